@@ -1,0 +1,36 @@
+# What every target of the tree shares: language level, warnings, sanitizers, output folders.
+
+set(CMAKE_CXX_STANDARD 17)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+set(CMAKE_C_STANDARD 11)
+set(CMAKE_EXPORT_COMPILE_COMMANDS ON)
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+if(NOT CMAKE_BUILD_TYPE AND NOT CMAKE_CONFIGURATION_TYPES)
+  set(CMAKE_BUILD_TYPE Release CACHE STRING "Build type" FORCE)
+endif()
+
+# Programs and libraries of one build lie together, so that tools find each other.
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
+set(CMAKE_INSTALL_RPATH "$ORIGIN:$ORIGIN/../${CMAKE_INSTALL_LIBDIR}")
+
+find_program(ZEM_CCACHE ccache)
+if(ZEM_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
+  set(CMAKE_C_COMPILER_LAUNCHER ${ZEM_CCACHE})
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${ZEM_CCACHE})
+endif()
+
+find_package(Threads REQUIRED)
+
+if(ZEM_SANITIZE)
+  add_compile_options(-fsanitize=${ZEM_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
+  add_link_options(-fsanitize=${ZEM_SANITIZE})
+endif()
+
+# zem_target(<target>): the house's warnings on a target of ours.
+function(zem_target target)
+  target_compile_options(${target} PRIVATE
+    -Wall -Wextra -Wpedantic -Wshadow
+    $<$<COMPILE_LANGUAGE:CXX>:-Wconversion -Wnon-virtual-dtor>)
+endfunction()

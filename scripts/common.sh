@@ -1,0 +1,50 @@
+# Shared by the scripts: where the tree is, what the machine must have, how it is built.
+# Sourced, not run.
+
+set -euo pipefail
+top=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
+jobs=$(nproc)
+
+say() { printf '== %s\n' "$*" >&2; }
+die() { printf 'error: %s\n' "$*" >&2; exit 1; }
+
+# what each group of work needs, by Debian package
+packages_build="g++ cmake ninja-build ccache pkg-config flex bison
+  libsqlite3-dev nlohmann-json3-dev libcli11-dev"
+packages_test="libgtest-dev"
+packages_bench="libbenchmark-dev libcsv-dev python3"
+packages_style="clang clang-format clang-tidy libclang-rt-14-dev"
+
+# install_missing <package>...: installs through apt what dpkg does not know yet.
+install_missing() {
+    local missing=() package
+    for package in "$@"; do
+        dpkg-query -W -f='${Status}' "$package" 2>/dev/null | grep -q 'ok installed' ||
+            missing+=("$package")
+    done
+    [ ${#missing[@]} -eq 0 ] && return 0
+    command -v apt-get >/dev/null || die "no apt-get here; install by hand: ${missing[*]}"
+    local as_root=()
+    if [ "$(id -u)" -ne 0 ]; then
+        command -v sudo >/dev/null ||
+            die "not root and no sudo; as root run: apt-get install ${missing[*]}"
+        as_root=(sudo)
+    fi
+    say "installing: ${missing[*]}"
+    "${as_root[@]}" apt-get update -qq >&2
+    "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive \
+        apt-get install -y -qq --no-install-recommends "${missing[@]}" >&2
+}
+
+# build <preset> [<cmake option>...]: configures and builds into build/<preset>.
+build() {
+    local preset=$1
+    shift
+    say "building ($preset)"
+    cmake -S "$top" --preset "$preset" "$@" >"$top/build-$preset.log" 2>&1 || {
+        cat "$top/build-$preset.log" >&2
+        die "configuring failed"
+    }
+    rm -f "$top/build-$preset.log"
+    cmake --build "$top/build/$preset" -j "$jobs" >&2
+}

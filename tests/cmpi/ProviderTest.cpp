@@ -1,0 +1,353 @@
+// A provider as the server sees it: factories, the entries of its tables, and cleanup.
+#include <gtest/gtest.h>
+#include <pthread.h>
+
+#include <functional>
+#include <memory>
+#include <new>
+#include <stdexcept>
+#include <string>
+
+#include "CmpiAssociationMI.h"
+#include "CmpiIndicationMI.h"
+#include "CmpiInstanceMI.h"
+#include "CmpiMethodMI.h"
+#include "CmpiPropertyMI.h"
+#include "FakeServer.h"
+
+namespace {
+
+/// What the provider does next, and what it saw.
+struct Script {
+    std::function<CmpiStatus()> operation = [] { return CmpiStatus(CMPI_RC_OK); };
+    std::function<CmpiStatus()> construct = operation, initialize = operation, cleanup = operation;
+    int unloadable = 1;
+    int alive = 0;
+    std::string called;
+};
+Script* script;
+
+CmpiStatus act(const char* name) {
+    script->called = name;
+    return script->operation();
+}
+
+class Sample : public CmpiInstanceMI,
+               public CmpiAssociationMI,
+               public CmpiMethodMI,
+               public CmpiPropertyMI,
+               public CmpiIndicationMI {
+    using Status = CmpiStatus;
+    using Ctx = const CmpiContext&;
+    using Out = CmpiResult&;
+    using Filter = const CmpiSelectExp&;
+    using Path = const CmpiObjectPath&;
+    using Text = const char*;
+    using List = const char**;
+    using Flag = CMPIBoolean;
+
+public:
+    Sample(const CmpiBroker& b, Ctx ctx)
+        : CmpiBaseMI(b, ctx),
+          CmpiInstanceMI(b, ctx),
+          CmpiAssociationMI(b, ctx),
+          CmpiMethodMI(b, ctx),
+          CmpiPropertyMI(b, ctx),
+          CmpiIndicationMI(b, ctx) {
+        script->construct();
+        ++script->alive;
+    }
+    ~Sample() override { --script->alive; }
+
+    CmpiStatus initialize(Ctx) override { return script->initialize(); }
+    CmpiStatus cleanup(CmpiContext&) override { return script->cleanup(); }
+    int isUnloadable() const override { return script->unloadable; }
+
+    Status enumInstanceNames(Ctx, Out, Path) override { return act("enumNames"); }
+    Status enumInstances(Ctx, Out, Path, List) override { return act("enum"); }
+    Status getInstance(Ctx, Out, Path, List) override { return act("get"); }
+    Status createInstance(Ctx, Out, Path, const CmpiInstance&) override { return act("create"); }
+    Status setInstance(Ctx, Out, Path, const CmpiInstance&, List) override { return act("set"); }
+    Status deleteInstance(Ctx, Out, Path) override { return act("delete"); }
+    Status execQuery(Ctx, Out, Path, Text first, Text) override { return act(first); }
+    Status associators(Ctx, Out, Path, Text, Text, Text, Text, List) override {
+        return act("associators");
+    }
+    Status associatorNames(Ctx, Out, Path, Text, Text, Text, Text r) override { return act(r); }
+    Status references(Ctx, Out, Path, Text, Text, List) override { return act("references"); }
+    Status referenceNames(Ctx, Out, Path, Text, Text) override { return act("names"); }
+    Status invokeMethod(Ctx, Out, Path, Text, const CmpiArgs&, CmpiArgs& out) override {
+        out.setArg("Out", CmpiData(CMPIUint32(7)));
+        return act("invoke");
+    }
+    Status setProperty(Ctx, Out r, Path, Text, const CmpiData& d) override {
+        r.returnData(d);
+        return act("setProperty");
+    }
+    Status getProperty(Ctx, Out, Path, Text name) override { return act(name); }
+    Status authorizeFilter(Ctx, Filter, Text, Path, Text user) override { return act(user); }
+    Status mustPoll(Ctx, Filter, Text, Path) override { return act("poll"); }
+    Status activateFilter(Ctx, Filter, Text, Path, Flag f) override {
+        return act(f ? "first" : "");
+    }
+    Status deActivateFilter(Ctx, Filter, Text, Path, Flag f) override {
+        return act(f ? "last" : "");
+    }
+    Status enableIndications(Ctx) override { return act("enable"); }
+    Status disableIndications(Ctx) override { return act("disable"); }
+};
+
+CMProviderBase(SampleProvider);
+
+}  // namespace
+
+CMInstanceMIFactory(Sample, SampleProvider);
+CMAssociationMIFactory(Sample, SampleProvider);
+CMMethodMIFactory(Sample, SampleProvider);
+CMPropertyMIFactory(Sample, SampleProvider);
+CMIndicationMIFactory(Sample, SampleProvider);
+
+namespace {
+CmpiStatus throwCode() { throw CmpiStatus(CMPI_RC_ERR_ACCESS_DENIED); }
+CmpiStatus throwText() { throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND, "no such host"); }
+CmpiStatus throwError() { throw std::runtime_error("disk on fire"); }
+CmpiStatus throwMemory() { throw std::bad_alloc(); }
+CmpiStatus throwNumber() { throw 42; }
+CmpiStatus answerText() { return CmpiStatus(CMPI_RC_ERR_FAILED, "answered"); }
+
+struct ProviderTest : testing::Test {
+    ProviderTest() { script = &m_script; }
+    ~ProviderTest() override {
+        m_script.cleanup = [] { return CmpiStatus(CMPI_RC_OK); };
+        for (int i = 0; i < 5 && m_script.alive; ++i) cleanup(true);
+        EXPECT_EQ(m_script.alive, 0);
+    }
+
+    CMPIInstanceMI* load() {
+        m_instance = SampleProvider_Create_InstanceMI(&m_server.broker, m_ctx, &m_rc);
+        return m_instance;
+    }
+    CMPIStatus cleanup(bool terminating) {
+        return m_instance->ft->cleanup(m_instance, m_ctx, terminating);
+    }
+    CMPIStatus enumerate() {
+        return m_instance->ft->enumerateInstances(m_instance, m_ctx, m_result, m_path, nullptr);
+    }
+    static std::string text(const CMPIStatus& status) {
+        return status.msg ? static_cast<const char*>(status.msg->hdl) : "(none)";
+    }
+
+    Script m_script;
+    FakeServer m_server;
+    CMPIStatus m_rc{CMPI_RC_OK, nullptr};
+    CMPIContext* m_ctx = m_server.make<CMPIContext>(m_server.contextFt);
+    CMPIResult* m_result = m_server.make<CMPIResult>(m_server.resultFt);
+    CMPIObjectPath* m_path = m_server.make<CMPIObjectPath>(m_server.pathFt);
+    CMPIInstanceMI* m_instance = nullptr;
+};
+
+TEST_F(ProviderTest, EveryEntryReachesItsOperation) {
+    CMPIInstanceMI* i = load();
+    CMPIAssociationMI* a = SampleProvider_Create_AssociationMI(&m_server.broker, m_ctx, &m_rc);
+    CMPIMethodMI* m = SampleProvider_Create_MethodMI(&m_server.broker, m_ctx, &m_rc);
+    CMPIPropertyMI* p = SampleProvider_Create_PropertyMI(&m_server.broker, m_ctx, &m_rc);
+    CMPIIndicationMI* n = SampleProvider_Create_IndicationMI(&m_server.broker, m_ctx, &m_rc);
+    EXPECT_EQ(m_script.alive, 1);
+    EXPECT_STREQ(n->ft->miName, "indicationSampleProvider");
+
+    CMPIInstance* inst = m_server.make<CMPIInstance>(m_server.instanceFt);
+    CMPIArgs* args = m_server.make<CMPIArgs>(m_server.argsFt);
+    CMPIData value{CMPI_sint64, CMPI_goodValue, {}};
+    value.value.sint64 = INT64_MIN;
+    const auto ctx = m_ctx;
+    const auto r = m_result;
+    const auto op = m_path;
+    const struct {
+        const char* called;
+        std::function<CMPIStatus()> entry;
+    } kEntries[] = {
+        {"enumNames", [=] { return i->ft->enumerateInstanceNames(i, ctx, r, op); }},
+        {"enum", [=] { return i->ft->enumerateInstances(i, ctx, r, op, nullptr); }},
+        {"get", [=] { return i->ft->getInstance(i, ctx, r, op, nullptr); }},
+        {"create", [=] { return i->ft->createInstance(i, ctx, r, op, inst); }},
+        {"set", [=] { return i->ft->modifyInstance(i, ctx, r, op, inst, nullptr); }},
+        {"delete", [=] { return i->ft->deleteInstance(i, ctx, r, op); }},
+        {"query", [=] { return i->ft->execQuery(i, ctx, r, op, "query", "lang"); }},
+        {"associators",
+         [=] { return a->ft->associators(a, ctx, r, op, "A", "R", "r", "rr", nullptr); }},
+        {"rr", [=] { return a->ft->associatorNames(a, ctx, r, op, "A", "R", "r", "rr"); }},
+        {"references", [=] { return a->ft->references(a, ctx, r, op, "R", "r", nullptr); }},
+        {"names", [=] { return a->ft->referenceNames(a, ctx, r, op, "R", "r"); }},
+        {"invoke", [=] { return m->ft->invokeMethod(m, ctx, r, op, "Start", args, args); }},
+        {"setProperty", [=] { return p->ft->setProperty(p, ctx, r, op, "Name", value); }},
+        {"Name", [=] { return p->ft->getProperty(p, ctx, r, op, "Name"); }},
+        {"user", [=] { return n->ft->authorizeFilter(n, ctx, nullptr, "C", op, "user"); }},
+        {"poll", [=] { return n->ft->mustPoll(n, ctx, nullptr, "C", op); }},
+        {"first", [=] { return n->ft->activateFilter(n, ctx, nullptr, "C", op, 1); }},
+        {"last", [=] { return n->ft->deActivateFilter(n, ctx, nullptr, "C", op, 1); }},
+        {"enable", [=] { return n->ft->enableIndications(n, ctx); }},
+        {"disable", [=] { return n->ft->disableIndications(n, ctx); }},
+    };
+    for (const auto& e : kEntries) {
+        m_script.operation = [] { return CmpiStatus(CMPI_RC_OK); };
+        EXPECT_EQ(e.entry().rc, CMPI_RC_OK) << e.called;
+        EXPECT_EQ(m_script.called, e.called);
+        m_script.operation = throwError;
+        EXPECT_EQ(text(e.entry()), "disk on fire") << e.called;
+    }
+    EXPECT_EQ(FakeServer::bag(args).values.front().second.value.uint32, 7u);
+    EXPECT_EQ(FakeServer::bag(r).values.front().second.value.sint64, INT64_MIN);
+}
+
+TEST_F(ProviderTest, NothingButAStatusCrosses) {
+    static const struct {
+        CmpiStatus (*operation)();
+        CMPIrc rc;
+        const char* text;
+    } kCases[] = {
+        {throwCode, CMPI_RC_ERR_ACCESS_DENIED, "(none)"},
+        {throwText, CMPI_RC_ERR_NOT_FOUND, "no such host"},
+        {throwError, CMPI_RC_ERR_FAILED, "disk on fire"},
+        {throwMemory, CMPI_RC_ERR_FAILED, "std::bad_alloc"},
+        {throwNumber, CMPI_RC_ERR_FAILED, "The provider failed."},
+        {answerText, CMPI_RC_ERR_FAILED, "answered"},
+    };
+    ASSERT_TRUE(load());
+    for (const auto& c : kCases) {
+        m_script.operation = c.operation;
+        const CMPIStatus status = enumerate();
+        EXPECT_EQ(status.rc, c.rc);
+        EXPECT_EQ(text(status), c.text);
+    }
+    // Without a way to make the text, the code still arrives.
+    m_server.eft.newString = nullptr;
+    m_script.operation = throwError;
+    EXPECT_EQ(enumerate().rc, CMPI_RC_ERR_FAILED);
+    m_server.eft.newString = [](const CMPIBroker*, const char*, CMPIStatus*) -> CMPIString* {
+        throw std::bad_alloc();
+    };
+    EXPECT_EQ(text(enumerate()), "(none)");
+}
+
+TEST_F(ProviderTest, CancellationUnwindsTheWholeThread) {
+    ASSERT_TRUE(load());
+    m_script.operation = [this]() -> CmpiStatus {
+        const auto unwind = [](ProviderTest* test) { test->m_script.called = "unwound"; };
+        const std::unique_ptr<ProviderTest, decltype(unwind)> mark(this, unwind);
+        pthread_cancel(pthread_self());
+        pthread_testcancel();
+        return CmpiStatus(CMPI_RC_OK);
+    };
+    const auto thread = [](void* self) -> void* {
+        static_cast<ProviderTest*>(self)->enumerate();
+        return nullptr;
+    };
+    pthread_t id;
+    ASSERT_EQ(pthread_create(&id, nullptr, thread, this), 0);
+    void* result = nullptr;
+    ASSERT_EQ(pthread_join(id, &result), 0);
+    EXPECT_EQ(result, PTHREAD_CANCELED);
+    EXPECT_EQ(m_script.called, "unwound");
+}
+
+TEST_F(ProviderTest, RecordsWithoutAProviderAreRefused) {
+    CMPIInstanceMI* record = load();
+    CMPIInstanceMI gone{nullptr, record->ft};
+    const auto enumNames = record->ft->enumerateInstanceNames;
+    EXPECT_EQ(enumNames(&gone, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(enumNames(nullptr, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(record->ft->cleanup(&gone, m_ctx, 0).rc, CMPI_RC_ERR_INVALID_HANDLE);
+
+    CmpiMethodMI methodsOnly(CmpiBroker(&m_server.broker), CmpiContext(m_ctx));
+    CMPIInstanceMI wrongKind{static_cast<CmpiBaseMI*>(&methodsOnly), record->ft};
+    EXPECT_EQ(enumNames(&wrongKind, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    CMPIMethodMI notOverridden{wrongKind.hdl, nullptr};
+    EXPECT_EQ(CmpiMethodMI::driveInvokeMethod(&notOverridden, m_ctx, m_result, m_path, "M", nullptr,
+                                              nullptr)
+                  .rc,
+              CMPI_RC_ERR_NOT_SUPPORTED);
+}
+
+TEST_F(ProviderTest, AFailingLoadLeavesNothing) {
+    static const struct {
+        std::function<CmpiStatus()> Script::*step;
+        CmpiStatus (*does)();
+        CMPIrc rc;
+        const char* text;
+    } kCases[] = {
+        {&Script::initialize, answerText, CMPI_RC_ERR_FAILED, "answered"},
+        {&Script::initialize, throwText, CMPI_RC_ERR_NOT_FOUND, "no such host"},
+        {&Script::initialize, throwNumber, CMPI_RC_ERR_FAILED, "The provider failed."},
+        {&Script::construct, throwError, CMPI_RC_ERR_FAILED, "disk on fire"},
+    };
+    for (const auto& c : kCases) {
+        m_script.*(c.step) = c.does;
+        EXPECT_EQ(load(), nullptr);
+        EXPECT_EQ(m_rc.rc, c.rc);
+        EXPECT_EQ(text(m_rc), c.text);
+        EXPECT_EQ(m_script.alive, 0);
+        m_script.*(c.step) = [] { return CmpiStatus(CMPI_RC_OK); };
+    }
+    EXPECT_TRUE(load());
+    EXPECT_EQ(m_rc.rc, CMPI_RC_OK);
+}
+
+TEST_F(ProviderTest, TheLastCleanupDestroys) {
+    load();
+    CMPIMethodMI* method = SampleProvider_Create_MethodMI(&m_server.broker, m_ctx, &m_rc);
+    EXPECT_EQ(cleanup(false).rc, CMPI_RC_OK);
+    EXPECT_EQ(m_script.alive, 1);
+    EXPECT_EQ(method->ft->cleanup(method, m_ctx, 0).rc, CMPI_RC_OK);
+    EXPECT_EQ(m_script.alive, 0);
+    EXPECT_EQ(method->ft->invokeMethod(method, m_ctx, m_result, m_path, "M", nullptr, nullptr).rc,
+              CMPI_RC_ERR_INVALID_HANDLE);
+    load();
+    EXPECT_EQ(m_script.alive, 1);
+    EXPECT_EQ(enumerate().rc, CMPI_RC_OK);
+}
+
+TEST_F(ProviderTest, WhenAProviderMayStay) {
+    static const struct {
+        int unloadable;
+        CmpiStatus (*cleanup)();
+        bool terminating;
+        CMPIrc rc;
+        int alive;
+    } kCases[] = {
+        {0, nullptr, false, CMPI_RC_ERR_NOT_SUPPORTED, 1},
+        {0, nullptr, true, CMPI_RC_OK, 0},
+        {1, answerText, false, CMPI_RC_ERR_FAILED, 1},
+        {1, answerText, true, CMPI_RC_ERR_FAILED, 1},
+        {1, throwText, false, CMPI_RC_ERR_NOT_FOUND, 1},
+        {1, throwText, true, CMPI_RC_OK, 0},
+        {1, throwError, false, CMPI_RC_ERR_FAILED, 1},
+    };
+    for (const auto& c : kCases) {
+        load();
+        m_script.unloadable = c.unloadable;
+        if (c.cleanup) m_script.cleanup = c.cleanup;
+        EXPECT_EQ(cleanup(c.terminating).rc, c.rc);
+        EXPECT_EQ(m_script.alive, c.alive);
+        m_script.cleanup = [] { return CmpiStatus(CMPI_RC_OK); };
+        m_script.unloadable = 1;
+        // What stayed still has its one use: one more cleanup ends it.
+        if (c.alive) cleanup(false);
+        EXPECT_EQ(m_script.alive, 0);
+    }
+}
+
+TEST_F(ProviderTest, TextsAreMadeByALivingProvidersBroker) {
+    EXPECT_EQ(CmpiStatus(CMPI_RC_ERR_FAILED, "nobody to make it").msg(), nullptr);
+    const CmpiContext ctx(m_ctx);
+    auto other = std::make_unique<FakeServer>();
+    const CmpiMethodMI first(CmpiBroker(&m_server.broker), ctx);
+    auto second = std::make_unique<CmpiMethodMI>(CmpiBroker(&other->broker), ctx);
+    const int made = other->made();
+    EXPECT_STREQ(CmpiStatus(CMPI_RC_ERR_FAILED, "of the second").msg(), "of the second");
+    EXPECT_EQ(other->made(), made + 1);
+    second.reset();
+    other.reset();
+    EXPECT_STREQ(CmpiStatus(CMPI_RC_ERR_FAILED, "of the first").msg(), "of the first");
+}
+
+}  // namespace

@@ -1,0 +1,50 @@
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <set>
+#include <string>
+
+#include "Guid.h"
+
+namespace {
+
+constexpr char zero[] = "00000000-0000-0000-0000-000000000000";
+
+TEST(GuidTest, ReadsAndPrints) {
+    const struct {
+        const char* text;
+        const char* printed;
+    } rows[] = {
+        {"0123abcd-4567-89ab-cdef-0123456789ab", "0123ABCD-4567-89AB-CDEF-0123456789AB"},
+        {"0123abcd-4567-89ab-cdef-0123456789a", zero},
+        {"0123abcd-4567-89ab-cdef-0123456789abc", zero},
+        {"0123abcd-4567-89ab-cdef00123456789ab", zero},
+        {"0123abcd4-567-89ab-cdef-0123456789ab", zero},
+        {"0123abcd-4567-xxxx-cdef-0123456789ab", "0123ABCD-4567-0000-0000-000000000000"},
+        {"", zero},
+        {nullptr, zero},
+    };
+    for (const auto& row : rows) {
+        EXPECT_STREQ(zemGuid(row.text).toString(), row.printed);
+    }
+    EXPECT_TRUE(zemGuid(rows[0].text) == zemGuid(rows[0].printed));
+    EXPECT_FALSE(zemGuid(rows[0].text) == zemGuid());
+}
+
+TEST(GuidTest, PartsStandInMemoryInTheOrderOfTheText) {
+    // The fifth group is a 16-bit word and a 32-bit one.
+    const zemGuid guid("03020100-0504-0706-0908-0B0A0F0E0D0C");
+    EXPECT_EQ(std::memcmp(reinterpret_cast<const char*>(&guid) + sizeof(void*),
+                          "\0\1\2\3\4\5\6\7\10\11\12\13\14\15\16\17", 16),
+              0);
+}
+
+TEST(GuidTest, NewOnesDiffer) {
+    std::set<std::string> seen;
+    for (int i = 0; i < 1000; ++i) {
+        seen.insert(static_cast<const char*>(zemGuid::getNewGuid().toString()));
+    }
+    EXPECT_EQ(seen.size(), 1000U);
+}
+
+}  // namespace

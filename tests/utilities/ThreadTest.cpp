@@ -1,0 +1,165 @@
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <cerrno>
+#include <chrono>
+#include <ctime>
+#include <functional>
+#include <thread>
+#include <vector>
+
+#include "AtomicType.h"
+#include "Thread.h"
+
+namespace {
+
+using Clock = std::chrono::steady_clock;
+using std::chrono::milliseconds;
+
+bool eventually(const std::function<bool()>& holds) {
+    for (int i = 0; i < 20000 && !holds(); ++i) {
+        usleep(1000);
+    }
+    return holds();
+}
+
+void onThreads(int count, const std::function<void()>& work,
+               const std::function<void()>& meanwhile) {
+    std::vector<std::thread> threads;
+    for (int i = 0; i < count; ++i) {
+        threads.emplace_back(work);
+    }
+    meanwhile();
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+}
+
+TEST(ThreadSynchronizerTest, IsRecursiveAndKeepsOthersOut) {
+    zemSynchronizerContext context;
+    zemAtomicType<int> counted(5);
+    int plain = 0;
+    const auto count = [&] {
+        for (int i = 0; i < 5000; ++i) {
+            ++counted;
+            zemSynchronizer outer(context);
+            zemSynchronizer inner(context);
+            ++plain;
+        }
+    };
+    onThreads(3, count, count);
+    EXPECT_EQ(plain, 20000);
+    EXPECT_EQ(counted++, 20005);
+    EXPECT_EQ(counted -= 6, 20000);
+}
+
+TEST(ThreadConditionTest, TimedWaitCrossesASecond) {
+    timespec now{};
+    do {
+        clock_gettime(CLOCK_REALTIME, &now);
+    } while (now.tv_nsec < 700000000L || now.tv_nsec > 800000000L);
+    zemCondition condition;
+    const auto start = Clock::now();
+    condition.timedWait(400);
+    condition.timedWait(-5);
+    EXPECT_GE(Clock::now() - start, milliseconds(390));
+    EXPECT_LT(Clock::now() - start, milliseconds(5000));
+}
+
+TEST(ThreadConditionTest, SignalWakesAllWaiters) {
+    zemCondition condition;
+    std::atomic<int> awake{0};
+    const auto wait = [&] {
+        condition.wait();
+        ++awake;
+    };
+    onThreads(4, wait, [&] {
+        usleep(100000);
+        condition.signal();
+        EXPECT_TRUE(eventually([&] { return awake > 1; })) << "a broadcast";
+        while (awake < 4) {  // one that came late to its wait
+            condition.signal();
+        }
+    });
+}
+
+struct Gate {
+    std::atomic<bool> open{false};
+    std::atomic<int> id{0};
+    static void pass(void* gate) {
+        auto* const self = static_cast<Gate*>(gate);
+        self->id = zemThread::getCurrentThreadId();
+        EXPECT_TRUE(eventually([self] { return self->open.load(); }));
+    }
+};
+
+TEST(ThreadTest, RunsAndCanRunAgain) {
+    zemThread thread;
+    thread.waitThreadExit();
+    EXPECT_EQ(thread.cancel(), 0);
+    EXPECT_EQ(thread.resume(), ESRCH);
+    for (int round = 0; round < 2; ++round) {
+        Gate gate;
+        ASSERT_EQ(thread.start(Gate::pass, &gate), 0);
+        EXPECT_TRUE(eventually([&] { return gate.id == thread.getThreadId(); }));
+        EXPECT_TRUE(thread.isStarted());
+        EXPECT_EQ(thread.start(Gate::pass, &gate), EBUSY);
+        gate.open = true;
+        EXPECT_TRUE(eventually([&] { return !thread.isStarted(); }));
+    }
+}
+
+// Sets its flag when the stack is unwound.
+struct Witness {
+    explicit Witness(void* flag) : unwound(static_cast<std::atomic<bool>*>(flag)) {}
+    ~Witness() { *unwound = true; }
+    static void run(void (*method)()) { method(); }
+    std::atomic<bool>* unwound;
+};
+
+zemCondition neverSignalled;
+
+TEST(ThreadTest, EndsQuietlyHoweverTheMethodEnds) {
+    const zemThread::StartMethod methods[] = {
+        [](void* flag) { throw Witness(flag); },
+        [](void* flag) { Witness(flag).run(zemThread::Exit); },
+        [](void* flag) { Witness(flag).run([] { neverSignalled.wait(); }); },  // to be cancelled
+    };
+    for (const auto method : methods) {
+        std::atomic<bool> unwound{false};
+        {
+            zemThread thread;
+            ASSERT_EQ(thread.start(method, &unwound), 0);
+            EXPECT_TRUE(eventually([&] { return thread.isStarted() == (method == methods[2]); }));
+            EXPECT_EQ(thread.cancel(), 0);
+            EXPECT_FALSE(thread.isStarted());
+        }
+        EXPECT_TRUE(unwound);
+    }
+    neverSignalled.signal();  // blocks for good if the cancelled wait kept the mutex
+}
+
+TEST(ThreadQueueTest, DeliversInOrderAndNeverHangs) {
+    zemControlledDataCommunication queue;
+    int data[5000] = {};
+    const auto produce = [&] {
+        for (int i = 0; i < 5000; ++i) {
+            data[i] = i;
+            queue.putControlledData(&data[i], i + 1);
+            usleep(i % 500 == 0 ? 2000 : 0);
+        }
+    };
+    onThreads(1, produce, [&] {
+        for (int i = 0; i < 5000; ++i) {
+            int size = 0;
+            const void* const got = queue.getControlledData(size);
+            EXPECT_EQ(got, &data[i]);
+            EXPECT_EQ(size, data[i] + 1);
+        }
+    });
+    queue.putControlledData(data, 0);  // dropped, without a leak, at destruction
+    queue.putControlledData(data, 1);
+}
+
+}  // namespace

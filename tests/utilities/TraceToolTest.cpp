@@ -1,0 +1,189 @@
+#include <gtest/gtest.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <chrono>
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <functional>
+#include <regex>
+#include <string>
+#include <thread>
+#include <vector>
+
+#include "TraceTool.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+std::vector<std::string> linesOf(const std::string& file) {
+    std::vector<std::string> lines;
+    std::ifstream in(file);
+    for (std::string line; std::getline(in, line);) {
+        lines.push_back(line);
+    }
+    return lines;
+}
+
+// The manager reads the environment once in the life of a process, so each case is a process:
+// a fork of this one, which itself never touches the manager.
+class TraceToolTest : public testing::Test {
+protected:
+    ~TraceToolTest() override {
+        fs::remove(m_trace);
+        fs::remove(m_output);
+    }
+
+    // Runs the work with tracing switched by the variables, null meaning unset, and returns what
+    // it wrote to standard output. Its failed expectations make the process, and this test, fail.
+    std::string run(const char* trace, const char* path, const std::function<void()>& work) const {
+        std::fflush(stdout);
+        const pid_t child = fork();
+        if (child == 0) {
+            std::freopen(m_output.c_str(), "w", stdout);
+            trace == nullptr ? unsetenv("VM_CIMPROVIDER_TRACE")
+                             : setenv("VM_CIMPROVIDER_TRACE", trace, 1);
+            path == nullptr ? unsetenv("VM_CIMPROVIDER_TRACE_PATH")
+                            : setenv("VM_CIMPROVIDER_TRACE_PATH", path, 1);
+            work();
+            std::exit(HasFailure() ? 1 : 0);
+        }
+        int status = -1;
+        EXPECT_EQ(waitpid(child, &status, 0), child);
+        std::string text;
+        for (const std::string& line : linesOf(m_output)) {
+            text += line + "\n";
+        }
+        EXPECT_EQ(status, 0) << text;
+        return text;
+    }
+
+    bool waitForLines(std::size_t count) const {
+        for (int i = 0; i < 1000 && linesOf(m_trace).size() < count; ++i) {
+            usleep(50000);
+        }
+        return linesOf(m_trace).size() == count;
+    }
+
+    const std::string m_trace = testing::TempDir() + "timing" + std::to_string(getpid());
+    const std::string m_output = m_trace + ".stdout";
+};
+
+TEST_F(TraceToolTest, OffUnlessAskedFor) {
+    const std::string output = run(nullptr, m_trace.c_str(), [] {
+        CTimeLogerManager* const manager = CTimeLogerManager::getInstance();
+        CTimeLoger* const logger = manager->getLogger("x");
+        EXPECT_EQ(logger, manager->getLogger("y"));
+        EXPECT_STREQ(logger->getId(), "dummy");
+        EXPECT_FALSE(manager->isEnabled());
+        logger->begin("k");
+        logger->end("k");
+        manager->log("line");
+        EXPECT_EQ(manager->getLogQueue(), nullptr);
+    });
+    EXPECT_EQ(output, "env not set for VM_CIMPROVIDER_TRACE\n");
+    EXPECT_FALSE(fs::exists(m_trace));
+}
+
+TEST_F(TraceToolTest, SaysWhereTheDefaultFileIsAndEndsWithoutWaitingForThePoll) {
+    const auto start = std::chrono::steady_clock::now();
+    for (int i = 0; i < 5; ++i) {
+        EXPECT_EQ(run("", nullptr, CTimeLogerManager::getInstance),
+                  "env not set for VM_CIMPROVIDER_TRACE_PATH\npath:/tmp/CIMTestPerfData.txt\n");
+    }
+    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2400));
+}
+
+TEST_F(TraceToolTest, FiftyLinesAreWrittenFewerWait) {
+    const std::string output = run("", m_trace.c_str(), [this] {
+        CTimeLogerManager* const manager = CTimeLogerManager::getInstance();
+        CTimeLoger* const logger = manager->getLogger("op");
+        EXPECT_EQ(logger, manager->getLogger("op"));
+        EXPECT_NE(logger, manager->getLogger("other"));
+        logger->begin(std::string(10000, 'k').c_str());
+        logger->end("short");
+        logger->log("a", "b", "c");
+        for (int i = 3; i < 49; ++i) {
+            manager->log("fill");
+        }
+        usleep(1200000);  // two polls of the drain
+        EXPECT_TRUE(linesOf(m_trace).empty());
+        manager->log("fill");
+        EXPECT_TRUE(waitForLines(50));
+    });
+    EXPECT_EQ(output, "path:" + m_trace + "\n");
+    std::vector<std::string> lines = linesOf(m_trace);
+    ASSERT_EQ(lines.size(), 50U);
+    const std::size_t key = lines[0].find("kkk");
+    EXPECT_EQ(lines[0].substr(key, 10000), std::string(10000, 'k'));
+    lines[0].erase(key, 9999);
+    const char* const forms[] = {R"(\+\+\+op:-?\d+ op-k begin at \d{16}\.)",
+                                 R"(\+\+\+op:-?\d+ op-short end at \d{16}\.)",
+                                 R"(\+\+\+op:-?\d+,\d{16}, op,a-b,c)"};
+    for (std::size_t i = 0; i < 3; ++i) {
+        EXPECT_TRUE(std::regex_match(lines[i], std::regex(forms[i]))) << lines[i];
+    }
+}
+
+TEST_F(TraceToolTest, ThreadsLinesArriveWholeAndInOrder) {
+    constexpr int threadCount = 8;
+    constexpr int lineCount = 4000;
+    run("", m_trace.c_str(), [this] {
+        std::vector<std::thread> threads;
+        for (int t = 0; t < threadCount; ++t) {
+            threads.emplace_back([t] {
+                for (int i = 0; i < lineCount; ++i) {
+                    zemString key;
+                    key.format("<%d/%d>", t, i);
+                    // Half of the loggers are shared.
+                    CTimeLogerManager::getInstance()->getLogger(zemString(t / 2))->begin(key);
+                }
+            });
+        }
+        for (std::thread& thread : threads) {
+            thread.join();
+        }
+        for (int i = 0; i < 50; ++i) {
+            CTimeLogerManager::getInstance()->log("fill");
+        }
+        EXPECT_TRUE(waitForLines(threadCount * lineCount + 50));
+    });
+    int next[threadCount] = {};
+    const std::regex form(R"(\+\+\+\d:-?\d+ (\d)-<(\d)/(\d+)> begin at \d{16}\.)");
+    for (const std::string& line : linesOf(m_trace)) {
+        std::smatch match;
+        if (line != "fill") {
+            ASSERT_TRUE(std::regex_match(line, match, form)) << line;
+            ASSERT_EQ(std::stoi(match[3]), next[std::stoi(match[2])]++);
+        }
+    }
+    EXPECT_EQ(std::count(next, next + threadCount, lineCount), threadCount);
+}
+
+TEST_F(TraceToolTest, FileLoggerWritesAtOnce) {
+    const std::string path = "/tmp/CIMTest-" + std::to_string(zemThread::getCurrentThreadId());
+    fs::remove(path);
+    CTimeFileLoger logger("id");
+    logger.end("k");
+    const std::string line = linesOf(path).at(0);
+    fs::remove(path);
+    const std::regex form(R"(\+\+id: \+\+\+id:-?\d+ id-k end at \d{16}\.)");
+    EXPECT_TRUE(std::regex_match(line, form)) << line;
+}
+
+TEST(TimerTest, ElapsedTimes) {
+    CTimer timer;
+    usleep(20000);
+    const std::uint64_t second = timer.timer(0);
+    usleep(10000);
+    const int step = static_cast<int>(timer.timer(0) - second);
+    EXPECT_EQ(timer.getElapsedTime(CTimer::fromprevious, CTimer::micro), step);
+    EXPECT_EQ(timer.getElapsedTime(CTimer::fromprevious, CTimer::milli), step / 1000);
+    EXPECT_GE(timer.getElapsedTime(CTimer::frombegin, CTimer::milli), 30);
+}
+
+}  // namespace

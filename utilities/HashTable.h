@@ -1,0 +1,255 @@
+/// zemHashTable: a chained hash table with unique keys; its hash functions; and the chains that
+/// it shares with zemMultiHashTable.
+///
+/// The number of chains is fixed at construction; there is no rehashing. The array of chain heads
+/// is made at the first insert. Tables copy deeply; pointers stored as values stay the caller's.
+/// Operations report by return codes, except [] and getElement(), which throw the integer 3 for
+/// an absent key.
+///
+/// Thread-safety: none; callers lock.
+///
+///     zemHashTable<int, zemString, hashFunc> record(4);
+///     record.insert(7, "seven");
+///     zemString value;
+///     if (record.lookup(7, value) == 0) puts(value);
+#ifndef HASH_TABLE_H
+#define HASH_TABLE_H
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <utility>
+
+#include "StringUtils.h"
+#include "ZemExport.h"
+
+/// Hash functions: each reduces a key to the index of its chain among @p count chains.
+ZEM_EXPORT inline unsigned hashFunc(const int& key, unsigned count) {
+    return static_cast<unsigned>(key) % count;
+}
+
+ZEM_EXPORT inline unsigned cecHashFunc(const zemString& key, unsigned count) {
+    return static_cast<unsigned>(key.getHashKey()) % count;
+}
+
+ZEM_EXPORT inline unsigned lparHashFunc(const zemString& key, unsigned count) {
+    return cecHashFunc(key, count);
+}
+
+ZEM_EXPORT inline unsigned assoHashFunc(const zemString& key, unsigned count) {
+    return cecHashFunc(key, count);
+}
+
+/// Sums the text as 32-bit words in the machine's byte order; a partial last word does not count.
+ZEM_EXPORT inline unsigned objectCacheHashFunc(const zemString& key, unsigned count) {
+    const char* const text = key;
+    const std::size_t words = key.isEmpty() ? 0 : key.length() / sizeof(std::uint32_t);
+    std::uint32_t sum = 0;
+    for (std::size_t i = 0; i < words; ++i) {
+        std::uint32_t word = 0;
+        std::memcpy(&word, text + i * sizeof word, sizeof word);
+        sum += word;
+    }
+    return sum % count;
+}
+
+template <class K, class V>
+struct ZEM_EXPORT DnxBucketElement {
+    K m_key;
+    V m_value;
+};
+
+template <class K, class V>
+struct ZEM_EXPORT DnxBucket {
+    DnxBucket* m_next;
+    unsigned m_hash;
+    DnxBucketElement<K, V> m_element;
+};
+
+/// The chains of a hash table and what does not depend on whether keys are unique. Newer entries
+/// stand before older ones of the same chain.
+template <class K, class V, unsigned (*HashFn)(const K&, unsigned)>
+class ZEM_EXPORT zemBucketTable {
+public:
+    /// Return codes; absent is also the integer that [] and getElement() throw.
+    static constexpr int done = 0;
+    static constexpr int noHeads = 1;
+    static constexpr int duplicate = 2;
+    static constexpr int absent = 3;
+
+    /// Copies the (newest) value of @p key. Returns 0, or 3 with @p value as it was.
+    int lookup(const K& key, V& value) const {
+        const Bucket* const bucket = find(key);
+        if (bucket == nullptr) {
+            return absent;
+        }
+        value = bucket->m_element.m_value;
+        return done;
+    }
+
+    /// Removes every entry of @p key. Returns 0, or 3 if there is none.
+    int remove(const K& key) {
+        if (m_bucketArray == nullptr) {
+            return absent;
+        }
+        int result = absent;
+        const unsigned hash = HashFn(key, m_bucketLen);
+        for (Bucket** link = &m_bucketArray[hash]; *link != nullptr;) {
+            Bucket* const bucket = *link;
+            if (holds(bucket, hash, key)) {
+                *link = bucket->m_next;
+                delete bucket;
+                result = done;
+            } else {
+                link = &bucket->m_next;
+            }
+        }
+        return result;
+    }
+
+    /// Removes all entries; the array of heads stays.
+    void clear() {
+        for (unsigned i = 0; m_bucketArray != nullptr && i < m_bucketLen; ++i) {
+            while (Bucket* const bucket = m_bucketArray[i]) {
+                m_bucketArray[i] = bucket->m_next;
+                delete bucket;
+            }
+        }
+    }
+
+protected:
+    using Bucket = DnxBucket<K, V>;
+
+    explicit zemBucketTable(unsigned n) : m_bucketLen(n == 0 ? 8 : n), m_bucketArray(nullptr) {}
+
+    zemBucketTable(const zemBucketTable& source) : zemBucketTable(source.m_bucketLen) {
+        copyChains(source);
+    }
+
+    /// Leaves @p source empty, with its number of chains.
+    zemBucketTable(zemBucketTable&& source) noexcept
+        : m_bucketLen(source.m_bucketLen), m_bucketArray(source.m_bucketArray) {
+        source.m_bucketArray = nullptr;
+    }
+
+    zemBucketTable& operator=(const zemBucketTable& source) {
+        if (this != &source) {
+            clear();
+            if (m_bucketLen != source.m_bucketLen) {
+                delete[] m_bucketArray;
+                m_bucketArray = nullptr;
+                m_bucketLen = source.m_bucketLen;
+            }
+            copyChains(source);
+        }
+        return *this;
+    }
+
+    zemBucketTable& operator=(zemBucketTable&& source) noexcept {
+        std::swap(m_bucketLen, source.m_bucketLen);
+        std::swap(m_bucketArray, source.m_bucketArray);
+        return *this;
+    }
+
+    ~zemBucketTable() {
+        clear();
+        delete[] m_bucketArray;
+    }
+
+    bool hasHeads() const { return m_bucketArray != nullptr; }
+
+    static bool holds(const Bucket* bucket, unsigned hash, const K& key) {
+        return bucket->m_hash == hash && bucket->m_element.m_key == key;
+    }
+
+    /// The newest entry of @p key, or null.
+    Bucket* find(const K& key) const {
+        if (m_bucketArray == nullptr) {
+            return nullptr;
+        }
+        const unsigned hash = HashFn(key, m_bucketLen);
+        return findFrom(m_bucketArray[hash], hash, key);
+    }
+
+    /// The next older entry of the same key, or null.
+    Bucket* findNext(const Bucket* bucket) const {
+        return findFrom(bucket->m_next, bucket->m_hash, bucket->m_element.m_key);
+    }
+
+    /// Puts a new entry at the head of its chain. Returns 0, or 1 if there can be no chains.
+    int add(const K& key, const V& value) {
+        if (m_bucketLen == 0) {
+            return noHeads;
+        }
+        makeHeads();
+        const unsigned hash = HashFn(key, m_bucketLen);
+        m_bucketArray[hash] = new Bucket{m_bucketArray[hash], hash, {key, value}};
+        return done;
+    }
+
+private:
+    static Bucket* findFrom(Bucket* bucket, unsigned hash, const K& key) {
+        while (bucket != nullptr && !holds(bucket, hash, key)) {
+            bucket = bucket->m_next;
+        }
+        return bucket;
+    }
+
+    void makeHeads() {
+        if (m_bucketArray == nullptr) {
+            m_bucketArray = new Bucket*[m_bucketLen]();
+        }
+    }
+
+    void copyChains(const zemBucketTable& source) {
+        if (source.m_bucketArray == nullptr) {
+            return;
+        }
+        makeHeads();
+        for (unsigned i = 0; i < m_bucketLen; ++i) {
+            Bucket** link = &m_bucketArray[i];
+            for (const Bucket* from = source.m_bucketArray[i]; from != nullptr;
+                 from = from->m_next) {
+                *link = new Bucket{nullptr, from->m_hash, from->m_element};
+                link = &(*link)->m_next;
+            }
+        }
+    }
+
+    unsigned m_bucketLen;
+    Bucket** m_bucketArray;
+};
+
+template <class K, class V, unsigned (*HashFn)(const K&, unsigned)>
+class ZEM_EXPORT zemHashTable : public zemBucketTable<K, V, HashFn> {
+    using Base = zemBucketTable<K, V, HashFn>;
+
+public:
+    /// A table of @p n chains, 8 if that is 0.
+    explicit zemHashTable(unsigned n = 0) : Base(n) {}
+
+    /// Adds an entry. Returns 0; 2 if the key is there already, which changes nothing; 1 if the
+    /// table has no chains.
+    int insert(const K& key, const V& value) {
+        return this->find(key) != nullptr ? Base::duplicate : this->add(key, value);
+    }
+
+    /// The value of @p key, owned by the table.
+    /// @throws int 3 if the key is absent
+    V& operator[](const K& key) { return found(key).m_value; }
+    const V& operator[](const K& key) const { return found(key).m_value; }
+
+    /// The same, copied.
+    V getElement(const K& key) const { return found(key).m_value; }
+
+private:
+    DnxBucketElement<K, V>& found(const K& key) const {
+        typename Base::Bucket* const bucket = this->find(key);
+        if (bucket == nullptr) {
+            throw int{Base::absent};
+        }
+        return bucket->m_element;
+    }
+};
+
+#endif

@@ -1,0 +1,159 @@
+/// The timing trace: "begin" and "end" lines with a microsecond clock around provider operations.
+///
+/// Off unless the environment variable VM_CIMPROVIDER_TRACE is set when the manager first comes
+/// into being; VM_CIMPROVIDER_TRACE_PATH may name the file, /tmp/CIMTestPerfData.txt otherwise.
+/// Lines gather in a queue in memory, and one background thread writes them out, so that the
+/// threads of operations never touch the file. When off, begin(), end() and log() of the
+/// manager's loggers cost next to nothing.
+///
+/// Thread-safety: loggers and the manager are shared by all threads. Lines of one thread stand in
+/// the file in the order in which it wrote them.
+///
+///     CTimeLoger* timing = CTimeLogerManager::getInstance()->getLogger("enumInstances");
+///     timing->begin(key);
+///     ...
+///     timing->end(key);
+#ifndef TRACE_TOOL_H
+#define TRACE_TOOL_H
+
+#include <cstdint>
+#include <fstream>
+
+#include "DynamicArray.h"
+#include "StringUtils.h"
+#include "Synchronizer.h"
+#include "Thread.h"
+#include "ZemExport.h"
+
+/// A clock of microseconds since the epoch that keeps three ticks: the begin mark, the current
+/// reading and the one before it. May be read by many threads; their readings then mix.
+class ZEM_EXPORT CTimer {
+public:
+    enum tagTimeIntervalType { fromprevious = 0, frombegin = 1 };
+    enum tagTimerPrecisionType { milli = 0, micro = 1 };
+
+    /// Takes the first reading as the begin mark.
+    CTimer();
+
+    /// Takes a reading and returns it; a non-zero @p setBegin makes it the begin mark as well.
+    std::uint64_t timer(int setBegin);
+
+    /// From the previous reading or the begin mark to the current reading; 0 for other intervals.
+    int getElapsedTime(tagTimeIntervalType interval, tagTimerPrecisionType precision) const;
+
+private:
+    std::uint64_t _beginTick;
+    std::uint64_t _currentTick;
+    std::uint64_t _previousTick;
+};
+
+/// Builds the lines of one named logger and leaves to its subclasses where they go.
+class ZEM_EXPORT CTimeLoger {
+public:
+    explicit CTimeLoger(const zemString& id);
+    virtual ~CTimeLoger();
+
+    /// Bracket a piece of work; @p text tells one from another.
+    void begin(const char* text);
+    void end(const char* text);
+
+    /// A line of three texts at the current tick.
+    void log(const char* a, const char* b, const char* c);
+
+    const zemString& getId() const { return _id; }
+
+protected:
+    /// Takes one line, without its newline.
+    virtual void log(const char* text) = 0;
+
+private:
+    bool isDropped() const;
+    void mark(int setBegin, const char* word, const char* text);
+
+    zemString _id;
+    CTimer _timer;
+};
+
+/// Sends its lines to the manager's queue; the manager makes them.
+class ZEM_EXPORT CTimeThreadLoger : public CTimeLoger {
+public:
+    explicit CTimeThreadLoger(const zemString& id);
+
+protected:
+    void log(const char* text) override;
+};
+
+/// Writes its lines to a file of its own, "/tmp/CIMTest-" and the id of the thread that makes it.
+class ZEM_EXPORT CTimeFileLoger : public CTimeLoger {
+public:
+    explicit CTimeFileLoger(const zemString& id);
+
+protected:
+    void log(const char* text) override;
+
+private:
+    std::ofstream m_logger;
+    zemString m_filepath;
+    zemSynchronizerContext _context;
+};
+
+/// A file that is opened for append and closed with the object. For one thread.
+class ZEM_EXPORT CFileLoger {
+public:
+    explicit CFileLoger(const zemString& path);
+
+    /// Writes the line and a newline, and flushes.
+    void log(const char* text);
+
+private:
+    zemString m_filepath;
+    std::ofstream m_logger;
+};
+
+/// The one owner of the loggers, the queue, the file and the thread that drains one into the
+/// other.
+class ZEM_EXPORT CTimeLogerManager {
+public:
+    using LogListData = zemDynamicArray<zemString>;
+
+    /// The only manager; the first call reads the environment, starts the trace if that asks for
+    /// it, and says on standard output what it found.
+    static CTimeLogerManager* getInstance();
+
+    /// The logger of that name, made at the first call, owned by the manager. When tracing is off
+    /// all names share one.
+    CTimeLoger* getLogger(const zemString& name);
+
+    /// Appends a line to the queue; nothing when tracing is off.
+    void log(const char* text);
+
+    /// Hands the queue over to the caller, who deletes it, once it has 50 lines or is a minute
+    /// old; else null.
+    LogListData* getLogQueue();
+
+    bool isEnabled() const { return _enableLogger; }
+
+private:
+    CTimeLogerManager();
+    ~CTimeLogerManager();
+    CTimeLogerManager(const CTimeLogerManager&) = delete;
+    CTimeLogerManager& operator=(const CTimeLogerManager&) = delete;
+
+    static void monitorThread(void* manager);
+    void drain();
+    bool isStopped() const;
+    CTimeLoger* findOrAdd(const zemString& name);
+
+    CFileLoger* _logger;
+    zemThread m_monitorThread;
+    bool m_stopThread;
+    CTimer _timer;
+    zemCondition m_threadCond;
+    LogListData* _messageQueue;
+    zemSynchronizerContext _queuecontext;
+    zemSynchronizerContext _loggercontext;
+    zemDynamicArray<CTimeLoger> _loggers;
+    bool _enableLogger;
+};
+
+#endif

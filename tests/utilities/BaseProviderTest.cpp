@@ -1,0 +1,426 @@
+#include <atomic>
+#include <fstream>
+#include <thread>
+
+#include "ProviderHarness.h"
+
+namespace {
+
+using cimom::Character;
+
+bool enabled = true;
+constexpr const char* kTimingFile = "/tmp/zemBaseProviderTest.timing";
+
+// The timing trace reads its environment once, at the first operation of the process.
+const bool timingOn = [] {
+    std::remove(kTimingFile);
+    setenv("VM_CIMPROVIDER_TRACE", "1", 1);
+    setenv("VM_CIMPROVIDER_TRACE_PATH", kTimingFile, 1);
+    return true;
+}();
+
+}  // namespace
+
+// A deployment's own answer, as it would be put ahead of the library's.
+CMPIBoolean zemBaseProvider::isProviderEnabled(const CmpiContext&) { return enabled; }
+
+namespace {
+
+enum Rule { kOrdinary, kEnumeration, kMethod, kIndication };
+
+// One operation as the server calls it, and what the frame says of it.
+struct Operation {
+    const char* name;
+    const char* worker;
+    Rule rule;
+    const char* refusal;      ///< operation named when the class is not served; null: no class test
+    const char* unsupported;  ///< operation named by the worker of the base class, or null
+    const char* banner;
+    bool done;
+    int exits;         ///< exit lines of the operation when it succeeds
+    int refusedExits;  ///< and when the class is not served
+    Answer (*call)(Harness& h);
+};
+
+using I = CMPIInstanceMIFT;
+using A = CMPIAssociationMIFT;
+using N = CMPIIndicationMIFT;
+constexpr auto no = nullptr;
+
+Answer setCaption(Harness& h) {
+    CMPIData data = {CMPI_chars, CMPI_goodValue, {}};
+    data.value.chars = const_cast<char*>("new caption");
+    return h.call(h.property, &CMPIPropertyMIFT::setProperty, h.path(), "Caption", data);
+}
+
+// getInstance and setInstance have exit lines of the inner getInstance and of the existence test.
+// clang-format off
+const Operation kOperations[] = {
+    {"enumInstanceNames", "performEnumInstanceNames", kEnumeration, "enumInstanceNames", "enumerateInstanceNames", "ENUMERATE INSTANCE NAMES: ", true, 1, 1,
+     [](Harness& h) { return h.call(h.instance, &I::enumerateInstanceNames, h.classPath()); }},
+    {"enumInstances", "performEnumInstances", kEnumeration, "enumerateInstances", "enumerateInstances", "ENUMERATE INSTANCES: ", true, 1, 1,
+     [](Harness& h) { return h.call(h.instance, &I::enumerateInstances, h.classPath(), no); }},
+    {"getInstance", "performGetInstance", kOrdinary, "getInstance", "getInstance", "GET INSTANCE: ", true, 2, 2,
+     [](Harness& h) { return h.call(h.instance, &I::getInstance, h.path(), no); }},
+    {"createInstance", "performCreateInstance", kOrdinary, "createInstance", "createInstance", "CREATE INSTANCE: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.instance, &I::createInstance, h.classPath(), h.disk()); }},
+    {"setInstance", "performSetInstance", kOrdinary, "modifyInstance", "getInstance", "SET INSTANCE: ", false, 2, 2,
+     [](Harness& h) { return h.call(h.instance, &I::modifyInstance, h.path(), h.disk(), no); }},
+    {"deleteInstance", "performDeleteInstance", kOrdinary, "deleteInstance", "deleteInstance", "DELETE INSTANCE: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.instance, &I::deleteInstance, h.path()); }},
+    {"associators", "performAssociators", kOrdinary, nullptr, "associators", "ASSOCIATORS: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.association, &A::associators, h.path(), no, "X", no, no, no); }},
+    {"associatorNames", "performAssociatorNames", kOrdinary, nullptr, "associatorNames", "ASSOCIATOR NAMES: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.association, &A::associatorNames, h.path(), "", no, no, no); }},
+    {"references", "performReferences", kOrdinary, nullptr, "references", "REFERENCES: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.association, &A::references, h.path(), no, no, no); }},
+    {"referenceNames", "performReferenceNames", kOrdinary, nullptr, "referenceNames", "REFERENCE NAMES: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.association, &A::referenceNames, h.path(), no, no); }},
+    {"invokeMethod", "performInvokeMethod", kMethod, "invokeMethod", nullptr, "INVOKE METHOD Force: ", true, 1, 2,
+     [](Harness& h) { return h.call(h.method, &CMPIMethodMIFT::invokeMethod, h.path(), "Force", h.args(), h.args()); }},
+    {"getProperty", "performGetInstance", kOrdinary, "getProperty", "getInstance", "", true, 1, 2,
+     [](Harness& h) { return h.call(h.property, &CMPIPropertyMIFT::getProperty, h.path(), "Name"); }},
+    {"setProperty", "performSetInstance", kOrdinary, "setProperty", "modifyInstance", "", true, 1, 2, setCaption},
+    {"mustPoll", "performMustPoll", kIndication, "mustPoll", "activateFilter", "", false, 1, 2,
+     [](Harness& h) { return h.call(h.indication, &N::mustPoll, no, "Test_Event", h.classPath()); }},
+    {"activateFilter", "performActivateFilter", kIndication, "activateFilter", "activateFilter", "", false, 1, 2,
+     [](Harness& h) { return h.call(h.indication, &N::activateFilter, no, "Test_Event", h.classPath(), true); }},
+    {"authorizeFilter", "performAuthorizeFilter", kIndication, "authorizeFilter", nullptr, "", false, 1, 2,
+     [](Harness& h) { return h.call(h.indication, &N::authorizeFilter, no, "Test_Event", h.classPath(), "root"); }},
+    {"deActivateFilter", "performDeActivateFilter", kIndication, "deActivateFilter", "deActivateFilter", "", false, 1, 2,
+     [](Harness& h) { return h.call(h.indication, &N::deActivateFilter, no, "Test_Event", h.classPath(), true); }},
+    {"enableIndications", "performEnableIndications", kIndication, nullptr, nullptr, "", false, 0, 0,
+     [](Harness& h) { return h.call(h.indication, &N::enableIndications); }},
+    {"disableIndications", "performDisableIndications", kIndication, nullptr, nullptr, "", false, 0, 0,
+     [](Harness& h) { return h.call(h.indication, &N::disableIndications); }},
+};
+// clang-format on
+
+Answer call(Harness& h, const std::string& name) {
+    for (const Operation& op : kOperations) {
+        if (name == op.name) return op.call(h);
+    }
+    throw std::out_of_range(name);
+}
+
+Answer invokeOnClass(Harness& h) {
+    return h.call(h.method, &CMPIMethodMIFT::invokeMethod, h.classPath(), "Force", h.args(),
+                  h.args());
+}
+
+std::string notSupported(const std::string& name, const std::string& className = "Test_Disk") {
+    return "Method " + name + " on provider TestProvider is not supported for class " + className +
+           ".";
+}
+
+std::string general(const std::string& text) {
+    return "A general error occurred that is not covered by a more specific error code: \"" + text +
+           "\"";
+}
+
+class BaseProvider : public BothBrokers {
+protected:
+    BaseProvider() : h(GetParam()) { enabled = true; }
+    Harness h;
+};
+
+TEST_P(BaseProvider, SucceedsInItsSteps) {
+    for (const Operation& op : kOperations) {
+        SCOPED_TRACE(op.name);
+        script.calls.clear();
+        const Answer answer = op.call(h);
+        EXPECT_EQ(CMPI_RC_OK, answer.rc) << answer.text;
+        EXPECT_EQ(op.done, answer.reply.done);
+        ASSERT_FALSE(script.calls.empty());
+        EXPECT_EQ(0U, script.calls.back().find(op.worker));
+        EXPECT_EQ(op.exits, answer.traced(std::string("Exiting method ") + op.name));
+        if (op.banner[0] != '\0') {
+            EXPECT_EQ(1, answer.traced(std::string(op.banner) + ".*Test_Disk.*")) << answer.output;
+        }
+    }
+}
+
+TEST_P(BaseProvider, RefusesClassesItDoesNotServe) {
+    script.instanceClass = script.methodClass = script.indicationClass = false;
+    for (const Operation& op : kOperations) {
+        if (op.refusal == nullptr) continue;
+        SCOPED_TRACE(op.name);
+        const Answer answer = op.call(h);
+        // A filter's refusal names the event; its message does not reach the server.
+        const std::string text =
+            notSupported(op.refusal, op.rule == kIndication ? "Test_Event" : "Test_Disk");
+        EXPECT_EQ(op.rule == kMethod ? CMPI_RC_ERR_FAILED : CMPI_RC_ERR_NOT_SUPPORTED, answer.rc);
+        EXPECT_EQ(op.rule == kMethod       ? general(text)
+                  : op.rule == kIndication ? ""
+                                           : text,
+                  answer.text);
+        EXPECT_EQ(1, answer.traced("Exception: " + text));
+        EXPECT_EQ(op.refusedExits, answer.traced(std::string("Exiting method ") + op.name));
+        EXPECT_FALSE(answer.reply.done);
+    }
+    script.instanceClass = script.associationClass = true;
+    for (const char* name : {"setInstance", "createInstance", "deleteInstance", "setProperty"}) {
+        EXPECT_EQ(CMPI_RC_ERR_NOT_SUPPORTED, call(h, name).rc);
+    }
+    EXPECT_TRUE(script.calls.empty());
+}
+
+TEST_P(BaseProvider, TestsTheFilterClassOfAssociationsWhenGiven) {
+    const auto refer = [&] {
+        return h.call(h.association, &A::references, h.path(), "Test_Link", no, no);
+    };
+    EXPECT_EQ(notSupported("references", "Test_Link"), refer().text);
+    script.associationClass = true;
+    EXPECT_EQ(CMPI_RC_OK, refer().rc);
+}
+
+TEST_P(BaseProvider, RefusesWhatIsNotOverridden) {
+    Harness plain(GetParam(), Harness::make<PlainProvider>);
+    for (const Operation& op : kOperations) {
+        if (op.unsupported == nullptr) continue;
+        EXPECT_LE(1, op.call(plain).traced("Exception: " + notSupported(op.unsupported)))
+            << op.name;
+    }
+    script.staticMethod = true;
+    EXPECT_EQ(general(notSupported("invokeMethod")), invokeOnClass(plain).text);
+    EXPECT_EQ(CMPI_RC_OK, call(plain, "authorizeFilter").rc);
+}
+
+// What a worker throws, and the code that an enumeration makes of it.
+struct Failure {
+    std::function<void()> raise;
+    CMPIrc rc;
+    CMPIrc enumeration;
+    bool isStatus;
+};
+
+Failure exception(int kind, CMPIrc rc, CMPIrc enumeration) {
+    return {[kind] { throw zemException(kind, "it is so"); }, rc, enumeration, false};
+}
+
+Failure status(CMPIrc rc, CMPIrc enumeration) {
+    return {[rc] { throw CmpiStatus(rc, "it is so"); }, rc, enumeration, true};
+}
+
+TEST_P(BaseProvider, AnswersFailuresByTheRuleOfTheOperation) {
+    const Failure failures[] = {
+        exception(1, CMPI_RC_ERR_ACCESS_DENIED, CMPI_RC_OK),
+        exception(3, CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER),
+        exception(4, CMPI_RC_ERR_NOT_SUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED),
+        exception(5, CMPI_RC_ERR_NOT_FOUND, CMPI_RC_OK),
+        exception(6, CMPI_RC_ERR_FAILED, CMPI_RC_ERR_FAILED),
+        status(CMPI_RC_ERR_FAILED, CMPI_RC_OK),
+        status(CMPI_RC_ERR_NOT_FOUND, CMPI_RC_OK),
+        status(CMPI_RC_ERR_NOT_SUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED),
+        status(CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER),
+    };
+    for (const Operation& op : kOperations) {
+        for (const Failure& failure : failures) {
+            SCOPED_TRACE(std::string(op.name) + " " + std::to_string(failure.rc) +
+                         (failure.isStatus ? " status" : " exception"));
+            script.actions = {{op.worker, failure.raise}};
+            const Answer answer = op.call(h);
+            const bool wrapped = op.rule == kMethod && !failure.isStatus;
+            const CMPIrc rc = op.rule == kEnumeration ? failure.enumeration
+                              : wrapped               ? CMPI_RC_ERR_FAILED
+                                                      : failure.rc;
+            EXPECT_EQ(rc, answer.rc);
+            EXPECT_EQ(rc == CMPI_RC_OK || op.rule == kIndication ? ""
+                      : wrapped                                  ? general("it is so")
+                                                                 : "it is so",
+                      answer.text);
+            EXPECT_FALSE(answer.reply.done);
+            const std::string code = zemBaseProvider::cmpiRcToString(failure.rc);
+            EXPECT_EQ(failure.isStatus, answer.traced("CMPI STATUS:" + code + "  it is so"));
+            EXPECT_EQ(rc == CMPI_RC_OK, answer.traced("LOG MESSAGE: " + code + ": it is so"));
+        }
+    }
+    script.actions = {{"performEnableIndications", [] { throw 3; }}};
+    EXPECT_THROW(h.provider().enableIndications(CmpiContext(h.ctx())), int);
+}
+
+TEST_P(BaseProvider, WantsTheEssentialKeys) {
+    script.keys = {"Name", "Serial"};
+    for (const Operation& op : kOperations) {
+        const bool wants = op.rule == kOrdinary && op.refusal != nullptr;
+        if (op.rule == kMethod) continue;
+        const Answer answer = op.call(h);
+        EXPECT_EQ(wants ? CMPI_RC_ERR_INVALID_PARAMETER : CMPI_RC_OK, answer.rc) << op.name;
+        EXPECT_EQ(wants ? "Key Serial for class Test_Disk is not provided to method " +
+                              std::string(op.refusal) + " on provider TestProvider."
+                        : "",
+                  answer.text);
+    }
+    script.keys.clear();
+    EXPECT_EQ(CMPI_RC_OK, call(h, "deleteInstance").rc);
+}
+
+TEST_P(BaseProvider, TakesKeysOfASetInstanceFromTheInstance) {
+    const Answer answer = h.call(h.instance, &I::modifyInstance, h.classPath(), h.disk(), no);
+    EXPECT_EQ(CMPI_RC_OK, answer.rc) << answer.text;
+    EXPECT_EQ(1U, script.calls.size());  // a path without keys cannot be looked up
+    EXPECT_EQ(1, answer.traced("Exiting method setInstance"));
+    script.actions["performGetInstance"] = [] { throw zemObjectNotFoundException("gone"); };
+    EXPECT_EQ("gone", call(h, "setInstance").text);
+}
+
+TEST_P(BaseProvider, ValidatesNamesAndKeys) {
+    const char* names[] = {"Caption", "caption", nullptr};
+    const auto where =
+        " for class Test_Disk is provided to method enumerateInstances on provider "
+        "TestProvider.";
+    const auto enumerate = [&] {
+        return h.call(h.instance, &I::enumerateInstances, h.classPath(),
+                      static_cast<const char**>(names));
+    };
+    EXPECT_EQ(std::string("Duplicate property name Caption") + where, enumerate().text);
+    names[1] = "Colour";
+    EXPECT_EQ(std::string("Invalid property name Colour") + where, enumerate().text);
+
+    script.keys.clear();  // an instance without properties is not looked at
+    EXPECT_EQ(CMPI_RC_OK, h.call(h.instance, &I::createInstance, h.classPath(), h.disk({})).rc);
+    script.name = "other";
+    for (const std::string name : {"getInstance", "getProperty"}) {
+        EXPECT_EQ("A key provided for class Test_Disk to method " + name +
+                      " on provider TestProvider had an unexpected value. A value of d1 was "
+                      "provided for key Name instead of the expected value of other.",
+                  call(h, name).text);
+    }
+}
+
+TEST_P(BaseProvider, AnswersAndSetsOneProperty) {
+    EXPECT_EQ(cimom::Value("d1"), call(h, "getProperty").reply.value());
+    const Answer missing = h.call(h.property, &CMPIPropertyMIFT::getProperty, h.path(), "Caption");
+    EXPECT_EQ(CMPI_RC_ERR_NO_SUCH_PROPERTY, missing.rc);
+    EXPECT_EQ("Caption", missing.text);
+    EXPECT_TRUE(missing.reply.done);
+    EXPECT_EQ(0, missing.traced("Exiting method getProperty"));
+    call(h, "setProperty");
+    EXPECT_NE(std::string::npos, script.calls.back().find("Caption = \"new caption\""));
+}
+
+TEST_P(BaseProvider, VerifiesTheTargetOfAMethod) {
+    const std::string path = "root/cimv2:Test_Disk.Name=\"d1\"";
+    script.actions["performGetInstance"] = [] { throw zemObjectNotFoundException("gone"); };
+    EXPECT_EQ(general("refers to an invalid object:" + path + " to inovke method Force"),
+              call(h, "invokeMethod").text);
+    script.actions["performGetInstance"] = [] { throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND, "no"); };
+    EXPECT_EQ(general("reference an invalid object:" + path + " to invoke method Force"),
+              call(h, "invokeMethod").text);
+    script.actions["performGetInstance"] = [] { throw CmpiStatus(CMPI_RC_ERR_FAILED, "no"); };
+    EXPECT_EQ(general("no"), call(h, "invokeMethod").text);
+
+    // A provider of the method alone asks the server, which knows no provider of the instances. A
+    // static method needs no object, but one given is looked up.
+    script = Script();
+    script.instanceClass = false;
+    script.staticMethod = true;
+    EXPECT_EQ(CMPI_RC_ERR_FAILED, call(h, "invokeMethod").rc);
+    EXPECT_TRUE(script.calls.empty());
+    EXPECT_EQ(CMPI_RC_OK, invokeOnClass(h).rc);
+    EXPECT_EQ(std::vector<std::string>{"performInvokeMethod Force"}, script.calls);
+}
+
+TEST_P(BaseProvider, TakesOnlyTheArgumentsOfTheMethod) {
+    const auto invoke = [&] {
+        return h.call(h.method, &CMPIMethodMIFT::invokeMethod, h.path(), "Force",
+                      h.args({{"Mode", "x"}}), h.args());
+    };
+    EXPECT_EQ(general("Wrong method argument Mode when invoking method Force on provider "
+                      "TestProvider."),
+              invoke().text);
+    EXPECT_EQ("Test_Disk.Force", script.argsOf);
+    script.methodArgs = {"mode"};
+    EXPECT_EQ(CMPI_RC_OK, invoke().rc);
+}
+
+TEST_P(BaseProvider, GivesFilterWorkersTheClassAndLogsTheFilter) {
+    for (const auto& [name, label] : {std::pair{"activateFilter", "Filter___activate"},
+                                      std::pair{"deActivateFilter", "deActivateFilter"}}) {
+        const std::string start = std::string("<zem350Log-prefix>") + label + " -> ";
+        EXPECT_NE(std::string::npos, call(h, name).output.find(start + "className:[Test_Disk]\n" +
+                                                               start + "eventType:[Test_Event]\n"));
+    }
+    EXPECT_EQ((std::vector<std::string>{"performActivateFilter Test_Disk",
+                                        "performDeActivateFilter Test_Disk"}),
+              script.calls);
+}
+
+TEST_P(BaseProvider, StaysSilentWhenDisabled) {
+    enabled = false;
+    for (const char* name : {"enumInstances", "enumInstanceNames", "associators", "associatorNames",
+                             "references", "referenceNames"}) {
+        const Answer answer = call(h, name);
+        EXPECT_EQ(CMPI_RC_OK, answer.rc);
+        EXPECT_TRUE(answer.reply.done);
+        EXPECT_EQ(1, answer.traced(std::string("Exiting method ") + name));
+    }
+    EXPECT_TRUE(script.calls.empty());
+    const Answer answer = call(h, "getInstance");
+    EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, answer.rc);
+    EXPECT_EQ(
+        "The requested object The XBRG is managed by DNX, this provider on the XGRB in dissabled. "
+        "of class zemBaseProvider can not be found. The exception was thrown from method "
+        "getInstance on provider TestProvider.",
+        answer.text);
+    EXPECT_EQ(CMPI_RC_OK, call(h, "deleteInstance").rc);
+}
+
+TEST_P(BaseProvider, ServesManyThreadsAtOnce) {
+    testing::internal::CaptureStdout();
+    std::vector<std::thread> threads;
+    std::atomic<int> refused{0};
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&] {
+            cimom::RequestScope own(h.server);
+            for (int i = 0; i < 50; ++i) {
+                cimom::Reply reply;
+                const CMPIStatus status = h.association->ft->references(
+                    h.association, own.context(), own.result(reply),
+                    own.wrap(cimom::ObjectPath("root/cimv2", "Test_Disk")), "Test_Link", no, no);
+                refused += status.rc == CMPI_RC_ERR_NOT_SUPPORTED;
+            }
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    testing::internal::GetCapturedStdout();
+    EXPECT_EQ(200, refused);
+}
+
+// begin and end have one key; the outer getInstance has a mark of its own; an enumeration that
+// failed ends under another number, one that was only logged does not end.
+TEST_P(BaseProvider, TimesItsOperations) {
+    h.className = GetParam() == Character::Full ? "TimedFull" : "TimedLean";
+    call(h, "getInstance");
+    call(h, "invokeMethod");
+    script.actions["performEnumInstances"] = [] { throw zemOperationFailedException("x"); };
+    call(h, "enumInstances");
+    script.actions["performEnumInstanceNames"] = [] { throw zemObjectNotFoundException("x"); };
+    call(h, "enumInstanceNames");
+
+    std::string lines;
+    const auto found = [&](const std::string& line) {
+        return std::regex_search(lines, std::regex(line));
+    };
+    const std::string key = "-TestProvider-" + h.className;
+    for (int wait = 0; wait < 100 && !found("enumInstanceNames" + key); ++wait) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(50));
+        for (int i = 0; i < 10; ++i) call(h, "associators");  // fills the queue
+        std::ifstream file(kTimingFile);
+        lines = std::string(std::istreambuf_iterator<char>(file), {});
+    }
+    const auto endsAsItBegan = [&](const std::string& start) {
+        return found(start + " ([0-9]+) begin at [0-9]+\\.\n[^]*" + start + " \\1 end at");
+    };
+    EXPECT_TRUE(endsAsItBegan("getInstance-TestProvider-4-" + h.className));
+    EXPECT_TRUE(found("getInstance" + key + " [0-9]+ begin at"));
+    EXPECT_TRUE(found("invokeMethod-TestProvider begin at"));
+    EXPECT_TRUE(found("invokeMethod-TestProvider end at"));
+    EXPECT_FALSE(endsAsItBegan("enumInstances" + key));
+    EXPECT_TRUE(found("enumInstances" + key + " [0-9]+ end at"));
+    EXPECT_FALSE(found("enumInstanceNames" + key + " [0-9]+ end at"));
+}
+
+ON_BOTH_BROKERS(BaseProvider);
+
+}  // namespace

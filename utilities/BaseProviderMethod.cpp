@@ -1,0 +1,58 @@
+// Method operation of zemBaseProvider.
+#include <string>
+
+#include "BaseProvider.h"
+#include "BaseProviderFrame.h"
+#include "BaseProviderText.h"
+#include "Exception.h"
+
+CmpiStatus zemBaseProvider::invokeMethod(const CmpiContext& ctx, CmpiResult& result,
+                                         const CmpiObjectPath& path, const char* method,
+                                         const CmpiArgs& in, CmpiArgs& out) {
+    zemOperationFrame frame(*this, zemOperation::InvokeMethod, ctx, &path, &result);
+    frame.setMethod(method);
+    return frame.run([&] {
+        const bool onClass = isStaticMethod(frame.className(), method) && path.getKeyCount() == 0;
+        if (!onClass) requireTarget(frame, ctx, path, method);
+        validateMethodArgs(method, in, frame.className());
+        performInvokeMethod(ctx, result, path, method, in, out);
+    });
+}
+
+// The object must exist. A provider of the method alone asks the server for it, which asks the
+// provider of the instances.
+void zemBaseProvider::requireTarget(zemOperationFrame& frame, const CmpiContext& ctx,
+                                    const CmpiObjectPath& path, const char* method) {
+    PROV_TRACE_LOCALS();
+    const char* className = frame.className();
+    try {
+        if (isValidInstanceClass(className)) {
+            getInstance(ctx, path, nullptr);
+        } else {
+            broker->getInstance(ctx, path, nullptr);
+        }
+    } catch (const zemException& failure) {
+        PROV_TRACE_STRING(4, "%s", static_cast<const char*>(failure.toString()));
+        frame.traceExit();
+        const zemString text = "refers to an invalid object:" + objectPathToString(path) +
+                               " to inovke method " + method;
+        throw zemInvalidParameterException(className, "invokeMethod", method,
+                                           failure.getExceptionId(), text);
+    } catch (const CmpiStatus& status) {
+        frame.traceStatus(status);
+        const char* code = cmpiRcToString(status.rc());
+        if (status.rc() != CMPI_RC_ERR_NOT_FOUND && status.rc() != CMPI_RC_ERR_INVALID_PARAMETER) {
+            throw zemOperationFailedException(className, "invokeMethod", code, status.msg());
+        }
+        frame.traceExit();
+        const zemString text = "reference an invalid object:" + objectPathToString(path) +
+                               " to invoke method " + method;
+        throw zemInvalidParameterException(className, "invokeMethod", method, code, text);
+    }
+}
+
+void zemBaseProvider::performInvokeMethod(const CmpiContext&, CmpiResult&,
+                                          const CmpiObjectPath& path, const char*, const CmpiArgs&,
+                                          CmpiArgs&) {
+    refuse(__func__, "invokeMethod", zemClassOf(path));
+}

@@ -1,0 +1,207 @@
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "CommandCaller.h"
+#include "RecordParser.h"
+#include "ToolFolder.h"
+
+namespace {
+
+class Caller : public zemCommandCaller {
+public:
+    explicit Caller(const char* auth = "", const char* locale = "")
+        : zemCommandCaller(auth, locale) {}
+    using zemCommandCaller::BuildChCmdString;
+    using zemCommandCaller::callChCommand;
+    using zemCommandCaller::callLsCommand;
+    using zemCommandCaller::callMkCommand;
+};
+
+constexpr const char* kNames[] = {"lpar_id", "name", "state", "mode"};
+
+/// The records as text: values of the keys with "|" between them, ";" after each record.
+std::string text(const zemRecordSetsType& records, const std::vector<int>& keys) {
+    std::string all;
+    for (int i = 0; i < records.size(); ++i) {
+        for (size_t k = 0; k < keys.size(); ++k) {
+            all += (k > 0 ? "|" : "") + std::string((*records.getElementAt(i))[keys[k]]);
+        }
+        all += ';';
+    }
+    return all;
+}
+
+zemDynamicArray<tagAttributePair> pairs(std::initializer_list<tagAttributePair> list) {
+    zemDynamicArray<tagAttributePair> all;
+    for (const tagAttributePair& pair : list) {
+        all.addElement(new tagAttributePair(pair));
+    }
+    return all;
+}
+
+TEST(RecordParserTest, RecordsAndQuotes) {
+    struct {
+        std::string output;
+        const char* records;  // of two fields
+        bool valid;
+    } const rows[] = {
+        {"", "", true},
+        {"a,b\n", "a|b;", true},
+        {"a,b", "a|b;", true},
+        {"a\n", "a|;", true},
+        {"a,b,c\n", "a|b;", true},
+        {"\"x,y\",z\n", "x,y|z;", true},
+        {"\"he said \"\"hi\"\"\",z\n", "he said \"hi\"|z;", true},
+        {"ab\"c,d\"e,\"f\"\"\"\n", "abc,de|f\";", true},
+        {"\"\",\"\"\n", "|;", true},
+        {"\"\"\"\",x\n", "\"|x;", true},
+        {"a,b\n\nc,d\n", "a|b;|;c|d;", true},
+        {"\n", "|;", true},
+        {"\"x", "", false},
+        {"a,b\nc,\"x\nd,e\n", "a|b;", false},
+        {"a,b,\"open\nc,d\n", "a|b;c|d;", true},  // behind the wanted fields nothing is read
+        {std::string("a\0b,c\n", 6), "a|b;", true},
+        {std::string("\"a\0\",c\n", 7), "", false},
+    };
+    for (const auto& row : rows) {
+        zemRecordSetsType records(0, 0, 1);
+        EXPECT_EQ(row.valid, zemParseRecords(row.output, nullptr, 2, records)) << row.output;
+        EXPECT_EQ(row.records, text(records, {0, 1})) << row.output;
+    }
+}
+
+TEST(CommandCallerTest, JudgesTheToolsResult) {
+    ToolFolder tools;
+    const std::pair<const char*, const char*> rows[] = {
+        {"echo fine", ""},
+        {"echo 'No results were found'", ""},
+        {"echo 'No results were found. At all.'; echo",
+         "5//\"tool\"/No results were found. At all."},
+        {"echo 'No results were found.' >&2; exit 3", "5//\"tool\"/No results were found.\n"},
+        {"echo 'No results were found.'; exit 3", "5//\"tool\"/No results were found.\n"},
+        {"echo 'No results were found.' >&2", ""},
+        {"echo 'WRTL1234 something'; exit 1", "6/WRTL1234/\"tool\"/WRTL1234 something"},
+        {"echo 'x WRTL9 a\nb\n' >&2; echo out; exit 1", "6/WRTL9/\"tool\"/x WRTL9 a\nb"},
+        {"printf 'see WRTL7' >&2; exit 1", "6/WRTL7/\"tool\"/see WRTL7"},
+        {"echo other >&2; exit 255", "6/UNKNOWN/\"tool\"/other"},
+        {"exit 1", "6/UNKNOWN/\"tool\"/"},
+    };
+    for (const auto& [body, failure] : rows) {
+        tools.script("tool", body);
+        EXPECT_EQ(failure, failureOf([] { Caller().callGenericCommand("tool", nullptr, false); }))
+            << body;
+    }
+    zemString output;
+    tools.recorder("xbrgcli", "bridged\n");
+    EXPECT_EQ(0, Caller().callXBRGCommand("list -a", &output));
+    EXPECT_STREQ("bridged\n", output);
+    EXPECT_EQ("list|-a", tools.arguments());
+}
+
+TEST(CommandCallerTest, RunsUnderUserAndLocale) {
+    ToolFolder tools;
+    tools.script("tool", "printf \"$(id -un) $LC_ALL\"");
+    zemString output;
+    Caller("", "de_DE").callGenericCommand("tool", &output, true);
+    EXPECT_TRUE(std::string(output).find(" de_DE") != std::string::npos);
+    if (geteuid() == 0) {
+        Caller("nobody", "xx").callGenericCommand("tool", &output, true);
+        EXPECT_STREQ("nobody xx", output);
+    }
+}
+
+TEST(CommandCallerTest, QueriesNamedFields) {
+    ToolFolder tools;
+    tools.recorder("tool", "run,7,one\nidle,8\n");
+    zemRecordSetsType records(0, 25, 1);
+    int wanted[] = {2, 0, 1, -1};
+    Caller().callLsCommand("tool -r lpar", wanted, -1, kNames, 4, records);
+    EXPECT_EQ("-r|lpar|-F|state,lpar_id,name", tools.arguments());
+    EXPECT_EQ("run|7|one;idle|8|;", text(records, {2, 0, 1}));
+
+    zemRecordSetsType all(0, 25, 1);
+    Caller().callLsCommand("tool", nullptr, -1, kNames, 4, all);
+    EXPECT_EQ("-F|lpar_id,name,state,mode", tools.arguments());
+    EXPECT_EQ("run|7|one|;idle|8||;", text(all, {0, 1, 2, 3}));
+
+    zemRecordSetsType none(0, 25, 1);  // a resource without fields: records are only counted
+    Caller().callLsCommand("tool", nullptr, -1, nullptr, 0, none);
+    EXPECT_EQ("-F", tools.arguments());
+    EXPECT_EQ(2, none.size());
+
+    tools.recorder("tool", "a\n\"b\n");
+    zemRecordSetsType first(0, 25, 1);
+    const auto query = [&first](int index) {
+        int list[] = {index, -1};
+        return failureOf([&] { Caller().callLsCommand("tool", list, -1, kNames, 4, first); });
+    };
+    EXPECT_EQ("6/INVALID_RECORD/tool -F name/a\n\"b\n", query(1));
+    EXPECT_EQ("a;", text(first, {1}));
+    EXPECT_EQ("3/INVALID_INDEX/tool -F /4", query(4));
+    tools.recorder("tool", "");
+    EXPECT_EQ("", query(1));
+    EXPECT_EQ(1, first.size());
+}
+
+TEST(CommandCallerTest, BuildsChangesAndCreations) {
+    ToolFolder tools;
+    tools.recorder("tool");
+    zemString line("tool");
+    Caller().BuildChCmdString(line, pairs({}), pairs({}), kNames, 4, Caller::CH_OP_ADD, " -i ");
+    EXPECT_STREQ("tool", line);
+    Caller().BuildChCmdString(line, pairs({{1, "P"}}), pairs({{3, "v"}}), kNames, 4,
+                              Caller::CH_OP_ADD, " -i ");
+    EXPECT_STREQ(R"(tool  -i  "\"name=P\",\"mode+=v\"")", line);
+
+    using List = std::initializer_list<tagAttributePair>;
+    const List none = {};
+    const List single = {{1, "P"}, {0, "3"}};
+    const List multi = {{3, "a,b c"}};
+    const List low = {{-1, "x"}};
+    const List high = {{4, "x"}};
+    const struct {
+        List single;
+        List multi;
+        int op;  // -1: a creation
+        const char* received;
+        const char* failure;
+    } rows[] = {
+        {single, multi, 2, R"(-r|x|-i|"name=P","lpar_id=3","mode-=a,b c")", ""},
+        {none, multi, 1, R"(-r|x|-i|"mode=a,b c")", ""},
+        {none, none, 0, "-r|x", ""},
+        {single, high, 0, "", R"(3/INVALID_INDEX/tool -r x -i "\"name=P\",\"lpar_id=3\",/4)"},
+        {low, none, 0, "", R"(3/INVALID_INDEX/tool -r x -i "/-1)"},
+        {single, none, -1, R"(-r|x|-i|"name=P","lpar_id=3")", ""},
+        {none, none, -1, "-r|x|-i|", ""},
+        {high, none, -1, "", R"(3/INVALID_INDEX/tool -r x -i "/4)"},
+    };
+    for (const auto& row : rows) {
+        std::filesystem::remove(tools.file("argv"));
+        EXPECT_EQ(row.failure, failureOf([&row] {
+                      if (row.op < 0) {
+                          Caller().callMkCommand("tool -r x", pairs(row.single), kNames, 4);
+                      } else {
+                          Caller().callChCommand("tool -r x", pairs(row.single), pairs(row.multi),
+                                                 kNames, 4, static_cast<Caller::CH_OP_TYPE>(row.op),
+                                                 "-i");
+                      }
+                  }));
+        EXPECT_EQ(row.received, tools.arguments());
+    }
+}
+
+TEST(CommandCallerTest, CutsTheFrontOfALine) {
+    ToolFolder tools;
+    tools.recorder("tool");
+    const std::string front = "tool " + std::string(3000, 'x');
+    Caller().callMkCommand(front.c_str(), pairs({}), kNames, 4);
+    EXPECT_EQ(std::string(507, 'x') + "|-i|", tools.arguments());
+    zemRecordSetsType records(0, 25, 1);
+    Caller().callLsCommand(front.c_str(), nullptr, -1, kNames, 1, records);
+    EXPECT_EQ(std::string(2043, 'x') + "|-F|lpar_id", tools.arguments());
+}
+
+}  // namespace

@@ -1,0 +1,422 @@
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <poll.h>
+#include <sys/ptrace.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <climits>
+#include <csignal>
+#include <cstring>
+#include <ctime>
+#include <thread>
+#include <tuple>
+#include <vector>
+
+#include "CommandLine.h"
+#include "PollPlan.h"
+#include "PropertiesHelper.h"
+#include "ToolFolder.h"
+
+using namespace std::chrono_literals;
+
+namespace {
+
+struct ToolRun {
+    zemString out;
+    zemString err;
+    int exitCode = 99;
+    std::string failure = {};
+
+    explicit ToolRun(const std::string& command, const char* user = nullptr, int waitTime = 0,
+                     const char* locale = nullptr) {
+        failure = failureOf([&] {
+            EXPECT_EQ(0, zemPropertiesHelper::executeCommand(command.c_str(), out, err, &exitCode,
+                                                             user, waitTime, locale, true));
+        });
+    }
+};
+
+/// Reads a non-blocking stream to its end and closes it.
+std::string readAll(FILE* stream) {
+    std::string text;
+    for (char buffer[4096];;) {
+        pollfd ready = {fileno(stream), POLLIN, 0};
+        poll(&ready, 1, -1);
+        const ssize_t n = read(fileno(stream), buffer, sizeof buffer);
+        if (n <= 0) {
+            break;
+        }
+        text.append(buffer, static_cast<size_t>(n));
+    }
+    fclose(stream);
+    return text;
+}
+
+/// The process that a tool wrote to the file "pid"; throws if none does within ten seconds.
+pid_t waitForPid(const ToolFolder& tools) {
+    for (int i = 0; i < 10000 && tools.read("pid").find('\n') == std::string::npos; ++i) {
+        std::this_thread::sleep_for(1ms);
+    }
+    return std::stoi(tools.read("pid"));
+}
+
+TEST(CommandLineTest, SplitsLikeAShell) {
+    const std::tuple<const char*, std::string, char> rows[] = {
+        {"tool", "tool", ' '},
+        {"", "", ' '},
+        {" tool a", "|tool|a", ' '},
+        {"tool   a    b  ", "tool|a|b", ' '},
+        {"tool a \"\" b ''", "tool|a||b|", ' '},
+        {R"(tool "a b"c 'd "e'f)", R"(tool|a bc|d "ef)", ' '},
+        {R"(tool -i  "\"name=a b\",\"x+=1\"")", R"(tool|-i|"name=a b","x+=1")", ' '},
+        {R"(tool a\ b \" \\ "\x\\\"" '\x')", R"(tool|a b|"|\|\x\"|\x)", ' '},
+        {"tool a\tb\nc", "tool|a\tb\nc", ' '},
+        {R"(tool a \)", "tool|a|", 'd'},
+        {R"(tool "a\)", "tool", 'u'},
+        {"tool a 'b c", "tool|a", 'u'},
+        {"tool \"it's\" 'say \"'", "tool|it's|say \"", ' '},
+    };
+    for (const auto& [command, arguments, fault] : rows) {
+        const zemCommandLine line = zemSplitCommandLine(command);
+        std::string joined;
+        for (const std::string& argument : line.arguments) {
+            joined += argument + '|';
+        }
+        EXPECT_EQ(arguments + '|', joined) << command;
+        EXPECT_EQ(line.danglingBackslash, fault == 'd') << command;
+        EXPECT_EQ(line.unbalancedQuote, fault == 'u') << command;
+    }
+}
+
+TEST(PollPlanTest, LimitsCountInTenthsOfASecond) {
+    // waitTime, passes (1000: no limit), their length
+    const std::tuple<int, int, std::chrono::microseconds>
+        rows[] =
+            {
+                {50, 0, 0us},          {99999, 0, 0us},
+                {100000, 1, 2ms},      {250000, 2, 102ms},
+                {2147483, 21, 2002ms}, {5000000, 50, 4902ms},
+                {3000000, 0, 0us},  // the product wraps: a negative unit larger than the limit
+                {0, 1000, 2s},         {-5, 1000, 2s},
+                {4294967, 1000, 2s},    // a negative unit smaller than the limit
+                {536870912, 1000, 2s},  // a unit of zero
+            };
+    for (const auto& [waitTime, passes, total] : rows) {
+        zemPollPlan plan(waitTime);
+        std::chrono::microseconds slept(0);
+        int count = 0;
+        for (; count < 1000 && !plan.expired(); ++count) {
+            slept += plan.pause();
+        }
+        EXPECT_EQ(passes, count) << waitTime;
+        EXPECT_EQ(total, slept) << waitTime;
+    }
+}
+
+TEST(PollPlanTest, BacksOffAfterTwentyMinutes) {
+    zemPollPlan plan(0);
+    for (int pass = 0; pass < 600001; ++pass) {
+        ASSERT_FALSE(plan.expired());
+        ASSERT_EQ(2ms, plan.pause());
+    }
+    EXPECT_EQ(0ms, plan.pause());
+    for (int wait = 1; wait <= 32768; wait *= 2) {
+        EXPECT_EQ(std::chrono::milliseconds(wait), plan.pause());
+    }
+    EXPECT_EQ(1min, plan.pause());
+    EXPECT_EQ(1min, plan.pause());
+}
+
+TEST(ExecuteCommandTest, PassesArgumentsByteForByteAndCollectsOutput) {
+    ToolFolder tools;
+    tools.recorder("record", "out");
+    const ToolRun run("record  \"a  b\" '' \\\"x \xff\x01*$HOME\t;");
+    EXPECT_EQ("a  b||\"x|\xff\x01*$HOME\t;", tools.arguments());
+    EXPECT_STREQ("out", run.out);
+    EXPECT_EQ(0, run.exitCode);
+
+    // The program's name is argument 0; a zero byte hides the rest of its piece.
+    EXPECT_STREQ("cat", ToolRun("cat /proc/self/cmdline").out);
+
+    tools.script("both", "printf 'o\\377\\n\\n'; printf e >&2; exit 255");
+    const ToolRun both("both");
+    EXPECT_STREQ("o\xff\n\n", both.out);
+    EXPECT_STREQ("e", both.err);
+    EXPECT_EQ(255, both.exitCode);
+    EXPECT_EQ("", both.failure);
+}
+
+TEST(ExecuteCommandTest, LocaleIsTheOnlyChangeToTheEnvironment) {
+    ToolFolder tools;
+    setenv("ZEM_TEST", "kept", 1);
+    setenv("LC_ALL", "C", 1);
+    tools.script("show", "echo $LC_ALL $ZEM_TEST; env | grep -c LC_ALL=");
+    EXPECT_STREQ("de_DE kept\n1\n", ToolRun("show", nullptr, 0, "de_DE").out);
+    EXPECT_STREQ("C kept\n1\n", ToolRun("show", nullptr, 0, "").out);
+    unsetenv("LC_ALL");
+    EXPECT_STREQ("fr_FR kept\n1\n", ToolRun("show", nullptr, 0, "fr_FR").out);
+}
+
+TEST(ExecuteCommandTest, FailuresNameTheirCause) {
+    ToolFolder tools;
+    tools.script("locked", "");
+    std::filesystem::permissions(tools.file("bin/locked"), std::filesystem::perms(0644));
+    tools.script("killed", "kill -9 $$");
+    tools.script("marker", "touch $here/started");
+    const std::string open = "marker " + std::string(200000, 'x') + " \"";
+    const std::string complaint = "-1:Invalid command parameter:";
+    const std::tuple<std::string, const char*, std::string, int> rows[] = {
+        {"nosuchtool -x", "", "6/2/nosuchtool/No such file or directory", 255},
+        {"", "", "6/2//No such file or directory", 255},
+        {"locked", "", "1/13/locked/Permission denied", 255},
+        {"killed", "", "6///Receive Signal:9", -1},
+        {"marker \"a", "", "6/-1/marker/Invalid command parameter:\"a", 255},
+        {open, "", "6/-1/marker/Invalid command parameter:" + open.substr(7), 255},
+        {"cat " + std::string(300000, 'x'), "", "6/7/cat/Argument list too long", 255},
+        {"marker", "no such user", "6/0/marker/The given user name \"no such user\" was not found.",
+         255},
+        {"marker \"a", "nobodyelse", "6/0/marker/The given user name \"nobodyelse\" was not found.",
+         255},
+        {"nosuchtool \\", "", "6/-1/nosuchtool/Invalid command parameter:\\", 255},
+    };
+    for (const auto& [command, user, failure, exitCode] : rows) {
+        const ToolRun run(command, user);
+        EXPECT_EQ(failure, run.failure);
+        EXPECT_EQ(exitCode, run.exitCode) << failure;
+    }
+    EXPECT_FALSE(std::filesystem::exists(tools.file("started")));
+    // After a backslash at the end the tool runs all the same.
+    const ToolRun run("marker \\");
+    EXPECT_EQ("6/-1/marker/Invalid command parameter:\\", run.failure);
+    EXPECT_EQ(0, run.exitCode);
+    EXPECT_TRUE(std::filesystem::exists(tools.file("started")));
+    EXPECT_FALSE(hasChildren());
+}
+
+TEST(ExecuteCommandTest, ReportsAStoppedTool) {
+    const std::string self = std::filesystem::read_symlink("/proc/self/exe");
+    EXPECT_EQ("6///Receive Stop Signal:" + std::to_string(SIGSTOP),
+              ToolRun(self + " stop").failure);
+    // The stopped child is no one's but the caller's.
+    pid_t child = 0;
+    ASSERT_TRUE(std::ifstream("/proc/thread-self/children") >> child);
+    kill(child, SIGKILL);
+    EXPECT_EQ(child, waitpid(child, nullptr, 0));
+}
+
+TEST(ExecuteCommandTest, LimitLeavesTheToolRunning) {
+    ToolFolder tools;
+    tools.script("hang", "echo $$ >$here/pid; exec sleep 60");
+    // At once, the child finds no one to complain to about the backslash, and starts all the same.
+    const std::pair<const char*, int> rows[] = {{"hang \\", 50}, {"hang", 200000}};
+    for (const auto& [command, limit] : rows) {
+        std::filesystem::remove(tools.file("pid"));
+        const auto begin = std::chrono::steady_clock::now();
+        EXPECT_EQ("6/CLI_TIME_OUT//CLI do not return in 10 miniutes.",
+                  ToolRun(command, nullptr, limit).failure);
+        EXPECT_LT(std::chrono::steady_clock::now() - begin, 10s);
+        const pid_t pid = waitForPid(tools);
+        EXPECT_EQ(0, waitpid(pid, nullptr, WNOHANG));
+        kill(pid, SIGKILL);
+        EXPECT_EQ(pid, waitpid(pid, nullptr, 0));
+    }
+    EXPECT_EQ("", ToolRun("true", nullptr, 5000000).failure);
+}
+
+TEST(ExecuteCommandTest, TakesMuchOutputOnBothStreams) {
+    ToolFolder tools;
+    tools.script("flood",
+                 "for i in 1 2 3 4 5; do\n"
+                 "  head -c 2000000 /dev/zero | tr '\\0' o\n"
+                 "  head -c 2000000 /dev/zero | tr '\\0' e >&2\n"
+                 "done");
+    const ToolRun run("flood");
+    EXPECT_EQ(std::string(10000000, 'o'), std::string(run.out));
+    EXPECT_EQ(std::string(10000000, 'e'), std::string(run.err));
+}
+
+TEST(ExecuteCommandTest, ManyRunsLeaveNothingBehind) {
+    ToolFolder tools;
+    tools.script("count", "ls /proc/self/fd | wc -l");
+    const std::string descriptors = std::string(ToolRun("count").out);
+    const long before = openDescriptors();
+    for (int i = 0; i < 500; ++i) {
+        const ToolRun run(i % 4 == 0 ? "nosuchtool" : i % 4 == 1 ? "echo 'x" : "echo x");
+        EXPECT_EQ(i % 4 > 1, run.failure.empty());
+    }
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 8; ++t) {
+        threads.emplace_back([&descriptors] {
+            for (int i = 0; i < 8; ++i) {
+                EXPECT_EQ(descriptors, std::string(ToolRun("count").out));
+                FILE* stream = nullptr;
+                pid_t pid = 0;
+                zemPropertiesHelper::asynExecuteCommand("count", &pid, &stream, nullptr, nullptr);
+                EXPECT_EQ(descriptors, readAll(stream));
+                EXPECT_EQ(pid, waitpid(pid, nullptr, 0));
+            }
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    EXPECT_EQ(before, openDescriptors());
+    EXPECT_FALSE(hasChildren());
+}
+
+TEST(ExecuteCommandTest, WorksWithoutStandardDescriptors) {
+    EXPECT_EXIT(
+        {
+            close(STDIN_FILENO);
+            close(STDOUT_FILENO);
+            close(STDERR_FILENO);
+            zemString out;
+            zemString err;
+            zemPropertiesHelper::executeCommand("sh -c 'echo o; echo e >&2'", out, err, nullptr,
+                                                nullptr, 0, nullptr, false);
+            pid_t pid = 0;
+            FILE* stream = nullptr;
+            zemPropertiesHelper::asynExecuteCommand("sh -c 'echo o; echo e >&2'", &pid, &stream,
+                                                    nullptr, nullptr);
+            const bool good = out == "o\n" && err == "e\n" && readAll(stream) == "o\ne\n";
+            _exit(good ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
+}
+
+TEST(ExecuteCommandTest, FullDescriptorTableIsAFailureOfThePipe) {
+    EXPECT_EXIT(
+        {
+            while (dup(STDERR_FILENO) >= 0) {
+            }
+            const std::string failure = ToolRun("true").failure;
+            _exit(failure == "6/24/pipe/Too many open files" ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
+}
+
+TEST(UserContextTest, SwitchesGroupAndUser) {
+    if (geteuid() != 0) {
+        GTEST_SKIP() << "needs root";
+    }
+    ToolFolder tools;
+    tools.script("who", "id -u; id -g");
+    EXPECT_STREQ("65534\n65534\n", ToolRun("who", "nobody").out);
+    EXPECT_STREQ("0\n0\n", ToolRun("who", "root").out);
+    EXPECT_EQ(0, zemPropertiesHelper::changeProcessUserContext("root"));
+    EXPECT_EQ(-1, zemPropertiesHelper::changeProcessUserContext("no such user"));
+    EXPECT_EXIT(
+        {
+            const int there = zemPropertiesHelper::changeProcessUserContext("nobody");
+            const int back = zemPropertiesHelper::changeProcessUserContext("root");
+            _exit(there == 0 && geteuid() == 65534 && back == EPERM ? 0 : 1);
+        },
+        testing::ExitedWithCode(0), "");
+}
+
+TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {
+    ToolFolder tools;
+    tools.script("both", "echo $LC_ALL; echo e >&2; exit 7");
+    tools.script("marker", "echo ran");
+    const std::tuple<const char*, const char*, std::string, int> rows[] = {
+        {"both", "", "xx\ne\n", 7},
+        {"nosuchtool a", "", std::string("No such file or directory : nosuchtool") + '\0', 2},
+        {"marker", "no such user",
+         std::string("The given user name \"no such user\" was not found.") + '\0', 255},
+        {"marker 'a", "", std::string("-1:Invalid command parameter:'a") + '\0', 255},
+        {"marker \\", "", std::string("-1:Invalid command parameter:\\") + '\0' + "ran\n", 0},
+    };
+    for (const auto& row : rows) {
+        pid_t pid = 0;
+        FILE* stream = nullptr;
+        EXPECT_EQ(
+            0, zemPropertiesHelper::asynExecuteCommand(row.command, &pid, &stream, row.user, "xx"));
+        EXPECT_NE(0, fcntl(fileno(stream), F_GETFL) & O_NONBLOCK);
+        EXPECT_EQ(output, readAll(stream));
+        int status = 0;
+        EXPECT_EQ(pid, waitpid(pid, &status, 0));
+        EXPECT_EQ(exitCode, WEXITSTATUS(status)) << command;
+    }
+}
+
+TEST(HostTest, NamesAndAddresses) {
+    char name[257] = {};
+    gethostname(name, sizeof name - 1);
+    std::vector<std::thread> threads;
+    for (int t = 0; t < 4; ++t) {
+        threads.emplace_back([&name] {
+            EXPECT_STREQ(name, zemPropertiesHelper::getHostName());
+            zemPropertiesHelper::getFullHostName();
+        });
+    }
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
+    EXPECT_EQ(&zemPropertiesHelper::getHostName(), &zemPropertiesHelper::getHostName());
+
+    EXPECT_EQ(0x0A010203U, zemPropertiesHelper::getHostIPAddress("10.1.2.3"));
+    EXPECT_EQ(0xFFFFFFFFU, zemPropertiesHelper::getHostIPAddress(nullptr));
+    EXPECT_EQ(0xFFFFFFFFU, zemPropertiesHelper::getHostIPAddress("no such host"));
+    EXPECT_STREQ("10.1.2.3", zemPropertiesHelper::getHostIP("10.1.2.3"));
+    EXPECT_STREQ("", zemPropertiesHelper::getHostIP("no such host"));
+    EXPECT_TRUE(zemPropertiesHelper::isSameHost("127.0.0.1"));
+    EXPECT_FALSE(zemPropertiesHelper::isSameHost("no such host"));
+    EXPECT_FALSE(zemPropertiesHelper::isSameHost("192.0.2.1"));
+}
+
+TEST(ValidatorTest, AddressesAndNames) {
+    for (const char* good : {"1.2.3.4", "1..2.3.4", "-1.2.3.4", "255.255.255.255", "1.2.3.4x"}) {
+        EXPECT_EQ(1, zemPropertiesHelper::isValidIPAddress(good)) << good;
+    }
+    for (const char* bad : {"", "1.2.3", "1.2.3.256", "a.b.c.d"}) {
+        EXPECT_EQ(0, zemPropertiesHelper::isValidIPAddress(bad)) << bad;
+    }
+    const std::tuple<const char*, const char*, int> rows[] = {
+        {"$ab", "", 1},  {"a9$#@", "", 1}, {"9a", "", 0},   {"a_b", "", 0},
+        {"$ab", "_", 0}, {"a_b", "_", 1},  {"a$b", "_", 0}, {"", "", 0},
+        {"", "_", 0},    {"_a", "_", 0},   {"Zz", "", 1},   {"\xe4", "", 0}};
+    for (const auto& [name, extra, valid] : rows) {
+        EXPECT_EQ(valid, zemPropertiesHelper::isValidName(name, extra)) << name;
+    }
+}
+
+std::string local(long seconds) {
+    const time_t time = seconds;
+    std::tm parts = {};
+    localtime_r(&time, &parts);
+    char text[32];
+    strftime(text, sizeof text, "%Y-%m-%d %H:%M:%S", &parts);
+    return text;
+}
+
+TEST(TimeStampTest, AreLocalTime) {
+    char stamp[] = "1130102030405";
+    char old[] = "0991231235959";
+    char blank[] = "             ";
+    char date[] = "20130102";
+    char time[] = "030405";
+    EXPECT_EQ("2013-01-02 03:04:05", local(zemPropertiesHelper::getTimeFromTimeStamp13(stamp)));
+    EXPECT_EQ("1999-12-31 23:59:59", local(zemPropertiesHelper::getTimeFromTimeStamp13(old)));
+    EXPECT_EQ(0, zemPropertiesHelper::getTimeFromTimeStamp13(blank));
+    EXPECT_EQ("2013-01-02 03:04:05",
+              local(zemPropertiesHelper::getTimeFromDateTimeStamps(date, time)));
+    EXPECT_EQ(0, zemPropertiesHelper::getTimeFromDateTimeStamps(blank, time));
+    EXPECT_EQ(0, zemPropertiesHelper::getTimeFromDateTimeStamps(date, blank));
+    const long now = zemPropertiesHelper::getLocalDateTime();
+    EXPECT_LE(std::labs(now - zemPropertiesHelper::getCurrentTimeBaseSec()), 1);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    // As a tool of its own: a wait reports a stop only of a child that is traced.
+    if (argc == 2 && std::strcmp(argv[1], "stop") == 0) {
+        ptrace(PTRACE_TRACEME, 0, nullptr, nullptr);
+        raise(SIGSTOP);
+        return 0;
+    }
+    testing::InitGoogleTest(&argc, argv);
+    GTEST_FLAG_SET(death_test_style, "threadsafe");
+    return RUN_ALL_TESTS();
+}

@@ -1,0 +1,58 @@
+/// Tools for a test: scripts of its own ahead of the real ones, and what they left behind.
+#pragma once
+
+#include <sys/wait.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <iterator>
+#include <string>
+
+#include "../support/TestAppliance.h"
+#include "Exception.h"
+
+class ToolFolder : public testing_support::TestAppliance {
+public:
+    ToolFolder() : TestAppliance("/usr/bin") {}
+
+    /// Makes a shell script, to which $here is the folder of file().
+    void script(const std::string& name, const std::string& body) {
+        replaceTool(name, "here=" + folder().string() + '\n' + body);
+    }
+
+    /// Makes a script that keeps its arguments for arguments() and then prints @p output.
+    void recorder(const std::string& name, const std::string& output = "") {
+        std::ofstream(file("output")) << output;
+        script(name, "for a; do printf '%s\\0' \"$a\"; done >$here/argv; cat $here/output");
+    }
+
+    /// The arguments of the last recorder that ran, with "|" between them.
+    std::string arguments() const {
+        std::string all = read("argv");
+        std::replace(all.begin(), all.end(), '\0', '|');
+        return all.substr(0, all.empty() ? 0 : all.size() - 1);
+    }
+
+    std::string file(const std::string& name) const { return (folder() / name).string(); }
+    std::string read(const std::string& name) const {
+        return testing_support::contents(file(name));
+    }
+};
+
+/// What an operation throws, "kind/id/access method/text", or "" if it throws nothing.
+template <typename Operation>
+std::string failureOf(Operation operation) {
+    try {
+        operation();
+    } catch (const zemException& e) {
+        return std::to_string(e.getExceptionType()) + '/' + e.getExceptionId() + '/' +
+               e.getAccessMethod() + '/' + e.getExceptionString();
+    }
+    return "";
+}
+
+/// Descriptors that this process holds open, and whether it has a child, ended or not.
+inline long openDescriptors() {
+    return std::distance(std::filesystem::directory_iterator("/proc/self/fd"), {});
+}
+inline bool hasChildren() { return waitpid(-1, nullptr, WNOHANG) != -1 || errno != ECHILD; }

@@ -1,0 +1,215 @@
+#include "CommandCaller.h"
+
+#include <cstring>
+#include <string>
+#include <string_view>
+
+#include "Exception.h"
+#include "Log.h"
+#include "PropertiesHelper.h"
+#include "RecordParser.h"
+#include "TraceTool.h"
+
+namespace {
+
+constexpr char kClass[] = "zemCommandCaller";
+constexpr char kNoResults[] = "No results were found.";
+constexpr char kErrorCode[] = "WRTL";
+
+/// Operators of a multi-valued attribute, by zemCommandCaller::CH_OP_TYPE.
+constexpr const char* kOperators[] = {"+=", "=", "-="};
+
+constexpr int kListEnd = -1;
+
+constexpr size_t kQueryRoom = 2048;
+constexpr size_t kChangeRoom = 512;
+
+/// The fixed front of a line; what does not fit into @p room is cut.
+std::string frontOf(const char* cmd, size_t room) {
+    return cmd != nullptr ? std::string(cmd, strnlen(cmd, room)) : std::string();
+}
+
+bool saysNoResults(const zemString& text) { return text.startsWith(kNoResults); }
+
+[[noreturn]] void throwNotFound(const std::string& quotedCommand, const zemString& text) {
+    throw zemObjectNotFoundException(kClass, "callGenericCommand", quotedCommand.c_str(), nullptr,
+                                     text);
+}
+
+/// The name at @p index of a table.
+const char* nameAt(int index, const zemAttributeNames& table, const std::string& line,
+                   const char* method) {
+    // As unsigned values, negative positions lie behind every table.
+    if (static_cast<unsigned>(index) >= table.count) {
+        throw zemInvalidParameterException(kClass, method, line.c_str(), "INVALID_INDEX",
+                                           zemString(index));
+    }
+    return table.names[index];
+}
+
+/// Appends one item for each pair: a double-quoted assignment and a comma, with the quotes escaped
+/// for the splitter.
+void appendItems(std::string& line, const zemDynamicArray<tagAttributePair>& pairs,
+                 const char* assignment, const zemAttributeNames& table, const char* method) {
+    for (int i = 0; i < pairs.size(); ++i) {
+        const tagAttributePair* pair = pairs.getElementAt(i);
+        if (pair == nullptr) {
+            continue;
+        }
+        const char* name = nameAt(pair->m_attributeIndex, table, line, method);
+        line += "\\\"";
+        line += name;
+        line += assignment;
+        line += pair->m_attributeValue;
+        line += "\\\",";
+    }
+}
+
+void removeTrailingCommas(std::string& line) { line.erase(line.find_last_not_of(',') + 1); }
+
+bool isGiven(const char* text) { return text != nullptr && *text != '\0'; }
+
+bool namesSystem(zemQuery::SystemTest test, const char* managedSystem) {
+    switch (test) {
+        case zemQuery::WHEN_NOT_EMPTY:
+            return isGiven(managedSystem);
+        case zemQuery::WHEN_NOT_NULL:
+            return managedSystem != nullptr;
+        default:
+            return false;
+    }
+}
+
+}  // namespace
+
+zemCommandCaller::zemCommandCaller(const char* auth, const char* locale)
+    : m_auth(auth), m_locale(locale) {}
+
+zemCommandCaller::~zemCommandCaller() = default;
+
+int zemCommandCaller::callGenericCommand(const char* command, zemString* pCmdOutput,
+                                         bool forceTimeOut) {
+    zemString strCmdOutput;
+    zemString strError;
+    int exitCode = 0;
+    CTimeLoger* const logger = CTimeLogerManager::getInstance()->getLogger("callGenericCommand");
+    logger->begin(command);
+    zemPropertiesHelper::executeCommand(command, strCmdOutput, strError, &exitCode, m_auth, 0,
+                                        m_locale, forceTimeOut);
+    logger->end(command);
+
+    const std::string quotedCommand = '"' + std::string(command != nullptr ? command : "") + '"';
+    if (exitCode == 0) {
+        if (saysNoResults(strCmdOutput)) {
+            throwNotFound(quotedCommand, strCmdOutput.stripTrailing('\n'));
+        }
+        if (pCmdOutput != nullptr) {
+            *pCmdOutput = std::move(strCmdOutput);
+        }
+        return 0;
+    }
+    if (strError.isEmpty()) {
+        strError = strCmdOutput;
+    }
+    if (saysNoResults(strError)) {
+        throwNotFound(quotedCommand, strError);
+    }
+    std::string code = "UNKNOWN";
+    const char* const found = std::strstr(strError, kErrorCode);
+    if (found != nullptr) {
+        code.assign(found, std::strcspn(found, " "));
+    }
+    throw zemOperationFailedException(kClass, "callGenericCommand", quotedCommand.c_str(),
+                                      code.c_str(), strError.stripTrailing('\n'));
+}
+
+int zemCommandCaller::callXBRGCommand(const char* command, zemString* pCmdOutput) {
+    return callGenericCommand("xbrgcli " + zemString(command), pCmdOutput, true);
+}
+
+void zemCommandCaller::callLsCommand(const char* cmd, int* paramAttr, int paramAttrEndFlag,
+                                     const char* const* allAttrNames, unsigned int allAttrNumber,
+                                     zemRecordSetsType& results) {
+    const zemAttributeNames table(allAttrNames, allAttrNumber);
+    std::string line = frontOf(cmd, kQueryRoom) + " -F ";
+    unsigned attrNumber = 0;
+    while (paramAttr != nullptr ? paramAttr[attrNumber] != paramAttrEndFlag
+                                : attrNumber < allAttrNumber) {
+        const int index =
+            paramAttr != nullptr ? paramAttr[attrNumber] : static_cast<int>(attrNumber);
+        line += nameAt(index, table, line, "callLsCommand");
+        line += ',';
+        ++attrNumber;
+    }
+    removeTrailingCommas(line);
+    zemLog::LogSysOut(line.c_str());
+    zemString output;
+    callGenericCommand(line.c_str(), &output, true);
+    const std::string_view text(output);
+    if (!zemParseRecords(text, paramAttr, attrNumber, results)) {
+        throw zemOperationFailedException(kClass, "callLsCommand", line.c_str(), "INVALID_RECORD",
+                                          output);
+    }
+}
+
+void zemCommandCaller::BuildChCmdString(zemString& strCmd,
+                                        const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
+                                        const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
+                                        const char* const* allAttrNames, unsigned int allAttrNumber,
+                                        CH_OP_TYPE op, const char* attrOpt) {
+    if (singleValAttrPairs.size() == 0 && multiValAttrPairs.size() == 0) {
+        return;
+    }
+    const zemAttributeNames table(allAttrNames, allAttrNumber);
+    std::string line(strCmd);
+    line += ' ';
+    line += attrOpt != nullptr ? attrOpt : "";
+    line += " \"";
+    appendItems(line, singleValAttrPairs, "=", table, "BuildChCmdString");
+    appendItems(line, multiValAttrPairs, kOperators[op], table, "BuildChCmdString");
+    removeTrailingCommas(line);
+    line += '"';
+    strCmd = line.c_str();
+}
+
+int zemCommandCaller::callChCommand(const char* cmd,
+                                    const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
+                                    const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
+                                    const char* const* allAttrNames, unsigned int allAttrNumber,
+                                    CH_OP_TYPE op, const char* attrOpt) {
+    zemString strCmd(frontOf(cmd, kChangeRoom).c_str());
+    BuildChCmdString(strCmd, singleValAttrPairs, multiValAttrPairs, allAttrNames, allAttrNumber, op,
+                     attrOpt);
+    zemLog::LogSysOut(strCmd);
+    return callGenericCommand(strCmd, nullptr, false);
+}
+
+int zemCommandCaller::callMkCommand(const char* cmd,
+                                    const zemDynamicArray<tagAttributePair>& attrPairs,
+                                    const char* const* allAttrNames, unsigned int allAttrNumber) {
+    const zemAttributeNames table(allAttrNames, allAttrNumber);
+    std::string line = frontOf(cmd, kChangeRoom) + " -i \"";
+    appendItems(line, attrPairs, "=", table, "callMkCommand");
+    removeTrailingCommas(line);
+    line += '"';
+    zemLog::LogSysOut(line.c_str());
+    return callGenericCommand(line.c_str(), nullptr, false);
+}
+
+zemRecordSetsType zemCommandCaller::query(const zemQuery& query, int* paramAttr,
+                                          const char* managedSystem, const char* filter,
+                                          const char* firstOptions, const char* lastOptions) {
+    std::string line = std::string(query.command) + firstOptions;
+    if (namesSystem(query.systemTest, managedSystem)) {
+        line += std::string(" -m \"") + managedSystem + '"';
+    }
+    if (isGiven(filter)) {
+        line += std::string(" --filter ") + filter;
+    }
+    line += lastOptions;
+    zemRecordSetsType results(0, 25, 1);
+    // Where there are no fields to ask for, none are: the records are then only counted.
+    callLsCommand(line.c_str(), query.attributes.count > 0 ? paramAttr : nullptr, kListEnd,
+                  query.attributes.names, query.attributes.count, results);
+    return results;
+}

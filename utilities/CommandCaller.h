@@ -1,0 +1,112 @@
+/// Queries and changes through the appliance's command-line tools.
+///
+/// zemCommandCaller builds a tool's line, runs it under the user and locale of one operation and
+/// judges the result. It is the base of the callers of the single tools (QyplatCmdCaller.h ...),
+/// and serves for one-off lines by itself:
+///
+///     zemCommandCaller caller(userName, locale);
+///     zemString output;
+///     caller.callGenericCommand("qyplat -r sys -F name", &output, true);
+///
+/// An object holds two strings and is made on the stack for one operation; objects are not shared
+/// between threads. The tool's own words reach the client unchanged. What running a tool can throw
+/// (PropertiesHelper.h) comes out of every operation here.
+#ifndef COMMAND_CALLER_H
+#define COMMAND_CALLER_H
+
+#include "AttributeTable.h"
+#include "DynamicArray.h"
+#include "RecordSets.h"
+#include "StringUtils.h"
+#include "ZemExport.h"
+
+/// One attribute for a change tool.
+struct tagAttributePair {
+    int m_attributeIndex;        ///< position in the tool's table of names
+    zemString m_attributeValue;  ///< written to the command line as it is
+};
+
+/// One query of a tool: what its lines begin with, which fields there are, and when the line names
+/// the managed system.
+struct zemQuery {
+    enum SystemTest { WHEN_NOT_EMPTY, WHEN_NOT_NULL, NEVER };
+
+    const char* command;
+    zemAttributeNames attributes;
+    SystemTest systemTest = WHEN_NOT_EMPTY;
+};
+
+class ZEM_EXPORT zemCommandCaller {
+public:
+    /// What a change does to a multi-valued attribute: "+=", "=" or "-=".
+    enum CH_OP_TYPE { CH_OP_ADD = 0, CH_OP_MODIFY = 1, CH_OP_REMOVE = 2 };
+    typedef CH_OP_TYPE ChOperateType;
+
+    /// @param auth  user to run tools as; null or empty: the process's own
+    /// @param locale  LC_ALL of the tools; null or empty leaves it alone
+    zemCommandCaller(const char* auth, const char* locale);
+    virtual ~zemCommandCaller();
+
+    /// Runs @p command without a time limit.
+    /// @param pCmdOutput  receives standard output if not null
+    /// @return 0
+    /// @throws zemObjectNotFoundException the tool says "No results were found."
+    /// @throws zemOperationFailedException the tool fails: the id is the code beginning with "WRTL"
+    ///         in its text, else "UNKNOWN"
+    int callGenericCommand(const char* command, zemString* pCmdOutput, bool forceTimeOut);
+
+    /// The same for @p command as arguments of "xbrgcli".
+    int callXBRGCommand(const char* command, zemString* pCmdOutput);
+
+protected:
+    /// Runs the query @p cmd, of which at most 2048 bytes count, for named fields.
+    /// @param paramAttr  positions of the wanted fields in @p allAttrNames, ending in
+    ///        @p paramAttrEndFlag and used as keys of the records; null: all, in table order
+    /// @param results  receives the records
+    /// @throws zemOperationFailedException id "INVALID_RECORD": a record ends inside quotes; the
+    ///         records before it are in @p results
+    /// @throws zemInvalidParameterException id "INVALID_INDEX": a position outside the table
+    virtual void callLsCommand(const char* cmd, int* paramAttr, int paramAttrEndFlag,
+                               const char* const* allAttrNames, unsigned int allAttrNumber,
+                               zemRecordSetsType& results);
+
+    /// Runs the change @p cmd, of which at most 512 bytes count, with the option that
+    /// BuildChCmdString() adds.
+    virtual int callChCommand(const char* cmd,
+                              const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
+                              const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
+                              const char* const* allAttrNames, unsigned int allAttrNumber,
+                              CH_OP_TYPE op, const char* attrOpt);
+
+    /// Runs the creation @p cmd, of which at most 512 bytes count, with the option -i and
+    /// @p attrPairs; the option stands even if they are empty.
+    virtual int callMkCommand(const char* cmd, const zemDynamicArray<tagAttributePair>& attrPairs,
+                              const char* const* allAttrNames, unsigned int allAttrNumber);
+
+    /// Appends the option @p attrOpt to @p strCmd with the single-valued attributes and then the
+    /// multi-valued ones, or nothing when both arrays are empty:
+    ///
+    ///      -i "\"name=value\",\"attr+=v1\""
+    ///
+    /// The splitter makes this one argument that keeps the inner quotes, so a value may hold
+    /// commas.
+    /// @throws zemInvalidParameterException id "INVALID_INDEX": a position outside the table
+    void BuildChCmdString(zemString& strCmd,
+                          const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
+                          const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
+                          const char* const* allAttrNames, unsigned int allAttrNumber,
+                          CH_OP_TYPE op, const char* attrOpt);
+
+    /// Runs one query of a tool. The line is the query's command, @p firstOptions, the managed
+    /// system, the filter, @p lastOptions and the wanted fields.
+    /// @param paramAttr  as in callLsCommand(), ending in -1
+    /// @param filter  with its own quoting; null or empty: none
+    zemRecordSetsType query(const zemQuery& query, int* paramAttr, const char* managedSystem,
+                            const char* filter = nullptr, const char* firstOptions = "",
+                            const char* lastOptions = "");
+
+    zemString m_auth;
+    zemString m_locale;
+};
+
+#endif

@@ -1,0 +1,24 @@
+#include "QyfaultCmdCaller.h"
+
+namespace {
+
+constexpr zemQuery kSystems = {"qyfault -r sys",
+                               zemQyfaultCmdCaller::ManagedSystemAttribute::m_attributeName};
+constexpr zemQuery kPartitions = {"qyfault -r lpar",
+                                  zemQyfaultCmdCaller::PartitionAttribute::m_attributeName};
+
+}  // namespace
+
+zemQyfaultCmdCaller::zemQyfaultCmdCaller(const char* auth, const char* locale)
+    : zemCommandCaller(auth, locale) {}
+
+zemRecordSetsType zemQyfaultCmdCaller::getManagedSystemInformation(int* paramAttr,
+                                                                   const char* managedSystem) {
+    return query(kSystems, paramAttr, managedSystem);
+}
+
+zemRecordSetsType zemQyfaultCmdCaller::getPartitionsInformation(int* paramAttr,
+                                                                const char* managedSystem,
+                                                                const char* filter) {
+    return query(kPartitions, paramAttr, managedSystem, filter);
+}

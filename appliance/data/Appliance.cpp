@@ -1,0 +1,145 @@
+// The program "appliance": makes an appliance's state, shows it and checks it.
+
+#include <unistd.h>
+
+#include <CLI/CLI.hpp>
+#include <chrono>
+#include <cstdio>
+#include <iostream>
+
+#include "Appliances.h"
+#include "Check.h"
+#include "Failure.h"
+#include "Show.h"
+
+namespace {
+
+using namespace appliance;
+
+constexpr const char* kFooter =
+    "The state is the file appliance.db in the folder that the environment variable\n"
+    "APPLIANCE_HOME names.\n"
+    "\n"
+    "Exit status: 0 done, 1 refused or rules broken, 2 wrong command line,\n"
+    "3 state unusable, 4 output not written.";
+
+constexpr std::int64_t kMostHosts = 65535;  ///< MAC addresses number hosts and partitions
+constexpr std::int64_t kMostLpars = 65000;
+
+/// Tells a watching person how far a long work is; says nothing before two seconds are over.
+class Progress {
+public:
+    explicit Progress(std::int64_t total) : m_total(total) {}
+    ~Progress() {
+        if (m_shown) std::fputc('\n', stderr);
+    }
+    Progress(const Progress&) = delete;
+    Progress& operator=(const Progress&) = delete;
+
+    void operator()(std::int64_t done) {
+        const auto now = std::chrono::steady_clock::now();
+        if (!m_watched || now - m_last < (m_shown ? std::chrono::milliseconds(200)
+                                                  : std::chrono::milliseconds(2000))) {
+            return;
+        }
+        m_last = now;
+        m_shown = true;
+        std::fprintf(stderr, "\r%lld of %lld hosts", static_cast<long long>(done),
+                     static_cast<long long>(m_total));
+    }
+
+private:
+    const bool m_watched = isatty(STDERR_FILENO) != 0;
+    const std::int64_t m_total;
+    bool m_shown = false;
+    std::chrono::steady_clock::time_point m_last = std::chrono::steady_clock::now();
+};
+
+/// Fills the state anew, in one transaction: whoever reads meanwhile sees what was there before.
+template <typename Fill>
+void fill(bool force, Fill fillStore) {
+    Store store = Store::create();
+    Transaction change = store.write();
+    store.clear(force);
+    fillStore(store);
+    change.commit();
+}
+
+int showState(const std::string& format) {
+    Store store = Store::open(Database::Access::Read);
+    const Transaction picture = store.read();
+    std::cout << (format == "json" ? showJson(store) : showText(store));
+    return 0;
+}
+
+int checkState() {
+    Store store = Store::open(Database::Access::Read);
+    const Transaction picture = store.read();
+    const std::vector<std::string> findings = check(store);
+    for (const std::string& finding : findings) std::cout << finding << '\n';
+    return findings.empty() ? 0 : kExitRefused;
+}
+
+int run(int argc, char** argv) {
+    CLI::App app{"Makes and shows the state of an appliance that manages partitioned hosts."};
+    app.footer(kFooter);
+    app.require_subcommand(1);
+    bool force = false;
+    Size size{3, 10, 1};
+    std::string format = "text";
+
+    CLI::App* init = app.add_subcommand(
+        "init", "Make the demo appliance: four hosts in four states, fourteen partitions.");
+    CLI::App* generate = app.add_subcommand(
+        "generate", "Make an appliance of any size; the same options always make the same one.");
+    CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
+    CLI::App* verify = app.add_subcommand(
+        "check", "Check that the state obeys the rules of hosts, and print those that it breaks.");
+
+    for (CLI::App* maker : {init, generate}) {
+        maker->add_flag("--force", force, "Replace an appliance that is there already");
+    }
+    generate->add_option("--hosts", size.hosts, "How many hosts")
+        ->check(CLI::Range(std::int64_t{0}, kMostHosts))
+        ->capture_default_str();
+    generate->add_option("--lpars", size.lpars, "How many partitions each host has")
+        ->check(CLI::Range(std::int64_t{0}, kMostLpars))
+        ->capture_default_str();
+    generate->add_option("--seed", size.seed, "Start of the random choices")->capture_default_str();
+    show->add_option("--format", format, "text, or json with every attribute that was set")
+        ->check(CLI::IsMember({"text", "json"}))
+        ->capture_default_str();
+    for (CLI::App* verb : {init, generate, show, verify}) verb->footer(kFooter);
+
+    try {
+        app.parse(argc, argv);
+    } catch (const CLI::ParseError& error) {
+        return app.exit(error) == 0 ? 0 : kExitUsage;
+    }
+
+    if (init->parsed()) fill(force, fillDemo);
+    if (generate->parsed()) {
+        Progress progress(size.hosts);
+        fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
+    }
+    if (show->parsed()) return showState(format);
+    if (verify->parsed()) return checkState();
+    return 0;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    try {
+        const int status = run(argc, argv);
+        std::cout.flush();
+        if (!std::cout) throw Failure(Fault::Output, {"standard output"});
+        return status;
+    } catch (const Failure& failure) {
+        std::cerr << failure.text(languageOfEnvironment()) << '\n';
+        return failure.exitStatus();
+    } catch (const std::exception& error) {
+        std::cerr << error.what() << '\n';
+        return kExitState;
+    }
+}

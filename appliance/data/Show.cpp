@@ -1,0 +1,94 @@
+#include "Show.h"
+
+#include <algorithm>
+#include <nlohmann/json.hpp>
+
+#include "Text.h"
+#include "View.h"
+
+namespace appliance {
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+using Line = std::vector<std::string>;
+
+constexpr const char* kColumns[] = {"name",           "lpar_env", "state",
+                                    "run_proc_units", "run_mem",  "curr_profile"};
+
+/// Characters of UTF-8 text: all bytes but those that continue one.
+std::size_t width(const std::string& text) {
+    return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), [](char c) {
+        return (static_cast<unsigned char>(c) & 0xC0) != 0x80;
+    }));
+}
+
+std::string table(const std::vector<Line>& lines) {
+    std::vector<std::size_t> widths(lines.front().size(), 0);
+    for (const Line& line : lines) {
+        for (std::size_t i = 0; i < line.size(); ++i) {
+            widths[i] = std::max(widths[i], width(line[i]));
+        }
+    }
+    std::string text;
+    for (const Line& line : lines) {
+        text += "   ";
+        for (std::size_t i = 0; i < line.size(); ++i) {
+            text += ' ' + line[i];
+            if (i + 1 < line.size()) text.append(widths[i] - width(line[i]) + 1, ' ');
+        }
+        text += '\n';
+    }
+    return text;
+}
+
+std::string overview(const HostView& view) {
+    const Row row{&view, &view.host()};
+    const auto& lpars = view.all(Kind::Lpar);
+    std::string text = view.host().get("name") + " (" + view.mtms() + ")  " +
+                       view.host().get("state") + "\n    " + std::to_string(lpars.size()) +
+                       " partitions, free: " + valueOf(row, "pend_avail_sys_proc_units") + " of " +
+                       valueOf(row, "configurable_sys_proc_units") + " processing units, " +
+                       valueOf(row, "pend_avail_sys_mem") + " of " +
+                       valueOf(row, "configurable_sys_mem") + " MB\n";
+    if (lpars.empty()) return text;
+    std::vector<Line> lines = {
+        {"id", "name", "environment", "state", "processors", "memory", "profile"}};
+    for (const Object& lpar : lpars) {
+        lines.push_back({lpar.get("lpar_id")});
+        for (const char* column : kColumns) lines.back().push_back(lpar.get(column));
+    }
+    return text + table(lines);
+}
+
+Json attributes(const Object& object) {
+    const Place& place = object.place();
+    Json json = {{"host", place.host}, {"lpar", place.lpar}, {"number", place.number}};
+    const std::string& lines = object.stored();
+    for (std::size_t begin = 1; begin < lines.size();) {
+        const std::size_t equals = lines.find('=', begin), end = lines.find('\n', begin);
+        json[lines.substr(begin, equals - begin)] = lines.substr(equals + 1, end - equals - 1);
+        begin = end + 1;
+    }
+    return json;
+}
+
+}  // namespace
+
+std::string showText(Store& store) {
+    std::string text;
+    for (const auto& view : allHosts(store)) text += overview(*view);
+    return text;
+}
+
+std::string showJson(Store& store) {
+    Json json;
+    for (int i = 0; i < kKinds; ++i) {
+        const Kind kind = static_cast<Kind>(i);
+        Json& list = json[kindName(kind)] = Json::array();
+        for (const Object& object : store.all(kind)) list.push_back(attributes(object));
+    }
+    return json.dump(2, ' ', false, Json::error_handler_t::replace) + '\n';
+}
+
+}  // namespace appliance

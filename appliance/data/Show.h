@@ -1,0 +1,19 @@
+/// What the appliance holds, for people and as JSON.
+#ifndef APPLIANCE_SHOW_H
+#define APPLIANCE_SHOW_H
+
+#include <string>
+
+#include "Store.h"
+
+namespace appliance {
+
+/// Hosts with what is free on them, and their partitions as a table.
+std::string showText(Store& store);
+
+/// Every object with the attributes that it was given: {"host": [{...}, ...], "lpar": [...], ...}.
+std::string showJson(Store& store);
+
+}  // namespace appliance
+
+#endif

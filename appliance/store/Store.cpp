@@ -1,0 +1,131 @@
+#include "Store.h"
+
+#include <cstdlib>
+#include <filesystem>
+
+#include "Failure.h"
+
+namespace appliance {
+
+namespace {
+
+/// Stands in the file's user_version; 0 there is a file in which nothing was made yet. Goes up
+/// with every change of the schema or of what stored attributes mean.
+constexpr std::int64_t kVersion = 1;
+
+// The attributes of an object are one text, because an object is always read whole: a table with a
+// row for each attribute would have tens of millions of rows on a large appliance.
+constexpr const char* kSchema = R"(
+    DROP TABLE IF EXISTS object;
+    CREATE TABLE object(
+        kind TEXT NOT NULL,
+        host INTEGER NOT NULL,
+        lpar INTEGER NOT NULL,
+        number INTEGER NOT NULL,
+        attributes TEXT NOT NULL,
+        UNIQUE(kind, host, lpar, number)
+    );
+)";
+
+std::filesystem::path home() {
+    const char* folder = std::getenv("APPLIANCE_HOME");
+    if (folder == nullptr || *folder == '\0') throw Failure(Fault::NoHome);
+    return folder;
+}
+
+std::filesystem::path stateFile() { return home() / "appliance.db"; }
+
+std::vector<Object> collect(Statement& query, Kind kind) {
+    std::vector<Object> objects;
+    while (query.step()) {
+        objects.emplace_back(kind, Place{query.integer(0), query.integer(1), query.integer(2)},
+                             query.text(3));
+    }
+    return objects;
+}
+
+}  // namespace
+
+Store::Store(std::unique_ptr<Database> database) : m_database(std::move(database)) {}
+
+std::int64_t Store::version() {
+    Statement query(*m_database, "PRAGMA user_version");
+    query.step();
+    return query.integer(0);
+}
+
+Store Store::open(Database::Access access) {
+    const auto file = stateFile();
+    std::error_code error;
+    if (!std::filesystem::exists(file, error)) {
+        if (error) throw Failure(Fault::StateUnusable, {file.string(), error.message()});
+        throw Failure(Fault::NoState, {home().string()});
+    }
+    Store store(std::make_unique<Database>(file.string(), access));
+    const std::int64_t version = store.version();
+    if (version == 0) throw Failure(Fault::NoState, {home().string()});
+    if (version != kVersion) {
+        throw Failure(Fault::StateVersion, {std::to_string(version), std::to_string(kVersion)});
+    }
+    return store;
+}
+
+Store Store::create() {
+    const auto file = stateFile();
+    std::error_code error;
+    std::filesystem::create_directories(home(), error);
+    if (error) throw Failure(Fault::StateUnusable, {home().string(), error.message()});
+    return Store(std::make_unique<Database>(file.string(), Database::Access::Create));
+}
+
+void Store::clear(bool force) {
+    if (!force && version() != 0) throw Failure(Fault::StateExists, {home().string()});
+    m_put.reset();
+    m_database->execute(kSchema);
+    m_database->execute(("PRAGMA user_version = " + std::to_string(kVersion)).c_str());
+}
+
+void Store::put(const Object& object) {
+    if (!m_put) {
+        m_put = std::make_unique<Statement>(
+            *m_database,
+            "INSERT INTO object(kind, host, lpar, number, attributes) VALUES(?, ?, ?, ?, ?) "
+            "ON CONFLICT(kind, host, lpar, number) DO UPDATE SET attributes = excluded.attributes");
+    }
+    m_put->bind(1, kindName(object.kind()));
+    m_put->bind(2, object.place().host);
+    m_put->bind(3, object.place().lpar);
+    m_put->bind(4, object.place().number);
+    m_put->bind(5, object.stored());
+    m_put->step();
+}
+
+bool Store::remove(Kind kind, const Place& place) {
+    Statement query(*m_database,
+                    "DELETE FROM object WHERE kind = ? AND host = ? AND lpar = ? AND number = ?");
+    query.bind(1, kindName(kind));
+    query.bind(2, place.host);
+    query.bind(3, place.lpar);
+    query.bind(4, place.number);
+    query.step();
+    return sqlite3_changes(m_database->handle()) != 0;
+}
+
+std::vector<Object> Store::all(Kind kind) {
+    Statement query(*m_database,
+                    "SELECT host, lpar, number, attributes FROM object WHERE kind = ? "
+                    "ORDER BY host, lpar, number");
+    query.bind(1, kindName(kind));
+    return collect(query, kind);
+}
+
+std::vector<Object> Store::all(Kind kind, std::int64_t host) {
+    Statement query(*m_database,
+                    "SELECT host, lpar, number, attributes FROM object WHERE kind = ? "
+                    "AND host = ? ORDER BY lpar, number");
+    query.bind(1, kindName(kind));
+    query.bind(2, host);
+    return collect(query, kind);
+}
+
+}  // namespace appliance

@@ -1,0 +1,99 @@
+#include "Request.h"
+
+#include <cstdint>
+
+#include "Failure.h"
+#include "Text.h"
+
+namespace appliance {
+
+namespace {
+
+constexpr unsigned kByHost = kQyplat | kQyalloc | kQymove | kQyusage | kQyfault | kQylink;
+constexpr unsigned kAll = kByHost | kQylwh;
+
+constexpr Option kOptions[] = {
+    {"-r", kByHost, "<resource>", "what to list", "was aufgelistet wird"},
+    {"--rsubtype", kQyalloc, "<subtype>", "which kind of that resource",
+     "welche Art dieser Ressource"},
+    {"--level", kQyalloc, "<level>", "whose share of it", "wessen Anteil daran"},
+    {"-m", kByHost, "<managed system>",
+     "by its name or as <type_model>*<serial_num>; all when absent or empty",
+     "mit Namen oder als <type_model>*<serial_num>; alle, wenn es fehlt oder leer ist"},
+    {"--filter", kQyplat | kQyalloc | kQymove | kQyusage | kQyfault, "\"<name>=<value>,...,...\"",
+     "only records that have one of the values; several filters must all hold",
+     "nur Sätze, die einen der Werte haben; mehrere Filter müssen alle zutreffen"},
+    {"-F", kAll, "[<attribute>,...]",
+     "print these values without names; all of them when the list is empty",
+     "diese Werte ohne Namen ausgeben; alle, wenn die Liste leer ist"},
+    {"--maxmem", kQyalloc, "<megabytes>",
+     "memory that a partition may grow to, for the required_min_mem attributes",
+     "Speicher, bis zu dem eine Partition wachsen darf, für die Attribute required_min_mem"},
+    {"--procunits", kQyalloc, "<units>", "accepted; no attribute depends on it",
+     "wird angenommen; kein Attribut hängt davon ab"},
+    {"-n", kQyusage, "<number>", "at most so many samples, the newest",
+     "höchstens so viele Messungen, die neuesten"},
+    {"--startyear", kQyusage, "<year>",
+     "samples from here on, universal time; one hour before the end when absent",
+     "Messungen ab hier, Weltzeit; eine Stunde vor dem Ende, wenn es fehlt"},
+    {"--startmonth", kQyusage, "<1-12>", "1 when absent", "1, wenn es fehlt"},
+    {"--startday", kQyusage, "<1-31>", "1 when absent", "1, wenn es fehlt"},
+    {"--starthour", kQyusage, "<0-23>", "0 when absent", "0, wenn es fehlt"},
+    {"--endyear", kQyusage, "<year>", "samples up to here; now when absent",
+     "Messungen bis hier; bis jetzt, wenn es fehlt"},
+    {"--endmonth", kQyusage, "<1-12>", "1 when absent", "1, wenn es fehlt"},
+    {"--endday", kQyusage, "<1-31>", "1 when absent", "1, wenn es fehlt"},
+    {"--endhour", kQyusage, "<0-23>", "0 when absent", "0, wenn es fehlt"},
+    {"--help", kAll, nullptr, "this text", "dieser Text"},
+    {nullptr, 0, nullptr, nullptr, nullptr},
+};
+
+const Option& find(Tool tool, const std::string& name) {
+    for (const Option& option : kOptions) {
+        if (option.name != nullptr && name == option.name && (option.tools & tool) != 0) {
+            return option;
+        }
+    }
+    throw Failure(name.rfind('-', 0) == 0 ? Fault::UnknownOption : Fault::UnexpectedArgument,
+                  {name});
+}
+
+}  // namespace
+
+const Option* options() { return kOptions; }
+
+Request::Request(Tool tool, const char* const* arguments) {
+    while (*arguments != nullptr) {
+        const Option& option = find(tool, *arguments++);
+        std::string value;
+        if (option.value != nullptr) {
+            // The bare -F at the end of a line asks for all attributes.
+            const bool optional = *option.value == '[';
+            if (*arguments != nullptr && !(optional && **arguments == '-')) {
+                value = *arguments++;
+            } else if (!optional) {
+                throw Failure(Fault::MissingValue, {option.name});
+            }
+        }
+        if (!m_values.emplace(option.name, value).second) {
+            throw Failure(Fault::RepeatedOption, {option.name});
+        }
+    }
+}
+
+std::string Request::value(const char* option) const {
+    const auto found = m_values.find(option);
+    return found == m_values.end() ? std::string() : found->second;
+}
+
+std::int64_t Request::number(const char* option, std::int64_t least, std::int64_t most,
+                             std::int64_t absent) const {
+    if (!has(option)) return absent;
+    std::int64_t number = 0;
+    if (!wholeNumber(value(option), &number) || number < least || number > most) {
+        throw Failure(Fault::BadOptionValue, {option, value(option)});
+    }
+    return number;
+}
+
+}  // namespace appliance

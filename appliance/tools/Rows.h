@@ -1,0 +1,61 @@
+/// The records that resources cover: functions of the type Rows.
+#ifndef APPLIANCE_ROWS_H
+#define APPLIANCE_ROWS_H
+
+#include <algorithm>
+
+#include "Resource.h"
+
+namespace appliance {
+
+std::vector<Row> eachHost(const Hosts& hosts, const Request& request);
+
+/// All objects of the kinds, host by host, by partition and number.
+template <Kind... kinds>
+std::vector<Row> each(const Hosts& hosts, const Request&) {
+    std::vector<Row> rows;
+    for (const auto& view : hosts) {
+        const auto begin = static_cast<std::ptrdiff_t>(rows.size());
+        for (Kind kind : {kinds...}) {
+            for (const Object& object : view->all(kind)) rows.push_back(rowOf(*view, object));
+        }
+        if (sizeof...(kinds) == 1) continue;
+        std::stable_sort(rows.begin() + begin, rows.end(), [](const Row& a, const Row& b) {
+            const Place &p = a.self->place(), &q = b.self->place();
+            return p.lpar != q.lpar ? p.lpar < q.lpar : p.number < q.number;
+        });
+    }
+    return rows;
+}
+
+/// Those that a partition has.
+template <Kind kind>
+std::vector<Row> eachUsed(const Hosts& hosts, const Request& request) {
+    std::vector<Row> rows = each<kind>(hosts, request);
+    const auto isFree = [](const Row& row) { return row.lpar == nullptr; };
+    rows.erase(std::remove_if(rows.begin(), rows.end(), isFree), rows.end());
+    return rows;
+}
+
+/// Hosts, with the numbers that --maxmem and --procunits ask about.
+std::vector<Row> hostCapacity(const Hosts& hosts, const Request& request);
+
+/// Partitions of the environment that starts from tagged slots.
+std::vector<Row> taggedLpars(const Hosts& hosts, const Request& request);
+
+/// Utilisation samples of the time asked for: newest first, and within one moment by partition.
+/// Nothing is recorded: what a sample of some past moment says is worked out from the state of
+/// today, and is the same whenever that moment is asked for.
+std::vector<Row> hostSamples(const Hosts& hosts, const Request& request);
+std::vector<Row> lparSamples(const Hosts& hosts, const Request& request);
+
+/// What is the same for every host of the appliance, so its first host.
+std::vector<Row> theAppliance(const Hosts& hosts, const Request& request);
+
+/// An appliance that manages one host only lives on that host, in its first I/O server.
+/// @throws Failure NoSingleHostManager
+std::vector<Row> singleHostManager(const Hosts& hosts, const Request& request);
+
+}  // namespace appliance
+
+#endif

@@ -1,0 +1,231 @@
+// The query tools beside qyplat, and that all of them tell one story. Every row runs a program.
+
+#include <gtest/gtest.h>
+
+#include "Text.h"
+#include "ToolRecords.h"
+
+namespace {
+
+using appliance::hundredths;
+using appliance::number;
+using testing_support::Outcome;
+using testing_support::TestAppliance;
+
+class QueryToolsTest : public testing::Test {
+protected:
+    QueryToolsTest() { EXPECT_EQ(0, run("appliance init").exit); }
+    Outcome run(const std::string& command) { return m_appliance.run(command); }
+
+    /// The values of one field.
+    std::vector<std::string> column(const std::string& command) {
+        std::vector<std::string> values;
+        for (const Record& record : recordsOf(run(command).out)) values.push_back(record[0]);
+        return values;
+    }
+
+    TestAppliance m_appliance{ZEM_PROGRAMS};
+};
+
+TEST_F(QueryToolsTest, EveryAttributeAnswers) {
+    const struct {
+        const char* command;
+        const char* names;
+    } rows[] = {
+        {"qyalloc -r mem --level lpar",
+         "lpar_id,lpar_name,curr_min_mem,curr_mem,curr_max_mem,pend_min_mem,pend_mem,pend_max_mem,"
+         "run_min_mem,run_mem,mem_mode,pend_mem_weight,curr_mem_weight,run_mem_weight,"
+         "pend_io_entitled_mem,curr_io_entitled_mem,run_io_entitled_mem,auto_io_entitled_mem,"
+         "primary_psp_name,primary_psp_id,secondary_psp_name,secondary_psp_id,curr_psp_id,"
+         "curr_psp_name"},
+        {"qyalloc -r mem --level sys --maxmem 512",
+         "configurable_sys_mem,curr_avail_sys_mem,pend_avail_sys_mem,installed_sys_mem,"
+         "deconfig_sys_mem,sys_firmware_mem,mem_region_size,required_min_mem_tmx_linux,"
+         "required_min_mem_osq00,max_mem_pools"},
+        {"qyalloc -r proc --level lpar",
+         "lpar_id,lpar_name,curr_shared_proc_pool_id,curr_proc_mode,curr_min_proc_units,"
+         "curr_proc_units,curr_max_proc_units,curr_min_procs,curr_procs,curr_max_procs,"
+         "curr_sharing_mode,curr_uncap_weight,pend_shared_proc_pool_id,pend_proc_mode,"
+         "pend_min_proc_units,pend_proc_units,pend_max_proc_units,pend_min_procs,pend_procs,"
+         "pend_max_procs,pend_sharing_mode,pend_uncap_weight,run_proc_units,run_procs,"
+         "run_uncap_weight"},
+        {"qyalloc -r proc --level pool",
+         "shared_proc_pool_id,configurable_pool_proc_units,curr_avail_pool_proc_units,"
+         "pend_avail_pool_proc_units"},
+        {"qyalloc -r proc --level sys --procunits 2",
+         "configurable_sys_proc_units,curr_avail_sys_proc_units,pend_avail_sys_proc_units,"
+         "installed_sys_proc_units,deconfig_sys_proc_units,min_proc_units_per_virtual_proc,"
+         "max_shared_proc_pools,configurable_pool_proc_uints,pend_pool_mem"},
+        {"qyalloc -r mempool",
+         "curr_pool_mem,pend_pool_mem,curr_max_pool_mem,pend_max_pool_mem,sys_firmware_pool_mem,"
+         "pend_avail_pool_mem,psp_names,psp_ids"},
+        {"qyalloc -r procpool",
+         "name,shared_proc_pool_id,max_pool_proc_units,curr_reserved_pool_proc_units,"
+         "pend_reserved_pool_proc_units,lpar_names,lpar_ids"},
+        {"qyalloc -r virtualio --rsubtype eth --level lpar",
+         "lpar_id,lpar_name,slot_num,state,ieee_virtual_eth,port_vlan_id,addl_vlan_ids,is_trunk,"
+         "is_required,mac_addr,trunk_priority"},
+        {"qyalloc -r virtualio --rsubtype eth --level sys", "max_vlans_per_port,mac_prefix"},
+        {"qyalloc -r virtualio --rsubtype hsl", "hsl_pool_id,lpar_names,lpar_ids"},
+        {"qyalloc -r virtualio --rsubtype virtualopti --level sys",
+         "virtual_opti_pool_id,lpar_names,lpar_ids"},
+        {"qyalloc -r virtualio --rsubtype scsi --level lpar",
+         "lpar_id,lpar_name,slot_num,state,adapter_type,remote_lpar_id,remote_lpar_name,"
+         "remote_slot_num,is_required,backing_devices"},
+        {"qyalloc -r virtualio --rsubtype serial --level lpar",
+         "lpar_id,lpar_name,slot_num,state,is_required,connect_status,adapter_type,supports_dnx,"
+         "remote_lpar_id,remote_lpar_name,remote_slot_num"},
+        {"qyalloc -r virtualio --rsubtype slot --level lpar",
+         "lpar_id,lpar_name,curr_max_virtual_slots,pend_max_virtual_slots"},
+        {"qyalloc -r virtualio --rsubtype slot --level slot",
+         "lpar_id,lpar_name,slot_num,config,state,drc_name"},
+        {"qyalloc -r io --rsubtype unit", "unit_phys_loc"},
+        {"qyalloc -r io --rsubtype bus",
+         "unit_phys_loc,bus_id,backplane_phys_loc,bus_drc_index,bus_drc_name"},
+        {"qyalloc -r io --rsubtype slot",
+         "lpar_id,unit_phys_loc,bus_id,phys_loc,drc_index,slot_io_pool_id,description,"
+         "feature_codes,pci_vendor_id,pci_device_id,pci_subs_vendor_id,pci_subs_device_id,"
+         "pci_class,pci_revision_id,bus_grouping,iop,parent_slot_drc_index,drc_name"},
+        {"qyalloc -r io --rsubtype iopool --level pool", "max_io_pools"},
+        {"qyalloc -r io --rsubtype taggedio",
+         "lpar_id,lpar_name,load_source_slot,alt_restart_device_slot,"
+         "recent_alt_restart_device_slot,console_slot,alt_console_slot,op_console_slot"},
+        {"qymove -r lpar",
+         "name,lpar_id,migration_state,migration_type,source_sys_name,dest_sys_name,"
+         "source_lpar_id,dest_lpar_id,source_msp_name,source_msp_id,dest_msp_name,dest_msp_id,"
+         "bytes_transmitted,bytes_remaining"},
+        {"qymove -r sys",
+         "inactive_lpar_mobility_capable,num_inactive_migrations_supported,"
+         "num_inactive_migrations_in_progress,active_lpar_mobility_capable,"
+         "num_active_migrations_supported,num_active_migrations_in_progress"},
+        {"qymove -r manager", "remote_lpar_mobility_capable"},
+        {"qyusage -r sys --endyear 2100 -n 1 ",
+         "time,event_type,resource_type,sys_time,state,configurable_sys_proc_units,"
+         "configurable_sys_mem,curr_avail_sys_proc_units,curr_avail_7460_wkl_percent,"
+         "curr_avail_sys_mem,sys_firmware_mem,proc_cycles_per_second"},
+        {"qyusage -r lpar -n 1",
+         "time,event_type,resource_type,sys_time,time_cycles,lpar_name,lpar_id,curr_proc_mode,"
+         "curr_procs,curr_sharing_mode,curr_7460_wkl_percent,curr_mem,entitled_cycles,"
+         "capped_cycles,uncapped_cycles,mem_mode"},
+        {"qyusage -r config", "type_model_serial_num,name,sample_rate"},
+        {"qylink -r all",
+         "resource_type,type_model_serial_num,sp,sp_phys_loc,ipaddr,alt_ipaddr,state,"
+         "connection_error_code"},
+        {"qyfault -r lpar", "lpar_name,lpar_id,time_stamp,refcode,word2,fru_call_out_loc_codes"},
+        {"qyfault -r sys", "refcode_num,refcode"},
+    };
+    for (const auto& row : rows) EXPECT_EQ("", faultsOfTable(m_appliance, row.command, row.names));
+}
+
+TEST_F(QueryToolsTest, AnswersAndFailures) {
+    const ToolRow rows[] = {
+        {"qyalloc -r virtualio --rsubtype eth -m alpha --filter lpar_ids=4,slots=5 --level lpar "
+         "-F port_vlan_id,addl_vlan_ids",
+         0, "7,\"20,30\"\n", ""},
+        {"qyalloc -r virtualio --rsubtype slot --level slot -m alpha --filter lpar_ids=4 "
+         "-F slot_num,config",
+         0, "0,serial\n1,serial\n2,ethernet\n3,scsi\n5,ethernet\n6,serial\n", ""},
+        {"qyalloc -r virtualio --rsubtype scsi --level lpar -m alpha --filter 'lpar_names=db,main' "
+         "-F remote_lpar_name,remote_slot_num",
+         0, "xbrg2,14\n", ""},
+        {"qyalloc -r procpool -m alpha -F name,lpar_names,lpar_ids", 0,
+         "DefaultPool,\"xbrg2,\"\"say \"\"\"\"hi\"\"\"\"\"\",traveller\",\"2,5,7\"\n"
+         "\"web, db\",\"web server,\"\"db,main\"\"\",\"3,4\"\n",
+         ""},
+        {"qyalloc -r mempool -m gamma", 0, "No results were found.\n", ""},
+        {"qyalloc -r io --rsubtype slot -m gamma --filter lpar_names=xbrg -F drc_index", 0,
+         "30000001\n30000002\n", ""},
+        {"qyalloc -r io --rsubtype taggedio -F lpar_name,console_slot", 0,
+         "Büro-Prüfstand,dnx\nosq dev,dnx\n", ""},
+        // Asked with a bare -F by callers that only count.
+        {"qyalloc -r hca --level lpar -F | wc -l", 0, "1\n", ""},
+        {"qyalloc -r hca --level sys -F | wc -l", 0, "2\n", ""},
+        {"qyalloc -r sni -m alpha -F | wc -l", 0, "1\n", ""},
+        {"qyalloc -r mem --level sys --maxmem 65536 -m alpha -F required_min_mem_tmx_linux", 0,
+         "1280\n", ""},
+        {"qyalloc -r mem -F", 2, "", "WRTL1003 The option --level is missing.\n"},
+        {"qyalloc -r virtualio -F", 2, "", "WRTL1003 The option --rsubtype is missing.\n"},
+        {"qyalloc -r virtualio --rsubtype scsi --level sys -F", 2, "",
+         "WRTL1004 The option --level cannot have the value \"sys\".\n"},
+        {"qyalloc -r io --rsubtype unit --level frame -F", 2, "",
+         "WRTL1004 The option --level cannot have the value \"frame\".\n"},
+        {"qyalloc -r mem --level sys --maxmem 0", 2, "",
+         "WRTL1004 The option --maxmem cannot have the value \"0\".\n"},
+        {"qymove -r sys -m alpha -F num_active_migrations_in_progress", 0, "1\n", ""},
+        {"qymove -r lpar -m '' --filter lpar_names=traveller -F bytes_transmitted", 0,
+         "1073741824\n1073741824\n", ""},
+        {"qyfault -r lpar -m alpha --filter lpar_ids=3 -F refcode", 0, "A1000042\n", ""},
+        {"qylink -r all -m 'delta, spare' -F sp,state", 0,
+         "primary,No Connection\nsecondary,No Connection\n", ""},
+        {"qylwh", 1, "", "WRTL3001 This appliance is not the manager of a single host.\n"},
+        {"appliance generate --force --hosts 1 --lpars 2 && qylwh | cut -d, -f2,3", 0,
+         "0000001,1\n", ""},
+    };
+    expectRows(m_appliance, rows);
+}
+
+TEST_F(QueryToolsTest, SamplesCoverTheTimeAskedFor) {
+    const auto samples = [&](const std::string& range) {
+        return column("qyusage -r sys -m alpha  --filter event_types=sample" + range + " -F time");
+    };
+    EXPECT_NEAR(12, static_cast<double>(samples("").size()), 1);  // the last hour
+    EXPECT_EQ(3U, samples(" -n 3").size());
+    EXPECT_EQ("No results were found.", samples(" --startyear 1999 --endyear 2001").front());
+    EXPECT_EQ(2, run("qyusage -r sys --startyear 24x").exit);
+
+    const std::time_t time = std::time(nullptr) - 2 * 24 * 60 * 60;
+    const auto thatDay = [&](const char* format) {
+        char text[160];
+        return std::string(text, std::strftime(text, sizeof text, format, std::gmtime(&time)));
+    };
+    const std::string hours = thatDay(
+        " --startyear %Y --startmonth %m --startday %d --starthour 3 "
+        " --endyear %Y --endmonth %m --endday %d --endhour 5 ");
+    const auto two = samples(hours);
+    ASSERT_EQ(25U, two.size());
+    EXPECT_EQ(thatDay("%m/%d/%Y 05:00:00"), two.front());
+    EXPECT_EQ(thatDay("%m/%d/%Y 03:00:00"), two.back());
+    EXPECT_EQ(two, samples(hours));
+
+    const auto cycles =
+        column("qyusage -r lpar -m alpha  --filter \"event_types=sample\",lpar_ids=4" + hours +
+               " -F entitled_cycles");
+    ASSERT_EQ(25U, cycles.size());
+    EXPECT_EQ(number(cycles.front()) * 3, number(cycles.back()) * 5);  // counted from midnight
+}
+
+TEST_F(QueryToolsTest, ToolsTellOneStory) {
+    for (const char* demo : {"appliance init", "appliance generate --hosts 2 --lpars 60"}) {
+        ASSERT_EQ(0, run(demo + std::string(" --force")).exit);
+        for (const std::string& host : column("qyplat -r sys -F name")) {
+            const std::string m = " -m '" + host + "' -F ";
+            const auto ids = column("qyplat -r lpar" + m + "lpar_id");
+            EXPECT_EQ(ids, column("qymove -r lpar" + m + "lpar_id"));  // callers pair the lines
+            if (ids.front() == "No results were found.") continue;
+
+            std::int64_t mem =
+                number(column("qyalloc -r mem --level sys" + m + "sys_firmware_mem")[0]);
+            for (const Record& lpar :
+                 recordsOf(run("qyalloc -r mem --level lpar" + m + "pend_mem,mem_mode").out)) {
+                if (lpar[1] == "ded") mem += number(lpar[0]);
+            }
+            const auto pool = column("qyalloc -r mempool" + m + "pend_pool_mem");
+            mem += number(pool[0]) +
+                   number(column("qyalloc -r mem --level sys" + m + "pend_avail_sys_mem")[0]);
+            EXPECT_EQ(column("qyalloc -r mem --level sys" + m + "configurable_sys_mem")[0],
+                      std::to_string(mem));
+
+            std::int64_t units = hundredths(
+                column("qyalloc -r proc --level sys" + m + "pend_avail_sys_proc_units")[0]);
+            for (const auto& text :
+                 column("qyalloc -r proc --level lpar" + m + "pend_proc_units")) {
+                units += hundredths(text);
+            }
+            EXPECT_EQ(hundredths(column("qyalloc -r proc --level sys" + m +
+                                        "configurable_sys_proc_units")[0]),
+                      units);
+        }
+    }
+}
+
+}  // namespace

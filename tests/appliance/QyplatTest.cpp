@@ -1,0 +1,192 @@
+// qyplat, and with it what all query tools have in common: options, filters, quoting, failures,
+// language. Every row runs the program.
+
+#include <gtest/gtest.h>
+
+#include "ToolRecords.h"
+
+namespace {
+
+using testing_support::Outcome;
+using testing_support::TestAppliance;
+
+class QyplatTest : public testing::Test {
+protected:
+    QyplatTest() { EXPECT_EQ(0, run("appliance init").exit); }
+    Outcome run(const std::string& command) { return m_appliance.run(command); }
+
+    TestAppliance m_appliance{ZEM_PROGRAMS};
+};
+
+TEST_F(QyplatTest, EveryAttributeAnswers) {
+    EXPECT_EQ(
+        "",
+        faultsOfTable(
+            m_appliance, "qyplat -r sys",
+            "name,type_model,serial_num,ipaddr,state,sys_time,power_off_policy,cod_mem_capable,"
+            "cod_proc_capable,micro_lpar_capable,osq00_capable,max_lpars,max_power_ctrl_lpars,"
+            "service_lpar_id,mfg_default_config,active_lpar_mobility_capable,"
+            "inactive_lpar_mobility_capable,lpar_proc_compat_mode_capable,lpar_proc_compat_modes,"
+            "virtual_io_server_capable,lhea_capable,virtual_switch_capable,"
+            "active_lpar_share_idle_procs_capable,bsr_capable,electronic_err_reporting_capable,"
+            "hca_capable,huge_page_mem_capable,lpar_avail_priority_capable,7460_application_"
+            "capable,"
+            "redundant_err_path_reporting_capable,shared_eth_failover_capable,"
+            "sni_msg_passing_capable,sp_failover_capable,vet_activation_capable,"
+            "assign_7460_wkl_percent,curr_sys_keylock,pend_sys_keylock,curr_power_on_side,"
+            "pend_power_on_side,curr_power_on_speed,pend_power_on_speed,curr_power_on_speed_"
+            "override,"
+            "pend_power_on_speed_override,power_on_type,power_on_option,pend_power_on_option,"
+            "power_on_method,power_on_attr,sp_boot_attr,sp_boot_major_type,sp_boot_minor_type,"
+            "sp_version,curr_mfg_default_ipl_source,pend_mfg_default_ipl_source,"
+            "curr_mfg_default_boot_mode,pend_mfg_default_boot_mode,sp_failover_enabled,"
+            "lpar_suspend_capable,coralhv_lpar_remote_restart_capable,max_suspend_capable_lpars,"
+            "max_remote_restart_capable_lpars,active_mem_sharing_capable"));
+    EXPECT_EQ("", faultsOfTable(
+                      m_appliance, "qyplat -r lpar",
+                      "lpar_id,name,lpar_env,state,resource_config,os_version,logical_serial_num,"
+                      "default_profile,curr_profile,work_group_id,shared_proc_pool_util_auth,"
+                      "allow_perf_collection,power_ctrl_lpar_ids,boot_mode,lpar_keylock,auto_start,"
+                      "desired_lpar_proc_compat_mode,curr_lpar_proc_compat_mode,migration_state,"
+                      "redundant_err_path_reporting,suspend_capable,remote_restart_capable,"
+                      "remote_restart_status"));
+    EXPECT_EQ(
+        "",
+        faultsOfTable(
+            m_appliance, "qyplat -r prof",
+            "lpar_id,lpar_name,name,lpar_env,all_resources,min_mem,desired_mem,max_mem,mem_mode,"
+            "mem_weight,desired_io_entitled_mem,primary_psp_id,primary_psp_name,secondary_psp_id,"
+            "secondary_psp_name,proc_mode,min_proc_units,desired_proc_units,max_proc_units,min_"
+            "procs,"
+            "desired_procs,max_procs,sharing_mode,uncap_weight,io_slots,load_source_slot,"
+            "alt_restart_device_slot,console_slot,alt_console_slot,op_console_slot,lpar_io_pool_"
+            "ids,"
+            "max_virtual_slots,virtual_serial_adapters,virtual_scsi_adapters,virtual_eth_adapters,"
+            "boot_mode,conn_monitoring,auto_start,power_ctrl_lpar_ids,shared_proc_pool_id,"
+            "lpar_proc_compat_mode,hca_adapters,work_group_id,redundant_err_path_reporting"));
+}
+
+TEST_F(QyplatTest, AnswersAndFailures) {
+    const ToolRow rows[] = {
+        // Which hosts.
+        {"qyplat -r sys -F name,type_model,serial_num", 0,
+         "alpha,1111-AAA,0000001\nbeta lab,1111-AAB,0000002\ngamma,1111-AAC,0000003\n"
+         "\"delta, spare\",1111-AAD,0000004\n",
+         ""},
+        {"qyplat -r sys -m '1111-AAC*0000003' -F state", 0, "Power Off\n", ""},
+        {"qyplat -r sys -m 'delta, spare' -F state,sys_time", 0, "No Connection,unavailable\n", ""},
+        {"qyplat -r lpar -m '' -F name | wc -l", 0, "14\n", ""},
+        {"qyplat -r lpar -m 'delta, spare'", 0, "No results were found.\n", ""},
+        {"LC_ALL=de_DE.UTF-8 qyplat -r lpar -m 'delta, spare'", 0, "No results were found.\n", ""},
+        // Order of fields and records, quoting.
+        {"qyplat -m gamma -F state,lpar_id,lpar_id -r lpar", 0,
+         "Not Activated,1,1\nNot Activated,2,2\nNot Activated,7,7\n", ""},
+        {"qyplat -r lpar -m alpha -F name,lpar_env", 0,
+         "xbrg1,xbrgserver\nxbrg2,xbrgserver\nweb server,tmxlinux\n\"db,main\",tmxlinux\n"
+         "\"say \"\"hi\"\"\",tmxlinux\nBüro-Prüfstand,osq00\ntraveller,tmxlinux\n",
+         ""},
+        {"qyplat -r prof -m alpha --filter lpar_ids=4 -F virtual_eth_adapters,lpar_name,name", 0,
+         "\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/storage\"\"\",\"db,main\",normal\n"
+         "\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/storage\"\"\",\"db,main\","
+         "\"small, \"\"safe\"\"\"\n",
+         ""},
+        {"qyplat -r prof -m alpha --filter lpar_ids=2 -F virtual_scsi_adapters,io_slots", 0,
+         "\"\"\"14/server/4/db,main/3/0\"\",17/server/7/traveller/3/0\","
+         "\"30000003/none/1,30000004/none/0\"\n",
+         ""},
+        {"qyplat -r prof -m gamma --filter lpar_ids=7 -F virtual_serial_adapters,io_slots", 0,
+         "\"0/server/1/any//any/1,1/server/1/any//any/1\",none\n", ""},
+        {"qyplat -r lpar -m gamma --filter lpar_ids=7 | cut -d, -f1-3", 0,
+         "lpar_id=7,name=my-test,lpar_env=tmxlinux\n", ""},
+        {"qyplat -r lpar -m alpha --filter lpar_ids=4 | cut -d, -f2,3", 0, "\"name=db,main\"\n",
+         ""},
+        // Filters.
+        {"qyplat -r lpar -m alpha --filter lpar_ids=7,2 -F lpar_id", 0, "2\n7\n", ""},
+        {"qyplat -r lpar -m alpha --filter '\"lpar_ids=7,2\"' -F lpar_id", 0, "2\n7\n", ""},
+        {"qyplat -r lpar --filter '\"lpar_names=xbrg,traveller\",lpar_ids=2' -F name", 0,
+         "traveller\n", ""},
+        {"qyplat -r lpar --filter 'lpar_names=db,main' -F lpar_id", 0, "4\n", ""},
+        {"qyplat -r lpar --filter 'lpar_names=xbrg1,db,main,web server' -F lpar_id", 0, "1\n3\n4\n",
+         ""},
+        {"qyplat -r lpar --filter 'lpar_names=\"db,main\",xbrg2' -F lpar_id", 0, "2\n4\n", ""},
+        {"qyplat -r lpar --filter '\"lpar_names=\"\"db,main\"\",xbrg2\"' -F lpar_id", 0, "2\n4\n",
+         ""},
+        {"qyplat -r lpar --filter 'lpar_names=say \"hi\"' -F lpar_id", 0, "5\n", ""},
+        {"qyplat -r lpar --filter 'lpar_names=東京, \"本番\"' -F lpar_id", 0, "3\n", ""},
+        {"qyplat -r lpar --filter lpar_envs=osq00 -F name", 0, "Büro-Prüfstand\nosq dev\n", ""},
+        {"qyplat -r lpar --filter '' -F name | wc -l", 0, "14\n", ""},
+        {"qyplat -r prof --filter 'lpar_ids=4,profile_names=small, \"safe\"' -F desired_mem", 0,
+         "8192\n", ""},
+        {"qyplat -r prof -m gamma --filter lpar_ids=7,profile_names=my-prof -F name", 0,
+         "my-prof\n", ""},
+        {"qyplat -r prof -m gamma --filter lpar_ids=7,profile_names=other -F name", 0,
+         "No results were found.\n", ""},
+        // What is not there.
+        {"qyplat -r lpar -m omega", 1, "",
+         "WRTL8018 The managed system \"omega\" was not found.\n"},
+        {"qyplat -r sys -m 1111-AAA", 1, "",
+         "WRTL8018 The managed system \"1111-AAA\" was not found.\n"},
+        {"qyplat -r lpar -m gamma --filter lpar_ids=1,3", 1, "",
+         "WRTL8011 The partition with the ID 3 was not found.\n"},
+        {"qyplat -r prof -m gamma --filter '\"lpar_ids=,1\"'", 1, "",
+         "WRTL8011 The partition with the ID  was not found.\n"},
+        {"qyplat -r lpar --filter 'lpar_names=db,ma in'", 1, "",
+         "WRTL8010 The partition with the name \"db\" was not found.\n"},
+        {"LC_ALL=de_DE.UTF-8 qyplat -r lpar -m omega", 1, "",
+         "WRTL8018 Das verwaltete System \"omega\" wurde nicht gefunden.\n"},
+        {"LC_ALL= LC_MESSAGES= LANG=de qyplat -r lpar -m omega", 1, "",
+         "WRTL8018 Das verwaltete System \"omega\" wurde nicht gefunden.\n"},
+        {"LC_ALL=C LANG=de_DE qyplat -r lpar -m omega", 1, "",
+         "WRTL8018 The managed system \"omega\" was not found.\n"},
+        // What is wrong with the line.
+        {"qyplat", 2, "", "WRTL1003 The option -r is missing.\n"},
+        {"qyplat -r frame", 2, "", "WRTL1004 The option -r cannot have the value \"frame\".\n"},
+        {"qyplat -r sys -x", 2, "", "WRTL1001 The option -x is not known.\n"},
+        {"qyplat -r sys --level sys", 2, "", "WRTL1001 The option --level is not known.\n"},
+        {"qyplat -r sys -m", 2, "", "WRTL1002 The option -m needs a value.\n"},
+        {"qyplat -r sys -r lpar", 2, "", "WRTL1005 The option -r is given more than once.\n"},
+        {"qyplat -r sys name", 2, "", "WRTL1006 The argument \"name\" belongs to no option.\n"},
+        {"qyplat -r lpar -F name,nmae", 2, "", "WRTL1007 The attribute \"nmae\" is not known.\n"},
+        {"qyplat -r sys -F lpar_id", 2, "", "WRTL1007 The attribute \"lpar_id\" is not known.\n"},
+        {"qyplat -r sys -F name,", 2, "", "WRTL1007 The attribute \"\" is not known.\n"},
+        {"qyplat -r lpar --filter ids=1", 2, "", "WRTL1008 The filter \"ids\" is not known.\n"},
+        {"qyplat -r lpar --filter lpar_ids=1,ids=1", 2, "",
+         "WRTL1008 The filter \"ids\" is not known.\n"},
+        {"qyplat -r lpar --filter 4", 2, "",
+         "WRTL1009 The filter \"4\" is not of the form name=value.\n"},
+        {"qyplat -r lpar --filter =4", 2, "",
+         "WRTL1009 The filter \"=4\" is not of the form name=value.\n"},
+        {"LC_ALL=de_AT qyplat -r lpar --filter ids=1", 2, "",
+         "WRTL1008 Der Filter \"ids\" ist nicht bekannt.\n"},
+        {"APPLIANCE_HOME= qyplat -r sys", 3, "",
+         "WRTL2001 The environment variable APPLIANCE_HOME does not name the appliance's "
+         "folder.\n"},
+        {"qyplat -r sys >/dev/full", 4, "",
+         "WRTL2007 The output cannot be written: No space left on device.\n"},
+        {"qyplat -r sys >&-", 4, "",
+         "WRTL2007 The output cannot be written: Bad file descriptor.\n"},
+    };
+    expectRows(m_appliance, rows);
+}
+
+TEST_F(QyplatTest, HelpIsCompleteInBothLanguages) {
+    const std::string english = run("APPLIANCE_HOME= qyplat --help").out;
+    const std::string german = run("LC_ALL=de_DE.UTF-8 qyplat --help").out;
+    for (const char* word :
+         {"-r prof", "--filter", "profile_names", "redundant_err_path_reporting"}) {
+        EXPECT_NE(std::string::npos, english.find(word)) << word;
+        EXPECT_NE(std::string::npos, german.find(word)) << word;
+    }
+    EXPECT_EQ(0U, english.find("Usage: qyplat"));
+    EXPECT_EQ(0U, german.find("Aufruf: qyplat"));
+}
+
+TEST_F(QyplatTest, AReaderThatLeavesIsAFailureAndNoSignal) {
+    ASSERT_EQ(0, run("appliance generate --force --hosts 1 --lpars 1500").exit);
+    const Outcome outcome =
+        run("{ qyplat -r prof -F; echo $? >\"$APPLIANCE_HOME/status\"; } | head -c 1");
+    EXPECT_EQ("WRTL2007 The output cannot be written: Broken pipe.\n", outcome.err);
+    EXPECT_EQ("4\n", run("cat \"$APPLIANCE_HOME/status\"").out);
+}
+
+}  // namespace

@@ -1,0 +1,188 @@
+// The broker's operating system services and memory functions.
+
+#include <pthread.h>
+
+#include <cstdint>
+#include <cstdlib>
+#include <cstring>
+#include <ctime>
+
+#include "Broker.h"
+#include "Provider.h"
+
+namespace cimom {
+
+namespace {
+
+// -- threads ----------------------------------------------------------------------------------
+
+static_assert(sizeof(pthread_t) <= sizeof(void*), "a thread's name fits a pointer");
+static_assert(sizeof(pthread_key_t) == sizeof(CMPI_THREAD_KEY_TYPE), "keys are the system's");
+
+pthread_t threadOf(CMPI_THREAD_TYPE thread) { return reinterpret_cast<pthread_t>(thread); }
+pthread_mutex_t* mutexOf(CMPI_MUTEX_TYPE mutex) { return static_cast<pthread_mutex_t*>(mutex); }
+pthread_cond_t* conditionOf(CMPI_COND_TYPE cond) { return static_cast<pthread_cond_t*>(cond); }
+
+char* resolveFileName(const char* name) { return strdup(libraryFileName(textOf(name)).c_str()); }
+CMPI_THREAD_TYPE newThread(CMPI_THREAD_RETURN (*start)(void*), void* parm, int detached) {
+    pthread_t thread{};
+    if (pthread_create(&thread, nullptr, start, parm) != 0) return nullptr;
+    if (detached) pthread_detach(thread);
+    return reinterpret_cast<CMPI_THREAD_TYPE>(thread);
+}
+int joinThread(CMPI_THREAD_TYPE thread, CMPI_THREAD_RETURN* answer) {
+    return pthread_join(threadOf(thread), answer);
+}
+int exitThread(CMPI_THREAD_RETURN code) { pthread_exit(code); }
+int cancelThread(CMPI_THREAD_TYPE thread) { return pthread_cancel(threadOf(thread)); }
+int threadSleep(CMPIUint32 milliseconds) {
+    timespec left{static_cast<time_t>(milliseconds / 1000),
+                  static_cast<long>(milliseconds % 1000) * 1000000};
+    return nanosleep(&left, nullptr);
+}
+int threadOnce(int* once, void (*init)()) {
+    // One lock for all, recursive since an init may need another one done first.
+    static std::recursive_mutex mutex;
+    std::lock_guard<std::recursive_mutex> lock(mutex);
+    if (*once == 0) {
+        *once = 1;
+        init();
+    }
+    return 0;
+}
+int createThreadKey(CMPI_THREAD_KEY_TYPE* key, void (*cleanup)(void*)) {
+    return pthread_key_create(key, cleanup);
+}
+int destroyThreadKey(CMPI_THREAD_KEY_TYPE key) { return pthread_key_delete(key); }
+void* getThreadSpecific(CMPI_THREAD_KEY_TYPE key) { return pthread_getspecific(key); }
+int setThreadSpecific(CMPI_THREAD_KEY_TYPE key, void* value) {
+    return pthread_setspecific(key, value);
+}
+
+// -- mutexes and conditions -------------------------------------------------------------------
+
+CMPI_MUTEX_TYPE newMutex(int) {
+    auto* mutex = new pthread_mutex_t;
+    pthread_mutex_init(mutex, nullptr);
+    return mutex;
+}
+void destroyMutex(CMPI_MUTEX_TYPE mutex) {
+    pthread_mutex_destroy(mutexOf(mutex));
+    delete mutexOf(mutex);
+}
+void lockMutex(CMPI_MUTEX_TYPE mutex) { pthread_mutex_lock(mutexOf(mutex)); }
+void unlockMutex(CMPI_MUTEX_TYPE mutex) { pthread_mutex_unlock(mutexOf(mutex)); }
+CMPI_COND_TYPE newCondition(int) {
+    auto* condition = new pthread_cond_t;
+    pthread_cond_init(condition, nullptr);
+    return condition;
+}
+void destroyCondition(CMPI_COND_TYPE condition) {
+    pthread_cond_destroy(conditionOf(condition));
+    delete conditionOf(condition);
+}
+int condWait(CMPI_COND_TYPE condition, CMPI_MUTEX_TYPE mutex) {
+    return pthread_cond_wait(conditionOf(condition), mutexOf(mutex));
+}
+int timedCondWait(CMPI_COND_TYPE condition, CMPI_MUTEX_TYPE mutex, timespec* until) {
+    return pthread_cond_timedwait(conditionOf(condition), mutexOf(mutex), until);
+}
+int signalCondition(CMPI_COND_TYPE condition) {
+    return pthread_cond_signal(conditionOf(condition));
+}
+
+// -- memory -----------------------------------------------------------------------------------
+
+CMPIGcStat* mark(const CMPIBroker* mb, CMPIStatus* rc) {
+    return brokerEntry(mb, rc, [](Broker& broker) -> CMPIGcStat* {
+        Activation* activation = Activation::current(broker);
+        if (!activation) throw Failure(CMPI_RC_ERR_FAILED, "no request on this thread");
+        return const_cast<void*>(activation->pool().mark());
+    });
+}
+CMPIStatus release(const CMPIBroker* mb, const CMPIGcStat* level) {
+    return brokerStatus(mb, [level](Broker& broker) {
+        Activation* activation = Activation::current(broker);
+        if (!activation || !activation->pool().release(level))
+            throw Failure(CMPI_RC_ERR_FAILED, "no such mark in the request of this thread");
+    });
+}
+
+void* allocate(const CMPIBroker* mb, void* old, std::size_t size, bool zeroed) {
+    return brokerEntry(mb, nullptr,
+                       [=](Broker& broker) { return broker.allocate(old, size, zeroed); });
+}
+void* cmpiMalloc(const CMPIBroker* mb, std::size_t size) {
+    return allocate(mb, nullptr, size, false);
+}
+void* cmpiCalloc(const CMPIBroker* mb, std::size_t count, std::size_t size) {
+    const bool overflows = size != 0 && count > SIZE_MAX / size;
+    return overflows ? nullptr : allocate(mb, nullptr, count * size, true);
+}
+void* cmpiRealloc(const CMPIBroker* mb, void* block, std::size_t size) {
+    return allocate(mb, block, size, false);
+}
+char* cmpiStrDup(const CMPIBroker* mb, const char* text) {
+    const std::size_t size = text ? std::strlen(text) + 1 : 0;
+    void* block = text ? cmpiMalloc(mb, size) : nullptr;
+    return static_cast<char*>(block ? std::memcpy(block, text, size) : nullptr);
+}
+void cmpiFree(const CMPIBroker* mb, void* block) {
+    brokerEntry(mb, nullptr, [block](Broker& broker) { broker.freeBlock(block); });
+}
+
+template <class C>
+void freeObject(const CMPIBroker*, C* object) {
+    releaseObject(object);
+}
+
+}  // namespace
+
+CMPIBrokerExtFT extensionTable(bool lean) {
+    return {lean ? 1 : CMPIVersion200,
+            resolveFileName,
+            newThread,
+            joinThread,
+            exitThread,
+            cancelThread,
+            threadSleep,
+            threadOnce,
+            createThreadKey,
+            destroyThreadKey,
+            getThreadSpecific,
+            setThreadSpecific,
+            newMutex,
+            destroyMutex,
+            lockMutex,
+            unlockMutex,
+            newCondition,
+            destroyCondition,
+            condWait,
+            timedCondWait,
+            signalCondition};
+}
+
+CMPIBrokerMemFT memoryTable(bool lean) {
+    CMPIBrokerMemFT table = {CMPIVersion200,
+                             mark,
+                             release,
+                             cmpiMalloc,
+                             cmpiCalloc,
+                             cmpiRealloc,
+                             cmpiStrDup,
+                             cmpiFree,
+                             freeObject<CMPIInstance>,
+                             freeObject<CMPIObjectPath>,
+                             freeObject<CMPIArgs>,
+                             freeObject<CMPIString>,
+                             freeObject<CMPIArray>,
+                             freeObject<CMPIDateTime>,
+                             freeObject<CMPISelectExp>};
+    if (lean) {
+        table.ftVersion = 0;
+        endTableAfter(table, &CMPIBrokerMemFT::release);
+    }
+    return table;
+}
+
+}  // namespace cimom

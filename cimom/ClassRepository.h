@@ -1,0 +1,189 @@
+/// The CIM classes that this object manager knows, read from MOF and then never changed.
+///
+///     auto classes = cimom::ClassRepository::load("providers/mof/zem.mof");
+///     if (const cimom::CimClass* cls = classes->findClass("orxc_lpar_cs")) {
+///         for (const auto& property : cls->properties) use(property->name, property->type);
+///         bool system = classes->isA("ORXC_LPAR_CS", "CIM_System");
+///     }
+///
+/// Names of classes, properties, methods, parameters and qualifiers are found by hash and
+/// without regard to ASCII case; they are stored as declared. Everything reached from a
+/// repository is owned by it and lives as long as it does. A loaded repository is immutable:
+/// any number of threads may use it at once, without a lock.
+#ifndef CIMOM_CLASS_REPOSITORY_H
+#define CIMOM_CLASS_REPOSITORY_H
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <utility>
+#include <variant>
+#include <vector>
+
+#include "MofParser.h"
+
+namespace cimom {
+
+/// Named things in the order in which they were added, found by name in constant time.
+///
+/// A copy shares its elements with the original. T has a member `name`, fixed once added.
+template <class T>
+class NamedList {
+public:
+    using Item = std::shared_ptr<const T>;
+
+    /// Appends @p item; false, and nothing is added, when its name is already taken.
+    bool add(Item item) {
+        if (!m_index.emplace(item->name, m_items.size()).second) return false;
+        m_items.push_back(std::move(item));
+        return true;
+    }
+    /// Puts @p item in the place of the element of its name, or appends it.
+    void put(Item item) {
+        auto found = m_index.find(item->name);
+        if (found == m_index.end()) {
+            add(std::move(item));
+            return;
+        }
+        std::size_t position = found->second;
+        m_index.erase(found);  // its key views the name of the element that goes
+        m_index.emplace(item->name, position);
+        m_items[position] = std::move(item);
+    }
+    /// The element of that name, or null.
+    const T* find(std::string_view name) const {
+        auto found = m_index.find(name);
+        return found == m_index.end() ? nullptr : m_items[found->second].get();
+    }
+    std::size_t size() const { return m_items.size(); }
+    bool empty() const { return m_items.empty(); }
+    const T& operator[](std::size_t i) const { return *m_items[i]; }
+    auto begin() const { return m_items.begin(); }
+    auto end() const { return m_items.end(); }
+
+private:
+    std::vector<Item> m_items;
+    std::unordered_map<std::string_view, std::size_t, NameHash, NameEqual> m_index;
+};
+
+/// One element of a value. monostate is NULL; uintN and char16 are held as uint64_t, sintN as
+/// int64_t, realN as double; string, datetime and references as text.
+using CimScalar =
+    std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, std::string>;
+
+/// A value that fits its declared type; a null pointer is NULL. A scalar has exactly one element.
+/// Values are shared between a declaration and those that inherit it.
+using CimValue = std::shared_ptr<const std::vector<CimScalar>>;
+
+struct CimQualifier {
+    std::string name;
+    CimType type = CimType::Boolean;
+    bool isArray = false;
+    CimValue value;
+    unsigned flavors = 0;       ///< MofFlavor bits in effect here
+    bool isPropagated = false;  ///< came down from the superclass's element
+};
+
+struct CimQualifierType {
+    std::string name;
+    CimType type = CimType::Boolean;
+    bool isArray = false;
+    CimValue value;       ///< default
+    unsigned scopes = 0;  ///< MofScope bits
+    unsigned flavors = 0;
+};
+
+/// What properties, parameters and methods (by what they return) have in common.
+struct CimElement {
+    std::string name;
+    CimType type = CimType::Boolean;
+    bool isArray = false;
+    std::uint32_t arraySize = 0;         ///< 0: any number of elements
+    std::string referenceClass;          ///< of a Reference; else empty
+    bool isEmbeddedObject = false;       ///< a String that carries an instance, or a class
+    std::string embeddedClass;           ///< class of the embedded instances; empty: any class
+    NamedList<CimQualifier> qualifiers;  ///< own ones and those propagated
+
+    /// Value of a boolean qualifier, or @p otherwise when it is absent or NULL.
+    bool flag(std::string_view qualifier, bool otherwise = false) const;
+};
+
+struct CimParameter : CimElement {
+    bool isIn = true;
+    bool isOut = false;
+};
+
+struct CimProperty : CimElement {
+    bool isKey = false;
+    CimValue defaultValue;
+    std::string originClass;     ///< class that introduced the name
+    std::string declaringClass;  ///< class whose declaration this is: origin, or an override
+};
+
+struct CimMethod : CimElement {
+    NamedList<CimParameter> parameters;
+    std::string originClass;
+    std::string declaringClass;
+};
+
+/// A class with all that it inherits. Inherited features come first, in the superclass's order.
+struct CimClass {
+    std::string name;
+    const CimClass* superclass = nullptr;     ///< null for a root
+    std::vector<const CimClass*> lineage;     ///< root first, this class last
+    std::vector<const CimClass*> subclasses;  ///< direct ones, in order of declaration
+    std::vector<const CimProperty*> keys;     ///< key properties
+    bool isAssociation = false;
+    bool isIndication = false;
+    bool isAbstract = false;
+    NamedList<CimQualifier> qualifiers;
+    NamedList<CimProperty> properties;  ///< references included
+    NamedList<CimMethod> methods;
+
+    /// True when this is @p base or descends from it. Constant time.
+    bool isA(const CimClass& base) const;
+    /// All classes below this one, parents before children; without this class.
+    std::vector<const CimClass*> allSubclasses() const;
+};
+
+class ClassRepository {
+public:
+    /// Which features a printed class shows.
+    enum class Features { Own, All };
+
+    /// Reads the MOF file @p path and all that it includes.
+    ///
+    /// Superclasses and referenced classes may be declared after their use. Instance
+    /// declarations are parsed and dropped: instances come from providers alone.
+    /// @throws MofError with the first fault of form, or every fault of meaning (up to a limit)
+    static std::shared_ptr<const ClassRepository> load(const std::string& path,
+                                                       const MofReader& reader = readMofFile);
+
+    /// The class, or null.
+    const CimClass* findClass(std::string_view name) const { return m_classes.find(name); }
+
+    /// True when both classes exist and @p name is @p base or descends from it.
+    bool isA(std::string_view name, std::string_view base) const;
+
+    /// All classes, each after its superclass.
+    const NamedList<CimClass>& classes() const { return m_classes; }
+    const NamedList<CimQualifierType>& qualifierTypes() const { return m_qualifierTypes; }
+
+    /// The class as MOF text, which load() reads again given the class's surroundings.
+    /// Own shows what the class itself declared, All what it inherits too.
+    std::string toMof(const CimClass& cls, Features features = Features::Own) const;
+
+private:
+    friend class ClassLinker;
+    ClassRepository() = default;
+
+    NamedList<CimClass> m_classes;
+    NamedList<CimQualifierType> m_qualifierTypes;
+};
+
+}  // namespace cimom
+
+#endif

@@ -1,0 +1,236 @@
+#include "Commands.h"
+
+#include <algorithm>
+#include <condition_variable>
+#include <csignal>
+#include <ctime>
+
+#include "Classes.h"
+#include "Failure.h"
+#include "PathText.h"
+
+namespace cimom {
+
+namespace {
+
+ObjectPath readPath(const Session& session, const std::string& text) {
+    ObjectPath path = parsePath(text);
+    if (path.nameSpace.empty()) path.nameSpace = session.request.nameSpace;
+    return session.classes ? typedKeys(path, *session.classes) : path;
+}
+
+const CimClass* classOf(const Session& session, const ObjectPath& path) {
+    return session.classes ? session.classes->findClass(path.className) : nullptr;
+}
+
+/// The value of an element, typed as declared; guessed when its class is not known.
+Value readValue(const Session& session, const CimElement* declared, const std::string& text) {
+    return declared ? parseValue(text, typeOf(*declared), session.classes) : guessValue(text);
+}
+
+/// Values given as name=value.
+/// @param declared  elements that there are; null when nothing is known of them
+template <class T>
+NamedValues readAssignments(const Session& session, const NamedList<T>* declared,
+                            const std::vector<std::string>& assignments) {
+    NamedValues values;
+    for (const std::string& text : assignments) {
+        const std::size_t equals = text.find('=');
+        if (equals == 0 || equals == std::string::npos)
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + text + "' is not name=value");
+        const std::string name = text.substr(0, equals);
+        const T* element = declared ? declared->find(name) : nullptr;
+        if (declared && !element)
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "there is no '" + name + "' to set");
+        values.set(element ? element->name : name,
+                   readValue(session, element, text.substr(equals + 1)));
+    }
+    return values;
+}
+
+/// Prints what a reply holds, failure or not: of several providers some may have answered.
+Reply printed(Session& session, Reply reply, bool instances) {
+    const std::string text =
+        instances ? render(reply.instances, session.format) : render(reply.paths, session.format);
+    const bool nothing = reply.instances.empty() && reply.paths.empty();
+    if (reply.ok() || !nothing) session.out.write(text);
+    return reply;
+}
+
+// -- instances --------------------------------------------------------------------------------
+
+Reply enumInstances(Session& session, const Arguments& arguments) {
+    const ObjectPath path = readPath(session, arguments.object);
+    return printed(session, session.server.enumInstances(session.request, path), true);
+}
+Reply enumInstanceNames(Session& session, const Arguments& arguments) {
+    const ObjectPath path = readPath(session, arguments.object);
+    return printed(session, session.server.enumInstanceNames(session.request, path), false);
+}
+Reply getInstance(Session& session, const Arguments& arguments) {
+    const ObjectPath path = readPath(session, arguments.object);
+    return printed(session, session.server.getInstance(session.request, path), true);
+}
+
+Instance readInstance(const Session& session, const Arguments& arguments) {
+    Instance instance(readPath(session, arguments.object));
+    const CimClass* cls = classOf(session, instance.path);
+    instance.properties =
+        readAssignments(session, cls ? &cls->properties : nullptr, arguments.assignments);
+    return instance;
+}
+Reply createInstance(Session& session, const Arguments& arguments) {
+    Instance instance = readInstance(session, arguments);
+    if (const CimClass* cls = classOf(session, instance.path))
+        for (const CimProperty* key : cls->keys)
+            if (const Value* value = instance.properties.find(key->name))
+                instance.path.keys.set(key->name, *value);
+    return printed(session, session.server.createInstance(session.request, instance), false);
+}
+Reply modifyInstance(Session& session, const Arguments& arguments) {
+    const Instance instance = readInstance(session, arguments);
+    Request request = session.request;
+    request.properties.emplace();
+    for (const auto& each : instance.properties) request.properties->push_back(each.name);
+    return session.server.modifyInstance(request, instance);
+}
+Reply deleteInstance(Session& session, const Arguments& arguments) {
+    return session.server.deleteInstance(session.request, readPath(session, arguments.object));
+}
+
+// -- associations -----------------------------------------------------------------------------
+
+using AssociationOperation = Reply (Server::*)(const Request&, const ObjectPath&,
+                                               const AssociationFilter&);
+
+template <AssociationOperation Operation, bool Instances>
+Reply navigate(Session& session, const Arguments& arguments) {
+    const ObjectPath path = readPath(session, arguments.object);
+    return printed(session, (session.server.*Operation)(session.request, path, arguments.filter),
+                   Instances);
+}
+
+// -- methods and properties -------------------------------------------------------------------
+
+Reply invokeMethod(Session& session, const Arguments& arguments) {
+    const ObjectPath path = readPath(session, arguments.object);
+    const CimClass* cls = classOf(session, path);
+    const CimMethod* method = cls ? cls->methods.find(arguments.name) : nullptr;
+    if (cls && !method)
+        throw Failure(CMPI_RC_ERR_METHOD_NOT_FOUND,
+                      "class " + cls->name + " has no method " + arguments.name);
+    const NamedValues in =
+        readAssignments(session, method ? &method->parameters : nullptr, arguments.assignments);
+    Reply reply = session.server.invokeMethod(session.request, path, arguments.name, in);
+    if (reply.ok()) session.out.write(renderMethod(reply, session.format));
+    return reply;
+}
+Reply getProperty(Session& session, const Arguments& arguments) {
+    Reply reply = session.server.getProperty(session.request, readPath(session, arguments.object),
+                                             arguments.name);
+    if (reply.ok()) session.out.write(render(reply.value(), session.format));
+    return reply;
+}
+Reply setProperty(Session& session, const Arguments& arguments) {
+    const ObjectPath path = readPath(session, arguments.object);
+    const CimClass* cls = classOf(session, path);
+    const CimProperty* property = cls ? cls->properties.find(arguments.name) : nullptr;
+    if (cls && !property)
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
+                      "class " + cls->name + " has no property " + arguments.name);
+    return session.server.setProperty(session.request, path, arguments.name,
+                                      readValue(session, property, arguments.value));
+}
+
+// -- classes ----------------------------------------------------------------------------------
+
+const ClassRepository& repository(const Session& session) {
+    if (!session.classes)
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED, "no classes are known without --schema");
+    return *session.classes;
+}
+const CimClass& knownClass(const Session& session, const std::string& name) {
+    const CimClass* cls = repository(session).findClass(name);
+    if (!cls) throw Failure(CMPI_RC_ERR_INVALID_CLASS, "no class " + name);
+    return *cls;
+}
+Reply getClass(Session& session, const Arguments& arguments) {
+    const CimClass& cls = knownClass(session, arguments.object);
+    const std::string mof = repository(session).toMof(cls, ClassRepository::Features::All);
+    session.out.write(session.format == Format::Json ? render(Value(mof), session.format) : mof);
+    return {};
+}
+Reply enumClasses(Session& session, const Arguments& arguments) {
+    std::vector<std::string> names;
+    if (arguments.object.empty()) {
+        for (const auto& cls : repository(session).classes()) names.push_back(cls->name);
+    } else {
+        for (const CimClass* cls : knownClass(session, arguments.object).allSubclasses())
+            names.push_back(cls->name);
+    }
+    session.out.write(render(names, session.format));
+    return {};
+}
+
+// -- indications ------------------------------------------------------------------------------
+
+// Until a signal asks to end, or enough indications have come, or nobody reads them.
+Reply watch(Session& session, const Arguments& arguments) {
+    const std::string query = arguments.query.find(' ') == std::string::npos
+                                  ? "SELECT * FROM " + arguments.query
+                                  : arguments.query;
+    sigset_t ends;
+    sigemptyset(&ends);
+    for (int signal : {SIGINT, SIGTERM, SIGUSR1}) sigaddset(&ends, signal);
+    // Threads that providers start inherit the mask, and so leave these signals to sigwait.
+    pthread_sigmask(SIG_BLOCK, &ends, nullptr);
+    const pthread_t waiting = pthread_self();
+
+    std::size_t seen = 0;  // the handler runs one indication at a time
+    Server::SubscriptionId id = 0;
+    Reply reply = session.server.subscribe(
+        session.request, query, arguments.queryLanguage,
+        [&](const Indication& indication) {
+            if (arguments.count != 0 && seen == arguments.count) return;
+            ++seen;
+            const bool read = session.out.write(renderEvent(indication, session.format));
+            if (!read || seen == arguments.count) pthread_kill(waiting, SIGUSR1);
+        },
+        id);
+    if (!reply.ok()) return reply;
+    int signal = 0;
+    sigwait(&ends, &signal);
+    return session.server.unsubscribe(session.request, id);
+}
+
+}  // namespace
+
+const std::vector<Verb>& verbs() {
+    static const std::vector<Verb> rows = {
+        {"ei", "Enumerate the instances of a class", Takes::Class, true, enumInstances},
+        {"ein", "Enumerate the paths of the instances of a class", Takes::Class, false,
+         enumInstanceNames},
+        {"gi", "Get an instance", Takes::Path, true, getInstance},
+        {"ci", "Create an instance and print its path", Takes::ClassAndValues, false,
+         createInstance},
+        {"mi", "Modify properties of an instance", Takes::PathAndValues, false, modifyInstance},
+        {"di", "Delete an instance", Takes::Path, false, deleteInstance},
+        {"ai", "Get the instances associated with an instance", Takes::Navigation, true,
+         navigate<&Server::associators, true>},
+        {"ain", "Get the paths of the instances associated with an instance", Takes::Navigation,
+         false, navigate<&Server::associatorNames, false>},
+        {"ri", "Get the associations that refer to an instance", Takes::Navigation, true,
+         navigate<&Server::references, true>},
+        {"rin", "Get the paths of the associations that refer to an instance", Takes::Navigation,
+         false, navigate<&Server::referenceNames, false>},
+        {"im", "Invoke a method", Takes::Method, false, invokeMethod},
+        {"gp", "Get a property of an instance", Takes::Property, false, getProperty},
+        {"sp", "Set a property of an instance", Takes::PropertyAndValue, false, setProperty},
+        {"gc", "Print the declaration of a class", Takes::Class, false, getClass},
+        {"ec", "List all classes, or those below one", Takes::OptionalClass, false, enumClasses},
+        {"watch", "Print indications until interrupted", Takes::Filter, false, watch},
+    };
+    return rows;
+}
+
+}  // namespace cimom

@@ -1,0 +1,62 @@
+/// The verbs of the command line, one row each.
+#ifndef CIMOM_COMMANDS_H
+#define CIMOM_COMMANDS_H
+
+#include <cstddef>
+#include <string>
+#include <vector>
+
+#include "Output.h"
+#include "Server.h"
+
+namespace cimom {
+
+/// What stands behind a verb, as text.
+struct Arguments {
+    std::string object;  ///< class or path
+    std::string name;    ///< method or property
+    std::string value;
+    std::vector<std::string> assignments;  ///< name=value
+    AssociationFilter filter;
+    std::string query;
+    std::string queryLanguage = "WQL";
+    std::size_t count = 0;  ///< indications to wait for; 0 for any number
+};
+
+/// Everything that a verb works with.
+struct Session {
+    Server& server;
+    Request request;
+    const ClassRepository* classes;
+    Format format;
+    ResultStream& out;
+};
+
+/// What a verb takes; the command line is made from it.
+enum class Takes {
+    Class,
+    OptionalClass,
+    Path,
+    ClassAndValues,
+    PathAndValues,
+    Navigation,
+    Method,
+    Property,
+    PropertyAndValue,
+    Filter
+};
+
+struct Verb {
+    const char* name;
+    const char* help;
+    Takes takes;
+    bool propertyList;  ///< has --properties
+    Reply (*run)(Session& session, const Arguments& arguments);
+};
+
+/// All verbs, in the order of --help.
+const std::vector<Verb>& verbs();
+
+}  // namespace cimom
+
+#endif

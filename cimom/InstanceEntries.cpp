@@ -1,0 +1,169 @@
+// Entries of CMPIInstance, and the rules by which the class of an instance checks its properties.
+
+#include <algorithm>
+
+#include "NamedEntries.h"
+#include "PathText.h"
+
+namespace cimom {
+
+namespace {
+
+const CimProperty* declared(const InstanceBody& body, const std::string& name) {
+    return body.cls ? body.cls->properties.find(name) : nullptr;
+}
+
+// Without its class, an instance has the keys of its path.
+bool isKey(const InstanceBody& body, const std::string& name) {
+    if (!body.cls) return body.value.path.keys.find(name) != nullptr;
+    const CimProperty* element = declared(body, name);
+    return element && element->isKey;
+}
+
+bool passesFilter(const InstanceBody& body, const std::string& name) {
+    return !body.filter ||
+           std::any_of(body.filter->begin(), body.filter->end(),
+                       [&](const std::string& each) { return sameName(each, name); });
+}
+
+// An embedded instance may also come as a text that shows it.
+bool typeAgrees(const CimProperty& element, const Value& value) {
+    if (value.type() == typeOf(element)) return true;
+    const auto bare = [](CMPIType type) { return static_cast<CMPIType>(type & ~CMPI_ARRAY); };
+    return value.isArray() == ((typeOf(element) & CMPI_ARRAY) != 0) &&
+           bare(typeOf(element)) == CMPI_instance && bare(value.type()) == CMPI_string;
+}
+
+// The value as the class declares it; @p element is null when it has no such property.
+Value checked(bool lean, const InstanceBody& body, const CimProperty* element,
+              const std::string& name, Value value) {
+    if (!element) {
+        if (lean) return value;
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
+                      "class " + body.cls->name + " has no property " + name);
+    }
+    value.retypeNull(typeOf(*element));
+    if (typeAgrees(*element, value)) return value;
+    Value converted;
+    if (lean) return value.convertTo(typeOf(*element), converted) ? converted : value;
+    throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, "property " + body.cls->name + "." + name + " is " +
+                                                 typeName(typeOf(*element)) + ", not " +
+                                                 typeName(value.type()));
+}
+
+// The keys of the path become properties, typed by the class. What the class does not have, or
+// not so, stays in the path alone: that a path is wrong is for the provider to say.
+void takeKeys(InstanceBody& body) {
+    NamedValues& keys = body.value.path.keys;
+    for (const auto& [name, value] : NamedValues(keys)) {
+        Value typed = value;
+        if (body.cls) {
+            const CimProperty* element = declared(body, name);
+            if (!element || !value.convertTo(typeOf(*element), typed)) continue;
+        }
+        keys.set(name, typed);
+        body.value.properties.set(name, std::move(typed));
+    }
+}
+
+CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
+    return objectEntry(instance, rc, [name](InstanceBody& body, Broker& broker) {
+        const std::string wanted = textOf(name);
+        if (const Value* value = body.value.properties.find(wanted))
+            return namedData<CMPIInstance>(broker, body, wanted, *value);
+        // A property of the class that has not been set is there, and null.
+        const CimProperty* element = passesFilter(body, wanted) ? declared(body, wanted) : nullptr;
+        if (!element) throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "no property " + wanted);
+        return namedData<CMPIInstance>(broker, body, wanted, Value::null(typeOf(*element)));
+    });
+}
+
+CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value,
+                       CMPIType type) {
+    return objectStatus(instance, [=](InstanceBody& body, Broker& broker) {
+        if (!name || !*name) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
+        setInstanceProperty(broker, body, name, readValue(value, type));
+    });
+}
+CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name,
+                                 const CMPIValue* value, const CMPIType type, const char*) {
+    return setProperty(instance, name, value, type);
+}
+
+CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
+    return objectEntry(instance, rc, [](InstanceBody& body, Broker& broker) {
+        return make<CMPIObjectPath>(broker, body.value.path);
+    });
+}
+CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* path) {
+    return objectStatus(instance, [path](InstanceBody& body, Broker& broker) {
+        body.value.path = bodyOf(path);
+        body.cls = broker.classOf(body.value.path);
+        takeKeys(body);
+    });
+}
+
+// The key list of the call is ignored, as the standard has come to say: keys stay by the class.
+CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, const char**) {
+    return objectStatus(instance, [properties](InstanceBody& body, Broker&) {
+        body.filter.reset();
+        if (!properties) return;
+        body.filter.emplace();
+        for (const char** name = properties; *name; ++name) body.filter->push_back(*name);
+        NamedValues kept;
+        for (const auto& [name, value] : body.value.properties)
+            if (passesFilter(body, name) || isKey(body, name)) kept.set(name, value);
+        body.value.properties = std::move(kept);
+    });
+}
+
+}  // namespace
+
+template <>
+CMPIData namedData<CMPIInstance>(Broker& broker, const InstanceBody& body, const std::string& name,
+                                 const Value& value) {
+    CMPIData data = makeData(broker, value);
+    if (isKey(body, name)) data.state |= CMPI_keyValue;
+    return data;
+}
+
+InstanceBody instanceBody(Broker& broker, Instance value) {
+    const CimClass* cls = broker.classOf(value.path);
+    return {std::move(value), std::nullopt, cls};
+}
+
+InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path) {
+    InstanceBody body = instanceBody(broker, Instance(path));
+    if (!body.cls && broker.classes() && !broker.lean())
+        throw Failure(CMPI_RC_ERR_NOT_FOUND, "no class " + path.className);
+    if (body.cls && broker.lean())
+        for (const auto& element : body.cls->properties)
+            body.value.properties.set(element->name, Value::null(typeOf(*element)));
+    takeKeys(body);
+    return body;
+}
+
+void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& name, Value value) {
+    const CimProperty* element = declared(body, name);
+    if (body.cls) value = checked(broker.lean(), body, element, name, std::move(value));
+    // The path of an instance is made of its key properties.
+    const bool key = isKey(body, name);
+    if (key && !value.isNull()) body.value.path.keys.set(name, value);
+    if (key || passesFilter(body, name)) body.value.properties.set(name, std::move(value));
+}
+
+void fillInstanceTables(ObjectTables& tables) {
+    std::get<CMPIInstanceFT>(tables) = {0,
+                                        releaseObject<CMPIInstance>,
+                                        cloneObject<CMPIInstance>,
+                                        getProperty,
+                                        getNamedAt<CMPIInstance>,
+                                        countNamed<CMPIInstance>,
+                                        setProperty,
+                                        getObjectPath,
+                                        setPropertyFilter,
+                                        setObjectPath,
+                                        setPropertyWithOrigin};
+}
+
+}  // namespace cimom

@@ -1,0 +1,278 @@
+/// The C objects of CMPI, and who owns them.
+///
+/// Each object that a provider sees is the face of a node: the C struct of its kind, whose hdl
+/// points back to the node, and a body that holds the content in the value model. Nodes made
+/// during a request are owned by the request's pool and freed with it; clones, and objects made
+/// on threads without a request, are owned by the broker's stray pool until they are released.
+///
+/// The memory of nodes is reused for nodes and never given back. A released object's face stays
+/// readable with a null hdl, so that its use is answered with CMPI_RC_ERR_INVALID_HANDLE and
+/// counted, instead of corrupting the heap.
+///
+/// Thread-safety: objects may be made and released on any thread; one object must not be used
+/// by two threads at a time while it changes.
+#ifndef CIMOM_OBJECTS_H
+#define CIMOM_OBJECTS_H
+
+#include <atomic>
+#include <cstddef>
+#include <memory>
+#include <mutex>
+#include <optional>
+#include <string>
+#include <tuple>
+#include <variant>
+#include <vector>
+
+#include "Failure.h"
+#include "Value.h"
+#include "cmpidt.h"
+#include "cmpift.h"
+
+namespace cimom {
+
+class Broker;
+class Pool;
+class Query;
+struct CimClass;
+struct Reply;
+struct Condition;
+struct SubCondition;
+struct Predicate;
+
+// -- bodies ----------------------------------------------------------------------------------
+
+struct StringBody {
+    std::string text;
+    bool null = false;  ///< getCharPtr answers null
+};
+struct InstanceBody {
+    Instance value;
+    std::optional<std::vector<std::string>> filter;  ///< set by setPropertyFilter
+    const CimClass* cls = nullptr;                   ///< null when the class is not known
+};
+struct ArrayBody {
+    CMPIType elementType = CMPI_null;
+    Value::Array elements;
+};
+struct EnumerationBody {
+    Value::Array items;
+    std::size_t next = 0;
+};
+struct ResultBody {
+    std::shared_ptr<Reply> reply;
+};
+
+/// The kinds of objects: C type and body, in one order.
+template <class C, class B>
+struct Kind {
+    using Face = C;
+    using Body = B;
+};
+using Kinds =
+    std::tuple<Kind<CMPIString, StringBody>, Kind<CMPIInstance, InstanceBody>,
+               Kind<CMPIObjectPath, ObjectPath>, Kind<CMPIArgs, NamedValues>,
+               Kind<CMPIContext, NamedValues>, Kind<CMPIArray, ArrayBody>,
+               Kind<CMPIDateTime, DateTime>, Kind<CMPIEnumeration, EnumerationBody>,
+               Kind<CMPIResult, ResultBody>, Kind<CMPISelectExp, std::shared_ptr<const Query>>,
+               Kind<CMPISelectCond, std::shared_ptr<const Condition>>,
+               Kind<CMPISubCond, std::shared_ptr<const SubCondition>>,
+               Kind<CMPIPredicate, std::shared_ptr<const Predicate>>, Kind<CMPIError, NamedValues>>;
+constexpr std::size_t kKindCount = std::tuple_size_v<Kinds>;
+
+template <class C, std::size_t I = 0>
+constexpr std::size_t kindOf() {
+    if constexpr (std::is_same_v<typename std::tuple_element_t<I, Kinds>::Face, C>)
+        return I;
+    else
+        return kindOf<C, I + 1>();
+}
+template <class C>
+using BodyOf = typename std::tuple_element_t<kindOf<C>(), Kinds>::Body;
+template <class C>
+using TableOf = std::remove_pointer_t<decltype(C::ft)>;
+
+// -- nodes -----------------------------------------------------------------------------------
+
+struct Link {
+    Link* prev = nullptr;
+    Link* next = nullptr;
+};
+
+namespace detail {
+template <class>
+struct NodeParts;
+template <class... K>
+struct NodeParts<std::tuple<K...>> {
+    using Face = std::variant<typename K::Face...>;
+    using Content = std::variant<std::unique_ptr<typename K::Body>...>;
+    using Tables = std::tuple<TableOf<typename K::Face>...>;
+};
+}  // namespace detail
+
+/// The function tables of the object kinds.
+using ObjectTables = detail::NodeParts<Kinds>::Tables;
+
+struct Node : Link {
+    detail::NodeParts<Kinds>::Face face;
+    detail::NodeParts<Kinds>::Content content;
+    Broker* broker = nullptr;
+    Pool* pool = nullptr;
+};
+
+/// Owns nodes in levels, as mark and release stack them; the lowest level lasts as long as
+/// the pool.
+class Pool {
+public:
+    Pool();
+    ~Pool();
+    Pool(const Pool&) = delete;
+    Pool& operator=(const Pool&) = delete;
+
+    void adopt(Node& node);
+    /// Opens a level; the result names it.
+    const void* mark();
+    /// Frees the level of that name and those above it; false when there is none.
+    bool release(const void* level);
+    /// Frees one node of this pool.
+    void free(Node& node);
+
+private:
+    using Level = std::unique_ptr<Link>;  // head of a ring of nodes
+    static Level newLevel();
+    static void clear(Link& head);
+
+    std::mutex m_mutex;
+    std::vector<Level> m_levels;
+};
+
+/// Takes a node from the process's store of nodes; Pool gives it back.
+Node& takeNode();
+/// Uses of released objects in this process so far.
+std::size_t staleUseCount();
+void countStaleUse();
+
+/// Where objects made by this thread for this broker go.
+Pool& currentPool(Broker& broker);
+Pool& strayPool(Broker& broker);
+ObjectTables& objectTables(Broker& broker);
+void countLive(Broker& broker, std::ptrdiff_t by);
+
+// -- making and using objects -----------------------------------------------------------------
+
+template <class C>
+C* makeIn(Pool& pool, Broker& broker, BodyOf<C> body) {
+    auto content = std::make_unique<BodyOf<C>>(std::move(body));
+    Node& node = takeNode();
+    node.broker = &broker;
+    node.content.emplace<kindOf<C>()>(std::move(content));
+    C& face = node.face.emplace<kindOf<C>()>();
+    face.hdl = &node;
+    face.ft = &std::get<TableOf<C>>(objectTables(broker));
+    countLive(broker, 1);
+    pool.adopt(node);
+    return &face;
+}
+
+/// A new object that belongs to the request of this thread.
+template <class C>
+C* make(Broker& broker, BodyOf<C> body) {
+    return makeIn<C>(currentPool(broker), broker, std::move(body));
+}
+
+/// The node of an object. @throws Failure CMPI_RC_ERR_INVALID_HANDLE for null, released or alien
+template <class C>
+Node& nodeOf(const C* object) {
+    if (!object) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "null object");
+    if (!object->hdl) {
+        countStaleUse();
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "released object");
+    }
+    Node& node = *static_cast<Node*>(object->hdl);
+    if (node.content.index() != kindOf<C>())
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "object of another kind");
+    return node;
+}
+template <class C>
+BodyOf<C>& bodyOf(const C* object) {
+    return *std::get<kindOf<C>()>(nodeOf(object).content);
+}
+template <class C>
+Broker& brokerOf(const C* object) {
+    return *nodeOf(object).broker;
+}
+
+// -- from C and back -----------------------------------------------------------------------------
+
+/// A text made into an object of the request.
+CMPIString* makeString(Broker& broker, const std::string& text);
+/// Reads a C value. A null @p value gives a null of the type; CMPI_chars values are the text
+/// itself, as everywhere in CMPI.
+/// @throws Failure CMPI_RC_ERR_INVALID_DATA_TYPE for a type that a value cannot have
+Value readValue(const CMPIValue* value, CMPIType type);
+Value readData(const CMPIData& data);
+/// The C form of a value; objects in it belong to the request of this thread.
+CMPIData makeData(Broker& broker, const Value& value);
+/// The body of a C instance, with its class looked up.
+InstanceBody instanceBody(Broker& broker, Instance value);
+/// Answer of the getters when there is nothing.
+CMPIData noData();
+
+inline std::string textOf(const char* text) { return text ? text : ""; }
+
+/// Stores a status for the caller, with its text as an object of the request, if there is one.
+void setStatus(CMPIStatus* out, CMPIrc rc, Broker* broker = nullptr, const char* text = nullptr);
+
+/// Runs the body of a C entry: no exception leaves, a Failure becomes the status, and the
+/// answer is then the empty one of its type.
+template <class F>
+auto entry(CMPIStatus* rc, Broker* broker, F body) -> decltype(body()) {
+    setStatus(rc, CMPI_RC_OK);
+    try {
+        return body();
+    } catch (const Failure& failure) {
+        setStatus(rc, failure.rc(), broker, failure.what());
+    } catch (const std::exception& e) {
+        setStatus(rc, CMPI_RC_ERROR_SYSTEM, broker, e.what());
+    }
+    if constexpr (std::is_same_v<decltype(body()), CMPIData>)
+        return noData();
+    else if constexpr (!std::is_void_v<decltype(body())>)
+        return {};
+}
+
+/// The same for entries on an object that answer a value.
+template <class C, class F>
+auto objectEntry(const C* object, CMPIStatus* rc, F body) {
+    Broker* broker = object && object->hdl ? static_cast<Node*>(object->hdl)->broker : nullptr;
+    return entry(rc, broker, [&] { return body(bodyOf(object), brokerOf(object)); });
+}
+
+/// The same for entries on an object that answer a status alone.
+template <class C, class F>
+CMPIStatus objectStatus(const C* object, F body) {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    objectEntry(object, &status, [&](auto& content, Broker& broker) { body(content, broker); });
+    return status;
+}
+
+/// release and clone, the same for every kind.
+template <class C>
+CMPIStatus releaseObject(C* object) {
+    CMPIStatus status{CMPI_RC_OK, nullptr};
+    entry(&status, nullptr, [&] {
+        Node& node = nodeOf(object);
+        node.pool->free(node);
+    });
+    return status;
+}
+template <class C>
+C* cloneObject(const C* object, CMPIStatus* rc) {
+    return objectEntry(object, rc, [](const BodyOf<C>& body, Broker& broker) {
+        return makeIn<C>(strayPool(broker), broker, body);
+    });
+}
+
+}  // namespace cimom
+
+#endif

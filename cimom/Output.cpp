@@ -1,0 +1,147 @@
+#include "Output.h"
+
+#include <fcntl.h>
+#include <unistd.h>
+
+#include <cerrno>
+#include <cstring>
+#include <nlohmann/json.hpp>
+#include <stdexcept>
+
+#include "PathText.h"
+
+namespace cimom {
+
+// -- where to -----------------------------------------------------------------------------------
+
+ResultStream::ResultStream(const std::string& providerOutput)
+    : m_descriptor(fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, STDERR_FILENO + 1)) {
+    const std::string file = providerOutput == "discard" ? "/dev/null" : providerOutput;
+    const int target = file == "stderr"
+                           ? STDERR_FILENO
+                           : open(file.c_str(), O_WRONLY | O_CREAT | O_APPEND | O_CLOEXEC,
+                                  S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH);
+    if (target < 0 || m_descriptor < 0) {
+        const std::string why = std::strerror(errno);
+        if (m_descriptor >= 0) close(m_descriptor);
+        throw std::runtime_error(file + ": " + why);
+    }
+    dup2(target, STDOUT_FILENO);
+    if (target != STDERR_FILENO) close(target);
+}
+
+// Descriptor 1 stays as it is: what providers have in their buffers comes out at exit.
+ResultStream::~ResultStream() { close(m_descriptor); }
+
+bool ResultStream::write(const std::string& text) {
+    for (std::size_t done = 0; done < text.size();) {
+        const ssize_t count = ::write(m_descriptor, text.data() + done, text.size() - done);
+        if (count < 0 && errno != EINTR) return false;
+        if (count > 0) done += static_cast<std::size_t>(count);
+    }
+    return true;
+}
+
+// -- what ---------------------------------------------------------------------------------------
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+Json toJson(const Instance& instance);
+
+Json toJson(const Value& value) {
+    if (value.isNull()) return nullptr;
+    if (value.isArray()) {
+        Json array = Json::array();
+        for (const Value& element : value.elements()) array.push_back(toJson(element));
+        return array;
+    }
+    switch (value.type()) {
+        case CMPI_boolean:
+            return value.boolean();
+        case CMPI_real32:
+        case CMPI_real64:
+            return value.real();
+        case CMPI_instance:
+            return toJson(value.instance());
+        case CMPI_uint8:
+        case CMPI_uint16:
+        case CMPI_uint32:
+        case CMPI_uint64:
+            return value.uint();
+        case CMPI_sint8:
+        case CMPI_sint16:
+        case CMPI_sint32:
+        case CMPI_sint64:
+            return value.sint();
+        default:
+            return plainText(value);
+    }
+}
+
+Json toJson(const NamedValues& values) {
+    Json object = Json::object();
+    for (const auto& [name, value] : values) object[name] = toJson(value);
+    return object;
+}
+
+Json toJson(const Instance& instance) {
+    return {{"path", printPath(instance.path)},
+            {"class", instance.path.className},
+            {"properties", toJson(instance.properties)}};
+}
+Json toJson(const ObjectPath& path) { return printPath(path); }
+Json toJson(const std::string& name) { return name; }
+
+std::string toText(const Instance& instance) { return printInstance(instance); }
+std::string toText(const ObjectPath& path) { return printPath(path) + "\n"; }
+std::string toText(const std::string& name) { return name + "\n"; }
+
+// Texts of providers need not be UTF-8.
+std::string dump(const Json& json, int indent = 2) {
+    return json.dump(indent, ' ', false, Json::error_handler_t::replace) + "\n";
+}
+
+template <class T>
+std::string renderAll(const std::vector<T>& items, Format format) {
+    if (format == Format::Json) {
+        Json array = Json::array();
+        for (const T& item : items) array.push_back(toJson(item));
+        return dump(array);
+    }
+    std::string out;
+    for (const T& item : items) out += toText(item);
+    return out;
+}
+
+}  // namespace
+
+std::string render(const std::vector<Instance>& instances, Format format) {
+    return renderAll(instances, format);
+}
+std::string render(const std::vector<ObjectPath>& paths, Format format) {
+    return renderAll(paths, format);
+}
+std::string render(const std::vector<std::string>& names, Format format) {
+    return renderAll(names, format);
+}
+
+std::string render(const Value& value, Format format) {
+    return format == Format::Json ? dump(toJson(value)) : printValue(value) + "\n";
+}
+
+std::string renderMethod(const Reply& reply, Format format) {
+    if (format == Format::Json)
+        return dump({{"returnValue", toJson(reply.value())}, {"out", toJson(reply.out)}});
+    std::string out = "returnValue = " + printValue(reply.value()) + ";\n";
+    for (const auto& [name, value] : reply.out) out += name + " = " + printValue(value) + ";\n";
+    return out;
+}
+
+std::string renderEvent(const Indication& indication, Format format) {
+    return format == Format::Json ? dump(toJson(indication.instance), -1)
+                                  : printInstance(indication.instance);
+}
+
+}  // namespace cimom

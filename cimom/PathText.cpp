@@ -1,0 +1,493 @@
+#include "PathText.h"
+
+#include <strings.h>
+
+#include <algorithm>
+#include <cerrno>
+#include <cmath>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+
+#include "Failure.h"
+
+namespace cimom {
+
+namespace {
+
+struct TypeName {
+    CMPIType type;
+    const char* name;
+};
+constexpr TypeName kTypeNames[] = {
+    {CMPI_null, "null"},         {CMPI_boolean, "boolean"}, {CMPI_char16, "char16"},
+    {CMPI_real32, "real32"},     {CMPI_real64, "real64"},   {CMPI_uint8, "uint8"},
+    {CMPI_uint16, "uint16"},     {CMPI_uint32, "uint32"},   {CMPI_uint64, "uint64"},
+    {CMPI_sint8, "sint8"},       {CMPI_sint16, "sint16"},   {CMPI_sint32, "sint32"},
+    {CMPI_sint64, "sint64"},     {CMPI_string, "string"},   {CMPI_dateTime, "datetime"},
+    {CMPI_instance, "instance"}, {CMPI_ref, "reference"},   {CMPI_ptr, "pointer"},
+};
+
+struct Escape {
+    char letter;
+    char meant;
+};
+const std::string kInstanceOf = "instance of ";
+constexpr int kDeepest = 50;
+
+constexpr Escape kEscapes[] = {{'"', '"'},  {'\\', '\\'}, {'\'', '\''}, {'n', '\n'},
+                               {'t', '\t'}, {'r', '\r'},  {'b', '\b'},  {'f', '\f'}};
+
+void appendEscaped(std::string& out, char c, char quote) {
+    for (const Escape& escape : kEscapes)
+        if (escape.meant == c && (c == quote || (c != '"' && c != '\''))) {
+            out += '\\';
+            out += escape.letter;
+            return;
+        }
+    if (static_cast<unsigned char>(c) >= 0x20) {
+        out += c;
+        return;
+    }
+    char text[8];
+    std::snprintf(text, sizeof text, "\\x%04X", static_cast<unsigned>(c));
+    out += text;
+}
+
+std::string quoted(const std::string& text) {
+    std::string out = "\"";
+    for (char c : text) appendEscaped(out, c, '"');
+    return out + '"';
+}
+
+std::string printChar16(std::uint64_t unit) {
+    std::string out = "'";
+    if (unit >= 0x20 && unit < 0x7F) {
+        appendEscaped(out, static_cast<char>(unit), '\'');
+    } else {
+        char text[16];
+        std::snprintf(text, sizeof text, "\\x%04X", static_cast<unsigned>(unit));
+        out += text;
+    }
+    return out + "'";
+}
+
+// The shortest text that reads back as the same number, with something that shows it is a real.
+std::string printReal(double value, bool single) {
+    if (!std::isfinite(value)) return std::isnan(value) ? "NaN" : value < 0 ? "-INF" : "INF";
+    char text[40];
+    for (int digits = 6; digits <= 17; ++digits) {
+        std::snprintf(text, sizeof text, "%.*g", digits, value);
+        const double back = std::strtod(text, nullptr);
+        const bool same = single ? static_cast<float>(back) == static_cast<float>(value)
+                                 : std::abs(back - value) <= 0.0;
+        if (same) break;
+    }
+    std::string out = text;
+    if (out.find_first_of(".e") == std::string::npos) out += ".0";
+    return out;
+}
+
+// Reads texts of the forms above from left to right.
+class Scanner {
+public:
+    explicit Scanner(const std::string& text, std::size_t at = 0) : m_text(text), m_at(at) {}
+
+    bool atEnd() const { return m_at == m_text.size(); }
+    char peek() const { return atEnd() ? '\0' : m_text[m_at]; }
+    void skipBlanks() {
+        while (peek() == ' ' || peek() == '\t' || peek() == '\n' || peek() == '\r') ++m_at;
+    }
+    bool take(char c) {
+        if (peek() != c || atEnd()) return false;
+        ++m_at;
+        return true;
+    }
+
+    /// Up to one of the stops or the end, without trailing blanks.
+    std::string word(const char* stops) {
+        const std::size_t end = std::min(m_text.find_first_of(stops, m_at), m_text.size());
+        std::string out = m_text.substr(m_at, end - m_at);
+        m_at = end;
+        while (!out.empty() && std::strchr(" \t\r\n", out.back())) out.pop_back();
+        return out;
+    }
+
+    /// A text between quotes, escapes resolved.
+    std::string quotedText() {
+        const char quote = m_text[m_at++];
+        std::string out;
+        while (!atEnd() && peek() != quote)
+            out += take('\\') ? escaped() : std::string(1, m_text[m_at++]);
+        if (!take(quote)) fail("a quote is not closed");
+        return out;
+    }
+
+    /// A value as printValue prints it.
+    Value literal(const char* stops) {
+        if (peek() == '{') return arrayLiteral();
+        if (m_text.compare(m_at, kInstanceOf.size(), kInstanceOf) == 0) return Value(instance());
+        if (peek() == '"') return Value(quotedText());
+        if (peek() == '\'') return charLiteral();
+        const std::string bare = word(stops);
+        if (strcasecmp(bare.c_str(), "true") == 0) return Value(true);
+        if (strcasecmp(bare.c_str(), "false") == 0) return Value(false);
+        if (strcasecmp(bare.c_str(), "null") == 0) return Value();
+        return number(bare);
+    }
+
+    /// `instance of Class { name = value; ... }`; the first two words may be missing.
+    Instance instance() {
+        if (++m_depth > kDeepest) fail("too deep a nesting");
+        Instance read;
+        if (m_text.compare(m_at, kInstanceOf.size(), kInstanceOf) == 0) m_at += kInstanceOf.size();
+        skipBlanks();
+        read.path.className = word("{");
+        if (read.path.className.empty() || !take('{')) fail("Class { is missing");
+        for (skipBlanks(); !take('}'); skipBlanks()) {
+            const std::string name = word("=;}");
+            if (name.empty() || !take('=')) fail("name = value is missing");
+            skipBlanks();
+            read.properties.set(name, literal(";}"));
+            skipBlanks();
+            if (peek() != '}' && !take(';')) fail("a semicolon is missing");
+        }
+        --m_depth;
+        return read;
+    }
+
+    [[noreturn]] void fail(const std::string& why) const {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER,
+                      "at character " + std::to_string(m_at + 1) + " of '" + m_text + "': " + why);
+    }
+
+private:
+    std::string escaped() {
+        if (atEnd()) fail("nothing behind a backslash");
+        const char letter = m_text[m_at++];
+        if (letter == 'x' || letter == 'X') {
+            const std::string hex = m_text.substr(m_at, 4);
+            char* end = nullptr;
+            const unsigned long unit = std::strtoul(hex.c_str(), &end, 16);
+            if (hex.size() != 4 || end != hex.c_str() + 4) fail("\\x needs four hex digits");
+            m_at += 4;
+            m_unit = static_cast<std::uint16_t>(unit);
+            return utf8(m_unit);
+        }
+        for (const Escape& escape : kEscapes)
+            if (escape.letter == letter) return std::string(1, escape.meant);
+        fail("unknown escape");
+    }
+
+    static std::string utf8(std::uint16_t unit) {
+        const auto byte = [](int value) { return static_cast<char>(value); };
+        if (unit < 0x80) return {byte(unit)};
+        if (unit < 0x800) return {byte(0xC0 | unit >> 6), byte(0x80 | (unit & 0x3F))};
+        return {byte(0xE0 | unit >> 12), byte(0x80 | (unit >> 6 & 0x3F)),
+                byte(0x80 | (unit & 0x3F))};
+    }
+
+    Value charLiteral() {
+        m_unit = 0;
+        const std::string text = quotedText();
+        if (text.size() == 1) return Value::char16(static_cast<unsigned char>(text[0]));
+        if (text.empty() || m_unit == 0) fail("not one character");
+        return Value::char16(m_unit);
+    }
+
+    Value arrayLiteral() {
+        if (++m_depth > kDeepest) fail("too deep a nesting");
+        take('{');
+        Value::Array elements;
+        for (skipBlanks(); !take('}'); skipBlanks()) {
+            elements.push_back(literal(",}"));
+            skipBlanks();
+            if (peek() != '}' && !take(',')) fail("a comma is missing");
+        }
+        --m_depth;
+        // Elements of one type; the first that is not null tells which.
+        CMPIType type = CMPI_string;
+        for (auto each = elements.rbegin(); each != elements.rend(); ++each)
+            if (!each->isNull()) type = each->type();
+        for (Value& each : elements)
+            if (!each.convertTo(type, each)) fail("an array of mixed types");
+        return Value::array(type, std::move(elements));
+    }
+
+    Value number(const std::string& bare) const {
+        Value value;
+        for (const CMPIType type :
+             std::initializer_list<CMPIType>{CMPI_sint64, CMPI_uint64, CMPI_real64})
+            if (parseNumber(bare, type, value)) return value;
+        fail("'" + bare + "' is no value");
+    }
+
+public:
+    static bool parseNumber(const std::string& text, CMPIType type, Value& result) {
+        if (text.empty() || std::strchr(" \t\n", text[0])) return false;
+        char* end = nullptr;
+        errno = 0;
+        Value wide;
+        if (type == CMPI_real32 || type == CMPI_real64) {
+            wide = Value(std::strtod(text.c_str(), &end));
+        } else if (text[0] == '-') {
+            wide = Value(std::int64_t{std::strtoll(text.c_str(), &end, 10)});
+        } else {
+            wide = Value(std::uint64_t{std::strtoull(text.c_str(), &end, 10)});
+        }
+        return end == text.c_str() + text.size() && errno == 0 && wide.convertTo(type, result);
+    }
+
+private:
+    const std::string& m_text;
+    std::size_t m_at;
+    int m_depth = 0;
+    std::uint16_t m_unit = 0;  // of the last \x
+};
+
+void appendProperties(std::string& out, const Instance& instance, const std::string& indent);
+
+std::string instanceText(const Instance& instance, const std::string& indent) {
+    std::string out = "instance of " + instance.path.className + " {\n";
+    appendProperties(out, instance, indent + "    ");
+    return out + indent + "}";
+}
+
+std::string valueText(const Value& value, const std::string& indent) {
+    if (value.isNull()) return "NULL";
+    if (value.isArray()) {
+        std::string out = "{";
+        for (const Value& element : value.elements()) {
+            if (out.size() > 1) out += ", ";
+            out += valueText(element, indent);
+        }
+        return out + "}";
+    }
+    switch (value.type()) {
+        case CMPI_boolean:
+            return value.boolean() ? "true" : "false";
+        case CMPI_char16:
+            return printChar16(value.uint());
+        case CMPI_real32:
+            return printReal(value.real(), true);
+        case CMPI_real64:
+            return printReal(value.real(), false);
+        case CMPI_string:
+            return quoted(value.text());
+        case CMPI_dateTime:
+            return quoted(value.dateTime().text());
+        case CMPI_ref:
+            return quoted(printPath(value.reference()));
+        case CMPI_instance:
+            return instanceText(value.instance(), indent);
+        case CMPI_ptr:
+            return "<pointer>";
+        default:
+            break;
+    }
+    return (value.type() & CMPI_SINT) == CMPI_SINT ? std::to_string(value.sint())
+                                                   : std::to_string(value.uint());
+}
+
+void appendProperties(std::string& out, const Instance& instance, const std::string& indent) {
+    for (const auto& [name, value] : instance.properties)
+        out += indent + name + " = " + valueText(value, indent) + ";\n";
+}
+
+[[noreturn]] void mismatch(const std::string& text, CMPIType type) {
+    throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, "'" + text + "' is no " + typeName(type));
+}
+
+// A value as it is declared, from what could be read without knowing.
+Value declaredValue(const Value& value, CMPIType type, const std::string& what) {
+    Value typed;
+    if (value.convertTo(type, typed)) return typed;
+    if (value.type() == CMPI_string) return parseValue(value.text(), type);
+    const bool empty = value.isArray() && value.elements().empty() && (type & CMPI_ARRAY);
+    if (empty) return Value::array(static_cast<CMPIType>(type & ~CMPI_ARRAY), {});
+    throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, what + " is of type " + typeName(type));
+}
+
+Instance typedInstance(Instance instance, const ClassRepository* classes) {
+    const CimClass* cls = classes ? classes->findClass(instance.path.className) : nullptr;
+    if (!cls) return instance;
+    NamedValues typed;
+    for (const auto& [name, value] : instance.properties) {
+        const CimProperty* property = cls->properties.find(name);
+        if (!property)
+            throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
+                          "class " + cls->name + " has no property " + name);
+        Value own = value;
+        if (!own.isNull() && own.type() == CMPI_instance)
+            own = Value(typedInstance(own.instance(), classes));
+        typed.set(property->name,
+                  declaredValue(own, typeOf(*property), "property " + cls->name + "." + name));
+        if (property->isKey) instance.path.keys.set(property->name, *typed.find(name));
+    }
+    instance.properties = std::move(typed);
+    return instance;
+}
+
+Instance wholeInstance(const std::string& text) {
+    Scanner scanner(text);
+    scanner.skipBlanks();
+    Instance instance = scanner.instance();
+    scanner.skipBlanks();
+    scanner.take(';');
+    scanner.skipBlanks();
+    if (!scanner.atEnd()) scanner.fail("something follows the instance");
+    return instance;
+}
+
+Value parseArray(const std::string& text, CMPIType elementType, const ClassRepository* classes) {
+    Scanner scanner(text);
+    Value::Array elements;
+    scanner.skipBlanks();
+    const bool braces = scanner.take('{');
+    scanner.skipBlanks();
+    const char* const stops = braces ? ",}" : ",";
+    while (!scanner.atEnd() && scanner.peek() != '}') {
+        if (elementType == CMPI_instance)
+            elements.emplace_back(typedInstance(scanner.instance(), classes));
+        else if (scanner.peek() == '"')
+            elements.push_back(parseValue(scanner.quotedText(), elementType));
+        else
+            elements.push_back(parseValue(scanner.word(stops), elementType));
+        scanner.skipBlanks();
+        if (!scanner.take(',')) break;
+        scanner.skipBlanks();
+    }
+    if (braces && !scanner.take('}')) scanner.fail("a brace is not closed");
+    scanner.skipBlanks();
+    if (!scanner.atEnd()) scanner.fail("something follows the array");
+    return Value::array(elementType, std::move(elements));
+}
+
+}  // namespace
+
+bool isValueType(CMPIType type) {
+    return std::any_of(std::begin(kTypeNames), std::end(kTypeNames),
+                       [type](const TypeName& row) { return row.type == (type & ~CMPI_ARRAY); });
+}
+
+std::string typeName(CMPIType type) {
+    for (const TypeName& row : kTypeNames)
+        if (row.type == (type & ~CMPI_ARRAY))
+            return std::string(row.name) + (type & CMPI_ARRAY ? "[]" : "");
+    return "type " + std::to_string(type);
+}
+
+std::string printPath(const ObjectPath& path) {
+    std::string out;
+    if (!path.host.empty()) out += "//" + path.host + "/";
+    if (!path.nameSpace.empty()) out += path.nameSpace + ":";
+    out += path.className;
+    char separator = '.';
+    for (const auto& [name, value] : path.keys) {
+        out += separator + name + "=" + valueText(value, {});
+        separator = ',';
+    }
+    return out;
+}
+
+ObjectPath parsePath(const std::string& text) {
+    ObjectPath path;
+    std::size_t at = 0;
+    if (text.compare(0, 2, "//") == 0) {
+        const std::size_t slash = text.find('/', 2);
+        if (slash == std::string::npos || slash == 2) Scanner(text).fail("no host behind //");
+        path.host = text.substr(2, slash - 2);
+        at = slash + 1;
+    }
+    // Behind the first quote stand key values, in which anything may occur.
+    const std::size_t colon = text.find_first_of(":\"", at);
+    if (colon != std::string::npos && text[colon] == ':') {
+        path.nameSpace = text.substr(at, colon - at);
+        if (path.nameSpace.empty()) Scanner(text, at).fail("no namespace before the colon");
+        at = colon + 1;
+    }
+    Scanner scanner(text, at);
+    path.className = scanner.word(".\"=,");
+    if (path.className.empty()) scanner.fail("no class name");
+    if (scanner.atEnd()) return path;
+    if (!scanner.take('.')) scanner.fail("a dot is missing behind the class name");
+    do {
+        scanner.skipBlanks();
+        const std::string key = scanner.word("=,\"");
+        if (key.empty() || !scanner.take('=')) scanner.fail("key=value is missing");
+        if (path.keys.find(key)) scanner.fail("key " + key + " stands twice");
+        scanner.skipBlanks();
+        path.keys.set(key, scanner.literal(","));
+        scanner.skipBlanks();
+    } while (scanner.take(','));
+    if (!scanner.atEnd()) scanner.fail("a comma is missing");
+    return path;
+}
+
+std::string printValue(const Value& value) { return valueText(value, {}); }
+
+std::string plainText(const Value& value) {
+    if (!value.isNull() && value.type() == CMPI_string) return value.text();
+    if (!value.isNull() && value.type() == CMPI_dateTime) return value.dateTime().text();
+    if (!value.isNull() && value.type() == CMPI_ref) return printPath(value.reference());
+    return printValue(value);
+}
+
+Value parseValue(const std::string& text, CMPIType type, const ClassRepository* classes) {
+    if (type & CMPI_ARRAY)
+        return parseArray(text, static_cast<CMPIType>(type & ~CMPI_ARRAY), classes);
+    Value result;
+    switch (type) {
+        case CMPI_string:
+            return Value(text);
+        case CMPI_boolean:
+            if (strcasecmp(text.c_str(), "true") == 0) return Value(true);
+            if (strcasecmp(text.c_str(), "false") == 0) return Value(false);
+            mismatch(text, type);
+        case CMPI_char16:
+            if (text.size() == 1) return Value::char16(static_cast<unsigned char>(text[0]));
+            result = Scanner(text).literal("");
+            if (result.isNull() || result.type() != CMPI_char16) mismatch(text, type);
+            return result;
+        case CMPI_dateTime:
+            if (!Value(text).convertTo(type, result)) mismatch(text, type);
+            return result;
+        case CMPI_ref:
+            return Value(classes ? typedKeys(parsePath(text), *classes) : parsePath(text));
+        case CMPI_instance:
+            return Value(typedInstance(wholeInstance(text), classes));
+        default:
+            if (!Scanner::parseNumber(text, type, result)) mismatch(text, type);
+            return result;
+    }
+}
+
+Value guessValue(const std::string& text) {
+    try {
+        Scanner scanner(text);
+        Value value = scanner.literal("");
+        if (scanner.atEnd()) return value;
+    } catch (const Failure&) {  // not quoted, and so a string
+    }
+    return Value(text);
+}
+
+std::string printInstance(const Instance& instance) {
+    return "// " + printPath(instance.path) + "\n" + instanceText(instance, {}) + ";\n";
+}
+
+ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes) {
+    const CimClass* cls = classes.findClass(path.className);
+    if (!cls) return path;
+    ObjectPath typed = path;
+    for (const auto& [name, value] : path.keys) {
+        const CimProperty* property = cls->properties.find(name);
+        if (!property || value.isNull()) continue;
+        Value key = declaredValue(value, typeOf(*property), "key " + name + " of " + cls->name);
+        if (key.type() == CMPI_ref) key = Value(typedKeys(key.reference(), classes));
+        typed.keys.set(name, std::move(key));
+    }
+    return typed;
+}
+
+}  // namespace cimom

@@ -1,0 +1,137 @@
+/// Providers: where they come from, their CMPI interfaces, and their life from load to unload.
+///
+/// A registration file is JSON and says which class is served by which provider:
+///
+///     {
+///       "namespace": "root/cimv2",
+///       "library": "zemproviders",
+///       "classes": {
+///         "ORXC_Host": {"provider": "ORXC_HostProvider", "interfaces": ["instance", "method"]},
+///         "ORXC_HostedPartition": [{"provider": "A", "interfaces": ["association"]},
+///                                  {"provider": "B", "interfaces": ["instance"]}]
+///       }
+///     }
+///
+/// "namespace" may be a list, and both it and "library" may stand again in a row of "classes".
+/// Interfaces are instance, association, method, indication and property. A library is a file
+/// name, or a bare name that stands for lib<name>.so; it is looked for in the folder of the
+/// registration file, then in the server's library folders, then by the system's loader.
+#ifndef CIMOM_PROVIDER_H
+#define CIMOM_PROVIDER_H
+
+#include <memory>
+#include <mutex>
+#include <string>
+#include <tuple>
+#include <vector>
+
+#include "Broker.h"
+
+namespace cimom {
+
+/// One row of a registration.
+struct Registration {
+    std::string className;
+    std::string provider;
+    std::string library;
+    std::vector<std::string> nameSpaces;
+    unsigned interfaces = 0;  ///< bits of Interface
+};
+
+/// @throws std::runtime_error with the file and the reason
+std::vector<Registration> readRegistration(const std::string& file);
+/// "lib<name>.so" for a bare name, any other name as it stands.
+std::string libraryFileName(const std::string& name);
+
+/// What distinguishes the five kinds of interfaces.
+template <class MI>
+struct InterfaceTraits;
+template <>
+struct InterfaceTraits<CMPIInstanceMI> {
+    static constexpr Interface kBit = kInstance;
+    static constexpr const char* kName = "InstanceMI";
+    static constexpr auto kFactory = &Factories::instance;
+};
+template <>
+struct InterfaceTraits<CMPIAssociationMI> {
+    static constexpr Interface kBit = kAssociation;
+    static constexpr const char* kName = "AssociationMI";
+    static constexpr auto kFactory = &Factories::association;
+};
+template <>
+struct InterfaceTraits<CMPIMethodMI> {
+    static constexpr Interface kBit = kMethod;
+    static constexpr const char* kName = "MethodMI";
+    static constexpr auto kFactory = &Factories::method;
+};
+template <>
+struct InterfaceTraits<CMPIIndicationMI> {
+    static constexpr Interface kBit = kIndication;
+    static constexpr const char* kName = "IndicationMI";
+    static constexpr auto kFactory = &Factories::indication;
+};
+template <>
+struct InterfaceTraits<CMPIPropertyMI> {
+    static constexpr Interface kBit = kProperty;
+    static constexpr const char* kName = "PropertyMI";
+    static constexpr auto kFactory = &Factories::property;
+};
+
+/// One provider with the interfaces that have been asked for so far. Thread-safe.
+class Provider {
+public:
+    /// A provider of a library, looked for in @p folders.
+    Provider(std::string name, std::string library, std::vector<std::string> folders)
+        : m_name(std::move(name)), m_file(std::move(library)), m_folders(std::move(folders)) {}
+    /// A provider of this process.
+    Provider(std::string name, const Factories& factories)
+        : m_name(std::move(name)), m_factories(factories) {}
+    ~Provider();
+    Provider(const Provider&) = delete;
+    Provider& operator=(const Provider&) = delete;
+
+    const std::string& name() const { return m_name; }
+    const std::string& file() const { return m_file; }
+
+    /// Keeps a provider loaded while it lives.
+    class Use {
+    public:
+        explicit Use(Provider& provider);
+        ~Use();
+        Use(const Use&) = delete;
+        Use& operator=(const Use&) = delete;
+
+    private:
+        Provider& m_provider;
+    };
+    /// The interface, made when asked for the first time; valid as long as a Use.
+    /// @throws Failure CMPI_RC_ERR_FAILED when the library or the factory fails
+    template <class MI>
+    MI& interface(Broker& broker, const CMPIContext* context);
+
+    /// Calls the cleanup of all interfaces and unloads the library.
+    /// @return false when the provider is in use or, unless @p terminating, asks to stay
+    bool unload(const CMPIContext* context, bool terminating);
+
+private:
+    using Interfaces = std::tuple<CMPIInstanceMI*, CMPIAssociationMI*, CMPIMethodMI*,
+                                  CMPIIndicationMI*, CMPIPropertyMI*>;
+
+    void open();
+    template <class MI>
+    MI* create(Broker& broker, const CMPIContext* context, CMPIStatus& status);
+
+    const std::string m_name;
+    const std::string m_file;
+    const std::vector<std::string> m_folders;
+    const Factories m_factories;
+
+    std::recursive_mutex m_mutex;  // recursive: a factory may reach its own provider by an upcall
+    void* m_library = nullptr;
+    Interfaces m_interfaces{};
+    int m_uses = 0;
+};
+
+}  // namespace cimom
+
+#endif

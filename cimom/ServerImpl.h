@@ -1,0 +1,188 @@
+/// The inside of a Server: which providers serve what, and how one of them is called.
+#ifndef CIMOM_SERVER_IMPL_H
+#define CIMOM_SERVER_IMPL_H
+
+#include <cxxabi.h>
+
+#include <list>
+#include <map>
+#include <unordered_map>
+
+#include "Broker.h"
+#include "Provider.h"
+#include "Query.h"
+#include "Server.h"
+
+namespace cimom {
+
+/// A provider to be called, and the class to call it for.
+struct Target {
+    Provider* provider;
+    std::string className;
+};
+
+/// What a provider is called with.
+struct Call {
+    CMPIContext* context;
+    CMPIResult* result;
+    CMPIObjectPath* path;
+    const char* className;  ///< of the target; null when it has none
+    Reply& reply;
+};
+
+/// One filter that a client has active.
+struct Subscription {
+    std::string nameSpace;
+    std::shared_ptr<const Query> query;
+    Server::IndicationHandler handler;
+    std::vector<Target> targets;
+    // Held while the handler runs, so that unsubscribing waits for it; the handler itself may
+    // unsubscribe.
+    std::recursive_mutex mutex;
+    bool ended = false;
+};
+
+class Server::Impl {
+public:
+    Impl(Server& server, const Options& options) : broker(server, options) {}
+
+    void add(const Registration& row, const std::string& folder);
+    void add(const std::string& name, const std::vector<std::string>& classes,
+             const Factories& factories, const std::vector<std::string>& nameSpaces);
+
+    /// The path in the request's namespace where it has none, its keys typed by the class.
+    /// @throws Failure CMPI_RC_ERR_INVALID_CLASS, CMPI_RC_ERR_INVALID_PARAMETER
+    ObjectPath complete(const Request& request, const ObjectPath& path) const;
+
+    /// The provider of a class, or of the nearest class above it that has one.
+    /// @throws Failure CMPI_RC_ERR_NOT_SUPPORTED when there is none
+    Target targetOf(const ObjectPath& path, Interface bit) const;
+    bool serves(const ObjectPath& path, Interface bit) const;
+    /// The providers of a class and of those below it.
+    /// @throws Failure CMPI_RC_ERR_NOT_SUPPORTED when there is none
+    std::vector<Target> targetsBelow(const ObjectPath& classPath, Interface bit) const;
+    /// The providers of all associations in which the class of the path may stand, one by one
+    /// and with an empty class name.
+    std::vector<Target> associationTargets(const ObjectPath& path) const;
+
+    /// Calls one provider in a request of its own; nothing that goes wrong is thrown.
+    /// @param body  takes the interface and a Call, and returns the provider's status
+    template <class MI, class Body>
+    Reply call(const Request& request, const Target& target, const ObjectPath& path, Body body);
+    /// Calls the provider of a path.
+    template <class MI, class Body>
+    Reply callFor(const Request& request, const ObjectPath& path, Body body) {
+        return call<MI>(request, targetOf(path, InterfaceTraits<MI>::kBit), path, body);
+    }
+    /// Calls all targets and puts their answers together.
+    /// @param perClass  each target is called for its own class instead of the path
+    template <class MI, class Body>
+    Reply callAll(const Request& request, const std::vector<Target>& targets,
+                  const ObjectPath& path, bool perClass, Body body);
+
+    /// Fills in what providers leave out and drops the properties not asked for.
+    static void finish(const Request& request, const ObjectPath& path, Reply& reply);
+
+    // Indications, Indications.cpp.
+    void filterStep(const Request& request, const Target& target, FilterStep step,
+                    const std::shared_ptr<const Query>& query, bool firstOrLast);
+    Reply switchIndications(const Request& request, const Target& target, bool on);
+    void activate(const Request& request, Subscription& subscription, const Target& target);
+    void deactivate(const Request& request, const Subscription& subscription);
+    bool countFilter(const Target& target, int by, bool ofProvider);
+
+    struct Route {
+        std::vector<std::string> nameSpaces;  // empty: all
+        unsigned interfaces;
+        Provider* provider;
+    };
+
+    Broker broker;
+    std::list<Provider> providers;
+    std::unordered_map<std::string, std::vector<Route>, NameHash, NameEqual> routes;
+
+    std::mutex subscriptionMutex;
+    SubscriptionId nextSubscription = 1;
+    std::map<SubscriptionId, std::shared_ptr<Subscription>> subscriptions;
+    std::map<std::pair<Provider*, std::string>, int> activeFilters;  // empty class: all of them
+
+private:
+    Provider* routeOf(const std::string& className, const std::string& nameSpace,
+                      Interface bit) const;
+};
+
+/// Runs an operation of the facade: a Failure becomes its reply.
+template <class F>
+Reply answer(F operation) {
+    try {
+        return operation();
+    } catch (const Failure& failure) {
+        Reply reply;
+        reply.rc = failure.rc();
+        reply.message = failure.what();
+        return reply;
+    }
+}
+
+template <class MI, class Body>
+Reply Server::Impl::call(const Request& request, const Target& target, const ObjectPath& path,
+                         Body body) {
+    auto reply = std::make_shared<Reply>();
+    try {
+        Activation activation(broker, contextOf(request, broker.lean()));
+        Provider::Use use(*target.provider);
+        MI& mi = target.provider->interface<MI>(broker, activation.context());
+        const Call parts{activation.context(), make<CMPIResult>(broker, {reply}),
+                         make<CMPIObjectPath>(broker, path),
+                         target.className.empty() ? nullptr : target.className.c_str(), *reply};
+        const CMPIStatus status = body(&mi, parts);
+        reply->rc = status.rc;
+        if (status.msg) reply->message = bodyOf(status.msg).text;
+    } catch (const Failure& failure) {
+        reply->rc = failure.rc();
+        reply->message = failure.what();
+    } catch (const std::exception& e) {
+        reply->rc = CMPI_RC_ERR_FAILED;
+        reply->message = "provider " + target.provider->name() + " threw: " + e.what();
+    } catch (abi::__forced_unwind&) {
+        throw;  // a cancelled thread must end
+    } catch (...) {
+        reply->rc = CMPI_RC_ERR_FAILED;
+        reply->message = "provider " + target.provider->name() + " threw";
+    }
+    return std::move(*reply);
+}
+
+/// Puts the elements of one list behind those of another.
+template <class T>
+void append(std::vector<T>& all, std::vector<T>& more) {
+    std::move(more.begin(), more.end(), std::back_inserter(all));
+}
+
+template <class MI, class Body>
+Reply Server::Impl::callAll(const Request& request, const std::vector<Target>& targets,
+                            const ObjectPath& path, bool perClass, Body body) {
+    Reply all;
+    all.done = true;
+    std::size_t refused = 0;
+    for (const Target& target : targets) {
+        const ObjectPath own = perClass ? ObjectPath(path.nameSpace, target.className) : path;
+        Reply one = call<MI>(request, target, own, body);
+        append(all.instances, one.instances);
+        append(all.paths, one.paths);
+        append(all.values, one.values);
+        append(all.errors, one.errors);
+        all.done = all.done && one.done;
+        // Of several providers, one that does not know the operation does not spoil it.
+        const bool refuses = one.rc == CMPI_RC_ERR_NOT_SUPPORTED && ++refused < targets.size();
+        if (all.ok() && !one.ok() && !refuses) {
+            all.rc = one.rc;
+            all.message = one.message;
+        }
+    }
+    return all;
+}
+
+}  // namespace cimom
+
+#endif

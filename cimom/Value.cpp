@@ -1,0 +1,308 @@
+#include "Value.h"
+
+#include <strings.h>
+#include <sys/time.h>
+
+#include <algorithm>
+#include <cctype>
+#include <cstdio>
+#include <cstdlib>
+#include <ctime>
+#include <limits>
+
+namespace cimom {
+
+namespace {
+
+constexpr std::size_t kDateTimeLength = 25;
+constexpr std::size_t kPointAt = 14;
+constexpr std::size_t kSignAt = 21;
+constexpr std::uint64_t kMicrosPerSecond = 1000000;
+constexpr std::uint64_t kSecondsPerDay = 86400;
+
+// Start and length of each field, most significant first; bounds hold for written digits.
+struct Field {
+    std::size_t at;
+    std::size_t length;
+    unsigned low;
+    unsigned high;
+};
+constexpr Field kTimestampFields[] = {{0, 4, 0, 9999},   {4, 2, 1, 12},  {6, 2, 1, 31},
+                                      {8, 2, 0, 23},     {10, 2, 0, 59}, {12, 2, 0, 60},
+                                      {15, 6, 0, 999999}};
+constexpr Field kIntervalFields[] = {
+    {0, 8, 0, 99999999}, {8, 2, 0, 23}, {10, 2, 0, 59}, {12, 2, 0, 59}, {15, 6, 0, 999999}};
+
+bool isDigit(char c) { return c >= '0' && c <= '9'; }
+
+// Value of a field; asterisks give its lowest value.
+unsigned fieldValue(const std::string& text, const Field& field) {
+    const std::string digits = text.substr(field.at, field.length);
+    if (digits.front() == '*') return field.low;
+    unsigned value = 0;
+    for (char c : digits) value = value * 10 + (c == '*' ? 0U : static_cast<unsigned>(c - '0'));
+    return value;
+}
+
+template <std::size_t N>
+bool validFields(const std::string& text, const Field (&fields)[N]) {
+    bool wild = false;  // asterisks go on to the last field once they begin
+    for (const Field& field : fields) {
+        const std::string part = text.substr(field.at, field.length);
+        const std::size_t digits =
+            part.find('*') == std::string::npos ? part.size() : part.find('*');
+        if (!std::all_of(part.begin(), part.begin() + static_cast<std::ptrdiff_t>(digits), isDigit))
+            return false;
+        if (part.find_first_not_of('*', digits) != std::string::npos) return false;
+        // Only microseconds may be cut within the field.
+        if (digits != 0 && digits != part.size() && field.length != 6) return false;
+        if (wild && digits != 0) return false;
+        wild = digits != part.size();
+        const unsigned value = fieldValue(text, field);
+        if (value < field.low || value > field.high) return false;
+    }
+    return true;
+}
+
+// Range check and conversion between the integer representations.
+bool integerFits(CMPIType type, bool negative, std::uint64_t magnitude) {
+    const unsigned bits = 8U << (type >> 4 & 3);
+    if ((type & CMPI_SINT) != CMPI_SINT) return !negative && (bits == 64 || magnitude >> bits == 0);
+    const std::uint64_t limit = std::uint64_t{1} << (bits - 1);
+    return negative ? magnitude <= limit : magnitude < limit;
+}
+
+bool isInteger(CMPIType type) { return (type & CMPI_UINT) != 0 && (type & ~0x00F0) == 0; }
+bool isReal(CMPIType type) { return type == CMPI_real32 || type == CMPI_real64; }
+
+}  // namespace
+
+bool sameName(const std::string& a, const std::string& b) {
+    return a.size() == b.size() && strcasecmp(a.c_str(), b.c_str()) == 0;
+}
+
+// -- DateTime -------------------------------------------------------------------------------
+
+DateTime::DateTime() : m_text("00000000000000.000000:000") {}
+
+DateTime DateTime::fromBinary(std::uint64_t microseconds, bool interval) {
+    const auto micros = static_cast<unsigned>(microseconds % kMicrosPerSecond);
+    const std::uint64_t seconds = microseconds / kMicrosPerSecond;
+    char text[64];
+    if (interval) {
+        const std::uint64_t days = std::min<std::uint64_t>(seconds / kSecondsPerDay, 99999999);
+        const auto rest = static_cast<unsigned>(seconds % kSecondsPerDay);
+        std::snprintf(text, sizeof text, "%08u%02u%02u%02u.%06u:000", static_cast<unsigned>(days),
+                      rest / 3600, rest / 60 % 60, rest % 60, micros);
+    } else {
+        constexpr std::uint64_t kEndOf9999 = 253402300799;
+        const auto when = static_cast<time_t>(std::min(seconds, kEndOf9999));
+        std::tm utc{};
+        gmtime_r(&when, &utc);
+        std::snprintf(text, sizeof text, "%04d%02d%02d%02d%02d%02d.%06u+000", utc.tm_year + 1900,
+                      utc.tm_mon + 1, utc.tm_mday, utc.tm_hour, utc.tm_min, utc.tm_sec, micros);
+    }
+    DateTime result;
+    result.m_text = text;
+    return result;
+}
+
+DateTime DateTime::now() {
+    timeval tv{};
+    gettimeofday(&tv, nullptr);
+    return fromBinary(static_cast<std::uint64_t>(tv.tv_sec) * kMicrosPerSecond +
+                          static_cast<std::uint64_t>(tv.tv_usec),
+                      false);
+}
+
+bool DateTime::parse(const std::string& text, DateTime& result) {
+    if (text.size() != kDateTimeLength || text[kPointAt] != '.') return false;
+    const char sign = text[kSignAt];
+    if (!std::all_of(text.begin() + kSignAt + 1, text.end(), isDigit)) return false;
+    if (sign == ':') {
+        if (text.compare(kSignAt, 4, ":000") != 0 || !validFields(text, kIntervalFields))
+            return false;
+    } else if ((sign != '+' && sign != '-') || !validFields(text, kTimestampFields)) {
+        return false;
+    }
+    result.m_text = text;
+    return true;
+}
+
+bool DateTime::isInterval() const { return m_text[kSignAt] == ':'; }
+
+std::uint64_t DateTime::binary() const {
+    if (isInterval()) {
+        std::uint64_t value = fieldValue(m_text, kIntervalFields[0]);
+        value = value * 24 + fieldValue(m_text, kIntervalFields[1]);
+        value = value * 60 + fieldValue(m_text, kIntervalFields[2]);
+        value = value * 60 + fieldValue(m_text, kIntervalFields[3]);
+        return value * kMicrosPerSecond + fieldValue(m_text, kIntervalFields[4]);
+    }
+    const auto field = [this](std::size_t i) {
+        return static_cast<int>(fieldValue(m_text, kTimestampFields[i]));
+    };
+    std::tm utc{};
+    utc.tm_year = field(0) - 1900;
+    utc.tm_mon = field(1) - 1;
+    utc.tm_mday = field(2);
+    utc.tm_hour = field(3);
+    utc.tm_min = field(4);
+    utc.tm_sec = field(5);
+    const long offset = std::strtol(m_text.c_str() + kSignAt, nullptr, 10);
+    const std::int64_t seconds = timegm(&utc) - offset * 60;
+    if (seconds < 0) return 0;
+    return static_cast<std::uint64_t>(seconds) * kMicrosPerSecond +
+           static_cast<std::uint64_t>(field(6));
+}
+
+// -- Value ----------------------------------------------------------------------------------
+
+Value Value::null(CMPIType type) {
+    Value value;
+    value.m_type = type;
+    return value;
+}
+
+Value Value::char16(std::uint16_t unit) {
+    Value value(unit);
+    value.m_type = CMPI_char16;
+    return value;
+}
+
+Value Value::pointer(CMPIValuePtr area) {
+    Value value;
+    value.m_type = CMPI_ptr;
+    value.m_data = area;
+    return value;
+}
+
+Value Value::array(CMPIType elementType, Array elements) {
+    Value value;
+    value.m_type = static_cast<CMPIType>(elementType | CMPI_ARRAY);
+    for (Value& element : elements) element.retypeNull(elementType);
+    value.m_data = std::move(elements);
+    return value;
+}
+
+Value::Value(const char* text) : m_type(CMPI_string) {
+    if (text) m_data = std::string(text);
+}
+Value::Value(std::string text) : m_type(CMPI_string), m_data(std::move(text)) {}
+Value::Value(DateTime when) : m_type(CMPI_dateTime), m_data(std::move(when)) {}
+Value::Value(const ObjectPath& path)
+    : m_type(CMPI_ref), m_data(std::make_shared<const ObjectPath>(path)) {}
+Value::Value(const Instance& embedded)
+    : m_type(CMPI_instance), m_data(std::make_shared<const Instance>(embedded)) {}
+
+void Value::retypeNull(CMPIType type) {
+    if (isNull()) m_type = type;
+}
+
+bool Value::convertTo(CMPIType type, Value& result) const {
+    if (isNull() || type == m_type) {
+        result = *this;
+        result.retypeNull(type);
+        return true;
+    }
+    if (isArray() != ((type & CMPI_ARRAY) != 0)) return false;
+    if (isArray()) {
+        const auto elementType = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+        Array converted(elements().size());
+        for (std::size_t i = 0; i < converted.size(); ++i)
+            if (!elements()[i].convertTo(elementType, converted[i])) return false;
+        result = array(elementType, std::move(converted));
+        return true;
+    }
+    if (isInteger(m_type) || m_type == CMPI_char16) {
+        const bool isSigned = (m_type & CMPI_SINT) == CMPI_SINT;
+        const bool negative = isSigned && sint() < 0;
+        const std::uint64_t raw = isSigned ? static_cast<std::uint64_t>(sint()) : uint();
+        if (isReal(type)) {
+            result.m_data = negative ? static_cast<double>(sint()) : static_cast<double>(raw);
+        } else if (isInteger(type) && integerFits(type, negative, negative ? ~raw + 1 : raw)) {
+            if ((type & CMPI_SINT) == CMPI_SINT)
+                result.m_data = static_cast<std::int64_t>(raw);
+            else
+                result.m_data = raw;
+        } else {
+            return false;
+        }
+    } else if (isReal(m_type) && isReal(type)) {
+        const double value = real();
+        result.m_data =
+            type == CMPI_real32 ? static_cast<double>(static_cast<float>(value)) : value;
+    } else if (m_type == CMPI_string && type == CMPI_dateTime) {
+        DateTime when;
+        if (!DateTime::parse(text(), when)) return false;
+        result.m_data = when;
+    } else {
+        return false;
+    }
+    result.m_type = type;
+    return true;
+}
+
+bool Value::operator==(const Value& other) const {
+    if (m_type != other.m_type || m_data.index() != other.m_data.index()) return false;
+    if (std::holds_alternative<PathPtr>(m_data)) return reference() == other.reference();
+    if (std::holds_alternative<InstancePtr>(m_data)) return instance() == other.instance();
+    if (std::holds_alternative<CMPIValuePtr>(m_data))
+        return pointer().ptr == other.pointer().ptr && pointer().length == other.pointer().length;
+    return std::visit(
+        [&other](const auto& mine) {
+            using T = std::decay_t<decltype(mine)>;
+            if constexpr (std::is_same_v<T, PathPtr> || std::is_same_v<T, InstancePtr> ||
+                          std::is_same_v<T, CMPIValuePtr>)
+                return false;
+            else
+                return mine == std::get<T>(other.m_data);
+        },
+        m_data);
+}
+
+// -- NamedValues, ObjectPath, Instance ------------------------------------------------------
+
+NamedValues::NamedValues(std::initializer_list<Entry> entries) {
+    for (const Entry& entry : entries) set(entry.name, entry.value);
+}
+
+void NamedValues::set(const std::string& name, Value value) {
+    if (const Value* present = find(name))
+        *const_cast<Value*>(present) = std::move(value);
+    else
+        m_entries.push_back({name, std::move(value)});
+}
+
+const Value* NamedValues::find(const std::string& name) const {
+    for (const Entry& entry : m_entries)
+        if (sameName(entry.name, name)) return &entry.value;
+    return nullptr;
+}
+
+bool NamedValues::erase(const std::string& name) {
+    const auto at = std::find_if(m_entries.begin(), m_entries.end(),
+                                 [&](const Entry& entry) { return sameName(entry.name, name); });
+    if (at == m_entries.end()) return false;
+    m_entries.erase(at);
+    return true;
+}
+
+bool NamedValues::operator==(const NamedValues& other) const {
+    return size() == other.size() &&
+           std::all_of(m_entries.begin(), m_entries.end(), [&other](const Entry& entry) {
+               const Value* twin = other.find(entry.name);
+               return twin && *twin == entry.value;
+           });
+}
+
+bool ObjectPath::operator==(const ObjectPath& other) const {
+    return sameName(host, other.host) && sameName(nameSpace, other.nameSpace) &&
+           sameName(className, other.className) && keys == other.keys;
+}
+
+bool Instance::operator==(const Instance& other) const {
+    return path == other.path && properties == other.properties;
+}
+
+}  // namespace cimom

@@ -1,0 +1,194 @@
+/// The values of CIM: scalars, date-times, object paths, instances and arrays of these.
+///
+/// One model for the whole object manager. The C objects that a provider sees (CMPIInstance,
+/// CMPIObjectPath, ...) are handles on these; what a Server answers is made of these.
+/// All types are plain values: copying copies, nothing is shared that can change.
+/// Thread-safety: that of standard containers.
+#ifndef CIMOM_VALUE_H
+#define CIMOM_VALUE_H
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <type_traits>
+#include <utility>
+#include <variant>
+#include <vector>
+
+#include "cmpidt.h"
+
+namespace cimom {
+
+struct ObjectPath;
+struct Instance;
+
+/// True when both are equal but for the case of ASCII letters, as names are in CIM.
+bool sameName(const std::string& a, const std::string& b);
+
+/// A point in time or an interval, held in the 25-character text form of CIM:
+/// "yyyymmddhhmmss.mmmmmmsutc" or "ddddddddhhmmss.mmmmmm:000".
+class DateTime {
+public:
+    /// The interval of length zero.
+    DateTime();
+    /// @param microseconds  since 1970-01-01 UTC, or the length of the interval
+    static DateTime fromBinary(std::uint64_t microseconds, bool interval);
+    static DateTime now();
+    /// @return false, leaving @p result, unless @p text has one of the two forms; digits may be
+    ///         replaced by asterisks from the right, field by field
+    static bool parse(const std::string& text, DateTime& result);
+
+    const std::string& text() const { return m_text; }
+    bool isInterval() const;
+    /// Microseconds as in fromBinary; fields of asterisks count as their lowest value.
+    std::uint64_t binary() const;
+    bool operator==(const DateTime& other) const { return m_text == other.m_text; }
+
+private:
+    std::string m_text;
+};
+
+/// One CIM value with its CMPI type; null values have a type too.
+///
+/// Strings are always of type CMPI_string, whichever way they came. An array has the type of its
+/// elements with CMPI_ARRAY; each element is a Value of the element type and may be null.
+class Value {
+public:
+    using Array = std::vector<Value>;
+
+    /// A null without a type (CMPI_null).
+    Value() = default;
+    static Value null(CMPIType type);
+    static Value char16(std::uint16_t unit);
+    /// A raw memory area, as context entries may hold; the memory is not owned.
+    static Value pointer(CMPIValuePtr area);
+    /// @param elementType  without CMPI_ARRAY
+    static Value array(CMPIType elementType, Array elements);
+
+    /// From the C++ types that CIM has: bool, integers by width and sign, float, double.
+    template <class T, class = std::enable_if_t<std::is_arithmetic_v<T>>>
+    Value(T v) : m_type(typeOf<T>()) {  // NOLINT: a value reads as one
+        if constexpr (std::is_same_v<T, bool>)
+            m_data = v;
+        else if constexpr (std::is_floating_point_v<T>)
+            m_data = static_cast<double>(v);
+        else if constexpr (std::is_signed_v<T>)
+            m_data = static_cast<std::int64_t>(v);
+        else
+            m_data = static_cast<std::uint64_t>(v);
+    }
+    Value(const char* text);          // NOLINT
+    Value(std::string text);          // NOLINT
+    Value(DateTime when);             // NOLINT
+    Value(const ObjectPath& path);    // NOLINT
+    Value(const Instance& embedded);  // NOLINT
+
+    CMPIType type() const { return m_type; }
+    bool isNull() const { return m_data.index() == 0; }
+    bool isArray() const { return (m_type & CMPI_ARRAY) != 0; }
+    /// Gives a null its type; a value keeps its own.
+    void retypeNull(CMPIType type);
+
+    /// The getters require the matching type and a value: std::bad_variant_access otherwise.
+    bool boolean() const { return std::get<bool>(m_data); }
+    std::uint64_t uint() const { return std::get<std::uint64_t>(m_data); }
+    std::int64_t sint() const { return std::get<std::int64_t>(m_data); }
+    double real() const { return std::get<double>(m_data); }
+    const std::string& text() const { return std::get<std::string>(m_data); }
+    const DateTime& dateTime() const { return std::get<DateTime>(m_data); }
+    const ObjectPath& reference() const { return *std::get<PathPtr>(m_data); }
+    const Instance& instance() const { return *std::get<InstancePtr>(m_data); }
+    const CMPIValuePtr& pointer() const { return std::get<CMPIValuePtr>(m_data); }
+    const Array& elements() const { return std::get<Array>(m_data); }
+
+    /// This value as a value of another type, where nothing is lost: integers that fit, a
+    /// text that is a date-time, and the like.
+    /// @return false, leaving @p result, when there is no such value
+    bool convertTo(CMPIType type, Value& result) const;
+
+    /// Equal in type and content; paths and instances are compared member by member.
+    bool operator==(const Value& other) const;
+    bool operator!=(const Value& other) const { return !(*this == other); }
+
+private:
+    using PathPtr = std::shared_ptr<const ObjectPath>;
+    using InstancePtr = std::shared_ptr<const Instance>;
+
+    template <class T>
+    static constexpr CMPIType typeOf() {
+        if (std::is_same_v<T, bool>) return CMPI_boolean;
+        if (std::is_floating_point_v<T>) return sizeof(T) == 4 ? CMPI_real32 : CMPI_real64;
+        constexpr CMPIType bySize[] = {CMPI_uint8, CMPI_uint16, CMPI_uint32, CMPI_uint64,
+                                       CMPI_sint8, CMPI_sint16, CMPI_sint32, CMPI_sint64};
+        const int width = sizeof(T) == 1 ? 0 : sizeof(T) == 2 ? 1 : sizeof(T) == 4 ? 2 : 3;
+        return bySize[width + (std::is_signed_v<T> ? 4 : 0)];
+    }
+
+    CMPIType m_type = CMPI_null;
+    std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, std::string, DateTime,
+                 PathPtr, InstancePtr, CMPIValuePtr, Array>
+        m_data;
+};
+
+/// Values by name, in the order in which they came; names differ by more than case.
+/// The keys of a path, the properties of an instance, the arguments of a method, the entries
+/// of a context.
+class NamedValues {
+public:
+    struct Entry {
+        std::string name;
+        Value value;
+    };
+
+    NamedValues() = default;
+    NamedValues(std::initializer_list<Entry> entries);
+
+    /// Replaces the value of that name, or appends.
+    void set(const std::string& name, Value value);
+    /// @return null when there is none; valid until the next change
+    const Value* find(const std::string& name) const;
+    /// @return false when there was none
+    bool erase(const std::string& name);
+
+    std::size_t size() const { return m_entries.size(); }
+    bool empty() const { return m_entries.empty(); }
+    const Entry& at(std::size_t index) const { return m_entries.at(index); }
+    auto begin() const { return m_entries.begin(); }
+    auto end() const { return m_entries.end(); }
+
+    /// Same names and values, in any order.
+    bool operator==(const NamedValues& other) const;
+
+private:
+    std::vector<Entry> m_entries;
+};
+
+/// The name of a class or, with keys, of an instance.
+struct ObjectPath {
+    std::string host;
+    std::string nameSpace;
+    std::string className;
+    NamedValues keys;
+
+    ObjectPath() = default;
+    ObjectPath(std::string ns, std::string cls, NamedValues bindings = {})
+        : nameSpace(std::move(ns)), className(std::move(cls)), keys(std::move(bindings)) {}
+
+    /// Names compare without case; the host counts.
+    bool operator==(const ObjectPath& other) const;
+};
+
+struct Instance {
+    ObjectPath path;
+    NamedValues properties;
+
+    Instance() = default;
+    explicit Instance(ObjectPath p, NamedValues values = {})
+        : path(std::move(p)), properties(std::move(values)) {}
+
+    bool operator==(const Instance& other) const;
+};
+
+}  // namespace cimom
+
+#endif

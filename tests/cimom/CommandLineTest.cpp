@@ -1,0 +1,176 @@
+// The program cimom as a child process, with the fixture library.
+#include <gtest/gtest.h>
+#include <signal.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <filesystem>
+#include <fstream>
+#include <nlohmann/json.hpp>
+#include <sstream>
+
+#include "Fixture.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+class CommandLine : public testing::Test {
+protected:
+    struct Run {
+        int exit;
+        std::string out;
+        std::string err;
+    };
+
+    CommandLine() {
+        std::string name = (fs::temp_directory_path() / "commandXXXXXX").string();
+        m_folder = mkdtemp(name.data());
+        std::ofstream(m_folder / "fixture.mof") << fixture::kMof;
+        const nlohmann::json row = {
+            {"provider", "Fixture"},
+            {"interfaces", {"instance", "association", "method", "indication", "property"}}};
+        const nlohmann::json json = {
+            {"namespace", "root/cimv2"},
+            {"library", FIXTURE_LIBRARY},
+            {"classes", {{"Fix_Thing", row}, {"Fix_Link", row}, {"Fix_Event", row}}}};
+        std::ofstream(m_folder / "fixture.json") << json.dump();
+    }
+    ~CommandLine() override { fs::remove_all(m_folder); }
+
+    pid_t start(std::vector<std::string> arguments) {
+        arguments.insert(arguments.begin(), CIMOM_PROGRAM);
+        std::vector<char*> argv;
+        for (std::string& each : arguments) argv.push_back(each.data());
+        argv.push_back(nullptr);
+        const pid_t child = fork();
+        if (child == 0) {
+            if (chdir(m_folder.c_str()) != 0 || !freopen("out", "w", stdout) ||
+                !freopen("err", "w", stderr))
+                _exit(99);
+            setenv("CIMOM_REGISTRATION", "fixture.json", 1);
+            execv(CIMOM_PROGRAM, argv.data());
+            _exit(98);
+        }
+        return child;
+    }
+    Run finish(pid_t child) {
+        int status = 0;
+        waitpid(child, &status, 0);
+        return {WIFEXITED(status) ? WEXITSTATUS(status) : -1, read("out"), read("err")};
+    }
+    Run run(const std::vector<std::string>& arguments) { return finish(start(arguments)); }
+    Run runTyped(std::vector<std::string> arguments) {
+        arguments.insert(arguments.begin(), {"--schema", "fixture.mof"});
+        return run(arguments);
+    }
+
+    std::string read(const char* name) {
+        std::ostringstream text;
+        text << std::ifstream(m_folder / name).rdbuf();
+        return text.str();
+    }
+
+    fs::path m_folder;
+};
+
+TEST_F(CommandLine, PathsThatArePrintedCanBeGivenBack) {
+    const Run names = run({"ein", "Fix_Thing"});
+    ASSERT_EQ(names.exit, 0) << names.err;
+    EXPECT_EQ(names.out,
+              "root/cimv2:Fix_Thing.Name=\"one\"\n"
+              "root/cimv2:Fix_Thing.Name=\"two, \\\"quoted\\\" \\\\\"\n");
+    const std::string second = names.out.substr(names.out.find('\n') + 1);
+    const std::string path = second.substr(0, second.size() - 1);
+    const Run one = run({"gi", path, "--properties", "Size"});
+    EXPECT_EQ(one.out, "// " + path + "\ninstance of Fix_Thing {\n    Size = 2;\n};\n");
+    const Run json = run({"--format", "json", "ei", "Fix_Thing"});
+    const auto parsed = nlohmann::json::parse(json.out);
+    ASSERT_EQ(parsed.size(), 2U);
+    EXPECT_EQ(parsed[1]["path"], path);
+    EXPECT_EQ(parsed[1]["properties"]["Tags"], nlohmann::json({"first", nullptr}));
+}
+
+TEST_F(CommandLine, FailuresAreTold) {
+    const struct {
+        std::vector<std::string> arguments;
+        int exit;
+        std::string err;
+    } rows[] = {
+        {{"gi", "Fix_Thing.Name=\"none\""}, 6, "CIM_ERR_NOT_FOUND (6): no such thing\n"},
+        {{"ei", "Other"}, 7, "CIM_ERR_NOT_SUPPORTED (7): no provider serves class Other"},
+        {{"gi", "Fix_Thing.Name"}, 4, "CIM_ERR_INVALID_PARAMETER (4): at character 15 of "},
+        {{"gc", "Fix_Thing"}, 7, "CIM_ERR_NOT_SUPPORTED (7): no classes are known without"},
+        {{"ei"}, 64, "class is required"},
+        {{"dance"}, 64, ""},
+        {{}, 64, ""},
+        {{"--broker", "fat", "ei", "C"}, 64, "--broker"},
+        {{"--registration", "none.json", "ei", "C"}, 78, "cimom: none.json: cannot be read"},
+        {{"--schema", "fixture.json", "ei", "C"}, 78, "cimom: fixture.json:1:1"},
+        {{"--provider-output", "no/such", "ei", "C"}, 78, "cimom: no/such: "},
+    };
+    for (const auto& row : rows) {
+        const Run result = run(row.arguments);
+        EXPECT_EQ(result.exit, row.exit) << result.err;
+        EXPECT_EQ(result.err.substr(0, row.err.size()), row.err);
+        EXPECT_EQ(result.out, "");
+    }
+    const Run unknown = runTyped({"mi", "Fix_Thing.Name=\"one\"", "Colour=red"});
+    EXPECT_EQ(unknown.exit, 4) << unknown.err;
+    const Run help = run({"gi", "--help"});
+    EXPECT_EQ(help.exit, 0);
+    EXPECT_NE(help.out.find("--properties"), std::string::npos);
+}
+
+TEST_F(CommandLine, ProvidersDoNotPrintAmongResults) {
+    const char* line = "fixture: a line for standard output\n";
+    EXPECT_EQ(run({"ein", "Fix_Thing"}).err, "");
+    EXPECT_EQ(run({"--provider-output", "stderr", "ein", "Fix_Thing"}).err, line);
+    run({"ein", "Fix_Thing", "--provider-output", "provider.log"});
+    EXPECT_EQ(read("provider.log"), line);
+    EXPECT_EQ(run({"--trace", "1", "watch", "Nothing"}).exit, 7);
+}
+
+TEST_F(CommandLine, VerbsThatChange) {
+    const struct {
+        std::vector<std::string> arguments;
+        std::string out;
+    } rows[] = {
+        {{"ci", "Fix_Thing", "Name=new", "Size=7"}, "root/cimv2:Fix_Thing.Name=\"new\"\n"},
+        {{"mi", "Fix_Thing.Name=\"one\"", "Size=7"}, ""},
+        {{"di", "Fix_Thing.Name=\"one\""}, ""},
+        {{"sp", "Fix_Thing.Name=\"one\"", "Size", "8"}, ""},
+        {{"gp", "Fix_Thing.Name=\"one\"", "Size"}, "1\n"},
+        {{"ain", "Fix_Thing.Name=\"two, \\\"quoted\\\" \\\\\"", "--assoc-class", "Fix_Link"},
+         "root/cimv2:Fix_Thing.Name=\"one\"\n"},
+        {{"rin", "Fix_Thing.Name=\"one\"", "--role", "Dependent"}, ""},
+        {{"ec", "Fix_Base"}, "Fix_Thing\n"},
+        {{"im", "Fix_Thing.Name=\"one\"", "Echo", "Number=5", "Names={a,\"b,c\"}",
+          "Thing=Fix_Base.Name=\"x\"", "Parts={instance of Fix_Thing { Size = 3; }}"},
+         "returnValue = 4;\nNumber = 5;\nNames = {\"a\", \"b,c\"};\n"
+         "Thing = \"Fix_Base.Name=\\\"x\\\"\";\n"
+         "Parts = {instance of Fix_Thing {\n    Size = 3;\n}};\n"},
+        {{"--format", "json", "im", "Fix_Thing.Name=\"one\"", "Echo", "Number=5"},
+         "{\n  \"returnValue\": 1,\n  \"out\": {\n    \"Number\": 5\n  }\n}\n"},
+    };
+    for (const auto& row : rows) {
+        const Run result = runTyped(row.arguments);
+        EXPECT_EQ(result.exit, 0) << result.err;
+        EXPECT_EQ(result.out, row.out);
+    }
+    EXPECT_NE(runTyped({"gc", "Fix_Thing"}).out.find("class Fix_Thing : Fix_Base {"),
+              std::string::npos);
+}
+
+// Nothing fires in that process, and so it watches until it is told to end.
+TEST_F(CommandLine, WatchingEndsWithASignal) {
+    const pid_t child = start({"--trace", "1", "watch", "Fix_Event"});
+    for (int i = 0; i < 500 && read("err").find("enable") == std::string::npos; ++i) usleep(20000);
+    kill(child, SIGTERM);
+    const Run result = finish(child);
+    EXPECT_EQ(result.exit, 0);
+    EXPECT_NE(result.err.find("trace 1 Fixture: deactivate Fix_Event edge"), std::string::npos)
+        << result.err;
+}
+
+}  // namespace

@@ -1,0 +1,56 @@
+#include "HostProvider.h"
+
+#include "ProviderFactories.h"
+
+namespace {
+
+using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
+
+const std::vector<PropertyRow> kRows = {
+    {"ElementName", ValueKind::Text, Host::ATTR_NAME},
+    {"Caption", ValueKind::Text, Host::ATTR_NAME},
+    {"EnabledState", ValueKind::EnabledState, Host::ATTR_STATE},
+    {"OperationalStatus", ValueKind::Status, Host::ATTR_STATE},
+    {"State", ValueKind::Text, Host::ATTR_STATE},
+    {"TypeModel", ValueKind::Text, Host::ATTR_TYPE_MODEL},
+    {"SerialNumber", ValueKind::Text, Host::ATTR_SERIAL_NUM},
+    {"IPAddress", ValueKind::Text, Host::ATTR_IPADDR},
+    {"SystemTime", ValueKind::Timestamp, Host::ATTR_SYS_TIME},
+    {"PowerOffPolicy", ValueKind::Flag, Host::ATTR_POWER_OFF_POLICY},
+    {"ServiceProcessorVersion", ValueKind::Text, Host::ATTR_SP_VERSION},
+    {"MaxLpars", ValueKind::Uint32, Host::ATTR_MAX_LPARS},
+    {"ServiceLparID", ValueKind::Uint16, Host::ATTR_SERVICE_LPAR_ID},
+    {"ActiveLparMobilityCapable", ValueKind::Flag, Host::ATTR_ACTIVE_LPAR_MOBILITY_CAPABLE},
+    {"InactiveLparMobilityCapable", ValueKind::Flag, Host::ATTR_INACTIVE_LPAR_MOBILITY_CAPABLE},
+    {"VirtualIOServerCapable", ValueKind::Flag, Host::ATTR_VIRTUAL_IO_SERVER_CAPABLE},
+    {"VirtualSwitchCapable", ValueKind::Flag, Host::ATTR_VIRTUAL_SWITCH_CAPABLE},
+    {"ActiveMemorySharingCapable", ValueKind::Flag, Host::ATTR_ACTIVE_MEMORY_SHARING_CAPABLE},
+    {"LparSuspendCapable", ValueKind::Flag, Host::ATTR_LPAR_SUSPEND_CAPABLE},
+    {"LparRemoteRestartCapable", ValueKind::Flag, Host::ATTR_CORALHV_LPAR_REMOTE_RESTART_CAPABLE},
+    {"LparProcCompatModes", ValueKind::TextList, Host::ATTR_LPAR_PROC_COMPAT_MODES},
+};
+
+}  // namespace
+
+HostProvider::HostProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+    : CmpiBaseMI(mb, ctx),
+      ComputerSystemProvider(mb, ctx, name, "ORXC_CEC_CS", kRows,
+                             {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM}) {}
+
+void HostProvider::find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+                        const Sink& sink) {
+    if (!isHostName(name)) return;
+    try {
+        const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, name.c_str());
+        if (hosts.size() == 1) sink(hostName(*hosts[0]), *hosts[0]);
+    } catch (const zemException& e) {
+        if (!isUnknownObject(e)) throw;
+    }
+}
+
+void HostProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
+    const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, nullptr);
+    for (int i = 0; i < hosts.size(); ++i) sink(hostName(*hosts[i]), *hosts[i]);
+}
+
+ZEM_PROVIDER(ORXC_CEC_CSProvider, HostProvider)

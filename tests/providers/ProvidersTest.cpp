@@ -1,0 +1,207 @@
+// The providers as a server sees them: the built library, loaded by a broker of each character,
+// over the tools of an appliance in a temporary folder.
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include <map>
+
+#include "Server.h"
+#include "TestAppliance.h"
+
+namespace {
+
+using namespace cimom;
+using testing_support::lines;
+using testing_support::TestAppliance;
+
+constexpr const char* kHostClass = "ORXC_CEC_CS";
+constexpr const char* kPartitionClass = "ORXC_LPAR_CS";
+
+ObjectPath system(const char* className, const std::string& name) {
+    return {"root/cimv2", className, {{"CreationClassName", className}, {"Name", name}}};
+}
+
+std::string textOf(const Instance& instance, const char* property) {
+    const Value* value = instance.properties.find(property);
+    if (value == nullptr || value->isNull()) return "";
+    return value->type() == CMPI_string ? value->text() : std::to_string(value->uint());
+}
+
+class ProvidersTest : public ::testing::TestWithParam<Character> {
+protected:
+    void SetUp() override {
+        ASSERT_EQ(m_appliance.run("appliance init").exit, 0);
+        Options options;
+        options.character = GetParam();
+        options.classes = ClassRepository::load(ZEM_SCHEMA);
+        m_server = std::make_unique<Server>(options);
+        m_server->loadRegistration(ZEM_REGISTRATION);
+    }
+
+    /// What the tool prints, a field of each record.
+    std::vector<std::string> tool(const std::string& arguments) {
+        return lines(m_appliance.run("qyplat " + arguments).out);
+    }
+
+    TestAppliance m_appliance{ZEM_PROGRAMS};
+    std::unique_ptr<Server> m_server;
+    Request m_request;
+};
+
+TEST_P(ProvidersTest, HostsAreThoseOfTheTool) {
+    const Reply hosts = m_server->enumInstances(m_request, {"root/cimv2", kHostClass});
+    ASSERT_EQ(hosts.rc, CMPI_RC_OK) << hosts.message;
+    EXPECT_TRUE(hosts.done);
+    std::vector<std::string> names, states;
+    for (const Instance& host : hosts.instances) {
+        names.push_back(textOf(host, "TypeModel") + "," + textOf(host, "SerialNumber"));
+        states.push_back(textOf(host, "State"));
+        EXPECT_EQ(textOf(host, "Name"),
+                  textOf(host, "TypeModel") + "*" + textOf(host, "SerialNumber"));
+    }
+    EXPECT_GE(names.size(), 3u);
+    EXPECT_EQ(names, tool("-r sys -F type_model,serial_num"));
+    EXPECT_EQ(states, tool("-r sys -F state"));
+}
+
+TEST_P(ProvidersTest, EveryPartitionOfEveryHostIsEnumeratedAndGot) {
+    const Reply all = m_server->enumInstances(m_request, {"root/cimv2", kPartitionClass});
+    ASSERT_EQ(all.rc, CMPI_RC_OK) << all.message;
+    ASSERT_GE(all.instances.size(), 14u);
+    std::vector<ObjectPath> paths;
+    for (const Instance& partition : all.instances) {
+        paths.push_back(partition.path);
+        const Reply one = m_server->getInstance(m_request, partition.path);
+        ASSERT_EQ(one.rc, CMPI_RC_OK) << one.message;
+        EXPECT_TRUE(one.instances.at(0) == partition);
+
+        const std::string host = textOf(partition, "HostName");
+        EXPECT_EQ(textOf(partition, "Name"), textOf(partition, "LparID") + "*" + host);
+        const std::string filter = " --filter lpar_ids=" + textOf(partition, "LparID");
+        EXPECT_EQ(textOf(partition, "LparEnvironment"),
+                  tool("-r lpar -m '" + host + "' -F lpar_env" + filter).at(0));
+    }
+    EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", kPartitionClass}).paths,
+              paths);
+}
+
+TEST_P(ProvidersTest, OnlyWantedPropertiesAreAskedOfTheToolAndAnswered) {
+    const std::string seen = (m_appliance.folder() / "seen").string();
+    m_appliance.replaceTool("qyplat", "echo \"$@\" >'" + seen +
+                                          "'\n"
+                                          "echo 1111-AAA,0000001,Operating");
+    m_request.properties = {{"State", "EnabledState"}};
+    const Reply hosts = m_server->enumInstances(m_request, {"root/cimv2", kHostClass});
+    ASSERT_EQ(hosts.instances.size(), 1u) << hosts.message;
+    EXPECT_EQ(textOf(hosts.instances[0], "State"), "Operating");
+    EXPECT_EQ(textOf(hosts.instances[0], "EnabledState"), "2");
+    EXPECT_EQ(textOf(hosts.instances[0], "TypeModel"), "");
+    EXPECT_EQ(testing_support::contents(seen), "-r sys -F type_model,serial_num,state\n");
+}
+
+TEST_P(ProvidersTest, ToolRunsAsTheClientAndInItsLanguage) {
+    if (geteuid() != 0) GTEST_SKIP() << "only root can become another user";
+    m_appliance.replaceTool("qyplat", "printf 'T-1,S1,%s %s\\n' \"$(id -un)\" \"$LC_ALL\"");
+    m_request.user = "nobody";
+    m_request.language = "fr;q=0.5,de";
+    const Reply hosts = m_server->enumInstances(m_request, {"root/cimv2", kHostClass});
+    ASSERT_EQ(hosts.instances.size(), 1u) << hosts.message;
+    // third in the query stands the first attribute that only a property needs: the name
+    EXPECT_EQ(textOf(hosts.instances[0], "ElementName"), "nobody de_DE.UTF-8");
+}
+
+struct Failure {
+    const char* what;
+    ObjectPath path;
+    CMPIrc rc;
+    const char* message;
+};
+
+TEST_P(ProvidersTest, ClientReadsWhyAnObjectIsNotThere) {
+    const std::string notFound = "The requested object //";
+    const Failure rows[] = {
+        {"unknown host", system(kHostClass, "9999-ZZZ*0000000"), CMPI_RC_ERR_NOT_FOUND,
+         "The requested object root/cimv2:ORXC_CEC_CS.CreationClassName=\"ORXC_CEC_CS\","
+         "Name=\"9999-ZZZ*0000000\" of class ORXC_CEC_CS can not be found. The exception was "
+         "thrown from method getInstance on provider ORXC_CEC_CSProvider."},
+        {"unknown partition", system(kPartitionClass, "999*1111-AAA*0000001"),
+         CMPI_RC_ERR_NOT_FOUND,
+         "The requested object root/cimv2:ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\","
+         "Name=\"999*1111-AAA*0000001\" of class ORXC_LPAR_CS can not be found. The exception "
+         "was thrown from method getInstance on provider ORXC_LPAR_CSProvider."},
+        {"no name",
+         {"root/cimv2", kHostClass, {{"CreationClassName", kHostClass}}},
+         CMPI_RC_ERR_INVALID_PARAMETER,
+         "Key Name for class ORXC_CEC_CS is not provided to method getInstance on provider "
+         "ORXC_CEC_CSProvider."},
+        {"another class's name",
+         {"root/cimv2", kHostClass, {{"CreationClassName", "X"}, {"Name", "1111-AAA*0000001"}}},
+         CMPI_RC_ERR_NOT_FOUND,
+         "The requested object root/cimv2:ORXC_CEC_CS.CreationClassName=\"X\","
+         "Name=\"1111-AAA*0000001\" of class ORXC_CEC_CS can not be found. The exception was "
+         "thrown from method getInstance on provider ORXC_CEC_CSProvider."},
+    };
+    for (const Failure& row : rows) {
+        const Reply reply = m_server->getInstance(m_request, row.path);
+        EXPECT_EQ(reply.rc, row.rc) << row.what;
+        EXPECT_EQ(reply.message, row.message) << row.what;
+        EXPECT_TRUE(reply.instances.empty()) << row.what;
+    }
+}
+
+TEST_P(ProvidersTest, NoKeyReachesACommandLineUnlessItHasItsForm) {
+    const std::string seen = (m_appliance.folder() / "seen").string();
+    m_appliance.replaceTool("qyplat", "echo called >'" + seen + "'");
+    for (const char* name : {"1111-AAA", "*0000001", "1111-AAA*", "a*b*c", "1111-AAA*1\" -r prof \"",
+                             "a b*c", "a\\*c", "", "\xC3\xA4*1"}) {
+        EXPECT_EQ(m_server->getInstance(m_request, system(kHostClass, name)).rc,
+                  CMPI_RC_ERR_NOT_FOUND)
+            << name;
+        EXPECT_EQ(m_server->getInstance(m_request, system(kPartitionClass, name)).rc,
+                  CMPI_RC_ERR_NOT_FOUND)
+            << name;
+    }
+    EXPECT_FALSE(std::filesystem::exists(seen));
+}
+
+TEST_P(ProvidersTest, ToolsFailureReachesTheClientInItsWords) {
+    struct Row {
+        const char* script;
+        const char* message;
+    };
+    const char* const before =
+        "An exception occurred during executing method enumerateInstances on provider "
+        "ORXC_CEC_CSProvider. ";
+    const Row rows[] = {
+        {"echo 'WRTL1234 No more.' >&2; exit 3",
+         "The exception was thrown from method callGenericCommand on class zemCommandCaller with "
+         "an exception id of WRTL1234 and an exception string of \"WRTL1234 No more.\"."},
+        {"kill -9 $$",
+         "The exception was thrown from method executeCommand on class zemPropertiesHelper with "
+         "an exception id of CIM_ERROR and an exception string of \"Receive Signal:9\"."},
+        {"printf 'a,\"b\\n'",
+         "The exception was thrown from method callLsCommand on class zemCommandCaller with an "
+         "exception id of INVALID_RECORD and an exception string of \"a,\"b\n\"."},
+    };
+    for (const Row& row : rows) {
+        m_appliance.replaceTool("qyplat", row.script);
+        const Reply reply = m_server->enumInstances(m_request, {"root/cimv2", kHostClass});
+        EXPECT_EQ(reply.rc, CMPI_RC_ERR_FAILED) << row.script;
+        EXPECT_EQ(reply.message.rfind(before, 0), 0u) << reply.message;
+        // behind it stands the command line on whose behalf the work was done, where there is one
+        EXPECT_NE(reply.message.find(std::string(row.message).substr(0, 120)), std::string::npos)
+            << reply.message;
+    }
+    m_appliance.replaceTool("qyplat", "echo 'No results were found.'");
+    const Reply none = m_server->enumInstances(m_request, {"root/cimv2", kHostClass});
+    EXPECT_EQ(none.rc, CMPI_RC_OK) << none.message;
+    EXPECT_TRUE(none.instances.empty());
+}
+
+INSTANTIATE_TEST_SUITE_P(Brokers, ProvidersTest,
+                         ::testing::Values(Character::Full, Character::Lean),
+                         [](const auto& broker) {
+                             return broker.param == Character::Full ? "full" : "lean";
+                         });
+
+}  // namespace

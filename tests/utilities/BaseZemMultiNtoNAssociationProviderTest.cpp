@@ -1,0 +1,221 @@
+#include <thread>
+
+#include "AssociationDataPrepareUtils.h"
+#include "AssociationHarness.h"
+#include "BaseZemMultiNtoNAssociationProvider.h"
+
+namespace {
+
+const cimom::AssociationFilter kNone = {"Test_Link", "", "", ""};
+
+/// A side: serves the objects of the world, past the server.
+class Side : public zemBaseZemInstanceProvider {
+public:
+    Side(const CmpiBroker& mb, const CmpiContext& ctx)
+        : CmpiBaseMI(mb, ctx), zemBaseZemInstanceProvider(mb, ctx, "Side") {}
+    using zemBaseZemInstanceProvider::enumInstanceNames;
+    using zemBaseZemInstanceProvider::getInstance;
+
+    int getInstance(const CmpiContext&, const CmpiObjectPath& cop, const char**,
+                    CmpiInstance& out) override {
+        const auto& names = world->objects[cop.getClassName().charPtr()];
+        if (std::find(names.begin(), names.end(), nameOf(cop)) == names.end()) return -1;
+        out.setProperty("Name", CmpiData(nameOf(cop).c_str()));
+        return 0;
+    }
+    void enumInstanceNames(const CmpiContext&, const CmpiObjectPath& cop,
+                           zemDynamicArray<CmpiObjectPath>& out, const CmpiObjectPath&) override {
+        const std::string className = cop.getClassName().charPtr();
+        world->note("names:" + className);
+        world->onCall("names:" + className);
+        for (const std::string& name : world->objects[className]) {
+            out.addElement(new CmpiObjectPath(createObjectPath(cop)));
+            out[out.size() - 1]->setKey("Name", CmpiData(name.c_str()));
+        }
+    }
+};
+
+/// Adds the rows of the world as pairs; a namespace "none" stands for a missing handle.
+void addPairs(zemMultiNtoNAssociationDataSet& set, Side& side) {
+    const auto handle = [&](const char* nameSpace) {
+        return std::string(nameSpace) == "none" ? nullptr : &side;
+    };
+    for (const Row& r : world->rows)
+        set.addNewAssoPair(new zemMultiNtoNAssociationPair(
+            {handle(r[4]), r[2], r[3], ""}, {handle(r[7]), r[5], r[6], ""}, r[0], r[1]));
+}
+
+class Plain : public zemBaseZemMultiNtoNAssociationProvider {
+public:
+    Plain(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          zemBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
+          m_side(mb, ctx) {
+        addPairs(m_associationDataSet, m_side);
+    }
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& cop1,
+                               const CmpiObjectPath& cop2,
+                               const zemMultiNtoNAssociationPair& pair) override {
+        EXPECT_STREQ("Left", pair.m_leftAssiData.m_assoPropname);
+        return world->valid(nameOf(cop1), nameOf(cop2));
+    }
+    bool BeforeGenerateAssociation(const CmpiContext&, const char*) override {
+        return world->hook("before");
+    }
+    void AfterGenerateAssociation(const CmpiContext&, const char*) override {
+        world->hook("after");
+    }
+
+private:
+    Side m_side;
+};
+
+/// Objects belong together by the digits of their names.
+class Joined : public zemEnhanceBaseZemMultiNtoNAssociationProvider {
+public:
+    Joined(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          zemEnhanceBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
+          m_side(mb, ctx) {
+        addPairs(m_associationDataSet, m_side);
+    }
+    bool isValidateAssociationPlus(const CmpiContext&, const CmpiObjectPath& cop1,
+                                   const CmpiObjectPath& cop2, void* addInfo) override {
+        EXPECT_EQ(world.get(), addInfo);
+        world->note("pair");
+        return world->valid(nameOf(cop1), nameOf(cop2));
+    }
+    zemString getObjectPathHashKeyString(const CmpiObjectPath& cop, bool) override {
+        return byKey ? zemString(nameOf(cop).substr(1).c_str()) : zemString();
+    }
+    void* BeforeGenerateAssociation(const CmpiContext&, const char*,
+                                    const CmpiObjectPath&) override {
+        world->hook("before");
+        return world.get();
+    }
+    void AfterGenerateAssociation(const CmpiContext&, const char*, void* addInfo) override {
+        world->hook(addInfo == world.get() ? "after" : "after without context");
+    }
+    static inline bool byKey = false;
+
+private:
+    Side m_side;
+};
+
+const Row kSystemDisk = {"Test_Link", "", "Test_System", "Left", "", "Test_Disk", "Right", ""};
+const Row kSystemPort = {"Test_Link", "", "Test_System", "Left", "", "Test_Port", "Right", ""};
+const Row kSystems = {"", "", "Test_System", "Left", "", "Test_System", "Right", ""};
+const Row kNoHandle = {"Test_Link", "", "Test_System", "Left", "", "Test_Port", "Right", "none"};
+
+template <class Provider>
+class ProviderPairs : public testing::Test {
+protected:
+    void SetUp() override { Joined::byKey = false; }
+};
+using Bases = testing::Types<Plain, Joined>;
+TYPED_TEST_SUITE(ProviderPairs, Bases);
+
+TYPED_TEST(ProviderPairs, AnswerFromTheirHandles) {
+    const CMPIrc failed = CMPI_RC_ERR_FAILED;
+    const struct {
+        std::vector<Row> rows;
+        RequestCase request;
+        // clang-format off
+    } cases[] = {
+        {{kSystemDisk}, {"names", "ein", "", kNone, "s1-d1 s1-d2 s2-d1 s2-d2"}},
+        {{kSystemDisk, kSystemPort}, {"instances", "ei", "", kNone, "s1-d1 s1-d2 s2-d1 s2-d2 s1-p1 s2-p1"}},
+        {{kSystemDisk}, {"associators", "a", "s1", kNone, "d1 d2"}},
+        {{kSystemDisk}, {"from the right", "an", "d1", kNone, "s1 s2"}},
+        {{kSystemDisk}, {"references", "r", "d2", kNone, "s1-d2 s2-d2"}},
+        {{kSystemDisk, kSystemPort}, {"reference names", "rn", "s2", kNone, "s2-d1 s2-d2 s2-p1"}},
+        {{kSystems}, {"right of a self association", "rn", "s1", kNone, "s1-s1 s2-s1"}},
+        {{kSystemDisk}, {"role of the target", "an", "s1", {"Test_Link", "", "right", ""}, "d1 d2"}},
+        {{kSystemDisk}, {"role of the source", "an", "s1", {"Test_Link", "", "Left", ""}, ""}},
+        {{kSystemDisk}, {"result role", "an", "s1", {"Test_Link", "", "", "Left"}, "d1 d2"}},
+        {{kSystemDisk, kSystemPort}, {"result class", "an", "s1", {"Test_Link", "Test_Port", "", ""}, "p1"}},
+        {{kSystemDisk}, {"base", "an", "s1", {"Test_Link", "Test_Device", "", ""}, "d1 d2"}},
+        {{kSystemDisk}, {"class on no side", "an", "p1", kNone, ""}},
+        {{kSystemDisk}, {"no such source", "an", "s9", kNone, ""}},
+        {{kSystemDisk}, {"an association", "gi", "s1-d2", kNone, "s1-d2"}},
+        {{kSystemDisk}, {"no such object", "gi", "s1-d9", kNone, "", CMPI_RC_ERR_NOT_FOUND}},
+        {{kSystemDisk}, {"wrong side", "gi", "d1-s1", kNone, "", CMPI_RC_ERR_INVALID_PARAMETER}},
+        {{kNoHandle}, {"target without handle", "an", "s1", kNone, "", failed}},
+        {{kNoHandle}, {"side without handle", "ein", "", kNone, "", failed}},
+        {{kNoHandle, kSystemDisk}, {"a handle that is not needed", "an", "d1", kNone, "s1 s2"}},
+    };
+    // clang-format on
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.request.what);
+        for (const auto character : {cimom::Character::Full, cimom::Character::Lean}) {
+            World<TypeParam> w(character);
+            world->rows = c.rows;
+            // a pair without a class name serves whatever class its provider says it serves
+            if (c.rows[0][0][0] == '\0')
+                world->rows.push_back(kSystemDisk), world->objects["Test_Disk"].clear();
+            expectAnswer(w, c.request);
+        }
+    }
+}
+
+TYPED_TEST(ProviderPairs, AskForAClassOnceAnOperation) {
+    World<TypeParam> w;
+    world->rows = {kSystemDisk, kSystemPort};
+    w.run("ein", "");
+    EXPECT_EQ(1, world->count("names:Test_System"));
+    EXPECT_EQ(3, world->count("names:"));
+}
+
+TYPED_TEST(ProviderPairs, NameTheMissingHandle) {
+    World<TypeParam> w;
+    world->rows = {kNoHandle};
+    const char* const text = "rror occured while retrive the handle of the associated class.";
+    EXPECT_NE(std::string::npos, w.run("an", "s1").message.find(std::string("\"E") + text));
+    EXPECT_NE(std::string::npos, w.run("ein", "").message.find(std::string("\"e") + text));
+}
+
+// The hooks come in pairs, and what the After hook throws does not matter.
+TYPED_TEST(ProviderPairs, HooksThatThrow) {
+    constexpr bool plain = std::is_same_v<TypeParam, Plain>;
+    for (const Operation& op : kOperations) {
+        for (const std::string hook : {"before", "valid", "after"}) {
+            SCOPED_TRACE(op.letters + (" " + hook));
+            World<TypeParam> w;
+            const auto act = [&](const std::string& name) {
+                if (name == hook) throw zemOperationFailedException("hook failed");
+                return true;
+            };
+            world->onHook = act;
+            world->valid = [&](const std::string&, const std::string&) { return act("valid"); };
+            const cimom::Reply reply = w.run(op.letters, op.object);
+            EXPECT_EQ(hook == "after" ? CMPI_RC_OK : CMPI_RC_ERR_FAILED, reply.rc);
+            EXPECT_EQ(plain && hook == "before" ? 0 : 1, world->count("after"));
+            if (plain && hook == "before") {
+                EXPECT_NE(std::string::npos,
+                          reply.message.find("thrown from method zemAssociationDataPrepareUtility "
+                                             "on class zemAssociationDataPrepareUtility"))
+                    << reply.message;
+            }
+        }
+    }
+}
+
+TEST(ProviderPairsByKey, OnlyObjectsWithOneKeyAreCompared) {
+    Joined::byKey = true;
+    World<Joined> w;
+    EXPECT_EQ("s1-d1 s2-d2", show(w.run("ein", "")));
+    EXPECT_EQ(2, world->count("pair"));
+    EXPECT_EQ("s2-d2", show(w.run("rn", "d2")));
+    EXPECT_EQ(3, world->count("pair"));
+    EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, w.run("gi", "s1-d2").rc);
+}
+
+TEST(PreparationScopes, WithoutProviderOrRun) {
+    World<Joined> w;
+    const CmpiObjectPath path = (w.provider(), w.path(pathOf("s1")));
+    EXPECT_FALSE(zemAssociationDataPrepareUtility(nullptr, w.ctx(), "A").isInitialized());
+    EXPECT_EQ(nullptr, zemAssociationDataPrepareUtilityPlus(nullptr, w.ctx(), "A", path).run());
+    { const zemAssociationDataPrepareUtilityPlus never(&w.provider(), w.ctx(), "A", path); }
+    EXPECT_EQ(1, world->count("after without context"));
+}
+
+}  // namespace

@@ -1,0 +1,39 @@
+# What `cmake --install` gives: libraries, headers, programs, a CMake package, a pkg-config file.
+include(CMakePackageConfigHelpers)
+
+set(zem_installed zemutilities)
+file(GLOB zem_headers ${CMAKE_SOURCE_DIR}/utilities/*.h)
+install(FILES ${zem_headers} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zemutilities)
+
+# The bundled binding goes along; the system's own is found again by the package.
+if(TARGET cmpiCppImpl)
+  get_target_property(zem_cmpi_headers cmpiCppImpl PUBLIC_HEADER)
+  list(TRANSFORM zem_cmpi_headers PREPEND ${CMAKE_SOURCE_DIR}/cmpi/)
+  install(FILES ${zem_cmpi_headers} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/cmpi)
+  set_target_properties(cmpiCppImpl PROPERTIES PUBLIC_HEADER "")
+  list(APPEND zem_installed cmpiCppImpl cmpi_headers)
+endif()
+
+install(TARGETS ${zem_installed} EXPORT zemutilities
+  LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
+  RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+install(TARGETS cimom appliance appliance_tools RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+install(TARGETS zemproviders LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}/zemutilities)
+install(FILES ${CMAKE_SOURCE_DIR}/providers/zemproviders.json
+  DESTINATION ${CMAKE_INSTALL_LIBDIR}/zemutilities)
+install(DIRECTORY ${CMAKE_SOURCE_DIR}/providers/mof
+  DESTINATION ${CMAKE_INSTALL_DATADIR}/zemutilities)
+install(FILES README.md docs/architecture.md docs/appliance.md
+  DESTINATION ${CMAKE_INSTALL_DOCDIR})
+
+set(zem_package ${CMAKE_INSTALL_LIBDIR}/cmake/zemutilities)
+install(EXPORT zemutilities FILE zemutilitiesTargets.cmake NAMESPACE zem:: DESTINATION ${zem_package})
+configure_package_config_file(${CMAKE_SOURCE_DIR}/cmake/zemutilitiesConfig.cmake.in
+  ${CMAKE_BINARY_DIR}/zemutilitiesConfig.cmake INSTALL_DESTINATION ${zem_package})
+write_basic_package_version_file(${CMAKE_BINARY_DIR}/zemutilitiesConfigVersion.cmake
+  COMPATIBILITY SameMinorVersion)
+install(FILES ${CMAKE_BINARY_DIR}/zemutilitiesConfig.cmake
+  ${CMAKE_BINARY_DIR}/zemutilitiesConfigVersion.cmake DESTINATION ${zem_package})
+
+configure_file(${CMAKE_SOURCE_DIR}/cmake/zemutilities.pc.in ${CMAKE_BINARY_DIR}/zemutilities.pc @ONLY)
+install(FILES ${CMAKE_BINARY_DIR}/zemutilities.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)

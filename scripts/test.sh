@@ -21,8 +21,8 @@ while [ $# -gt 0 ]; do
 done
 
 install_missing $packages_build $packages_test
-bench=OFF
-build "$preset" -DZEM_BUILD_BENCH=$bench
+
+build "$preset" -DZEM_BUILD_TESTS=ON -DZEM_BUILD_BENCH=OFF
 
 say "testing ($preset)"
 export ASAN_OPTIONS=${ASAN_OPTIONS:-detect_leaks=1:strict_string_checks=1:detect_stack_use_after_return=1}

@@ -1,0 +1,83 @@
+#!/usr/bin/env bash
+# Installs what is missing, builds, runs the benchmarks and prints how each compares with its rival.
+#
+#   scripts/bench.sh                        release build, every benchmark
+#   scripts/bench.sh --build FOLDER         programs of a build folder that stands already
+#   scripts/bench.sh --only REGEX           only benchmarks (rival included) whose name matches
+#
+# Exits with 0 when every ratio keeps its limit.
+. "$(dirname "$0")/common.sh"
+
+folder=
+only=.
+while [ $# -gt 0 ]; do
+    case $1 in
+        --build) folder=${2:?--build needs a build folder}; shift 2 ;;
+        --only) only=${2:?--only needs a regular expression}; shift 2 ;;
+        -h | --help) sed -n '2,/^\./{/^\./d;s/^# \{0,1\}//;p}' "$0"; exit 0 ;;
+        *) die "unknown argument '$1'; see $0 --help" ;;
+    esac
+done
+
+if [ -z "$folder" ]; then
+    install_missing $packages_build $packages_bench
+    build release -DZEM_BUILD_TESTS=OFF -DZEM_BUILD_BENCH=ON
+    folder=$top/build/release
+fi
+
+results=$(mktemp -d)
+trap 'rm -rf "$results"' EXIT
+for program in "$folder"/bench/*; do
+    [ -f "$program" ] && [ -x "$program" ] || continue
+    name=$(basename "$program")
+    say "$name"
+    # Rivals take turns, so that what else the machine does weighs on both.
+    "$program" --benchmark_filter="$only" --benchmark_repetitions=5 \
+        --benchmark_enable_random_interleaving=true \
+        --benchmark_out="$results/$name.json" --benchmark_out_format=json >/dev/null
+done
+
+# The rows: benchmark, rival, how many times the rival's time it may take, milliseconds on top.
+python3 - "$results" <<'PY'
+import glob, json, statistics, sys
+
+ROWS = [
+    ("ParseRecords/100000", "LibcsvKeyed/100000", 1.0, 0),
+    ("ParseRecords/100000", "LibcsvRows/100000", None, 0),
+    ("ParseRecords/1000000", "ParseRecords/100000", 20.0, 0),
+    ("ExecuteCommand/real_time", "SpawnReadWait/real_time", 1.25, 2),
+]
+TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}
+
+runs = {}
+for path in glob.glob(sys.argv[1] + "/*.json"):
+    with open(path) as file:
+        text = file.read()
+    for run in json.loads(text)["benchmarks"] if text.strip() else []:
+        if run["run_type"] == "iteration":
+            runs.setdefault(run["run_name"], []).append(run)
+
+def median(name):
+    # Programs that sleep are timed by the clock, the others by the processor.
+    key = "real_time" if name.endswith("/real_time") else "cpu_time"
+    return statistics.median(run[key] * TO_MS[run["time_unit"]] for run in runs[name])
+
+paired = set()
+failed = False
+print("%-28s %12s   %-28s %12s %8s  %s" % ("benchmark", "ms", "rival", "ms", "ratio", "limit"))
+for name, rival, factor, slack in ROWS:
+    if name not in runs or rival not in runs:
+        continue
+    paired |= {name, rival}
+    mine, theirs = median(name), median(rival)
+    limit = "none"
+    if factor is not None:
+        kept = mine <= theirs * factor + slack
+        failed = failed or not kept
+        limit = "%.4g x%s %s" % (factor, " + %g ms" % slack if slack else "",
+                                 "kept" if kept else "BROKEN")
+    print("%-28s %12.3f   %-28s %12.3f %8.2f  %s" % (name, mine, rival, theirs, mine / theirs, limit))
+for name in sorted(set(runs) - paired):
+    print("%-28s %12.3f" % (name, median(name)))
+sys.exit(failed)
+PY

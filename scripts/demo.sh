@@ -1,0 +1,72 @@
+#!/usr/bin/env bash
+# Installs what is missing, builds, and shows a CIM request's whole road: an appliance, its tool
+# asked by hand, the same asked through CIM, and what a client reads when a thing is not there.
+#
+#   scripts/demo.sh
+#
+# Leaves nothing behind but the build. Exits with 0 when everything shown was as it should be.
+. "$(dirname "$0")/common.sh"
+
+case ${1:-} in
+    '') ;;
+    -h | --help) sed -n '2,/^\./{/^\./d;s/^# \{0,1\}//;p}' "$0"; exit 0 ;;
+    *) die "unknown argument '$1'; see $0 --help" ;;
+esac
+
+install_missing $packages_build
+build release -DZEM_BUILD_TESTS=OFF -DZEM_BUILD_BENCH=OFF
+
+folder=$(mktemp -d)
+trap 'rm -rf "$folder"' EXIT
+export PATH="$top/build/release/bin:$PATH" APPLIANCE_HOME="$folder/appliance"
+export CIMOM_REGISTRATION="$top/build/release/lib/zemproviders.json"
+export CIMOM_SCHEMA="$top/providers/mof/zem.mof"
+
+# quoted <word>...: the words as one would type them.
+quoted() {
+    local line= word
+    for word in "$@"; do
+        case $word in
+            *[!A-Za-z0-9_.,/:=-]*) line+="'$word' " ;;
+            *) line+="$word " ;;
+        esac
+    done
+    printf '%s' "${line% }"
+}
+
+# show <expected exit status> <command>...: prints the command, runs it, holds it to its status.
+show() {
+    local expected=$1 status=0
+    shift
+    printf '\n$ %s\n' "$(quoted "$@")"
+    "$@" || status=$?
+    [ "$status" -eq 0 ] || printf '(exit status %d)\n' "$status"
+    [ "$status" -eq "$expected" ] || die "expected exit status $expected"
+}
+
+host='ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name='
+
+say "an appliance with hosts and partitions"
+show 0 appliance init
+show 0 appliance show
+
+say "its tool, asked by hand"
+show 0 qyplat -r sys -F name,type_model,serial_num,state
+mtms=$(qyplat -r sys -F type_model,serial_num | head -1 | tr ',' '*')
+show 0 qyplat -r lpar -m "$mtms" -F lpar_id,name,lpar_env,state
+
+say "the same through CIM: broker, provider, frame, tool"
+show 0 cimom ein ORXC_CEC_CS
+show 0 cimom ein ORXC_LPAR_CS
+show 0 cimom ei ORXC_CEC_CS
+show 0 cimom ei ORXC_LPAR_CS --properties ElementName,State,LparEnvironment
+
+say "one object by its path"
+show 0 cimom gi "$host\"$mtms\""
+
+say "what a client reads when a thing is not there"
+show 5 cimom gi 'ORXC_Unknown.Name="1"'
+show 6 cimom gi "$host\"9999-ZZZ*0000000\""
+
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path, two failures by name.\n' \
+    "$(cimom ein ORXC_CEC_CS | wc -l)" "$(cimom ein ORXC_LPAR_CS | wc -l)"

@@ -3,138 +3,29 @@
 #include <strings.h>
 
 #include <algorithm>
-#include <cctype>
-#include <cstdlib>
-#include <ctime>
 #include <memory>
 
 namespace {
 
-using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
+constexpr const char kStateChange[] = "RequestStateChange";
 
-/// What clients are told of the state words of hosts and partitions.
-struct StateRow {
-    const char* word;
-    CMPIUint16 enabledState;
-    CMPIUint16 operationalStatus;
-};
+/// States that a client may ask for, and the answer to each of them.
+constexpr CMPIUint16 kRequestableStates[] = {2, 3, 4, 6, 7, 8, 9, 10, 11};
+constexpr CMPIUint32 kNotSupported = 1;
 
-constexpr StateRow kStates[] = {
-    {"Operating", 2, 2},
-    {"Running", 2, 2},
-    {"Standby", 6, 2},
-    {"Starting", 10, 8},
-    {"Initializing", 10, 8},
-    {"Shutting Down", 4, 9},
-    {"Open Firmware", 10, 8},
-    {"Suspended", 9, 15},
-    {"Not Activated", 3, 10},
-    {"Power Off", 3, 10},
-    {"Power Off In Progress", 4, 9},
-    {"Error", 1, 6},
-    {"No Connection", 0, 13},
-    {"Not Available", 0, 0},
-};
-constexpr StateRow kUnknownState = {"", 0, 0};
-
-const StateRow& stateRow(const char* word) {
-    const auto* row = std::find_if(std::begin(kStates), std::end(kStates), [&](const StateRow& r) {
-        return strcasecmp(r.word, word) == 0;
-    });
-    return row == std::end(kStates) ? kUnknownState : *row;
-}
-
-/// The whole text as a decimal number up to @p limit.
-bool parseNumber(const char* text, unsigned long limit, unsigned long& value) {
-    char* end = nullptr;
-    value = std::strtoul(text, &end, 10);
-    return std::isdigit(static_cast<unsigned char>(*text)) != 0 && *end == '\0' && value <= limit;
-}
-
-CmpiArray textList(const std::string& text) {
-    const auto count = static_cast<CMPICount>(1 + std::count(text.begin(), text.end(), ','));
-    CmpiArray list(count, CMPI_chars);
-    std::size_t from = 0;
-    for (CMPICount i = 0; i < count; ++i) {
-        const std::size_t to = std::min(text.find(',', from), text.size());
-        list[i] = CmpiData(text.substr(from, to - from).c_str());
-        from = to + 1;
-    }
-    return list;
-}
-
-CmpiArray oneNumber(CMPIUint16 value) {
-    CmpiArray list(1, CMPI_uint16);
-    CmpiData element;
-    element.setUint16(value);
-    list[0] = element;
-    return list;
-}
-
-/// Sets @p data from the text of an attribute.
-/// @return false when the text is empty or of another form, so that the property stays null
-bool convert(ValueKind kind, const char* text, CmpiData& data) {
-    unsigned long value = 0;
-    std::tm when = {};
-    switch (kind) {
-        case ValueKind::Text:
-            if (*text != '\0') data = CmpiData(text);
-            return *text != '\0';
-        case ValueKind::TextList:
-            if (*text != '\0') data = CmpiData(textList(text));
-            return *text != '\0';
-        case ValueKind::Uint16:
-            if (!parseNumber(text, 0xFFFF, value)) return false;
-            data.setUint16(static_cast<CMPIUint16>(value));
-            return true;
-        case ValueKind::Uint32:
-            if (!parseNumber(text, 0xFFFFFFFF, value)) return false;
-            data.setUint32(static_cast<CMPIUint32>(value));
-            return true;
-        case ValueKind::Flag:
-            if (!parseNumber(text, 1, value)) return false;
-            data.setBoolean(static_cast<CMPIBoolean>(value));
-            return true;
-        case ValueKind::Timestamp:
-            if (strptime(text, "%m/%d/%Y %H:%M:%S", &when) == nullptr) return false;
-            when.tm_isdst = -1;
-            data.setDateTime(zemBaseProvider::convertDateTime(static_cast<long>(mktime(&when))));
-            return true;
-        case ValueKind::EnabledState:
-            data.setUint16(stateRow(text).enabledState);
-            return true;
-        case ValueKind::Status:
-            data = CmpiData(oneNumber(stateRow(text).operationalStatus));
-            return true;
-    }
-    return false;
+CmpiData uint32(CMPIUint32 value) {
+    CmpiData data;
+    data.setUint32(value);
+    return data;
 }
 
 }  // namespace
-
-bool isHostName(const std::string& text) {
-    const std::size_t star = text.find('*');
-    return star != std::string::npos && star > 0 && star + 1 < text.size() &&
-           std::count(text.begin(), text.end(), '*') == 1 &&
-           std::all_of(text.begin(), text.end(),
-                       [](unsigned char c) { return std::isalnum(c) || c == '-' || c == '*'; });
-}
-
-bool isUnknownObject(const zemException& failure) {
-    const zemString id(failure.getExceptionId());
-    return failure.getExceptionType() == 5 || id == "WRTL8011" || id == "WRTL8018";
-}
-
-std::string hostName(const zemRecordType& host) {
-    return std::string(host[Host::ATTR_TYPE_MODEL]) + "*" +
-           static_cast<const char*>(host[Host::ATTR_SERIAL_NUM]);
-}
 
 ComputerSystemProvider::ComputerSystemProvider(const CmpiBroker& mb, const CmpiContext& ctx,
                                                const char* name, const char* className,
                                                std::vector<PropertyRow> rows, Attributes identity)
     : CmpiBaseMI(mb, ctx),
-      zemBaseProvider(mb, ctx, name),
+      zemBaseZemProvider(mb, ctx, name),
       m_className(className),
       m_rows(std::move(rows)),
       m_identity(std::move(identity)) {}
@@ -147,7 +38,7 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
     std::unique_ptr<CmpiInstance> found;
     if (strcasecmp(creationClass.charPtr(), m_className) == 0) {
         zemQyplatCmdCaller tool = toolFor(context);
-        find(tool, name.charPtr(), attributesFor(properties).data(),
+        find(tool, name.charPtr(), attributesFor(m_rows, m_identity, properties).data(),
              [&](const std::string& foundName, const zemRecordType& record) {
                  found = std::make_unique<CmpiInstance>(
                      systemInstance(path, properties, foundName, record));
@@ -161,7 +52,7 @@ void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, Cm
                                                   const CmpiObjectPath& path,
                                                   const char** properties) {
     zemQyplatCmdCaller tool = toolFor(context);
-    walk(tool, attributesFor(properties).data(),
+    walk(tool, attributesFor(m_rows, m_identity, properties).data(),
          [&](const std::string& name, const zemRecordType& record) {
              result.returnData(systemInstance(path, properties, name, record));
          });
@@ -170,21 +61,55 @@ void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, Cm
 void ComputerSystemProvider::performEnumInstanceNames(const CmpiContext& context,
                                                       CmpiResult& result,
                                                       const CmpiObjectPath& path) {
-    Attributes attributes = m_identity;
-    attributes.push_back(Host::ATTR_END);
     zemQyplatCmdCaller tool = toolFor(context);
-    walk(tool, attributes.data(), [&](const std::string& name, const zemRecordType&) {
-        result.returnData(systemPath(path, name));
-    });
+    walk(tool, attributesFor({}, m_identity, nullptr).data(),
+         [&](const std::string& name, const zemRecordType&) {
+             result.returnData(systemPath(path, name));
+         });
+}
+
+void ComputerSystemProvider::performSetInstance(const CmpiContext& context, CmpiResult&,
+                                                const CmpiObjectPath& path,
+                                                const CmpiInstance& instance,
+                                                const char** properties) {
+    const CmpiInstance present = performGetInstance(context, path, nullptr);
+    for (unsigned i = 0; i < instance.getPropertyCount(); ++i) {
+        CmpiString name;
+        instance.getProperty(static_cast<int>(i), &name);
+        if (containsProperty(properties, name.charPtr()))
+            validateUnmodifiableProperty(present, instance, name.charPtr());
+    }
+}
+
+void ComputerSystemProvider::performInvokeMethod(const CmpiContext&, CmpiResult& result,
+                                                 const CmpiObjectPath&, const char* method,
+                                                 const CmpiArgs& in, CmpiArgs&) {
+    if (strcasecmp(method, kStateChange) != 0) throwMethodNotFoundExc(method, m_className);
+    const CmpiData asked = getParmVal(in, "RequestedState");
+    const auto* end = std::end(kRequestableStates);
+    if (std::find(std::begin(kRequestableStates), end, asked.getUint16()) == end)
+        throwInvalidMethodArgValueExc("RequestedState", cmpidata2String(asked), method);
+    result.returnData(uint32(kNotSupported));
 }
 
 CMPIBoolean ComputerSystemProvider::isValidInstanceClass(const char* className) {
     return strcasecmp(className, m_className) == 0;
 }
 
+CMPIBoolean ComputerSystemProvider::isValidMethodClass(const char* className) {
+    return isValidInstanceClass(className);
+}
+
 void ComputerSystemProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
     keys[0] = CmpiData("CreationClassName");
     keys[1] = CmpiData("Name");
+}
+
+void ComputerSystemProvider::populateMethodArgs(const char*, zemDynamicArray<zemString>& args,
+                                                const char* method) {
+    if (strcasecmp(method, kStateChange) != 0) return;
+    args.addElement(new zemString("RequestedState"));
+    args.addElement(new zemString("TimeoutPeriod"));
 }
 
 const char* ComputerSystemProvider::getMessageBundlePath() { return ""; }
@@ -193,17 +118,6 @@ void ComputerSystemProvider::complete(CmpiInstance&, const std::string&, const c
 
 zemQyplatCmdCaller ComputerSystemProvider::toolFor(const CmpiContext& context) {
     return zemQyplatCmdCaller(getUserContext(context), getExternalLanguageName(context));
-}
-
-/// The identifying attributes and those of the wanted properties, each once.
-ComputerSystemProvider::Attributes ComputerSystemProvider::attributesFor(const char** properties) {
-    Attributes attributes = m_identity;
-    for (const PropertyRow& row : m_rows)
-        if (containsProperty(properties, row.property) &&
-            std::find(attributes.begin(), attributes.end(), row.attribute) == attributes.end())
-            attributes.push_back(row.attribute);
-    attributes.push_back(Host::ATTR_END);
-    return attributes;
 }
 
 CmpiObjectPath ComputerSystemProvider::systemPath(const CmpiObjectPath& near,
@@ -221,12 +135,7 @@ CmpiInstance ComputerSystemProvider::systemInstance(const CmpiObjectPath& near,
     CmpiInstance instance(systemPath(near, name));
     instance.setProperty("CreationClassName", CmpiData(m_className));
     instance.setProperty("Name", CmpiData(name.c_str()));
-    for (const PropertyRow& row : m_rows) {
-        CmpiData value;
-        if (containsProperty(properties, row.property) &&
-            convert(row.kind, record[row.attribute], value))
-            instance.setProperty(row.property, value);
-    }
+    setProperties(instance, m_rows, properties, record);
     complete(instance, name, properties);
     return instance;
 }

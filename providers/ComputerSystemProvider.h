@@ -4,6 +4,9 @@
 /// says how to find one system and how to walk all. The tool runs under the client's user and in
 /// the client's language, and is asked only for the attributes that the wanted properties need.
 ///
+/// A modification may repeat what is already so, and is refused when it would change anything.
+/// RequestStateChange answers "Not Supported" to every state there is.
+///
 /// Thread-safety: as the frame demands, no state beside the constant rows; any number of
 /// operations at once.
 #ifndef COMPUTER_SYSTEM_PROVIDER_H
@@ -13,32 +16,12 @@
 #include <string>
 #include <vector>
 
-#include "BaseProvider.h"
-#include "Exception.h"
+#include "BaseZemProvider.h"
+#include "PropertyRows.h"
 #include "QyplatCmdCaller.h"
 
-/// How the text of a tool attribute becomes the value of a property. An empty text is null.
-enum class ValueKind {
-    Text,
-    TextList,      ///< "a,b" as an array of texts
-    Uint16,        ///< decimal; anything else is null
-    Uint32,        ///< likewise
-    Flag,          ///< "1" true, "0" false
-    Timestamp,     ///< "MM/DD/YYYY HH:MM:SS" as a date-time
-    EnabledState,  ///< state word as the number of CIM_EnabledLogicalElement.EnabledState
-    Status         ///< state word as a one-element CIM_ManagedSystemElement.OperationalStatus
-};
-
-/// One property and the attribute that fills it.
-struct PropertyRow {
-    const char* property;
-    ValueKind kind;
-    int attribute;
-};
-
-class ComputerSystemProvider : public zemBaseProvider {
+class ComputerSystemProvider : public zemBaseZemProvider {
 protected:
-    using Attributes = std::vector<int>;  ///< enumerators of one qyplat table
     /// Receives each record found, with the value of the Name key.
     using Sink = std::function<void(const std::string& name, const zemRecordType& record)>;
 
@@ -56,6 +39,10 @@ protected:
     /// Adds what follows from the Name alone.
     virtual void complete(CmpiInstance& instance, const std::string& name, const char** properties);
 
+    zemQyplatCmdCaller toolFor(const CmpiContext& context);
+    /// Path of the system with this Name, in the namespace of @p near.
+    CmpiObjectPath systemPath(const CmpiObjectPath& near, const std::string& name);
+
     // the frame's hooks
     CmpiInstance performGetInstance(const CmpiContext& context, const CmpiObjectPath& path,
                                     const char** properties) override;
@@ -63,14 +50,20 @@ protected:
                               const CmpiObjectPath& path, const char** properties) override;
     void performEnumInstanceNames(const CmpiContext& context, CmpiResult& result,
                                   const CmpiObjectPath& path) override;
+    void performSetInstance(const CmpiContext& context, CmpiResult& result,
+                            const CmpiObjectPath& path, const CmpiInstance& instance,
+                            const char** properties) override;
+    void performInvokeMethod(const CmpiContext& context, CmpiResult& result,
+                             const CmpiObjectPath& path, const char* method, const CmpiArgs& in,
+                             CmpiArgs& out) override;
     CMPIBoolean isValidInstanceClass(const char* className) override;
+    CMPIBoolean isValidMethodClass(const char* className) override;
     void populateEssentialKeys(const char* className, CmpiArray& keys) override;
+    void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
+                            const char* method) override;
     const char* getMessageBundlePath() override;
 
 private:
-    zemQyplatCmdCaller toolFor(const CmpiContext& context);
-    Attributes attributesFor(const char** properties);
-    CmpiObjectPath systemPath(const CmpiObjectPath& near, const std::string& name);
     CmpiInstance systemInstance(const CmpiObjectPath& near, const char** properties,
                                 const std::string& name, const zemRecordType& record);
 
@@ -78,15 +71,5 @@ private:
     const std::vector<PropertyRow> m_rows;
     const Attributes m_identity;  ///< what find and walk need to form the Name
 };
-
-/// Whether a text has the form of a host's key, <type_model>*<serial_num>. Keys come from
-/// clients and go into command lines, so nothing else may pass.
-bool isHostName(const std::string& text);
-
-/// Whether a tool failed because it knows no such host or partition.
-bool isUnknownObject(const zemException& failure);
-
-/// The key of the host that a qyplat host record describes.
-std::string hostName(const zemRecordType& host);
 
 #endif

@@ -1,5 +1,7 @@
 #include "HostProvider.h"
 
+#include <strings.h>
+
 #include "ProviderFactories.h"
 
 namespace {
@@ -30,6 +32,8 @@ const std::vector<PropertyRow> kRows = {
     {"LparProcCompatModes", ValueKind::TextList, Host::ATTR_LPAR_PROC_COMPAT_MODES},
 };
 
+constexpr const char kFindHost[] = "FindHost";
+
 }  // namespace
 
 HostProvider::HostProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
@@ -51,6 +55,38 @@ void HostProvider::find(zemQyplatCmdCaller& tool, const std::string& name, int* 
 void HostProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
     const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, nullptr);
     for (int i = 0; i < hosts.size(); ++i) sink(hostName(*hosts[i]), *hosts[i]);
+}
+
+void HostProvider::performInvokeMethod(const CmpiContext& context, CmpiResult& result,
+                                       const CmpiObjectPath& path, const char* method,
+                                       const CmpiArgs& in, CmpiArgs& out) {
+    if (strcasecmp(method, kFindHost) != 0) {
+        ComputerSystemProvider::performInvokeMethod(context, result, path, method, in, out);
+        return;
+    }
+    const CmpiString wanted = getParmVal(in, "ElementName").getString();
+    int attributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_NAME,
+                        Host::ATTR_END};
+    zemQyplatCmdCaller tool = toolFor(context);
+    std::string found;
+    walk(tool, attributes, [&](const std::string& name, const zemRecordType& host) {
+        if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;
+    });
+    if (found.empty()) throwObjectNotFoundExc(kFindHost, "ORXC_CEC_CS", wanted.charPtr());
+    out.setArg("Host", CmpiData(systemPath(path, found)));
+    CmpiData completed;
+    completed.setUint32(0);
+    result.returnData(completed);
+}
+
+CMPIBoolean HostProvider::isStaticMethod(const char*, const char* method) {
+    return strcasecmp(method, kFindHost) == 0;
+}
+
+void HostProvider::populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
+                                      const char* method) {
+    ComputerSystemProvider::populateMethodArgs(className, args, method);
+    if (strcasecmp(method, kFindHost) == 0) args.addElement(new zemString("ElementName"));
 }
 
 ZEM_PROVIDER(ORXC_CEC_CSProvider, HostProvider)

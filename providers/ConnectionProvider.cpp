@@ -1,0 +1,111 @@
+#include "ConnectionProvider.h"
+
+#include <strings.h>
+
+#include <memory>
+
+#include "PropertyRows.h"
+#include "ProviderFactories.h"
+#include "QylinkCmdCaller.h"
+
+namespace {
+
+using Link = zemQylinkCmdCaller::ALL;
+
+constexpr const char kClass[] = "ORXC_HostConnection";
+constexpr const char kPrefix[] = "ORX:";
+
+const Attributes kIdentity = {Link::ATTR_TYPE_MODEL_SERIAL_NUM, Link::ATTR_SP};
+
+const std::vector<PropertyRow> kRows = {
+    {"HostName", ValueKind::Text, Link::ATTR_TYPE_MODEL_SERIAL_NUM},
+    {"ServiceProcessor", ValueKind::Text, Link::ATTR_SP},
+    {"PhysicalLocation", ValueKind::Text, Link::ATTR_SP_PHYS_LOC},
+    {"IPAddress", ValueKind::Text, Link::ATTR_IPADDR},
+    {"EnabledState", ValueKind::EnabledState, Link::ATTR_STATE},
+    {"State", ValueKind::Text, Link::ATTR_STATE},
+    {"ErrorCode", ValueKind::Text, Link::ATTR_CONNECTION_ERROR_CODE},
+};
+
+std::string idOf(const zemRecordType& link) {
+    return std::string(kPrefix) + static_cast<const char*>(link[Link::ATTR_TYPE_MODEL_SERIAL_NUM]) +
+           ":" + static_cast<const char*>(link[Link::ATTR_SP]);
+}
+
+/// The host in an InstanceID; empty when it has not the form of one.
+std::string hostOf(const std::string& id) {
+    const std::size_t prefix = sizeof kPrefix - 1;
+    const std::size_t colon = id.rfind(':');
+    if (id.compare(0, prefix, kPrefix) != 0 || colon < prefix) return "";
+    const std::string host = id.substr(prefix, colon - prefix);
+    return isHostName(host) ? host : "";
+}
+
+}  // namespace
+
+ConnectionProvider::ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx,
+                                       const char* name)
+    : CmpiBaseMI(mb, ctx), zemBaseZemInstanceProvider(mb, ctx, name) {}
+
+int ConnectionProvider::getInstance(const CmpiContext& context, const CmpiObjectPath& path,
+                                    const char** properties, CmpiInstance& out) {
+    const std::string id = getKeyBinding(path, "InstanceID").getString().charPtr();
+    const std::string host = hostOf(id);
+    if (host.empty()) return -1;
+    zemQylinkCmdCaller tool(getUserContext(context), getExternalLanguageName(context));
+    try {
+        const zemRecordSetsType links = tool.getQylinkInformation(
+            attributesFor(kRows, kIdentity, properties).data(), host.c_str());
+        for (int i = 0; i < links.size(); ++i) {
+            if (idOf(*links[i]) != id) continue;
+            out.setProperty("InstanceID", CmpiData(id.c_str()));
+            setProperties(out, kRows, properties, *links[i]);
+            return 0;
+        }
+    } catch (const zemException& e) {
+        if (!isUnknownObject(e)) throw;
+    }
+    return -1;
+}
+
+void ConnectionProvider::enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
+                                           zemDynamicArray<CmpiObjectPath>& out,
+                                           const CmpiObjectPath&) {
+    zemQylinkCmdCaller tool(getUserContext(context), getExternalLanguageName(context));
+    const zemRecordSetsType links =
+        tool.getQylinkInformation(attributesFor({}, kIdentity, nullptr).data(), nullptr);
+    for (int i = 0; i < links.size(); ++i)
+        out.addElement(new CmpiObjectPath(connectionPath(path, idOf(*links[i]))));
+}
+
+void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
+                                       const char** properties, zemDynamicArray<CmpiInstance>& out,
+                                       const CmpiObjectPath&) {
+    zemQylinkCmdCaller tool(getUserContext(context), getExternalLanguageName(context));
+    const zemRecordSetsType links =
+        tool.getQylinkInformation(attributesFor(kRows, kIdentity, properties).data(), nullptr);
+    for (int i = 0; i < links.size(); ++i) {
+        const std::string id = idOf(*links[i]);
+        auto instance = std::make_unique<CmpiInstance>(connectionPath(path, id));
+        instance->setProperty("InstanceID", CmpiData(id.c_str()));
+        setProperties(*instance, kRows, properties, *links[i]);
+        out.addElement(instance.release());
+    }
+}
+
+CMPIBoolean ConnectionProvider::isValidInstanceClass(const char* className) {
+    return strcasecmp(className, kClass) == 0;
+}
+
+void ConnectionProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
+    keys[0] = CmpiData("InstanceID");
+}
+
+CmpiObjectPath ConnectionProvider::connectionPath(const CmpiObjectPath& near,
+                                                  const std::string& id) {
+    CmpiObjectPath path = createObjectPath(near, kClass);
+    path.setKey("InstanceID", CmpiData(id.c_str()));
+    return path;
+}
+
+ZEM_PROVIDER(ORXC_HostConnectionProvider, ConnectionProvider)

@@ -1,0 +1,35 @@
+/// ORXC_HostConnection: the appliance's connections to service processors, read from qylink.
+/// InstanceID is ORX:<Name of the host>:<service processor>.
+///
+/// The shortest way to serve a class for reading: three operations that fill what they are
+/// given. Thread-safety: no state; any number of operations at once.
+#ifndef CONNECTION_PROVIDER_H
+#define CONNECTION_PROVIDER_H
+
+#include "BaseZemInstanceProvider.h"
+
+class ConnectionProvider : public zemBaseZemInstanceProvider {
+public:
+    ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name);
+
+protected:
+    using zemBaseZemInstanceProvider::enumInstanceNames;
+    using zemBaseZemInstanceProvider::enumInstances;
+    using zemBaseZemInstanceProvider::getInstance;
+
+    int getInstance(const CmpiContext& context, const CmpiObjectPath& path, const char** properties,
+                    CmpiInstance& out) override;
+    void enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
+                           zemDynamicArray<CmpiObjectPath>& out,
+                           const CmpiObjectPath& asked) override;
+    void enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
+                       const char** properties, zemDynamicArray<CmpiInstance>& out,
+                       const CmpiObjectPath& asked) override;
+    CMPIBoolean isValidInstanceClass(const char* className) override;
+    void populateEssentialKeys(const char* className, CmpiArray& keys) override;
+
+private:
+    CmpiObjectPath connectionPath(const CmpiObjectPath& near, const std::string& id);
+};
+
+#endif

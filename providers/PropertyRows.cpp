@@ -1,0 +1,155 @@
+#include "PropertyRows.h"
+
+#include <strings.h>
+
+#include <algorithm>
+#include <cctype>
+#include <cstdlib>
+#include <ctime>
+
+#include "BaseProvider.h"
+#include "QyplatCmdCaller.h"
+
+namespace {
+
+using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
+
+/// What clients are told of the state words of hosts and partitions.
+struct StateRow {
+    const char* word;
+    CMPIUint16 enabledState;
+    CMPIUint16 operationalStatus;
+};
+
+constexpr StateRow kStates[] = {
+    {"Operating", 2, 2},
+    {"Running", 2, 2},
+    {"Standby", 6, 2},
+    {"Starting", 10, 8},
+    {"Initializing", 10, 8},
+    {"Shutting Down", 4, 9},
+    {"Open Firmware", 10, 8},
+    {"Suspended", 9, 15},
+    {"Not Activated", 3, 10},
+    {"Power Off", 3, 10},
+    {"Power Off In Progress", 4, 9},
+    {"Error", 1, 6},
+    {"Connected", 2, 2},
+    {"No Connection", 0, 13},
+    {"Not Available", 0, 0},
+};
+constexpr StateRow kUnknownState = {"", 0, 0};
+
+const StateRow& stateRow(const char* word) {
+    const auto* row = std::find_if(std::begin(kStates), std::end(kStates), [&](const StateRow& r) {
+        return strcasecmp(r.word, word) == 0;
+    });
+    return row == std::end(kStates) ? kUnknownState : *row;
+}
+
+/// The whole text as a decimal number up to @p limit.
+bool parseNumber(const char* text, unsigned long limit, unsigned long& value) {
+    char* end = nullptr;
+    value = std::strtoul(text, &end, 10);
+    return std::isdigit(static_cast<unsigned char>(*text)) != 0 && *end == '\0' && value <= limit;
+}
+
+CmpiArray textList(const std::string& text) {
+    const auto count = static_cast<CMPICount>(1 + std::count(text.begin(), text.end(), ','));
+    CmpiArray list(count, CMPI_chars);
+    std::size_t from = 0;
+    for (CMPICount i = 0; i < count; ++i) {
+        const std::size_t to = std::min(text.find(',', from), text.size());
+        list[i] = CmpiData(text.substr(from, to - from).c_str());
+        from = to + 1;
+    }
+    return list;
+}
+
+CmpiArray oneNumber(CMPIUint16 value) {
+    CmpiArray list(1, CMPI_uint16);
+    CmpiData element;
+    element.setUint16(value);
+    list[0] = element;
+    return list;
+}
+
+/// Sets @p data from the text of an attribute.
+/// @return false when the text is empty or of another form, so that the property stays null
+bool convert(ValueKind kind, const char* text, CmpiData& data) {
+    unsigned long value = 0;
+    std::tm when = {};
+    switch (kind) {
+        case ValueKind::Text:
+            if (*text != '\0') data = CmpiData(text);
+            return *text != '\0';
+        case ValueKind::TextList:
+            if (*text != '\0') data = CmpiData(textList(text));
+            return *text != '\0';
+        case ValueKind::Uint16:
+            if (!parseNumber(text, 0xFFFF, value)) return false;
+            data.setUint16(static_cast<CMPIUint16>(value));
+            return true;
+        case ValueKind::Uint32:
+            if (!parseNumber(text, 0xFFFFFFFF, value)) return false;
+            data.setUint32(static_cast<CMPIUint32>(value));
+            return true;
+        case ValueKind::Flag:
+            if (!parseNumber(text, 1, value)) return false;
+            data.setBoolean(static_cast<CMPIBoolean>(value));
+            return true;
+        case ValueKind::Timestamp:
+            if (strptime(text, "%m/%d/%Y %H:%M:%S", &when) == nullptr) return false;
+            when.tm_isdst = -1;
+            data.setDateTime(zemBaseProvider::convertDateTime(static_cast<long>(mktime(&when))));
+            return true;
+        case ValueKind::EnabledState:
+            data.setUint16(stateRow(text).enabledState);
+            return true;
+        case ValueKind::Status:
+            data = CmpiData(oneNumber(stateRow(text).operationalStatus));
+            return true;
+    }
+    return false;
+}
+
+}  // namespace
+
+Attributes attributesFor(const std::vector<PropertyRow>& rows, const Attributes& identity,
+                         const char** properties) {
+    Attributes attributes = identity;
+    for (const PropertyRow& row : rows)
+        if (zemBaseProvider::containsProperty(properties, row.property) &&
+            std::find(attributes.begin(), attributes.end(), row.attribute) == attributes.end())
+            attributes.push_back(row.attribute);
+    attributes.push_back(Host::ATTR_END);
+    return attributes;
+}
+
+void setProperties(CmpiInstance& instance, const std::vector<PropertyRow>& rows,
+                   const char** properties, const zemRecordType& record) {
+    for (const PropertyRow& row : rows) {
+        CmpiData value;
+        if (zemBaseProvider::containsProperty(properties, row.property) &&
+            convert(row.kind, record[row.attribute], value))
+            instance.setProperty(row.property, value);
+    }
+}
+
+bool isHostName(const std::string& text) {
+    const std::size_t star = text.find('*');
+    return star != std::string::npos && star > 0 && star + 1 < text.size() &&
+           std::count(text.begin(), text.end(), '*') == 1 &&
+           std::all_of(text.begin(), text.end(),
+                       [](unsigned char c) { return std::isalnum(c) || c == '-' || c == '*'; });
+}
+
+bool isUnknownObject(const zemException& failure) {
+    const zemString id(failure.getExceptionId());
+    return failure.getExceptionType() == 5 || id == "WRTL8011" || id == "WRTL8018";
+}
+
+std::string hostName(const zemRecordType& host) {
+    return std::string(host[Host::ATTR_TYPE_MODEL]) + "*" +
+           static_cast<const char*>(host[Host::ATTR_SERIAL_NUM]);
+}

@@ -81,8 +81,7 @@ TEST_P(ProvidersTest, EveryPartitionOfEveryHostIsEnumeratedAndGot) {
         EXPECT_EQ(textOf(partition, "LparEnvironment"),
                   tool("-r lpar -m '" + host + "' -F lpar_env" + filter).at(0));
     }
-    EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", kPartitionClass}).paths,
-              paths);
+    EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", kPartitionClass}).paths, paths);
 }
 
 TEST_P(ProvidersTest, OnlyWantedPropertiesAreAskedOfTheToolAndAnswered) {
@@ -152,8 +151,8 @@ TEST_P(ProvidersTest, ClientReadsWhyAnObjectIsNotThere) {
 TEST_P(ProvidersTest, NoKeyReachesACommandLineUnlessItHasItsForm) {
     const std::string seen = (m_appliance.folder() / "seen").string();
     m_appliance.replaceTool("qyplat", "echo called >'" + seen + "'");
-    for (const char* name : {"1111-AAA", "*0000001", "1111-AAA*", "a*b*c", "1111-AAA*1\" -r prof \"",
-                             "a b*c", "a\\*c", "", "\xC3\xA4*1"}) {
+    for (const char* name : {"1111-AAA", "*0000001", "1111-AAA*", "a*b*c",
+                             "1111-AAA*1\" -r prof \"", "a b*c", "a\\*c", "", "\xC3\xA4*1"}) {
         EXPECT_EQ(m_server->getInstance(m_request, system(kHostClass, name)).rc,
                   CMPI_RC_ERR_NOT_FOUND)
             << name;

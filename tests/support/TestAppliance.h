@@ -3,13 +3,14 @@
 /// the environment.
 #pragma once
 
+#include <sys/wait.h>
+
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
 #include <stdexcept>
 #include <string>
-#include <sys/wait.h>
 #include <vector>
 
 namespace testing_support {
@@ -64,8 +65,7 @@ public:
     explicit TestAppliance(const std::string& programs)
         : m_folder(makeFolder()),
           m_home("APPLIANCE_HOME", (m_folder / "appliance").string()),
-          m_path("PATH", (m_folder / "bin").string() + ":" + programs + ":" +
-                             std::getenv("PATH")) {
+          m_path("PATH", (m_folder / "bin").string() + ":" + programs + ":" + std::getenv("PATH")) {
         fs::create_directory(m_folder / "bin");
         fs::permissions(m_folder, fs::perms(0755));  // tools run as other users too
     }

@@ -1,0 +1,184 @@
+// The whole road as a client walks it: the programs as built, from a command line to the tool
+// and back, under a broker of each character.
+#include <gtest/gtest.h>
+
+#include "TestAppliance.h"
+
+namespace {
+
+using testing_support::lines;
+using testing_support::Outcome;
+using testing_support::ScopedEnvironment;
+using testing_support::TestAppliance;
+
+const std::string kHost =
+    R"('ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name="1111-AAA*0000001"')";
+const std::string kPartition =
+    R"('ORXC_LPAR_CS.CreationClassName="ORXC_LPAR_CS",Name="3*1111-AAA*0000001"')";
+const std::string kNoHost =
+    R"('ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name="9999-ZZZ*0000000"')";
+const std::string kGeneral =
+    "CIM_ERR_FAILED (1): A general error occurred that is not covered by a more specific error "
+    "code: \"";
+
+class Road : public ::testing::TestWithParam<const char*> {
+protected:
+    void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
+
+    Outcome cimom(const std::string& arguments) {
+        return m_appliance.run(std::string("cimom --broker ") + GetParam() + " " + arguments);
+    }
+
+    TestAppliance m_appliance{ZEM_PROGRAMS};
+    ScopedEnvironment m_registration{"CIMOM_REGISTRATION", ZEM_REGISTRATION};
+    ScopedEnvironment m_schema{"CIMOM_SCHEMA", ZEM_SCHEMA};
+};
+
+TEST_P(Road, WhatIsPrintedCanBeGivenBack) {
+    // the host's clock goes on between two requests
+    const std::string still = " --properties ElementName,State,EnabledState";
+    for (const char* cls : {"ORXC_CEC_CS", "ORXC_LPAR_CS", "ORXC_HostConnection"}) {
+        const std::vector<std::string> paths = lines(cimom(std::string("ein ") + cls).out);
+        ASSERT_FALSE(paths.empty()) << cls;
+        std::string one;
+        for (const std::string& path : paths) {
+            const Outcome got = cimom("gi '" + path + "'" + still);
+            ASSERT_EQ(got.exit, 0) << got.err;
+            one += got.out;
+        }
+        EXPECT_EQ(cimom(std::string("ei ") + cls + still).out, one);
+    }
+}
+
+struct Row {
+    std::string arguments;
+    int exit;
+    std::string out;
+    std::string err;
+};
+
+TEST_P(Road, ClientReadsStatusNameNumberAndText) {
+    const std::string unmodifiable =
+        "CIM_ERR_INVALID_PARAMETER (4): Attempt to change unmodifiable property \"ElementName\" "
+        "of class ORXC_LPAR_CS from \"web server\" to \"x\".\n";
+    const Row rows[] = {
+        {"gi " + kNoHost, 6, "",
+         "CIM_ERR_NOT_FOUND (6): The requested object root/cimv2:ORXC_CEC_CS.CreationClassName="
+         "\"ORXC_CEC_CS\",Name=\"9999-ZZZ*0000000\" of class ORXC_CEC_CS can not be found. The "
+         "exception was thrown from method getInstance on provider ORXC_CEC_CSProvider.\n"},
+        {"gi 'ORXC_CEC_CS.CreationClassName=\"ORXC_CEC_CS\"'", 4, "",
+         "CIM_ERR_INVALID_PARAMETER (4): Key Name for class ORXC_CEC_CS is not provided to method "
+         "getInstance on provider ORXC_CEC_CSProvider.\n"},
+        {"gi ORXC_Unknown.Name=1", 5, "", "CIM_ERR_INVALID_CLASS (5): no class ORXC_Unknown\n"},
+        {"gi " + kHost + " --properties State,Nonsense", 4, "",
+         "CIM_ERR_INVALID_PARAMETER (4): Invalid property name Nonsense for class ORXC_CEC_CS is "
+         "provided to method getInstance on provider ORXC_CEC_CSProvider.\n"},
+        {"ei ORXC_CEC_CS --properties State,state", 4, "",
+         "CIM_ERR_INVALID_PARAMETER (4): Duplicate property name State for class ORXC_CEC_CS is "
+         "provided to method enumerateInstances on provider ORXC_CEC_CSProvider.\n"},
+        {"di " + kPartition, 7, "",
+         "CIM_ERR_NOT_SUPPORTED (7): Method deleteInstance on provider ORXC_LPAR_CSProvider is "
+         "not supported for class ORXC_LPAR_CS.\n"},
+        {"gp " + kPartition + " ElementName", 0, "\"web server\"\n", ""},
+        {"gp " + kPartition + " OtherEnabledState", 12, "",
+         "CIM_ERR_NO_SUCH_PROPERTY (12): OtherEnabledState\n"},
+        {"sp " + kPartition + " ElementName 'web server'", 0, "", ""},
+        {"sp " + kPartition + " ElementName x", 4, "", unmodifiable},
+        {"mi " + kPartition + " ElementName=x", 4, "", unmodifiable},
+        {"mi " + kNoHost + " ElementName=x", 6, "",
+         "CIM_ERR_NOT_FOUND (6): The requested object root/cimv2:ORXC_CEC_CS.CreationClassName="
+         "\"ORXC_CEC_CS\",Name=\"9999-ZZZ*0000000\" of class ORXC_CEC_CS can not be found. The "
+         "exception was thrown from method getInstance on provider ORXC_CEC_CSProvider.\n"},
+        {"im " + kHost + " RequestStateChange RequestedState=2", 0, "returnValue = 1;\n", ""},
+        {"im " + kHost + " RequestStateChange RequestedState=77", 1, "",
+         kGeneral + "Invalid value of 77 is provided for parameter RequestedState to method "
+                    "RequestStateChange on provider ORXC_CEC_CSProvider.\"\n"},
+        {"im " + kHost + " RequestStateChange", 1, "",
+         kGeneral + "Parameter RequestedState is not found in provided parameters.\"\n"},
+        {"im ORXC_CEC_CS FindHost 'ElementName=delta, spare'", 0,
+         "returnValue = 0;\nHost = \"root/cimv2:ORXC_CEC_CS.CreationClassName=\\\"ORXC_CEC_CS\\\","
+         "Name=\\\"1111-AAD*0000004\\\"\";\n",
+         ""},
+        {"im " + kNoHost + " RequestStateChange RequestedState=2", 1, "",
+         kGeneral + "refers to an invalid object:root/cimv2:ORXC_CEC_CS.CreationClassName="
+                    "\"ORXC_CEC_CS\",Name=\"9999-ZZZ*0000000\" to inovke method "
+                    "RequestStateChange\"\n"},
+    };
+    for (const Row& row : rows) {
+        const Outcome got = cimom(row.arguments);
+        EXPECT_EQ(got.exit, row.exit) << row.arguments;
+        EXPECT_EQ(got.out, row.out) << row.arguments;
+        EXPECT_EQ(got.err, row.err) << row.arguments;
+    }
+}
+
+TEST_P(Road, WithoutASchemaTheFrameChecksAlone) {
+    ScopedEnvironment none("CIMOM_SCHEMA", "");
+    const Row rows[] = {
+        {"im " + kHost + " RequestStateChange Wrong=1", 1, "",
+         kGeneral + "Wrong method argument Wrong when invoking method RequestStateChange on "
+                    "provider ORXC_CEC_CSProvider.\"\n"},
+        {"im " + kHost + " Nonsense", 1, "",
+         kGeneral + "CIM_ERR_METHOD_NOT_FOUND (The invoked method  Nonsense is not supported for "
+                    "class ORXC_CEC_CS)\"\n"},
+        {"gi 'ORXC_CEC_CS.CreationClassName=\"ORXC_CEC_CS\",Name=\"1111-AAA*0000001\",Third=\"x\"'",
+         4, "",
+         "CIM_ERR_INVALID_PARAMETER (4): Invalid key name Third for class ORXC_CEC_CS is provided "
+         "to method getInstance on provider ORXC_CEC_CSProvider.\n"},
+        {"gi ORXC_Unknown.Name=1", 7, "", "CIM_ERR_NOT_SUPPORTED (7): "},
+    };
+    for (const Row& row : rows) {
+        const Outcome got = cimom(row.arguments);
+        EXPECT_EQ(got.exit, row.exit) << row.arguments;
+        EXPECT_EQ(got.err.substr(0, row.err.size()), row.err) << row.arguments;
+    }
+}
+
+TEST_P(Road, TextsComeInTheClientsLanguageWhereTheServerHasBundles) {
+    const Outcome got =
+        cimom(std::string("--messages ") + ZEM_MESSAGES + " --language 'fr;q=0.2,de' di " + kHost);
+    EXPECT_EQ(got.exit, 7);
+    const bool full = std::string(GetParam()) == "full";
+    EXPECT_EQ(got.err, full ? "CIM_ERR_NOT_SUPPORTED (7): Die Methode deleteInstance des Providers "
+                              "ORXC_CEC_CSProvider wird für die Klasse ORXC_CEC_CS nicht "
+                              "unterstützt.\n"
+                            : "CIM_ERR_NOT_SUPPORTED (7): Method deleteInstance on provider "
+                              "ORXC_CEC_CSProvider is not supported for class ORXC_CEC_CS.\n");
+}
+
+TEST_P(Road, ToolsWordsComeInTheClientsLanguage) {
+    m_appliance.replaceTool("qyplat", "exec " ZEM_PROGRAMS "/qyplat \"$@\" --nonsense");
+    const std::string english = cimom("ei ORXC_CEC_CS").err;
+    const std::string german = cimom("--language de ei ORXC_CEC_CS").err;
+    EXPECT_NE(english.find("an exception id of WRTL"), std::string::npos) << english;
+    EXPECT_NE(german.find("an exception id of WRTL"), std::string::npos) << german;
+    EXPECT_NE(german, english);
+}
+
+TEST_P(Road, DisabledProvidersFindNothing) {
+    const std::string preload =
+        std::string("ASAN_OPTIONS=verify_asan_link_order=0:detect_leaks=0 LD_PRELOAD=") +
+        ZEM_DISABLED + " cimom --broker " + GetParam() + " ";
+    const Outcome all = m_appliance.run(preload + "ei ORXC_CEC_CS");
+    EXPECT_EQ(all.exit, 0) << all.err;
+    EXPECT_EQ(all.out, "");
+    const Outcome one = m_appliance.run(preload + "gi " + kHost);
+    EXPECT_EQ(one.exit, 6);
+    EXPECT_EQ(one.err,
+              "CIM_ERR_NOT_FOUND (6): The requested object The XBRG is managed by DNX, this "
+              "provider on the XGRB in dissabled. of class zemBaseProvider can not be found. The "
+              "exception was thrown from method getInstance on provider ORXC_CEC_CSProvider.\n");
+}
+
+TEST_P(Road, TimingTraceIsWrittenWhenAskedFor) {
+    const std::string file = (m_appliance.folder() / "timing").string();
+    ScopedEnvironment on("VM_CIMPROVIDER_TRACE", "1"), path("VM_CIMPROVIDER_TRACE_PATH", file);
+    EXPECT_EQ(cimom("ei ORXC_CEC_CS").exit, 0);
+    EXPECT_TRUE(std::filesystem::exists(file));
+    EXPECT_FALSE(std::filesystem::exists(m_appliance.folder() / "CIMTestPerfData.txt"));
+}
+
+INSTANTIATE_TEST_SUITE_P(Brokers, Road, ::testing::Values("full", "lean"),
+                         [](const auto& broker) { return std::string(broker.param); });
+
+}  // namespace

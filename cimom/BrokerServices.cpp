@@ -28,7 +28,7 @@ CMPI_THREAD_TYPE newThread(CMPI_THREAD_RETURN (*start)(void*), void* parm, int d
     pthread_t thread{};
     if (pthread_create(&thread, nullptr, start, parm) != 0) return nullptr;
     if (detached) pthread_detach(thread);
-    return reinterpret_cast<CMPI_THREAD_TYPE>(thread);
+    return reinterpret_cast<CMPI_THREAD_TYPE>(thread);  // NOLINT(performance-no-int-to-ptr)
 }
 int joinThread(CMPI_THREAD_TYPE thread, CMPI_THREAD_RETURN* answer) {
     return pthread_join(threadOf(thread), answer);

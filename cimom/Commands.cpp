@@ -1,9 +1,11 @@
 #include "Commands.h"
 
+#include <fcntl.h>
+#include <unistd.h>
+
 #include <algorithm>
-#include <condition_variable>
+#include <cerrno>
 #include <csignal>
-#include <ctime>
 
 #include "Classes.h"
 #include "Failure.h"
@@ -30,9 +32,10 @@ Value readValue(const Session& session, const CimElement* declared, const std::s
 
 /// Values given as name=value.
 /// @param declared  elements that there are; null when nothing is known of them
+/// @throws Failure with @p unknown for a name that is not among them
 template <class T>
 NamedValues readAssignments(const Session& session, const NamedList<T>* declared,
-                            const std::vector<std::string>& assignments) {
+                            const std::vector<std::string>& assignments, CMPIrc unknown) {
     NamedValues values;
     for (const std::string& text : assignments) {
         const std::size_t equals = text.find('=');
@@ -40,8 +43,7 @@ NamedValues readAssignments(const Session& session, const NamedList<T>* declared
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + text + "' is not name=value");
         const std::string name = text.substr(0, equals);
         const T* element = declared ? declared->find(name) : nullptr;
-        if (declared && !element)
-            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "there is no '" + name + "' to set");
+        if (declared && !element) throw Failure(unknown, "there is no '" + name + "' to set");
         values.set(element ? element->name : name,
                    readValue(session, element, text.substr(equals + 1)));
     }
@@ -75,8 +77,8 @@ Reply getInstance(Session& session, const Arguments& arguments) {
 Instance readInstance(const Session& session, const Arguments& arguments) {
     Instance instance(readPath(session, arguments.object));
     const CimClass* cls = classOf(session, instance.path);
-    instance.properties =
-        readAssignments(session, cls ? &cls->properties : nullptr, arguments.assignments);
+    instance.properties = readAssignments(session, cls ? &cls->properties : nullptr,
+                                          arguments.assignments, CMPI_RC_ERR_NO_SUCH_PROPERTY);
     return instance;
 }
 Reply createInstance(Session& session, const Arguments& arguments) {
@@ -119,8 +121,8 @@ Reply invokeMethod(Session& session, const Arguments& arguments) {
     if (cls && !method)
         throw Failure(CMPI_RC_ERR_METHOD_NOT_FOUND,
                       "class " + cls->name + " has no method " + arguments.name);
-    const NamedValues in =
-        readAssignments(session, method ? &method->parameters : nullptr, arguments.assignments);
+    const NamedValues in = readAssignments(session, method ? &method->parameters : nullptr,
+                                           arguments.assignments, CMPI_RC_ERR_INVALID_PARAMETER);
     Reply reply = session.server.invokeMethod(session.request, path, arguments.name, in);
     if (reply.ok()) session.out.write(renderMethod(reply, session.format));
     return reply;
@@ -174,18 +176,26 @@ Reply enumClasses(Session& session, const Arguments& arguments) {
 
 // -- indications ------------------------------------------------------------------------------
 
+int wakePipe[2] = {-1, -1};
+
+void wake(int) {
+    const char byte = 0;
+    if (::write(wakePipe[1], &byte, 1) < 0) return;  // a full pipe wakes as well
+}
+// Handlers and no blocked signals: the tools that providers start must be free of both.
+void wakeAtSignals() {
+    struct sigaction action = {};
+    action.sa_handler = wake;
+    for (int signal : {SIGINT, SIGTERM}) sigaction(signal, &action, nullptr);
+}
+
 // Until a signal asks to end, or enough indications have come, or nobody reads them.
 Reply watch(Session& session, const Arguments& arguments) {
     const std::string query = arguments.query.find(' ') == std::string::npos
                                   ? "SELECT * FROM " + arguments.query
                                   : arguments.query;
-    sigset_t ends;
-    sigemptyset(&ends);
-    for (int signal : {SIGINT, SIGTERM, SIGUSR1}) sigaddset(&ends, signal);
-    // Threads that providers start inherit the mask, and so leave these signals to sigwait.
-    pthread_sigmask(SIG_BLOCK, &ends, nullptr);
-    const pthread_t waiting = pthread_self();
-
+    if (pipe2(wakePipe, O_CLOEXEC) != 0) throw Failure(CMPI_RC_ERROR_SYSTEM, "no pipe");
+    wakeAtSignals();
     std::size_t seen = 0;  // the handler runs one indication at a time
     Server::SubscriptionId id = 0;
     Reply reply = session.server.subscribe(
@@ -194,12 +204,13 @@ Reply watch(Session& session, const Arguments& arguments) {
             if (arguments.count != 0 && seen == arguments.count) return;
             ++seen;
             const bool read = session.out.write(renderEvent(indication, session.format));
-            if (!read || seen == arguments.count) pthread_kill(waiting, SIGUSR1);
+            if (!read || seen == arguments.count) wake(0);
         },
         id);
     if (!reply.ok()) return reply;
-    int signal = 0;
-    sigwait(&ends, &signal);
+    wakeAtSignals();  // once more: a Java VM of the providers takes them over
+    char byte = 0;
+    while (::read(wakePipe[0], &byte, 1) < 0 && errno == EINTR) continue;
     return session.server.unsubscribe(session.request, id);
 }
 

@@ -1,9 +1,9 @@
 // cimom: CIM operations from the command line, with the providers loaded into this process.
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <csignal>
 #include <cstdio>
-#include <iostream>
 #include <map>
 
 #include "Commands.h"
@@ -30,6 +30,8 @@ struct Settings {
 };
 
 const char* const kFooter =
+    "The options of cimom itself may stand before or behind the verb; cimom --help lists them.\n"
+    "\n"
     "Object paths read [//host/][namespace:]Class.key=\"text\",other=5,flag=true; quotes and\n"
     "backslashes within a text are written \\\" and \\\\. Paths that are printed can be given "
     "back.\n"
@@ -182,9 +184,7 @@ int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments)
     }
 }
 
-}  // namespace
-
-int main(int argc, char** argv) {
+int runCommandLine(int argc, char** argv) {
     CLI::App app("CIM operations on the providers of a registration, without a CIM server.",
                  "cimom");
     app.footer(kFooter);
@@ -199,15 +199,24 @@ int main(int argc, char** argv) {
         return app.exit(error) == 0 ? 0 : kUsageError;
     }
     if (app.count("--user")) settings.request.user = settings.user;
-    for (CLI::App* chosen : app.get_subcommands()) {
-        const auto* option = chosen->get_option_no_throw("--properties");
-        if (option && option->count())
-            settings.request.properties = splitNames(settings.properties);
-    }
-    std::signal(SIGPIPE, SIG_IGN);  // a reader that goes away ends the output, not the providers
+    const CLI::App& chosen = *app.get_subcommands().front();
+    const auto* option = chosen.get_option_no_throw("--properties");
+    if (option && option->count()) settings.request.properties = splitNames(settings.properties);
+    const auto& rows = cimom::verbs();
+    const auto verb = std::find_if(rows.begin(), rows.end(), [&](const cimom::Verb& row) {
+        return chosen.get_name() == row.name;
+    });
+    return run(*verb, settings, arguments);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    // A reader that goes away ends the output, not the providers; a handler, unlike SIG_IGN, is
+    // not passed on to the tools that they start.
+    std::signal(SIGPIPE, [](int) {});
     try {
-        for (const cimom::Verb& row : cimom::verbs())
-            if (app.got_subcommand(row.name)) return run(row, settings, arguments);
+        return runCommandLine(argc, argv);
     } catch (const std::exception& error) {
         std::fprintf(stderr, "cimom: %s\n", error.what());
     }

@@ -184,6 +184,33 @@ CMPIStatus returnError(const CMPIResult* result, const CMPIError* error) {
 
 }  // namespace
 
+namespace {
+
+void fillPathTable(ObjectTables& tables) {
+    std::get<CMPIObjectPathFT>(tables) = {0,
+                                          releaseObject<CMPIObjectPath>,
+                                          cloneObject<CMPIObjectPath>,
+                                          setPart<&ObjectPath::nameSpace>,
+                                          getPart<&ObjectPath::nameSpace>,
+                                          setPart<&ObjectPath::host>,
+                                          getPart<&ObjectPath::host>,
+                                          setPart<&ObjectPath::className>,
+                                          getPart<&ObjectPath::className>,
+                                          setNamed<CMPIObjectPath, CMPIObjectPath>,
+                                          getNamed<CMPIObjectPath, CMPI_RC_ERR_NOT_FOUND>,
+                                          getNamedAt<CMPIObjectPath>,
+                                          countNamed<CMPIObjectPath>,
+                                          setPlaceFrom<false>,
+                                          setPlaceFrom<true>,
+                                          classQualifier,
+                                          propertyQualifier,
+                                          methodQualifier,
+                                          parameterQualifier,
+                                          pathText};
+}
+
+}  // namespace
+
 void fillObjectTables(ObjectTables& tables) {
     constexpr CMPIrc kNotFound = CMPI_RC_ERR_NOT_FOUND;
     std::get<CMPIStringFT>(tables) = {0, releaseObject<CMPIString>, cloneObject<CMPIString>,
@@ -218,26 +245,7 @@ void fillObjectTables(ObjectTables& tables) {
                                        getNamedAt<CMPIContext>,
                                        countNamed<CMPIContext>,
                                        setNamed<CMPIContext, const CMPIContext>};
-    std::get<CMPIObjectPathFT>(tables) = {0,
-                                          releaseObject<CMPIObjectPath>,
-                                          cloneObject<CMPIObjectPath>,
-                                          setPart<&ObjectPath::nameSpace>,
-                                          getPart<&ObjectPath::nameSpace>,
-                                          setPart<&ObjectPath::host>,
-                                          getPart<&ObjectPath::host>,
-                                          setPart<&ObjectPath::className>,
-                                          getPart<&ObjectPath::className>,
-                                          setNamed<CMPIObjectPath, CMPIObjectPath>,
-                                          getNamed<CMPIObjectPath, kNotFound>,
-                                          getNamedAt<CMPIObjectPath>,
-                                          countNamed<CMPIObjectPath>,
-                                          setPlaceFrom<false>,
-                                          setPlaceFrom<true>,
-                                          classQualifier,
-                                          propertyQualifier,
-                                          methodQualifier,
-                                          parameterQualifier,
-                                          pathText};
+    fillPathTable(tables);
     std::get<CMPIResultFT>(tables) = {0,
                                       releaseObject<CMPIResult>,
                                       cloneObject<CMPIResult>,

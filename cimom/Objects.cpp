@@ -87,7 +87,10 @@ void countStaleUse() { ++staleUses; }
 
 Pool::Pool() { m_levels.push_back(newLevel()); }
 
-Pool::~Pool() { release(m_levels.front().get()); }
+// What could throw is a lock of a broken process, which then ends.
+Pool::~Pool() {  // NOLINT(bugprone-exception-escape)
+    for (const Level& each : m_levels) clear(*each);
+}
 
 Pool::Level Pool::newLevel() {
     auto head = std::make_unique<Link>();
@@ -249,20 +252,10 @@ Value readData(const CMPIData& data) {
     return readValue(&data.value, data.type);
 }
 
-CMPIData makeData(Broker& broker, const Value& value) {
-    CMPIData data{};
-    data.type = value.type();
-    data.state = CMPI_goodValue;
-    CMPIValue& out = data.value;
-    if (value.isNull()) {
-        data.state = CMPI_nullValue;
-        return data;
-    }
-    if (value.isArray()) {
-        const auto elementType = static_cast<CMPIType>(value.type() & ~CMPI_ARRAY);
-        out.array = make<CMPIArray>(broker, {elementType, value.elements()});
-        return data;
-    }
+namespace {
+
+CMPIValue makeNumber(const Value& value) {
+    CMPIValue out{};
     switch (value.type()) {
         case CMPI_boolean:
             out.boolean = value.boolean() ? 1 : 0;
@@ -297,27 +290,40 @@ CMPIData makeData(Broker& broker, const Value& value) {
         case CMPI_sint32:
             out.sint32 = static_cast<CMPISint32>(value.sint());
             break;
-        case CMPI_sint64:
+        default:
             out.sint64 = value.sint();
             break;
-        case CMPI_string:
-            out.string = makeString(broker, value.text());
-            break;
-        case CMPI_dateTime:
-            out.dateTime = make<CMPIDateTime>(broker, value.dateTime());
-            break;
-        case CMPI_ref:
-            out.ref = make<CMPIObjectPath>(broker, value.reference());
-            break;
-        case CMPI_instance:
-            out.inst = make<CMPIInstance>(broker, instanceBody(broker, value.instance()));
-            break;
-        case CMPI_ptr:
-            out.dataPtr = value.pointer();
-            break;
-        default:
-            return noData();
     }
+    return out;
+}
+
+CMPIValue makeObject(Broker& broker, const Value& value) {
+    CMPIValue out{};
+    if (value.isArray())
+        out.array = make<CMPIArray>(
+            broker, {static_cast<CMPIType>(value.type() & ~CMPI_ARRAY), value.elements()});
+    else if (value.type() == CMPI_string)
+        out.string = makeString(broker, value.text());
+    else if (value.type() == CMPI_dateTime)
+        out.dateTime = make<CMPIDateTime>(broker, value.dateTime());
+    else if (value.type() == CMPI_ref)
+        out.ref = make<CMPIObjectPath>(broker, value.reference());
+    else if (value.type() == CMPI_instance)
+        out.inst = make<CMPIInstance>(broker, instanceBody(broker, value.instance()));
+    else
+        out.dataPtr = value.pointer();
+    return out;
+}
+
+}  // namespace
+
+CMPIData makeData(Broker& broker, const Value& value) {
+    CMPIData data{};
+    data.type = value.type();
+    data.state = value.isNull() ? CMPI_nullValue : CMPI_goodValue;
+    if (value.isNull()) return data;
+    const bool encapsulated = (value.type() & (CMPI_ARRAY | CMPI_ENC)) != 0;
+    data.value = encapsulated ? makeObject(broker, value) : makeNumber(value);
     return data;
 }
 

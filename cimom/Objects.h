@@ -125,7 +125,7 @@ struct Node : Link {
 class Pool {
 public:
     Pool();
-    ~Pool();
+    ~Pool();  // NOLINT(bugprone-exception-escape)
     Pool(const Pool&) = delete;
     Pool& operator=(const Pool&) = delete;
 

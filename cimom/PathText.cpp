@@ -32,7 +32,7 @@ struct Escape {
     char letter;
     char meant;
 };
-const std::string kInstanceOf = "instance of ";
+constexpr std::string_view kInstanceOf = "instance of ";
 constexpr int kDeepest = 50;
 
 constexpr Escape kEscapes[] = {{'"', '"'},  {'\\', '\\'}, {'\'', '\''}, {'n', '\n'},
@@ -86,6 +86,25 @@ std::string printReal(double value, bool single) {
     std::string out = text;
     if (out.find_first_of(".e") == std::string::npos) out += ".0";
     return out;
+}
+
+// A whole text as a number of the type.
+bool parseNumber(const std::string& text, CMPIType type, Value& result) {
+    if (text.empty() || std::strchr(" \t\n", text[0])) return false;
+    char* end = nullptr;
+    errno = 0;
+    Value wide;
+    if (type == CMPI_real32 || type == CMPI_real64) {
+        wide = Value(std::strtod(text.c_str(), &end));
+    } else if (text[0] == '-') {
+        wide = Value(std::int64_t{std::strtoll(text.c_str(), &end, 10)});
+    } else {
+        wide = Value(std::uint64_t{std::strtoull(text.c_str(), &end, 10)});
+    }
+    // The smallest reals are out of range for strtod, and right all the same.
+    const bool tiny = wide.type() == CMPI_real64 && std::abs(wide.real()) < 1;
+    return end == text.c_str() + text.size() && (errno == 0 || tiny) &&
+           wide.convertTo(type, result);
 }
 
 // Reads texts of the forms above from left to right.
@@ -222,23 +241,6 @@ private:
         fail("'" + bare + "' is no value");
     }
 
-public:
-    static bool parseNumber(const std::string& text, CMPIType type, Value& result) {
-        if (text.empty() || std::strchr(" \t\n", text[0])) return false;
-        char* end = nullptr;
-        errno = 0;
-        Value wide;
-        if (type == CMPI_real32 || type == CMPI_real64) {
-            wide = Value(std::strtod(text.c_str(), &end));
-        } else if (text[0] == '-') {
-            wide = Value(std::int64_t{std::strtoll(text.c_str(), &end, 10)});
-        } else {
-            wide = Value(std::uint64_t{std::strtoull(text.c_str(), &end, 10)});
-        }
-        return end == text.c_str() + text.size() && errno == 0 && wide.convertTo(type, result);
-    }
-
-private:
     const std::string& m_text;
     std::size_t m_at;
     int m_depth = 0;
@@ -303,8 +305,13 @@ Value declaredValue(const Value& value, CMPIType type, const std::string& what) 
     Value typed;
     if (value.convertTo(type, typed)) return typed;
     if (value.type() == CMPI_string) return parseValue(value.text(), type);
-    const bool empty = value.isArray() && value.elements().empty() && (type & CMPI_ARRAY);
-    if (empty) return Value::array(static_cast<CMPIType>(type & ~CMPI_ARRAY), {});
+    if (value.isArray() && (type & CMPI_ARRAY)) {
+        const auto elementType = static_cast<CMPIType>(type & ~CMPI_ARRAY);
+        Value::Array elements;
+        for (const Value& element : value.elements())
+            elements.push_back(declaredValue(element, elementType, what));
+        return Value::array(elementType, std::move(elements));
+    }
     throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, what + " is of type " + typeName(type));
 }
 
@@ -457,7 +464,7 @@ Value parseValue(const std::string& text, CMPIType type, const ClassRepository* 
         case CMPI_instance:
             return Value(typedInstance(wholeInstance(text), classes));
         default:
-            if (!Scanner::parseNumber(text, type, result)) mismatch(text, type);
+            if (!parseNumber(text, type, result)) mismatch(text, type);
             return result;
     }
 }

@@ -37,7 +37,7 @@ std::string folderOf(const std::string& file) {
 
 }  // namespace
 
-Server::Server(Options options) : m_impl(std::make_unique<Impl>(*this, options)) {}
+Server::Server(const Options& options) : m_impl(std::make_unique<Impl>(*this, options)) {}
 
 Server::~Server() {
     std::vector<SubscriptionId> open;

@@ -138,7 +138,7 @@ enum class FilterStep { Authorize, MustPoll, Activate, Deactivate };
 
 class Server {
 public:
-    explicit Server(Options options = {});
+    explicit Server(const Options& options = {});
     /// Ends all subscriptions, cleans up and unloads the providers, and frees what they left.
     ~Server();
     Server(const Server&) = delete;

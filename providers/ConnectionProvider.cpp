@@ -32,20 +32,19 @@ std::string idOf(const zemRecordType& link) {
            ":" + static_cast<const char*>(link[Link::ATTR_SP]);
 }
 
-/// The host in an InstanceID; empty when it has not the form of one.
-std::string hostOf(const std::string& id) {
+}  // namespace
+
+ConnectionProvider::ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx,
+                                       const char* name)
+    : CmpiBaseMI(mb, ctx), zemBaseZemInstanceProvider(mb, ctx, name) {}
+
+std::string ConnectionProvider::hostOf(const std::string& id) {
     const std::size_t prefix = sizeof kPrefix - 1;
     const std::size_t colon = id.rfind(':');
     if (id.compare(0, prefix, kPrefix) != 0 || colon < prefix) return "";
     const std::string host = id.substr(prefix, colon - prefix);
     return isHostName(host) ? host : "";
 }
-
-}  // namespace
-
-ConnectionProvider::ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx,
-                                       const char* name)
-    : CmpiBaseMI(mb, ctx), zemBaseZemInstanceProvider(mb, ctx, name) {}
 
 int ConnectionProvider::getInstance(const CmpiContext& context, const CmpiObjectPath& path,
                                     const char** properties, CmpiInstance& out) {

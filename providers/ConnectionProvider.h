@@ -6,11 +6,16 @@
 #ifndef CONNECTION_PROVIDER_H
 #define CONNECTION_PROVIDER_H
 
+#include <string>
+
 #include "BaseZemInstanceProvider.h"
 
 class ConnectionProvider : public zemBaseZemInstanceProvider {
 public:
     ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name);
+
+    /// The Name of the host in an InstanceID; empty when that has not the form of one.
+    static std::string hostOf(const std::string& id);
 
 protected:
     using zemBaseZemInstanceProvider::enumInstanceNames;

@@ -38,6 +38,13 @@ void checkReferences(const Rows& rows, const CmpiObjectPath& cop1, const CmpiObj
                         className, providerName);
 }
 
+/// Whether a path is of the class on one side of some row.
+bool isOfAny(const Rows& rows, const CmpiObjectPath& cop, zemString zemAssociationData::*side) {
+    for (int i = 0; i < rows.size(); ++i)
+        if (zemPathIsA(cop, rows[i]->*side)) return true;
+    return false;
+}
+
 /// Whether the class of a path is named in some row as first class.
 bool isNamedFirst(const Rows& rows, const CmpiObjectPath& cop) {
     const zemString className = zemClassOf(cop);
@@ -275,16 +282,12 @@ int zemAssociationProvider::getReferenceClass(const CmpiObjectPath& cop1,
 
 bool zemAssociationProvider::isFirstClass(const CmpiObjectPath& cop, const char* className) {
     const std::unique_ptr<Rows> rows(getAssoDataSet(className));
-    for (int i = 0; i < rows->size(); ++i)
-        if (zemPathIsA(cop, (*rows)[i]->m_refClassName1)) return true;
-    return false;
+    return isOfAny(*rows, cop, &zemAssociationData::m_refClassName1);
 }
 
 bool zemAssociationProvider::isSecondClass(const CmpiObjectPath& cop, const char* className) {
     const std::unique_ptr<Rows> rows(getAssoDataSet(className));
-    for (int i = 0; i < rows->size(); ++i)
-        if (zemPathIsA(cop, (*rows)[i]->m_refClassName2)) return true;
-    return false;
+    return isOfAny(*rows, cop, &zemAssociationData::m_refClassName2);
 }
 
 int zemAssociationProvider::validateSourceObject(const CmpiContext& ctx, const CmpiObjectPath& cop,

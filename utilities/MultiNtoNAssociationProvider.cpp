@@ -75,6 +75,7 @@ private:
     CmpiArray fetch(const char* className, const char* nameSpace) {
         const zemSynchronizer hold(m_lock);
         const std::vector<CmpiObjectPath> objects = m_call.paths(nameSpace, className);
+        if (objects.empty()) return CmpiArray();
         CmpiArray array(static_cast<CMPICount>(objects.size()), CMPI_ref);
         for (CMPICount i = 0; i < objects.size(); ++i) array[i] = CmpiData(objects[i]);
         return array;

@@ -116,7 +116,7 @@ TEST_F(CommandLine, FailuresAreTold) {
         EXPECT_EQ(result.out, "");
     }
     const Run unknown = runTyped({"mi", "Fix_Thing.Name=\"one\"", "Colour=red"});
-    EXPECT_EQ(unknown.exit, 4) << unknown.err;
+    EXPECT_EQ(unknown.exit, 12) << unknown.err;
     const Run help = run({"gi", "--help"});
     EXPECT_EQ(help.exit, 0);
     EXPECT_NE(help.out.find("--properties"), std::string::npos);

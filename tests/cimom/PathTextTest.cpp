@@ -72,6 +72,8 @@ TEST(PathText, ValuesAreReadByType) {
         {"soon", CMPI_dateTime, {}},
         {"Foo.a=1", CMPI_ref, ObjectPath("", "Foo", {{"a", std::int64_t{1}}})},
         {"{a, \"b,c\" ,}", CMPI_stringA, Value::array(CMPI_string, {"a", "b,c"})},
+        {"{\"A.k=1\"}", CMPI_refA,
+         Value::array(CMPI_ref, {ObjectPath("", "A", {{"k", std::int64_t{1}}})})},
         {"1,2", CMPI_uint16A, Value::array(CMPI_uint16, {std::uint16_t{1}, std::uint16_t{2}})},
         {"{}", CMPI_uint16A, Value::array(CMPI_uint16, {})},
         {"{1", CMPI_uint16A, {}},
@@ -119,7 +121,7 @@ TEST(PathText, InstancesReadBackAsTheirClassSays) {
 }
 
 TEST(PathText, RealsKeepTheirValue) {
-    for (const double value : {0.0, 0.1, 1.0 / 3, 1e-300, 123456789.0, -2.5e10})
+    for (const double value : {0.0, 1e-310, 0.1, 1.0 / 3, 1e-300, 123456789.0, -2.5e10})
         EXPECT_EQ(parseValue(printValue(value), CMPI_real64), Value(value));
     EXPECT_EQ(printValue(0.1F), "0.1");
 }

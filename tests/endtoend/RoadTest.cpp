@@ -112,6 +112,65 @@ TEST_P(Road, ClientReadsStatusNameNumberAndText) {
     }
 }
 
+struct Association {
+    const char* name;
+    const char* nearRole;  ///< of the source
+    const char* farRole;
+    std::string source;
+    const char* farClass;
+    std::size_t targets;  ///< of the source
+    std::size_t all;
+};
+
+// One provider for each way in which the library can find the two sides.
+TEST_P(Road, EveryAssociationAnswersAllOperationsAndFilters) {
+    const std::string link = R"('ORXC_HostConnection.InstanceID="ORX:1111-AAA*0000001:primary"')";
+    const Association rows[] = {
+        {"ORXC_HostedPartition", "Antecedent", "Dependent", kHost, "ORXC_LPAR_CS", 7, 14},
+        {"ORXC_ConnectedHost", "Antecedent", "Dependent", kHost, "ORXC_HostConnection", 2, 8},
+        {"ORXC_HostComponent", "GroupComponent", "PartComponent", kHost,
+         "CIM_EnabledLogicalElement", 9, 22},
+        {"ORXC_ReachedHost", "Antecedent", "Dependent", kHost, "ORXC_HostConnection", 2, 8},
+        {"ORXC_PartitionConnection", "Antecedent", "Dependent", link, "ORXC_LPAR_CS", 7, 28},
+    };
+    for (const Association& row : rows) {
+        const std::string of = row.source + " --assoc-class " + row.name;
+        const auto answers = [&](const std::string& arguments) {
+            const Outcome got = cimom(arguments);
+            EXPECT_EQ(got.exit, 0) << arguments << got.err;
+            return lines(got.out);
+        };
+        const std::vector<std::string> targets = answers("ain " + of);
+        EXPECT_EQ(targets.size(), row.targets) << row.name;
+        EXPECT_EQ(answers("ain " + of + " --result-class " + row.farClass), targets) << row.name;
+        EXPECT_TRUE(answers("ain " + of + " --result-class CIM_ConcreteJob").empty()) << row.name;
+        EXPECT_TRUE(answers("ain " + of + " --role Neither").empty()) << row.name;
+        EXPECT_TRUE(answers("ain " + of + " --result-role Neither").empty()) << row.name;
+
+        std::vector<std::string> found;
+        for (const std::string& line : answers("ai " + of))
+            if (line.rfind("// ", 0) == 0) found.push_back(line.substr(3));
+        EXPECT_EQ(found, targets) << row.name;
+
+        const std::string named = row.source + " --result-class " + row.name;
+        const std::vector<std::string> references = answers("rin " + named);
+        EXPECT_EQ(references.size(), row.targets) << row.name;
+        EXPECT_EQ(cimom("gi '" + references.at(0) + "'").exit, 0) << references[0];
+        const std::string instances = cimom("ri " + named).out;
+        EXPECT_NE(instances.find(std::string("instance of ") + row.name), std::string::npos);
+        EXPECT_EQ(answers(std::string("ein ") + row.name).size(), row.all) << row.name;
+        EXPECT_NE(cimom(std::string("ei ") + row.name).out.find(row.farRole), std::string::npos);
+    }
+}
+
+TEST_P(Road, AssociationsOfWhatIsNotThereAreRefused) {
+    for (const char* name : {"ORXC_HostedPartition", "ORXC_ConnectedHost", "ORXC_HostComponent"}) {
+        const Outcome got = cimom("ain " + kNoHost + " --assoc-class " + name);
+        EXPECT_EQ(got.exit, 4) << name << got.err;
+        EXPECT_EQ(got.out, "") << name;
+    }
+}
+
 TEST_P(Road, WithoutASchemaTheFrameChecksAlone) {
     ScopedEnvironment none("CIMOM_SCHEMA", "");
     const Row rows[] = {

@@ -1,6 +1,5 @@
-#include "JMPIProviderInterfaceStub.h"
-
 #include "AssociationHarness.h"
+#include "JMPIProviderInterfaceStub.h"
 
 namespace {
 

@@ -5,8 +5,6 @@
 
 namespace {
 
-const cimom::AssociationFilter kNone = {"Test_Link", "", "", ""};
-
 /// "A B C" as a block of names.
 std::string block(const std::string& names) {
     std::string text = names + ' ';
@@ -60,9 +58,7 @@ TEST(MultiNtoNAssociation, BlocksThatAreNoPairs) {
                  zemInvalidParameterException);
 }
 
-class MultiNtoNAssociation : public AssociationTest {};
-
-TEST_P(MultiNtoNAssociation, AnswersAmongItsClasses) {
+TEST(MultiNtoNAssociation, AnswersAmongItsClasses) {
     const char* const fork = "Test_System Test_Disk Test_System Test_Port";
     const char* const chain = "Test_System Test_Disk Test_Disk Test_Port";
     const char* const nested = "Test_Disk Test_Port Test_System Test_Disk Test_BigSystem Test_Port";
@@ -87,15 +83,9 @@ TEST_P(MultiNtoNAssociation, AnswersAmongItsClasses) {
         {chain, {"classes that are in no pair", "gi", "s1-p1", kNone, "", CMPI_RC_ERR_NOT_FOUND}},
     };
     // clang-format on
-    for (const auto& c : cases) {
-        SCOPED_TRACE(c.request.what);
-        World<Pairs> w(GetParam());
-        world->pairs = block(c.pairs);
-        expectAnswer(w, c.request);
-    }
+    for (const auto& c : cases)
+        expectAnswer<Pairs>(c.request, [&] { world->pairs = block(c.pairs); });
 }
-
-ON_BOTH_KINDS_OF_BROKER(MultiNtoNAssociation);
 
 TEST(MultiNtoNAssociation, AsksForAClassOnceAnEnumeration) {
     World<Pairs> w;
@@ -109,19 +99,12 @@ TEST(MultiNtoNAssociation, AsksForAClassOnceAnEnumeration) {
     EXPECT_EQ("s1-p2 s2-p2 b1-p2", show(w.run("rn", "p2"))) << "nothing is kept";
 }
 
-TEST(MultiNtoNAssociation, RefusedReferences) {
+TEST(MultiNtoNAssociation, RefusesBeforeTheObjectsAreLookedFor) {
     World<Pairs> w;
-    const cimom::Reply wrong = w.run("gi", "d1-s1");
-    EXPECT_EQ(CMPI_RC_ERR_INVALID_PARAMETER, wrong.rc);
-    EXPECT_EQ(0U,
-              wrong.message.find("Invalid value \"" + w.textOf("d1") +
-                                 "\" for the property Left and invalid value \"" + w.textOf("s1") +
-                                 "\" for the property Right of the class Test_Link were "
-                                 "provided to method getInstance"))
-        << wrong.message;
+    EXPECT_NE(std::string::npos, w.run("gi", "d1-s1").message.find("\" for the property Right of"));
     world->valid = [](const std::string&, const std::string&) { return false; };
     EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, w.run("gi", "s1-d1").rc);
-    EXPECT_EQ(0, world->count("get:")) << "refused before the objects are looked for";
+    EXPECT_EQ(0, world->count("get:"));
 }
 
 // The lock covers a call to the server, not the pairing of what it answered.

@@ -31,8 +31,14 @@ struct ToolRun {
     explicit ToolRun(const std::string& command, const char* user = nullptr, int waitTime = 0,
                      const char* locale = nullptr) {
         failure = failureOf([&] {
-            EXPECT_EQ(0, zemPropertiesHelper::executeCommand(command.c_str(), out, err, &exitCode,
-                                                             user, waitTime, locale, true));
+            try {
+                zemPropertiesHelper::executeCommand(command.c_str(), out, err, &exitCode, user,
+                                                    waitTime, locale, true);
+            } catch (const zemException& e) {
+                EXPECT_STREQ("zemPropertiesHelper", e.getThrowingClass());
+                EXPECT_STREQ("executeCommand", e.getThrowingMethod());
+                throw;
+            }
         });
     }
 };
@@ -165,7 +171,6 @@ TEST(ExecuteCommandTest, FailuresNameTheirCause) {
     tools.script("killed", "kill -9 $$");
     tools.script("marker", "touch $here/started");
     const std::string open = "marker " + std::string(200000, 'x') + " \"";
-    const std::string complaint = "-1:Invalid command parameter:";
     const std::tuple<std::string, const char*, std::string, int> rows[] = {
         {"nosuchtool -x", "", "6/2/nosuchtool/No such file or directory", 255},
         {"", "", "6/2//No such file or directory", 255},
@@ -327,11 +332,10 @@ TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {
         {"marker 'a", "", std::string("-1:Invalid command parameter:'a") + '\0', 255},
         {"marker \\", "", std::string("-1:Invalid command parameter:\\") + '\0' + "ran\n", 0},
     };
-    for (const auto& row : rows) {
+    for (const auto& [command, user, output, exitCode] : rows) {
         pid_t pid = 0;
         FILE* stream = nullptr;
-        EXPECT_EQ(
-            0, zemPropertiesHelper::asynExecuteCommand(row.command, &pid, &stream, row.user, "xx"));
+        EXPECT_EQ(0, zemPropertiesHelper::asynExecuteCommand(command, &pid, &stream, user, "xx"));
         EXPECT_NE(0, fcntl(fileno(stream), F_GETFL) & O_NONBLOCK);
         EXPECT_EQ(output, readAll(stream));
         int status = 0;

@@ -58,7 +58,8 @@ public:
 
 class ScriptedProvider : public PlainProvider {
 public:
-    using PlainProvider::PlainProvider;
+    ScriptedProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), PlainProvider(mb, ctx, name) {}
     using Ctx = const CmpiContext&;
     using Path = const CmpiObjectPath&;
     using Instance = const CmpiInstance&;
@@ -96,8 +97,8 @@ public:
     WORKER(performAssociatorNames, Ctx, CmpiResult&, Path, Text, Text, Text, Text)
     WORKER(performReferences, Ctx, CmpiResult&, Path, Text, Text, Text*)
     WORKER(performReferenceNames, Ctx, CmpiResult&, Path, Text, Text)
-    WORKER(performEnableIndications)
-    WORKER(performDisableIndications)
+    WORKER(performEnableIndications, void)
+    WORKER(performDisableIndications, void)
     FILTER_WORKER(performActivateFilter, CMPIBoolean)
     FILTER_WORKER(performAuthorizeFilter, Text)
     FILTER_WORKER(performDeActivateFilter, CMPIBoolean)
@@ -179,7 +180,9 @@ public:
         return scope.wrap(cimom::ObjectPath("root/cimv2", className));
     }
     CMPIInstance* disk(const cimom::NamedValues& properties = {{"Name", "d1"}}) const {
-        return scope.wrap(cimom::Instance({"root/cimv2", className, properties}, properties));
+        cimom::ObjectPath path("root/cimv2", className);
+        if (!properties.empty()) path.keys.set("Name", "d1");
+        return scope.wrap(cimom::Instance(path, properties));
     }
     CMPIArgs* args(const cimom::NamedValues& values = {}) const { return scope.wrap(values); }
 

@@ -13,7 +13,11 @@
 
 class ToolFolder : public testing_support::TestAppliance {
 public:
-    ToolFolder() : TestAppliance("/usr/bin") {}
+    /// PATH is the scripts and the system's programs alone: a folder on it that may not be searched
+    /// would make a missing tool one that is refused.
+    ToolFolder() : TestAppliance("/usr/bin") {
+        setenv("PATH", (file("bin") + ":/usr/bin:/bin").c_str(), 1);
+    }
 
     /// Makes a shell script, to which $here is the folder of file().
     void script(const std::string& name, const std::string& body) {

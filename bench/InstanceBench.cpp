@@ -1,0 +1,114 @@
+// What does an instance cost on its way through broker, binding and frame, and does that stay the
+// same as the number of instances grows?
+//
+// A get and an enumeration over a provider that makes instances of six properties, beside a plain
+// loop that makes the same instances as the broker's own values. "per_instance" must stay flat.
+
+#include <benchmark/benchmark.h>
+
+#include <string>
+
+#include "ProviderInBench.h"
+
+namespace {
+
+constexpr const char* kClass = "Bench_Part";
+long instancesToReturn = 1;
+
+class PartProvider : public BenchProvider {
+public:
+    using BenchProvider::BenchProvider;
+    static CmpiBaseMI* create(const CmpiBroker& mb, const CmpiContext& ctx, const char* name) {
+        return new PartProvider(mb, ctx, name);
+    }
+    CMPIBoolean isValidInstanceClass(const char* name) override {
+        return compareClassNames(name, kClass);
+    }
+    CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
+                                    const char**) override {
+        return part(path, 0);
+    }
+    void performEnumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
+                              const char**) override {
+        for (long i = 0; i < instancesToReturn; ++i) result.returnData(part(path, i));
+    }
+
+private:
+    CmpiInstance part(const CmpiObjectPath& near, long number) {
+        CmpiObjectPath path = createObjectPath(near);
+        path.setKey("Name", CmpiData(std::to_string(number).c_str()));
+        CmpiInstance instance(path);
+        instance.setProperty("Name", CmpiData(std::to_string(number).c_str()));
+        for (const char* property : {"A", "B", "C", "D"})
+            instance.setProperty(property, CmpiData("some text"));
+        CmpiData state;
+        state.setUint16(2);
+        instance.setProperty("State", state);
+        return instance;
+    }
+};
+
+CMPIInstanceMI* makePartProvider(const CMPIBroker* broker, const CMPIContext* context,
+                                 CMPIStatus* status) {
+    return zemBaseProviderManager::getInstanceMI(const_cast<CMPIBroker*>(broker),
+                                                 const_cast<CMPIContext*>(context), "Part", status,
+                                                 PartProvider::create);
+}
+
+cimom::ObjectPath partPath(long number) {
+    return {"root/cimv2", kClass, {{"Name", std::to_string(number)}}};
+}
+
+struct Broker {
+    Broker() {
+        cimom::Factories factories;
+        factories.instance = makePartProvider;
+        server.registerProvider("Part", {kClass}, factories);
+    }
+    OutputTo quiet{"/dev/null"};
+    cimom::Server server;
+    cimom::Request request;
+};
+
+void perInstance(benchmark::State& state, long count) {
+    state.counters["per_instance"] = benchmark::Counter(
+        static_cast<double>(count),
+        benchmark::Counter::kIsIterationInvariantRate | benchmark::Counter::kInvert);
+}
+
+void Broker_GetInstance(benchmark::State& state) {
+    Broker broker;
+    for (auto _ : state)
+        benchmark::DoNotOptimize(broker.server.getInstance(broker.request, partPath(0)));
+    perInstance(state, 1);
+}
+BENCHMARK(Broker_GetInstance)->Unit(benchmark::kMicrosecond);
+
+void Broker_EnumInstances(benchmark::State& state) {
+    Broker broker;
+    instancesToReturn = state.range(0);
+    for (auto _ : state)
+        benchmark::DoNotOptimize(
+            broker.server.enumInstances(broker.request, {"root/cimv2", kClass}));
+    perInstance(state, state.range(0));
+}
+BENCHMARK(Broker_EnumInstances)->Arg(1)->Arg(100)->Arg(10000)->Unit(benchmark::kMicrosecond);
+
+void Plain_EnumInstances(benchmark::State& state) {
+    for (auto _ : state) {
+        cimom::Reply reply;
+        for (long i = 0; i < state.range(0); ++i) {
+            cimom::Instance part(partPath(i));
+            part.properties.set("Name", std::to_string(i));
+            for (const char* property : {"A", "B", "C", "D"})
+                part.properties.set(property, "some text");
+            part.properties.set("State", static_cast<std::uint16_t>(2));
+            reply.instances.push_back(std::move(part));
+        }
+        benchmark::DoNotOptimize(reply);
+    }
+    perInstance(state, state.range(0));
+}
+BENCHMARK(Plain_EnumInstances)->Arg(1)->Arg(100)->Arg(10000)->Unit(benchmark::kMicrosecond);
+
+}  // namespace

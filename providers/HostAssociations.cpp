@@ -1,0 +1,148 @@
+// Associations of hosts, partitions and connections: one on each family that the library has.
+//
+// All of them ask the same question, whether two objects belong to one host, and none of them
+// needs the tools for it: the host's Name is part of every key.
+#include <cstring>
+#include <string>
+
+#include "AssociationProvider.h"
+#include "BaseZemMultiNtoNAssociationProvider.h"
+#include "ConnectionProvider.h"
+#include "DataTypeConvertUtils.h"
+#include "JMPIProviderInterfaceStub.h"
+#include "MultiNtoNAssociationProvider.h"
+#include "NtoNAssociationProvider.h"
+#include "ProviderFactories.h"
+
+namespace {
+
+constexpr const char kHost[] = "ORXC_CEC_CS";
+constexpr const char kPartition[] = "ORXC_LPAR_CS";
+constexpr const char kConnection[] = "ORXC_HostConnection";
+
+bool isOfClass(const CmpiObjectPath& path, const char* className) {
+    return path.getClassName().equals(className) != 0;
+}
+
+zemString hostOf(const CmpiObjectPath& path) {
+    if (isOfClass(path, kConnection))
+        return ConnectionProvider::hostOf(path.getKey("InstanceID").getString().charPtr()).c_str();
+    return zemDataTypeConvertManager::getMTMSByOP(path);
+}
+
+bool onOneHost(const CmpiObjectPath& a, const CmpiObjectPath& b) {
+    const zemString host = hostOf(a);
+    return !host.isEmpty() && host == hostOf(b);
+}
+
+/// Which host a partition runs on: one class on each side, both asked of the server.
+class HostedPartition : public zemNtoNAssociationProvider {
+public:
+    HostedPartition(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          zemNtoNAssociationProvider(mb, ctx, name, "ORXC_HostedPartition", kHost, kPartition,
+                                     "Antecedent", "Dependent", OP_ALLOps, "", "", "") {}
+
+protected:
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& partition) override {
+        return onOneHost(host, partition);
+    }
+};
+
+/// Which connections lead to a host: a row, to which further association classes can be added.
+class ConnectedHost : public zemAssociationProvider {
+public:
+    ConnectedHost(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), zemAssociationProvider(mb, ctx, name, OP_ALLOps) {
+        addAssoData(new zemAssociationData("ORXC_ConnectedHost", "", kHost, "Antecedent", "",
+                                           kConnection, "Dependent", ""));
+    }
+
+protected:
+    bool isValidateAssociation(const CmpiContext&, const zemAssociationData&,
+                               const CmpiObjectPath& host,
+                               const CmpiObjectPath& connection) override {
+        return onOneHost(host, connection);
+    }
+};
+
+/// All that a host is made of: a list of pairs, the base class standing for its subclasses.
+class HostComponent : public zemMultiNtoNAssociationProvider {
+public:
+    HostComponent(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          zemMultiNtoNAssociationProvider(mb, ctx, name, "ORXC_HostComponent",
+                                          "ORXC_CEC_CS\0ORXC_LPAR_CS\0"
+                                          "ORXC_CEC_CS\0ORXC_HostConnection\0"
+                                          "ORXC_CEC_CS\0CIM_EnabledLogicalElement\0",
+                                          "GroupComponent", "PartComponent", OP_ALLOps, "", "",
+                                          "") {}
+
+protected:
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& part) override {
+        return !isOfClass(part, kHost) && onOneHost(host, part);
+    }
+};
+
+/// Hosts are served by another provider, which the stub asks through the server; connections by
+/// an object of this library.
+class ReachedHost : public zemBaseZemMultiNtoNAssociationProvider {
+public:
+    ReachedHost(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          zemBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
+          m_hosts(mb, ctx),
+          m_connections(mb, ctx, "ORXC_HostConnectionProvider") {
+        m_associationDataSet.addNewAssoPair(new zemMultiNtoNAssociationPair(
+            {&m_hosts, kHost, "Antecedent", ""}, {&m_connections, kConnection, "Dependent", ""},
+            "ORXC_ReachedHost", ""));
+    }
+
+protected:
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& connection,
+                               const zemMultiNtoNAssociationPair&) override {
+        return onOneHost(host, connection);
+    }
+
+private:
+    zemComputerSystemProviderStub m_hosts;
+    ConnectionProvider m_connections;
+};
+
+/// Both sides can be long, so only objects with one key, their host, are compared.
+class PartitionConnection : public zemEnhanceBaseZemMultiNtoNAssociationProvider {
+public:
+    PartitionConnection(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          zemEnhanceBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
+          m_partitions(mb, ctx),
+          m_connections(mb, ctx, "ORXC_HostConnectionProvider") {
+        m_associationDataSet.addNewAssoPair(new zemMultiNtoNAssociationPair(
+            {&m_connections, kConnection, "Antecedent", ""},
+            {&m_partitions, kPartition, "Dependent", ""}, "ORXC_PartitionConnection", ""));
+    }
+
+protected:
+    zemString getObjectPathHashKeyString(const CmpiObjectPath& path, bool) override {
+        return hostOf(path);
+    }
+    bool isValidateAssociationPlus(const CmpiContext&, const CmpiObjectPath& connection,
+                                   const CmpiObjectPath& partition, void*) override {
+        return onOneHost(connection, partition);
+    }
+
+private:
+    zemVirtualSystemProviderStub m_partitions;
+    ConnectionProvider m_connections;
+};
+
+}  // namespace
+
+ZEM_PROVIDER(ORXC_HostedPartitionProvider, HostedPartition)
+ZEM_PROVIDER(ORXC_ConnectedHostProvider, ConnectedHost)
+ZEM_PROVIDER(ORXC_HostComponentProvider, HostComponent)
+ZEM_PROVIDER(ORXC_ReachedHostProvider, ReachedHost)
+ZEM_PROVIDER(ORXC_PartitionConnectionProvider, PartitionConnection)

@@ -1,0 +1,352 @@
+#include <fcntl.h>
+#include <gtest/gtest.h>
+#include <poll.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <functional>
+#include <map>
+#include <string>
+#include <vector>
+
+#include "EdallocCmdCaller.h"
+#include "EdplatCmdCaller.h"
+#include "EdpowerCaller.h"
+#include "EdsuspCaller.h"
+#include "FailureText.h"
+#include "NwplatCmdCaller.h"
+#include "ToolFolder.h"
+#include "VirtualSystemRepRASD.h"
+
+namespace {
+
+using Pairs = zemDynamicArray<tagAttributePair>;
+using Partition = zemEdplatCmdCaller::PartitionAttribute;
+using Profile = zemEdplatCmdCaller::PartitionProfileAttribute;
+
+constexpr char kPrefix[] = "<zem350Log-prefix>";
+
+Pairs one(int index, const char* value) {
+    Pairs all;
+    all.addElement(new tagAttributePair{index, value});
+    return all;
+}
+
+Pairs two(int index, const char* value, int secondIndex, const char* secondValue) {
+    Pairs all = one(index, value);
+    all.addElement(new tagAttributePair{secondIndex, secondValue});
+    return all;
+}
+
+class RASD : public zemRASD {
+public:
+    struct Data : zemRASDCommData {
+        Data() = default;
+        explicit Data(const zemRASDCommData* source) : zemRASDCommData(source) {}
+        zemString getKey() const override { return "3-Processor"; }
+    };
+    RASD(const char* sharingMode, int weight) {
+        m_Data.m_SharingMode = sharingMode;
+        m_Data.m_Weight = weight;
+    }
+    zemRASDCommData* getData() override { return &m_Data; }
+    zemString getKey() override { return m_Data.getKey(); }
+    zemString getInstanceID(bool, zemVSSD*) override { return m_Data.m_InstanceID; }
+    zemRASD* clone() override { return new RASD(*this); }
+    void setInstanceID(const zemString& id, const zemString&) override { m_Data.m_InstanceID = id; }
+    bool equals(zemRASD* rasd) override { return m_Data.equals(rasd->getData()); }
+
+    Data m_Data;
+};
+
+/// Holds the line that a change prints, and what the tool receives of it, against @p line. These
+/// lines mean the same to the shell, which is asked what the tool would receive of them.
+void check(const std::string& log, const std::string& line, const std::function<void()>& change,
+           const std::string& behind = "") {
+    ToolFolder tools;
+    tools.recorder(line.substr(0, line.find(' ')), "done\n");
+    testing::internal::CaptureStdout();
+    EXPECT_NO_THROW(change()) << line;
+    // The first command of a process is followed by a word of the timing trace.
+    const std::string printed = testing::internal::GetCapturedStdout();
+    EXPECT_EQ(0U, printed.find(log + line + '\n' + behind)) << printed;
+    const std::string received = tools.arguments();
+    tools.run(line);
+    EXPECT_EQ(tools.arguments(), received) << line;
+}
+
+struct Row {
+    const char* log;
+    const char* line;
+    std::function<void()> change;
+};
+
+TEST(ChangeCallersTest, Edalloc) {
+    zemEdallocCmdCaller c("", "");
+    RASD both("uncap", 128), weight("", 0), none("", -1);
+    pid_t* const p = nullptr;
+    FILE* stream = nullptr;
+    FILE** const f = nullptr;
+    // clang-format off
+    const Row rows[] = {
+        {"addProcessing:procs:250;procUnits:0;", "proc -m h*1 -o a --id 3 --procs 2 ", [&] { c.addProcessing("h*1", "3", 250, 0, p, f); }},
+        {"addProcessing:procs:0;procUnits:150;", "proc -m h*1 -o a --id 3 --procunits 1.50", [&] { c.addProcessing("h*1", "3", 0, 150, p, f); }},
+        {"removeProcessing:procs:200;procUnits:5;", "proc -m h*1 -o r --id 3 --procs 2 --procunits 0.05", [&] { c.removeProcessing("h*1", "3", 200, 5, p, &stream); }},
+        {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "sharing_mode=uncap,uncap_weight=128")", [&] { c.modifyProcessing("h*1", "3", &both, p, f); }},
+        {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "uncap_weight=0")", [&] { c.modifyProcessing("h*1", "3", &weight, p, f); }},
+        {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "")", [&] { c.modifyProcessing("h*1", "3", &none, p, f); }},
+        {"addMemory:", "mem -m h*1 -o a --id 3", [&] { c.addMemory("h*1", "3", 0, 0, p, f); }},
+        {"removeMemory:", "mem -m h*1 -o r --id 3 --entitled 7 -q 8589934592", [&] { c.removeMemory("h*1", "3", 7, 8589934592, p, f); }},
+        {"modifyMemory:", R"(mem -m h*1 -o s --id 3 -a "mem_weight=128")", [&] { c.modifyMemory("h*1", "3", &both, p, f); }},
+        {"addIOSlot:", R"(io --rsubtype slot -o a -m h*1 --id 3 -l 210  -a  "\"slot_io_pool_id=1\"")", [&] { c.addIOSlot("h*1", "3", "210", one(0, "1"), p, f); }},
+        {"removeIOSlot:", "io  --rsubtype slot -m h*1 -o r --id 3 -l 210", [&] { c.removeIOSlot("h*1", "3", "210", p, f); }},
+        {"addVETH:", R"(virtualio --rsubtype eth -o a -m h*1 --id 3  -s 5  -a  "\"addl_vlan_ids=5,7\",\"vswitch=v\"")", [&] { c.addVETH("h*1", "3", 5, two(2, "5,7", 5, "v"), p, f); }},
+        {"addVSCSI:", "virtualio --rsubtype scsi -o a -m h*1 --id 3 ", [&] { c.addVSCSI("h*1", "3", 0, Pairs(), p, f); }},
+        {"addVSERIAL:", R"(virtualio --rsubtype serial -o a -m h*1 --id 3   -a  "\"supports_dnx=1\"")", [&] { c.addVSERIAL("h*1", "3", -1, one(4, "1"), p, f); }},
+        {"removeVETH:", "virtualio --rsubtype eth -m h*1 -o r --id 3 -s 5 ", [&] { c.removeVETH("h*1", "3", 5, p, f); }},
+        {"removeVSCSI:", "virtualio --rsubtype scsi -m h*1 -o r --id 3 -s 0 ", [&] { c.removeVSCSI("h*1", "3", 0, p, f); }},
+        {"removeVSERIAL:", "virtualio --rsubtype serial -m h*1 -o r --id 3 -s 2 ", [&] { c.removeVSERIAL("h*1", "3", 2, p, f); }},
+    };
+    // clang-format on
+    for (const Row& row : rows) {
+        check(std::string(kPrefix) + row.log, std::string("edalloc -r ") + row.line, row.change);
+    }
+}
+
+TEST(ChangeCallersTest, EdplatAndNwplat) {
+    zemEdplatCmdCaller c("", "");
+    zemNwplatCmdCaller create("", "");
+    const Pairs adapter = one(Profile::ATTR_VIRTUAL_ETH_ADAPTERS, "5/1/2,3");
+    const Pairs name = one(Partition::ATTR_NEW_NAME, "web");
+    // clang-format off
+    const Row rows[] = {
+        {R"(edplat -r sys -m "h")", "", [&] { c.modifyManagedSystemInformation(Pairs(), "h"); }},
+        {"edplat -r sys", R"(  -i  "\"sp_failover_enabled-=1\"")", [&] { c.changeManagedSystemInformation(one(8, "1"), nullptr, c.CH_OP_REMOVE); }},
+        {R"(edplat -r lpar -m "")", R"(  -i  "\"lpar_id=3\"")", [&] { c.addPartitionsInformation("3", Pairs(), ""); }},
+        {R"(edplat -r lpar -m "h")", R"(  -i  "\"lpar_id=3\",\"new_name=web\"")", [&] { c.modifyPartitionsInformation("3", name, "h"); }},
+        {"edplat -r lpar", R"(  -i  "\"lpar_id=3\",\"new_name-=web\"")", [&] { c.removePartitionsInformation("3", name, nullptr); }},
+        {R"(edplat -r prof -m "M")", R"(  -i  "\"name=P\",\"lpar_id=3\",\"virtual_eth_adapters+=5/1/2,3\"")", [&] { c.addPartitionsProfileInformation("P", adapter, "3", "M"); }},
+        {"edplat -r prof", R"(  -i  "\"name=P\",\"lpar_id=3\",\"electronic_err_reporting=1\"")", [&] { c.modifyPartitionsProfileInformation("P", one(57, "1"), "3", nullptr); }},
+        {"edplat -r prof", R"(  -i  "\"name=P\",\"lpar_id=3\",\"virtual_eth_adapters-=5/1/2,3\"")", [&] { c.removePartitionsProfileInformation("P", adapter, "3", nullptr); }},
+        {R"(nwplat -r lpar -m "M")", R"( -i "\"lhea_capabilities =1\",\"lpar_avail_priority=7\"")", [&] { create.makePartitionsInformation(two(54, "1", 60, "7"), "M"); }},
+        {"nwplat -r lpar", R"( -i "")", [&] { create.makePartitionsInformation(Pairs(), nullptr); }},
+    };
+    // clang-format on
+    for (const Row& row : rows) {
+        check(kPrefix, std::string(row.log) + row.line, row.change);
+    }
+}
+
+TEST(ChangeCallersTest, ValuesReachTheToolAsTheyAre) {
+    const std::string open = "6/zemPropertiesHelper/executeCommand/-1/Invalid command parameter:";
+    struct {
+        const char* value;
+        const char* received;  // null: the line is refused
+    } const rows[] = {
+        {"a b  c", "a b  c"},
+        {"x,y;$HOME `id` $(id) *", "x,y;$HOME `id` $(id) *"},
+        {"M\xc3\xbcller \xe6\x9d\xb1 \xfc", "M\xc3\xbcller \xe6\x9d\xb1 \xfc"},
+        {"it's C:\\temp", "it's C:\\temp"},
+        // A value that holds double quotes brings their escapes with it.
+        {"say \\\"hi\\\" \\\\", "say \"hi\" \\"},
+        {"a\"b", nullptr},
+        {"end\\", nullptr},
+    };
+    for (const auto& row : rows) {
+        ToolFolder tools;
+        tools.recorder("edplat");
+        const std::string thrown = failureText([&] {
+            zemEdplatCmdCaller("", "").modifyPartitionsInformation(
+                "3", one(Partition::ATTR_NEW_NAME, row.value), "host, 1");
+        });
+        const bool refused = row.received == nullptr;
+        EXPECT_EQ(refused ? open : "", thrown.substr(0, open.size()));
+        EXPECT_EQ(refused ? ""
+                          : "-r|lpar|-m|host, 1|-i|\"lpar_id=3\",\"new_name=" +
+                                std::string(row.received) + '"',
+                  tools.arguments());
+    }
+}
+
+struct Power {
+    int resource;
+    int operation;
+    bool immed = false;
+    bool restart = false;
+    const char* sysProfile = "";
+    bool validate = false;
+    int bootMode = 0;
+    const char* profile = "P";
+    int lparId = 3;
+};
+
+void run(const Power& settings, int times = 1) {
+    EdpowerCaller c("", "");
+    c.setManagedSystem("M");
+    c.setResource(settings.resource);
+    c.setOperation(settings.operation);
+    c.setImmed(settings.immed);
+    c.setRestart(settings.restart);
+    c.setSysProfName(settings.sysProfile);
+    c.setValidateSysProfile(settings.validate);
+    c.setBootMode(settings.bootMode);
+    c.setLparProfileName(settings.profile);
+    c.setLparId(settings.lparId);
+    for (; times > 0; --times) c.run();
+}
+
+void suspend(int operation) {
+    EdsuspCaller c("", "");
+    c.setManagedSystem("M");
+    c.setLparId(3);
+    c.setOperation(operation);
+    c.run();
+}
+
+TEST(ChangeCallersTest, EdpowerAndEdsusp) {
+    const std::string rule = kPrefix + std::string(28, '+') + '\n';
+    const struct {
+        Power settings;
+        const char* line;
+    } rows[] = {
+        {{1, 1, false, false, "", false, 5}, "lpar --id 3 -o on -b sms -f P"},
+        {{1, 1, false, false, "", false, 0, "P Q"}, "lpar --id 3 -o on -f P Q"},
+        {{1, 2, true, true}, "lpar --id 3 -o shutdown --immed  --restart "},
+        {{1, 3, false, true}, "lpar --id 3 -o osshutdown --restart "},
+        {{1, 4}, "lpar --id 3 -o dumprestart"},
+        {{2, 1}, "sys -o on"},
+        {{2, 6}, "sys -o onstandby"},
+        {{2, 7, false, false, "N"}, "sys -o onsysprof -f N"},
+        {{2, 8}, "sys -o rebuild"},
+        {{2, 9, true, true}, "sys -o off --immed --restart"},
+        {{3, 1, false, false, "N"}, "sysprof -n N -o on  --continue "},
+        {{3, 0, false, false, "N", true}, "sysprof -n N --test "},
+    };
+    for (const auto& row : rows) {
+        check(
+            rule + kPrefix + "Change system state:",
+            std::string("edpower -r ") + row.line + " -m \"M\"", [&] { run(row.settings); }, rule);
+    }
+    const char* const suspensions[] = {"suspend",
+                                       "resume",
+                                       "validate -t suspend ",
+                                       "cancel -t suspend ",
+                                       "recover -t suspend ",
+                                       "shutdown -t suspend "};
+    for (int i = 0; i < 6; ++i) {
+        check(
+            rule + kPrefix + "Change lpar state:",
+            std::string("edsusp  -o ") + suspensions[i] + " -m \"M\" --id 3",
+            [&] { suspend(i + 1); }, rule);
+    }
+}
+
+TEST(ChangeCallersTest, RefusalsRunNoTool) {
+    ToolFolder tools;
+    for (const char* tool : {"edalloc", "edplat", "nwplat", "edpower", "edsusp"}) {
+        tools.recorder(tool);
+    }
+    zemEdallocCmdCaller edalloc("", "");
+    const std::string parms = "4/EdpowerCaller/validateParms//edpower ";
+    const std::string atRun = "4/EdpowerCaller/run//";
+    const std::string mismatch = atRun + "parameter for the invoke method does not match CLI";
+    const std::string index = "3/zemCommandCaller/BuildChCmdString/INVALID_INDEX/";
+    // clang-format off
+    const std::vector<std::pair<std::string, std::function<void()>>> rows = {
+        {parms + "-r lpar operation unsupported: \x05", [] { run({1, 5}); }},
+        {parms + "-r lpar requires --id", [] { run({1, 1, false, false, "", false, 0, "", 0}); }},
+        {parms + "-r lpar requires -f <lpar_profile_name>", [] { run({1, 1, false, false, "", false, 0, ""}); }},
+        {parms + "-r lpar -o shutdown --restart must have --immed", [] { run({2, 9, false, true}); }},
+        {parms + "-r sysprof requires -n <system_profile_name>", [] { run({3, 0}); }},
+        {parms + "-r sysprof cannot have -o and --test", [] { run({3, 2, false, false, "N", true}); }},
+        {parms + "-r sysprof must have -o on", [] { run({3, 2, false, false, "N"}); }},
+        {parms + "resource type unsupported: \x04", [] { run({4, 1}); }},
+        {mismatch, [] { run({1, 1, false, false, "", false, 6}); }},
+        {mismatch, [] { run({2, 5}); }},
+        {atRun + "The command entered is either missing a required parameter or a parameter value " "is invalid. The parameters that are missing or have an invalid value are -f.", [] { run({2, 7}); }},
+        {"4/EdsuspCaller/validateParms//edsusp resource type unsupported: \x07", [] { suspend(7); }},
+        {"4/EdsuspCaller/validateParms//edsusp resource type unsupported: ", [] { suspend(0); }},
+        {"3/zemEdallocCmdCaller/removeProcessing//\"VirtualQuantity/100\" for shared mode or " "\"Reservation/100\" for dedicated mode should be an integer for the command \"edalloc -r " "proc -m %s -o r --id lpar_id --procs\"", [&] { edalloc.removeProcessing("M", "3", 250, 1, nullptr, nullptr); }},
+        {index + "6", [&] { edalloc.addVETH("M", "3", 1, one(6, "x"), nullptr, nullptr); }},
+        {index + "-1", [] { zemEdplatCmdCaller("", "").modifyPartitionsInformation("3", one(-1, ""), ""); }},
+        {"3/zemCommandCaller/callMkCommand/INVALID_INDEX/61", [] { zemNwplatCmdCaller("", "").makePartitionsInformation(one(61, ""), "M"); }},
+    };
+    // clang-format on
+    for (const auto& [words, operation] : rows) {
+        EXPECT_EQ(words, failureText(operation));
+        EXPECT_EQ("", tools.arguments()) << words;
+    }
+    EXPECT_EQ(parms + "-r lpar operation unsupported: ", failureText([] {
+                  run({1, 1}, 2);
+              }))
+        << "the first run uses the operation up";
+    tools.script("edsusp", "echo 'WRTL8018 no such partition' >&2; exit 1");
+    tools.script("edpower", "echo 'No results were found.'");
+    EXPECT_EQ("6/zemCommandCaller/callGenericCommand/WRTL8018/WRTL8018 no such partition",
+              failureText([] { suspend(1); }));
+    EXPECT_EQ("5/zemCommandCaller/callGenericCommand//No results were found.", failureText([] {
+                  run({2, 1});
+              }));
+}
+
+/// All that comes from the stream until its end, which the stream itself does not wait for.
+std::string drain(FILE* stream) {
+    std::string all;
+    char chunk[4096];
+    while (std::feof(stream) == 0) {
+        pollfd ready = {fileno(stream), POLLIN, 0};
+        poll(&ready, 1, -1);
+        std::clearerr(stream);
+        all.append(chunk, std::fread(chunk, 1, sizeof chunk, stream));
+    }
+    return all;
+}
+
+TEST(ChangeCallersTest, BackgroundRunsBelongToTheCaller) {
+    constexpr int kRuns = 32;
+    ToolFolder tools;
+    ASSERT_EQ(0, mkfifo(tools.file("gate").c_str(), 0600));
+    tools.script("edalloc",
+                 ": >$here/started.$8; read x <$here/gate; printf '%70000s' $8; echo err >&2; "
+                 "exit $8");
+    const long before = openDescriptors();
+    const int gate = open(tools.file("gate").c_str(), O_RDWR | O_CLOEXEC);
+    ASSERT_LE(0, gate);
+    std::map<int, std::pair<pid_t, FILE*>> children;
+    for (int i = 1; i <= kRuns; ++i) {
+        auto& [pid, stream] = children[i];
+        EXPECT_EQ(0, zemEdallocCmdCaller("", "").addMemory("M", zemString(i), 0, 1, &pid, &stream));
+    }
+    for (int i = 1; i <= kRuns; ++i) {  // all have begun and none can end
+        while (access(tools.file("started." + std::to_string(i)).c_str(), F_OK) != 0) usleep(2000);
+        EXPECT_EQ(0, waitpid(children[i].first, nullptr, WNOHANG));
+    }
+    EXPECT_EQ(kRuns, write(gate, std::string(kRuns, '\n').c_str(), kRuns));
+    for (const auto& [number, child] : children) {
+        const std::string text = std::to_string(number);
+        EXPECT_EQ(std::string(70000 - text.size(), ' ') + text + "err\n", drain(child.second));
+        fclose(child.second);
+        int status = 0;
+        EXPECT_EQ(child.first, waitpid(child.first, &status, 0));
+        EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == number);
+    }
+    close(gate);
+    EXPECT_FALSE(hasChildren());
+    EXPECT_EQ(before, openDescriptors());
+}
+
+TEST(ChangeCallersTest, CopiedRASDDataHaveNoAddress) {
+    RASD rasd("cap", 7);
+    rasd.m_Data.m_Limit = 200;
+    RASD copy = rasd;
+    EXPECT_TRUE(copy.equals(&rasd));
+    copy.m_Data.m_Limit = 201;
+    EXPECT_FALSE(copy.equals(&rasd));
+    rasd.m_Data.m_Address = "a";
+    const RASD::Data data(&rasd.m_Data);
+    EXPECT_STREQ("", data.m_Address);
+    EXPECT_EQ(200, data.m_Limit);
+    EXPECT_FALSE(data.equals(&rasd.m_Data));
+}
+
+}  // namespace

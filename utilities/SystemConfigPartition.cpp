@@ -1,0 +1,324 @@
+#include <cstdlib>
+#include <string>
+
+#include "DNXApiCaller.h"
+#include "EdplatCmdCaller.h"
+#include "PropertiesHelper.h"
+#include "QymoveCmdCaller.h"
+#include "QyplatCmdCaller.h"
+#include "SystemConfig.h"
+#include "SystemConfigSupport.h"
+#include "SystemStateText.h"
+
+namespace {
+
+constexpr char kClass[] = "zemVirtualSystem";
+
+constexpr int kNotActivated = 0;
+constexpr int kBase = 10;
+
+using Partition = zemQyplatCmdCaller::PartitionAttribute;
+using PartitionChange = zemEdplatCmdCaller::PartitionAttribute;
+
+const char* textOf(const zemString& text) { return text; }
+
+/// The name behind the number in "<number>,<profile name>"; empty when there is no profile.
+zemString profileNameOf(const zemString& text) {
+    const int comma = text.find(',');
+    if (comma <= 0 || zemString::equalsIgnoreCase(
+                          text.extractSubstring(0, static_cast<unsigned>(comma)), "null")) {
+        return zemString();
+    }
+    return text.extractSubstring(static_cast<unsigned>(comma) + 1);
+}
+
+zemString environmentOf(const zemString& definitionState) {
+    switch (zemNumberOf(definitionState)) {
+        case 1:
+        case 2:
+            return "tmxlinux";
+        case 3:
+        case 4:
+            return "xbrgserver";
+        case 129:
+        case 130:
+            return "osq00";
+        default:
+            return definitionState;
+    }
+}
+
+/// What a tool of moves says of its failure: an id up to the first blank, and the words behind it.
+[[noreturn]] void throwMoveFailure(const std::string& line, const zemString& errors,
+                                   const zemString& output, const char* method) {
+    zemString text = errors.isEmpty() ? output : errors;
+    zemString id = "UNKNOWN";
+    const int blank = text.find(' ');
+    if (blank > 0) {
+        id = text.extractSubstring(0, static_cast<unsigned>(blank));
+        text = text.extractSubstring(static_cast<unsigned>(blank) + 1);
+    }
+    // The class is another one's; clients know these failures so.
+    throw zemOperationFailedException("zemHostSystem", method, line.c_str(), id, text);
+}
+
+}  // namespace
+
+int zemVirtualSystem::m_virtualSystemInfoAttr[] = {Partition::ATTR_LPAR_ID,
+                                                   Partition::ATTR_STATE,
+                                                   Partition::ATTR_NAME,
+                                                   Partition::ATTR_CURR_PROFILE,
+                                                   Partition::ATTR_DEFAULT_PROFILE,
+                                                   Partition::ATTR_LPAR_ENV,
+                                                   Partition::ATTR_BOOT_MODE,
+                                                   Partition::ATTR_END};
+
+zemVirtualSystem::zemVirtualSystem(apiProp& prop, const zemHostSystem& host,
+                                   const char* requestUserContext, const char* locale)
+    : m_hostSystem(host), m_requestUserContext(requestUserContext), m_locale(locale) {
+    parseApiProp(prop);
+}
+
+zemVirtualSystem::zemVirtualSystem(apiProp& prop, const char* requestUserContext,
+                                   const char* locale)
+    : m_requestUserContext(requestUserContext), m_locale(locale) {
+    const zemString key = zemApiProp(&prop).getProperty("Name");
+    m_hostSystem = zemHostSystem(key.extractSubstring(static_cast<unsigned>(key.find('*') + 1)),
+                                 requestUserContext, locale);
+    parseApiProp(prop);
+}
+
+zemVirtualSystem::zemVirtualSystem(const zemString& lparId, const zemHostSystem& host,
+                                   const char* requestUserContext, const char* locale)
+    : m_lparId(lparId),
+      m_hostSystem(host),
+      m_requestUserContext(requestUserContext),
+      m_locale(locale) {}
+
+zemVirtualSystem::~zemVirtualSystem() = default;
+
+void zemVirtualSystem::updateData(OP_LEVEL level) {
+    const int depth = level == OP_LEVEL_ALL ? OP_LEVEL_2 : level;
+    const zemString key = getLparIDAndMTMS();
+    const zemApiReader reader = {kClass, "updateData", "getLparObj"};
+    const zemApiObjects partitions(reader,
+                                   zemApiCaller().getLparObj(m_requestUserContext, key, depth));
+    parseApiProp(partitions.only(key));
+}
+
+void zemVirtualSystem::parseApiProp(apiProp& prop) {
+    const zemApiProp partition(&prop);
+    const zemString key = partition.getProperty("Name");
+    m_lparId = key.extractSubstring(0, static_cast<unsigned>(key.find('*')));
+    m_lparName = partition.getProperty("UserDefinedName");
+    m_lparEnv = environmentOf(partition.getProperty("DefinitionState"));
+    m_lparState = zemNumberOf(partition.getProperty("PartitionState"));
+    m_bootMode = zemNumberOf(partition.getProperty("BootMode"));
+    m_migrationState = zemNumberOf(partition.getProperty("MigrationState"));
+    m_gotLevel1 = true;
+    if (zemApiProp::getProperty(&prop, "Default_prof") != nullptr) {
+        m_gotLevel2 = true;
+        m_defaultProfile = profileNameOf(partition.getProperty("Default_prof"));
+        m_currProfile = profileNameOf(partition.getProperty("Curr_prof"));
+    }
+    m_redundantPath = zemNumberOf(partition.getProperty("RedundantPath")) == 0;  // 0 is on
+    m_lparKeylock = zemNumberOf(partition.getProperty("Keylock"));
+    m_procCompatMode = partition.getProperty("ProcCompatMode");
+}
+
+void zemVirtualSystem::needLevel1() {
+    if (!m_gotLevel1) {
+        updateData(OP_LEVEL_1);
+    }
+}
+
+void zemVirtualSystem::needLevel2() {
+    if (!m_gotLevel2) {
+        updateData(OP_LEVEL_2);
+    }
+}
+
+zemString zemVirtualSystem::getLparIDAndMTMS() { return m_lparId + "*" + getMTMS(); }
+
+/// A getter of what a level tells.
+#define ZEM_PARTITION_GETTER(TYPE, NAME, LEVEL, VALUE) \
+    TYPE zemVirtualSystem::NAME() {                    \
+        needLevel##LEVEL();                            \
+        return VALUE;                                  \
+    }
+
+ZEM_PARTITION_GETTER(zemString, getName, 1, m_lparName)
+ZEM_PARTITION_GETTER(zemString, getEnv, 1, m_lparEnv)
+ZEM_PARTITION_GETTER(bool, isXBRG, 1, m_lparEnv == "xbrgserver")
+ZEM_PARTITION_GETTER(bool, isOSQ00, 1, m_lparEnv == "osq00")
+ZEM_PARTITION_GETTER(int, getState, 1, m_lparState)
+ZEM_PARTITION_GETTER(bool, isLive, 1, m_lparState != kNotActivated)
+ZEM_PARTITION_GETTER(int, getBootMode, 1, m_bootMode)
+ZEM_PARTITION_GETTER(int, getMigrationState, 1, zemMigrationStateOf(m_migrationState))
+ZEM_PARTITION_GETTER(zemString, getMigrationStateString, 1,
+                     zemMigrationStateText(zemMigrationStateOf(m_migrationState)))
+ZEM_PARTITION_GETTER(zemString, getDefaultProfileName, 2, m_defaultProfile)
+ZEM_PARTITION_GETTER(zemString, getCurrentProfileName, 2, m_currProfile)
+ZEM_PARTITION_GETTER(zemString, getProcCompatMode, 2, m_procCompatMode)
+ZEM_PARTITION_GETTER(int, getKeyLock, 2, m_lparKeylock)
+ZEM_PARTITION_GETTER(bool, getRedundantPath, 2, m_redundantPath)
+
+zemString zemVirtualSystem::getStateByID(int state) { return zemPartitionStateText(state); }
+
+zemString zemVirtualSystem::getBootModeByID(int bootMode) { return zemBootModeText(bootMode); }
+
+int zemVirtualSystem::getMigrationState(int number) { return zemMigrationStateOf(number); }
+
+int zemVirtualSystem::getMigrationStateFromString(const zemString& text) {
+    return zemMigrationStateOf(static_cast<const char*>(text));
+}
+
+std::string zemVirtualSystem::moveLine(char operation, const zemString& targetHost,
+                                       bool isCrossManager, const zemString& targetManager,
+                                       const char* userName) {
+    std::string manager;
+    if (isCrossManager) {
+        manager = std::string("--ip ") + textOf(targetManager);
+        if (userName != nullptr) {
+            manager += std::string("-u ") + userName;  // no blank before it: the tool gets it so
+        }
+    }
+    return std::string("domove -o ") + operation + " -m \"" + textOf(getMTMS()) + "\" -t \"" +
+           textOf(targetHost) + "\" " + manager + " --id \"" + textOf(m_lparId) + '"';
+}
+
+bool zemVirtualSystem::validateMigratebility(const zemString& targetHost, bool isCrossManager,
+                                             const zemString& targetManager, const char* userName) {
+    const std::string line = moveLine('v', targetHost, isCrossManager, targetManager, userName);
+    zemString output;
+    zemString errors;
+    int exitCode = -1;
+    zemPropertiesHelper::executeCommand(line.c_str(), output, errors, &exitCode,
+                                        m_requestUserContext, 0, m_locale, false);
+    if (exitCode != 0) {
+        throwMoveFailure(line, errors, output, "getVirtualSystemByName");
+    }
+    return true;
+}
+
+int zemVirtualSystem::migrateTo(const zemString& targetHost, bool isCrossManager,
+                                const zemString& targetManager, const char* userName, pid_t* pid,
+                                FILE** fpOutput) {
+    const std::string line = moveLine('m', targetHost, isCrossManager, targetManager, userName);
+    const int rc = zemPropertiesHelper::asynExecuteCommand(line.c_str(), pid, fpOutput,
+                                                           m_requestUserContext, m_locale);
+    if (rc != 0) {
+        const std::string text = "Command:\"" + line + "\" ReturnCode:" + std::to_string(rc);
+        throw zemNotSupportedException(kClass, "validateMigratebility", text.c_str());
+    }
+    return 0;
+}
+
+int zemVirtualSystem::stopMigration(const zemString& /*targetHost*/, bool /*isCrossManager*/,
+                                    const zemString& /*targetManager*/, const char* /*userName*/,
+                                    int timeOut) {
+    const std::string line = std::string("domove -o s -m \"") + textOf(getMTMS()) + "\" --id \"" +
+                             textOf(m_lparId) + '"';
+    zemString output;
+    zemString errors;
+    int exitCode = -1;
+    const int rc = zemPropertiesHelper::executeCommand(
+        line.c_str(), output, errors, &exitCode, m_requestUserContext, timeOut, m_locale, false);
+    if (rc == 0 && exitCode != 0) {
+        throwMoveFailure(line, errors, output, "stopMigration");
+    }
+    return rc;
+}
+
+int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
+    using Migration = zemQymoveCmdCaller::PartitionAttribute;
+    int wanted[] = {Migration::ATTR_BYTES_TRANSMITTED, Migration::ATTR_BYTES_REMAINING,
+                    Migration::ATTR_END};
+    const std::string filter = std::string("\"lpar_ids=") + textOf(m_lparId) + '"';
+    const zemRecordSetsType records =
+        zemQymoveCmdCaller(userName, nullptr)
+            .getPartitionsMigrationState(wanted, getMTMS(), filter.c_str());
+    if (records.size() == 0) {
+        return -1;
+    }
+    zemRecordType& record = *records.getElementAt(0);
+    const auto sent = static_cast<double>(std::strtoull(record[wanted[0]], nullptr, kBase));
+    const auto left = static_cast<double>(std::strtoull(record[wanted[1]], nullptr, kBase));
+    constexpr double kSentAll = 90.0;
+    return sent + left > 0 ? static_cast<int>(sent / (sent + left) * kSentAll + 0.5) : 0;
+} catch (...) {
+    return -1;
+}
+
+int zemVirtualSystem::change(int attributeIndex, const zemString& value, const char* method) {
+    return zemWithNotFound(kUnknownToChanges, kClass, method, [&] {
+        zemDynamicArray<tagAttributePair> pairs;
+        pairs.addElement(new tagAttributePair{attributeIndex, value});
+        return zemEdplatCmdCaller(m_requestUserContext, m_locale)
+            .modifyPartitionsInformation(m_lparId, pairs, getMTMS());
+    });
+}
+
+int zemVirtualSystem::setDefaultProfile(const zemString& profileName) {
+    return change(PartitionChange::ATTR_DEFAULT_PROFILE, profileName, "setDefaultProfile");
+}
+
+int zemVirtualSystem::setName(const zemString& systemName) {
+    return change(PartitionChange::ATTR_NEW_NAME, systemName, "setVirtualSystemName");
+}
+
+int zemVirtualSystem::setKeylock(const zemString& keylockPos) {
+    return zemWithNotFound(kUnknownToChanges, kClass, "setKeylock", [&] {
+        const std::string line = std::string("edpower -r lpar -o chkey -k \"") +
+                                 textOf(keylockPos) + "\" --id \"" + textOf(m_lparId) + "\" -m \"" +
+                                 textOf(getMTMS()) + '"';
+        return zemCommandCaller(m_requestUserContext, m_locale)
+            .callGenericCommand(line.c_str(), nullptr, false);
+    });
+}
+
+zemVirtualSystemProfile zemVirtualSystem::getCurrentProfile() {
+    return getVirtualSystemProfileByName(getCurrentProfileName());
+}
+
+zemVirtualSystemProfile zemVirtualSystem::getDefaultProfile() {
+    return getVirtualSystemProfileByName(getDefaultProfileName());
+}
+
+zemDynamicArray<zemVirtualSystemProfile> zemVirtualSystem::getAllVirtualSystemProfiles() {
+    const zemApiReader reader = {kClass, "getAllVirtualSystemProfiles",
+                                 "getAllLparProfilesFromLpar", "UNKNOWN"};
+    const zemApiObjects objects(reader, zemApiCaller().getAllLparProfilesFromLpar(
+                                            m_requestUserContext, getLparIDAndMTMS(), 1));
+    zemDynamicArray<zemVirtualSystemProfile> profiles;
+    for (apiProp& profile : objects) {
+        profiles.addElement(
+            new zemVirtualSystemProfile(profile, *this, m_requestUserContext, m_locale));
+    }
+    return profiles;
+}
+
+zemVirtualSystemProfile zemVirtualSystem::getVirtualSystemProfileByName(
+    const zemString& profileName) {
+    const zemApiReader reader = {kClass, "getVirtualSystemProfileByName", "getLparProfile"};
+    const zemApiObjects profiles(
+        reader,
+        zemApiCaller().getLparProfile(m_requestUserContext, getLparIDAndMTMS(), profileName, 1));
+    return zemVirtualSystemProfile(profiles.only(profileName), *this, m_requestUserContext,
+                                   m_locale);
+}
+
+zemString zemVirtualSystem::getAttributeValue(int attributeIndex) {
+    const char* const method = "getAttributeValue";
+    int wanted[] = {attributeIndex, Partition::ATTR_END};
+    const zemString key = getLparIDAndMTMS();
+    const zemRecordSetsType records = zemWithNotFound(kUnknownToQueries, kClass, method, [&] {
+        const std::string filter = std::string("\"lpar_ids=") + textOf(m_lparId) + '"';
+        return zemQyplatCmdCaller(m_requestUserContext, m_locale)
+            .getPartitionsInformation(wanted, getMTMS(), filter.c_str());
+    });
+    if (records.size() == 0) {
+        throw zemObjectNotFoundException(kClass, method, key);
+    }
+    return (*records.getElementAt(0))[attributeIndex];
+}

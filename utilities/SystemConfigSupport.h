@@ -1,0 +1,43 @@
+/// What the sources of the configuration objects share: numbers in texts, and how the failures of
+/// tools become failures of these objects.
+///
+/// Functions without state; any thread may call them.
+#ifndef SYSTEM_CONFIG_SUPPORT_H
+#define SYSTEM_CONFIG_SUPPORT_H
+
+#include <cstddef>
+#include <cstdlib>
+#include <cstring>
+
+#include "Exception.h"
+#include "StringUtils.h"
+
+/// The decimal number with which @p text begins; 0 if there is none.
+inline int zemNumberOf(const zemString& text) {
+    constexpr int kBase = 10;
+    return static_cast<int>(std::strtol(text, nullptr, kBase));
+}
+
+/// Ids by which the query tool and the change tools say that there is no such object.
+constexpr const char* kUnknownToQueries[] = {"WRTL8018", "WRTL8011"};
+constexpr const char* kUnknownToChanges[] = {"WRTL8018", "WRTL8011", "WRTL8010"};
+
+/// Runs @p operation. A failure with one of @p ids becomes a zemObjectNotFoundException of the
+/// given class and method; others pass.
+template <std::size_t N, class Operation>
+auto zemWithNotFound(const char* const (&ids)[N], const char* throwClass, const char* throwMethod,
+                     Operation operation) {
+    try {
+        return operation();
+    } catch (const zemOperationFailedException& e) {
+        for (const char* id : ids) {
+            if (std::strcmp(e.getExceptionId(), id) == 0) {
+                throw zemObjectNotFoundException(throwClass, throwMethod, e.getAccessMethod(), id,
+                                                 e.getExceptionString());
+            }
+        }
+        throw;
+    }
+}
+
+#endif

@@ -1,4 +1,4 @@
-// The program "appliance": makes an appliance's state, shows it and checks it.
+// The program "appliance": makes an appliance's state, shows it and checks it, and lets tools fail.
 
 #include <unistd.h>
 
@@ -10,6 +10,7 @@
 #include "Appliances.h"
 #include "Check.h"
 #include "Failure.h"
+#include "FaultCommand.h"
 #include "Show.h"
 
 namespace {
@@ -109,7 +110,8 @@ int run(int argc, char** argv) {
     show->add_option("--format", format, "text, or json with every attribute that was set")
         ->check(CLI::IsMember({"text", "json"}))
         ->capture_default_str();
-    for (CLI::App* verb : {init, generate, show, verify}) verb->footer(kFooter);
+    FaultCommand fault(app);
+    for (CLI::App* verb : {init, generate, show, verify, fault.command()}) verb->footer(kFooter);
 
     try {
         app.parse(argc, argv);
@@ -124,6 +126,7 @@ int run(int argc, char** argv) {
     }
     if (show->parsed()) return showState(format);
     if (verify->parsed()) return checkState();
+    if (fault.isParsed()) return fault.run();
     return 0;
 }
 

@@ -66,6 +66,10 @@ constexpr FaultText kFaults[] = {
      "Die Partition mit der ID %1 wurde nicht gefunden."},
     {Fault::HostNotFound, kExitRefused, "WRTL8018", "The managed system \"%1\" was not found.",
      "Das verwaltete System \"%1\" wurde nicht gefunden."},
+    {Fault::NotIoServer, kExitRefused, "WRTL8019", "The partition with the ID %1 is no I/O server.",
+     "Die Partition mit der ID %1 ist kein I/O-Server."},
+    {Fault::LparNotRunning, kExitRefused, "WRTL8020",
+     "The partition with the ID %1 is not running.", "Die Partition mit der ID %1 läuft nicht."},
 };
 
 constexpr bool inOrder() {

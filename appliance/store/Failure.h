@@ -42,6 +42,8 @@ enum class Fault {
     LparNameNotFound,
     LparIdNotFound,
     HostNotFound,
+    NotIoServer,
+    LparNotRunning,
 };
 
 /// How a program ends: 0 when the request was met, otherwise one of these.

@@ -70,6 +70,20 @@ std::string memberNames(const Row& row, const char* key) { return members(row, k
 
 std::string hostMtms(const Row& row, const char*) { return row.view->mtms(); }
 
+std::string lparKey(const Row& row, const char*) {
+    return std::to_string(row.self->place().lpar) + '*' + row.view->mtms();
+}
+
+/// What a partition can change while it runs, as bits: 1 memory, 2 processors, 4 I/O. One that
+/// does not run, or is on its way to another host, can change nothing.
+std::string dynamicCapabilities(const Row& row, const char*) {
+    constexpr std::int64_t kAllOfThem = 1 | 2 | 4;
+    const bool changes = own(row, "state") == "Running" &&
+                         (own(row, "migration_state") == "Not Migrating" ||
+                          own(row, "migration_state") == "Migration Complete");
+    return "DCaps:<" + hex(changes ? kAllOfThem : 0, 1) + '>';
+}
+
 std::string sampleTime(const Row& row, const char*) { return timeText(row.time); }
 
 std::string hostTime(const Row& row, const char* key) {
@@ -293,6 +307,8 @@ constexpr Derived kOptiPool[] = {
 constexpr Derived kLpar[] = {
     {"resource_type", constant, "lpar"},
     {"logical_serial_num", logicalSerial},
+    {"lpar_key", lparKey},
+    {"dlpar_capabilities", dynamicCapabilities},
     {"primary_psp_name", namesOfIds, "primary_psp_id"},
     {"secondary_psp_name", namesOfIds, "secondary_psp_id"},
     {"curr_psp_name", namesOfIds, "curr_psp_id"},

@@ -69,7 +69,9 @@ std::string optionLines(Tool tool, Language language) {
 
 std::string resourceLines(const Resource& resource, const Words& words) {
     std::string text = "\n ";
-    if (resource.type != nullptr) text += std::string(" -r ") + resource.type;
+    if (resource.type != nullptr) {
+        text += std::string(1, ' ') + typeOption(resource.tool) + ' ' + resource.type;
+    }
     if (resource.subtype != nullptr) text += std::string(" --rsubtype ") + resource.subtype;
     if (resource.level != nullptr) text += std::string(" --level ") + resource.level;
     text += '\n' + wrapped(words.attributes, resource.attributes);
@@ -92,6 +94,10 @@ const std::vector<ToolName>& toolNames() {
          "listet die Verbindungen zu verwalteten Systemen auf"},
         {kQylwh, "qylwh", "names the host that this appliance alone manages, and its partition",
          "nennt den Host, den allein diese Appliance verwaltet, und ihre Partition darauf"},
+        {kQydyn, "qydyn", "lists what partitions can change while they run",
+         "listet auf, was Partitionen im laufenden Betrieb ändern können"},
+        {kXbrgcli, "xbrgcli", "has a running I/O server carry out a command",
+         "lässt einen laufenden I/O-Server einen Befehl ausführen"},
     };
     return names;
 }

@@ -10,6 +10,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "Faults.h"
 #include "Query.h"
 
 namespace {
@@ -25,6 +26,21 @@ void writeAll(const std::string& text) {
     }
 }
 
+/// Does what was planned to go wrong with this call.
+/// @return whether the tool ends here, with @p status
+bool failsAsPlanned(const std::string& name, int* status) {
+    const auto fault = takeFault(name);
+    if (!fault) return false;
+    pause(*fault);
+    if (!fault->text.empty()) std::fprintf(stderr, "%s\n", fault->text.c_str());
+    if (fault->signal != 0) {
+        std::signal(fault->signal, SIG_DFL);
+        std::raise(fault->signal);
+    }
+    *status = fault->code.value_or(kExitRefused);
+    return fault->code || !fault->text.empty();
+}
+
 }  // namespace
 
 int main(int, char** argv) {
@@ -33,7 +49,10 @@ int main(int, char** argv) {
     const Language language = languageOfEnvironment();
     try {
         const std::string program = argv[0] == nullptr ? "" : argv[0];
-        const Tool tool = toolNamed(program.substr(program.rfind('/') + 1));
+        const std::string name = program.substr(program.rfind('/') + 1);
+        const Tool tool = toolNamed(name);
+        int status = 0;
+        if (failsAsPlanned(name, &status)) return status;
         writeAll(answer(tool, argv + 1, language));
         return 0;
     } catch (const Failure& failure) {

@@ -27,7 +27,8 @@ bool anyLevel(const std::string& level) {
 /// Walks the table from the option that decides most: the first value that leaves no row is the
 /// one that is wrong.
 const Resource& resourceFor(Tool tool, const Request& request) {
-    const std::string type = request.value("-r"), subtype = request.value("--rsubtype"),
+    const char* const option = typeOption(tool);
+    const std::string type = request.value(option), subtype = request.value("--rsubtype"),
                       level = request.value("--level");
     bool typeKnown = false, subtypeKnown = false;
     for (const Resource& resource : resources()) {
@@ -37,7 +38,7 @@ const Resource& resourceFor(Tool tool, const Request& request) {
         subtypeKnown = true;
         if (resource.level == nullptr ? anyLevel(level) : level == resource.level) return resource;
     }
-    const char* wrong = !typeKnown ? "-r" : !subtypeKnown ? "--rsubtype" : "--level";
+    const char* wrong = !typeKnown ? option : !subtypeKnown ? "--rsubtype" : "--level";
     if (!request.has(wrong)) throw Failure(Fault::MissingOption, {wrong});
     throw Failure(Fault::BadOptionValue, {wrong, request.value(wrong)});
 }
@@ -54,12 +55,15 @@ std::vector<std::string> wantedAttributes(const Resource& resource, const std::s
     return wanted;
 }
 
-Hosts hostsFor(Store& store, const std::string& name) {
+/// @param joint  what stands between a host's type and serial number on the command line
+Hosts hostsFor(Store& store, const std::string& name, char joint) {
     Hosts all = allHosts(store);
     if (name.empty()) return all;
     Hosts found;
     for (auto& host : all) {
-        if (host->host().get("name") == name || host->mtms() == name) {
+        const Object& self = host->host();
+        if (self.get("name") == name ||
+            self.get("type_model") + joint + self.get("serial_num") == name) {
             found.push_back(std::move(host));
         }
     }
@@ -101,11 +105,12 @@ std::string answer(Tool tool, const char* const* arguments, Language language) {
 
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
-    const Hosts hosts = hostsFor(store, request.value("-m"));
+    const Hosts hosts = tool == kQydyn ? hostsFor(store, request.value("-c"), '_')
+                                       : hostsFor(store, request.value("-m"), '*');
     std::vector<Row> rows = resource.rows(hosts, request);
     applyFilter(request.value("--filter"), resource.filters, hosts, rows);
     if (rows.empty()) return kNothing;
-    const bool withNames = !request.has("-F") && resource.type != nullptr;
+    const bool withNames = !request.has("-F") && request.has("-r");
     return records(rows, attributes, withNames);
 }
 

@@ -10,7 +10,8 @@ namespace appliance {
 namespace {
 
 constexpr unsigned kByHost = kQyplat | kQyalloc | kQymove | kQyusage | kQyfault | kQylink;
-constexpr unsigned kAll = kByHost | kQylwh;
+constexpr unsigned kByAttribute = kByHost | kQylwh;
+constexpr unsigned kAll = kByAttribute | kQydyn | kXbrgcli;
 
 constexpr Option kOptions[] = {
     {"-r", kByHost, "<resource>", "what to list", "was aufgelistet wird"},
@@ -23,7 +24,7 @@ constexpr Option kOptions[] = {
     {"--filter", kQyplat | kQyalloc | kQymove | kQyusage | kQyfault, "\"<name>=<value>,...,...\"",
      "only records that have one of the values; several filters must all hold",
      "nur Sätze, die einen der Werte haben; mehrere Filter müssen alle zutreffen"},
-    {"-F", kAll, "[<attribute>,...]",
+    {"-F", kByAttribute, "[<attribute>,...]",
      "print these values without names; all of them when the list is empty",
      "diese Werte ohne Namen ausgeben; alle, wenn die Liste leer ist"},
     {"--maxmem", kQyalloc, "<megabytes>",
@@ -44,6 +45,16 @@ constexpr Option kOptions[] = {
     {"--endmonth", kQyusage, "<1-12>", "1 when absent", "1, wenn es fehlt"},
     {"--endday", kQyusage, "<1-31>", "1 when absent", "1, wenn es fehlt"},
     {"--endhour", kQyusage, "<0-23>", "0 when absent", "0, wenn es fehlt"},
+    {"-dlpar", kQydyn, nullptr, "what the running partitions can change",
+     "was die laufenden Partitionen ändern können"},
+    {"-c", kQydyn, "<managed system>",
+     "by its name or as <type_model>_<serial_num>; all when absent or empty",
+     "mit Namen oder als <type_model>_<serial_num>; alle, wenn es fehlt oder leer ist"},
+    {"-m", kXbrgcli, "<managed system>", "by its name or as <type_model>*<serial_num>",
+     "mit Namen oder als <type_model>*<serial_num>"},
+    {"--id", kXbrgcli, "<lpar_id>", "the I/O server of that managed system",
+     "der I/O-Server dieses verwalteten Systems"},
+    {"-c", kXbrgcli, "<command>", "what it is to do", "was er tun soll"},
     {"--help", kAll, nullptr, "this text", "dieser Text"},
     {nullptr, 0, nullptr, nullptr, nullptr},
 };

@@ -16,6 +16,8 @@ enum Tool : unsigned {
     kQyfault = 16,
     kQylink = 32,
     kQylwh = 64,
+    kQydyn = 128,
+    kXbrgcli = 256,
 };
 
 struct Option {

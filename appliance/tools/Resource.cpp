@@ -201,6 +201,14 @@ const std::vector<Resource>& resources() {
         {kQylink, "all", nullptr, nullptr, each<Kind::Link>, kLink, kByHost},
 
         {kQylwh, nullptr, nullptr, nullptr, singleHostManager, "type_model,serial_num,lpar_id", ""},
+
+        // By partition ID: callers take the first place where "7*<host>" occurs, and that must not
+        // be within "17*<host>".
+        {kQydyn, nullptr, nullptr, nullptr, dynamicLpars, "lpar_key,dlpar_capabilities", ""},
+
+        {kXbrgcli, "version", nullptr, nullptr, ioServer, "os_version", ""},
+        {kXbrgcli, "mappings", nullptr, nullptr, ioServerMappings,
+         "slot_num,remote_lpar_id,remote_lpar_name,remote_slot_num,backing_devices", ""},
     };
     // clang-format on
     return all;

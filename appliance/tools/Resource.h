@@ -21,13 +21,16 @@ using Rows = std::vector<Row> (*)(const Hosts& hosts, const Request& request);
 
 struct Resource {
     Tool tool;
-    const char* type;     ///< value of -r; null for a tool that lists one thing only
+    const char* type;     ///< value of typeOption(tool); null for a tool that lists one thing only
     const char* subtype;  ///< value of --rsubtype; null when there is none
     const char* level;    ///< value of --level; null when any is taken, and none needed
     Rows rows;
     const char* attributes;  ///< names with commas between them
     const char* filters;     ///< likewise, of the table in Filter.cpp
 };
+
+/// The option of @p tool that names the type of a resource.
+inline const char* typeOption(Tool tool) { return tool == kXbrgcli ? "-c" : "-r"; }
 
 /// All resources of all tools, in the order of the help.
 const std::vector<Resource>& resources();

@@ -56,6 +56,14 @@ std::vector<Row> theAppliance(const Hosts& hosts, const Request& request);
 /// @throws Failure NoSingleHostManager
 std::vector<Row> singleHostManager(const Hosts& hosts, const Request& request);
 
+/// Partitions; -dlpar, the one thing to ask about them, must have been given.
+std::vector<Row> dynamicLpars(const Hosts& hosts, const Request& request);
+
+/// The I/O server that -m and --id name, and what it serves to others. Only one that runs answers.
+/// @throws Failure LparIdNotFound, NotIoServer, LparNotRunning
+std::vector<Row> ioServer(const Hosts& hosts, const Request& request);
+std::vector<Row> ioServerMappings(const Hosts& hosts, const Request& request);
+
 }  // namespace appliance
 
 #endif

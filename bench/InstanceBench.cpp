@@ -17,7 +17,8 @@ long instancesToReturn = 1;
 
 class PartProvider : public BenchProvider {
 public:
-    using BenchProvider::BenchProvider;
+    PartProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), BenchProvider(mb, ctx, name) {}
     static CmpiBaseMI* create(const CmpiBroker& mb, const CmpiContext& ctx, const char* name) {
         return new PartProvider(mb, ctx, name);
     }

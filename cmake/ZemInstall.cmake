@@ -1,9 +1,13 @@
 # What `cmake --install` gives: libraries, headers, programs, a CMake package, a pkg-config file.
 include(CMakePackageConfigHelpers)
 
-set(zem_installed zemutilities)
+set(zem_installed zemutilities api)
 file(GLOB zem_headers ${CMAKE_SOURCE_DIR}/utilities/*.h)
-install(FILES ${zem_headers} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zemutilities)
+foreach(header IN LISTS ZEM_PRIVATE_HEADERS)
+  list(REMOVE_ITEM zem_headers ${CMAKE_SOURCE_DIR}/utilities/${header})
+endforeach()
+install(FILES ${zem_headers} ${CMAKE_SOURCE_DIR}/appliance/api/libapi.h
+  DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zemutilities)
 
 # The bundled binding goes along; the system's own is found again by the package.
 if(TARGET cmpiCppImpl)
@@ -21,9 +25,9 @@ install(TARGETS cimom appliance appliance_tools RUNTIME DESTINATION ${CMAKE_INST
 install(TARGETS zemproviders LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}/zemutilities)
 install(FILES ${CMAKE_SOURCE_DIR}/providers/zemproviders.json
   DESTINATION ${CMAKE_INSTALL_LIBDIR}/zemutilities)
-install(DIRECTORY ${CMAKE_SOURCE_DIR}/providers/mof
+install(DIRECTORY ${CMAKE_SOURCE_DIR}/providers/mof ${CMAKE_SOURCE_DIR}/providers/messages
   DESTINATION ${CMAKE_INSTALL_DATADIR}/zemutilities)
-install(FILES README.md docs/architecture.md docs/appliance.md
+install(FILES README.md docs/architecture.md docs/appliance.md docs/writing-a-provider.md
   DESTINATION ${CMAKE_INSTALL_DOCDIR})
 
 set(zem_package ${CMAKE_INSTALL_LIBDIR}/cmake/zemutilities)
@@ -35,5 +39,7 @@ write_basic_package_version_file(${CMAKE_BINARY_DIR}/zemutilitiesConfigVersion.c
 install(FILES ${CMAKE_BINARY_DIR}/zemutilitiesConfig.cmake
   ${CMAKE_BINARY_DIR}/zemutilitiesConfigVersion.cmake DESTINATION ${zem_package})
 
+# The prefix is told from where the file lies, so that the tree may be installed anywhere.
+file(RELATIVE_PATH zem_pc_up /${CMAKE_INSTALL_LIBDIR}/pkgconfig /)
 configure_file(${CMAKE_SOURCE_DIR}/cmake/zemutilities.pc.in ${CMAKE_BINARY_DIR}/zemutilities.pc @ONLY)
 install(FILES ${CMAKE_BINARY_DIR}/zemutilities.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)

@@ -45,6 +45,17 @@ ROWS = [
     ("ParseRecords/100000", "LibcsvKeyed/100000", 1.0, 0),
     ("ParseRecords/100000", "LibcsvRows/100000", None, 0),
     ("ParseRecords/1000000", "ParseRecords/100000", 20.0, 0),
+    ("Broker_EnumInstances/100", "Plain_EnumInstances/100", None, 0),
+    ("Broker_EnumInstances/10000", "Broker_EnumInstances/100", 150.0, 0),
+    ("Frame_EnumInstanceNames", "Worker_EnumInstanceNames", None, 0),
+    ("HashJoin_EnumNames/100", "CrossProduct_EnumNames/100", None, 0),
+    ("HashJoin_EnumNames/1000", "CrossProduct_EnumNames/1000", 0.02, 0),
+    ("HashJoin_EnumNames/4000", "HashJoin_EnumNames/1000", 6.0, 0),
+    ("HashJoin_AssociatorNames/1000", "Plain_AssociatorNames/1000", None, 0),
+    ("HashJoin_AssociatorNames/10000", "HashJoin_AssociatorNames/1000", 15.0, 0),
+    ("NtoN_AssociatorNames/1000", "Plain_AssociatorNames/1000", None, 0),
+    ("NtoN_AssociatorNames/10000", "NtoN_AssociatorNames/1000", 15.0, 0),
+    ("MultiNtoN_EnumNames", "Rows_EnumNames", None, 0),
     ("ExecuteCommand/real_time", "SpawnReadWait/real_time", 1.25, 2),
 ]
 TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}

@@ -36,7 +36,9 @@ install_missing() {
         apt-get install -y -qq --no-install-recommends "${missing[@]}" >&2
 }
 
-# build <preset> [<cmake option>...]: configures and builds into build/<preset>.
+# build <preset> [<cmake option>...]: configures and builds into build/<preset>; only the targets
+# in build_targets where that names any.
+build_targets=()
 build() {
     local preset=$1
     shift
@@ -46,5 +48,6 @@ build() {
         die "configuring failed"
     }
     rm -f "$top/build-$preset.log"
-    cmake --build "$top/build/$preset" -j "$jobs" >&2
+    cmake --build "$top/build/$preset" -j "$jobs" \
+        ${build_targets[@]+--target "${build_targets[@]}"} >&2
 }

@@ -346,7 +346,7 @@ public:
     /// @throws zemInvalidParameterException  with @p text, when it is none of these forms
     static CmpiObjectPath createObjectPath(const zemString& text);
 
-    /// A key of a path; a value that tests as null when it cannot be read.
+    /// A key of a path; a value that tests as not found when it cannot be read.
     static CmpiData getKeyBinding(const CmpiObjectPath& path, const char* name);
 
     /// An argument or a property that must be there.

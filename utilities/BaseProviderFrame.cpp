@@ -129,6 +129,7 @@ bool zemOperationFrame::admit() {
         m_provider.throwObjectNotFoundExc("getInstance", "zemBaseProvider", kDisabledText);
     }
     if (m_row.banner != nullptr) traceBanner();
+    if (m_filterLabel != nullptr) logFilter();
     testClass();
     if (m_row.keys != kNoKeys) testKeys();
     return true;
@@ -172,6 +173,15 @@ void zemOperationFrame::traceBanner() const {
     } else {
         PROV_TRACE_STRING(4, m_row.banner, static_cast<const char*>(path));
     }
+}
+
+void zemOperationFrame::logFilter() const {
+    const auto line = [this](const char* what, const char* value) {
+        const std::string text = std::string(m_filterLabel) + " -> " + what + ":[" + value + "]";
+        zemLog::LogSysOut(text.c_str());
+    };
+    line("className", m_className);
+    line("eventType", m_namedClass);
 }
 
 void zemOperationFrame::testClass() {

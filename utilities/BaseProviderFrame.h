@@ -49,6 +49,8 @@ public:
     void setFilterClass(const char* className);
     /// The event type that a refused filter operation names in place of the class.
     void setEventType(const char* eventType);
+    /// Opens the lines on standard output that tell of a filter; without it there are none.
+    void setFilterLabel(const char* label) { m_filterLabel = label; }
     /// The instance whose properties count as keys.
     void setInstance(const CmpiInstance& instance) { m_instance = &instance; }
     void setMethod(const char* method) { m_method = method != nullptr ? method : ""; }
@@ -76,6 +78,7 @@ private:
     std::string timingKey() const;
     void endTiming(const std::string& key) const;
     void traceBanner() const;
+    void logFilter() const;
     void testClass();
     void testKeys();
     bool hasKey(const char* key) const;
@@ -90,6 +93,7 @@ private:
     CmpiResult* m_result;
     const CmpiInstance* m_instance = nullptr;
     const char* m_method = nullptr;
+    const char* m_filterLabel = nullptr;
     zemString m_className;
     zemString m_testedClass;
     zemString m_namedClass;

@@ -1,23 +1,6 @@
 // Indication operations of zemBaseProvider.
-#include <string>
-
 #include "BaseProvider.h"
 #include "BaseProviderFrame.h"
-#include "Log.h"
-
-namespace {
-
-void logFilter(const char* what, const char* className, const char* eventType) {
-    const auto line = [what](const char* label, const char* value) {
-        const std::string text =
-            std::string(what) + " -> " + label + ":[" + (value != nullptr ? value : "") + "]";
-        zemLog::LogSysOut(text.c_str());
-    };
-    line("className", className);
-    line("eventType", eventType);
-}
-
-}  // namespace
 
 CmpiStatus zemBaseProvider::enableIndications(const CmpiContext& ctx) {
     return zemOperationFrame(*this, zemOperation::EnableIndications, ctx).run([&] {
@@ -43,7 +26,7 @@ CmpiStatus zemBaseProvider::activateFilter(const CmpiContext& ctx, const CMPISel
                                            CMPIBoolean firstActivation) {
     zemOperationFrame frame(*this, zemOperation::ActivateFilter, ctx, &path);
     frame.setEventType(eventType);
-    logFilter("Filter___activate", frame.className(), eventType);
+    frame.setFilterLabel("Filter___activate");
     return frame.run(
         [&] { performActivateFilter(ctx, filter, frame.className(), path, firstActivation); });
 }
@@ -61,7 +44,7 @@ CmpiStatus zemBaseProvider::deActivateFilter(const CmpiContext& ctx, const CMPIS
                                              CMPIBoolean lastActivation) {
     zemOperationFrame frame(*this, zemOperation::DeActivateFilter, ctx, &path);
     frame.setEventType(eventType);
-    logFilter("deActivateFilter", frame.className(), eventType);
+    frame.setFilterLabel("deActivateFilter");
     return frame.run(
         [&] { performDeActivateFilter(ctx, filter, frame.className(), path, lastActivation); });
 }

@@ -145,7 +145,7 @@ typename Kind::MI* zemBaseProviderManager::implGetMI(CMPIBroker* mb, CMPIContext
     record->hdl = item->m_mi;
     record->ft = table.get();
     (this->*Kind::list).addElement(record.get());
-    table.release();
+    static_cast<void>(table.release());
     ++item->m_miCount;
     return record.release();
 }
@@ -221,7 +221,8 @@ zemBaseProviderManager::BaseMIItem* zemBaseProviderManager::getBaseMIItem(CMPIBr
 
 void zemBaseProviderManager::addBaseMI(const char* name, CmpiBaseMI* mi) {
     zemSynchronizer hold(m_synchContext);
-    // Makes the binding remember the broker; once is enough for the life of the library.
+    // The manager counts the uses, no anchor of the binding does. Objects are made without one, so
+    // that saying it once in the life of the library is enough.
     static bool first = true;
     if (first) mi->setProviderBase(nullptr);
     first = false;
@@ -230,9 +231,9 @@ void zemBaseProviderManager::addBaseMI(const char* name, CmpiBaseMI* mi) {
     auto ownName = std::make_unique<zemString>(name);
     auto item = std::make_unique<BaseMIItem>(BaseMIItem{*ownName, 0, mi});
     m_miNameList.addElement(ownName.get());
-    ownName.release();
+    static_cast<void>(ownName.release());
     m_baseMIList.addElement(item.get());
-    item.release();
+    static_cast<void>(item.release());
 }
 
 CMPIStatus zemBaseProviderManager::cleanupMI(const char* name, const CMPIContext* ctx,

@@ -86,7 +86,7 @@ std::string preferredLanguage(const std::string& ranges) {
     float weight = 0;
     for (size_t start = 0; start <= ranges.size();) {
         const size_t comma = std::min(ranges.find(',', start), ranges.size());
-        const std::string range = ranges.substr(start, comma - start);
+        std::string range = ranges.substr(start, comma - start);
         const size_t semicolon = range.find(';');
         if (semicolon == std::string::npos) return range;
         readWeight(range.c_str() + semicolon + 1, weight);
@@ -148,9 +148,10 @@ public:
             return false;
         }
         if (status.rc != CMPI_RC_OK || message == nullptr) return false;
-        text = message->ft->getCharPtr(message, nullptr);
+        const char* chars = message->ft->getCharPtr(message, nullptr);
+        if (chars != nullptr) text = chars;
         message->ft->release(message);
-        return true;
+        return chars != nullptr;
     }
 
     void close() {

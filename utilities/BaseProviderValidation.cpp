@@ -59,7 +59,7 @@ bool convert(From from, To& to) {
         const double low = std::is_signed_v<To> ? -limit : 0.0;
         if (!(value >= low && value < limit)) return false;
     }
-    to = static_cast<To>(from);
+    to = static_cast<To>(from);  // NOLINT(bugprone-signed-char-misuse): numbers, not characters
     return true;
 }
 
@@ -161,10 +161,6 @@ bool equalValues(const CmpiData& value1, const CmpiData& value2, zemString& text
     }
 }
 
-bool isAbsent(CMPIrc rc) {
-    return rc == CMPI_RC_ERR_NOT_FOUND || rc == CMPI_RC_ERR_NO_SUCH_PROPERTY;
-}
-
 }  // namespace
 
 void zemBaseProvider::validateKeys(const CmpiObjectPath& copt, const CmpiObjectPath& cop,
@@ -198,7 +194,7 @@ void zemBaseProvider::validateKeys(const CmpiObjectPath& copt, const CmpiObjectP
     for (const Key& key : given) {
         CMPIStatus status = {CMPI_RC_OK, nullptr};
         raw->ft->getKey(raw, key.name, &status);
-        if (isAbsent(status.rc)) {
+        if (status.rc == CMPI_RC_ERR_NOT_FOUND) {
             PROV_TRACE_EXIT();
             throwInvalidKeyExc(callingMethod, className, key.name);
         }
@@ -240,7 +236,7 @@ void zemBaseProvider::validateProerties(const CmpiObjectPath& cop, const char** 
         for (const char* name : names) {
             CMPIStatus status = {CMPI_RC_OK, nullptr};
             blank->ft->getProperty(blank, name, &status);
-            if (isAbsent(status.rc)) {
+            if (status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY) {
                 PROV_TRACE_EXIT();
                 throwInvalidPropertyExc(callingMethod, className, name);
             }

@@ -166,7 +166,7 @@ CmpiDateTime dateTimeOf(const timeval& time) {
     timeval now = {};
     struct timezone zone = {};
     gettimeofday(&now, &zone);
-    const time_t local = time.tv_sec - zone.tz_minuteswest * 60;
+    const time_t local = time.tv_sec - zone.tz_minuteswest * 60L;
     tm fields = {};
     char seconds[32] = {};
     if (gmtime_r(&local, &fields) == nullptr ||
@@ -206,6 +206,7 @@ zemString zemBaseProvider::cmpiDataTypeToString(CMPIType type) {
     return name;
 }
 
+// NOLINTNEXTLINE(performance-unnecessary-value-param): providers link against this form
 zemString zemBaseProvider::cmpidata2String(CmpiData data) {
     if (zemIsMissing(data)) return zemString("");
     try {

@@ -1,5 +1,6 @@
 #include "BaseZemMultiNtoNAssociationProvider.h"
 
+#include <algorithm>
 #include <memory>
 
 #include "AssociationDataPrepareUtils.h"
@@ -578,7 +579,8 @@ zemEnhanceBaseZemMultiNtoNAssociationProvider::findValidAssociationCopMappingPai
 
 zemEnhanceBaseZemMultiNtoNAssociationProvider::PathsByKey
 zemEnhanceBaseZemMultiNtoNAssociationProvider::getObjectPathHashRes(const Paths& rightCops) {
-    PathsByKey hash(8);
+    // as many chains as objects: with a few, looking up every left object would be quadratic
+    PathsByKey hash(static_cast<unsigned>(std::max(rightCops.size(), 8)));
     for (int j = 0; j < rightCops.size(); ++j)
         hash.insert(getObjectPathHashKeyString(*rightCops[j], false), j);
     return hash;

@@ -2,7 +2,8 @@
 /// it shares with zemMultiHashTable.
 ///
 /// The number of chains is fixed at construction; there is no rehashing. The array of chain heads
-/// is made at the first insert. Tables copy deeply; pointers stored as values stay the caller's.
+/// is made at the first insert, with room for about one entry a chain. Tables copy deeply; pointers
+/// stored as values stay the caller's.
 /// Operations report by return codes, except [] and getElement(), which throw the integer 3 for
 /// an absent key.
 ///
@@ -15,9 +16,13 @@
 #ifndef HASH_TABLE_H
 #define HASH_TABLE_H
 
+#include <algorithm>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <functional>
+#include <memory>
+#include <new>
 #include <utility>
 
 #include "StringUtils.h"
@@ -98,7 +103,7 @@ public:
             Bucket* const bucket = *link;
             if (holds(bucket, hash, key)) {
                 *link = bucket->m_next;
-                delete bucket;
+                dispose(bucket);
                 result = done;
             } else {
                 link = &bucket->m_next;
@@ -109,12 +114,16 @@ public:
 
     /// Removes all entries; the array of heads stays.
     void clear() {
-        for (unsigned i = 0; m_bucketArray != nullptr && i < m_bucketLen; ++i) {
+        if (m_bucketArray == nullptr) {
+            return;
+        }
+        for (unsigned i = 0; i < m_bucketLen; ++i) {
             while (Bucket* const bucket = m_bucketArray[i]) {
                 m_bucketArray[i] = bucket->m_next;
-                delete bucket;
+                dispose(bucket);
             }
         }
+        unused() = blockBegin();
     }
 
 protected:
@@ -136,8 +145,7 @@ protected:
         if (this != &source) {
             clear();
             if (m_bucketLen != source.m_bucketLen) {
-                delete[] m_bucketArray;
-                m_bucketArray = nullptr;
+                releaseHeads();
                 m_bucketLen = source.m_bucketLen;
             }
             copyChains(source);
@@ -153,7 +161,7 @@ protected:
 
     ~zemBucketTable() {
         clear();
-        delete[] m_bucketArray;
+        releaseHeads();
     }
 
     bool hasHeads() const { return m_bucketArray != nullptr; }
@@ -176,14 +184,19 @@ protected:
         return findFrom(bucket->m_next, bucket->m_hash, bucket->m_element.m_key);
     }
 
-    /// Puts a new entry at the head of its chain. Returns 0, or 1 if there can be no chains.
-    int add(const K& key, const V& value) {
+    /// Puts a new entry at the head of its chain. Returns 0; 1 if there can be no chains; 2 if
+    /// the key has to be @p unique and is there already.
+    int add(const K& key, const V& value, bool unique) {
         if (m_bucketLen == 0) {
             return noHeads;
         }
         makeHeads();
         const unsigned hash = HashFn(key, m_bucketLen);
-        m_bucketArray[hash] = new Bucket{m_bucketArray[hash], hash, {key, value}};
+        Bucket*& head = m_bucketArray[hash];
+        if (unique && findFrom(head, hash, key) != nullptr) {
+            return duplicate;
+        }
+        head = make(head, hash, key, value);
         return done;
     }
 
@@ -195,9 +208,62 @@ private:
         return bucket;
     }
 
+    // The heads and the first entries share one piece of memory, because queries make records by
+    // the hundred thousand, each with one entry a chain: heads, the next unused entry, the block
+    // of entries. What the block has no room for is made singly; an entry removed from the block
+    // leaves its place unused until clear().
+    struct alignas(Bucket) Slot {
+        unsigned char m_bytes[sizeof(Bucket)];
+    };
+
+    static constexpr unsigned blockLimit = 64;  // few tables with more chains fill them
+
+    std::size_t headSlots() const {
+        return ((std::size_t{m_bucketLen} + 1) * sizeof(Bucket*) + sizeof(Slot) - 1) / sizeof(Slot);
+    }
+
+    std::size_t blockSlots() const { return std::min(m_bucketLen, blockLimit); }
+
+    Bucket*& unused() { return m_bucketArray[m_bucketLen]; }
+
+    Bucket* blockBegin() const {
+        return reinterpret_cast<Bucket*>(reinterpret_cast<Slot*>(m_bucketArray) + headSlots());
+    }
+
+    Bucket* blockEnd() const { return blockBegin() + blockSlots(); }
+
+    bool isInBlock(const Bucket* bucket) const {
+        const std::less<const Bucket*> before;
+        return !before(bucket, blockBegin()) && before(bucket, blockEnd());
+    }
+
     void makeHeads() {
         if (m_bucketArray == nullptr) {
-            m_bucketArray = new Bucket*[m_bucketLen]();
+            m_bucketArray = reinterpret_cast<Bucket**>(new Slot[headSlots() + blockSlots()]);
+            std::uninitialized_fill_n(m_bucketArray, m_bucketLen, nullptr);
+            new (&unused()) Bucket*(blockBegin());
+        }
+    }
+
+    void releaseHeads() {
+        delete[] reinterpret_cast<Slot*>(m_bucketArray);
+        m_bucketArray = nullptr;
+    }
+
+    Bucket* make(Bucket* next, unsigned hash, const K& key, const V& value) {
+        if (unused() == blockEnd()) {
+            return new Bucket{next, hash, {key, value}};
+        }
+        Bucket* const bucket = new (unused()) Bucket{next, hash, {key, value}};
+        ++unused();
+        return bucket;
+    }
+
+    void dispose(Bucket* bucket) {
+        if (isInBlock(bucket)) {
+            bucket->~Bucket();
+        } else {
+            delete bucket;
         }
     }
 
@@ -210,7 +276,7 @@ private:
             Bucket** link = &m_bucketArray[i];
             for (const Bucket* from = source.m_bucketArray[i]; from != nullptr;
                  from = from->m_next) {
-                *link = new Bucket{nullptr, from->m_hash, from->m_element};
+                *link = make(nullptr, from->m_hash, from->m_element.m_key, from->m_element.m_value);
                 link = &(*link)->m_next;
             }
         }
@@ -230,9 +296,7 @@ public:
 
     /// Adds an entry. Returns 0; 2 if the key is there already, which changes nothing; 1 if the
     /// table has no chains.
-    int insert(const K& key, const V& value) {
-        return this->find(key) != nullptr ? Base::duplicate : this->add(key, value);
-    }
+    int insert(const K& key, const V& value) { return this->add(key, value, true); }
 
     /// The value of @p key, owned by the table.
     /// @throws int 3 if the key is absent

@@ -20,7 +20,7 @@ public:
     explicit zemMultiHashTable(unsigned n = 0) : Base(n) {}
 
     /// Adds one more value for @p key. Returns 0, or 1 if the table has no chains.
-    int insert(const K& key, const V& value) { return this->add(key, value); }
+    int insert(const K& key, const V& value) { return this->add(key, value, false); }
 
     /// All values of @p key; the empty set if it is absent.
     std::set<V> getElement(const K& key) const {

@@ -323,8 +323,11 @@ TEST_P(BaseProvider, LogsFiltersComingAndGoing) {
     for (const auto& [name, label] : {std::pair{"activateFilter", "Filter___activate"},
                                       std::pair{"deActivateFilter", "deActivateFilter"}}) {
         const std::string start = std::string("<zem350Log-prefix>") + label + " -> ";
-        EXPECT_NE(std::string::npos, call(h, name).output.find(start + "className:[Test_Disk]\n" +
-                                                               start + "eventType:[Test_Event]\n"));
+        const std::string output = call(h, name).output;
+        const size_t lines =
+            output.find(start + "className:[Test_Disk]\n" + start + "eventType:[Test_Event]\n");
+        EXPECT_NE(std::string::npos, lines);
+        EXPECT_LT(output.find(std::string("Entering method ") + name), lines);
     }
 }
 

@@ -138,6 +138,23 @@ TEST(HashTableTest, CopiesAreDeep) {
     EXPECT_THROW(source[4], int);
 }
 
+TEST(HashTableTest, EntriesComeAndGo) {
+    zemHashTable<int, Item, hashFunc> table(3);
+    const Item item = std::make_shared<int>(0);
+    for (int round = 0; round < 3; ++round) {
+        for (int key = 0; key < 9; ++key) {
+            table.insert(key, item);
+            table.remove(key - 2);
+        }
+        EXPECT_EQ(item.use_count(), 3) << "the last two and this one";
+        const zemHashTable<int, Item, hashFunc> copy(table);
+        table.clear();
+        EXPECT_EQ(copy[8], item);
+        EXPECT_EQ(item.use_count(), 3);
+    }
+    EXPECT_EQ(item.use_count(), 1);
+}
+
 TEST(HashTableTest, HashFunctions) {
     EXPECT_EQ(hashFunc(-1, 10), 4294967295U % 10);
     EXPECT_EQ(lparHashFunc("\xff", 10), 4294967295U % 10) << "negative sums divide unsigned";

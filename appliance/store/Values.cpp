@@ -78,9 +78,9 @@ std::string lparKey(const Row& row, const char*) {
 /// does not run, or is on its way to another host, can change nothing.
 std::string dynamicCapabilities(const Row& row, const char*) {
     constexpr std::int64_t kAllOfThem = 1 | 2 | 4;
-    const bool changes = own(row, "state") == "Running" &&
-                         (own(row, "migration_state") == "Not Migrating" ||
-                          own(row, "migration_state") == "Migration Complete");
+    const bool changes =
+        own(row, "state") == "Running" && (own(row, "migration_state") == "Not Migrating" ||
+                                           own(row, "migration_state") == "Migration Complete");
     return "DCaps:<" + hex(changes ? kAllOfThem : 0, 1) + '>';
 }
 

@@ -84,6 +84,59 @@ TEST_P(ProvidersTest, EveryPartitionOfEveryHostIsEnumeratedAndGot) {
     EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", kPartitionClass}).paths, paths);
 }
 
+// The tools and the management library are two doors to one appliance.
+TEST_P(ProvidersTest, ClassesOfBothDoorsAgree) {
+    struct Doors {
+        const char* tools;
+        const char* library;
+        std::vector<const char*> properties;
+        const char* unknown;
+    };
+    const Doors rows[] = {
+        {kHostClass,
+         "ORXC_ApiHost",
+         {"ElementName", "State", "EnabledState", "TypeModel", "SerialNumber", "IPAddress"},
+         "9999-ZZZ*0000000"},
+        {kPartitionClass,
+         "ORXC_ApiPartition",
+         {"ElementName", "State", "EnabledState", "LparID", "HostName", "LparEnvironment"},
+         "99*1111-AAA*0000001"},
+    };
+    for (const Doors& row : rows) {
+        const Reply byTools = m_server->enumInstances(m_request, {"root/cimv2", row.tools});
+        const Reply byLibrary = m_server->enumInstances(m_request, {"root/cimv2", row.library});
+        ASSERT_EQ(byLibrary.rc, CMPI_RC_OK) << byLibrary.message;
+        ASSERT_EQ(byLibrary.instances.size(), byTools.instances.size()) << row.library;
+        std::vector<ObjectPath> paths;
+        for (std::size_t i = 0; i < byTools.instances.size(); ++i) {
+            const Instance& told = byLibrary.instances[i];
+            const std::string name = textOf(byTools.instances[i], "Name");
+            EXPECT_EQ(textOf(told, "Name"), name);
+            for (const char* property : row.properties) {
+                EXPECT_NE(textOf(told, property), "") << name << ' ' << property;
+                EXPECT_EQ(textOf(told, property), textOf(byTools.instances[i], property))
+                    << name << ' ' << property;
+            }
+            const Reply one = m_server->getInstance(m_request, system(row.library, name));
+            ASSERT_EQ(one.rc, CMPI_RC_OK) << one.message;
+            EXPECT_TRUE(one.instances.at(0) == told) << name;
+            paths.push_back(told.path);
+        }
+        EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", row.library}).paths, paths);
+        for (const char* name : {row.unknown, "1*9999-ZZZ*0000000", "a b*c", ""}) {
+            EXPECT_EQ(m_server->getInstance(m_request, system(row.library, name)).rc,
+                      CMPI_RC_ERR_NOT_FOUND)
+                << row.library << ' ' << name;
+        }
+    }
+    ASSERT_EQ(m_appliance.run("appliance fault getCecObj --code 5").exit, 0);
+    const ObjectPath path = system("ORXC_ApiHost", "1111-AAA*0000001");
+    const Reply failed = m_server->getInstance(m_request, path);
+    EXPECT_EQ(failed.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_NE(failed.message.find("DNX_API_NOT_SUPPORTED"), std::string::npos) << failed.message;
+    EXPECT_EQ(m_server->getInstance(m_request, path).rc, CMPI_RC_OK);
+}
+
 TEST_P(ProvidersTest, OnlyWantedPropertiesAreAskedOfTheToolAndAnswered) {
     const std::string seen = (m_appliance.folder() / "seen").string();
     m_appliance.replaceTool("qyplat", "echo \"$@\" >'" + seen +

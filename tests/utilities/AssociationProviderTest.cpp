@@ -13,7 +13,8 @@ const std::string kTimingFile = "/tmp/zemAssociationTest." + std::to_string(getp
 
 // The timing trace reads its environment once, at the first call of the process.
 const bool timingOn = setenv("VM_CIMPROVIDER_TRACE", "1", 1) == 0 &&
-                      setenv("VM_CIMPROVIDER_TRACE_PATH", kTimingFile.c_str(), 1) == 0;
+                      setenv("VM_CIMPROVIDER_TRACE_PATH", kTimingFile.c_str(), 1) == 0 &&
+                      std::atexit([] { std::remove(kTimingFile.c_str()); }) == 0;
 
 const Row kSystemDevice = {"Test_Link", "", "Test_System", "Left", "", "Test_Disk", "Right", ""};
 const Row kSystemSystem = {"Test_Link", "", "Test_System", "Left", "", "Test_System", "Right", ""};
@@ -175,7 +176,6 @@ TEST(AssociationRows, CallsAreTimed) {
     }
     EXPECT_NE(text.npos, text.find("brokerCaller-giTest_Port begin at")) << text;
     EXPECT_NE(text.npos, text.find("brokerCaller-niTest_Port end at")) << text;
-    std::remove(kTimingFile.c_str());
 }
 
 TEST(AssociationRows, ReportsTheEnumerationOfNames) {

@@ -1,3 +1,4 @@
+#include <cstdlib>
 #include <fstream>
 #include <thread>
 
@@ -8,13 +9,13 @@ namespace {
 using cimom::Character;
 
 bool enabled = true;
-constexpr const char* kTimingFile = "/tmp/zemBaseProviderTest.timing";
+const std::string kTimingFile = "/tmp/zemBaseProviderTest." + std::to_string(getpid());
 
 // The timing trace reads its environment once, at the first operation of the process.
 const bool timingOn = [] {
-    std::remove(kTimingFile);
     setenv("VM_CIMPROVIDER_TRACE", "1", 1);
-    setenv("VM_CIMPROVIDER_TRACE_PATH", kTimingFile, 1);
+    setenv("VM_CIMPROVIDER_TRACE_PATH", kTimingFile.c_str(), 1);
+    std::atexit([] { std::remove(kTimingFile.c_str()); });
     return true;
 }();
 

@@ -64,9 +64,13 @@ show 0 cimom ei ORXC_LPAR_CS --properties ElementName,State,LparEnvironment
 say "one object by its path"
 show 0 cimom gi "$host\"$mtms\""
 
+say "its partitions, by way of an association"
+show 0 cimom ain "$host\"$mtms\"" --assoc-class ORXC_HostedPartition
+
 say "what a client reads when a thing is not there"
 show 5 cimom gi 'ORXC_Unknown.Name="1"'
 show 6 cimom gi "$host\"9999-ZZZ*0000000\""
+show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
-printf '\nShown: %s hosts and %s partitions through CIM, one object by path, two failures by name.\n' \
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path,\nits partitions by association, two failures by name, one of them in German too.\n' \
     "$(cimom ein ORXC_CEC_CS | wc -l)" "$(cimom ein ORXC_LPAR_CS | wc -l)"

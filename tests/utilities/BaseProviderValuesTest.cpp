@@ -97,7 +97,17 @@ TEST_P(BaseProviderValues, ConvertsDateTimes) {
     EXPECT_EQ("00000000000000.000000:000",
               printed(Z::convertDateTime(std::numeric_limits<long>::max())));
     EXPECT_EQ(1000000000L, Z::convertDateTime(Z::convertDateTime(1000000000L)));
-    EXPECT_LE(std::abs(Z::convertDateTime(Z::getCurrentDateTime()) - time(nullptr)), 5);
+    // before and after a change to and from summer time, wherever the process thinks it is
+    for (const char* zone : {"UTC", "Europe/Berlin", "America/St_Johns", "Asia/Kolkata"}) {
+        setenv("TZ", zone, 1);
+        tzset();
+        for (const long when :
+             {1L, 1364691599L, 1364691600L, 1382835599L, 1382835600L, 4102444800L})
+            EXPECT_EQ(when, Z::convertDateTime(Z::convertDateTime(when))) << zone;
+        EXPECT_LE(std::abs(Z::convertDateTime(Z::getCurrentDateTime()) - time(nullptr)), 5) << zone;
+    }
+    unsetenv("TZ");
+    tzset();
 }
 
 TEST_P(BaseProviderValues, ReadsWhatMustBeThere) {

@@ -1,3 +1,4 @@
+#include <cmath>
 #include <cstdlib>
 #include <string>
 
@@ -245,7 +246,7 @@ int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
     const auto sent = static_cast<double>(std::strtoull(record[wanted[0]], nullptr, kBase));
     const auto left = static_cast<double>(std::strtoull(record[wanted[1]], nullptr, kBase));
     constexpr double kSentAll = 90.0;
-    return sent + left > 0 ? static_cast<int>(sent / (sent + left) * kSentAll + 0.5) : 0;
+    return sent + left > 0 ? static_cast<int>(std::lround(sent / (sent + left) * kSentAll)) : 0;
 } catch (...) {
     return -1;
 }

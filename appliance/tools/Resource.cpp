@@ -148,6 +148,7 @@ constexpr auto eachVirtualSlot = each<Kind::Ethernet, Kind::VirtualScsi, Kind::S
 
 }  // namespace
 
+// NOLINTNEXTLINE(readability-function-size): one table
 const std::vector<Resource>& resources() {
     // clang-format off
     static const std::vector<Resource> all = {

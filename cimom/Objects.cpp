@@ -99,9 +99,10 @@ Pool::Level Pool::newLevel() {
 }
 
 void Pool::clear(Link& head) {
-    for (Link* at = head.next; at != &head;) {
+    // Last in, first out: the heap takes back its end, not ten thousand holes.
+    for (Link* at = head.prev; at != &head;) {
         Node& node = *static_cast<Node*>(at);
-        at = at->next;
+        at = at->prev;
         retire(node);
     }
 }

@@ -42,6 +42,7 @@ python3 - "$results" <<'PY'
 import glob, json, statistics, sys
 
 ROWS = [
+    ("ParseRecords/100000", "LibcsvRecords/100000", 1.0, 0),
     ("ParseRecords/100000", "LibcsvKeyed/100000", 1.0, 0),
     ("ParseRecords/100000", "LibcsvRows/100000", None, 0),
     ("ParseRecords/1000000", "ParseRecords/100000", 20.0, 0),

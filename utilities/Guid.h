@@ -16,8 +16,8 @@ public:
     /// The zero identifier.
     zemGuid();
 
-    /// Reads "XXXXXXXX-XXXX-XXXX-XXXX-XXXXXXXXXXXX", any case. A text of another length, or with
-    /// its dashes elsewhere, and null give zero; of a text with other bytes than hexadecimal
+    /// Reads hexadecimal digits in groups of 8-4-4-4-12, any case. A text of another length, or
+    /// with its dashes elsewhere, and null give zero; of a text with other bytes than hexadecimal
     /// digits the groups before the first such byte count.
     zemGuid(const char* text);
 

@@ -24,7 +24,7 @@ protected:
     std::optional<RequestScope> m_scope{m_server};
 };
 
-Instance part() { return Instance({"root/x", "Part", {{"Id", 7}}}, {{"Id", 7}, {"Note", "n"}}); }
+Instance part() { return Instance({"test/x", "Part", {{"Id", 7}}}, {{"Id", 7}, {"Note", "n"}}); }
 
 const Value kValues[] = {true,
                          Value::char16(0x20AC),
@@ -42,7 +42,7 @@ const Value kValues[] = {true,
                          "text \xC3\xA9",
                          DateTime(),
                          DateTime::fromBinary(1600000000123456, false),
-                         ObjectPath("root/x", "Other", {{"A", 1}, {"B", "b"}}),
+                         ObjectPath("test/x", "Other", {{"A", 1}, {"B", "b"}}),
                          part(),
                          Value::array(CMPI_string, {"a", Value(), "c"}),
                          Value::array(CMPI_uint16, {}),
@@ -60,7 +60,7 @@ TEST_P(Objects, ValuesOfAllTypesComeBack) {
     for (const Value& value : kValues) all.set("v" + std::to_string(all.size()), value);
     CMPIArgs* from = m_scope->wrap(all);
     CMPIArgs* to = eft()->newArgs(mb(), nullptr);
-    CMPIInstance* inst = m_scope->wrap(Instance({"root/x", "Any"}));
+    CMPIInstance* inst = m_scope->wrap(Instance({"test/x", "Any"}));
     ASSERT_EQ(from->ft->getArgCount(from, nullptr), all.size());
     for (CMPICount i = 0; i < all.size(); ++i) {
         CMPIString* name = nullptr;
@@ -146,7 +146,7 @@ TEST_P(Objects, DateTimes) {
 }
 
 TEST_P(Objects, PathsAndInstances) {
-    CMPIObjectPath* path = eft()->newObjectPath(mb(), "root/x", "Thing", nullptr);
+    CMPIObjectPath* path = eft()->newObjectPath(mb(), "test/x", "Thing", nullptr);
     path->ft->setHostname(path, "h");
     path->ft->addKey(path, "Name", reinterpret_cast<const CMPIValue*>("a"), CMPI_chars);
     EXPECT_EQ(path->ft->addKey(path, "", nullptr, CMPI_string).rc, CMPI_RC_ERR_INVALID_PARAMETER);
@@ -172,12 +172,12 @@ TEST_P(Objects, PathsAndInstances) {
     const Instance seen = RequestScope::read(inst);
     EXPECT_EQ(seen.properties, NamedValues({{"Name", "b"}, {"Kept", "v"}}));
     EXPECT_EQ(textOf(eft()->toString(mb(), inst->ft->getObjectPath(inst, nullptr), nullptr)),
-              "//h/root/x:Thing.Name=\"b\"");
+              "//h/test/x:Thing.Name=\"b\"");
 
     CMPIObjectPath* other = eft()->newObjectPath(mb(), "", "Other", nullptr);
     other->ft->setHostAndNameSpaceFromObjectPath(other, path);
     EXPECT_EQ(RequestScope::read(other), [] {
-        ObjectPath want("root/x", "Other");
+        ObjectPath want("test/x", "Other");
         want.host = "h";
         return want;
     }());

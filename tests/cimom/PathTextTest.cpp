@@ -8,7 +8,7 @@ namespace {
 using namespace cimom;
 
 TEST(PathText, PathsRoundTrip) {
-    ObjectPath onHost("root/a", "C", {{"k", 1}});
+    ObjectPath onHost("test/a", "C", {{"k", 1}});
     onHost.host = "host.example";
     const struct {
         ObjectPath path;
@@ -16,7 +16,7 @@ TEST(PathText, PathsRoundTrip) {
     } rows[] = {
         {{"", "Foo"}, "Foo"},
         {{"root/cimv2", "Foo"}, "root/cimv2:Foo"},
-        {onHost, "//host.example/root/a:C.k=1"},
+        {onHost, "//host.example/test/a:C.k=1"},
         {{"", "C", {{"a", ""}, {"b", true}}}, R"(C.a="",b=true)"},
         {{"", "C", {{"a", "x,y=\"z\"\\ . : // \n\t\x01"}}},
          R"(C.a="x,y=\"z\"\\ . : // \n\t\x0001")"},

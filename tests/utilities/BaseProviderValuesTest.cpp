@@ -66,7 +66,7 @@ TEST_P(BaseProviderValues, ParsesObjectPaths) {
     const std::pair<const char*, const char*> rows[] = {
         {"Foo", "root/cimv2:Foo"},
         {"root/x:Foo.a=\"1\",b=2", "root/x:Foo.a=\"1\",b=\"2\""},
-        {"//h/root/x:Foo.k=\"\"v\"\"", "//h/root/x:Foo.k=\"v\""},
+        {"//h/test/x:Foo.k=\"\"v\"\"", "//h/test/x:Foo.k=\"v\""},
         {"Foo.a=x=y", "root/cimv2:Foo.a=\"x=y\""},
         {"//h/Foo", "refused"},
         {"//h", "refused"},
@@ -81,10 +81,10 @@ TEST_P(BaseProviderValues, ParsesObjectPaths) {
         EXPECT_EQ(expected, made);
         EXPECT_EQ(made == "refused" ? source : "", refusal);
     }
-    const CmpiObjectPath from = Z::createObjectPath(zemString("//box/root/a:Test_Disk.Name=1"));
-    EXPECT_EQ("//box/root/a:Test_Disk", text(Z::objectPathToString(Z::createObjectPath(from))));
-    EXPECT_EQ("//box/root/b:Other",
-              text(Z::objectPathToString(Z::createObjectPath(from, "root/b", "Other"))));
+    const CmpiObjectPath from = Z::createObjectPath(zemString("//box/test/a:Test_Disk.Name=1"));
+    EXPECT_EQ("//box/test/a:Test_Disk", text(Z::objectPathToString(Z::createObjectPath(from))));
+    EXPECT_EQ("//box/test/b:Other",
+              text(Z::objectPathToString(Z::createObjectPath(from, "test/b", "Other"))));
 }
 
 TEST_P(BaseProviderValues, ConvertsDateTimes) {

@@ -1,4 +1,7 @@
 #include <gtest/gtest.h>
+#include <sched.h>
+#include <sys/mount.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 #include <cstdio>
@@ -15,6 +18,8 @@
 #include "ToolFolder.h"
 
 namespace {
+
+namespace fs = std::filesystem;
 
 constexpr char kHost[] = "1111-AAA*0000001";
 
@@ -50,6 +55,49 @@ protected:
     zemVirtualSystem m_partition{"3", m_host, "", ""};
     zemVirtualSystemProfile m_profile{"normal", m_partition, "", ""};
 };
+
+/// Runs @p test in a child that sees an empty folder /opt of its own.
+/// @return its exit status; 77 where the machine lets no process have one
+template <typename Test>
+int withOwnProductData(Test test) {
+    const pid_t child = fork();
+    if (child == 0) {
+        if (unshare(CLONE_NEWNS) != 0 ||
+            mount("none", "/", nullptr, MS_REC | MS_PRIVATE, nullptr) != 0 ||
+            mount("none", "/opt", "tmpfs", 0, nullptr) != 0) {
+            _exit(77);
+        }
+        fs::create_directories("/opt/wrt/data");
+        _exit(test());
+    }
+    int status = 0;
+    waitpid(child, &status, 0);
+    return WIFEXITED(status) ? WEXITSTATUS(status) : 256;
+}
+
+// Before the tests that read the data of this machine, which the process then keeps.
+TEST_F(SystemConfigTest, ProductDataIsReadOnce) {
+    const int failed = withOwnProductData([] {
+        const auto write = [](const char* text) {
+            std::ofstream("/opt/wrt/data/dnxvpd.properties") << text;
+        };
+        write("MODELTYPE=1111-AAA\nSERIALNUMBER=0000001\n");
+        const std::string none = failureText([] { zemManagerSystem::getDNXUUID(); });
+        if (none !=
+            "1/zemManagerSystem/getDNXUUID//there is no UUID infoamation in the config "
+            "file : /opt/wrt/data/dnxvpd.properties.") {
+            return 1;
+        }
+        write("uuid=a=b\nMODELTYPE=1111-AAA\nSERIALNUMBER=0000001\nUUID=second\n");
+        if (!(zemManagerSystem::getDNXUUID() == "a=b")) return 2;
+        if (!(zemManagerSystem::getMTMS("") == "1111-AAA*0000001")) return 3;
+        write("UUID=other\n");
+        if (!(zemManagerSystem::getDNXUUID() == "a=b")) return 4;
+        return zemManagerSystem::getMTMS("") == "1111-AAA*0000001" ? 0 : 5;
+    });
+    if (failed == 77) GTEST_SKIP() << "this machine allows no mounts";
+    EXPECT_EQ(0, failed);
+}
 
 TEST_F(SystemConfigTest, ProductData) {
     const struct {

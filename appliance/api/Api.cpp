@@ -10,6 +10,7 @@
 #include "Failure.h"
 #include "Family.h"
 #include "Faults.h"
+#include "Operations.h"
 #include "Result.h"
 #include "Text.h"
 #include "libapi.h"
@@ -125,71 +126,41 @@ apiProp* answer(const char* operation, const Family& family, const char* user, M
 
 #define API extern "C" __attribute__((visibility("default")))
 
-// One operation of each shape: of all hosts, of one host, of one partition.
-#define ALL(NAME, FAMILY)                                         \
+// One body for each shape of operation.
+#define OPERATION_ALL(NAME, FAMILY)                               \
     API apiProp* NAME(const char* user, int level) {              \
         return answer(#NAME, FAMILY, user, allHostsScope, level); \
     }
-#define OF_HOST(NAME, FAMILY)                                             \
+#define OPERATION_OF_HOST(NAME, FAMILY)                                   \
     API apiProp* NAME(const char* user, const char* mtms, int level) {    \
         return answer(                                                    \
             #NAME, FAMILY, user, [&] { return hostScope(mtms); }, level); \
     }
-#define OF_LPAR(NAME, FAMILY)                                                \
+#define OPERATION_OF_LPAR(NAME, FAMILY)                                      \
     API apiProp* NAME(const char* user, const char* lparKey, int level) {    \
         return answer(                                                       \
             #NAME, FAMILY, user, [&] { return lparScope(lparKey); }, level); \
     }
+#define OPERATION_NAMED(NAME, FAMILY)                                                          \
+    API apiProp* NAME(const char* user, const char* lparKey, const char* profile, int level) { \
+        return answer(                                                                         \
+            #NAME, FAMILY, user, [&] { return profileScope(lparKey, profile); }, level);       \
+    }
 
-// clang-format off
-ALL(getAllCecs, kCecs)
-ALL(getAllLpars, kLpars)
-ALL(getAllLparProfiles, kProfiles)
-ALL(getAllLparVirtualSerial, kSerials)
-ALL(getAllLparVirtualScsi, kScsis)
-ALL(getAllLparVirtualEthernet, kEthernets)
-ALL(getAllIoSlots, kIoSlots)
-ALL(getAllCecMemoryCfg, kCecMemory)
-ALL(getAllCecProcessorCfg, kCecProcessors)
-ALL(getAllCecMemoryPoolCfgs, kCecMemoryPools)
-ALL(getAllCecProcessorPoolCfg, kCecProcessorPools)
-ALL(getAllLparMemoryCfgs, kLparMemory)
-ALL(getAllLparProcessorCfgs, kLparProcessors)
-
-OF_HOST(getCecObj, kCecs)
-OF_HOST(getAllLparsFromCec, kLpars)
-OF_HOST(getAllLparProfilesFromCec, kProfiles)
-OF_HOST(getVirtualSerial, kSerials)
-OF_HOST(getVirtualScsi, kScsis)
-OF_HOST(getVirtualEthernet, kEthernets)
-OF_HOST(getIoSlots, kIoSlots)
-OF_HOST(getCecMemoryCfg, kCecMemory)
-OF_HOST(getCecProcessorCfg, kCecProcessors)
-OF_HOST(getCecMemoryPoolCfg, kCecMemoryPools)
-OF_HOST(getCecProcessorPoolCfg, kCecProcessorPools)
-OF_HOST(getAllLparMemoryCfg, kLparMemory)
-OF_HOST(getAllLparProcessorCfg, kLparProcessors)
-
-OF_LPAR(getLparObj, kLpars)
-OF_LPAR(getAllLparProfilesFromLpar, kProfiles)
-OF_LPAR(getLparVirtualSerial, kSerials)
-OF_LPAR(getLparVirtualScsi, kScsis)
-OF_LPAR(getLparVirtualEthernet, kEthernets)
-OF_LPAR(getLparIoSlots, kIoSlots)
-OF_LPAR(getLparMemoryCfg, kLparMemory)
-OF_LPAR(getLparProcessorCfg, kLparProcessors)
-// clang-format on
-
-API apiProp* getLparProfile(const char* user, const char* lparKey, const char* profile, int level) {
-    return answer(
-        "getLparProfile", kProfiles, user, [&] { return profileScope(lparKey, profile); }, level);
-}
+API_OPERATIONS(OPERATION_ALL, OPERATION_OF_HOST, OPERATION_OF_LPAR, OPERATION_NAMED)
 
 API char* getProperty(apiProp* record, const char* key) {
     if (record == nullptr || key == nullptr || *key == '\0') return nullptr;
     const int count = std::min<int>(record->propertyCount, API_MAX_PROPERTIES);
     for (int i = 0; i < count; ++i) {
-        if (std::strncmp(record->name[i], key, API_TEXT_SIZE) == 0) return record->value[i];
+        if (std::strncmp(record->name[i], key, API_TEXT_SIZE) != 0) continue;
+        // Entries lie far apart, and readers mostly ask for the next key next: what a record fills
+        // comes into the cache while its caller works on the value before.
+        if (i + 1 < count) {
+            __builtin_prefetch(record->name[i + 1]);
+            __builtin_prefetch(record->value[i + 1]);
+        }
+        return record->value[i];
     }
     return nullptr;
 }

@@ -73,6 +73,18 @@ int showState(const std::string& format) {
     return 0;
 }
 
+int showJournal(std::int64_t after) {
+    constexpr std::int64_t kAtOnce = 1000;
+    Store store = Store::open(Database::Access::Read);
+    const Transaction picture = store.read();
+    for (auto lines = store.journal(after, kAtOnce); !lines.empty();
+         lines = store.journal(after, kAtOnce)) {
+        for (const auto& [number, line] : lines) std::cout << number << ' ' << line << '\n';
+        after = lines.back().first;
+    }
+    return 0;
+}
+
 int checkState() {
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
@@ -94,6 +106,8 @@ int run(int argc, char** argv) {
     CLI::App* generate = app.add_subcommand(
         "generate", "Make an appliance of any size; the same options always make the same one.");
     CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
+    CLI::App* journal = app.add_subcommand(
+        "journal", "Show the journal of changes, each with its number: oldest first.");
     CLI::App* verify = app.add_subcommand(
         "check", "Check that the state obeys the rules of hosts, and print those that it breaks.");
 
@@ -110,8 +124,13 @@ int run(int argc, char** argv) {
     show->add_option("--format", format, "text, or json with every attribute that was set")
         ->check(CLI::IsMember({"text", "json"}))
         ->capture_default_str();
+    std::int64_t after = 0;
+    journal->add_option("--after", after, "Only changes behind the one with this number")
+        ->check(CLI::NonNegativeNumber)
+        ->capture_default_str();
     FaultCommand fault(app);
-    for (CLI::App* verb : {init, generate, show, verify, fault.command()}) verb->footer(kFooter);
+    for (CLI::App* verb : {init, generate, show, journal, verify, fault.command()})
+        verb->footer(kFooter);
 
     try {
         app.parse(argc, argv);
@@ -125,6 +144,7 @@ int run(int argc, char** argv) {
         fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
     }
     if (show->parsed()) return showState(format);
+    if (journal->parsed()) return showJournal(after);
     if (verify->parsed()) return checkState();
     if (fault.isParsed()) return fault.run();
     return 0;

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "Adapters.h"
+#include "LparState.h"
 #include "Text.h"
 
 namespace appliance {
@@ -32,7 +33,7 @@ void setQuantities(Object& object, const LparPlan& plan, const char* desired, co
     object.set(p + "min_mem", rounded(plan.mem / 2));
     object.set(d + "mem", rounded(plan.mem));
     object.set(p + "max_mem", rounded(plan.mem * 2));
-    object.set(p + "min_procs", "1");
+    object.set(p + "min_procs", std::to_string((least + 99) / 100));
     object.set(d + "procs", std::to_string(procs));
     object.set(p + "max_procs", std::to_string(procs * 2));
     object.set(p + "min_proc_units", units(least));
@@ -54,18 +55,11 @@ void setSharing(Object& object, const LparPlan& plan, const std::string& prefix)
     }
 }
 
-const char* osVersion(const std::string& env) {
-    return env == "osq00" ? "OSQ00 3.2" : env == "xbrgserver" ? "XBRG 2.1" : "Linux 5.14";
-}
-
-/// A partition that does not run has no running resources, but keeps its own.
-void setRunning(Object& lpar, const LparPlan& plan) {
-    if (plan.state != "Not Activated") {
-        lpar.set("os_version", osVersion(plan.env));
-        return;
-    }
-    for (const char* name : {"run_mem", "run_min_mem", "run_procs"}) lpar.set(name, "0");
-    lpar.set("run_proc_units", "0.0");
+/// What runs is what is in effect, as long as nothing else is stored.
+void setState(Object& lpar, const LparPlan& plan) {
+    lpar.set("state", plan.state);
+    if (plan.state != "Not Activated") lpar.set("os_version", osVersion(plan.env));
+    if (!isActive(lpar)) setInactive(lpar, plan.state.c_str());
 }
 
 }  // namespace
@@ -120,11 +114,10 @@ void HostBuilder::add(const LparPlan& plan) {
     Object& lpar = addTo(plan.id, Kind::Lpar, 0);
     lpar.set("name", plan.name);
     lpar.set("lpar_env", plan.env);
-    lpar.set("state", plan.state);
     lpar.set("default_profile", plan.profile);
     setQuantities(lpar, plan, "pend_", "pend_");
     setSharing(lpar, plan, "pend_");
-    setRunning(lpar, plan);
+    setState(lpar, plan);
 
     Object& profile = addTo(plan.id, Kind::Profile, 0);
     profile.set("name", plan.profile);
@@ -278,10 +271,17 @@ void HostBuilder::finish() {
     for (int i = 0; i < kFreeSlots; ++i) addSlot(m_ofHost, 0, nullptr);
     m_store.put(m_host);
     for (const Object& object : m_ofHost) m_store.put(object);
+    std::vector<std::string> starts;
     for (auto& [id, objects] : m_lpars) {
         writeLists(objects);
         for (const Object& object : objects) m_store.put(object);
+        starts.push_back(std::to_string(id) + "/0");
     }
+    if (starts.empty()) return;
+    Object all(Kind::SystemProfile, {m_number});
+    all.set("name", "all");
+    all.set("lpar_profiles", joined(starts));
+    m_store.put(all);
 }
 
 }  // namespace appliance

@@ -1,15 +1,28 @@
 #include "FaultCommand.h"
 
+#include <algorithm>
 #include <csignal>
 #include <iostream>
 #include <limits>
 
 #include "Failure.h"
+#include "Help.h"
+#include "Operations.h"
 #include "Text.h"
 
 namespace appliance {
 
 namespace {
+
+/// Of all tools and operations.
+std::vector<std::string> names() {
+#define NAME(OPERATION, FAMILY) #OPERATION,
+    std::vector<std::string> all = {API_OPERATIONS(NAME, NAME, NAME, NAME)};
+#undef NAME
+    for (const ToolName& tool : toolNames()) all.emplace_back(tool.name);
+    std::sort(all.begin(), all.end());
+    return all;
+}
 
 std::string describe(const PlannedFault& fault) {
     std::string text = fault.name + ": " + std::to_string(fault.calls) + " calls";
@@ -29,7 +42,8 @@ FaultCommand::FaultCommand(CLI::App& app)
           "Let the next calls of a tool (qyplat ...) or of an operation of the management library\n"
           "(getCecObj ...) go wrong. Without a name: show what is planned.")) {
     constexpr std::int64_t kMost = std::numeric_limits<std::int32_t>::max();
-    m_command->add_option("name", m_plan.name, "Tool or operation");
+    m_command->add_option("name", m_plan.name, "Tool or operation")
+        ->check(CLI::IsMember(names()).description(""));
     m_command->add_option("--calls", m_plan.calls, "How many calls")
         ->check(CLI::Range(std::int64_t{1}, kMost))
         ->capture_default_str();

@@ -64,12 +64,7 @@ std::string overview(const HostView& view) {
 Json attributes(const Object& object) {
     const Place& place = object.place();
     Json json = {{"host", place.host}, {"lpar", place.lpar}, {"number", place.number}};
-    const std::string& lines = object.stored();
-    for (std::size_t begin = 1; begin < lines.size();) {
-        const std::size_t equals = lines.find('=', begin), end = lines.find('\n', begin);
-        json[lines.substr(begin, equals - begin)] = lines.substr(equals + 1, end - equals - 1);
-        begin = end + 1;
-    }
+    for (const auto& [name, value] : object.settings()) json[std::string(name)] = value;
     return json;
 }
 

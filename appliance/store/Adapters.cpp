@@ -3,12 +3,70 @@
 #include <algorithm>
 #include <cstring>
 #include <iterator>
+#include <map>
+#include <set>
 
+#include "Failure.h"
 #include "Text.h"
 
 namespace appliance {
 
 namespace {
+
+/// The values of a field that is a number, and what stands for one that is left empty; null when
+/// it must be given.
+struct NumberRule {
+    const char* field;
+    std::int64_t least;
+    std::int64_t most;
+    const char* absent;
+};
+
+constexpr std::int64_t kMostVlan = 4094;
+constexpr std::size_t kMostVlans = 20;  ///< max_vlans_per_port of every host
+
+constexpr NumberRule kNumberRules[] = {
+    {"slot_num", 0, 65534, nullptr},
+    {"ieee_virtual_eth", 0, 1, "0"},
+    {"port_vlan_id", 1, kMostVlan, nullptr},
+    {"is_trunk", 0, 1, "0"},
+    {"trunk_priority", 0, 15, "0"},
+    {"is_required", 0, 1, "0"},
+    {"supports_dnx", 0, 1, "1"},
+    {"remote_lpar_id", 1, 65534, "any"},
+    {"remote_slot_num", 0, 65534, "any"},
+};
+
+std::optional<std::string> vlanIds(const std::string& list) {
+    if (list.empty() || list == "none") return std::string();
+    std::set<std::int64_t> ids;
+    std::vector<std::string> texts;
+    for (const std::string& text : split(list)) {
+        std::int64_t id = 0;
+        if (!wholeNumber(text, &id) || id < 1 || id > kMostVlan || !ids.insert(id).second) {
+            return std::nullopt;
+        }
+        texts.push_back(std::to_string(id));
+    }
+    if (texts.size() > kMostVlans) return std::nullopt;
+    return joined(texts);
+}
+
+/// Cuts at @p separator where it stands outside quotes, and drops quotes around a whole part.
+std::optional<std::vector<std::string>> cut(const std::string& text, char separator) {
+    std::vector<std::string> parts;
+    bool inside = false;
+    for (std::size_t begin = 0, i = 0; i <= text.size(); ++i) {
+        if (i < text.size() && text[i] == '"') inside = !inside;
+        if (i < text.size() && (text[i] != separator || inside)) continue;
+        const std::string part = text.substr(begin, i - begin);
+        const bool isQuoted = part.size() > 1 && part.front() == '"' && part.back() == '"';
+        parts.push_back(isQuoted ? unquoted(part) : part);
+        begin = i + 1;
+    }
+    if (inside) return std::nullopt;
+    return parts;
+}
 
 std::string withRemoteName(const AdapterForm& form, const HostView& view, std::string element) {
     std::vector<std::size_t> slashes;
@@ -40,6 +98,148 @@ std::string adapterElement(const AdapterForm& form, const Object& adapter) {
 
 std::string adapterList(const std::vector<std::string>& elements) {
     return elements.empty() ? "none" : joined(elements);
+}
+
+std::vector<std::string> elementsOf(const char* key, const std::string& list) {
+    if (list.empty() || list == "none") return {};
+    auto elements = cut(list, ',');
+    if (!elements) throw Failure(Fault::BadValue, {key, list});
+    return std::move(*elements);
+}
+
+std::optional<std::string> adapterValue(const std::string& name, const std::string& value) {
+    for (const NumberRule& rule : kNumberRules) {
+        if (name != rule.field) continue;
+        if (rule.absent != nullptr && (value.empty() || value == rule.absent)) return rule.absent;
+        std::int64_t number = 0;
+        if (!wholeNumber(value, &number) || number < rule.least || number > rule.most) {
+            return std::nullopt;
+        }
+        return std::to_string(number);
+    }
+    if (name == "addl_vlan_ids") return vlanIds(value);
+    if (name == "vswitch") {
+        if (value.find_first_of("/\"") != std::string::npos) return std::nullopt;
+        return value.empty() ? "default" : value;
+    }
+    if (name == "adapter_type" && (value == "client" || value == "server")) return value;
+    return std::nullopt;
+}
+
+bool isWhole(const Object& adapter) {
+    if (adapter.kind() == Kind::Ethernet) {
+        return adapter.get("addl_vlan_ids").empty() || adapter.get("ieee_virtual_eth") == "1";
+    }
+    return adapter.get("adapter_type") == "server" ||
+           (adapter.get("remote_lpar_id") != "any" && adapter.get("remote_slot_num") != "any");
+}
+
+Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std::string& element) {
+    const Failure malformed(Fault::BadValue, {form.list, element});
+    const auto fields = cut(element, '/');
+    std::size_t count = 0;
+    while (form.fields[count] != nullptr) ++count;
+    // Of Ethernet adapters, the switch may be missing, and a MAC address may follow.
+    const std::size_t slack = form.kind == Kind::Ethernet ? 1 : 0;
+    if (!fields || fields->size() + slack < count || fields->size() > count + slack) {
+        throw malformed;
+    }
+    const auto slot = adapterValue("slot_num", fields->front());
+    if (!slot) throw malformed;
+    Object adapter(form.kind, {lpar.host, lpar.lpar, number(*slot)});
+    for (std::size_t i = 1; i < count; ++i) {
+        const std::string name = form.fields[i];
+        if (name.empty()) continue;
+        const auto value = adapterValue(name, i < fields->size() ? (*fields)[i] : "");
+        if (!value) throw malformed;
+        adapter.set(name, *value);
+    }
+    if (form.kind == Kind::Ethernet) {
+        adapter.set("is_trunk", adapter.get("trunk_priority") == "0" ? "0" : "1");
+    } else if (form.kind == Kind::Serial && adapter.get("adapter_type") == "client") {
+        adapter.set("supports_dnx", "0");
+    }
+    if (!isWhole(adapter)) throw malformed;
+    return adapter;
+}
+
+std::vector<Object> adaptersOf(const Object& profile) {
+    const std::int64_t slots = number(profile.get("max_virtual_slots"));
+    std::map<std::int64_t, Object> adapters;
+    for (const AdapterForm& form : kAdapterForms) {
+        for (const std::string& element : elementsOf(form.list, profile.get(form.list))) {
+            Object adapter = adapterFromElement(form, profile.place(), element);
+            const std::int64_t slot = adapter.place().number;
+            if (slot >= slots || !adapters.emplace(slot, std::move(adapter)).second) {
+                throw Failure(Fault::BadValue, {form.list, element});
+            }
+        }
+    }
+    std::vector<Object> all;
+    all.reserve(adapters.size());
+    for (auto& [slot, adapter] : adapters) all.push_back(std::move(adapter));
+    return all;
+}
+
+VirtualSlot slotOf(const Object& adapter) { return {adapter.place().lpar, adapter.place().number}; }
+
+std::optional<VirtualSlot> serverOf(const Object& adapter) {
+    VirtualSlot server;
+    if (adapter.kind() == Kind::Ethernet || adapter.get("adapter_type") != "client" ||
+        !wholeNumber(adapter.get("remote_lpar_id"), &server.first) ||
+        !wholeNumber(adapter.get("remote_slot_num"), &server.second)) {
+        return std::nullopt;
+    }
+    return server;
+}
+
+bool serves(const Object& other, const Object& client) {
+    const auto admits = [&](const char* attribute, std::int64_t own) {
+        const std::string wanted = other.get(attribute);
+        return wanted == "any" || wanted == std::to_string(own);
+    };
+    return other.kind() == client.kind() && other.get("adapter_type") == "server" &&
+           admits("remote_lpar_id", client.place().lpar) &&
+           admits("remote_slot_num", client.place().number);
+}
+
+std::string newMac(const HostView& view, const Place& place) {
+    std::set<std::string> used;
+    for (const Object& adapter : view.all(Kind::Ethernet)) used.insert(adapter.get("mac_addr"));
+    const std::string prefix = view.host().get("mac_prefix");
+    std::int64_t suffix = (place.lpar * 256 + place.number % 256) % (1 << 24);
+    while (used.count(prefix + hex(suffix, 6)) != 0) suffix = (suffix + 1) % (1 << 24);
+    return prefix + hex(suffix, 6);
+}
+
+std::vector<IoSlot> ioSlotsFromList(const std::string& list) {
+    constexpr std::size_t kMostDigits = 8;
+    constexpr std::int64_t kMostPool = 65534;
+    std::vector<IoSlot> slots;
+    std::set<std::string> drcs;
+    for (const std::string& element : elementsOf("io_slots", list)) {
+        const Failure malformed(Fault::BadValue, {"io_slots", element});
+        const auto fields = cut(element, '/');
+        if (!fields || fields->size() != 3) throw malformed;
+        const auto required = adapterValue("is_required", (*fields)[2]);
+        IoSlot slot{(*fields)[0], (*fields)[1], required == "1"};
+        const auto upper = [](char c) { return c >= 'a' && c <= 'f' ? c - 'a' + 'A' : c; };
+        std::transform(slot.drcIndex.begin(), slot.drcIndex.end(), slot.drcIndex.begin(), upper);
+        if (slot.pool.empty()) slot.pool = "none";
+        std::int64_t pool = 0;
+        const bool fits =
+            !slot.drcIndex.empty() && slot.drcIndex.size() <= kMostDigits &&
+            slot.drcIndex.find_first_not_of("0123456789ABCDEF") == std::string::npos &&
+            (slot.pool == "none" || (wholeNumber(slot.pool, &pool) && pool <= kMostPool)) &&
+            required;
+        if (!fits || !drcs.insert(slot.drcIndex).second) throw malformed;
+        slots.push_back(std::move(slot));
+    }
+    return slots;
+}
+
+std::string ioSlotElement(const IoSlot& slot) {
+    return slot.drcIndex + '/' + slot.pool + (slot.isRequired ? "/1" : "/0");
 }
 
 std::string namedAdapters(const Row& row, const char* key) {

@@ -3,16 +3,22 @@
 /// A list has elements with commas between them, an element has fields with slashes between them;
 /// an element that holds a comma or a quote is quoted as a whole; an empty list is "none". Stored
 /// lists leave the name of a remote partition empty, because partitions are renamed: the name is
-/// filled in when a list is read.
+/// filled in when a list is read. Lists that come from outside may quote single fields instead,
+/// name the remote partition, and leave fields empty for their usual value; read here and written
+/// back, they have the stored form.
 #ifndef APPLIANCE_ADAPTERS_H
 #define APPLIANCE_ADAPTERS_H
 
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "View.h"
 
 namespace appliance {
+
+/// The kinds of adapters that are in virtual slots.
+constexpr Kind kVirtual[] = {Kind::Ethernet, Kind::VirtualScsi, Kind::Serial};
 
 /// One kind of adapter in lists.
 struct AdapterForm {
@@ -51,6 +57,55 @@ std::string adapterElement(const AdapterForm& form, const Object& adapter);
 
 /// The list of these elements, "none" for no element.
 std::string adapterList(const std::vector<std::string>& elements);
+
+/// The elements of a list, without their quotes; none for "none" and for an empty list.
+/// @throws Failure BadValue with the attribute @p key: a quote is open at the end
+std::vector<std::string> elementsOf(const char* key, const std::string& list);
+
+/// The adapter that an element describes, in @p lpar, where its slot is its number; Ethernet
+/// without a MAC address.
+/// @throws Failure BadValue with the form's list and the element
+Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std::string& element);
+
+/// All virtual adapters of a profile, by slot, as objects of its partition; Ethernet without MAC
+/// addresses.
+/// @throws Failure BadValue with list and element: it is malformed, or its slot is taken by another
+///         or not below the profile's max_virtual_slots
+std::vector<Object> adaptersOf(const Object& profile);
+
+/// How @p value is stored as the attribute @p name of an adapter; nothing when it cannot be its
+/// value. Empty stands for the usual value.
+std::optional<std::string> adapterValue(const std::string& name, const std::string& value);
+
+/// Whether the values of an adapter go together: a client must name its server's slot, and only
+/// IEEE adapters have additional VLANs.
+bool isWhole(const Object& adapter);
+
+/// A virtual slot of a host: the ID of its partition, and its number there.
+using VirtualSlot = std::pair<std::int64_t, std::int64_t>;
+
+VirtualSlot slotOf(const Object& adapter);
+
+/// Where the server of a client adapter would be; nothing for other adapters.
+std::optional<VirtualSlot> serverOf(const Object& adapter);
+
+/// Whether @p other, which is where @p client has its server, is one, and lets the client in. A
+/// server may name a client that is not there yet, or leave open who comes.
+bool serves(const Object& other, const Object& client);
+
+/// A MAC address that no adapter of the host has, for an Ethernet adapter in @p place.
+std::string newMac(const HostView& view, const Place& place);
+
+/// One physical slot of a profile.
+struct IoSlot {
+    std::string drcIndex;  ///< upper-case hexadecimal digits
+    std::string pool;      ///< ID of its I/O pool, or "none"
+    bool isRequired;
+};
+
+/// @throws Failure BadValue of io_slots with the element that is malformed or there twice
+std::vector<IoSlot> ioSlotsFromList(const std::string& list);
+std::string ioSlotElement(const IoSlot& slot);
 
 /// A profile's list under the attribute @p key, with the remote names.
 std::string namedAdapters(const Row& row, const char* key);

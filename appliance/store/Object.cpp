@@ -199,6 +199,9 @@ constexpr AttributeRow kLpar[] = {
     {"suspend_capable", "0"},
     {"remote_restart_capable", "0"},
     {"remote_restart_status", "Not Ready"},
+    {"electronic_err_reporting", "0"},
+    {"lpar_avail_priority", "127"},
+    {"ipl_source", "b"},
     // Memory in megabytes: what the next change aims at, what is in effect, what runs.
     {"pend_min_mem", nullptr},
     {"pend_mem", nullptr},
@@ -267,6 +270,7 @@ constexpr AttributeRow kLpar[] = {
     {"dest_msp_id", "none"},
     {"bytes_transmitted", "0"},
     {"bytes_remaining", "0"},
+    {"migration_token", "none"},  // tells one move of a partition from its next
     // The last reference code.
     {"refcode", "00000000"},
     {"refcode_time", "01/01/2024 00:00:00"},
@@ -316,6 +320,9 @@ constexpr AttributeRow kProfile[] = {
     {"power_ctrl_lpar_ids", "none"},
     {"work_group_id", "none"},
     {"redundant_err_path_reporting", "0"},
+    {"electronic_err_reporting", "0"},
+    {"hsl_pool_id", "none"},
+    {"virtual_opti_pool_id", "none"},
 };
 
 constexpr AttributeRow kEthernet[] = {
@@ -339,6 +346,12 @@ constexpr AttributeRow kSerial[] = {
     {"is_required", "1"},       {"connect_status", "unavailable"},
 };
 
+constexpr AttributeRow kSystemProfile[] = {
+    {"name", nullptr},
+    // A list of "<lpar_id>/<number of the profile>", in the order in which they are started.
+    {"lpar_profiles", nullptr},
+};
+
 struct KindRow {
     const char* name;
     const AttributeRow* attributes;
@@ -351,10 +364,23 @@ struct KindRow {
 
 /// In the order of Kind.
 constexpr KindRow kKindRows[] = {
-    {"host", kHost},         {"link", kLink},         {"unit", kUnit},        {"bus", kBus},
-    {"slot", kSlot},         {"procpool", kProcPool}, {"mempool", kMemPool},  {"hslpool", kHslPool},
-    {"optipool", kOptiPool}, {"hca", kHca},           {"sni", kSni},          {"lpar", kLpar},
-    {"profile", kProfile},   {"ethernet", kEthernet}, {"scsi", kVirtualScsi}, {"serial", kSerial},
+    {"host", kHost},
+    {"link", kLink},
+    {"unit", kUnit},
+    {"bus", kBus},
+    {"slot", kSlot},
+    {"procpool", kProcPool},
+    {"mempool", kMemPool},
+    {"hslpool", kHslPool},
+    {"optipool", kOptiPool},
+    {"hca", kHca},
+    {"sni", kSni},
+    {"lpar", kLpar},
+    {"profile", kProfile},
+    {"ethernet", kEthernet},
+    {"scsi", kVirtualScsi},
+    {"serial", kSerial},
+    {"sysprofile", kSystemProfile},
 };
 static_assert(sizeof kKindRows / sizeof *kKindRows == kKinds);
 
@@ -428,6 +454,26 @@ void Object::set(std::string_view name, std::string_view value) {
     } else {
         m_attributes.append(name).append("=").append(value).append("\n");
     }
+}
+
+void Object::unset(std::string_view name) {
+    defaultOf(m_kind, name);
+    std::size_t size = 0;
+    const std::size_t at = find(name, &size);
+    const std::size_t line = name.size() + 1;  // with the equals sign
+    if (at != std::string::npos) m_attributes.erase(at - line, line + size + 1);
+}
+
+std::vector<std::pair<std::string_view, std::string_view>> Object::settings() const {
+    std::vector<std::pair<std::string_view, std::string_view>> all;
+    const std::string_view lines = m_attributes;
+    for (std::size_t begin = 1; begin < lines.size();) {
+        const std::size_t equals = lines.find('=', begin), end = lines.find('\n', begin);
+        all.emplace_back(lines.substr(begin, equals - begin),
+                         lines.substr(equals + 1, end - equals - 1));
+        begin = end + 1;
+    }
+    return all;
 }
 
 }  // namespace appliance

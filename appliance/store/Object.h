@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <vector>
 
 namespace appliance {
 
@@ -30,8 +31,9 @@ enum class Kind {
     Ethernet,  ///< virtual Ethernet adapter that exists now, by virtual slot
     VirtualScsi,
     Serial,
+    SystemProfile,  ///< partitions of a host that are started together, each with a profile
 };
-constexpr int kKinds = static_cast<int>(Kind::Serial) + 1;
+constexpr int kKinds = static_cast<int>(Kind::SystemProfile) + 1;
 
 /// The word for a kind in the stored state.
 const char* kindName(Kind kind);
@@ -60,9 +62,16 @@ public:
     /// @throws std::logic_error as get()
     void set(std::string_view name, std::string_view value);
 
+    /// Gives the attribute the kind's own value again.
+    void unset(std::string_view name);
+
     /// The attributes that were set, as the text to store: a line "name=value" for each, with a
     /// line break before every line and behind the last.
     const std::string& stored() const { return m_attributes; }
+
+    /// Name and value of each of them, in the order in which they were first set. The texts are
+    /// parts of stored().
+    std::vector<std::pair<std::string_view, std::string_view>> settings() const;
 
 private:
     std::size_t find(std::string_view name, std::size_t* size) const;

@@ -11,7 +11,7 @@ namespace {
 
 /// Stands in the file's user_version; 0 there is a file in which nothing was made yet. Goes up
 /// with every change of the schema or of what stored attributes mean.
-constexpr std::int64_t kVersion = 1;
+constexpr std::int64_t kVersion = 2;
 
 // The attributes of an object are one text, because an object is always read whole: a table with a
 // row for each attribute would have tens of millions of rows on a large appliance.
@@ -24,6 +24,10 @@ constexpr const char* kSchema = R"(
         number INTEGER NOT NULL,
         attributes TEXT NOT NULL,
         UNIQUE(kind, host, lpar, number)
+    );
+    CREATE TABLE IF NOT EXISTS journal(
+        number INTEGER PRIMARY KEY AUTOINCREMENT,
+        line TEXT NOT NULL
     );
 )";
 
@@ -109,6 +113,36 @@ bool Store::remove(Kind kind, const Place& place) {
     query.bind(4, place.number);
     query.step();
     return sqlite3_changes(m_database->handle()) != 0;
+}
+
+std::optional<Object> Store::find(Kind kind, const Place& place) {
+    Statement query(*m_database,
+                    "SELECT host, lpar, number, attributes FROM object WHERE kind = ? "
+                    "AND host = ? AND lpar = ? AND number = ?");
+    query.bind(1, kindName(kind));
+    query.bind(2, place.host);
+    query.bind(3, place.lpar);
+    query.bind(4, place.number);
+    std::vector<Object> found = collect(query, kind);
+    if (found.empty()) return std::nullopt;
+    return std::move(found.front());
+}
+
+void Store::append(const std::string& line) {
+    Statement insert(*m_database, "INSERT INTO journal(line) VALUES(?)");
+    insert.bind(1, line);
+    insert.step();
+}
+
+std::vector<std::pair<std::int64_t, std::string>> Store::journal(std::int64_t after,
+                                                                 std::int64_t most) {
+    Statement query(*m_database,
+                    "SELECT number, line FROM journal WHERE number > ? ORDER BY number LIMIT ?");
+    query.bind(1, after);
+    query.bind(2, most);
+    std::vector<std::pair<std::int64_t, std::string>> lines;
+    while (query.step()) lines.emplace_back(query.integer(0), query.text(1));
+    return lines;
 }
 
 std::vector<Object> Store::all(Kind kind) {

@@ -14,6 +14,7 @@
 #define APPLIANCE_STORE_H
 
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -44,6 +45,16 @@ public:
     void put(const Object& object);
     /// Whether there was such an object.
     bool remove(Kind kind, const Place& place);
+
+    /// The object in this place, if there is one.
+    std::optional<Object> find(Kind kind, const Place& place);
+
+    /// Adds @p line to the journal of changes, which keeps the order of the transactions.
+    void append(const std::string& line);
+    /// The lines that were added after the one with the number @p after, each with its number;
+    /// numbers start from 1 and are never used again. At most @p most lines.
+    std::vector<std::pair<std::int64_t, std::string>> journal(std::int64_t after,
+                                                              std::int64_t most);
 
     /// All objects of @p kind, by host, partition and number.
     std::vector<Object> all(Kind kind);

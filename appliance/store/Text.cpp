@@ -100,6 +100,19 @@ bool wholeNumber(std::string_view text, std::int64_t* value) {
     return true;
 }
 
+bool wholeUnits(std::string_view text, std::int64_t* value) {
+    constexpr std::int64_t kMost = 1'000'000'000;
+    const std::size_t point = std::min(text.find('.'), text.size());
+    const std::string_view decimals = text.substr(std::min(point + 1, text.size()));
+    std::int64_t whole = 0, part = 0;
+    if (!wholeNumber(text.substr(0, point), &whole) || whole > kMost || decimals.size() > 2 ||
+        (point != text.size() && !wholeNumber(decimals, &part))) {
+        return false;
+    }
+    *value = hundredths(text);
+    return true;
+}
+
 std::string timeText(std::time_t time) {
     std::tm parts{};
     gmtime_r(&time, &parts);

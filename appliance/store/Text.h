@@ -34,6 +34,10 @@ std::string unquoted(std::string_view field);
 /// Processing units in hundredths: "1.25" is 125. What is no number counts as 0.
 std::int64_t hundredths(std::string_view units);
 
+/// The whole of @p text as processing units without sign, with at most two decimals.
+/// @return false, with @p value untouched, when it is anything else or does not fit
+bool wholeUnits(std::string_view text, std::int64_t* value);
+
 /// Hundredths as processing units with two decimals: 125 is "1.25"; nothing at all is "0.0".
 std::string units(std::int64_t hundredths);
 

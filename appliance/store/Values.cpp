@@ -6,6 +6,7 @@
 #include <unordered_map>
 
 #include "Adapters.h"
+#include "LparState.h"
 #include "Text.h"
 #include "View.h"
 
@@ -78,9 +79,7 @@ std::string lparKey(const Row& row, const char*) {
 /// does not run, or is on its way to another host, can change nothing.
 std::string dynamicCapabilities(const Row& row, const char*) {
     constexpr std::int64_t kAllOfThem = 1 | 2 | 4;
-    const bool changes =
-        own(row, "state") == "Running" && (own(row, "migration_state") == "Not Migrating" ||
-                                           own(row, "migration_state") == "Migration Complete");
+    const bool changes = own(row, "state") == "Running" && !isMoving(*row.self);
     return "DCaps:<" + hex(changes ? kAllOfThem : 0, 1) + '>';
 }
 
@@ -205,7 +204,7 @@ std::string availablePoolUnits(const Row& row, const char* key) {
 /// How many partitions are moving in the way @p key.
 std::string migrations(const Row& row, const char* key) {
     return std::to_string(sumOfLpars(row, [&](const Object& lpar) {
-        return lpar.get("migration_type") == key && lpar.get("migration_state") != "Not Migrating";
+        return lpar.get("migration_type") == key && isMoving(lpar);
     }));
 }
 

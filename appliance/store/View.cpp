@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Failure.h"
 #include "Text.h"
 
 namespace appliance {
@@ -24,18 +25,49 @@ const Object* HostView::lpar(std::int64_t id) const {
     return found != lpars.end() && found->place().lpar == id ? &*found : nullptr;
 }
 
+const Object* HostView::lparNamed(const std::string& name) const {
+    for (const Object& lpar : all(Kind::Lpar)) {
+        if (lpar.get("name") == name) return &lpar;
+    }
+    return nullptr;
+}
+
 std::string HostView::lparName(const std::string& id) const {
     std::int64_t wanted = 0;
     const Object* found = wholeNumber(id, &wanted) ? lpar(wanted) : nullptr;
     return found == nullptr ? std::string() : found->get("name");
 }
 
-std::vector<std::unique_ptr<HostView>> allHosts(Store& store) {
-    std::vector<std::unique_ptr<HostView>> hosts;
+std::optional<Object> HostView::lparElsewhere(const std::string& host, std::int64_t id) const {
+    for (const Object& other : m_store.all(Kind::Host)) {
+        if (other.get("name") == host) {
+            return m_store.find(Kind::Lpar, {other.place().host, id, 0});
+        }
+    }
+    return std::nullopt;
+}
+
+Hosts allHosts(Store& store) {
+    Hosts hosts;
     for (Object& host : store.all(Kind::Host)) {
         hosts.push_back(std::make_unique<HostView>(store, std::move(host)));
     }
     return hosts;
+}
+
+Hosts hostsNamed(Store& store, const std::string& name, char joint) {
+    Hosts all = allHosts(store);
+    if (name.empty()) return all;
+    Hosts found;
+    for (auto& host : all) {
+        const Object& self = host->host();
+        if (self.get("name") == name ||
+            self.get("type_model") + joint + self.get("serial_num") == name) {
+            found.push_back(std::move(host));
+        }
+    }
+    if (found.empty()) throw Failure(Fault::HostNotFound, {name});
+    return found;
 }
 
 Row rowOf(const HostView& view, const Object& object) {

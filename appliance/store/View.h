@@ -10,6 +10,7 @@
 #include <ctime>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -31,9 +32,13 @@ public:
     const std::vector<Object>& all(Kind kind) const;
     /// Null when the host has no such partition.
     const Object* lpar(std::int64_t id) const;
+    const Object* lparNamed(const std::string& name) const;
     /// The name of that partition, or the empty text. @p id is an attribute's value, which may be
     /// a word such as "any".
     std::string lparName(const std::string& id) const;
+
+    /// A partition of the host with the name @p host, which may be another.
+    std::optional<Object> lparElsewhere(const std::string& host, std::int64_t id) const;
 
 private:
     Store& m_store;
@@ -41,8 +46,15 @@ private:
     mutable std::map<Kind, std::vector<Object>> m_objects;
 };
 
+using Hosts = std::vector<std::unique_ptr<HostView>>;
+
 /// Every host of @p store, in its order.
-std::vector<std::unique_ptr<HostView>> allHosts(Store& store);
+Hosts allHosts(Store& store);
+
+/// The hosts that are called @p name, or that have this type and serial number with @p joint
+/// between them; every host when it is empty.
+/// @throws Failure HostNotFound
+Hosts hostsNamed(Store& store, const std::string& name, char joint);
 
 /// What one record is about. The pointers are borrowed from the view.
 struct Row {

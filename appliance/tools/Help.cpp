@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Operation.h"
 #include "Resource.h"
 #include "Text.h"
 
@@ -15,6 +16,7 @@ struct Words {
     const char* options;
     const char* attributes;
     const char* filters;
+    const char* records;
     const char* ends;
 };
 
@@ -25,8 +27,9 @@ constexpr Words kEnglish = {
     "attributes:",
     "filters:",
     "Records are lines of values with commas between them; a value that holds a comma or a\n"
-    "double quote stands in double quotes, with its own quotes doubled.\n"
-    "Exit status: 0 done, 1 named object not found, 2 wrong command line, 3 state unusable,\n"
+    "double quote stands in double quotes, with its own quotes doubled.\n",
+    "Exit status: 0 done, 1 refused, or named object not found, 2 wrong command line, 3 state "
+    "unusable,\n"
     "4 output not written.\n"};
 
 constexpr Words kGerman = {
@@ -36,8 +39,9 @@ constexpr Words kGerman = {
     "Attribute:",
     "Filter:",
     "Sätze sind Zeilen aus Werten mit Kommas dazwischen; ein Wert mit Komma oder Anführungs-\n"
-    "zeichen steht in Anführungszeichen, seine eigenen sind verdoppelt.\n"
-    "Rückgabewert: 0 erledigt, 1 genanntes Objekt nicht gefunden, 2 falscher Aufruf,\n"
+    "zeichen steht in Anführungszeichen, seine eigenen sind verdoppelt.\n",
+    "Rückgabewert: 0 erledigt, 1 abgelehnt, oder genanntes Objekt nicht gefunden, 2 falscher "
+    "Aufruf,\n"
     "3 Zustand nicht benutzbar, 4 Ausgabe nicht geschrieben.\n"};
 
 /// @p names behind @p heading, in lines of bounded width.
@@ -78,29 +82,17 @@ std::string resourceLines(const Resource& resource, const Words& words) {
     return *resource.filters == '\0' ? text : text + wrapped(words.filters, resource.filters);
 }
 
-}  // namespace
-
-const std::vector<ToolName>& toolNames() {
-    static const std::vector<ToolName> names = {
-        {kQyplat, "qyplat", "lists managed systems, partitions and profiles",
-         "listet verwaltete Systeme, Partitionen und Profile auf"},
-        {kQyalloc, "qyalloc", "lists the resources of managed systems and who has them",
-         "listet die Ressourcen verwalteter Systeme auf, und wer sie hat"},
-        {kQymove, "qymove", "lists what can move between managed systems, and what moves",
-         "listet auf, was zwischen verwalteten Systemen umziehen kann und was umzieht"},
-        {kQyusage, "qyusage", "lists utilisation samples", "listet Messungen der Auslastung auf"},
-        {kQyfault, "qyfault", "lists reference codes", "listet Referenzcodes auf"},
-        {kQylink, "qylink", "lists the connections to managed systems",
-         "listet die Verbindungen zu verwalteten Systemen auf"},
-        {kQylwh, "qylwh", "names the host that this appliance alone manages, and its partition",
-         "nennt den Host, den allein diese Appliance verwaltet, und ihre Partition darauf"},
-        {kQydyn, "qydyn", "lists what partitions can change while they run",
-         "listet auf, was Partitionen im laufenden Betrieb ändern können"},
-        {kXbrgcli, "xbrgcli", "has a running I/O server carry out a command",
-         "lässt einen laufenden I/O-Server einen Befehl ausführen"},
-    };
-    return names;
+std::string operationLines(const Operation& operation, const Words& words) {
+    std::string text = "\n ";
+    if (operation.type != nullptr) text += std::string(" -r ") + operation.type;
+    if (operation.subtype != nullptr) text += std::string(" --rsubtype ") + operation.subtype;
+    if (operation.name != nullptr) text += std::string(" -o ") + operation.name;
+    text += '\n';
+    const char* attributes = operation.attributes;
+    return *attributes == '\0' ? text : text + wrapped(words.attributes, attributes);
 }
+
+}  // namespace
 
 std::string help(Tool tool, Language language) {
     const bool german = language == Language::German;
@@ -115,7 +107,9 @@ std::string help(Tool tool, Language language) {
     for (const Resource& resource : resources()) {
         if (resource.tool == tool) text += resourceLines(resource, words);
     }
-    return text + '\n' + words.ends;
+    const std::vector<Operation> operations = operationsOf(tool);
+    for (const Operation& operation : operations) text += operationLines(operation, words);
+    return text + '\n' + (operations.empty() ? words.records : "") + words.ends;
 }
 
 }  // namespace appliance

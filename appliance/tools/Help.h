@@ -19,6 +19,9 @@ struct ToolName {
 
 const std::vector<ToolName>& toolNames();
 
+/// The name by which the program is called to be @p tool.
+const char* toolName(Tool tool);
+
 std::string help(Tool tool, Language language);
 
 }  // namespace appliance

@@ -11,6 +11,7 @@
 #include <cstring>
 
 #include "Faults.h"
+#include "Operation.h"
 #include "Query.h"
 
 namespace {
@@ -53,7 +54,8 @@ int main(int, char** argv) {
         const Tool tool = toolNamed(name);
         int status = 0;
         if (failsAsPlanned(name, &status)) return status;
-        writeAll(answer(tool, argv + 1, language));
+        const bool changes = !operationsOf(tool).empty();
+        writeAll((changes ? carryOut : answer)(tool, argv + 1, language));
         return 0;
     } catch (const Failure& failure) {
         std::fprintf(stderr, "%s\n", failure.text(language).c_str());

@@ -55,22 +55,6 @@ std::vector<std::string> wantedAttributes(const Resource& resource, const std::s
     return wanted;
 }
 
-/// @param joint  what stands between a host's type and serial number on the command line
-Hosts hostsFor(Store& store, const std::string& name, char joint) {
-    Hosts all = allHosts(store);
-    if (name.empty()) return all;
-    Hosts found;
-    for (auto& host : all) {
-        const Object& self = host->host();
-        if (self.get("name") == name ||
-            self.get("type_model") + joint + self.get("serial_num") == name) {
-            found.push_back(std::move(host));
-        }
-    }
-    if (found.empty()) throw Failure(Fault::HostNotFound, {name});
-    return found;
-}
-
 std::string records(const std::vector<Row>& rows, const std::vector<std::string>& attributes,
                     bool withNames) {
     std::string text;
@@ -105,8 +89,8 @@ std::string answer(Tool tool, const char* const* arguments, Language language) {
 
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
-    const Hosts hosts = tool == kQydyn ? hostsFor(store, request.value("-c"), '_')
-                                       : hostsFor(store, request.value("-m"), '*');
+    const Hosts hosts = tool == kQydyn ? hostsNamed(store, request.value("-c"), '_')
+                                       : hostsNamed(store, request.value("-m"), '*');
     std::vector<Row> rows = resource.rows(hosts, request);
     applyFilter(request.value("--filter"), resource.filters, hosts, rows);
     if (rows.empty()) return kNothing;

@@ -11,7 +11,8 @@ namespace {
 
 constexpr unsigned kByHost = kQyplat | kQyalloc | kQymove | kQyusage | kQyfault | kQylink;
 constexpr unsigned kByAttribute = kByHost | kQylwh;
-constexpr unsigned kAll = kByAttribute | kQydyn | kXbrgcli;
+constexpr unsigned kChange = kEdalloc | kEdplat | kNwplat | kDlplat | kEdpower | kEdsusp | kDomove;
+constexpr unsigned kAll = kByAttribute | kQydyn | kXbrgcli | kChange;
 
 constexpr Option kOptions[] = {
     {"-r", kByHost, "<resource>", "what to list", "was aufgelistet wird"},
@@ -55,6 +56,47 @@ constexpr Option kOptions[] = {
     {"--id", kXbrgcli, "<lpar_id>", "the I/O server of that managed system",
      "der I/O-Server dieses verwalteten Systems"},
     {"-c", kXbrgcli, "<command>", "what it is to do", "was er tun soll"},
+    {"-r", kEdalloc | kEdplat | kNwplat | kDlplat | kEdpower, "<resource>", "what to change",
+     "was geändert wird"},
+    {"--rsubtype", kEdalloc, "<subtype>", "which kind of that resource",
+     "welche Art dieser Ressource"},
+    {"-m", kChange, "<managed system>", "by its name or as <type_model>*<serial_num>",
+     "mit Namen oder als <type_model>*<serial_num>"},
+    {"-o", kEdalloc | kEdpower | kEdsusp, "<operation>", "what to do", "was zu tun ist"},
+    {"-o", kDomove, "v|m|s", "tell whether the partition could move, move it, stop its move",
+     "sagen, ob die Partition umziehen könnte, sie umziehen, ihren Umzug anhalten"},
+    {"--id", kEdalloc | kDlplat | kEdpower | kEdsusp | kDomove, "<lpar_id>", "the partition",
+     "die Partition"},
+    {"-i", kEdplat | kNwplat, "\"\"<name>=<value>\",...\"",
+     "attributes to set; += adds to a list and -= takes from it",
+     "zu setzende Attribute; += ergänzt eine Liste, -= nimmt aus ihr heraus"},
+    {"-a", kEdalloc, "\"\"<name>=<value>\",...\"", "attributes to set", "zu setzende Attribute"},
+    {"--procs", kEdalloc, "<number>", "whole processors", "ganze Prozessoren"},
+    {"--procunits", kEdalloc, "<units>", "processing units", "Prozessoreinheiten"},
+    {"-q", kEdalloc, "<megabytes>", "memory", "Speicher"},
+    {"--entitled", kEdalloc, "<megabytes>", "memory that I/O may use",
+     "Speicher, den die Ein-/Ausgabe benutzen darf"},
+    {"-s", kEdalloc, "<slot>", "virtual slot; the first free one when absent",
+     "virtueller Steckplatz; der erste freie, wenn es fehlt"},
+    {"-l", kEdalloc, "<drc_index>", "physical slot", "physischer Steckplatz"},
+    {"-f", kEdpower, "<profile>", "the profile to start with: of the partition, or of the system",
+     "das Profil, mit dem gestartet wird: der Partition oder des Systems"},
+    {"-b", kEdpower, "norm|dd|ds|of|sms", "boot mode; that of the profile when absent",
+     "Startmodus; der des Profils, wenn es fehlt"},
+    {"-k", kEdpower, "norm|manual", "position of the keylock", "Stellung des Schlüsselschalters"},
+    {"-n", kEdpower, "<system profile>", "the system profile", "das Systemprofil"},
+    {"--immed", kEdpower, nullptr, "end at once what runs", "sofort beenden, was läuft"},
+    {"--restart", kEdpower, nullptr, "start again afterwards", "danach wieder starten"},
+    {"--continue", kEdpower, nullptr, "pass over partitions that cannot start",
+     "Partitionen übergehen, die nicht starten können"},
+    {"--test", kEdpower, nullptr, "only tell whether it could be done",
+     "nur sagen, ob es möglich wäre"},
+    {"-t", kEdsusp, "suspend", "what the operation is about", "worum es bei der Operation geht"},
+    {"-t", kDomove, "<managed system>", "where the partition moves to",
+     "wohin die Partition umzieht"},
+    {"--ip", kDomove, "<manager>", "who manages that system, when it is another",
+     "wer dieses System verwaltet, wenn es ein anderer ist"},
+    {"-u", kDomove, "<user>", "the user on that manager", "der Benutzer bei diesem Verwalter"},
     {"--help", kAll, nullptr, "this text", "dieser Text"},
     {nullptr, 0, nullptr, nullptr, nullptr},
 };
@@ -73,7 +115,7 @@ const Option& find(Tool tool, const std::string& name) {
 
 const Option* options() { return kOptions; }
 
-Request::Request(Tool tool, const char* const* arguments) {
+Request::Request(Tool tool, const char* const* arguments) : m_tool(tool) {
     while (*arguments != nullptr) {
         const Option& option = find(tool, *arguments++);
         std::string value;

@@ -18,6 +18,13 @@ enum Tool : unsigned {
     kQylwh = 64,
     kQydyn = 128,
     kXbrgcli = 256,
+    kEdalloc = 512,
+    kEdplat = 1024,
+    kNwplat = 2048,
+    kDlplat = 4096,
+    kEdpower = 8192,
+    kEdsusp = 16384,
+    kDomove = 32768,
 };
 
 struct Option {
@@ -37,6 +44,7 @@ public:
     /// @throws Failure of kind kExitUsage
     Request(Tool tool, const char* const* arguments);
 
+    Tool tool() const { return m_tool; }
     bool has(const char* option) const { return m_values.count(option) != 0; }
     /// The option's value, empty when it was not given.
     std::string value(const char* option) const;
@@ -46,6 +54,7 @@ public:
                         std::int64_t absent) const;
 
 private:
+    Tool m_tool;
     std::map<std::string, std::string> m_values;
 };
 

@@ -14,8 +14,6 @@
 
 namespace appliance {
 
-using Hosts = std::vector<std::unique_ptr<HostView>>;
-
 /// The records of a resource for @p hosts, in the order in which they are printed.
 using Rows = std::vector<Row> (*)(const Hosts& hosts, const Request& request);
 

@@ -181,7 +181,7 @@ TEST_F(StoreTest, WhatCannotBeOpenedSaysWhy) {
     };
 
     sqlite("PRAGMA user_version = 99");
-    EXPECT_EQ("WRTL2003 The appliance's state has version 99; this program reads version 1.",
+    EXPECT_EQ("WRTL2003 The appliance's state has version 99; this program reads version 2.",
               faultOf(open));
     EXPECT_EQ(0U, faultOf([] {
                       Store store = Store::create();

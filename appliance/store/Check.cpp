@@ -1,10 +1,13 @@
 #include "Check.h"
 
+#include <algorithm>
 #include <map>
+#include <optional>
 #include <set>
 
+#include "Adapters.h"
+#include "LparState.h"
 #include "Text.h"
-#include "View.h"
 
 namespace appliance {
 
@@ -23,6 +26,9 @@ public:
         require(false, std::string(kindName(object.kind())) + ' ' + std::to_string(place.number) +
                            " of partition " + std::to_string(place.lpar) + ' ' + what);
     }
+    void add(const std::vector<std::string>& texts) {
+        m_texts.insert(m_texts.end(), texts.begin(), texts.end());
+    }
     std::vector<std::string> take() { return std::move(m_texts); }
 
 private:
@@ -34,7 +40,6 @@ using Rule = void (*)(const HostView& view, Findings& findings);
 
 constexpr Kind kOfLpar[] = {Kind::Profile, Kind::Ethernet, Kind::VirtualScsi, Kind::Serial,
                             Kind::Slot,    Kind::Hca,      Kind::Sni};
-constexpr Kind kVirtual[] = {Kind::Ethernet, Kind::VirtualScsi, Kind::Serial};
 
 void ownersExist(const HostView& view, Findings& findings) {
     for (Kind kind : kOfLpar) {
@@ -119,23 +124,7 @@ void quantitiesAreWithinLimits(const HostView& view, Findings& findings) {
     }
 }
 
-using VirtualSlot = std::pair<std::int64_t, std::int64_t>;  // partition, slot
 using VirtualSlots = std::map<VirtualSlot, const Object*>;
-
-/// Whether what @p adapter is joined to is joined to it, and is of the other type.
-bool isPaired(const Object& adapter, const VirtualSlots& slots) {
-    std::int64_t lpar = 0, slot = 0;
-    if (!wholeNumber(adapter.get("remote_lpar_id"), &lpar) ||
-        !wholeNumber(adapter.get("remote_slot_num"), &slot)) {
-        return adapter.get("adapter_type") == "server";
-    }
-    const auto found = slots.find({lpar, slot});
-    if (found == slots.end() || found->second->kind() != adapter.kind()) return false;
-    const Object& other = *found->second;
-    return other.get("remote_lpar_id") == std::to_string(adapter.place().lpar) &&
-           other.get("remote_slot_num") == std::to_string(adapter.place().number) &&
-           other.get("adapter_type") != adapter.get("adapter_type");
-}
 
 void virtualSlotsFit(const HostView& view, Findings& findings) {
     VirtualSlots slots;
@@ -153,9 +142,15 @@ void virtualSlotsFit(const HostView& view, Findings& findings) {
                              adapter, "has the MAC address of another");
         }
     }
+    std::set<VirtualSlot> servers;
     for (const auto& [place, adapter] : slots) {
-        findings.require(adapter->kind() == Kind::Ethernet || isPaired(*adapter, slots), *adapter,
-                         "is joined to an adapter that is not joined to it");
+        if (adapter->kind() == Kind::Ethernet || adapter->get("adapter_type") != "client") continue;
+        const std::optional<VirtualSlot> server = serverOf(*adapter);
+        const auto found = server ? slots.find(*server) : slots.end();
+        const bool served = found != slots.end() && serves(*found->second, *adapter);
+        findings.require(served, *adapter, "is joined to an adapter that is not joined to it");
+        findings.require(!served || servers.insert(*server).second, *adapter,
+                         "is joined to an adapter that serves another client");
     }
 }
 
@@ -167,11 +162,55 @@ void physicalSlotsAreUnique(const HostView& view, Findings& findings) {
     }
 }
 
-constexpr Rule kRules[] = {ownersExist,     namesAreUnique,
-                           capacityHolds,   quantitiesAreWithinLimits,
-                           virtualSlotsFit, physicalSlotsAreUnique};
+void activeLparsHaveActiveHosts(const HostView& view, Findings& findings) {
+    const std::string state = view.host().get("state");
+    for (const Object& lpar : view.all(Kind::Lpar)) {
+        findings.require(state == "Operating" || !isActive(lpar), lpar,
+                         "is active on a host in the state " + state);
+    }
+}
+
+/// A partition that moves and the place that is kept for it must name each other.
+void movesHaveTwoEnds(const HostView& view, Findings& findings) {
+    constexpr const char* kSame[] = {
+        "name",           "migration_state", "migration_type",  "source_sys_name",  "dest_sys_name",
+        "source_lpar_id", "dest_lpar_id",    "bytes_remaining", "bytes_transmitted"};
+    const std::string name = view.host().get("name");
+    for (const Object& lpar : view.all(Kind::Lpar)) {
+        if (!isMoving(lpar)) continue;
+        const bool leaves = lpar.get("source_sys_name") == name &&
+                            lpar.get("source_lpar_id") == lpar.get("lpar_id");
+        const bool arrives =
+            lpar.get("dest_sys_name") == name && lpar.get("dest_lpar_id") == lpar.get("lpar_id");
+        const std::optional<Object> other =
+            view.lparElsewhere(lpar.get(leaves ? "dest_sys_name" : "source_sys_name"),
+                               number(lpar.get(leaves ? "dest_lpar_id" : "source_lpar_id")));
+        findings.require(leaves != arrives && other &&
+                             std::all_of(std::begin(kSame), std::end(kSame),
+                                         [&](const char* attribute) {
+                                             return lpar.get(attribute) == other->get(attribute);
+                                         }),
+                         lpar, "is in a move without another end");
+    }
+}
+
+constexpr Rule kRules[] = {ownersExist,
+                           namesAreUnique,
+                           capacityHolds,
+                           quantitiesAreWithinLimits,
+                           virtualSlotsFit,
+                           physicalSlotsAreUnique,
+                           activeLparsHaveActiveHosts,
+                           movesHaveTwoEnds};
 
 }  // namespace
+
+std::vector<std::string> check(const HostView& view) {
+    Findings findings;
+    findings.setHost(view);
+    for (Rule rule : kRules) rule(view, findings);
+    return findings.take();
+}
 
 std::vector<std::string> check(Store& store) {
     Findings findings;
@@ -181,7 +220,7 @@ std::vector<std::string> check(Store& store) {
         findings.require(
             names.insert(view->host().get("name")).second && names.insert(view->mtms()).second,
             "another host has the same name or serial number");
-        for (Rule rule : kRules) rule(*view, findings);
+        findings.add(check(*view));
     }
     return findings.take();
 }

@@ -6,12 +6,14 @@
 #include <string>
 #include <vector>
 
-#include "Store.h"
+#include "View.h"
 
 namespace appliance {
 
 /// A sentence for each rule that is broken, with the object that breaks it.
 std::vector<std::string> check(Store& store);
+/// Of what one host has; not whether other hosts have its name.
+std::vector<std::string> check(const HostView& view);
 
 }  // namespace appliance
 

@@ -1,0 +1,81 @@
+/// Starts partitions of one host with profiles.
+///
+/// What a profile asks for is judged against what is left when the partitions that were started
+/// before have theirs; one that is refused takes nothing. Nothing is changed before apply().
+///
+///     Activation activation(change.host());
+///     activation.start(lpar, "normal", "");
+///     activation.apply(change);
+#ifndef APPLIANCE_ACTIVATION_H
+#define APPLIANCE_ACTIVATION_H
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include "Adapters.h"
+#include "Change.h"
+
+namespace appliance {
+
+class Activation {
+public:
+    /// @param host  as it stands now; must hold until apply()
+    explicit Activation(const HostView& host);
+
+    /// Gives @p lpar the profile's memory and processors (as wanted, or what is left if that is
+    /// enough), its virtual adapters in place of those it has, and its physical slots, and makes
+    /// it run. A server adapter that a client of another partition uses stays as it is.
+    /// @param bootMode  empty: the profile's
+    /// @throws Failure HostState, LparState, LparMoving, ProfileNotFound, NotEnough, NoPool,
+    ///         NoServerAdapter, SlotNotFound, SlotNotFree, BadValue
+    void start(const Object& lpar, const std::string& profile, const std::string& bootMode);
+
+    /// Whether start() made this partition run.
+    bool hasStarted(const Object& lpar) const { return m_lpars.count(lpar.place().lpar) != 0; }
+
+    /// Puts all that start() decided, and makes a host that stood by operate.
+    void apply(Change& change) const;
+
+private:
+    /// What is left of a resource, now and when pending changes are in effect.
+    struct Left {
+        std::int64_t curr;
+        std::int64_t pend;
+    };
+
+    static std::int64_t room(const Left& left, const Left& own);
+    static Left memoryOf(const Object& lpar);
+    static Left entitlementOf(const Object& lpar);
+    static Left unitsOf(const Object& lpar, const std::string& pool);
+    void setMemory(const Object& before, const Object& profile, Object& lpar) const;
+    void setProcessors(const Object& before, const Object& profile, Object& lpar) const;
+    Object withResources(const Object& before, const Object& profile) const;
+    std::map<VirtualSlot, Object> adaptersFor(const Object& lpar, const Object& profile) const;
+    /// @throws Failure NoServerAdapter
+    void requireServer(const Object& client) const;
+    std::map<std::string, Object> slotsFor(const Object& lpar, const Object& profile) const;
+    void account(const Object& lpar, int sign);
+
+    const HostView& m_host;
+    Left m_mem{};
+    Left m_entitled{};                    ///< of the memory pool
+    std::map<std::string, Left> m_units;  ///< by ID of the processor pool; "0": all there are
+    std::map<VirtualSlot, Object> m_adapters;
+    std::map<VirtualSlot, VirtualSlot> m_clients;  ///< of server adapters
+    std::map<std::string, Object> m_slots;         ///< by DRC index
+    std::map<std::int64_t, Object> m_lpars;        ///< that were started
+};
+
+/// Makes these partitions of @p host be in @p state, on what they hold already.
+void enter(Change& change, const HostView& host, std::vector<Object> lpars, const char* state);
+
+/// Makes a partition be as its profile says, apart from its memory and processors.
+void takeSettings(const Object& profile, Object& lpar);
+
+/// Takes the last reference code away from a partition that starts.
+void clearRefcode(Object& lpar);
+
+}  // namespace appliance
+
+#endif

@@ -1,0 +1,101 @@
+/// One change of the appliance's state: a transaction with a line in the journal.
+///
+/// What is put and removed is seen at once by the change itself, and by others when it is
+/// committed. Before that, the rules that every appliance obeys (Check.h) are applied to the hosts
+/// that were touched: a change that would break one is refused, and nothing of it remains. The
+/// journal's line is a JSON object with the tool, the time, and each object that differs
+/// afterwards:
+///
+///     {"tool":"edplat","time":1700000000,"objects":[{"event":"modify","kind":"lpar",
+///      "host":"1111-AAA*0000001","lpar":3,"number":0,"old":{"name":"web"},"new":{"name":"www"}}]}
+///
+/// "old" and "new" have the attributes that differ; an "add" has no "old", a "delete" no "new".
+///
+///     Change change(request);
+///     Object lpar = change.lpar();
+///     lpar.set("name", "www");
+///     change.put(lpar);
+///     change.commit();
+#ifndef APPLIANCE_CHANGE_H
+#define APPLIANCE_CHANGE_H
+
+#include <initializer_list>
+#include <map>
+#include <optional>
+#include <set>
+#include <string>
+#include <tuple>
+#include <vector>
+
+#include "Request.h"
+#include "View.h"
+
+namespace appliance {
+
+class Change {
+public:
+    /// Starts a change of the host that -m names, and waits until no other change is under way.
+    /// @throws Failure MissingOption, HostNotFound, and those of Store::open
+    explicit Change(const Request& request);
+
+    /// The host that -m names, as it stands now. A view of a host, and what it gives, holds until
+    /// something of that host is put or removed.
+    const HostView& host() { return view(m_host); }
+    /// Another host, by its name or type and serial number.
+    /// @throws Failure HostNotFound
+    const HostView& host(const std::string& name);
+
+    /// Whether a host is called so, or has this type and serial number.
+    bool isHost(const std::string& name);
+
+    /// The partition that --id names.
+    /// @throws Failure MissingOption, BadOptionValue, LparIdNotFound
+    Object lpar();
+
+    /// Adds @p object, or replaces the one in its place.
+    void put(const Object& object);
+    void remove(const Object& object);
+
+    /// Puts the object @p name with these values into the journal's line, for what those who follow
+    /// the journal would otherwise have to look up.
+    void note(const char* name, std::vector<std::pair<const char*, std::string>> values);
+
+    /// Judges what was changed so far; a change that ends without commit() changes nothing.
+    /// @throws Failure Unsound the change breaks a rule
+    void verify();
+
+    /// @throws Failure Unsound as verify(); StateUnusable, with nothing changed
+    void commit();
+
+private:
+    using Key = std::tuple<Kind, std::int64_t, std::int64_t, std::int64_t>;
+
+    const HostView& view(std::int64_t host);
+    std::int64_t numberOf(const std::string& name);
+    /// Keeps what is in the place of @p object before its first change.
+    void keep(const Object& object);
+    std::string journalLine();
+
+    const Request& m_request;
+    Store m_store;
+    Transaction m_transaction;
+    std::int64_t m_host;
+    std::map<std::int64_t, std::unique_ptr<HostView>> m_views;
+    std::map<Key, std::optional<Object>> m_before;
+    std::map<std::string, std::vector<std::pair<const char*, std::string>>> m_notes;
+};
+
+/// @throws Failure HostState the host is in none of @p states
+void requireState(const HostView& host, std::initializer_list<const char*> states);
+/// @throws Failure HostState what the appliance knows of the host may be out of date
+void requireConnection(const HostView& host);
+
+/// @throws Failure LparState
+void requireState(const Object& lpar, std::initializer_list<const char*> states);
+
+/// @throws Failure LparMoving the partition is on its way to another host, or from there
+void requireStill(const Object& lpar);
+
+}  // namespace appliance
+
+#endif

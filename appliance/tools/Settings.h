@@ -1,0 +1,28 @@
+/// The attribute lists of change tools: "name=value" items with commas between them. An item that
+/// holds a comma is quoted as a whole, its own quotes doubled.
+#ifndef APPLIANCE_SETTINGS_H
+#define APPLIANCE_SETTINGS_H
+
+#include <string>
+#include <vector>
+
+#include "Request.h"
+
+namespace appliance {
+
+struct Setting {
+    enum class Operator { Set, Add, Remove };  ///< =, += and -=
+
+    std::string name;
+    Operator op = Operator::Set;
+    std::string value;
+};
+
+/// The items of the option's value, in their order; none when it is empty or was not given.
+/// @param names  those that may be set, with commas between them
+/// @throws Failure BadSetting no operator stands behind a name; UnknownAttribute; RepeatedSetting
+std::vector<Setting> settingsOf(const Request& request, const char* option, const char* names);
+
+}  // namespace appliance
+
+#endif

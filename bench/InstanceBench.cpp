@@ -1,11 +1,13 @@
 // What does an instance cost on its way through broker, binding and frame, and does that stay the
 // same as the number of instances grows?
 //
-// A get and an enumeration over a provider that makes instances of six properties, beside a plain
-// loop that makes the same instances as the broker's own values. "per_instance" must stay flat.
+// A get of each instance, and an enumeration of all, over a provider that makes instances of six
+// properties, beside a plain loop that makes the same instances as the broker's own values.
+// "per_instance" must stay flat.
 
 #include <benchmark/benchmark.h>
 
+#include <cstdlib>
 #include <string>
 
 #include "ProviderInBench.h"
@@ -13,7 +15,8 @@
 namespace {
 
 constexpr const char* kClass = "Bench_Part";
-long instancesToReturn = 1;
+/// How many instances there are; they are named by number.
+long instancesServed = 1;
 
 class PartProvider : public BenchProvider {
 public:
@@ -27,11 +30,13 @@ public:
     }
     CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
                                     const char**) override {
-        return part(path, 0);
+        const long number = std::atol(path.getKey("Name").getString().charPtr());
+        if (number >= instancesServed) throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
+        return part(path, number);
     }
     void performEnumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
                               const char**) override {
-        for (long i = 0; i < instancesToReturn; ++i) result.returnData(part(path, i));
+        for (long i = 0; i < instancesServed; ++i) result.returnData(part(path, i));
     }
 
 private:
@@ -79,15 +84,20 @@ void perInstance(benchmark::State& state, long count) {
 
 void Broker_GetInstance(benchmark::State& state) {
     Broker broker;
+    instancesServed = state.range(0);
     for (auto _ : state)
-        benchmark::DoNotOptimize(broker.server.getInstance(broker.request, partPath(0)));
-    perInstance(state, 1);
+        for (long i = 0; i < state.range(0); ++i) {
+            const cimom::Reply reply = broker.server.getInstance(broker.request, partPath(i));
+            if (!reply.ok()) state.SkipWithError("wrong answer");
+            benchmark::DoNotOptimize(reply);
+        }
+    perInstance(state, state.range(0));
 }
-BENCHMARK(Broker_GetInstance)->Unit(benchmark::kMicrosecond);
+BENCHMARK(Broker_GetInstance)->Arg(1)->Arg(100)->Arg(10000)->Unit(benchmark::kMicrosecond);
 
 void Broker_EnumInstances(benchmark::State& state) {
     Broker broker;
-    instancesToReturn = state.range(0);
+    instancesServed = state.range(0);
     for (auto _ : state)
         benchmark::DoNotOptimize(
             broker.server.enumInstances(broker.request, {"root/cimv2", kClass}));

@@ -5,7 +5,7 @@
 #   scripts/bench.sh --build FOLDER         programs of a build folder that stands already
 #   scripts/bench.sh --only REGEX           only benchmarks (rival included) whose name matches
 #
-# Exits with 0 when every ratio keeps its limit.
+# Exits with 0 when every ratio and counter keeps its limit.
 . "$(dirname "$0")/common.sh"
 
 folder=
@@ -47,7 +47,8 @@ ROWS = [
     ("ParseRecords/100000", "LibcsvRows/100000", None, 0),
     ("ParseRecords/1000000", "ParseRecords/100000", 20.0, 0),
     ("Broker_EnumInstances/100", "Plain_EnumInstances/100", None, 0),
-    ("Broker_EnumInstances/10000", "Broker_EnumInstances/100", 150.0, 0),
+    ("Broker_EnumInstances/10000", "Broker_EnumInstances/100", 125.0, 0),
+    ("Broker_GetInstance/10000", "Broker_GetInstance/100", 125.0, 0),
     ("Frame_EnumInstanceNames", "Worker_EnumInstanceNames", None, 0),
     ("HashJoin_EnumNames/100", "CrossProduct_EnumNames/100", None, 0),
     ("HashJoin_EnumNames/1000", "CrossProduct_EnumNames/1000", 0.02, 0),
@@ -58,7 +59,22 @@ ROWS = [
     ("NtoN_AssociatorNames/10000", "NtoN_AssociatorNames/1000", 15.0, 0),
     ("MultiNtoN_EnumNames", "Rows_EnumNames", None, 0),
     ("ExecuteCommand/real_time", "SpawnReadWait/real_time", 1.25, 2),
+    ("Qyalloc/1000/real_time", "QyallocSpawn/1000/real_time", 1.5, 4),
+    ("QyallocParse/1000/real_time", "Qyalloc/1000/real_time", 0.1, 0),
+    ("GetAllLpars/1000", "SqliteWalkLpars/1000", 10.0, 0),
+    ("GetAllLpars/10000", "SqliteWalkLpars/10000", 10.0, 0),
+    ("GetAllLpars/10000", "GetAllLpars/1000", 15.0, 0),
+    ("WalkLpars/1000", "WalkLpars/100", 20.0, 0),
+    ("LookUp/10", "LookUpInVector/10", 3.0, 0),
+    ("LookUp/100", "LookUpInVector/100", 2.0, 0),
+    ("LookUp/1000", "LookUpInVector/1000", 2.0, 0),
+    ("LookUp/1", "LookUpInMap/1", None, 0),
+    ("LookUp/10", "LookUpInMap/10", None, 0),
+    ("LookUp/100", "LookUpInMap/100", None, 0),
+    ("LookUp/1000", "LookUpInMap/1000", None, 0),
 ]
+# Counters: benchmark, counter, the most that it may be.
+COUNTERS = [("GetAllLpars/1000", "resident_MB", 100)]
 TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}
 
 runs = {}
@@ -88,8 +104,15 @@ for name, rival, factor, slack in ROWS:
         failed = failed or not kept
         limit = "%.4g x%s %s" % (factor, " + %g ms" % slack if slack else "",
                                  "kept" if kept else "BROKEN")
-    print("%-28s %12.3f   %-28s %12.3f %8.2f  %s" % (name, mine, rival, theirs, mine / theirs, limit))
+    print("%-28s %12.4g   %-28s %12.4g %8.2f  %s" % (name, mine, rival, theirs, mine / theirs, limit))
+for name, counter, most in COUNTERS:
+    if name not in runs:
+        continue
+    worst = max(run[counter] for run in runs[name])
+    failed = failed or worst > most
+    print("%-28s %12.4g   %-50s  at most %g %s"
+          % (name, worst, counter, most, "kept" if worst <= most else "BROKEN"))
 for name in sorted(set(runs) - paired):
-    print("%-28s %12.3f" % (name, median(name)))
+    print("%-28s %12.4g" % (name, median(name)))
 sys.exit(failed)
 PY

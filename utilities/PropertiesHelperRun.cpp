@@ -1,10 +1,13 @@
 #include <fcntl.h>
+#include <poll.h>
 #include <pwd.h>
+#include <sys/syscall.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
+#include <chrono>
 #include <csignal>
 #include <cstdlib>
 #include <cstring>
@@ -285,6 +288,23 @@ void appendPieces(std::string& text, const char* bytes, size_t size) {
     }
 }
 
+/// A descriptor that can be read when the child has ended; none where the system has no such thing.
+class ChildEnd {
+public:
+    explicit ChildEnd(pid_t pid)
+        : m_descriptor(static_cast<int>(syscall(SYS_pidfd_open, pid, 0))) {}
+    ~ChildEnd() {
+        if (m_descriptor >= 0) close(m_descriptor);
+    }
+    ChildEnd(const ChildEnd&) = delete;
+    ChildEnd& operator=(const ChildEnd&) = delete;
+
+    int descriptor() const { return m_descriptor; }
+
+private:
+    int m_descriptor;
+};
+
 /// One run from the fork on: empties the child's pipes until the child has ended.
 class Supervision {
 public:
@@ -319,6 +339,7 @@ public:
     /// @param error  receives the error number when waiting itself fails, else 0
     bool awaitEnd(pid_t pid, int waitTime, int& error) {
         zemPollPlan plan(waitTime);
+        const ChildEnd end(pid);
         error = 0;
         for (;;) {
             if (plan.expired()) {
@@ -332,7 +353,7 @@ public:
             if (ended > 0 || (ended < 0 && error != EINTR)) {
                 return true;
             }
-            std::this_thread::sleep_for(plan.pause());
+            rest(plan.pause(), end);
         }
     }
 
@@ -344,6 +365,34 @@ public:
     }
 
 private:
+    /// Spends a pause between two passes. A pipe that fills meanwhile is emptied, so that the child
+    /// need not wait for the next pass, and the end of the child ends the pause.
+    void rest(std::chrono::microseconds pause, const ChildEnd& end) {
+        using Clock = std::chrono::steady_clock;
+        pollfd watched[] = {{end.descriptor(), POLLIN, 0},
+                            {m_pfdStdout.getReadingPipe(), POLLIN, 0},
+                            {m_pfdStderr.getReadingPipe(), POLLIN, 0}};
+        const auto until = Clock::now() + pause;
+        for (auto left = until - Clock::now(); left > left.zero(); left = until - Clock::now()) {
+            const auto seconds = std::chrono::duration_cast<std::chrono::seconds>(left);
+            const timespec limit = {seconds.count(), (left - seconds).count()};
+            const int ready = ppoll(watched, std::size(watched), &limit, nullptr);
+            if (ready < 0 && errno != EINTR) {
+                std::this_thread::sleep_for(left);
+            }
+            if (watched[0].revents != 0) {
+                return;
+            }
+            if (ready > 0) {
+                drainAll();
+            }
+            for (pollfd& pipe : watched) {
+                // The child may close its output and go on.
+                if ((pipe.revents & (POLLHUP | POLLIN)) == POLLHUP) pipe.fd = -1;
+            }
+        }
+    }
+
     /// The exception channel is emptied along with the others, for its text can be larger than a
     /// pipe; its pieces are counted at the end, when it is whole.
     void drainAll() {

@@ -48,7 +48,8 @@ Broker::Broker(Server& server, const Options& options)
       m_extension(extensionTable(lean())),
       m_memory(memoryTable(lean())),
       m_tables(makeTables(lean())),
-      m_messages(options.messageFolder) {
+      m_messages(options.messageFolder),
+      m_strays(*this) {
     m_face.hdl = this;
     m_face.bft = &m_operations;
     m_face.eft = &m_encapsulation;
@@ -106,8 +107,7 @@ void Broker::freeBlock(void* block) {
 // -- Activation -----------------------------------------------------------------------------------
 
 Activation::Activation(Broker& broker, const NamedValues& contextEntries)
-    : m_broker(broker), m_outer(innermost) {
-    m_context = makeIn<CMPIContext>(m_pool, broker, contextEntries);
+    : m_outer(innermost), m_pool(broker), m_context(makeIn<CMPIContext>(m_pool, contextEntries)) {
     innermost = this;
 }
 
@@ -115,7 +115,7 @@ Activation::~Activation() { innermost = m_outer; }
 
 Activation* Activation::current(const Broker& broker) {
     Activation* at = innermost;
-    while (at && &at->m_broker != &broker) at = at->m_outer;
+    while (at && &at->m_pool.broker() != &broker) at = at->m_outer;
     return at;
 }
 

@@ -85,10 +85,9 @@ public:
     Pool& pool() { return m_pool; }
 
 private:
-    Broker& m_broker;
     Activation* const m_outer;
     Pool m_pool;
-    CMPIContext* m_context;
+    CMPIContext* const m_context;
 };
 
 /// The context entries that stand for a request, and the request that an upcall's context

@@ -110,31 +110,30 @@ Node& anyNode(const void* object) {
     return *node;
 }
 
-std::string describe(const Node& node) {
-    return std::visit(
-        [&node](const auto& body) -> std::string {
-            using B = std::decay_t<decltype(*body)>;
-            if constexpr (std::is_same_v<B, StringBody>)
-                return body->text;
-            else if constexpr (std::is_same_v<B, InstanceBody>)
-                return printInstance(body->value);
-            else if constexpr (std::is_same_v<B, ObjectPath>)
-                return printPath(*body);
-            else if constexpr (std::is_same_v<B, DateTime>)
-                return body->text();
-            else if constexpr (std::is_same_v<B, ArrayBody>)
-                return printValue(Value::array(body->elementType, body->elements));
-            else if constexpr (std::is_same_v<B, std::shared_ptr<const Query>>)
-                return (*body)->text();
-            else if constexpr (std::is_same_v<B, NamedValues>) {
-                std::string out = "{";
-                for (const auto& [name, value] : *body)
-                    out += (out.size() > 1 ? ", " : "") + name + " = " + printValue(value);
-                return out + "}";
-            } else
-                return kObjectTypes[node.content.index()];
-        },
-        node.content);
+std::string describe(Node& node) {
+    return withKind(node.chunk->kind, [&node](auto kind) -> std::string {
+        using B = typename decltype(kind)::Body;
+        const B& body = *static_cast<NodeOf<typename decltype(kind)::Face>&>(node).body;
+        if constexpr (std::is_same_v<B, StringBody>)
+            return body.text;
+        else if constexpr (std::is_same_v<B, InstanceBody>)
+            return printInstance(body.value);
+        else if constexpr (std::is_same_v<B, ObjectPath>)
+            return printPath(body);
+        else if constexpr (std::is_same_v<B, DateTime>)
+            return body.text();
+        else if constexpr (std::is_same_v<B, ArrayBody>)
+            return printValue(Value::array(body.elementType, body.elements));
+        else if constexpr (std::is_same_v<B, std::shared_ptr<const Query>>)
+            return body->text();
+        else if constexpr (std::is_same_v<B, NamedValues>) {
+            std::string out = "{";
+            for (const auto& [name, value] : body)
+                out += (out.size() > 1 ? ", " : "") + name + " = " + printValue(value);
+            return out + "}";
+        } else
+            return kObjectTypes[node.chunk->kind];
+    });
 }
 
 CMPIString* objectText(const CMPIBroker* mb, const void* object, CMPIStatus* rc) {
@@ -143,12 +142,12 @@ CMPIString* objectText(const CMPIBroker* mb, const void* object, CMPIStatus* rc)
 }
 CMPIBoolean isOfType(const CMPIBroker* mb, const void* object, const char* type, CMPIStatus* rc) {
     return brokerEntry(mb, rc, [=](Broker&) -> CMPIBoolean {
-        return textOf(type) == kObjectTypes[anyNode(object).content.index()] ? 1 : 0;
+        return textOf(type) == kObjectTypes[anyNode(object).chunk->kind] ? 1 : 0;
     });
 }
 CMPIString* getType(const CMPIBroker* mb, const void* object, CMPIStatus* rc) {
     return brokerEntry(mb, rc, [object](Broker& broker) {
-        return makeString(broker, kObjectTypes[anyNode(object).content.index()]);
+        return makeString(broker, kObjectTypes[anyNode(object).chunk->kind]);
     });
 }
 

@@ -18,7 +18,7 @@ namespace {
 ObjectPath readPath(const Session& session, const std::string& text) {
     ObjectPath path = parsePath(text);
     if (path.nameSpace.empty()) path.nameSpace = session.request.nameSpace;
-    return session.classes ? typedKeys(path, *session.classes) : path;
+    return session.classes ? typedKeys(path, *session.classes, session.unfit) : path;
 }
 
 const CimClass* classOf(const Session& session, const ObjectPath& path) {
@@ -27,12 +27,18 @@ const CimClass* classOf(const Session& session, const ObjectPath& path) {
 
 /// The value of an element, typed as declared; guessed when its class is not known.
 Value readValue(const Session& session, const CimElement* declared, const std::string& text) {
-    return declared ? parseValue(text, typeOf(*declared), session.classes) : guessValue(text);
+    return declared ? parseValue(text, typeOf(*declared), session.classes, session.unfit)
+                    : guessValue(text);
+}
+
+/// What to say of a name that is not declared; nothing where the provider is to judge.
+void refuseName(const Session& session, CMPIrc rc, const std::string& message) {
+    if (session.unfit == Unfit::Refused) throw Failure(rc, message);
 }
 
 /// Values given as name=value.
 /// @param declared  elements that there are; null when nothing is known of them
-/// @throws Failure with @p unknown for a name that is not among them
+/// @throws Failure with @p unknown for a name that is not among them, and for one given twice
 template <class T>
 NamedValues readAssignments(const Session& session, const NamedList<T>* declared,
                             const std::vector<std::string>& assignments, CMPIrc unknown) {
@@ -43,7 +49,9 @@ NamedValues readAssignments(const Session& session, const NamedList<T>* declared
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + text + "' is not name=value");
         const std::string name = text.substr(0, equals);
         const T* element = declared ? declared->find(name) : nullptr;
-        if (declared && !element) throw Failure(unknown, "there is no '" + name + "' to set");
+        if (declared && !element) refuseName(session, unknown, "there is no '" + name + "' to set");
+        if (values.find(name))
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + name + "' is given twice");
         values.set(element ? element->name : name,
                    readValue(session, element, text.substr(equals + 1)));
     }
@@ -119,8 +127,8 @@ Reply invokeMethod(Session& session, const Arguments& arguments) {
     const CimClass* cls = classOf(session, path);
     const CimMethod* method = cls ? cls->methods.find(arguments.name) : nullptr;
     if (cls && !method)
-        throw Failure(CMPI_RC_ERR_METHOD_NOT_FOUND,
-                      "class " + cls->name + " has no method " + arguments.name);
+        refuseName(session, CMPI_RC_ERR_METHOD_NOT_FOUND,
+                   "class " + cls->name + " has no method " + arguments.name);
     const NamedValues in = readAssignments(session, method ? &method->parameters : nullptr,
                                            arguments.assignments, CMPI_RC_ERR_INVALID_PARAMETER);
     Reply reply = session.server.invokeMethod(session.request, path, arguments.name, in);
@@ -138,8 +146,8 @@ Reply setProperty(Session& session, const Arguments& arguments) {
     const CimClass* cls = classOf(session, path);
     const CimProperty* property = cls ? cls->properties.find(arguments.name) : nullptr;
     if (cls && !property)
-        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
-                      "class " + cls->name + " has no property " + arguments.name);
+        refuseName(session, CMPI_RC_ERR_NO_SUCH_PROPERTY,
+                   "class " + cls->name + " has no property " + arguments.name);
     return session.server.setProperty(session.request, path, arguments.name,
                                       readValue(session, property, arguments.value));
 }

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "Output.h"
+#include "PathText.h"
 #include "Server.h"
 
 namespace cimom {
@@ -28,6 +29,8 @@ struct Session {
     Server& server;
     Request request;
     const ClassRepository* classes;
+    /// Kept where the broker leaves names and types to the provider, as small servers do.
+    Unfit unfit;
     Format format;
     ResultStream& out;
 };

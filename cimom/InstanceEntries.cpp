@@ -51,17 +51,23 @@ Value checked(bool lean, const InstanceBody& body, const CimProperty* element,
                                                  typeName(value.type()));
 }
 
+// Keys that are as they were stay shared with the path that they came from.
+void setKey(InstanceBody& body, const std::string& name, const Value& value) {
+    const Value* present = body.value.path.keys.find(name);
+    if (!present || *present != value) body.value.path.keys.set(name, value);
+}
+
 // The keys of the path become properties, typed by the class. What the class does not have, or
 // not so, stays in the path alone: that a path is wrong is for the provider to say.
 void takeKeys(InstanceBody& body) {
-    NamedValues& keys = body.value.path.keys;
-    for (const auto& [name, value] : NamedValues(keys)) {
+    const NamedValues keys = body.value.path.keys;
+    for (const auto& [name, value] : keys) {
         Value typed = value;
         if (body.cls) {
             const CimProperty* element = declared(body, name);
             if (!element || !value.convertTo(typeOf(*element), typed)) continue;
         }
-        keys.set(name, typed);
+        setKey(body, name, typed);
         body.value.properties.set(name, std::move(typed));
     }
 }
@@ -108,8 +114,9 @@ CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, co
     return objectStatus(instance, [properties](InstanceBody& body, Broker&) {
         body.filter.reset();
         if (!properties) return;
-        body.filter.emplace();
-        for (const char** name = properties; *name; ++name) body.filter->push_back(*name);
+        const char** end = properties;
+        while (*end) ++end;
+        body.filter = std::make_shared<const std::vector<std::string>>(properties, end);
         NamedValues kept;
         for (const auto& [name, value] : body.value.properties)
             if (passesFilter(body, name) || isKey(body, name)) kept.set(name, value);
@@ -129,7 +136,7 @@ CMPIData namedData<CMPIInstance>(Broker& broker, const InstanceBody& body, const
 
 InstanceBody instanceBody(Broker& broker, Instance value) {
     const CimClass* cls = broker.classOf(value.path);
-    return {std::move(value), std::nullopt, cls};
+    return {std::move(value), nullptr, cls};
 }
 
 InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path) {
@@ -148,7 +155,7 @@ void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& 
     if (body.cls) value = checked(broker.lean(), body, element, name, std::move(value));
     // The path of an instance is made of its key properties.
     const bool key = isKey(body, name);
-    if (key && !value.isNull()) body.value.path.keys.set(name, value);
+    if (key && !value.isNull()) setKey(body, name, value);
     if (key || passesFilter(body, name)) body.value.properties.set(name, std::move(value));
 }
 

@@ -1,10 +1,16 @@
 // cimom: CIM operations from the command line, with the providers loaded into this process.
 
+#include <unistd.h>
+
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <chrono>
+#include <condition_variable>
 #include <csignal>
 #include <cstdio>
 #include <map>
+#include <mutex>
+#include <thread>
 
 #include "Commands.h"
 #include "Failure.h"
@@ -37,7 +43,8 @@ const char* const kFooter =
     "back.\n"
     "Values of properties and arguments are read as the class declares them, with --schema:\n"
     "arrays as {a, b}, references as paths, embedded instances as\n"
-    "'instance of Class { name = value; }'. Without it they are guessed.\n"
+    "'instance of Class { name = value; }'. Without it they are guessed. What the class does not\n"
+    "have, or not so, is refused here, and left to the provider with --broker lean.\n"
     "\n"
     "What providers write to their standard output goes where --provider-output says, and never\n"
     "among the results.\n"
@@ -165,6 +172,46 @@ void printLine(const cimom::LogLine& line, int level) {
                  line.component.c_str(), line.text.c_str());
 }
 
+/// Tells who watches the terminal, from two seconds on, for how long the request has been working.
+class Waiting {
+public:
+    /// @param what  the request; empty for one that lasts by its nature
+    explicit Waiting(const std::string& what) {
+        if (what.empty() || isatty(STDERR_FILENO) == 0) return;
+        m_thread = std::thread([this, what] {
+            std::unique_lock<std::mutex> lock(m_mutex);
+            for (int seconds = 1;
+                 !m_over.wait_for(lock, std::chrono::seconds(1), [this] { return m_ended; });
+                 ++seconds) {
+                if (seconds > 1) std::fprintf(stderr, "\r%s: %d s", what.c_str(), seconds);
+                m_shown = seconds > 1;
+            }
+            if (m_shown) std::fputs("\r\033[K", stderr);
+        });
+    }
+    ~Waiting() { end(); }
+    Waiting(const Waiting&) = delete;
+    Waiting& operator=(const Waiting&) = delete;
+
+    /// Takes away what it shows.
+    void end() {
+        if (!m_thread.joinable()) return;
+        {
+            const std::lock_guard<std::mutex> lock(m_mutex);
+            m_ended = true;
+        }
+        m_over.notify_one();
+        m_thread.join();
+    }
+
+private:
+    std::mutex m_mutex;
+    std::condition_variable m_over;
+    bool m_ended = false;
+    bool m_shown = false;
+    std::thread m_thread;
+};
+
 int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments) {
     cimom::ResultStream out(settings.providerOutput);
     if (!settings.schema.empty())
@@ -174,12 +221,22 @@ int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments)
     if (settings.traceLevel >= 0)
         server.setLogHook(
             [level = settings.traceLevel](const cimom::LogLine& line) { printLine(line, level); });
-    cimom::Session session{server, settings.request, settings.options.classes.get(),
-                           settings.format, out};
+    const bool lean = settings.options.character == cimom::Character::Lean;
+    cimom::Session session{server,
+                           settings.request,
+                           settings.options.classes.get(),
+                           lean ? cimom::Unfit::Kept : cimom::Unfit::Refused,
+                           settings.format,
+                           out};
+    const std::string what = arguments.name.empty() ? verb.name : arguments.name;
+    Waiting waiting(verb.takes == Takes::Filter ? "" : what);
+    out.beforeFirstWrite([&] { waiting.end(); });
     try {
         const cimom::Reply reply = verb.run(session, arguments);
+        waiting.end();
         return reply.ok() ? 0 : reportFailure(reply.rc, reply.message);
     } catch (const cimom::Failure& failure) {
+        waiting.end();
         return reportFailure(failure.rc(), failure.what());
     }
 }

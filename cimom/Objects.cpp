@@ -1,150 +1,151 @@
 #include "Objects.h"
 
 #include <algorithm>
+#include <atomic>
 
 namespace cimom {
 
 namespace {
 
-// Free nodes wait in line, so that a released object's face stays as it is for a while. Threads
-// use lines of their own as far as possible.
-class NodeStore {
+// Free chunks wait in line, so that a released object's face stays as it is for a while. Threads
+// use lines of their own as far as possible. Nothing is ever destroyed: providers may release
+// objects in destructors that run at exit.
+class ChunkStore {
 public:
-    Node& take() {
-        Line& line = mine();
-        std::lock_guard<std::mutex> lock(line.mutex);
-        if (!line.first) refill(line);
-        Node& node = *line.first;
-        line.first = static_cast<Node*>(node.next);
-        if (!line.first) line.last = nullptr;
-        return node;
+    Chunk& take(std::size_t kind) {
+        Lines& lines = mine();
+        std::lock_guard<std::mutex> lock(lines.mutex);
+        Link& line = lines.ofKind[kind];
+        if (line.next == &line) return make(kind);
+        auto& chunk = static_cast<Chunk&>(*line.next);
+        chunk.remove();
+        return chunk;
     }
 
-    void give(Node& node) {
-        Line& line = mine();
-        std::lock_guard<std::mutex> lock(line.mutex);
-        node.next = nullptr;
-        append(line, node);
+    void give(Chunk& chunk) {
+        Lines& lines = mine();
+        std::lock_guard<std::mutex> lock(lines.mutex);
+        chunk.insertBefore(lines.ofKind[chunk.kind]);
     }
 
 private:
-    static constexpr std::size_t kLines = 8;
-    static constexpr std::size_t kChunk = 256;
-
-    struct alignas(64) Line {
+    struct alignas(64) Lines {
         std::mutex mutex;
-        Node* first = nullptr;
-        Node* last = nullptr;
-        std::vector<std::unique_ptr<Node[]>> chunks;
+        Link ofKind[kKindCount];
     };
 
-    Line& mine() {
-        thread_local const std::size_t index = m_nextLine.fetch_add(1) % kLines;
+    Lines& mine() {
+        thread_local const std::size_t index = m_next.fetch_add(1) % std::size(m_lines);
         return m_lines[index];
     }
 
-    static void append(Line& line, Node& node) {
-        if (line.last)
-            line.last->next = &node;
-        else
-            line.first = &node;
-        line.last = &node;
+    static Chunk& make(std::size_t kind) {
+        return withKind(
+            kind, [](auto of) -> Chunk& { return *new ChunkOf<typename decltype(of)::Face>; });
     }
 
-    static void refill(Line& line) {
-        line.chunks.push_back(std::make_unique<Node[]>(kChunk));
-        for (std::size_t i = 0; i < kChunk; ++i) append(line, line.chunks.back()[i]);
-    }
-
-    std::atomic<std::size_t> m_nextLine{0};
-    Line m_lines[kLines];
+    std::atomic<std::size_t> m_next{0};
+    Lines m_lines[8];
 };
 
-// Never destroyed: providers may release objects in destructors that run at exit.
-NodeStore& nodeStore() {
-    static NodeStore* const store = new NodeStore;
+ChunkStore& chunkStore() {
+    static ChunkStore* const store = new ChunkStore;
     return *store;
 }
 
 std::atomic<std::size_t> staleUses{0};
 
-void retire(Node& node) {
-    countLive(*node.broker, -1);
-    std::visit([](auto& face) { face.hdl = nullptr; }, node.face);
-    std::visit([](auto& body) { body.reset(); }, node.content);
-    node.pool = nullptr;
-    node.broker = nullptr;
-    nodeStore().give(node);
+template <class C>
+void retire(NodeOf<C>& node) {
+    node.face.hdl = nullptr;
+    node.body.reset();
 }
 
 }  // namespace
 
-Node& takeNode() { return nodeStore().take(); }
 std::size_t staleUseCount() { return staleUses; }
 void countStaleUse() { ++staleUses; }
 
+void Link::insertBefore(Link& other) {
+    prev = other.prev;
+    next = &other;
+    prev->next = next->prev = this;
+}
+void Link::remove() {
+    prev->next = next;
+    next->prev = prev;
+}
+
 // -- Pool -------------------------------------------------------------------------------------
 
-Pool::Pool() { m_levels.push_back(newLevel()); }
+Pool::Pool(Broker& broker) : m_broker(broker) { mark(); }
 
 // What could throw is a lock of a broken process, which then ends.
 Pool::~Pool() {  // NOLINT(bugprone-exception-escape)
-    for (const Level& each : m_levels) clear(*each);
+    for (const auto& each : m_levels) clear(*each);
 }
 
-Pool::Level Pool::newLevel() {
-    auto head = std::make_unique<Link>();
-    head->prev = head->next = head.get();
-    return head;
-}
-
-void Pool::clear(Link& head) {
+void Pool::clear(Level& level) {
     // Last in, first out: the heap takes back its end, not ten thousand holes.
-    for (Link* at = head.prev; at != &head;) {
-        Node& node = *static_cast<Node*>(at);
-        at = at->prev;
-        retire(node);
+    while (level.chunks.prev != &level.chunks) {
+        auto& chunk = static_cast<Chunk&>(*level.chunks.prev);
+        withKind(chunk.kind, [&chunk](auto of) {
+            auto& nodes = static_cast<ChunkOf<typename decltype(of)::Face>&>(chunk).nodes;
+            for (unsigned i = chunk.used; i-- > 0;)
+                if (nodes[i].body) retire(nodes[i]);
+        });
+        countLive(m_broker, -static_cast<std::ptrdiff_t>(chunk.alive));
+        giveBack(chunk);
     }
 }
 
-void Pool::adopt(Node& node) {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    Link& head = *m_levels.back();
-    node.pool = this;
-    node.prev = head.prev;
-    node.next = &head;
-    head.prev->next = &node;
-    head.prev = &node;
+void Pool::giveBack(Chunk& chunk) {
+    chunk.remove();
+    chunk.used = chunk.alive = 0;
+    chunkStore().give(chunk);
+}
+
+// The chunk of the top level that has room.
+Chunk& Pool::openChunk(std::size_t kind) {
+    Level& level = *m_levels.back();
+    Chunk*& open = level.open[kind];
+    if (!open) {
+        open = &chunkStore().take(kind);
+        open->pool = this;
+        open->insertBefore(level.chunks);
+    }
+    Chunk& chunk = *open;
+    if (chunk.used + 1 == Chunk::kNodes) open = nullptr;
+    return chunk;
 }
 
 const void* Pool::mark() {
     std::lock_guard<std::mutex> lock(m_mutex);
-    m_levels.push_back(newLevel());
+    m_levels.push_back(std::make_unique<Level>());
     return m_levels.back().get();
 }
 
 bool Pool::release(const void* level) {
-    std::vector<Level> ended;
+    std::vector<std::unique_ptr<Level>> ended;
     {
         std::lock_guard<std::mutex> lock(m_mutex);
-        const auto from = std::find_if(m_levels.begin(), m_levels.end(),
-                                       [level](const Level& l) { return l.get() == level; });
+        const auto from = std::find_if(m_levels.begin() + 1, m_levels.end(),
+                                       [level](const auto& l) { return l.get() == level; });
         if (from == m_levels.end()) return false;
         std::move(from, m_levels.end(), std::back_inserter(ended));
         m_levels.erase(from, m_levels.end());
-        if (m_levels.empty()) m_levels.push_back(newLevel());
     }
-    for (const Level& each : ended) clear(*each);
+    for (const auto& each : ended) clear(*each);
     return true;
 }
 
 void Pool::free(Node& node) {
-    {
-        std::lock_guard<std::mutex> lock(m_mutex);
-        node.prev->next = node.next;
-        node.next->prev = node.prev;
-    }
-    retire(node);
+    Chunk& chunk = *node.chunk;
+    withKind(chunk.kind,
+             [&node](auto of) { retire(static_cast<NodeOf<typename decltype(of)::Face>&>(node)); });
+    countLive(m_broker, -1);
+    std::lock_guard<std::mutex> lock(m_mutex);
+    if (--chunk.alive == 0 && chunk.used == Chunk::kNodes) giveBack(chunk);
 }
 
 // -- from C and back -------------------------------------------------------------------------
@@ -173,6 +174,30 @@ void setStatus(CMPIStatus* out, CMPIrc rc, Broker* broker, const char* text) {
 }
 
 namespace {
+
+template <class T>
+struct Number {
+    CMPIType type;
+    T CMPIValue::*member;
+};
+constexpr auto kNumbers = std::make_tuple(Number<CMPIReal32>{CMPI_real32, &CMPIValue::real32},
+                                          Number<CMPIReal64>{CMPI_real64, &CMPIValue::real64},
+                                          Number<CMPIUint8>{CMPI_uint8, &CMPIValue::uint8},
+                                          Number<CMPIUint16>{CMPI_uint16, &CMPIValue::uint16},
+                                          Number<CMPIUint32>{CMPI_uint32, &CMPIValue::uint32},
+                                          Number<CMPIUint64>{CMPI_uint64, &CMPIValue::uint64},
+                                          Number<CMPISint8>{CMPI_sint8, &CMPIValue::sint8},
+                                          Number<CMPISint16>{CMPI_sint16, &CMPIValue::sint16},
+                                          Number<CMPISint32>{CMPI_sint32, &CMPIValue::sint32},
+                                          Number<CMPISint64>{CMPI_sint64, &CMPIValue::sint64});
+
+// Calls @p f with the member of CMPIValue that holds numbers of a type; false for other types.
+template <class F>
+bool withNumber(CMPIType type, F f) {
+    return std::apply(
+        [&](const auto&... row) { return ((row.type == type && (f(row.member), true)) || ...); },
+        kNumbers);
+}
 
 Value readArray(const CMPIArray* array, CMPIType type) {
     if (!array) return Value::null(type);
@@ -213,38 +238,13 @@ CMPIType stringFor(CMPIType type) {
 Value readValue(const CMPIValue* value, CMPIType type) {
     if (!value) return Value::null(stringFor(type));
     if (type & CMPI_ARRAY) return readArray(value->array, stringFor(type));
-    switch (type) {
-        case CMPI_null:
-            return Value();
-        case CMPI_boolean:
-            return Value(value->boolean != 0);
-        case CMPI_char16:
-            return Value::char16(value->char16);
-        case CMPI_real32:
-            return Value(value->real32);
-        case CMPI_real64:
-            return Value(value->real64);
-        case CMPI_uint8:
-            return Value(value->uint8);
-        case CMPI_uint16:
-            return Value(value->uint16);
-        case CMPI_uint32:
-            return Value(value->uint32);
-        case CMPI_uint64:
-            return Value(value->uint64);
-        case CMPI_sint8:
-            return Value(value->sint8);
-        case CMPI_sint16:
-            return Value(value->sint16);
-        case CMPI_sint32:
-            return Value(value->sint32);
-        case CMPI_sint64:
-            return Value(value->sint64);
-        case CMPI_chars:
-            return Value(reinterpret_cast<const char*>(value));
-        default:
-            return readObject(*value, type);
-    }
+    if (type == CMPI_null) return Value();
+    if (type == CMPI_boolean) return Value(value->boolean != 0);
+    if (type == CMPI_char16) return Value::char16(value->char16);
+    if (type == CMPI_chars) return Value(reinterpret_cast<const char*>(value));
+    Value number;
+    if (withNumber(type, [&](auto member) { number = Value(value->*member); })) return number;
+    return readObject(*value, type);
 }
 
 Value readData(const CMPIData& data) {
@@ -257,44 +257,17 @@ namespace {
 
 CMPIValue makeNumber(const Value& value) {
     CMPIValue out{};
-    switch (value.type()) {
-        case CMPI_boolean:
-            out.boolean = value.boolean() ? 1 : 0;
-            break;
-        case CMPI_real32:
-            out.real32 = static_cast<CMPIReal32>(value.real());
-            break;
-        case CMPI_real64:
-            out.real64 = value.real();
-            break;
-        case CMPI_char16:
-            out.char16 = static_cast<CMPIChar16>(value.uint());
-            break;
-        case CMPI_uint8:
-            out.uint8 = static_cast<CMPIUint8>(value.uint());
-            break;
-        case CMPI_uint16:
-            out.uint16 = static_cast<CMPIUint16>(value.uint());
-            break;
-        case CMPI_uint32:
-            out.uint32 = static_cast<CMPIUint32>(value.uint());
-            break;
-        case CMPI_uint64:
-            out.uint64 = value.uint();
-            break;
-        case CMPI_sint8:
-            out.sint8 = static_cast<CMPISint8>(value.sint());
-            break;
-        case CMPI_sint16:
-            out.sint16 = static_cast<CMPISint16>(value.sint());
-            break;
-        case CMPI_sint32:
-            out.sint32 = static_cast<CMPISint32>(value.sint());
-            break;
-        default:
-            out.sint64 = value.sint();
-            break;
-    }
+    if (value.type() == CMPI_boolean) out.boolean = value.boolean() ? 1 : 0;
+    if (value.type() == CMPI_char16) out.char16 = static_cast<CMPIChar16>(value.uint());
+    withNumber(value.type(), [&](auto member) {
+        using Number = std::decay_t<decltype(out.*member)>;
+        if constexpr (std::is_floating_point_v<Number>)
+            out.*member = static_cast<Number>(value.real());
+        else if constexpr (std::is_signed_v<Number>)
+            out.*member = static_cast<Number>(value.sint());
+        else
+            out.*member = static_cast<Number>(value.uint());
+    });
     return out;
 }
 

@@ -5,23 +5,22 @@
 /// during a request are owned by the request's pool and freed with it; clones, and objects made
 /// on threads without a request, are owned by the broker's stray pool until they are released.
 ///
-/// The memory of nodes is reused for nodes and never given back. A released object's face stays
-/// readable with a null hdl, so that its use is answered with CMPI_RC_ERR_INVALID_HANDLE and
-/// counted, instead of corrupting the heap.
+/// The memory of nodes is reused for nodes of their kind and never given back. A released object's
+/// face stays readable with a null hdl, so that its use is answered with CMPI_RC_ERR_INVALID_HANDLE
+/// and counted, instead of corrupting the heap.
 ///
 /// Thread-safety: objects may be made and released on any thread; one object must not be used
 /// by two threads at a time while it changes.
 #ifndef CIMOM_OBJECTS_H
 #define CIMOM_OBJECTS_H
 
-#include <atomic>
 #include <cstddef>
 #include <memory>
 #include <mutex>
 #include <optional>
 #include <string>
 #include <tuple>
-#include <variant>
+#include <type_traits>
 #include <vector>
 
 #include "Failure.h"
@@ -48,8 +47,8 @@ struct StringBody {
 };
 struct InstanceBody {
     Instance value;
-    std::optional<std::vector<std::string>> filter;  ///< set by setPropertyFilter
-    const CimClass* cls = nullptr;                   ///< null when the class is not known
+    std::shared_ptr<const std::vector<std::string>> filter;  ///< set by setPropertyFilter, or null
+    const CimClass* cls = nullptr;                           ///< null when the class is not known
 };
 struct ArrayBody {
     CMPIType elementType = CMPI_null;
@@ -94,42 +93,81 @@ using TableOf = std::remove_pointer_t<decltype(C::ft)>;
 
 // -- nodes -----------------------------------------------------------------------------------
 
-struct Link {
-    Link* prev = nullptr;
-    Link* next = nullptr;
-};
-
-namespace detail {
-template <class>
-struct NodeParts;
-template <class... K>
-struct NodeParts<std::tuple<K...>> {
-    using Face = std::variant<typename K::Face...>;
-    using Content = std::variant<std::unique_ptr<typename K::Body>...>;
-    using Tables = std::tuple<TableOf<typename K::Face>...>;
-};
-}  // namespace detail
-
 /// The function tables of the object kinds.
-using ObjectTables = detail::NodeParts<Kinds>::Tables;
-
-struct Node : Link {
-    detail::NodeParts<Kinds>::Face face;
-    detail::NodeParts<Kinds>::Content content;
-    Broker* broker = nullptr;
-    Pool* pool = nullptr;
+template <class>
+struct TablesOf;
+template <class... K>
+struct TablesOf<std::tuple<K...>> {
+    using Type = std::tuple<TableOf<typename K::Face>...>;
 };
+using ObjectTables = TablesOf<Kinds>::Type;
+
+/// A place in a ring; the head of the ring is one too.
+struct Link {
+    Link* prev = this;
+    Link* next = this;
+
+    void insertBefore(Link& other);
+    void remove();
+};
+
+/// Nodes of one kind that lie together. A chunk belongs to one pool at a time, or is free.
+struct Chunk : Link {
+    static constexpr unsigned kNodes = 32;
+
+    explicit Chunk(std::size_t ofKind) : kind(ofKind) {}
+
+    const std::size_t kind;  ///< position in Kinds
+    Pool* pool = nullptr;
+    unsigned used = 0;   ///< nodes that have been handed out, the first ones
+    unsigned alive = 0;  ///< of these, the ones that have not been released
+};
+
+struct Node {
+    Chunk* chunk = nullptr;
+};
+
+template <class C>
+struct NodeOf : Node {
+    C face{};
+    std::optional<BodyOf<C>> body;  ///< none when released
+};
+
+template <class C>
+struct ChunkOf : Chunk {
+    ChunkOf() : Chunk(kindOf<C>()) {
+        for (Node& node : nodes) node.chunk = this;
+    }
+    NodeOf<C> nodes[kNodes];
+};
+
+/// Calls @p f with the Kind at a position in Kinds.
+template <std::size_t I = 0, class F>
+decltype(auto) withKind(std::size_t kind, F f) {
+    if constexpr (I + 1 < kKindCount)
+        if (kind != I) return withKind<I + 1>(kind, f);
+    return f(std::tuple_element_t<I, Kinds>());
+}
 
 /// Owns nodes in levels, as mark and release stack them; the lowest level lasts as long as
 /// the pool.
 class Pool {
 public:
-    Pool();
+    explicit Pool(Broker& broker);
     ~Pool();  // NOLINT(bugprone-exception-escape)
     Pool(const Pool&) = delete;
     Pool& operator=(const Pool&) = delete;
 
-    void adopt(Node& node);
+    Broker& broker() const { return m_broker; }
+
+    /// Takes a node, whose body the caller makes; it belongs to the level that is on top now.
+    template <class C>
+    NodeOf<C>& take() {
+        std::lock_guard<std::mutex> lock(m_mutex);
+        Chunk& chunk = openChunk(kindOf<C>());
+        ++chunk.alive;
+        return static_cast<ChunkOf<C>&>(chunk).nodes[chunk.used++];
+    }
     /// Opens a level; the result names it.
     const void* mark();
     /// Frees the level of that name and those above it; false when there is none.
@@ -138,16 +176,20 @@ public:
     void free(Node& node);
 
 private:
-    using Level = std::unique_ptr<Link>;  // head of a ring of nodes
-    static Level newLevel();
-    static void clear(Link& head);
+    struct Level {
+        Link chunks;  // head of the ring
+        Chunk* open[kKindCount] = {};
+    };
 
+    Chunk& openChunk(std::size_t kind);
+    void clear(Level& level);
+    static void giveBack(Chunk& chunk);
+
+    Broker& m_broker;
     std::mutex m_mutex;
-    std::vector<Level> m_levels;
+    std::vector<std::unique_ptr<Level>> m_levels;
 };
 
-/// Takes a node from the process's store of nodes; Pool gives it back.
-Node& takeNode();
 /// Uses of released objects in this process so far.
 std::size_t staleUseCount();
 void countStaleUse();
@@ -161,45 +203,37 @@ void countLive(Broker& broker, std::ptrdiff_t by);
 // -- making and using objects -----------------------------------------------------------------
 
 template <class C>
-C* makeIn(Pool& pool, Broker& broker, BodyOf<C> body) {
-    auto content = std::make_unique<BodyOf<C>>(std::move(body));
-    Node& node = takeNode();
-    node.broker = &broker;
-    node.content.emplace<kindOf<C>()>(std::move(content));
-    C& face = node.face.emplace<kindOf<C>()>();
-    face.hdl = &node;
-    face.ft = &std::get<TableOf<C>>(objectTables(broker));
-    countLive(broker, 1);
-    pool.adopt(node);
-    return &face;
+C* makeIn(Pool& pool, BodyOf<C> body) {
+    NodeOf<C>& node = pool.take<C>();
+    node.body.emplace(std::move(body));
+    node.face.hdl = &node;
+    node.face.ft = &std::get<TableOf<C>>(objectTables(pool.broker()));
+    countLive(pool.broker(), 1);
+    return &node.face;
 }
 
 /// A new object that belongs to the request of this thread.
 template <class C>
 C* make(Broker& broker, BodyOf<C> body) {
-    return makeIn<C>(currentPool(broker), broker, std::move(body));
+    return makeIn<C>(currentPool(broker), std::move(body));
 }
 
 /// The node of an object. @throws Failure CMPI_RC_ERR_INVALID_HANDLE for null, released or alien
 template <class C>
-Node& nodeOf(const C* object) {
+NodeOf<C>& nodeOf(const C* object) {
     if (!object) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "null object");
     if (!object->hdl) {
         countStaleUse();
         throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "released object");
     }
     Node& node = *static_cast<Node*>(object->hdl);
-    if (node.content.index() != kindOf<C>())
+    if (node.chunk->kind != kindOf<C>())
         throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "object of another kind");
-    return node;
+    return static_cast<NodeOf<C>&>(node);
 }
 template <class C>
 BodyOf<C>& bodyOf(const C* object) {
-    return *std::get<kindOf<C>()>(nodeOf(object).content);
-}
-template <class C>
-Broker& brokerOf(const C* object) {
-    return *nodeOf(object).broker;
+    return *nodeOf(object).body;
 }
 
 // -- from C and back -----------------------------------------------------------------------------
@@ -244,8 +278,12 @@ auto entry(CMPIStatus* rc, Broker* broker, F body) -> decltype(body()) {
 /// The same for entries on an object that answer a value.
 template <class C, class F>
 auto objectEntry(const C* object, CMPIStatus* rc, F body) {
-    Broker* broker = object && object->hdl ? static_cast<Node*>(object->hdl)->broker : nullptr;
-    return entry(rc, broker, [&] { return body(bodyOf(object), brokerOf(object)); });
+    Broker* broker =
+        object && object->hdl ? &static_cast<Node*>(object->hdl)->chunk->pool->broker() : nullptr;
+    return entry(rc, broker, [&] {
+        auto& content = bodyOf(object);
+        return body(content, *broker);
+    });
 }
 
 /// The same for entries on an object that answer a status alone.
@@ -262,14 +300,14 @@ CMPIStatus releaseObject(C* object) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
     entry(&status, nullptr, [&] {
         Node& node = nodeOf(object);
-        node.pool->free(node);
+        node.chunk->pool->free(node);
     });
     return status;
 }
 template <class C>
 C* cloneObject(const C* object, CMPIStatus* rc) {
     return objectEntry(object, rc, [](const BodyOf<C>& body, Broker& broker) {
-        return makeIn<C>(strayPool(broker), broker, body);
+        return makeIn<C>(strayPool(broker), body);
     });
 }
 

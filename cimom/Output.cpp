@@ -7,6 +7,7 @@
 #include <cstring>
 #include <nlohmann/json.hpp>
 #include <stdexcept>
+#include <utility>
 
 #include "PathText.h"
 
@@ -34,6 +35,7 @@ ResultStream::ResultStream(const std::string& providerOutput)
 ResultStream::~ResultStream() { close(m_descriptor); }
 
 bool ResultStream::write(const std::string& text) {
+    if (m_hook) std::exchange(m_hook, nullptr)();
     for (std::size_t done = 0; done < text.size();) {
         const ssize_t count = ::write(m_descriptor, text.data() + done, text.size() - done);
         if (count < 0 && errno != EINTR) return false;
@@ -103,24 +105,24 @@ std::string dump(const Json& json, int indent = 2) {
     return json.dump(indent, ' ', false, Json::error_handler_t::replace) + "\n";
 }
 
-template <class T>
-std::string renderAll(const std::vector<T>& items, Format format) {
+template <class List>
+std::string renderAll(const List& items, Format format) {
     if (format == Format::Json) {
         Json array = Json::array();
-        for (const T& item : items) array.push_back(toJson(item));
+        for (const auto& item : items) array.push_back(toJson(item));
         return dump(array);
     }
     std::string out;
-    for (const T& item : items) out += toText(item);
+    for (const auto& item : items) out += toText(item);
     return out;
 }
 
 }  // namespace
 
-std::string render(const std::vector<Instance>& instances, Format format) {
+std::string render(const std::deque<Instance>& instances, Format format) {
     return renderAll(instances, format);
 }
-std::string render(const std::vector<ObjectPath>& paths, Format format) {
+std::string render(const std::deque<ObjectPath>& paths, Format format) {
     return renderAll(paths, format);
 }
 std::string render(const std::vector<std::string>& names, Format format) {

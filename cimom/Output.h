@@ -2,6 +2,8 @@
 #ifndef CIMOM_OUTPUT_H
 #define CIMOM_OUTPUT_H
 
+#include <deque>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -23,19 +25,23 @@ public:
     ResultStream(const ResultStream&) = delete;
     ResultStream& operator=(const ResultStream&) = delete;
 
+    /// Has @p hook called once, before anything is written.
+    void beforeFirstWrite(std::function<void()> hook) { m_hook = std::move(hook); }
+
     /// @return false when the reader has gone
     bool write(const std::string& text);
 
 private:
     int m_descriptor;
+    std::function<void()> m_hook;
 };
 
 enum class Format { Text, Json };
 
 /// The parts of a reply as text that ends with a newline; empty for an empty list of texts.
 /// In JSON, instances are {path, class, properties}, and paths are their texts.
-std::string render(const std::vector<Instance>& instances, Format format);
-std::string render(const std::vector<ObjectPath>& paths, Format format);
+std::string render(const std::deque<Instance>& instances, Format format);
+std::string render(const std::deque<ObjectPath>& paths, Format format);
 /// The return value and the output arguments of a method.
 std::string renderMethod(const Reply& reply, Format format);
 std::string render(const Value& value, Format format);

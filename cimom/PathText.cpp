@@ -301,7 +301,7 @@ void appendProperties(std::string& out, const Instance& instance, const std::str
 }
 
 // A value as it is declared, from what could be read without knowing.
-Value declaredValue(const Value& value, CMPIType type, const std::string& what) {
+Value convertedValue(const Value& value, CMPIType type, const std::string& what) {
     Value typed;
     if (value.convertTo(type, typed)) return typed;
     if (value.type() == CMPI_string) return parseValue(value.text(), type);
@@ -309,26 +309,38 @@ Value declaredValue(const Value& value, CMPIType type, const std::string& what) 
         const auto elementType = static_cast<CMPIType>(type & ~CMPI_ARRAY);
         Value::Array elements;
         for (const Value& element : value.elements())
-            elements.push_back(declaredValue(element, elementType, what));
+            elements.push_back(convertedValue(element, elementType, what));
         return Value::array(elementType, std::move(elements));
     }
     throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, what + " is of type " + typeName(type));
 }
+Value declaredValue(const Value& value, CMPIType type, const std::string& what, Unfit unfit) {
+    try {
+        return convertedValue(value, type, what);
+    } catch (const Failure&) {
+        if (unfit == Unfit::Refused) throw;
+        return value;
+    }
+}
 
-Instance typedInstance(Instance instance, const ClassRepository* classes) {
+Instance typedInstance(Instance instance, const ClassRepository* classes, Unfit unfit) {
     const CimClass* cls = classes ? classes->findClass(instance.path.className) : nullptr;
     if (!cls) return instance;
     NamedValues typed;
     for (const auto& [name, value] : instance.properties) {
         const CimProperty* property = cls->properties.find(name);
-        if (!property)
+        if (!property && unfit == Unfit::Refused)
             throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
                           "class " + cls->name + " has no property " + name);
         Value own = value;
         if (!own.isNull() && own.type() == CMPI_instance)
-            own = Value(typedInstance(own.instance(), classes));
-        typed.set(property->name,
-                  declaredValue(own, typeOf(*property), "property " + cls->name + "." + name));
+            own = Value(typedInstance(own.instance(), classes, unfit));
+        if (!property) {
+            typed.set(name, std::move(own));
+            continue;
+        }
+        typed.set(property->name, declaredValue(own, typeOf(*property),
+                                                "property " + cls->name + "." + name, unfit));
         if (property->isKey) instance.path.keys.set(property->name, *typed.find(name));
     }
     instance.properties = std::move(typed);
@@ -346,7 +358,8 @@ Instance wholeInstance(const std::string& text) {
     return instance;
 }
 
-Value parseArray(const std::string& text, CMPIType elementType, const ClassRepository* classes) {
+Value parseArray(const std::string& text, CMPIType elementType, const ClassRepository* classes,
+                 Unfit unfit) {
     Scanner scanner(text);
     Value::Array elements;
     scanner.skipBlanks();
@@ -355,7 +368,7 @@ Value parseArray(const std::string& text, CMPIType elementType, const ClassRepos
     const char* const stops = braces ? ",}" : ",";
     while (!scanner.atEnd() && scanner.peek() != '}') {
         if (elementType == CMPI_instance)
-            elements.emplace_back(typedInstance(scanner.instance(), classes));
+            elements.emplace_back(typedInstance(scanner.instance(), classes, unfit));
         else if (scanner.peek() == '"')
             elements.push_back(parseValue(scanner.quotedText(), elementType));
         else
@@ -440,9 +453,12 @@ std::string plainText(const Value& value) {
     return printValue(value);
 }
 
-Value parseValue(const std::string& text, CMPIType type, const ClassRepository* classes) {
+namespace {
+
+Value parseDeclared(const std::string& text, CMPIType type, const ClassRepository* classes,
+                    Unfit unfit) {
     if (type & CMPI_ARRAY)
-        return parseArray(text, static_cast<CMPIType>(type & ~CMPI_ARRAY), classes);
+        return parseArray(text, static_cast<CMPIType>(type & ~CMPI_ARRAY), classes, unfit);
     Value result;
     switch (type) {
         case CMPI_string:
@@ -460,12 +476,24 @@ Value parseValue(const std::string& text, CMPIType type, const ClassRepository* 
             if (!Value(text).convertTo(type, result)) mismatch(text, type);
             return result;
         case CMPI_ref:
-            return Value(classes ? typedKeys(parsePath(text), *classes) : parsePath(text));
+            return Value(classes ? typedKeys(parsePath(text), *classes, unfit) : parsePath(text));
         case CMPI_instance:
-            return Value(typedInstance(wholeInstance(text), classes));
+            return Value(typedInstance(wholeInstance(text), classes, unfit));
         default:
             if (!parseNumber(text, type, result)) mismatch(text, type);
             return result;
+    }
+}
+
+}  // namespace
+
+Value parseValue(const std::string& text, CMPIType type, const ClassRepository* classes,
+                 Unfit unfit) {
+    try {
+        return parseDeclared(text, type, classes, unfit);
+    } catch (const Failure&) {
+        if (unfit == Unfit::Refused) throw;
+        return guessValue(text);
     }
 }
 
@@ -483,15 +511,16 @@ std::string printInstance(const Instance& instance) {
     return "// " + printPath(instance.path) + "\n" + instanceText(instance, {}) + ";\n";
 }
 
-ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes) {
+ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes, Unfit unfit) {
     const CimClass* cls = classes.findClass(path.className);
     if (!cls) return path;
     ObjectPath typed = path;
     for (const auto& [name, value] : path.keys) {
         const CimProperty* property = cls->properties.find(name);
         if (!property || value.isNull()) continue;
-        Value key = declaredValue(value, typeOf(*property), "key " + name + " of " + cls->name);
-        if (key.type() == CMPI_ref) key = Value(typedKeys(key.reference(), classes));
+        Value key =
+            declaredValue(value, typeOf(*property), "key " + name + " of " + cls->name, unfit);
+        if (key.type() == CMPI_ref) key = Value(typedKeys(key.reference(), classes, unfit));
         typed.keys.set(name, std::move(key));
     }
     return typed;

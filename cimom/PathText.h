@@ -15,6 +15,10 @@
 
 namespace cimom {
 
+/// What becomes of a value that is not of its declared type, and in an instance of a property that
+/// its class does not have: refused, or kept as it could be read, for the provider to judge.
+enum class Unfit { Refused, Kept };
+
 std::string printPath(const ObjectPath& path);
 /// @throws Failure CMPI_RC_ERR_INVALID_PARAMETER with the place of the mistake
 ObjectPath parsePath(const std::string& text);
@@ -27,7 +31,8 @@ std::string plainText(const Value& value);
 /// references; a string is taken as it stands; {a, b} or a,b for arrays; for an instance
 /// `instance of Class { name = value; ... }`, its values typed by its class where that is known.
 /// @throws Failure CMPI_RC_ERR_TYPE_MISMATCH when the text is no such value
-Value parseValue(const std::string& text, CMPIType type, const ClassRepository* classes = nullptr);
+Value parseValue(const std::string& text, CMPIType type, const ClassRepository* classes = nullptr,
+                 Unfit unfit = Unfit::Refused);
 /// Reads a text whose type nobody knows: whatever printValue could have printed, else a string.
 Value guessValue(const std::string& text);
 
@@ -41,7 +46,8 @@ bool isValueType(CMPIType type);
 /// The path with its keys as its class declares them, and so the paths in its keys; a path of
 /// an unknown class stays as it is.
 /// @throws Failure CMPI_RC_ERR_INVALID_PARAMETER for a key that is not of its type
-ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes);
+ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes,
+                     Unfit unfit = Unfit::Refused);
 
 }  // namespace cimom
 

@@ -19,6 +19,7 @@
 #ifndef CIMOM_SERVER_H
 #define CIMOM_SERVER_H
 
+#include <deque>
 #include <functional>
 #include <memory>
 #include <mutex>
@@ -76,8 +77,8 @@ struct Request {
 struct Reply {
     CMPIrc rc = CMPI_RC_OK;
     std::string message;
-    std::vector<Instance> instances;
-    std::vector<ObjectPath> paths;
+    std::deque<Instance> instances;  ///< not a vector: they need not move as they come
+    std::deque<ObjectPath> paths;
     /// Values returned by returnData: a property, the return value of a method.
     std::vector<Value> values;
     /// Arguments that a method gave back.

@@ -154,9 +154,12 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
 }
 
 /// Puts the elements of one list behind those of another.
-template <class T>
-void append(std::vector<T>& all, std::vector<T>& more) {
-    std::move(more.begin(), more.end(), std::back_inserter(all));
+template <class List>
+void append(List& all, List& more) {
+    if (all.empty())
+        all.swap(more);
+    else
+        std::move(more.begin(), more.end(), std::back_inserter(all));
 }
 
 template <class MI, class Body>

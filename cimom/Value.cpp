@@ -9,6 +9,8 @@
 #include <cstdlib>
 #include <ctime>
 #include <limits>
+#include <new>
+#include <stdexcept>
 
 namespace cimom {
 
@@ -188,12 +190,12 @@ Value Value::array(CMPIType elementType, Array elements) {
 Value::Value(const char* text) : m_type(CMPI_string) {
     if (text) m_data = std::string(text);
 }
-Value::Value(std::string text) : m_type(CMPI_string), m_data(std::move(text)) {}
-Value::Value(DateTime when) : m_type(CMPI_dateTime), m_data(std::move(when)) {}
+Value::Value(std::string text) : m_data(std::move(text)), m_type(CMPI_string) {}
+Value::Value(DateTime when) : m_data(std::move(when)), m_type(CMPI_dateTime) {}
 Value::Value(const ObjectPath& path)
-    : m_type(CMPI_ref), m_data(std::make_shared<const ObjectPath>(path)) {}
+    : m_data(std::make_shared<const ObjectPath>(path)), m_type(CMPI_ref) {}
 Value::Value(const Instance& embedded)
-    : m_type(CMPI_instance), m_data(std::make_shared<const Instance>(embedded)) {}
+    : m_data(std::make_shared<const Instance>(embedded)), m_type(CMPI_instance) {}
 
 void Value::retypeNull(CMPIType type) {
     if (isNull()) m_type = type;
@@ -267,30 +269,62 @@ NamedValues::NamedValues(std::initializer_list<Entry> entries) {
     for (const Entry& entry : entries) set(entry.name, entry.value);
 }
 
-void NamedValues::set(const std::string& name, Value value) {
-    if (const Value* present = find(name))
-        *const_cast<Value*>(present) = std::move(value);
+NamedValues::NamedValues(const NamedValues& other) : m_block(other.m_block) {
+    if (m_block) m_block->users.fetch_add(1, std::memory_order_relaxed);
+}
+
+NamedValues::~NamedValues() {
+    if (!m_block || m_block->users.fetch_sub(1, std::memory_order_acq_rel) != 1) return;
+    std::destroy_n(m_block->entries(), m_block->size);
+    ::operator delete(m_block);
+}
+
+// Makes sure that nobody else has the block and that so many entries fit.
+void NamedValues::makeOwn(std::size_t room) {
+    const bool own = m_block && m_block->users.load(std::memory_order_acquire) == 1;
+    if (own && room <= m_block->room) return;
+    if (room > size()) room *= 2;
+    NamedValues other;
+    other.m_block = new (::operator new(sizeof(Block) + room * sizeof(Entry))) Block;
+    other.m_block->room = static_cast<std::uint32_t>(room);
+    Entry* const entries = other.m_block->entries();
+    if (own)
+        std::uninitialized_move_n(m_block->entries(), size(), entries);
     else
-        m_entries.push_back({name, std::move(value)});
+        std::uninitialized_copy_n(begin(), size(), entries);
+    other.m_block->size = static_cast<std::uint32_t>(size());
+    std::swap(m_block, other.m_block);
+}
+
+void NamedValues::set(const std::string& name, Value value) {
+    const std::size_t at = indexOf(name);
+    makeOwn(std::max(size(), at + 1));
+    if (at == size())
+        new (m_block->entries() + m_block->size++) Entry{name, std::move(value)};
+    else
+        m_block->entries()[at].value = std::move(value);
 }
 
 const Value* NamedValues::find(const std::string& name) const {
-    for (const Entry& entry : m_entries)
-        if (sameName(entry.name, name)) return &entry.value;
-    return nullptr;
+    const std::size_t at = indexOf(name);
+    return at == size() ? nullptr : &begin()[at].value;
 }
 
-bool NamedValues::erase(const std::string& name) {
-    const auto at = std::find_if(m_entries.begin(), m_entries.end(),
-                                 [&](const Entry& entry) { return sameName(entry.name, name); });
-    if (at == m_entries.end()) return false;
-    m_entries.erase(at);
-    return true;
+// The number of entries when there is none of that name.
+std::size_t NamedValues::indexOf(const std::string& name) const {
+    return static_cast<std::size_t>(
+        std::find_if(begin(), end(),
+                     [&](const Entry& entry) { return sameName(entry.name, name); }) -
+        begin());
+}
+
+const NamedValues::Entry& NamedValues::at(std::size_t index) const {
+    if (index >= size()) throw std::out_of_range("NamedValues::at");
+    return begin()[index];
 }
 
 bool NamedValues::operator==(const NamedValues& other) const {
-    return size() == other.size() &&
-           std::all_of(m_entries.begin(), m_entries.end(), [&other](const Entry& entry) {
+    return size() == other.size() && std::all_of(begin(), end(), [&other](const Entry& entry) {
                const Value* twin = other.find(entry.name);
                return twin && *twin == entry.value;
            });

@@ -2,11 +2,13 @@
 ///
 /// One model for the whole object manager. The C objects that a provider sees (CMPIInstance,
 /// CMPIObjectPath, ...) are handles on these; what a Server answers is made of these.
-/// All types are plain values: copying copies, nothing is shared that can change.
+/// All types are plain values: a change to one is seen in no copy of it.
 /// Thread-safety: that of standard containers.
 #ifndef CIMOM_VALUE_H
 #define CIMOM_VALUE_H
 
+#include <atomic>
+#include <cstddef>
 #include <cstdint>
 #include <memory>
 #include <string>
@@ -124,10 +126,12 @@ private:
         return bySize[width + (std::is_signed_v<T> ? 4 : 0)];
     }
 
-    CMPIType m_type = CMPI_null;
-    std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, std::string, DateTime,
-                 PathPtr, InstancePtr, CMPIValuePtr, Array>
+    // The type finds room in what the variant leaves free at its end.
+    [[no_unique_address]] std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double,
+                                       std::string, DateTime, PathPtr, InstancePtr, CMPIValuePtr,
+                                       Array>
         m_data;
+    CMPIType m_type = CMPI_null;
 };
 
 /// Values by name, in the order in which they came; names differ by more than case.
@@ -142,25 +146,42 @@ public:
 
     NamedValues() = default;
     NamedValues(std::initializer_list<Entry> entries);
+    NamedValues(const NamedValues& other);
+    NamedValues(NamedValues&& other) noexcept : m_block(std::exchange(other.m_block, nullptr)) {}
+    NamedValues& operator=(NamedValues other) noexcept {
+        std::swap(m_block, other.m_block);
+        return *this;
+    }
+    ~NamedValues();
 
     /// Replaces the value of that name, or appends.
     void set(const std::string& name, Value value);
     /// @return null when there is none; valid until the next change
     const Value* find(const std::string& name) const;
-    /// @return false when there was none
-    bool erase(const std::string& name);
 
-    std::size_t size() const { return m_entries.size(); }
-    bool empty() const { return m_entries.empty(); }
-    const Entry& at(std::size_t index) const { return m_entries.at(index); }
-    auto begin() const { return m_entries.begin(); }
-    auto end() const { return m_entries.end(); }
+    std::size_t size() const { return m_block ? m_block->size : 0; }
+    bool empty() const { return size() == 0; }
+    const Entry& at(std::size_t index) const;
+    const Entry* begin() const { return m_block ? m_block->entries() : nullptr; }
+    const Entry* end() const { return begin() + size(); }
 
     /// Same names and values, in any order.
     bool operator==(const NamedValues& other) const;
 
 private:
-    std::vector<Entry> m_entries;
+    // Copies share a block until one of them changes, for what a provider made and what the
+    // client is answered are mostly the same. The entries lie behind the head of the block.
+    struct alignas(Entry) Block {
+        Entry* entries() { return reinterpret_cast<Entry*>(this + 1); }
+
+        std::atomic<std::uint32_t> users{1};
+        std::uint32_t size = 0;
+        std::uint32_t room = 0;
+    };
+    void makeOwn(std::size_t room);
+    std::size_t indexOf(const std::string& name) const;
+
+    Block* m_block = nullptr;
 };
 
 /// The name of a class or, with keys, of an instance.

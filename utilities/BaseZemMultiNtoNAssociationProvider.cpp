@@ -1,6 +1,5 @@
 #include "BaseZemMultiNtoNAssociationProvider.h"
 
-#include <algorithm>
 #include <memory>
 
 #include "AssociationDataPrepareUtils.h"
@@ -29,6 +28,27 @@ CmpiObjectPath classPathOf(const CmpiObjectPath& cop, const zemMultiNtoNAssociat
     return zemBaseProvider::createObjectPath(cop, zemNameSpaceOr(side.m_nameSpace, cop),
                                              side.m_className);
 }
+
+/// Makes paths like that of a request, for as many associations as there are, reading it once.
+class PathsLike {
+public:
+    explicit PathsLike(const CmpiObjectPath& cop)
+        : m_className(zemClassOf(cop)),
+          m_nameSpace(zemTextOf(cop.getNameSpace())),
+          m_host(zemTextOf(cop.getHostname())) {}
+
+    CmpiObjectPath make() const {
+        CmpiObjectPath path(static_cast<const char*>(m_nameSpace), m_className);
+        if (!m_host.isEmpty()) path.setHostname(static_cast<const char*>(m_host));
+        return path;
+    }
+    const zemString& className() const { return m_className; }
+
+private:
+    const zemString m_className;
+    const zemString m_nameSpace;
+    const zemString m_host;
+};
 
 }  // namespace
 
@@ -139,11 +159,11 @@ void zemProviderPairAssociation<Provider>::setValidAssociationKeys(const CmpiObj
                                                                    const Paths& rights,
                                                                    const IndexPairs& pairs,
                                                                    Paths& out) {
-    const zemString className = zemClassOf(cop);
+    const PathsLike request(cop);
     for (int i = 0; i < pairs.size(); ++i) {
-        auto ncop = std::make_unique<CmpiObjectPath>(createObjectPath(cop));
+        auto ncop = std::make_unique<CmpiObjectPath>(request.make());
         self().addKeys(*ncop, *lefts[pairs[i]->m_copsIndex1], *rights[pairs[i]->m_copsIndex2],
-                       className);
+                       request.className());
         out.addElement(ncop.release());
     }
 }
@@ -152,14 +172,14 @@ template <class Provider>
 void zemProviderPairAssociation<Provider>::setValidAssociationProperties(
     const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights, const IndexPairs& pairs,
     const char** properties, void* addInfo, zemDynamicArray<CmpiInstance>& out) {
-    const zemString className = zemClassOf(cop);
+    const PathsLike request(cop);
     for (int i = 0; i < pairs.size(); ++i) {
         const CmpiObjectPath& left = *lefts[pairs[i]->m_copsIndex1];
         const CmpiObjectPath& right = *rights[pairs[i]->m_copsIndex2];
-        CmpiObjectPath ncop = createObjectPath(cop);
-        self().addKeys(ncop, left, right, className);
+        CmpiObjectPath ncop = request.make();
+        self().addKeys(ncop, left, right, request.className());
         auto instance = std::make_unique<CmpiInstance>(ncop);
-        self().complete(*instance, left, right, properties, className, addInfo);
+        self().complete(*instance, left, right, properties, request.className(), addInfo);
         out.addElement(instance.release());
     }
 }
@@ -579,8 +599,7 @@ zemEnhanceBaseZemMultiNtoNAssociationProvider::findValidAssociationCopMappingPai
 
 zemEnhanceBaseZemMultiNtoNAssociationProvider::PathsByKey
 zemEnhanceBaseZemMultiNtoNAssociationProvider::getObjectPathHashRes(const Paths& rightCops) {
-    // as many chains as objects: with a few, looking up every left object would be quadratic
-    PathsByKey hash(static_cast<unsigned>(std::max(rightCops.size(), 8)));
+    PathsByKey hash(rightCops.size());
     for (int j = 0; j < rightCops.size(); ++j)
         hash.insert(getObjectPathHashKeyString(*rightCops[j], false), j);
     return hash;

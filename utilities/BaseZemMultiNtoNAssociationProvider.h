@@ -39,8 +39,11 @@
 #ifndef BASE_ZEM_MULTI_NTON_ASSOCIATION_PROVIDER_H
 #define BASE_ZEM_MULTI_NTON_ASSOCIATION_PROVIDER_H
 
+#include <cstddef>
 #include <functional>
 #include <set>
+#include <string_view>
+#include <vector>
 
 #include "AssociationOperations.h"
 #include "BaseZemInstanceProvider.h"
@@ -267,7 +270,25 @@ public:
     virtual zemString getObjectPathHashKeyString(const CmpiObjectPath& cop, bool isLeft);
 
 protected:
-    using PathsByKey = zemMultiHashTable<zemString, int, assoHashFunc>;
+    /// Positions of objects by key. The hash of the tables, a sum of bytes, tells few keys apart;
+    /// so there are many tables, each for few keys, as a hash of another kind sends them.
+    class ZEM_EXPORT PathsByKey {
+    public:
+        explicit PathsByKey(int objects) : m_tables(static_cast<std::size_t>(objects) / 8 + 1) {}
+        void insert(const zemString& key, int position) {
+            m_tables[tableOf(key)].insert(key, position);
+        }
+        /// The positions under a key, in order.
+        std::set<int> getElement(const zemString& key) const {
+            return m_tables[tableOf(key)].getElement(key);
+        }
+
+    private:
+        std::size_t tableOf(const zemString& key) const {
+            return std::hash<std::string_view>()(static_cast<const char*>(key)) % m_tables.size();
+        }
+        std::vector<zemMultiHashTable<zemString, int, assoHashFunc>> m_tables;
+    };
 
     /// Positions of associated objects, in the order of the left ones.
     zemDynamicArray<objectPathIndexPair> findValidAssociationCopMappingPair(const CmpiContext& ctx,

@@ -2,9 +2,8 @@
 #ifndef TESTS_CIMOM_FIXTURE_H
 #define TESTS_CIMOM_FIXTURE_H
 
-#include <gtest/gtest.h>
-
-#include "Server.h"
+#include "BothBrokers.h"
+#include "Folder.h"
 
 extern "C" {
 CMPIInstanceMI* Fixture_Create_InstanceMI(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
@@ -68,20 +67,10 @@ inline cimom::ObjectPath thing(const std::string& name) {
     return {"root/cimv2", "Fix_Thing", {{"Name", name}}};
 }
 
-/// A server of a character, and a request that is open on it.
-class BothBrokers : public testing::TestWithParam<cimom::Character> {
-protected:
-    bool lean() const { return GetParam() == cimom::Character::Lean; }
-};
-
-inline std::string brokerName(const testing::TestParamInfo<cimom::Character>& info) {
-    return info.param == cimom::Character::Full ? "Full" : "Lean";
+inline std::string textOf(const CMPIString* string) {
+    const char* text = string ? string->ft->getCharPtr(string, nullptr) : nullptr;
+    return text ? text : "(null)";
 }
-
-#define ON_BOTH_BROKERS(suite)                                                                \
-    INSTANTIATE_TEST_SUITE_P(Brokers, suite,                                                  \
-                             testing::Values(cimom::Character::Full, cimom::Character::Lean), \
-                             fixture::brokerName)
 
 }  // namespace fixture
 

@@ -11,6 +11,15 @@
 #include "cmpift.h"
 #include "cmpimacs.h"
 
+/* Every operation has all the parameters of its entry, whatever it needs of them. */
+#pragma GCC diagnostic ignored "-Wunused-parameter"
+
+typedef const CMPIContext* Context;
+typedef const CMPIResult* Result;
+typedef const CMPIObjectPath* Path;
+typedef const CMPISelectExp* Filter;
+typedef const char* Text;
+
 enum { MaxThings = 32, NameSize = 64 };
 
 typedef struct {
@@ -22,40 +31,40 @@ static Thing things[MaxThings] = {{"one", 1}, {"two, \"quoted\" \\", 2}};
 static int thingCount = 2;
 static pthread_mutex_t storeMutex = PTHREAD_MUTEX_INITIALIZER;
 static const CMPIBroker* broker;
-static void hook(void) { printf("fixture: a line for standard output\n"); }
 
-static int findThing(const char* name) {
-    for (int i = 0; i < thingCount; ++i)
-        if (strcmp(things[i].name, name) == 0) return i;
-    return -1;
-}
-
-static const char* keyOf(const CMPIObjectPath* path) {
+static Text textOf(const CMPIString* string) { return string->ft->getCharPtr(string, NULL); }
+static Text nameSpaceOf(Path path) { return textOf(path->ft->getNameSpace(path, NULL)); }
+static Text keyOf(Path path) {
     CMPIStatus rc;
     CMPIData key = path->ft->getKey(path, "Name", &rc);
-    if (rc.rc != CMPI_RC_OK || key.type != CMPI_string) return "";
-    return key.value.string->ft->getCharPtr(key.value.string, NULL);
+    return rc.rc == CMPI_RC_OK && key.type == CMPI_string ? textOf(key.value.string) : "";
 }
 
-static CMPIStatus status(CMPIrc rc, const char* text) {
+static CMPIStatus status(CMPIrc rc, Text text) {
     CMPIStatus result = {rc, NULL};
     if (text) result.msg = broker->eft->newString(broker, text, NULL);
     return result;
 }
-
-static const char* nameSpaceOf(const CMPIObjectPath* path) {
-    return path->ft->getNameSpace(path, NULL)
-        ->ft->getCharPtr(path->ft->getNameSpace(path, NULL), NULL);
+static CMPIStatus done(Result result) {
+    result->ft->returnDone(result);
+    return status(CMPI_RC_OK, NULL);
 }
 
-static CMPIObjectPath* thingPath(const char* ns, const Thing* thing) {
-    CMPIObjectPath* path = broker->eft->newObjectPath(broker, ns, "Fix_Thing", NULL);
+static int findThing(Text name) {
+    for (int i = 0; i < thingCount; ++i)
+        if (strcmp(things[i].name, name) == 0) return i;
+    return -1;
+}
+static CMPIObjectPath* newPath(Path like, Text className) {
+    return broker->eft->newObjectPath(broker, nameSpaceOf(like), className, NULL);
+}
+static CMPIObjectPath* thingPath(Path like, const Thing* thing) {
+    CMPIObjectPath* path = newPath(like, "Fix_Thing");
     path->ft->addKey(path, "Name", (const CMPIValue*)thing->name, CMPI_chars);
     return path;
 }
-
-static CMPIInstance* thingInstance(const char* ns, const Thing* thing, const char** properties) {
-    CMPIInstance* inst = broker->eft->newInstance(broker, thingPath(ns, thing), NULL);
+static CMPIInstance* thingInstance(Path like, const Thing* thing, Text* properties) {
+    CMPIInstance* inst = broker->eft->newInstance(broker, thingPath(like, thing), NULL);
     CMPIValue value;
     if (!inst) return NULL;
     if (properties) inst->ft->setPropertyFilter(inst, properties, NULL);
@@ -66,82 +75,64 @@ static CMPIInstance* thingInstance(const char* ns, const Thing* thing, const cha
     inst->ft->setProperty(inst, "Tags", &value, CMPI_stringA);
     return inst;
 }
-
-/* -- instances -- */
-
-static CMPIStatus FixtureCleanup(CMPIInstanceMI* mi, const CMPIContext* ctx, CMPIBoolean ending) {
-    (void)ctx;
-    /* The Stayer goes when there is no other way. */
-    return status(mi->hdl && !ending ? CMPI_RC_DO_NOT_UNLOAD : CMPI_RC_OK, NULL);
-}
-static CMPIStatus enumerate(const CMPIResult* result, const CMPIObjectPath* path, int names,
-                            const char** properties) {
-    const char* ns = nameSpaceOf(path);
-    hook();
-    pthread_mutex_lock(&storeMutex);
-    for (int i = 0; i < thingCount; ++i) {
-        if (names)
-            result->ft->returnObjectPath(result, thingPath(ns, &things[i]));
-        else
-            result->ft->returnInstance(result, thingInstance(ns, &things[i], properties));
-    }
-    pthread_mutex_unlock(&storeMutex);
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
-}
-static CMPIStatus FixtureEnumInstanceNames(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                           const CMPIResult* result, const CMPIObjectPath* path) {
-    (void)mi, (void)ctx;
-    return enumerate(result, path, 1, NULL);
-}
-static CMPIStatus FixtureEnumInstances(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                       const CMPIResult* result, const CMPIObjectPath* path,
-                                       const char** properties) {
-    (void)mi, (void)ctx;
-    return enumerate(result, path, 0, properties);
-}
-static CMPIStatus FixtureGetInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                     const CMPIResult* result, const CMPIObjectPath* path,
-                                     const char** properties) {
-    int at;
-    (void)mi, (void)ctx;
-    pthread_mutex_lock(&storeMutex);
-    at = findThing(keyOf(path));
-    if (at >= 0)
-        result->ft->returnInstance(result,
-                                   thingInstance(nameSpaceOf(path), &things[at], properties));
-    pthread_mutex_unlock(&storeMutex);
-    if (at < 0) return status(CMPI_RC_ERR_NOT_FOUND, "no such thing");
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
-}
 static void takeSize(Thing* thing, const CMPIInstance* inst) {
     CMPIStatus rc;
     CMPIData size = inst->ft->getProperty(inst, "Size", &rc);
     if (rc.rc == CMPI_RC_OK && !(size.state & CMPI_nullValue)) thing->size = size.value.uint32;
 }
-static CMPIStatus FixtureCreateInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                        const CMPIResult* result, const CMPIObjectPath* path,
-                                        const CMPIInstance* inst) {
-    const char* name = keyOf(path);
-    CMPIrc rc = CMPI_RC_OK;
-    (void)mi, (void)ctx;
+
+/* -- instances -- */
+
+static CMPIStatus FixtureCleanup(CMPIInstanceMI* mi, Context ctx, CMPIBoolean ending) {
+    /* The Stayer goes when there is no other way. */
+    return status(mi->hdl && !ending ? CMPI_RC_DO_NOT_UNLOAD : CMPI_RC_OK, NULL);
+}
+static CMPIStatus enumerate(Result result, Path path, int names, Text* properties) {
+    printf("fixture: a line for standard output\n");
     pthread_mutex_lock(&storeMutex);
-    if (findThing(name) >= 0 || thingCount == MaxThings) {
-        rc = CMPI_RC_ERR_ALREADY_EXISTS;
-    } else {
+    for (int i = 0; i < thingCount; ++i) {
+        if (names)
+            result->ft->returnObjectPath(result, thingPath(path, &things[i]));
+        else
+            result->ft->returnInstance(result, thingInstance(path, &things[i], properties));
+    }
+    pthread_mutex_unlock(&storeMutex);
+    return done(result);
+}
+static CMPIStatus FixtureEnumInstanceNames(CMPIInstanceMI* mi, Context ctx, Result result,
+                                           Path path) {
+    return enumerate(result, path, 1, NULL);
+}
+static CMPIStatus FixtureEnumInstances(CMPIInstanceMI* mi, Context ctx, Result result, Path path,
+                                       Text* properties) {
+    return enumerate(result, path, 0, properties);
+}
+static CMPIStatus FixtureGetInstance(CMPIInstanceMI* mi, Context ctx, Result result, Path path,
+                                     Text* properties) {
+    int at;
+    pthread_mutex_lock(&storeMutex);
+    at = findThing(keyOf(path));
+    if (at >= 0) result->ft->returnInstance(result, thingInstance(path, &things[at], properties));
+    pthread_mutex_unlock(&storeMutex);
+    return at < 0 ? status(CMPI_RC_ERR_NOT_FOUND, "no such thing") : done(result);
+}
+static CMPIStatus FixtureCreateInstance(CMPIInstanceMI* mi, Context ctx, Result result, Path path,
+                                        const CMPIInstance* inst) {
+    CMPIBoolean fits;
+    pthread_mutex_lock(&storeMutex);
+    fits = findThing(keyOf(path)) < 0 && thingCount < MaxThings;
+    if (fits) {
         Thing* thing = &things[thingCount++];
-        memset(thing, 0, sizeof *thing);
-        strncpy(thing->name, name, NameSize - 1);
+        thing->size = 0;
+        snprintf(thing->name, NameSize, "%s", keyOf(path));
         takeSize(thing, inst);
     }
     pthread_mutex_unlock(&storeMutex);
-    if (rc != CMPI_RC_OK) return status(rc, "such a thing is there");
+    if (!fits) return status(CMPI_RC_ERR_ALREADY_EXISTS, "such a thing is there");
     result->ft->returnObjectPath(result, path);
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
+    return done(result);
 }
-static CMPIStatus change(const CMPIObjectPath* path, const CMPIInstance* inst, int delete) {
+static CMPIStatus change(Path path, const CMPIInstance* inst, int delete) {
     int at;
     pthread_mutex_lock(&storeMutex);
     at = findThing(keyOf(path));
@@ -150,21 +141,15 @@ static CMPIStatus change(const CMPIObjectPath* path, const CMPIInstance* inst, i
     pthread_mutex_unlock(&storeMutex);
     return at < 0 ? status(CMPI_RC_ERR_NOT_FOUND, "no such thing") : status(CMPI_RC_OK, NULL);
 }
-static CMPIStatus FixtureModifyInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                        const CMPIResult* result, const CMPIObjectPath* path,
-                                        const CMPIInstance* inst, const char** properties) {
-    (void)mi, (void)ctx, (void)result, (void)properties;
+static CMPIStatus FixtureModifyInstance(CMPIInstanceMI* mi, Context ctx, Result result, Path path,
+                                        const CMPIInstance* inst, Text* properties) {
     return change(path, inst, 0);
 }
-static CMPIStatus FixtureDeleteInstance(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                        const CMPIResult* result, const CMPIObjectPath* path) {
-    (void)mi, (void)ctx, (void)result;
+static CMPIStatus FixtureDeleteInstance(CMPIInstanceMI* mi, Context ctx, Result result, Path path) {
     return change(path, NULL, 1);
 }
-static CMPIStatus FixtureExecQuery(CMPIInstanceMI* mi, const CMPIContext* ctx,
-                                   const CMPIResult* result, const CMPIObjectPath* path,
-                                   const char* query, const char* lang) {
-    (void)mi, (void)ctx, (void)result, (void)path, (void)query, (void)lang;
+static CMPIStatus FixtureExecQuery(CMPIInstanceMI* mi, Context ctx, Result result, Path path,
+                                   Text query, Text lang) {
     return status(CMPI_RC_ERR_NOT_SUPPORTED, NULL);
 }
 
@@ -172,8 +157,8 @@ static CMPIStatus FixtureExecQuery(CMPIInstanceMI* mi, const CMPIContext* ctx,
 
 enum { Paths = 1, Links = 2 };
 
-static CMPIInstance* linkInstance(const CMPIObjectPath* from, CMPIObjectPath* to) {
-    CMPIObjectPath* path = broker->eft->newObjectPath(broker, nameSpaceOf(from), "Fix_Link", NULL);
+static CMPIInstance* linkInstance(Path from, CMPIObjectPath* to) {
+    CMPIObjectPath* path = newPath(from, "Fix_Link");
     CMPIValue value;
     value.ref = (CMPIObjectPath*)from;
     path->ft->addKey(path, "Antecedent", &value, CMPI_ref);
@@ -181,11 +166,12 @@ static CMPIInstance* linkInstance(const CMPIObjectPath* from, CMPIObjectPath* to
     path->ft->addKey(path, "Dependent", &value, CMPI_ref);
     return broker->eft->newInstance(broker, path, NULL);
 }
-static CMPIStatus related(const CMPIContext* ctx, const CMPIResult* result,
-                          const CMPIObjectPath* from, int what, const char** properties) {
+static CMPIStatus related(Context ctx, Result result, Path from, Text role, int what,
+                          Text* properties) {
     CMPIStatus rc;
-    CMPIObjectPath* cls = broker->eft->newObjectPath(broker, nameSpaceOf(from), "Fix_Thing", NULL);
-    CMPIEnumeration* all = broker->bft->enumerateInstances(broker, ctx, cls, properties, &rc);
+    CMPIEnumeration* all;
+    if (role && strcmp(role, "Dependent") == 0) return status(CMPI_RC_OK, NULL);
+    all = broker->bft->enumerateInstances(broker, ctx, newPath(from, "Fix_Thing"), properties, &rc);
     if (!all) return rc;
     while (all->ft->hasNext(all, NULL)) {
         CMPIInstance* inst = all->ft->getNext(all, NULL).value.inst;
@@ -197,92 +183,54 @@ static CMPIStatus related(const CMPIContext* ctx, const CMPIResult* result,
         else
             result->ft->returnInstance(result, inst);
     }
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
+    return done(result);
 }
-static CMPIStatus FixtureAssociationCleanup(CMPIAssociationMI* mi, const CMPIContext* ctx,
-                                            CMPIBoolean ending) {
-    (void)mi, (void)ctx, (void)ending;
-    return status(CMPI_RC_OK, NULL);
+static CMPIStatus FixtureAssociators(CMPIAssociationMI* mi, Context ctx, Result result, Path path,
+                                     Text assocClass, Text resultClass, Text role, Text resultRole,
+                                     Text* properties) {
+    return related(ctx, result, path, role, 0, properties);
 }
-static CMPIStatus FixtureAssociators(CMPIAssociationMI* mi, const CMPIContext* ctx,
-                                     const CMPIResult* result, const CMPIObjectPath* path,
-                                     const char* assocClass, const char* resultClass,
-                                     const char* role, const char* resultRole,
-                                     const char** properties) {
-    (void)mi, (void)assocClass, (void)resultClass, (void)role, (void)resultRole;
-    return related(ctx, result, path, 0, properties);
+static CMPIStatus FixtureAssociatorNames(CMPIAssociationMI* mi, Context ctx, Result result,
+                                         Path path, Text assocClass, Text resultClass, Text role,
+                                         Text resultRole) {
+    return related(ctx, result, path, role, Paths, NULL);
 }
-static CMPIStatus FixtureAssociatorNames(CMPIAssociationMI* mi, const CMPIContext* ctx,
-                                         const CMPIResult* result, const CMPIObjectPath* path,
-                                         const char* assocClass, const char* resultClass,
-                                         const char* role, const char* resultRole) {
-    (void)mi, (void)assocClass, (void)resultClass, (void)role, (void)resultRole;
-    return related(ctx, result, path, Paths, NULL);
+static CMPIStatus FixtureReferences(CMPIAssociationMI* mi, Context ctx, Result result, Path path,
+                                    Text resultClass, Text role, Text* properties) {
+    return related(ctx, result, path, role, Links, NULL);
 }
-static CMPIStatus FixtureReferences(CMPIAssociationMI* mi, const CMPIContext* ctx,
-                                    const CMPIResult* result, const CMPIObjectPath* path,
-                                    const char* resultClass, const char* role,
-                                    const char** properties) {
-    (void)mi, (void)resultClass, (void)properties;
-    if (role && strcmp(role, "Dependent") == 0) return status(CMPI_RC_OK, NULL);
-    return related(ctx, result, path, Links, NULL);
-}
-static CMPIStatus FixtureReferenceNames(CMPIAssociationMI* mi, const CMPIContext* ctx,
-                                        const CMPIResult* result, const CMPIObjectPath* path,
-                                        const char* resultClass, const char* role) {
-    (void)mi, (void)resultClass;
-    if (role && strcmp(role, "Dependent") == 0) return status(CMPI_RC_OK, NULL);
-    return related(ctx, result, path, Links | Paths, NULL);
+static CMPIStatus FixtureReferenceNames(CMPIAssociationMI* mi, Context ctx, Result result,
+                                        Path path, Text resultClass, Text role) {
+    return related(ctx, result, path, role, Links | Paths, NULL);
 }
 
 /* -- methods -- */
 
-static void echo(const CMPIArgs* in, CMPIArgs* out) {
-    CMPICount count = in->ft->getArgCount(in, NULL);
-    for (CMPICount i = 0; i < count; ++i) {
-        CMPIString* name;
-        CMPIData data = in->ft->getArgAt(in, i, &name, NULL);
-        out->ft->addArg(out, name->ft->getCharPtr(name, NULL),
-                        data.state & CMPI_nullValue ? NULL : &data.value, data.type);
-    }
+static void give(CMPIArgs* out, const CMPIString* name, CMPIData data) {
+    const CMPIValue* value = data.state & CMPI_nullValue ? NULL : &data.value;
+    out->ft->addArg(out, textOf(name), value, data.type);
 }
-static void tellContext(const CMPIContext* ctx, CMPIArgs* out) {
-    CMPICount count = ctx->ft->getEntryCount(ctx, NULL);
-    for (CMPICount i = 0; i < count; ++i) {
-        CMPIString* name;
-        CMPIData data = ctx->ft->getEntryAt(ctx, i, &name, NULL);
-        if (data.type != CMPI_string || (data.state & CMPI_nullValue))
-            out->ft->addArg(out, name->ft->getCharPtr(name, NULL), &data.value, data.type);
-        else
-            out->ft->addArg(
-                out, name->ft->getCharPtr(name, NULL),
-                (const CMPIValue*)data.value.string->ft->getCharPtr(data.value.string, NULL),
-                CMPI_chars);
-    }
-}
-static CMPIStatus fire(const CMPIContext* ctx, const CMPIObjectPath* path, const CMPIArgs* in) {
+static CMPIStatus fire(Context ctx, Path path, const CMPIArgs* in) {
     CMPIData severity = in->ft->getArg(in, "Severity", NULL);
-    CMPIObjectPath* cls = broker->eft->newObjectPath(broker, nameSpaceOf(path), "Fix_Event", NULL);
-    CMPIInstance* event = broker->eft->newInstance(broker, cls, NULL);
+    CMPIInstance* event = broker->eft->newInstance(broker, newPath(path, "Fix_Event"), NULL);
     event->ft->setProperty(event, "Severity", &severity.value, severity.type);
     return broker->bft->deliverIndication(broker, ctx, nameSpaceOf(path), event);
 }
-static CMPIStatus FixtureMethodCleanup(CMPIMethodMI* mi, const CMPIContext* ctx,
-                                       CMPIBoolean ending) {
-    (void)mi, (void)ctx, (void)ending;
-    return status(CMPI_RC_OK, NULL);
-}
-static CMPIStatus FixtureInvokeMethod(CMPIMethodMI* mi, const CMPIContext* ctx,
-                                      const CMPIResult* result, const CMPIObjectPath* path,
-                                      const char* method, const CMPIArgs* in, CMPIArgs* out) {
+static CMPIStatus FixtureInvokeMethod(CMPIMethodMI* mi, Context ctx, Result result, Path path,
+                                      Text method, const CMPIArgs* in, CMPIArgs* out) {
+    CMPIString* name;
     CMPIValue value;
-    (void)mi;
     value.uint32 = in->ft->getArgCount(in, NULL);
     if (strcmp(method, "Echo") == 0) {
-        echo(in, out);
+        for (CMPICount i = 0; i < value.uint32; ++i) {
+            CMPIData data = in->ft->getArgAt(in, i, &name, NULL);
+            give(out, name, data);
+        }
     } else if (strcmp(method, "Context") == 0) {
-        tellContext(ctx, out);
+        for (CMPICount i = 0; i < ctx->ft->getEntryCount(ctx, NULL); ++i) {
+            CMPIData data = ctx->ft->getEntryAt(ctx, i, &name, NULL);
+            give(out, name, data);
+        }
     } else if (strcmp(method, "Relay") == 0) { /* Echo, by way of the broker */
         CMPIData data = broker->bft->invokeMethod(broker, ctx, path, "Echo", in, out, NULL);
         value.uint32 = data.value.uint32;
@@ -295,85 +243,69 @@ static CMPIStatus FixtureInvokeMethod(CMPIMethodMI* mi, const CMPIContext* ctx,
         return status(CMPI_RC_ERR_METHOD_NOT_FOUND, method);
     }
     result->ft->returnData(result, &value, CMPI_uint32);
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
+    return done(result);
 }
 
 /* -- properties -- */
 
-static CMPIStatus FixturePropertyCleanup(CMPIPropertyMI* mi, const CMPIContext* ctx,
-                                         CMPIBoolean ending) {
-    (void)mi, (void)ctx, (void)ending;
-    return status(CMPI_RC_OK, NULL);
-}
-static CMPIStatus FixtureSetProperty(CMPIPropertyMI* mi, const CMPIContext* ctx,
-                                     const CMPIResult* result, const CMPIObjectPath* path,
-                                     const char* name, const CMPIData data) {
+static CMPIStatus FixtureSetProperty(CMPIPropertyMI* mi, Context ctx, Result result, Path path,
+                                     Text name, const CMPIData data) {
     CMPIInstance* inst = broker->eft->newInstance(broker, path, NULL);
     CMPIStatus rc = inst->ft->setProperty(inst, name, &data.value, data.type);
-    (void)mi, (void)ctx, (void)result;
     return rc.rc != CMPI_RC_OK ? rc : change(path, inst, 0);
 }
-static CMPIStatus FixtureGetProperty(CMPIPropertyMI* mi, const CMPIContext* ctx,
-                                     const CMPIResult* result, const CMPIObjectPath* path,
-                                     const char* name) {
+static CMPIStatus FixtureGetProperty(CMPIPropertyMI* mi, Context ctx, Result result, Path path,
+                                     Text name) {
+    const int at = findThing(keyOf(path));
     CMPIValue value;
-    int at;
-    (void)mi, (void)ctx;
     if (strcmp(name, "Size") != 0) return status(CMPI_RC_ERR_NO_SUCH_PROPERTY, name);
-    at = findThing(keyOf(path));
     if (at < 0) return status(CMPI_RC_ERR_NOT_FOUND, "no such thing");
     value.uint32 = things[at].size;
     result->ft->returnData(result, &value, CMPI_uint32);
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
+    return done(result);
 }
 
 /* -- indications: what happens to filters is written to the log -- */
 
-static CMPIStatus note(const char* what, const char* className, CMPIBoolean edge) {
+static CMPIStatus note(Text what, Text className, CMPIBoolean edge) {
     char text[128];
     snprintf(text, sizeof text, "%s %s %s", what, className, edge ? "edge" : "inner");
     broker->eft->trace(broker, CMPI_LEV_INFO, "Fixture", text, NULL);
     return status(CMPI_RC_OK, NULL);
 }
-static CMPIStatus FixtureIndicationCleanup(CMPIIndicationMI* mi, const CMPIContext* ctx,
-                                           CMPIBoolean ending) {
-    (void)mi, (void)ctx, (void)ending;
-    return status(CMPI_RC_OK, NULL);
-}
-static CMPIStatus FixtureAuthorizeFilter(CMPIIndicationMI* mi, const CMPIContext* ctx,
-                                         const CMPISelectExp* filter, const char* className,
-                                         const CMPIObjectPath* path, const char* owner) {
-    (void)mi, (void)ctx, (void)filter, (void)className, (void)path;
+static CMPIStatus FixtureAuthorizeFilter(CMPIIndicationMI* mi, Context ctx, Filter filter,
+                                         Text className, Path path, Text owner) {
     return status(strcmp(owner, "eve") == 0 ? CMPI_RC_ERR_ACCESS_DENIED : CMPI_RC_OK, owner);
 }
-static CMPIStatus FixtureMustPoll(CMPIIndicationMI* mi, const CMPIContext* ctx,
-                                  const CMPISelectExp* filter, const char* className,
-                                  const CMPIObjectPath* path) {
-    (void)mi, (void)ctx, (void)filter, (void)className, (void)path;
+static CMPIStatus FixtureMustPoll(CMPIIndicationMI* mi, Context ctx, Filter filter, Text className,
+                                  Path path) {
     return status(CMPI_RC_ERR_NOT_SUPPORTED, "never");
 }
-static CMPIStatus FixtureActivateFilter(CMPIIndicationMI* mi, const CMPIContext* ctx,
-                                        const CMPISelectExp* filter, const char* className,
-                                        const CMPIObjectPath* path, CMPIBoolean first) {
-    (void)mi, (void)ctx, (void)filter, (void)path;
+static CMPIStatus FixtureActivateFilter(CMPIIndicationMI* mi, Context ctx, Filter filter,
+                                        Text className, Path path, CMPIBoolean first) {
     return note("activate", className, first);
 }
-static CMPIStatus FixtureDeActivateFilter(CMPIIndicationMI* mi, const CMPIContext* ctx,
-                                          const CMPISelectExp* filter, const char* className,
-                                          const CMPIObjectPath* path, CMPIBoolean last) {
-    (void)mi, (void)ctx, (void)filter, (void)path;
+static CMPIStatus FixtureDeActivateFilter(CMPIIndicationMI* mi, Context ctx, Filter filter,
+                                          Text className, Path path, CMPIBoolean last) {
     return note("deactivate", className, last);
 }
-static CMPIStatus FixtureEnableIndications(CMPIIndicationMI* mi, const CMPIContext* ctx) {
-    (void)mi, (void)ctx;
+static CMPIStatus FixtureEnableIndications(CMPIIndicationMI* mi, Context ctx) {
     return note("enable", "", 1);
 }
-static CMPIStatus FixtureDisableIndications(CMPIIndicationMI* mi, const CMPIContext* ctx) {
-    (void)mi, (void)ctx;
+static CMPIStatus FixtureDisableIndications(CMPIIndicationMI* mi, Context ctx) {
     return note("disable", "", 1);
 }
+
+/* -- factories -- */
+
+#define CLEANUP(Kind)                                                                            \
+    static CMPIStatus Fixture##Kind##Cleanup(CMPI##Kind##MI* mi, Context ctx, CMPIBoolean end) { \
+        return status(CMPI_RC_OK, NULL);                                                         \
+    }
+CLEANUP(Association)
+CLEANUP(Method)
+CLEANUP(Property)
+CLEANUP(Indication)
 
 CMInstanceMIStub(Fixture, Fixture, broker, CMNoHook)
     CMAssociationMIStub(Fixture, Fixture, broker, CMNoHook)
@@ -382,18 +314,16 @@ CMInstanceMIStub(Fixture, Fixture, broker, CMNoHook)
                 CMIndicationMIStub(Fixture, Fixture, broker, CMNoHook)
 
                     CMPI_EXTERN_C CMPIInstanceMI* Refuser_Create_InstanceMI(const CMPIBroker* mb,
-                                                                            const CMPIContext* ctx,
+                                                                            Context ctx,
                                                                             CMPIStatus* rc) {
-    (void)ctx;
     rc->rc = CMPI_RC_ERR_ACCESS_DENIED;
     rc->msg = mb->eft->newString(mb, "not today", NULL);
     return NULL;
 }
 
 /* The same things under another name, by the generic factory. */
-CMPI_EXTERN_C CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker* mb,
-                                                         const CMPIContext* ctx, const char* name,
-                                                         CMPIStatus* rc) {
+CMPI_EXTERN_C CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker* mb, Context ctx,
+                                                         Text name, CMPIStatus* rc) {
     static CMPIInstanceMI stayer;
     if (strcmp(name, "Stayer") != 0) return NULL;
     stayer = *Fixture_Create_InstanceMI(mb, ctx, rc);

@@ -1,36 +1,25 @@
 // Message bundles, as providers reach them through the broker.
-#include <unistd.h>
-
 #include <cstdlib>
-#include <filesystem>
-#include <fstream>
+#include <tuple>
 
 #include "Fixture.h"
 #include "Messages.h"
+#include "cmpimacs.h"
 
 namespace {
 
 using namespace cimom;
-namespace fs = std::filesystem;
+using fixture::textOf;
 
 class Messages : public testing::Test {
 protected:
     Messages() {
-        std::string name = (fs::temp_directory_path() / "messagesXXXXXX").string();
-        m_folder = mkdtemp(name.data());
-        write("default_de.json", R"({"Greet": "Hallo {0}, $1", "Odd": 5})");
-        write("default_de_AT.json", R"({"Greet": "Servus {0}"})");
-        write("default.json", R"({"Greet": "Hello {0}"})");
-        write("broken.json", "{");
-        fs::create_directory(m_folder / "sub");
-        write("sub/osbase_fr.json", R"({"Greet": "Bonjour {0}"})");
-        m_server =
-            std::make_unique<Server>(Options{Character::Full, m_folder.string(), {}, nullptr});
-    }
-    ~Messages() override { fs::remove_all(m_folder); }
-
-    void write(const std::string& name, const char* text) {
-        std::ofstream(m_folder / name) << text;
+        m_folder.write("default_de.json", R"({"Greet": "Hallo {0}, $1", "Odd": 5})");
+        m_folder.write("default_de_AT.json", R"({"Greet": "Servus {0}"})");
+        m_folder.write("default.json", R"({"Greet": "Hello {0}"})");
+        m_folder.write("broken.json", "{");
+        std::filesystem::create_directory(m_folder / "sub");
+        m_folder.write("sub/osbase_fr.json", R"({"Greet": "Bonjour {0}"})");
     }
 
     /// What Greet says, or the status of opening the bundle.
@@ -38,29 +27,27 @@ protected:
         Request request;
         request.language = language;
         if (local) request.context.set("UseProcessLocale", true);
-        RequestScope scope(*m_server, request);
-        CMPIBroker* mb = m_server->broker();
+        const RequestScope scope(m_server, request);
+        CMPIBroker* mb = m_server.broker();
         CMPIMsgFileHandle handle = nullptr;
-        const CMPIStatus opened = mb->eft->openMessageFile(mb, bundle.c_str(), &handle);
+        const CMPIStatus opened = CMOpenMessageFile(mb, bundle.c_str(), &handle);
         if (opened.rc != CMPI_RC_OK) return statusName(opened.rc);
         CMPIStatus rc{CMPI_RC_OK, nullptr};
         CMPIString* text = mb->eft->getMessage2(mb, "Greet", handle, "default $0", &rc, 2,
                                                 CMPI_chars, "Eve", CMPI_sint32, -3);
         EXPECT_EQ(rc.rc, CMPI_RC_OK);
-        EXPECT_EQ(mb->eft->closeMessageFile(mb, handle).rc, CMPI_RC_OK);
-        EXPECT_EQ(mb->eft->closeMessageFile(mb, handle).rc, CMPI_RC_ERR_INVALID_HANDLE);
-        return text->ft->getCharPtr(text, nullptr);
+        EXPECT_EQ(CMCloseMessageFile(mb, handle).rc, CMPI_RC_OK);
+        EXPECT_EQ(CMCloseMessageFile(mb, handle).rc, CMPI_RC_ERR_INVALID_HANDLE);
+        return textOf(text);
     }
 
-    fs::path m_folder;
-    std::unique_ptr<Server> m_server;
+    const fixture::Folder m_folder;
+    Server m_server{{Character::Full, m_folder / "", {}, nullptr}};
 };
 
 TEST_F(Messages, BundlesAreFoundByLanguage) {
-    const std::string sub = (m_folder / "sub" / "osbase").string();
-    const struct {
-        std::string bundle, language, expected;
-    } rows[] = {
+    const std::string sub = m_folder / "sub/osbase";
+    const std::tuple<std::string, std::string, std::string> rows[] = {
         {"", "de", "Hallo Eve, -3"},
         {"", "de-AT", "Servus Eve"},
         {"", "de-CH,fr", "Hallo Eve, -3"},
@@ -75,40 +62,34 @@ TEST_F(Messages, BundlesAreFoundByLanguage) {
         {"other", "de", "CIM_ERR_NOT_FOUND"},
         {"broken", "de", "CIM_ERR_NOT_FOUND"},
     };
-    for (const auto& row : rows)
-        EXPECT_EQ(greet(row.bundle, row.language), row.expected) << row.bundle << row.language;
+    for (const auto& [bundle, language, expected] : rows)
+        EXPECT_EQ(greet(bundle, language), expected) << bundle << language;
     setenv("LC_ALL", "de_AT.UTF-8", 1);
     EXPECT_EQ(greet("", "fr", true), "Servus Eve");
     unsetenv("LC_ALL");
 }
 
 TEST_F(Messages, TextsTakeInserts) {
-    const struct {
-        const char* text;
-        const char* expected;
-    } rows[] = {{"$0$1", "ab"},
-                {"{1} {0}", "b a"},
-                {"$2 {2} $ {x} {0", "$2 {2} $ {x} {0"},
-                {"{0}{0}", "aa"},
-                {"", ""}};
-    for (const auto& row : rows) EXPECT_EQ(withInserts(row.text, {"a", "b"}), row.expected);
+    const std::pair<const char*, const char*> rows[] = {{"$0$1", "ab"},
+                                                        {"{1} {0}", "b a"},
+                                                        {"$2 {2} $ {x} {0", "$2 {2} $ {x} {0"},
+                                                        {"{0}{0}", "aa"},
+                                                        {"", ""}};
+    for (const auto& [text, expected] : rows) EXPECT_EQ(withInserts(text, {"a", "b"}), expected);
     EXPECT_EQ(withInserts("$0", {"$1", "x"}), "$1");  // an insert is not looked at again
 
-    RequestScope scope(*m_server);
-    CMPIBroker* mb = m_server->broker();
+    const RequestScope scope(m_server);
+    CMPIBroker* mb = m_server.broker();
     CMPIStatus rc{CMPI_RC_OK, nullptr};
-    const auto message = [&](CMPIString* text) {
-        return std::string(text ? text->ft->getCharPtr(text, nullptr) : "(none)");
-    };
-    CMPIString* string = mb->eft->newString(mb, "s", nullptr);
-    EXPECT_EQ(message(mb->eft->getMessage2(mb, "x", nullptr, "$0 $1 $2 $3 $4 $5 $6", &rc, 7,
-                                           CMPI_uint32, 4000000000U, CMPI_sint64, -5LL, CMPI_uint64,
-                                           5ULL, CMPI_real64, 2.5, CMPI_boolean, 1, CMPI_string,
-                                           string, CMPI_chars, nullptr)),
+    CMPIString* string = CMNewString(mb, "s", nullptr);
+    EXPECT_EQ(textOf(mb->eft->getMessage2(mb, "x", nullptr, "$0 $1 $2 $3 $4 $5 $6", &rc, 7,
+                                          CMPI_uint32, 4000000000U, CMPI_sint64, -5LL, CMPI_uint64,
+                                          5ULL, CMPI_real64, 2.5, CMPI_boolean, 1, CMPI_string,
+                                          string, CMPI_chars, nullptr)),
               "4000000000 -5 5 2.5 true s ");
-    EXPECT_EQ(message(mb->eft->getMessage(mb, "Greet", "x", &rc, 1, CMPI_chars, "you")),
+    EXPECT_EQ(textOf(mb->eft->getMessage(mb, "Greet", "x", &rc, 1, CMPI_chars, "you")),
               "Hello you");
-    EXPECT_EQ(message(mb->eft->getMessage(mb, "Unknown", "no $0", &rc, 1, CMPI_chars, "way")),
+    EXPECT_EQ(textOf(mb->eft->getMessage(mb, "Unknown", "no $0", &rc, 1, CMPI_chars, "way")),
               "no way");
     mb->eft->getMessage2(mb, "x", nullptr, "", &rc, 11);
     EXPECT_EQ(rc.rc, CMPI_RC_ERR_INVALID_PARAMETER);

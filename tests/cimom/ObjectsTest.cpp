@@ -1,250 +1,246 @@
 // The objects that the broker hands to providers, through the C function tables.
-#include <cmath>
 #include <cstring>
 #include <thread>
+#include <tuple>
 
 #include "Fixture.h"
+#include "cmpimacs.h"
 
 namespace {
 
 using namespace cimom;
 
-std::string textOf(const CMPIString* string) {
-    const char* text = string ? string->ft->getCharPtr(string, nullptr) : nullptr;
-    return text ? text : "(null)";
-}
+using fixture::textOf;
 
-class Objects : public fixture::BothBrokers {
+class Objects : public BothBrokers {
 protected:
-    CMPIBroker* mb() { return m_server.broker(); }
-    CMPIBrokerEncFT* eft() { return mb()->eft; }
-    CMPIString* string(const char* text) { return eft()->newString(mb(), text, nullptr); }
+    CMPIString* string(const char* text) { return CMNewString(m_mb, text, nullptr); }
 
     Server m_server{{GetParam(), "", {}, nullptr}};
     std::optional<RequestScope> m_scope{m_server};
+    CMPIBroker* const m_mb = m_server.broker();
+    CMPIStatus m_rc{CMPI_RC_OK, nullptr};
 };
 
 Instance part() { return Instance({"test/x", "Part", {{"Id", 7}}}, {{"Id", 7}, {"Note", "n"}}); }
 
-const Value kValues[] = {true,
-                         Value::char16(0x20AC),
-                         std::uint8_t{255},
-                         std::uint16_t{65535},
-                         std::uint32_t{4294967295},
-                         std::uint64_t{18446744073709551615U},
-                         std::int8_t{-128},
-                         std::int16_t{-32768},
-                         std::int32_t{-2147483647},
-                         std::int64_t{INT64_MIN},
-                         1.5F,
-                         1e300,
-                         "",
-                         "text \xC3\xA9",
-                         DateTime(),
-                         DateTime::fromBinary(1600000000123456, false),
-                         ObjectPath("test/x", "Other", {{"A", 1}, {"B", "b"}}),
-                         part(),
-                         Value::array(CMPI_string, {"a", Value(), "c"}),
-                         Value::array(CMPI_uint16, {}),
-                         Value::array(CMPI_boolean, {true, false}),
-                         Value::array(CMPI_real32, {0.25F}),
-                         Value::array(CMPI_instance, {part(), part()}),
-                         Value::array(CMPI_dateTime, {DateTime()}),
-                         Value::array(CMPI_ref, {ObjectPath("n", "C")}),
-                         Value::null(CMPI_uint32),
-                         Value::null(CMPI_stringA),
-                         Value::null(CMPI_instance)};
+template <class... Each>
+std::vector<Value> valuesOf(const Each&... each) {
+    return {Value(each)...};
+}
 
 TEST_P(Objects, ValuesOfAllTypesComeBack) {
     NamedValues all;
-    for (const Value& value : kValues) all.set("v" + std::to_string(all.size()), value);
+    for (const Value& value : valuesOf(
+             true, Value::char16(0x20AC), std::uint8_t{255}, std::uint16_t{65535}, UINT32_MAX,
+             UINT64_MAX, std::int8_t{-128}, std::int16_t{-32768}, INT32_MIN, INT64_MIN, 1.5F, 1e300,
+             "", "text \xC3\xA9", DateTime(), DateTime::fromBinary(1600000000123456, false),
+             ObjectPath("test/x", "Other", {{"A", 1}, {"B", "b"}}), part(),
+             Value::array(CMPI_string, {"a", Value(), "c"}), Value::array(CMPI_uint16, {}),
+             Value::array(CMPI_boolean, {true, false}), Value::array(CMPI_real32, {0.25F}),
+             Value::array(CMPI_instance, {part(), part()}),
+             Value::array(CMPI_dateTime, {DateTime()}),
+             Value::array(CMPI_ref, {ObjectPath("n", "C")}), Value::null(CMPI_uint32),
+             Value::null(CMPI_stringA), Value::null(CMPI_instance)))
+        all.set("v" + std::to_string(all.size()), value);
     CMPIArgs* from = m_scope->wrap(all);
-    CMPIArgs* to = eft()->newArgs(mb(), nullptr);
+    CMPIArgs* to = CMNewArgs(m_mb, nullptr);
     CMPIInstance* inst = m_scope->wrap(Instance({"test/x", "Any"}));
-    ASSERT_EQ(from->ft->getArgCount(from, nullptr), all.size());
+    ASSERT_EQ(CMGetArgCount(from, nullptr), all.size());
     for (CMPICount i = 0; i < all.size(); ++i) {
         CMPIString* name = nullptr;
-        CMPIStatus rc{CMPI_RC_ERR_FAILED, nullptr};
-        CMPIData data = from->ft->getArgAt(from, i, &name, &rc);
-        ASSERT_EQ(rc.rc, CMPI_RC_OK);
-        EXPECT_EQ((data.state & CMPI_nullValue) != 0, all.at(i).value.isNull());
-        const CMPIValue* value = data.state & CMPI_nullValue ? nullptr : &data.value;
-        EXPECT_EQ(to->ft->addArg(to, textOf(name).c_str(), value, data.type).rc, CMPI_RC_OK);
-        EXPECT_EQ(inst->ft->setProperty(inst, textOf(name).c_str(), value, data.type).rc,
-                  CMPI_RC_OK);
+        m_rc.rc = CMPI_RC_ERR_FAILED;
+        const CMPIData data = CMGetArgAt(from, i, &name, &m_rc);
+        ASSERT_EQ(m_rc.rc, CMPI_RC_OK);
+        const CMPIValue* value = CMIsNullValue(data) ? nullptr : &data.value;
+        EXPECT_EQ(CMAddArg(to, CMGetCharPtr(name), value, data.type).rc, CMPI_RC_OK);
+        EXPECT_EQ(CMSetProperty(inst, CMGetCharPtr(name), value, data.type).rc, CMPI_RC_OK);
     }
     EXPECT_EQ(RequestScope::read(to), all);
     EXPECT_EQ(RequestScope::read(inst).properties, all);
     // Names are found whatever their case; what is not there has the status of its kind.
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    EXPECT_EQ(to->ft->getArg(to, "V0", &rc).value.boolean, 1);
-    to->ft->getArg(to, "none", &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NOT_FOUND);
-    inst->ft->getProperty(inst, "none", &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
-    inst->ft->getPropertyAt(inst, 1000, nullptr, &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
-    EXPECT_EQ(to->ft->addArg(to, "q", nullptr, CMPI_filter).rc, CMPI_RC_OK);  // a null is a null
-    CMPIValue value{};
-    EXPECT_EQ(to->ft->addArg(to, "q", &value, CMPI_filter).rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
+    EXPECT_EQ(CMGetArg(to, "V0", &m_rc).value.boolean, 1);
+    CMGetArg(to, "none", &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NOT_FOUND);
+    CMGetProperty(inst, "none", &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    CMGetPropertyAt(inst, 1000, nullptr, &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    EXPECT_EQ(CMAddArg(to, "q", nullptr, CMPI_filter).rc, CMPI_RC_OK);  // a null is a null
+    const CMPIValue value{};
+    EXPECT_EQ(CMAddArg(to, "q", &value, CMPI_filter).rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
 }
 
 TEST_P(Objects, ArraysCheckWhatTheyAreGiven) {
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    CMPIArray* array = eft()->newArray(mb(), 2, CMPI_chars, &rc);
-    EXPECT_EQ(array->ft->getSimpleType(array, nullptr), CMPI_string);
-    const auto* text = reinterpret_cast<const CMPIValue*>("x");
+    CMPIArray* array = CMNewArray(m_mb, 2, CMPI_chars, &m_rc);
+    EXPECT_EQ(CMGetArrayType(array, nullptr), CMPI_string);
     CMPIValue number{};
-    EXPECT_EQ(array->ft->setElementAt(array, 1, text, CMPI_chars).rc, CMPI_RC_OK);
-    EXPECT_EQ(array->ft->setElementAt(array, 2, text, CMPI_chars).rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
-    EXPECT_EQ(array->ft->setElementAt(array, 0, &number, CMPI_uint8).rc, CMPI_RC_ERR_TYPE_MISMATCH);
-    EXPECT_EQ(array->ft->getElementAt(array, 0, nullptr).state, CMPI_nullValue);
-    EXPECT_EQ(textOf(array->ft->getElementAt(array, 1, nullptr).value.string), "x");
-    array->ft->getElementAt(array, 2, &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    EXPECT_EQ(CMSetArrayElementAt(array, 1, "x", CMPI_chars).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMSetArrayElementAt(array, 2, "x", CMPI_chars).rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    EXPECT_EQ(CMSetArrayElementAt(array, 0, &number, CMPI_uint8).rc, CMPI_RC_ERR_TYPE_MISMATCH);
+    EXPECT_EQ(CMGetArrayElementAt(array, 0, nullptr).state, CMPI_nullValue);
+    EXPECT_EQ(textOf(CMGetArrayElementAt(array, 1, nullptr).value.string), "x");
+    CMGetArrayElementAt(array, 2, &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
     for (const CMPIType bad : {CMPIType{CMPI_null}, CMPIType{CMPI_stringA}, CMPIType{CMPI_args}}) {
-        EXPECT_EQ(eft()->newArray(mb(), 1, bad, &rc), nullptr);
-        EXPECT_EQ(rc.rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
+        EXPECT_EQ(CMNewArray(m_mb, 1, bad, &m_rc), nullptr);
+        EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_INVALID_DATA_TYPE);
     }
 }
 
 TEST_P(Objects, DateTimes) {
-    const struct {
-        const char* text;
-        bool valid;
-        bool interval;
-        std::uint64_t micros;
-    } rows[] = {
-        {"19700101000001.000002+000", true, false, 1000002},
-        {"19700101010000.000000+060", true, false, 0},
-        {"20000229120000.500000-300", true, false, 951843600500000},
-        {"00000001000000.000000:000", true, true, 86400000000},
-        {"00000000000000.00****:000", true, true, 0},
-        {"200002**120000.500000-300", false, false, 0},
-        {"20001329120000.000000+000", false, false, 0},
-        {"20000229120000.000000x000", false, false, 0},
-        {"00000001000000.000000:001", false, false, 0},
-        {"2000", false, false, 0},
-        {"", false, false, 0},
+    const std::tuple<const char*, bool, std::uint64_t> rows[] = {
+        {"19700101000001.000002+000", false, 1000002},
+        {"19700101010000.000000+060", false, 0},
+        {"20000229120000.500000-300", false, 951843600500000},
+        {"00000001000000.000000:000", true, 86400000000},
+        {"00000000000000.00****:000", true, 0},
     };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.text);
-        CMPIStatus rc{CMPI_RC_OK, nullptr};
-        CMPIDateTime* when = eft()->newDateTimeFromChars(mb(), row.text, &rc);
-        EXPECT_EQ(rc.rc, row.valid ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_PARAMETER);
-        ASSERT_EQ(when != nullptr, row.valid);
-        if (!when) continue;
-        EXPECT_EQ(textOf(when->ft->getStringFormat(when, nullptr)), row.text);
-        EXPECT_EQ(when->ft->isInterval(when, nullptr) != 0, row.interval);
-        EXPECT_EQ(when->ft->getBinaryFormat(when, nullptr), row.micros);
-        CMPIDateTime* same =
-            eft()->newDateTimeFromBinary(mb(), row.micros, row.interval ? 1 : 0, nullptr);
-        EXPECT_EQ(same->ft->getBinaryFormat(same, nullptr), row.micros);
+    for (const auto& [text, interval, micros] : rows) {
+        SCOPED_TRACE(text);
+        CMPIDateTime* when = CMNewDateTimeFromChars(m_mb, text, &m_rc);
+        ASSERT_EQ(m_rc.rc, CMPI_RC_OK);
+        EXPECT_EQ(textOf(CMGetStringFormat(when, nullptr)), text);
+        EXPECT_EQ(CMIsInterval(when, nullptr) != 0, interval);
+        EXPECT_EQ(CMGetBinaryFormat(when, nullptr), micros);
+        when = CMNewDateTimeFromBinary(m_mb, micros, interval, nullptr);
+        EXPECT_EQ(CMGetBinaryFormat(when, nullptr), micros);
+    }
+    for (const char* bad : {"200002**120000.500000-300", "20001329120000.000000+000",
+                            "20000229120000.000000x000", "00000001000000.000000:001", "2000", ""}) {
+        EXPECT_EQ(CMNewDateTimeFromChars(m_mb, bad, &m_rc), nullptr) << bad;
+        EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_INVALID_PARAMETER);
     }
     EXPECT_EQ(DateTime::fromBinary(UINT64_MAX, false).text().size(), 25U);
     EXPECT_EQ(DateTime::fromBinary(UINT64_MAX, true).text().substr(0, 8), "99999999");
 }
 
 TEST_P(Objects, PathsAndInstances) {
-    CMPIObjectPath* path = eft()->newObjectPath(mb(), "test/x", "Thing", nullptr);
-    path->ft->setHostname(path, "h");
-    path->ft->addKey(path, "Name", reinterpret_cast<const CMPIValue*>("a"), CMPI_chars);
-    EXPECT_EQ(path->ft->addKey(path, "", nullptr, CMPI_string).rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    EXPECT_TRUE(path->ft->getKey(path, "NAME", &rc).state & CMPI_keyValue);
-    path->ft->getKey(path, "none", &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NOT_FOUND);
-    path->ft->getClassQualifier(path, "Key", &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    CMPIObjectPath* path = CMNewObjectPath(m_mb, "test/x", "Thing", nullptr);
+    CMSetHostname(path, "h");
+    CMAddKey(path, "Name", "a", CMPI_chars);
+    EXPECT_EQ(CMAddKey(path, "", nullptr, CMPI_string).rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_TRUE(CMIsKeyValue(CMGetKey(path, "NAME", &m_rc)));
+    CMGetKey(path, "none", &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NOT_FOUND);
+    CMGetClassQualifier(path, "Key", &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NOT_SUPPORTED);
 
     // Key properties and path are one; a filter spares the keys.
-    CMPIInstance* inst = eft()->newInstance(mb(), path, nullptr);
-    EXPECT_EQ(textOf(inst->ft->getProperty(inst, "Name", nullptr).value.string), "a");
-    inst->ft->setProperty(inst, "Name", reinterpret_cast<const CMPIValue*>("b"), CMPI_chars);
-    inst->ft->setProperty(inst, "Old", reinterpret_cast<const CMPIValue*>("o"), CMPI_chars);
+    CMPIInstance* inst = CMNewInstance(m_mb, path, nullptr);
+    EXPECT_EQ(textOf(CMGetProperty(inst, "Name", nullptr).value.string), "a");
+    CMSetProperty(inst, "Name", "b", CMPI_chars);
+    CMSetProperty(inst, "Old", "o", CMPI_chars);
     const char* wanted[] = {"kept", nullptr};
-    inst->ft->setPropertyFilter(inst, wanted, nullptr);
+    CMSetPropertyFilter(inst, wanted, nullptr);
     for (const char* name : {"Kept", "Dropped"})
-        EXPECT_EQ(
-            inst->ft->setProperty(inst, name, reinterpret_cast<const CMPIValue*>("v"), CMPI_chars)
-                .rc,
-            CMPI_RC_OK);
-    const Instance seen = RequestScope::read(inst);
-    EXPECT_EQ(seen.properties, NamedValues({{"Name", "b"}, {"Kept", "v"}}));
-    EXPECT_EQ(textOf(eft()->toString(mb(), inst->ft->getObjectPath(inst, nullptr), nullptr)),
+        EXPECT_EQ(CMSetProperty(inst, name, "v", CMPI_chars).rc, CMPI_RC_OK);
+    EXPECT_EQ(RequestScope::read(inst).properties, NamedValues({{"Name", "b"}, {"Kept", "v"}}));
+    EXPECT_EQ(textOf(CDToString(m_mb, CMGetObjectPath(inst, nullptr), nullptr)),
               "//h/test/x:Thing.Name=\"b\"");
 
-    CMPIObjectPath* other = eft()->newObjectPath(mb(), "", "Other", nullptr);
-    other->ft->setHostAndNameSpaceFromObjectPath(other, path);
-    EXPECT_EQ(RequestScope::read(other), [] {
-        ObjectPath want("test/x", "Other");
-        want.host = "h";
-        return want;
-    }());
-    inst->ft->setObjectPath(inst, other);
-    EXPECT_EQ(RequestScope::read(inst).path.className, "Other");
-    EXPECT_TRUE(eft()->classPathIsA(mb(), other, "OTHER", &rc));
-    EXPECT_FALSE(eft()->classPathIsA(mb(), other, "Thing", &rc));
-    EXPECT_TRUE(eft()->isOfType(mb(), other, "CMPIObjectPath", nullptr));
-    EXPECT_EQ(textOf(eft()->getType(mb(), inst, nullptr)), "CMPIInstance");
+    CMPIObjectPath* other = CMNewObjectPath(m_mb, "", "Other", nullptr);
+    CMSetHostAndNameSpaceFromObjectPath(other, path);
+    CMSetObjectPath(inst, other);
+    EXPECT_EQ(textOf(CDToString(m_mb, CMGetObjectPath(inst, nullptr), nullptr)),
+              "//h/test/x:Other");
+    EXPECT_TRUE(CMClassPathIsA(m_mb, other, "OTHER", &m_rc));
+    EXPECT_FALSE(CMClassPathIsA(m_mb, other, "Thing", &m_rc));
+    EXPECT_TRUE(CDIsOfType(m_mb, other, "CMPIObjectPath", nullptr));
+    EXPECT_EQ(textOf(CDGetType(m_mb, inst, nullptr)), "CMPIInstance");
 }
 
 TEST_P(Objects, ReleasedObjectsAreCountedAndRefused) {
     const std::size_t live = m_server.liveObjects(), stale = m_server.staleUses();
     CMPIString* own = string("of the request");
-    CMPIString* clone = own->ft->clone(own, nullptr);
+    CMPIString* clone = CMClone(own, nullptr);
     EXPECT_EQ(m_server.liveObjects(), live + 2);
-    EXPECT_EQ(own->ft->release(own).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMRelease(own).rc, CMPI_RC_OK);
     EXPECT_EQ(m_server.liveObjects(), live + 1);
-    EXPECT_EQ(own->ft->release(own).rc, CMPI_RC_ERR_INVALID_HANDLE);
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    EXPECT_EQ(own->ft->getCharPtr(own, &rc), nullptr);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(CMRelease(own).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(CMGetCharsPtr(own, &m_rc), nullptr);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_INVALID_HANDLE);
     EXPECT_EQ(m_server.staleUses(), stale + 2);
 
     string("left behind");
     m_scope.reset();  // the request ends
     EXPECT_EQ(m_server.liveObjects(), 1U);
     EXPECT_EQ(textOf(clone), "of the request");
-    EXPECT_EQ(clone->ft->release(clone).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMRelease(clone).rc, CMPI_RC_OK);
     EXPECT_EQ(m_server.liveObjects(), 0U);
-    EXPECT_EQ(own->ft->getCharPtr(nullptr, &rc), nullptr);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(own->ft->getCharPtr(nullptr, &m_rc), nullptr);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_INVALID_HANDLE);
+}
+
+TEST_P(Objects, ManyObjectsEndInAnyOrder) {
+    const std::size_t live = m_server.liveObjects(), stale = m_server.staleUses();
+    std::vector<CMPIString*> clones;
+    for (int i = 0; i < 300; ++i) {
+        CMPIString* own = string(std::to_string(i).c_str());
+        clones.push_back(CMClone(own, nullptr));
+        EXPECT_EQ(CMRelease(own).rc, CMPI_RC_OK);
+    }
+    for (int step = 0; step < 300; ++step) {
+        CMPIString* clone = clones[step * 7U % 300];
+        EXPECT_EQ(textOf(clone), std::to_string(step * 7 % 300));
+        EXPECT_EQ(CMRelease(clone).rc, CMPI_RC_OK);
+        EXPECT_EQ(CMRelease(clone).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    }
+    EXPECT_EQ(m_server.liveObjects(), live);
+    EXPECT_EQ(m_server.staleUses(), stale + 300);
+}
+
+TEST_P(Objects, ChangesStayInTheObjectThatIsChanged) {
+    Reply reply;
+    const CMPIResult* result = m_scope->result(reply);
+    CMPIInstance* inst = m_scope->wrap(part());
+    CMPIInstance* clone = CMClone(inst, nullptr);
+    EXPECT_EQ(CMReturnInstance(result, inst).rc, CMPI_RC_OK);
+    CMPIValue value{};
+    value.uint16 = 8;
+    EXPECT_EQ(CMSetProperty(inst, "Id", &value, CMPI_uint16).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMSetProperty(inst, "More", &value, CMPI_uint16).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMReturnInstance(result, inst).rc, CMPI_RC_OK);
+    const Value eight(std::uint16_t{8});
+    EXPECT_EQ(reply.instances[0], part());
+    EXPECT_EQ(reply.instances[1], Instance({"test/x", "Part", {{"Id", eight}}},
+                                           {{"Id", eight}, {"Note", "n"}, {"More", eight}}));
+    EXPECT_EQ(RequestScope::read(clone), part());
+    CMRelease(clone);
 }
 
 TEST_P(Objects, MarksEndWhatCameAfterThem) {
     CMPIString* before = string("before");
     const std::size_t live = m_server.liveObjects();
-    CMPIGcStat* outer = mb()->mft->mark(mb(), nullptr);
+    CMPIGcStat* outer = m_mb->mft->mark(m_mb, nullptr);
     CMPIString* inside = string("inside");
-    CMPIGcStat* inner = mb()->mft->mark(mb(), nullptr);
+    CMPIGcStat* inner = m_mb->mft->mark(m_mb, nullptr);
     string("deep");
-    CMPIString* clone = inside->ft->clone(inside, nullptr);
+    CMPIString* clone = CMClone(inside, nullptr);
     EXPECT_EQ(m_server.liveObjects(), live + 3);
-    EXPECT_EQ(mb()->mft->release(mb(), outer).rc, CMPI_RC_OK);
+    EXPECT_EQ(m_mb->mft->release(m_mb, outer).rc, CMPI_RC_OK);
     EXPECT_EQ(m_server.liveObjects(), live + 1);
-    EXPECT_EQ(mb()->mft->release(mb(), inner).rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(m_mb->mft->release(m_mb, inner).rc, CMPI_RC_ERR_FAILED);
     EXPECT_EQ(textOf(before), "before");
     EXPECT_EQ(textOf(clone), "inside");
-    EXPECT_EQ(clone->ft->release(clone).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMRelease(clone).rc, CMPI_RC_OK);
     m_scope.reset();
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    EXPECT_EQ(mb()->mft->mark(mb(), &rc), nullptr);  // no request on this thread
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(m_mb->mft->mark(m_mb, &m_rc), nullptr);  // no request on this thread
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_FAILED);
 }
 
 TEST_P(Objects, OtherThreadsAttach) {
-    CMPIContext* handed = mb()->bft->prepareAttachThread(mb(), m_scope->context());
+    CMPIContext* handed = m_mb->bft->prepareAttachThread(m_mb, m_scope->context());
     CMPIString* fromThere = nullptr;
     std::thread([&] {
-        EXPECT_EQ(mb()->bft->detachThread(mb(), handed).rc, CMPI_RC_ERR_FAILED);
-        ASSERT_EQ(mb()->bft->attachThread(mb(), handed).rc, CMPI_RC_OK);
+        EXPECT_EQ(m_mb->bft->detachThread(m_mb, handed).rc, CMPI_RC_ERR_FAILED);
+        ASSERT_EQ(m_mb->bft->attachThread(m_mb, handed).rc, CMPI_RC_OK);
         CMPIString* made = string("there");
-        fromThere = made->ft->clone(made, nullptr);
-        EXPECT_EQ(mb()->bft->detachThread(mb(), handed).rc, CMPI_RC_OK);
+        fromThere = CMClone(made, nullptr);
+        EXPECT_EQ(m_mb->bft->detachThread(m_mb, handed).rc, CMPI_RC_OK);
     }).join();
     EXPECT_EQ(textOf(fromThere), "there");
-    fromThere->ft->release(fromThere);
+    CMRelease(fromThere);
     m_scope.reset();
     EXPECT_EQ(m_server.liveObjects(), 0U);
 }
@@ -256,17 +252,16 @@ TEST_P(Objects, ContextsTellTheRequest) {
     request.context.set("Extra", 5);
     RequestScope scope(m_server, request);
     CMPIContext* ctx = scope.context();
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    CMPIData user = ctx->ft->getEntry(ctx, CMPIPrincipal, &rc);
-    ASSERT_EQ(rc.rc, CMPI_RC_OK);
+    const CMPIData user = CMGetContextEntry(ctx, CMPIPrincipal, &m_rc);
+    ASSERT_EQ(m_rc.rc, CMPI_RC_OK);
     ASSERT_EQ(user.type, CMPI_string);
     EXPECT_EQ(textOf(user.value.string), lean() ? "(null)" : "");
-    EXPECT_EQ(textOf(ctx->ft->getEntry(ctx, CMPIAcceptLanguage, &rc).value.string), "de");
-    EXPECT_EQ(textOf(ctx->ft->getEntry(ctx, CMPIInitNameSpace, &rc).value.string), "root/cimv2");
-    EXPECT_EQ(ctx->ft->getEntry(ctx, CMPIInvocationFlags, &rc).value.uint32, 1U);
-    EXPECT_EQ(ctx->ft->getEntry(ctx, "Extra", &rc).value.sint32, 5);
-    ctx->ft->getEntry(ctx, CMPIRole, &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    EXPECT_EQ(textOf(CMGetContextEntry(ctx, CMPIAcceptLanguage, &m_rc).value.string), "de");
+    EXPECT_EQ(textOf(CMGetContextEntry(ctx, CMPIInitNameSpace, &m_rc).value.string), "root/cimv2");
+    EXPECT_EQ(CMGetContextEntry(ctx, CMPIInvocationFlags, &m_rc).value.uint32, 1U);
+    EXPECT_EQ(CMGetContextEntry(ctx, "Extra", &m_rc).value.sint32, 5);
+    CMGetContextEntry(ctx, CMPIRole, &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
 }
 
 // Null entries of a table behind its version, "" for a complete one.
@@ -282,25 +277,25 @@ std::string nullEntries(const T& table, std::size_t header) {
 }
 
 TEST_P(Objects, TablesAreCompleteOrEndEarly) {
-    CMPIObjectPath* path = eft()->newObjectPath(mb(), "n", "C", nullptr);
-    CMPIInstance* inst = eft()->newInstance(mb(), path, nullptr);
-    CMPISelectExp* query = eft()->newSelectExp(mb(), "SELECT * FROM C", "WQL", nullptr, nullptr);
+    CMPIObjectPath* path = CMNewObjectPath(m_mb, "n", "C", nullptr);
+    CMPIInstance* inst = CMNewInstance(m_mb, path, nullptr);
+    CMPISelectExp* query = CMNewSelectExp(m_mb, "SELECT * FROM C", "WQL", nullptr, nullptr);
     Reply reply;
     CMPIResult* result = m_scope->result(reply);
-    EXPECT_EQ(nullEntries(*mb()->bft, 16), "");
-    EXPECT_EQ(nullEntries(*mb()->xft, 8), "");
-    EXPECT_EQ(nullEntries(*eft(), 8), lean() ? "17 18 19 20 " : "");
+    EXPECT_EQ(nullEntries(*m_mb->bft, 16), "");
+    EXPECT_EQ(nullEntries(*m_mb->xft, 8), "");
+    EXPECT_EQ(nullEntries(*m_mb->eft, 8), lean() ? "17 18 19 20 " : "");
     EXPECT_EQ(nullEntries(*inst->ft, 8), lean() ? "10 " : "");
     EXPECT_EQ(nullEntries(*path->ft, 8), lean() ? "19 " : "");
     EXPECT_EQ(nullEntries(*result->ft, 8), lean() ? "7 " : "");
     EXPECT_EQ(nullEntries(*query->ft, 8), lean() ? "5 6 7 " : "");
-    EXPECT_EQ(mb()->mft->cmpiMalloc == nullptr, lean());
+    EXPECT_EQ(m_mb->mft->cmpiMalloc == nullptr, lean());
     EXPECT_EQ(inst->ft->ftVersion, lean() ? 1 : CMPIVersion200);
-    EXPECT_EQ(mb()->mft->ftVersion, lean() ? 0 : CMPIVersion200);
+    EXPECT_EQ(m_mb->mft->ftVersion, lean() ? 0 : CMPIVersion200);
     LogCollector log(m_server);
     const CMPIrc want = lean() ? CMPI_RC_ERR_NOT_SUPPORTED : CMPI_RC_OK;
-    EXPECT_EQ(eft()->logMessage(mb(), CMPI_SEV_ERROR, "Me", "text", nullptr).rc, want);
-    EXPECT_EQ(eft()->trace(mb(), static_cast<CMPILevel>(3), "Me", nullptr, string("s")).rc, want);
+    EXPECT_EQ(CMLogMessage(m_mb, CMPI_SEV_ERROR, "Me", "text", nullptr).rc, want);
+    EXPECT_EQ(CMTraceMessage(m_mb, static_cast<CMPILevel>(3), "Me", nullptr, string("s")).rc, want);
     EXPECT_EQ(log.lines().size(), lean() ? 0U : 2U);
     EXPECT_EQ(log.contains(LogLine::Kind::Message, 1, "Me", "tex"), !lean());
     EXPECT_EQ(log.contains(LogLine::Kind::Trace, 3, "Me", "s"), !lean());
@@ -315,6 +310,7 @@ protected:
     Server m_server;
     RequestScope m_scope{m_server};
     CMPIBroker* m_mb = m_server.broker();
+    CMPIStatus m_rc{CMPI_RC_OK, nullptr};
 };
 
 CMPIData accessSeverity(const char* name, void* parm) {
@@ -327,36 +323,34 @@ CMPIData accessSeverity(const char* name, void* parm) {
 
 TEST_F(FullObjects, QueriesHaveNormalForms) {
     CMPIArray* names = nullptr;
-    CMPISelectExp* query = m_mb->eft->newSelectExp(
+    CMPISelectExp* query = CMNewSelectExp(
         m_mb,
         "SELECT Severity, Text FROM Fix_Event WHERE (Severity > 3 OR Text LIKE 'a%') AND "
         "NOT Text IS NULL",
         "CIM:CQL", &names, nullptr);
     ASSERT_NE(query, nullptr);
-    EXPECT_EQ(names->ft->getSize(names, nullptr), 2U);
+    EXPECT_EQ(CMGetArrayCount(names, nullptr), 2U);
     int type = -1;
-    CMPISelectCond* doc = query->ft->getDOC(query, nullptr);
-    EXPECT_EQ(doc->ft->getCountAndType(doc, &type, nullptr), 2U);
+    CMPISelectCond* doc = CMGetDoc(query, nullptr);
+    EXPECT_EQ(CMGetSubCondCountAndType(doc, &type, nullptr), 2U);
     EXPECT_EQ(type, CMPI_COND_DOC);
-    CMPISelectCond* cod = query->ft->getCOD(query, nullptr);
-    EXPECT_EQ(cod->ft->getCountAndType(cod, &type, nullptr), 2U);
+    CMPISelectCond* cod = CMGetCod(query, nullptr);
+    EXPECT_EQ(CMGetSubCondCountAndType(cod, &type, nullptr), 2U);
     EXPECT_EQ(type, CMPI_COND_COD);
-    CMPISubCond* sub = doc->ft->getSubCondAt(doc, 0, nullptr);
-    ASSERT_EQ(sub->ft->getCount(sub, nullptr), 2U);
-    CMPIPredicate* predicate = sub->ft->getPredicate(sub, "severity", nullptr);
+    CMPISubCond* sub = CMGetSubCondAt(doc, 0, nullptr);
+    ASSERT_EQ(CMGetPredicateCount(sub, nullptr), 2U);
+    CMPIPredicate* predicate = CMGetPredicate(sub, "severity", nullptr);
     CMPIType literal = 0;
     CMPIPredOp op = CMPI_PredOp_Equals;
     CMPIString *left = nullptr, *right = nullptr;
-    EXPECT_EQ(predicate->ft->getData(predicate, &literal, &op, &left, &right).rc, CMPI_RC_OK);
+    EXPECT_EQ(CMGetPredicateData(predicate, &literal, &op, &left, &right).rc, CMPI_RC_OK);
     EXPECT_EQ(literal, CMPI_integerString);
     EXPECT_EQ(op, CMPI_PredOp_GreaterThan);
     EXPECT_EQ(textOf(left) + textOf(right), "Severity3");
-    for (const std::uint16_t severity : {std::uint16_t{3}, std::uint16_t{4}}) {
-        std::uint16_t value = severity;
-        EXPECT_EQ(
-            predicate->ft->evaluateUsingAccessor(predicate, accessSeverity, &value, nullptr) != 0,
-            severity > 3);
-        EXPECT_FALSE(query->ft->evaluateUsingAccessor(query, accessSeverity, &value, nullptr));
+    for (std::uint16_t value : {std::uint16_t{3}, std::uint16_t{4}}) {
+        EXPECT_EQ(CMEvaluatePredicateUsingAccessor(predicate, accessSeverity, &value, nullptr) != 0,
+                  value > 3);
+        EXPECT_FALSE(CMEvaluateSelExpUsingAccessor(query, accessSeverity, &value, nullptr));
     }
 }
 
@@ -367,10 +361,8 @@ TEST_F(FullObjects, QueriesSelect) {
                           {"When", DateTime::fromBinary(1000000, false)},
                           {"Source", part()},
                           {"Empty", Value::null(CMPI_string)}});
-    const struct {
-        const char* where;
-        int expected;  // 1, 0, or -1 for an invalid query
-    } rows[] = {
+    // What is expected: 1, 0, or -1 for an invalid query.
+    const std::pair<const char*, int> rows[] = {
         {"", 1},
         {"WHERE Severity = 5", 1},
         {"WHERE 4 < Severity AND Severity <= 5", 1},
@@ -391,46 +383,41 @@ TEST_F(FullObjects, QueriesSelect) {
         {"WHERE (Severity = 5", -1},
         {"WHERE Severity = 1x", -1},
     };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.where);
-        CMPIStatus rc{CMPI_RC_OK, nullptr};
-        CMPISelectExp* query = m_mb->eft->newSelectExp(
-            m_mb, (std::string("SELECT * FROM Fix_Event ") + row.where).c_str(), "WQL", nullptr,
-            &rc);
-        EXPECT_EQ(rc.rc, row.expected < 0 ? CMPI_RC_ERR_INVALID_QUERY : CMPI_RC_OK);
+    for (const auto& [where, expected] : rows) {
+        const std::string text = std::string("SELECT * FROM Fix_Event ") + where;
+        CMPISelectExp* query = CMNewSelectExp(m_mb, text.c_str(), "WQL", nullptr, &m_rc);
+        EXPECT_EQ(m_rc.rc, expected < 0 ? CMPI_RC_ERR_INVALID_QUERY : CMPI_RC_OK) << text;
         if (!query) continue;
-        EXPECT_EQ(query->ft->evaluate(query, m_scope.wrap(event), nullptr), row.expected);
+        EXPECT_EQ(CMEvaluateSelExp(query, m_scope.wrap(event), nullptr), expected) << text;
     }
-    CMPIStatus rc{CMPI_RC_OK, nullptr};
-    m_mb->eft->newSelectExp(m_mb, "SELECT * FROM X", "SQL", nullptr, &rc);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED);
+    CMNewSelectExp(m_mb, "SELECT * FROM X", "SQL", nullptr, &m_rc);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED);
     std::string wide = "SELECT * FROM X WHERE a=1";
     for (int i = 0; i < 20; ++i) wide += " AND (b=1 OR c=2)";
-    CMPISelectExp* query = m_mb->eft->newSelectExp(m_mb, wide.c_str(), "WQL", nullptr, &rc);
-    EXPECT_EQ(query->ft->getDOC(query, &rc), nullptr);
-    EXPECT_EQ(rc.rc, CMPI_RC_ERR_FAILED);
+    CMPISelectExp* query = CMNewSelectExp(m_mb, wide.c_str(), "WQL", nullptr, &m_rc);
+    EXPECT_EQ(CMGetDoc(query, &m_rc), nullptr);
+    EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_FAILED);
 }
 
 TEST_F(FullObjects, ErrorsAreReturned) {
-    CMPIError* error = m_mb->eft->newCMPIError(m_mb, "me", "E1", "broken", ErrorSevHigh, Timeout,
-                                               CMPI_RC_ERR_FAILED, nullptr);
-    error->ft->setErrorType(error, SoftwareError);
-    error->ft->setErrorSource(error, "here");
-    CMPIArray* actions = m_mb->eft->newArray(m_mb, 1, CMPI_chars, nullptr);
-    actions->ft->setElementAt(actions, 0, reinterpret_cast<const CMPIValue*>("wait"), CMPI_chars);
-    EXPECT_EQ(error->ft->setRecommendedActions(error, actions).rc, CMPI_RC_OK);
-    CMPIArray* numbers = m_mb->eft->newArray(m_mb, 1, CMPI_uint8, nullptr);
-    EXPECT_EQ(error->ft->setMessageArguments(error, numbers).rc, CMPI_RC_ERR_INVALID_PARAMETER);
-    EXPECT_EQ(error->ft->getErrorType(error, nullptr), SoftwareError);
-    EXPECT_EQ(error->ft->getPerceivedSeverity(error, nullptr), ErrorSevHigh);
-    EXPECT_EQ(error->ft->getCIMStatusCode(error, nullptr), CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(textOf(error->ft->getMessage(error, nullptr)), "broken");
-    EXPECT_EQ(error->ft->getOtherErrorType(error, nullptr), nullptr);
+    CMPIError* error = CMNewCMPIError(m_mb, "me", "E1", "broken", ErrorSevHigh, Timeout,
+                                      CMPI_RC_ERR_FAILED, nullptr);
+    CMSetErrorType(error, SoftwareError);
+    CMSetErrorSource(error, "here");
+    CMPIArray* actions = CMNewArray(m_mb, 1, CMPI_chars, nullptr);
+    CMSetArrayElementAt(actions, 0, "wait", CMPI_chars);
+    EXPECT_EQ(CMSetRecommendedActions(error, actions).rc, CMPI_RC_OK);
+    CMPIArray* numbers = CMNewArray(m_mb, 1, CMPI_uint8, nullptr);
+    EXPECT_EQ(CMSetMessageArguments(error, numbers).rc, CMPI_RC_ERR_INVALID_PARAMETER);
+    EXPECT_EQ(CMGetErrorType(error, nullptr), SoftwareError);
+    EXPECT_EQ(CMGetPerceivedSeverity(error, nullptr), ErrorSevHigh);
+    EXPECT_EQ(CMGetCIMStatusCode(error, nullptr), CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(textOf(CMGetErrorMessage(error, nullptr)), "broken");
+    EXPECT_EQ(CMGetOtherErrorType(error, nullptr), nullptr);
     Reply reply;
     CMPIResult* result = m_scope.result(reply);
-    EXPECT_EQ(result->ft->returnError(result, error).rc, CMPI_RC_OK);
-    ASSERT_EQ(reply.errors.size(), 1U);
-    EXPECT_EQ(*reply.errors[0].find("ErrorSource"), Value("here"));
+    EXPECT_EQ(CMReturnError(result, error).rc, CMPI_RC_OK);
+    EXPECT_EQ(*reply.errors.at(0).find("ErrorSource"), Value("here"));
 }
 
 TEST_F(FullObjects, MemoryAndThreadsOfProviders) {
@@ -452,6 +439,7 @@ TEST_F(FullObjects, MemoryAndThreadsOfProviders) {
         void *mutex, *condition;
         bool ready;
     } shared{xft, xft->newMutex(0), xft->newCondition(0), false};
+    xft->lockMutex(shared.mutex);  // so that it is waited for
     void* thread = xft->newThread(
         [](void* parm) -> void* {
             auto* s = static_cast<Shared*>(parm);
@@ -462,7 +450,6 @@ TEST_F(FullObjects, MemoryAndThreadsOfProviders) {
             return parm;
         },
         &shared, 0);
-    xft->lockMutex(shared.mutex);
     while (!shared.ready) xft->condWait(shared.condition, shared.mutex);
     xft->unlockMutex(shared.mutex);
     void* answer = nullptr;

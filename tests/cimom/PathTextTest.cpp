@@ -10,10 +10,7 @@ using namespace cimom;
 TEST(PathText, PathsRoundTrip) {
     ObjectPath onHost("test/a", "C", {{"k", 1}});
     onHost.host = "host.example";
-    const struct {
-        ObjectPath path;
-        const char* text;
-    } rows[] = {
+    const std::pair<ObjectPath, const char*> rows[] = {
         {{"", "Foo"}, "Foo"},
         {{"root/cimv2", "Foo"}, "root/cimv2:Foo"},
         {onHost, "//host.example/test/a:C.k=1"},
@@ -26,11 +23,11 @@ TEST(PathText, PathsRoundTrip) {
         {{"", "C", {{"c", Value::char16('\'')}, {"d", Value::char16(0x20AC)}}},
          R"(C.c='\'',d='\x20AC')"},
     };
-    for (const auto& row : rows) {
-        EXPECT_EQ(printPath(row.path), row.text);
-        EXPECT_EQ(printPath(parsePath(row.text)), row.text);
+    for (const auto& [path, text] : rows) {
+        EXPECT_EQ(printPath(path), text);
+        EXPECT_EQ(printPath(parsePath(text)), text);
     }
-    EXPECT_EQ(parsePath(rows[4].text), rows[4].path);
+    EXPECT_EQ(parsePath(rows[4].second), rows[4].first);
     EXPECT_EQ(parsePath("C. a = \"1\" , b = 2"),
               ObjectPath("", "C", {{"a", "1"}, {"b", std::int64_t{2}}}));
 }
@@ -52,11 +49,8 @@ TEST(PathText, KeysAreTypedByTheClass) {
 }
 
 TEST(PathText, ValuesAreReadByType) {
-    const struct {
-        const char* text;
-        CMPIType type;
-        Value expected;  // null: refused
-    } rows[] = {
+    // No value: refused.
+    const std::tuple<const char*, CMPIType, Value> rows[] = {
         {"5", CMPI_uint8, std::uint8_t{5}},
         {"256", CMPI_uint8, {}},
         {"-1", CMPI_uint32, {}},
@@ -79,12 +73,11 @@ TEST(PathText, ValuesAreReadByType) {
         {"{1", CMPI_uint16A, {}},
         {"{1}2", CMPI_uint16A, {}},
     };
-    for (const auto& row : rows) {
-        SCOPED_TRACE(row.text);
-        if (row.expected.isNull())
-            EXPECT_THROW(parseValue(row.text, row.type), Failure);
+    for (const auto& [text, type, expected] : rows) {
+        if (expected.isNull())
+            EXPECT_THROW(parseValue(text, type), Failure) << text;
         else
-            EXPECT_EQ(parseValue(row.text, row.type), row.expected);
+            EXPECT_EQ(parseValue(text, type), expected) << text;
     }
     EXPECT_EQ(guessValue("-7"), Value(std::int64_t{-7}));
     EXPECT_EQ(guessValue("\"7\""), Value("7"));
@@ -107,11 +100,8 @@ TEST(PathText, InstancesReadBackAsTheirClassSays) {
     const auto& classes = *fixture::classes();
     const Value read = parseValue(text.substr(text.find('\n') + 1), CMPI_instance, &classes);
     EXPECT_EQ(read.instance(), outer);
-    EXPECT_EQ(parseValue("{Fix_Thing{Size=1;}, instance of Fix_Base { Name = \"x\"; }}",
-                         CMPI_instanceA, &classes)
-                  .elements()
-                  .size(),
-              2U);
+    const char* const two = "{Fix_Thing{Size=1;}, instance of Fix_Base { Name = \"x\"; }}";
+    EXPECT_EQ(parseValue(two, CMPI_instanceA, &classes).elements().size(), 2U);
     for (const char* bad : {"Fix_Thing{Size=-1;}", "Fix_Thing{Sise=1;}", "Fix_Thing{Size=1;", "{}",
                             "Fix_Thing{Size=1;}x", "Fix_Thing{Size 1;}"})
         EXPECT_THROW(parseValue(bad, CMPI_instance, &classes), Failure) << bad;

@@ -2,11 +2,9 @@
 #include <gtest/gtest.h>
 #include <pthread.h>
 
-#include <functional>
-#include <memory>
 #include <new>
 #include <stdexcept>
-#include <string>
+#include <tuple>
 
 #include "CmpiAssociationMI.h"
 #include "CmpiIndicationMI.h"
@@ -17,10 +15,12 @@
 
 namespace {
 
+CmpiStatus succeed() { return CmpiStatus(CMPI_RC_OK); }
+
 /// What the provider does next, and what it saw.
 struct Script {
-    std::function<CmpiStatus()> operation = [] { return CmpiStatus(CMPI_RC_OK); };
-    std::function<CmpiStatus()> construct = operation, initialize = operation, cleanup = operation;
+    std::function<CmpiStatus()> operation = succeed;
+    std::function<CmpiStatus()> construct = succeed, initialize = succeed, cleanup = succeed;
     int unloadable = 1;
     int alive = 0;
     std::string called;
@@ -118,7 +118,7 @@ CmpiStatus answerText() { return CmpiStatus(CMPI_RC_ERR_FAILED, "answered"); }
 struct ProviderTest : testing::Test {
     ProviderTest() { script = &m_script; }
     ~ProviderTest() override {
-        m_script.cleanup = [] { return CmpiStatus(CMPI_RC_OK); };
+        m_script.cleanup = succeed;
         for (int i = 0; i < 5 && m_script.alive; ++i) cleanup(true);
         EXPECT_EQ(m_script.alive, 0);
     }
@@ -162,10 +162,7 @@ TEST_F(ProviderTest, EveryEntryReachesItsOperation) {
     const auto ctx = m_ctx;
     const auto r = m_result;
     const auto op = m_path;
-    const struct {
-        const char* called;
-        std::function<CMPIStatus()> entry;
-    } kEntries[] = {
+    const std::pair<const char*, std::function<CMPIStatus()>> kEntries[] = {
         {"enumNames", [=] { return i->ft->enumerateInstanceNames(i, ctx, r, op); }},
         {"enum", [=] { return i->ft->enumerateInstances(i, ctx, r, op, nullptr); }},
         {"get", [=] { return i->ft->getInstance(i, ctx, r, op, nullptr); }},
@@ -188,23 +185,19 @@ TEST_F(ProviderTest, EveryEntryReachesItsOperation) {
         {"enable", [=] { return n->ft->enableIndications(n, ctx); }},
         {"disable", [=] { return n->ft->disableIndications(n, ctx); }},
     };
-    for (const auto& e : kEntries) {
-        m_script.operation = [] { return CmpiStatus(CMPI_RC_OK); };
-        EXPECT_EQ(e.entry().rc, CMPI_RC_OK) << e.called;
-        EXPECT_EQ(m_script.called, e.called);
+    for (const auto& [called, entry] : kEntries) {
+        m_script.operation = succeed;
+        EXPECT_EQ(entry().rc, CMPI_RC_OK) << called;
+        EXPECT_EQ(m_script.called, called);
         m_script.operation = throwError;
-        EXPECT_EQ(text(e.entry()), "disk on fire") << e.called;
+        EXPECT_EQ(text(entry()), "disk on fire") << called;
     }
     EXPECT_EQ(FakeServer::bag(args).values.front().second.value.uint32, 7u);
     EXPECT_EQ(FakeServer::bag(r).values.front().second.value.sint64, INT64_MIN);
 }
 
 TEST_F(ProviderTest, NothingButAStatusCrosses) {
-    static const struct {
-        CmpiStatus (*operation)();
-        CMPIrc rc;
-        const char* text;
-    } kCases[] = {
+    static const std::tuple<CmpiStatus (*)(), CMPIrc, const char*> kCases[] = {
         {throwCode, CMPI_RC_ERR_ACCESS_DENIED, "(none)"},
         {throwText, CMPI_RC_ERR_NOT_FOUND, "no such host"},
         {throwError, CMPI_RC_ERR_FAILED, "disk on fire"},
@@ -213,11 +206,11 @@ TEST_F(ProviderTest, NothingButAStatusCrosses) {
         {answerText, CMPI_RC_ERR_FAILED, "answered"},
     };
     ASSERT_TRUE(load());
-    for (const auto& c : kCases) {
-        m_script.operation = c.operation;
+    for (const auto& [operation, rc, words] : kCases) {
+        m_script.operation = operation;
         const CMPIStatus status = enumerate();
-        EXPECT_EQ(status.rc, c.rc);
-        EXPECT_EQ(text(status), c.text);
+        EXPECT_EQ(status.rc, rc);
+        EXPECT_EQ(text(status), words);
     }
     // Without a way to make the text, the code still arrives.
     m_server.eft.newString = nullptr;
@@ -261,32 +254,27 @@ TEST_F(ProviderTest, RecordsWithoutAProviderAreRefused) {
     CmpiMethodMI methodsOnly(CmpiBroker(&m_server.broker), CmpiContext(m_ctx));
     CMPIInstanceMI wrongKind{static_cast<CmpiBaseMI*>(&methodsOnly), record->ft};
     EXPECT_EQ(enumNames(&wrongKind, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    CMPIMethodMI notOverridden{wrongKind.hdl, nullptr};
-    EXPECT_EQ(CmpiMethodMI::driveInvokeMethod(&notOverridden, m_ctx, m_result, m_path, "M", nullptr,
-                                              nullptr)
-                  .rc,
+    CMPIMethodMI bare{wrongKind.hdl, nullptr};  // its class overrides nothing
+    const auto invoke = CmpiMethodMI::driveInvokeMethod;
+    EXPECT_EQ(invoke(&bare, m_ctx, m_result, m_path, "M", nullptr, nullptr).rc,
               CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 TEST_F(ProviderTest, AFailingLoadLeavesNothing) {
-    static const struct {
-        std::function<CmpiStatus()> Script::*step;
-        CmpiStatus (*does)();
-        CMPIrc rc;
-        const char* text;
-    } kCases[] = {
+    using Step = std::function<CmpiStatus()> Script::*;
+    static const std::tuple<Step, CmpiStatus (*)(), CMPIrc, const char*> kCases[] = {
         {&Script::initialize, answerText, CMPI_RC_ERR_FAILED, "answered"},
         {&Script::initialize, throwText, CMPI_RC_ERR_NOT_FOUND, "no such host"},
         {&Script::initialize, throwNumber, CMPI_RC_ERR_FAILED, "The provider failed."},
         {&Script::construct, throwError, CMPI_RC_ERR_FAILED, "disk on fire"},
     };
-    for (const auto& c : kCases) {
-        m_script.*(c.step) = c.does;
+    for (const auto& [step, does, rc, words] : kCases) {
+        m_script.*step = does;
         EXPECT_EQ(load(), nullptr);
-        EXPECT_EQ(m_rc.rc, c.rc);
-        EXPECT_EQ(text(m_rc), c.text);
+        EXPECT_EQ(m_rc.rc, rc);
+        EXPECT_EQ(text(m_rc), words);
         EXPECT_EQ(m_script.alive, 0);
-        m_script.*(c.step) = [] { return CmpiStatus(CMPI_RC_OK); };
+        m_script.*step = succeed;
     }
     EXPECT_TRUE(load());
     EXPECT_EQ(m_rc.rc, CMPI_RC_OK);
@@ -328,7 +316,7 @@ TEST_F(ProviderTest, WhenAProviderMayStay) {
         if (c.cleanup) m_script.cleanup = c.cleanup;
         EXPECT_EQ(cleanup(c.terminating).rc, c.rc);
         EXPECT_EQ(m_script.alive, c.alive);
-        m_script.cleanup = [] { return CmpiStatus(CMPI_RC_OK); };
+        m_script.cleanup = succeed;
         m_script.unloadable = 1;
         // What stayed still has its one use: one more cleanup ends it.
         if (c.alive) cleanup(false);

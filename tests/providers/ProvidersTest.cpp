@@ -68,7 +68,7 @@ TEST_P(ProvidersTest, EveryPartitionOfEveryHostIsEnumeratedAndGot) {
     const Reply all = m_server->enumInstances(m_request, {"root/cimv2", kPartitionClass});
     ASSERT_EQ(all.rc, CMPI_RC_OK) << all.message;
     ASSERT_GE(all.instances.size(), 14u);
-    std::vector<ObjectPath> paths;
+    std::deque<ObjectPath> paths;
     for (const Instance& partition : all.instances) {
         paths.push_back(partition.path);
         const Reply one = m_server->getInstance(m_request, partition.path);
@@ -107,7 +107,7 @@ TEST_P(ProvidersTest, ClassesOfBothDoorsAgree) {
         const Reply byLibrary = m_server->enumInstances(m_request, {"root/cimv2", row.library});
         ASSERT_EQ(byLibrary.rc, CMPI_RC_OK) << byLibrary.message;
         ASSERT_EQ(byLibrary.instances.size(), byTools.instances.size()) << row.library;
-        std::vector<ObjectPath> paths;
+        std::deque<ObjectPath> paths;
         for (std::size_t i = 0; i < byTools.instances.size(); ++i) {
             const Instance& told = byLibrary.instances[i];
             const std::string name = textOf(byTools.instances[i], "Name");

@@ -15,13 +15,11 @@
 #include <vector>
 
 #include "AssociationProvider.h"
-#include "BaseProviderManager.h"
 #include "CmpiInstanceMI.h"
-#include "Exception.h"
+#include "FailureText.h"
 #include "MultiNtoNAssociationProvider.h"
 #include "NtoNAssociationProvider.h"
-#include "Server.h"
-#include "StringUtils.h"
+#include "ProviderFactories.h"
 
 inline constexpr const char* kNameSpace = "root/cimv2";
 inline const cimom::AssociationFilter kNone = {"Test_Link", "", "", ""};
@@ -139,18 +137,39 @@ private:
     }
 };
 
+/// What the script says of a provider under test, whatever its family.
+template <class Family>
+class Scripted : public Family {
+public:
+    template <class... Rest>
+    Scripted(const CmpiBroker& mb, const CmpiContext& ctx, Rest... rest)
+        : CmpiBaseMI(mb, ctx), Family(mb, ctx, rest...) {}
+    void addKeys(CmpiObjectPath& ncop, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
+                 const char* className) override {
+        world->hook("addKeys");
+        Family::addKeys(ncop, cop1, cop2, className);
+    }
+
+protected:
+    static auto supported() {
+        return static_cast<typename Family::SupportedOpType>(world->supported);
+    }
+    static bool isValid(const CmpiObjectPath& cop1, const CmpiObjectPath& cop2) {
+        return world->valid(nameOf(cop1), nameOf(cop2));
+    }
+};
+
 /// The providers under test, one of each family.
-class Rows : public zemAssociationProvider {
+class Rows : public Scripted<zemAssociationProvider> {
 public:
     Rows(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx),
-          zemAssociationProvider(mb, ctx, name, static_cast<SupportedOpType>(world->supported)) {
+        : CmpiBaseMI(mb, ctx), Scripted(mb, ctx, name, supported()) {
         for (const Row& r : world->rows)
             addAssoData(new zemAssociationData(r[0], r[1], r[2], r[3], r[4], r[5], r[6], r[7]));
     }
     bool isValidateAssociation(const CmpiContext&, const zemAssociationData&,
                                const CmpiObjectPath& cop1, const CmpiObjectPath& cop2) override {
-        return world->valid(nameOf(cop1), nameOf(cop2));
+        return isValid(cop1, cop2);
     }
     bool BeforeGenerateAssociation(const CmpiContext&, const char*) override {
         return world->hook("before");
@@ -158,78 +177,39 @@ public:
     void AfterGenerateAssociation(const CmpiContext&, const char*) override {
         world->hook("after");
     }
-    void addKeys(CmpiObjectPath& ncop, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
-                 const char* className) override {
-        world->hook("addKeys");
-        zemAssociationProvider::addKeys(ncop, cop1, cop2, className);
-    }
 };
 
-class Pair : public zemNtoNAssociationProvider {
+class Pair : public Scripted<zemNtoNAssociationProvider> {
 public:
     Pair(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx),
-          zemNtoNAssociationProvider(mb, ctx, name, "Test_Link", world->class1.c_str(),
-                                     world->class2.c_str(), "Left", "Right",
-                                     static_cast<SupportedOpType>(world->supported), "", "", "") {}
+          Scripted(mb, ctx, name, "Test_Link", world->class1.c_str(), world->class2.c_str(), "Left",
+                   "Right", supported(), "", "", "") {}
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& cop1,
                                const CmpiObjectPath& cop2) override {
-        return world->valid(nameOf(cop1), nameOf(cop2));
+        return isValid(cop1, cop2);
     }
     bool BeforeGenerateAssociation(const CmpiContext&) override { return world->hook("before"); }
     void AfterGenerateAssociation(const CmpiContext&) override { world->hook("after"); }
-    void addKeys(CmpiObjectPath& ncop, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
-                 const char* className) override {
-        world->hook("addKeys");
-        zemNtoNAssociationProvider::addKeys(ncop, cop1, cop2, className);
-    }
 };
 
-class Pairs : public zemMultiNtoNAssociationProvider {
+class Pairs : public Scripted<zemMultiNtoNAssociationProvider> {
 public:
     Pairs(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx),
-          zemMultiNtoNAssociationProvider(mb, ctx, name, "Test_Link", world->pairs.c_str(), "Left",
-                                          "Right", static_cast<SupportedOpType>(world->supported),
-                                          "", "", "") {}
+          Scripted(mb, ctx, name, "Test_Link", world->pairs.c_str(), "Left", "Right", supported(),
+                   "", "", "") {}
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& cop1,
                                const CmpiObjectPath& cop2) override {
-        return world->valid(nameOf(cop1), nameOf(cop2));
-    }
-    void addKeys(CmpiObjectPath& ncop, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
-                 const char* className) override {
-        world->hook("addKeys");
-        zemMultiNtoNAssociationProvider::addKeys(ncop, cop1, cop2, className);
+        return isValid(cop1, cop2);
     }
     using zemMultiNtoNAssociationProvider::aggregateReferenceClasses;
     using zemMultiNtoNAssociationProvider::m_aFirstClassName;
     using zemMultiNtoNAssociationProvider::m_aSecondClassName;
 };
 
-/// CMPI factories of a provider class, one object for all.
-template <class Provider>
-struct FactoriesOf {
-    static CmpiBaseMI* create(const CmpiBroker& mb, const CmpiContext& ctx, const char* name) {
-        return new Provider(mb, ctx, name);
-    }
-    static CMPIInstanceMI* instance(const CMPIBroker* mb, const CMPIContext* ctx, CMPIStatus* rc) {
-        return zemBaseProviderManager::getInstanceMI(const_cast<CMPIBroker*>(mb),
-                                                     const_cast<CMPIContext*>(ctx),
-                                                     typeid(Provider).name(), rc, create);
-    }
-    static CMPIAssociationMI* association(const CMPIBroker* mb, const CMPIContext* ctx,
-                                          CMPIStatus* rc) {
-        return zemBaseProviderManager::getAssociationMI(const_cast<CMPIBroker*>(mb),
-                                                        const_cast<CMPIContext*>(ctx),
-                                                        typeid(Provider).name(), rc, create);
-    }
-};
-
 /// The result of a request as a provider sees it, for workers that are called directly.
-class DirectResult : public CmpiResult {
-public:
-    explicit DirectResult(CMPIResult* result) : CmpiResult(result) {}
-};
+using DirectResult = FromServer<CmpiResult>;
 
 inline cimom::ObjectPath objectPath(const std::string& name) {
     static const std::map<char, const char*> classes = {
@@ -271,10 +251,8 @@ public:
         : server({character, "", {}, classes()}), scope(reset(server)) {
         server.registerProvider("Objects",
                                 {"Test_System", "Test_BigSystem", "Test_Disk", "Test_Port"},
-                                {&FactoriesOf<Objects>::instance});
-        server.registerProvider(
-            "UnderTest", {"Test_Link"},
-            {&FactoriesOf<Provider>::instance, &FactoriesOf<Provider>::association});
+                                FactoriesOf<Objects>::all());
+        server.registerProvider("UnderTest", {"Test_Link"}, FactoriesOf<Provider>::all());
     }
     ~World() { EXPECT_EQ(0U, server.staleUses()); }
 

@@ -1,8 +1,8 @@
 #include <algorithm>
 #include <atomic>
 #include <random>
-#include <thread>
 
+#include "OnThreads.h"
 #include "ProviderHarness.h"
 
 namespace {
@@ -52,27 +52,20 @@ protected:
 
     template <class MI>
     Record take(MI* (*factory)(CMPIBroker*, CMPIContext*, const char*, CMPIStatus*, createMI),
-                const char* name, createMI create, CMPIContext* ctx) {
+                const char* name, CMPIContext* ctx, createMI create) {
         CMPIStatus status = {CMPI_RC_ERR_FAILED, nullptr};
         MI* mi = factory(server.broker(), ctx, name, &status, create);
         EXPECT_EQ(CMPI_RC_OK, status.rc);
         return {mi, [=](bool terminating) { return mi->ft->cleanup(mi, ctx, terminating).rc; }};
     }
-    Record get(int kind, const char* name = "P", createMI create = Harness::make<CountedProvider>,
-               CMPIContext* ctx = nullptr) {
-        if (ctx == nullptr) ctx = scope.context();
-        switch (kind) {
-            case 0:
-                return take(M::getInstanceMI, name, create, ctx);
-            case 1:
-                return take(M::getAssociationMI, name, create, ctx);
-            case 2:
-                return take(M::getMethodMI, name, create, ctx);
-            case 3:
-                return take(M::getIndicationMI, name, create, ctx);
-            default:
-                return take(M::getPropertyMI, name, create, ctx);
-        }
+    Record get(int kind, const char* name = "P", CMPIContext* context = nullptr,
+               createMI create = FactoriesOf<CountedProvider>::create) {
+        CMPIContext* ctx = context != nullptr ? context : scope.context();
+        return kind == 0   ? take(M::getInstanceMI, name, ctx, create)
+               : kind == 1 ? take(M::getAssociationMI, name, ctx, create)
+               : kind == 2 ? take(M::getMethodMI, name, ctx, create)
+               : kind == 3 ? take(M::getIndicationMI, name, ctx, create)
+                           : take(M::getPropertyMI, name, ctx, create);
     }
 
     cimom::Server server;
@@ -134,34 +127,28 @@ TEST_F(BaseProviderManager, AnswersNullWhenCreationFails) {
     const createMI failing[] = {
         [](const CmpiBroker&, const CmpiContext&, const char*) -> CmpiBaseMI* { return nullptr; },
         [](const CmpiBroker&, const CmpiContext&, const char*) -> CmpiBaseMI* { throw 1; }};
-    for (createMI create : failing) EXPECT_EQ(nullptr, get(0, "P", create).mi);
+    for (createMI create : failing) EXPECT_EQ(nullptr, get(0, "P", nullptr, create).mi);
     CMPIInstanceMI foreign = {nullptr, nullptr};  // a record that is none of the manager's
     EXPECT_EQ(CMPI_RC_OK, M::cleanupInstanceMI(&foreign, scope.context(), false).rc);
 }
 
 TEST_F(BaseProviderManager, CountsExactlyInAnyOrderAndFromManyThreads) {
-    std::vector<std::thread> threads;
-    for (unsigned t = 0; t < 4; ++t) {
-        threads.emplace_back([this, t] {
-            cimom::RequestScope own(server);
-            const std::string name = "T" + std::to_string(t);
-            std::mt19937 random(t);
-            CMPIObjectPath* path = own.wrap(cimom::ObjectPath("root/cimv2", "Test_Disk"));
-            for (int round = 0; round < 250; ++round) {
-                std::vector<Record> records;
-                for (int kind = 0; kind < kKinds; ++kind) {
-                    records.push_back(
-                        get(kind, name.c_str(), Harness::make<CountedProvider>, own.context()));
-                }
-                auto* mi = static_cast<CMPIInstanceMI*>(records[0].mi);
-                EXPECT_EQ(CMPI_RC_ERR_NOT_SUPPORTED,
-                          mi->ft->enumerateInstanceNames(mi, own.context(), nullptr, path).rc);
-                std::shuffle(records.begin(), records.end(), random);
-                for (const Record& r : records) EXPECT_EQ(CMPI_RC_OK, r.cleanup(round % 2 == 0));
-            }
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
+    onThreads(4, [this](int number) {
+        cimom::RequestScope own(server);
+        const std::string name = "T" + std::to_string(number);
+        std::mt19937 random(static_cast<unsigned>(number));
+        CMPIObjectPath* path = own.wrap(cimom::ObjectPath("root/cimv2", "Test_Disk"));
+        for (int round = 0; round < 250; ++round) {
+            std::vector<Record> records;
+            for (int kind = 0; kind < kKinds; ++kind)
+                records.push_back(get(kind, name.c_str(), own.context()));
+            auto* mi = static_cast<CMPIInstanceMI*>(records[0].mi);
+            EXPECT_EQ(CMPI_RC_ERR_NOT_SUPPORTED,
+                      mi->ft->enumerateInstanceNames(mi, own.context(), nullptr, path).rc);
+            std::shuffle(records.begin(), records.end(), random);
+            for (const Record& r : records) EXPECT_EQ(CMPI_RC_OK, r.cleanup(round % 2 == 0));
+        }
+    });
     EXPECT_EQ(1000, made);
     EXPECT_EQ(1000, cleaned);
 }

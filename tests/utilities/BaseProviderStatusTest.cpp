@@ -1,7 +1,4 @@
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
-
+#include "../cimom/Folder.h"
 #include "ProviderHarness.h"
 
 namespace {
@@ -24,49 +21,35 @@ protected:
     zemBaseProvider& p;
 };
 
-// Kind and text of what a call throws; its standard output goes to @p output.
-std::string raised(const std::function<void()>& call, std::string* output = nullptr) {
-    testing::internal::CaptureStdout();
-    std::string text;
-    try {
-        call();
-    } catch (const zemException& e) {
-        text = std::to_string(e.getExceptionType()) + " " + e.getExceptionString();
-    }
-    const std::string lines = testing::internal::GetCapturedStdout();
-    if (output != nullptr) *output = lines;
-    return text;
-}
-
 TEST_P(BaseProviderStatus, ThrowsTheFamily) {
     const std::pair<std::function<void()>, std::string> rows[] = {
         {[&] { p.throwMethodNotSupportedExc("M", "K"); },
-         "4 Method M on provider TestProvider is not supported for class K."},
+         "4/Method M on provider TestProvider is not supported for class K."},
         {[&] { p.throwMethodNotFoundExc("M", "K"); },
-         "8 CIM_ERR_METHOD_NOT_FOUND (The invoked method  M is not supported for class K)"},
+         "8/CIM_ERR_METHOD_NOT_FOUND (The invoked method  M is not supported for class K)"},
         {[&] { p.throwUserAccessDeniedExc("M", "K", nullptr); },
-         "1 User  is not authorized to utilize M operation of class K on provider TestProvider."},
+         "1/User  is not authorized to utilize M operation of class K on provider TestProvider."},
         {[&] { p.throwKeyValueDoesntMatchExc("M", "K", "k", "1", "2"); },
-         "3 A key provided for class K to method M on provider TestProvider had an unexpected "
+         "3/A key provided for class K to method M on provider TestProvider had an unexpected "
          "value. A value of 1 was provided for key k instead of the expected value of 2."},
         {[&] { p.throwInvalidPropertyExc("M", "K", "100%s$M"); },
-         "3 Invalid property name 100%s$M for class K is provided to method M on provider "
+         "3/Invalid property name 100%s$M for class K is provided to method M on provider "
          "TestProvider."},
         {[&] { p.throwDuplicateMethodArgExc("a", "M"); },
-         "3 Duplicate method argument a when invoking method M on provider TestProvider."},
+         "3/Duplicate method argument a when invoking method M on provider TestProvider."},
         {[&] { p.throwParameterNotFoundExc("a"); },
-         "3 Parameter a is not found in provided parameters."},
+         "3/Parameter a is not found in provided parameters."},
     };
     for (const auto& [call, text] : rows) {
-        std::string output;
-        EXPECT_EQ(text, raised(call, &output));
-        EXPECT_NE(std::string::npos, output.find("> Exception: " + text.substr(2) + "\n"));
-        EXPECT_EQ(text[0] == '4' || text[0] == '8',
-                  output.find("Exc <-\n") != std::string::npos);  // these tell the console as well
-        EXPECT_EQ(text[0] == '4', output.find("\nzemMethodNotFoundException:errMessage:" +
-                                              text.substr(2)) != std::string::npos);
-        EXPECT_EQ(text[0] == '8', output.find("\nthrowMethodNotFoundExc:errMessage:" +
-                                              text.substr(2)) != std::string::npos);
+        testing::internal::CaptureStdout();
+        EXPECT_EQ(text, failureText(call, "kt"));
+        const std::string output = testing::internal::GetCapturedStdout();
+        const std::string words = text.substr(2), told = "errMessage:" + words;
+        const auto says = [&](const std::string& line) { return output.find(line) != line.npos; };
+        EXPECT_TRUE(says("> Exception: " + words + "\n"));
+        EXPECT_EQ(text[0] == '4' || text[0] == '8', says("Exc <-\n"));  // the console is told, too
+        EXPECT_EQ(text[0] == '4', says("\nzemMethodNotFoundException:" + told));
+        EXPECT_EQ(text[0] == '8', says("\nthrowMethodNotFoundExc:" + told));
     }
 }
 
@@ -153,27 +136,25 @@ TEST_P(BaseProviderStatus, ReadsUserAndLanguageOfTheRequest) {
 ON_BOTH_BROKERS(BaseProviderStatus);
 
 TEST(BaseProviderBundle, GivesTheTranslatedText) {
-    char folder[] = "/tmp/zemmessagesXXXXXX";
-    ASSERT_NE(nullptr, mkdtemp(folder));
-    std::ofstream(std::string(folder) + "/default_de.json") << R"json({
+    const fixture::Folder folder;
+    folder.write("default_de.json", R"json({
         "Error.KeyNotFound": "Schluessel {0} fehlt ({1},{2},{3})",
-        "Error.InvalidMethodArgValue": "nie gelesen"})json";
-    std::ofstream(std::string(folder) + "/own.json") << R"json({"Own.Text": "{0}{1}{2}"})json";
+        "Error.InvalidMethodArgValue": "nie gelesen"})json");
+    folder.write("own.json", R"json({"Own.Text": "{0}{1}{2}"})json");
     cimom::Request request;
     request.language = "de";
-    Harness h(Character::Full, Harness::make<ScriptedProvider>, request, folder);
+    Harness h(Character::Full, FactoriesOf<ScriptedProvider>::create, request, folder / "");
     zemBaseProvider& p = h.provider();
 
-    EXPECT_EQ("3 Schluessel k fehlt (K,M,TestProvider)",
-              raised([&] { p.throwKeyNotFoundExc("M", "K", "k"); }));
+    EXPECT_EQ("3/Schluessel k fehlt (K,M,TestProvider)",
+              failureText([&] { p.throwKeyNotFoundExc("M", "K", "k"); }, "kt"));
     EXPECT_EQ(
-        "3 Invalid value of v is provided for parameter a to method M on provider TestProvider.",
-        raised([&] { p.throwInvalidMethodArgValueExc("a", "v", "M"); }));
-    EXPECT_EQ("3 Duplicate key k for class K is provided to method M on provider TestProvider.",
-              raised([&] { p.throwDuplicateKeyExc("M", "K", "k"); }));
+        "3/Invalid value of v is provided for parameter a to method M on provider TestProvider.",
+        failureText([&] { p.throwInvalidMethodArgValueExc("a", "v", "M"); }, "kt"));
+    EXPECT_EQ("3/Duplicate key k for class K is provided to method M on provider TestProvider.",
+              failureText([&] { p.throwDuplicateKeyExc("M", "K", "k"); }, "kt"));
     script.bundle = "own";  // the list of inserts ends at the first null
     EXPECT_STREQ("12{2}", p.retrieveLocalizedString("Own.Text", "?", "1", "2", nullptr, "4"));
-    std::filesystem::remove_all(folder);
 }
 
 }  // namespace

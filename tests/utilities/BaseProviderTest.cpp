@@ -1,23 +1,14 @@
-#include <cstdlib>
-#include <fstream>
-#include <thread>
+#include <tuple>
 
 #include "ProviderHarness.h"
+#include "TimingTrace.h"
 
 namespace {
 
 using cimom::Character;
 
 bool enabled = true;
-const std::string kTimingFile = "/tmp/zemBaseProviderTest." + std::to_string(getpid());
-
-// The timing trace reads its environment once, at the first operation of the process.
-const bool timingOn = [] {
-    setenv("VM_CIMPROVIDER_TRACE", "1", 1);
-    setenv("VM_CIMPROVIDER_TRACE_PATH", kTimingFile.c_str(), 1);
-    std::atexit([] { std::remove(kTimingFile.c_str()); });
-    return true;
-}();
+const TimingTrace timing("zemBaseProviderTest");
 
 }  // namespace
 
@@ -97,9 +88,8 @@ const Operation kOperations[] = {
 // clang-format on
 
 Answer call(Harness& h, const std::string& name) {
-    for (const Operation& op : kOperations) {
+    for (const Operation& op : kOperations)
         if (name == op.name) return op.call(h);
-    }
     throw std::out_of_range(name);
 }
 
@@ -132,12 +122,11 @@ TEST_P(BaseProvider, SucceedsInItsSteps) {
         EXPECT_EQ(CMPI_RC_OK, answer.rc) << answer.text;
         EXPECT_EQ(op.done, answer.reply.done);
         ASSERT_FALSE(script.calls.empty());
-        EXPECT_EQ(0U,
-                  script.calls.back().find(op.worker));  // filters go by the class, not the event
+        // Filters go by the class, not the event.
+        EXPECT_EQ(0U, script.calls.back().find(op.worker));
         EXPECT_EQ(op.exits, answer.traced(std::string("Exiting method ") + op.name));
-        if (op.banner[0] != '\0') {
-            EXPECT_EQ(1, answer.traced(std::string(op.banner) + ".*Test_Disk.*")) << answer.output;
-        }
+        if (op.banner[0] == '\0') continue;
+        EXPECT_EQ(1, answer.traced(std::string(op.banner) + ".*Test_Disk.*")) << answer.output;
     }
 }
 
@@ -160,9 +149,8 @@ TEST_P(BaseProvider, RefusesClassesItDoesNotServe) {
         EXPECT_FALSE(answer.reply.done);
     }
     script.instanceClass = script.associationClass = true;
-    for (const char* name : {"setInstance", "createInstance", "deleteInstance", "setProperty"}) {
+    for (const char* name : {"setInstance", "createInstance", "deleteInstance", "setProperty"})
         EXPECT_EQ(CMPI_RC_ERR_NOT_SUPPORTED, call(h, name).rc);
-    }
     script.associationClass = false;  // that of the filter counts, where it is given
     EXPECT_EQ(notSupported("references", "Test_Link"),
               h.call(h.association, &A::references, h.path(), "Test_Link", no, no).text);
@@ -170,7 +158,7 @@ TEST_P(BaseProvider, RefusesClassesItDoesNotServe) {
 }
 
 TEST(BaseProviderDefaults, RefuseWhatIsNotOverridden) {
-    Harness plain(Character::Full, Harness::make<PlainProvider>);
+    Harness plain(Character::Full, FactoriesOf<PlainProvider>::create);
     for (const Operation& op : kOperations) {
         if (op.unsupported == nullptr) continue;
         EXPECT_EQ(1, op.call(plain).traced("Exception: " + notSupported(op.unsupported)))
@@ -181,55 +169,42 @@ TEST(BaseProviderDefaults, RefuseWhatIsNotOverridden) {
     EXPECT_EQ(CMPI_RC_OK, call(plain, "authorizeFilter").rc);
 }
 
-// What a worker throws, and the code that an enumeration makes of it.
-struct Failure {
-    std::function<void()> raise;
-    CMPIrc rc;
-    CMPIrc enumeration;
-    bool isStatus;
-};
-
-Failure exception(int kind, CMPIrc rc, CMPIrc enumeration) {
-    return {[kind] { throw zemException(kind, "it is so"); }, rc, enumeration, false};
-}
-
-Failure status(CMPIrc rc, CMPIrc enumeration) {
-    return {[rc] { throw CmpiStatus(rc, "it is so"); }, rc, enumeration, true};
-}
-
 TEST_P(BaseProvider, AnswersFailuresByTheRuleOfTheOperation) {
-    const Failure failures[] = {
-        exception(1, CMPI_RC_ERR_ACCESS_DENIED, CMPI_RC_OK),
-        exception(3, CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER),
-        exception(4, CMPI_RC_ERR_NOT_SUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED),
-        exception(5, CMPI_RC_ERR_NOT_FOUND, CMPI_RC_OK),
-        exception(6, CMPI_RC_ERR_FAILED, CMPI_RC_ERR_FAILED),
-        status(CMPI_RC_ERR_FAILED, CMPI_RC_OK),
-        status(CMPI_RC_ERR_NOT_FOUND, CMPI_RC_OK),
-        status(CMPI_RC_ERR_NOT_SUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED),
-        status(CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER),
+    // kind of exception, 0 for a status; its code; that of an enumeration
+    const std::tuple<int, CMPIrc, CMPIrc> failures[] = {
+        {1, CMPI_RC_ERR_ACCESS_DENIED, CMPI_RC_OK},
+        {3, CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER},
+        {4, CMPI_RC_ERR_NOT_SUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED},
+        {5, CMPI_RC_ERR_NOT_FOUND, CMPI_RC_OK},
+        {6, CMPI_RC_ERR_FAILED, CMPI_RC_ERR_FAILED},
+        {0, CMPI_RC_ERR_FAILED, CMPI_RC_OK},
+        {0, CMPI_RC_ERR_NOT_FOUND, CMPI_RC_OK},
+        {0, CMPI_RC_ERR_NOT_SUPPORTED, CMPI_RC_ERR_NOT_SUPPORTED},
+        {0, CMPI_RC_ERR_INVALID_PARAMETER, CMPI_RC_ERR_INVALID_PARAMETER},
     };
     for (const Operation& op : kOperations) {
-        for (const Failure& failure : failures) {
-            SCOPED_TRACE(std::string(op.name) + " " + std::to_string(failure.rc) +
-                         (failure.isStatus ? " status" : " exception"));
-            const std::string worker(op.worker);
-            script.actions = {{worker.substr(0, worker.find(' ')), failure.raise}};
+        for (const auto& [kind, failure, enumeration] : failures) {
+            const std::string worker(op.worker), code = zemBaseProvider::cmpiRcToString(failure);
+            SCOPED_TRACE(worker + " kind " + std::to_string(kind) + " " + code);
+            script.actions[worker.substr(0, worker.find(' '))] = [kind = kind, rc = failure] {
+                if (kind == 0) throw CmpiStatus(rc, "it is so");
+                throw zemException(kind, "it is so");
+            };
             const Answer answer = op.call(h);
-            const bool wrapped = op.rule == kMethod && !failure.isStatus;
-            const CMPIrc rc = op.rule == kEnumeration ? failure.enumeration
+            const bool wrapped = op.rule == kMethod && kind != 0;
+            const CMPIrc rc = op.rule == kEnumeration ? enumeration
                               : wrapped               ? CMPI_RC_ERR_FAILED
-                                                      : failure.rc;
+                                                      : failure;
             EXPECT_EQ(rc, answer.rc);
             EXPECT_EQ(rc == CMPI_RC_OK || op.rule == kIndication ? ""
                       : wrapped                                  ? general("it is so")
                                                                  : "it is so",
                       answer.text);
             EXPECT_FALSE(answer.reply.done);
-            const std::string code = zemBaseProvider::cmpiRcToString(failure.rc);
-            EXPECT_EQ(failure.isStatus, answer.traced("CMPI STATUS:" + code + "  it is so"));
+            EXPECT_EQ(kind == 0, answer.traced("CMPI STATUS:" + code + "  it is so"));
             EXPECT_EQ(rc == CMPI_RC_OK, answer.traced("LOG MESSAGE: " + code + ": it is so"));
         }
+        script.actions.clear();
     }
     script.actions = {{"performEnableIndications", [] { throw 3; }}};
     EXPECT_THROW(h.provider().enableIndications(CmpiContext(h.ctx())), int);
@@ -272,12 +247,11 @@ TEST_P(BaseProvider, ValidatesNamesAndKeys) {
     script.keys.clear();  // an instance without properties is not looked at
     EXPECT_EQ(CMPI_RC_OK, h.call(h.instance, &I::createInstance, h.classPath(), h.disk({})).rc);
     script.name = "other";
-    for (const std::string name : {"getInstance", "getProperty"}) {
+    for (const std::string name : {"getInstance", "getProperty"})
         EXPECT_EQ("A key provided for class Test_Disk to method " + name +
                       " on provider TestProvider had an unexpected value. A value of d1 was "
                       "provided for key Name instead of the expected value of other.",
                   call(h, name).text);
-    }
 }
 
 TEST_P(BaseProvider, AnswersAndSetsOneProperty) {
@@ -364,14 +338,9 @@ TEST_P(BaseProvider, TimesItsOperations) {
     call(h, "enumInstanceNames");
 
     const std::string key = "-TestProvider-" + h.className + " ";
-    std::string lines;
+    const std::string lines =
+        timing.waitFor("enumInstanceNames" + key, [&] { call(h, "associators"); });
     const auto has = [&](const std::string& text) { return lines.find(text) != std::string::npos; };
-    for (int wait = 0; wait < 100 && !has("enumInstanceNames" + key); ++wait) {
-        std::this_thread::sleep_for(std::chrono::milliseconds(50));
-        for (int i = 0; i < 10; ++i) call(h, "associators");  // fills the queue
-        std::ifstream file(kTimingFile);
-        lines = std::string(std::istreambuf_iterator<char>(file), {});
-    }
     // The number under which an operation begins or ends.
     const auto number = [&](const std::string& start, const std::string& word) {
         std::smatch match;

@@ -41,28 +41,13 @@ public:
 class BaseZemProvider : public BothBrokers {
 protected:
     BaseZemProvider()
-        : h(GetParam(), Harness::make<DiskProvider>),
+        : h(GetParam(), FactoriesOf<DiskProvider>::create),
           service(CmpiBroker(h.server.broker()), CmpiContext(h.ctx())),
           disk(h.disk({{"Name", "d1"},
                        {"Size", std::uint32_t{7}},
                        {"Caption", cimom::Value::null(CMPI_string)}})) {}
 
-    struct Instance : CmpiInstance {
-        explicit Instance(CMPIInstance* raw) : CmpiInstance(raw) {}
-    };
-
-    // The text of what a call throws, after its kind.
-    static std::string thrown(const std::function<void()>& call) {
-        testing::internal::CaptureStdout();
-        std::string text;
-        try {
-            call();
-        } catch (const zemException& e) {
-            text = std::to_string(e.getExceptionType()) + " " + e.getExceptionString();
-        }
-        testing::internal::GetCapturedStdout();
-        return text;
-    }
+    using Instance = FromServer<CmpiInstance>;
 
     Harness h;
     ServiceProvider service;
@@ -74,25 +59,25 @@ TEST_P(BaseZemProvider, ReadsPropertiesByType) {
     EXPECT_TRUE(zemIsMissing(service.getInstanceProperty(disk, "None", CMPI_uint32)));
     EXPECT_TRUE(zemIsMissing(service.getInstanceProperty(disk, "Caption", CMPI_uint32)));
     EXPECT_EQ(
-        "3 The data type(\"uint32\") of property \"Size\" is invalid in instance "
+        "3/The data type(\"uint32\") of property \"Size\" is invalid in instance "
         "root/cimv2:Test_Disk.Name=\"d1\", the expected data type is \"uint32[]\"",
-        thrown([&] { service.getInstanceProperty(disk, "Size", CMPI_uint32A); }));
+        failureText([&] { service.getInstanceProperty(disk, "Size", CMPI_uint32A); }, "kt"));
 }
 
 TEST_P(BaseZemProvider, TestsPropertiesOfInstances) {
     const Instance other(h.disk({{"Name", "d1"}, {"Size", std::uint32_t{8}}}));
     const std::string unexpected =
-        "3 A property provided for class Test_Disk had an unexpected value. An invalid value of ";
+        "3/A property provided for class Test_Disk had an unexpected value. An invalid value of ";
     const std::pair<std::function<void()>, std::string> rows[] = {
         {[&] { service.validateRequestedProperty(disk, "Caption"); },
-         "3 The requested property  \"Caption\" for class Test_Disk was not provided."},
+         "3/The requested property  \"Caption\" for class Test_Disk was not provided."},
         {[&] { service.validateUnsupportedProperty(disk, "Caption"); }, ""},
         {[&] { service.validateUnimplementedProperty(disk, "Name"); },
-         "3 Attempt to create or modify unimplemented property \"Name\" of class Test_Disk to "
+         "3/Attempt to create or modify unimplemented property \"Name\" of class Test_Disk to "
          "\"d1\"."},
         {[&] { service.validateUnmodifiableProperty(other, disk, "Caption"); }, ""},
         {[&] { service.validateUnmodifiableProperty(other, disk, "Size"); },
-         "3 Attempt to change unmodifiable property \"Size\" of class Test_Disk from 8 to 7."},
+         "3/Attempt to change unmodifiable property \"Size\" of class Test_Disk from 8 to 7."},
         {[&] { service.validateFixedValueProperty(disk, "Size", "7", false); }, ""},
         {[&] { service.validateFixedValueProperty(disk, "Caption", "x", true); }, ""},
         {[&] { service.validateFixedValueProperty(disk, "Name", "D1", true); },
@@ -100,35 +85,28 @@ TEST_P(BaseZemProvider, TestsPropertiesOfInstances) {
              "d1 was specifieded for property \"Name\" instead of the expected value of D1"},
         {[&] { service.validateEmbededInstanceProerties(disk, "M"); }, ""},
         {[&] { service.throwMinGtDesiredValueExc(~0ULL, 2, "K", "p", "s", "memory"); },
-         "3 Conflicted property value 18446744073709551615 of \"Reservation\" and property value 2 "
+         "3/Conflicted property value 18446744073709551615 of \"Reservation\" and property value 2 "
          "of \"VirtualQuantity\" were specified for class K for partition p on managed system s. "
          "Desired memory should be greater than or equal to min memory."},
     };
-    for (const auto& [call, text] : rows) EXPECT_EQ(text, thrown(call));
+    for (const auto& [call, text] : rows) EXPECT_EQ(text, failureText(call, "kt"));
 }
 
 TEST_P(BaseZemProvider, FetchesEmbeddedObjects) {
-    static Harness* current;
-    current = &h;
-    cimom::Factories factories;
-    factories.instance = [](const CMPIBroker*, const CMPIContext*, CMPIStatus* status) {
-        return Harness::M::getInstanceMI(current->server.broker(), current->ctx(), "Disks", status,
-                                         Harness::make<DiskProvider>);
-    };
-    h.server.registerProvider("Disks", {"Test_Disk"}, factories);
+    h.server.registerProvider("Disks", {"Test_Disk"}, FactoriesOf<DiskProvider>::all());
     const auto check = [&](CMPIObjectPath* path) {
-        return thrown([&] {
-            service.validateEmbeddedObject(CmpiContext(h.ctx()), CmpiObjectPath(path), "Target",
-                                           "Force");
-        });
+        const CmpiContext ctx(h.ctx());
+        const CmpiObjectPath target(path);
+        return failureText([&] { service.validateEmbeddedObject(ctx, target, "Target", "Force"); },
+                           "kt");
     };
     const std::string end =
         " is provided for parameter Target to method Force on provider Service.";
     EXPECT_EQ("", check(h.path()));
-    EXPECT_EQ("3 Invalid value of root/cimv2:Test_Disk" + end, check(h.classPath()));
-    EXPECT_EQ("3 Invalid value of root/cimv2:Test_Disk.Name=\"x9\"" + end, check(h.path("x9")));
+    EXPECT_EQ("3/Invalid value of root/cimv2:Test_Disk" + end, check(h.classPath()));
+    EXPECT_EQ("3/Invalid value of root/cimv2:Test_Disk.Name=\"x9\"" + end, check(h.path("x9")));
     h.className = "Test_Unserved";
-    EXPECT_EQ(0U, check(h.path()).find("6 An error ocurred, when validate value "
+    EXPECT_EQ(0U, check(h.path()).find("6/An error ocurred, when validate value "
                                        "root/cimv2:Test_Unserved.Name=\"d1\" of parameter "
                                        "\"Target\". And the error string was \""));
 }

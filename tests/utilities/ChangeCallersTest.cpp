@@ -1,42 +1,24 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <poll.h>
 #include <sys/stat.h>
-#include <unistd.h>
 
-#include <functional>
 #include <map>
-#include <string>
-#include <vector>
+#include <tuple>
 
 #include "EdallocCmdCaller.h"
 #include "EdplatCmdCaller.h"
 #include "EdpowerCaller.h"
 #include "EdsuspCaller.h"
-#include "FailureText.h"
 #include "NwplatCmdCaller.h"
 #include "ToolFolder.h"
 #include "VirtualSystemRepRASD.h"
 
 namespace {
 
-using Pairs = zemDynamicArray<tagAttributePair>;
 using Partition = zemEdplatCmdCaller::PartitionAttribute;
 using Profile = zemEdplatCmdCaller::PartitionProfileAttribute;
 
 constexpr char kPrefix[] = "<zem350Log-prefix>";
-
-Pairs one(int index, const char* value) {
-    Pairs all;
-    all.addElement(new tagAttributePair{index, value});
-    return all;
-}
-
-Pairs two(int index, const char* value, int secondIndex, const char* secondValue) {
-    Pairs all = one(index, value);
-    all.addElement(new tagAttributePair{secondIndex, secondValue});
-    return all;
-}
 
 class RASD : public zemRASD {
 public:
@@ -75,11 +57,8 @@ void check(const std::string& log, const std::string& line, const std::function<
     EXPECT_EQ(tools.arguments(), received) << line;
 }
 
-struct Row {
-    const char* log;
-    const char* line;
-    std::function<void()> change;
-};
+/// What is logged, how the line goes on, and what makes it.
+using Row = std::tuple<const char*, const char*, std::function<void()>>;
 
 TEST(ChangeCallersTest, Edalloc) {
     zemEdallocCmdCaller c("", "");
@@ -98,51 +77,46 @@ TEST(ChangeCallersTest, Edalloc) {
         {"addMemory:", "mem -m h*1 -o a --id 3", [&] { c.addMemory("h*1", "3", 0, 0, p, f); }},
         {"removeMemory:", "mem -m h*1 -o r --id 3 --entitled 7 -q 8589934592", [&] { c.removeMemory("h*1", "3", 7, 8589934592, p, f); }},
         {"modifyMemory:", R"(mem -m h*1 -o s --id 3 -a "mem_weight=128")", [&] { c.modifyMemory("h*1", "3", &both, p, f); }},
-        {"addIOSlot:", R"(io --rsubtype slot -o a -m h*1 --id 3 -l 210  -a  "\"slot_io_pool_id=1\"")", [&] { c.addIOSlot("h*1", "3", "210", one(0, "1"), p, f); }},
+        {"addIOSlot:", R"(io --rsubtype slot -o a -m h*1 --id 3 -l 210  -a  "\"slot_io_pool_id=1\"")", [&] { c.addIOSlot("h*1", "3", "210", pairs({{0, "1"}}), p, f); }},
         {"removeIOSlot:", "io  --rsubtype slot -m h*1 -o r --id 3 -l 210", [&] { c.removeIOSlot("h*1", "3", "210", p, f); }},
-        {"addVETH:", R"(virtualio --rsubtype eth -o a -m h*1 --id 3  -s 5  -a  "\"addl_vlan_ids=5,7\",\"vswitch=v\"")", [&] { c.addVETH("h*1", "3", 5, two(2, "5,7", 5, "v"), p, f); }},
-        {"addVSCSI:", "virtualio --rsubtype scsi -o a -m h*1 --id 3 ", [&] { c.addVSCSI("h*1", "3", 0, Pairs(), p, f); }},
-        {"addVSERIAL:", R"(virtualio --rsubtype serial -o a -m h*1 --id 3   -a  "\"supports_dnx=1\"")", [&] { c.addVSERIAL("h*1", "3", -1, one(4, "1"), p, f); }},
+        {"addVETH:", R"(virtualio --rsubtype eth -o a -m h*1 --id 3  -s 5  -a  "\"addl_vlan_ids=5,7\",\"vswitch=v\"")", [&] { c.addVETH("h*1", "3", 5, pairs({{2, "5,7"}, {5, "v"}}), p, f); }},
+        {"addVSCSI:", "virtualio --rsubtype scsi -o a -m h*1 --id 3 ", [&] { c.addVSCSI("h*1", "3", 0, pairs({}), p, f); }},
+        {"addVSERIAL:", R"(virtualio --rsubtype serial -o a -m h*1 --id 3   -a  "\"supports_dnx=1\"")", [&] { c.addVSERIAL("h*1", "3", -1, pairs({{4, "1"}}), p, f); }},
         {"removeVETH:", "virtualio --rsubtype eth -m h*1 -o r --id 3 -s 5 ", [&] { c.removeVETH("h*1", "3", 5, p, f); }},
         {"removeVSCSI:", "virtualio --rsubtype scsi -m h*1 -o r --id 3 -s 0 ", [&] { c.removeVSCSI("h*1", "3", 0, p, f); }},
         {"removeVSERIAL:", "virtualio --rsubtype serial -m h*1 -o r --id 3 -s 2 ", [&] { c.removeVSERIAL("h*1", "3", 2, p, f); }},
     };
     // clang-format on
-    for (const Row& row : rows) {
-        check(std::string(kPrefix) + row.log, std::string("edalloc -r ") + row.line, row.change);
-    }
+    for (const auto& [log, line, change] : rows)
+        check(std::string(kPrefix) + log, std::string("edalloc -r ") + line, change);
 }
 
 TEST(ChangeCallersTest, EdplatAndNwplat) {
     zemEdplatCmdCaller c("", "");
     zemNwplatCmdCaller create("", "");
-    const Pairs adapter = one(Profile::ATTR_VIRTUAL_ETH_ADAPTERS, "5/1/2,3");
-    const Pairs name = one(Partition::ATTR_NEW_NAME, "web");
+    const auto adapter = pairs({{Profile::ATTR_VIRTUAL_ETH_ADAPTERS, "5/1/2,3"}});
+    const auto name = pairs({{Partition::ATTR_NEW_NAME, "web"}});
     // clang-format off
     const Row rows[] = {
-        {R"(edplat -r sys -m "h")", "", [&] { c.modifyManagedSystemInformation(Pairs(), "h"); }},
-        {"edplat -r sys", R"(  -i  "\"sp_failover_enabled-=1\"")", [&] { c.changeManagedSystemInformation(one(8, "1"), nullptr, c.CH_OP_REMOVE); }},
-        {R"(edplat -r lpar -m "")", R"(  -i  "\"lpar_id=3\"")", [&] { c.addPartitionsInformation("3", Pairs(), ""); }},
+        {R"(edplat -r sys -m "h")", "", [&] { c.modifyManagedSystemInformation(pairs({}), "h"); }},
+        {"edplat -r sys", R"(  -i  "\"sp_failover_enabled-=1\"")", [&] { c.changeManagedSystemInformation(pairs({{8, "1"}}), nullptr, c.CH_OP_REMOVE); }},
+        {R"(edplat -r lpar -m "")", R"(  -i  "\"lpar_id=3\"")", [&] { c.addPartitionsInformation("3", pairs({}), ""); }},
         {R"(edplat -r lpar -m "h")", R"(  -i  "\"lpar_id=3\",\"new_name=web\"")", [&] { c.modifyPartitionsInformation("3", name, "h"); }},
         {"edplat -r lpar", R"(  -i  "\"lpar_id=3\",\"new_name-=web\"")", [&] { c.removePartitionsInformation("3", name, nullptr); }},
         {R"(edplat -r prof -m "M")", R"(  -i  "\"name=P\",\"lpar_id=3\",\"virtual_eth_adapters+=5/1/2,3\"")", [&] { c.addPartitionsProfileInformation("P", adapter, "3", "M"); }},
-        {"edplat -r prof", R"(  -i  "\"name=P\",\"lpar_id=3\",\"electronic_err_reporting=1\"")", [&] { c.modifyPartitionsProfileInformation("P", one(57, "1"), "3", nullptr); }},
+        {"edplat -r prof", R"(  -i  "\"name=P\",\"lpar_id=3\",\"electronic_err_reporting=1\"")", [&] { c.modifyPartitionsProfileInformation("P", pairs({{57, "1"}}), "3", nullptr); }},
         {"edplat -r prof", R"(  -i  "\"name=P\",\"lpar_id=3\",\"virtual_eth_adapters-=5/1/2,3\"")", [&] { c.removePartitionsProfileInformation("P", adapter, "3", nullptr); }},
-        {R"(nwplat -r lpar -m "M")", R"( -i "\"lhea_capabilities =1\",\"lpar_avail_priority=7\"")", [&] { create.makePartitionsInformation(two(54, "1", 60, "7"), "M"); }},
-        {"nwplat -r lpar", R"( -i "")", [&] { create.makePartitionsInformation(Pairs(), nullptr); }},
+        {R"(nwplat -r lpar -m "M")", R"( -i "\"lhea_capabilities =1\",\"lpar_avail_priority=7\"")", [&] { create.makePartitionsInformation(pairs({{54, "1"}, {60, "7"}}), "M"); }},
+        {"nwplat -r lpar", R"( -i "")", [&] { create.makePartitionsInformation(pairs({}), nullptr); }},
     };
     // clang-format on
-    for (const Row& row : rows) {
-        check(kPrefix, std::string(row.log) + row.line, row.change);
-    }
+    for (const auto& [begin, end, change] : rows) check(kPrefix, std::string(begin) + end, change);
 }
 
 TEST(ChangeCallersTest, ValuesReachTheToolAsTheyAre) {
     const std::string open = "6/zemPropertiesHelper/executeCommand/-1/Invalid command parameter:";
-    struct {
-        const char* value;
-        const char* received;  // null: the line is refused
-    } const rows[] = {
+    // What the tool receives of a value; null: the line is refused.
+    const std::pair<const char*, const char*> rows[] = {
         {"a b  c", "a b  c"},
         {"x,y;$HOME `id` $(id) *", "x,y;$HOME `id` $(id) *"},
         {"M\xc3\xbcller \xe6\x9d\xb1 \xfc", "M\xc3\xbcller \xe6\x9d\xb1 \xfc"},
@@ -152,19 +126,16 @@ TEST(ChangeCallersTest, ValuesReachTheToolAsTheyAre) {
         {"a\"b", nullptr},
         {"end\\", nullptr},
     };
-    for (const auto& row : rows) {
+    for (const auto& [value, received] : rows) {
         ToolFolder tools;
         tools.recorder("edplat");
-        const std::string thrown = failureText([&] {
-            zemEdplatCmdCaller("", "").modifyPartitionsInformation(
-                "3", one(Partition::ATTR_NEW_NAME, row.value), "host, 1");
+        const auto name = pairs({{Partition::ATTR_NEW_NAME, value}});
+        const std::string thrown = failureText([&name] {
+            zemEdplatCmdCaller("", "").modifyPartitionsInformation("3", name, "host, 1");
         });
-        const bool refused = row.received == nullptr;
-        EXPECT_EQ(refused ? open : "", thrown.substr(0, open.size()));
-        EXPECT_EQ(refused ? ""
-                          : "-r|lpar|-m|host, 1|-i|\"lpar_id=3\",\"new_name=" +
-                                std::string(row.received) + '"',
-                  tools.arguments());
+        EXPECT_EQ(received == nullptr ? open : "", thrown.substr(0, open.size()));
+        const std::string line = "-r|lpar|-m|host, 1|-i|\"lpar_id=3\",\"new_name=";
+        EXPECT_EQ(received == nullptr ? "" : line + received + '"', tools.arguments());
     }
 }
 
@@ -205,10 +176,7 @@ void suspend(int operation) {
 
 TEST(ChangeCallersTest, EdpowerAndEdsusp) {
     const std::string rule = kPrefix + std::string(28, '+') + '\n';
-    const struct {
-        Power settings;
-        const char* line;
-    } rows[] = {
+    const std::pair<Power, const char*> rows[] = {
         {{1, 1, false, false, "", false, 5}, "lpar --id 3 -o on -b sms -f P"},
         {{1, 1, false, false, "", false, 0, "P Q"}, "lpar --id 3 -o on -f P Q"},
         {{1, 2, true, true}, "lpar --id 3 -o shutdown --immed  --restart "},
@@ -223,29 +191,24 @@ TEST(ChangeCallersTest, EdpowerAndEdsusp) {
         {{3, 0, false, false, "N", true}, "sysprof -n N --test "},
     };
     for (const auto& row : rows) {
+        const std::string line = std::string("edpower -r ") + row.second + " -m \"M\"";
         check(
-            rule + kPrefix + "Change system state:",
-            std::string("edpower -r ") + row.line + " -m \"M\"", [&] { run(row.settings); }, rule);
+            rule + kPrefix + "Change system state:", line, [&] { run(row.first); }, rule);
     }
-    const char* const suspensions[] = {"suspend",
-                                       "resume",
-                                       "validate -t suspend ",
-                                       "cancel -t suspend ",
-                                       "recover -t suspend ",
-                                       "shutdown -t suspend "};
-    for (int i = 0; i < 6; ++i) {
+    int operation = 0;
+    for (const char* what : {"suspend", "resume", "validate -t suspend ", "cancel -t suspend ",
+                             "recover -t suspend ", "shutdown -t suspend "}) {
+        const std::string line = std::string("edsusp  -o ") + what + " -m \"M\" --id 3";
+        ++operation;
         check(
-            rule + kPrefix + "Change lpar state:",
-            std::string("edsusp  -o ") + suspensions[i] + " -m \"M\" --id 3",
-            [&] { suspend(i + 1); }, rule);
+            rule + kPrefix + "Change lpar state:", line, [&] { suspend(operation); }, rule);
     }
 }
 
 TEST(ChangeCallersTest, RefusalsRunNoTool) {
     ToolFolder tools;
-    for (const char* tool : {"edalloc", "edplat", "nwplat", "edpower", "edsusp"}) {
+    for (const char* tool : {"edalloc", "edplat", "nwplat", "edpower", "edsusp"})
         tools.recorder(tool);
-    }
     zemEdallocCmdCaller edalloc("", "");
     const std::string parms = "4/EdpowerCaller/validateParms//edpower ";
     const std::string atRun = "4/EdpowerCaller/run//";
@@ -267,39 +230,25 @@ TEST(ChangeCallersTest, RefusalsRunNoTool) {
         {"4/EdsuspCaller/validateParms//edsusp resource type unsupported: \x07", [] { suspend(7); }},
         {"4/EdsuspCaller/validateParms//edsusp resource type unsupported: ", [] { suspend(0); }},
         {"3/zemEdallocCmdCaller/removeProcessing//\"VirtualQuantity/100\" for shared mode or " "\"Reservation/100\" for dedicated mode should be an integer for the command \"edalloc -r " "proc -m %s -o r --id lpar_id --procs\"", [&] { edalloc.removeProcessing("M", "3", 250, 1, nullptr, nullptr); }},
-        {index + "6", [&] { edalloc.addVETH("M", "3", 1, one(6, "x"), nullptr, nullptr); }},
-        {index + "-1", [] { zemEdplatCmdCaller("", "").modifyPartitionsInformation("3", one(-1, ""), ""); }},
-        {"3/zemCommandCaller/callMkCommand/INVALID_INDEX/61", [] { zemNwplatCmdCaller("", "").makePartitionsInformation(one(61, ""), "M"); }},
+        {index + "6", [&] { edalloc.addVETH("M", "3", 1, pairs({{6, "x"}}), nullptr, nullptr); }},
+        {index + "-1", [] { zemEdplatCmdCaller("", "").modifyPartitionsInformation("3", pairs({{-1, ""}}), ""); }},
+        {"3/zemCommandCaller/callMkCommand/INVALID_INDEX/61", [] { zemNwplatCmdCaller("", "").makePartitionsInformation(pairs({{61, ""}}), "M"); }},
     };
     // clang-format on
     for (const auto& [words, operation] : rows) {
         EXPECT_EQ(words, failureText(operation));
         EXPECT_EQ("", tools.arguments()) << words;
     }
-    EXPECT_EQ(parms + "-r lpar operation unsupported: ", failureText([] {
-                  run({1, 1}, 2);
-              }))
+    const auto twice = [] { run({1, 1}, 2); };
+    EXPECT_EQ(parms + "-r lpar operation unsupported: ", failureText(twice))
         << "the first run uses the operation up";
     tools.script("edsusp", "echo 'WRTL8018 no such partition' >&2; exit 1");
     tools.script("edpower", "echo 'No results were found.'");
     EXPECT_EQ("6/zemCommandCaller/callGenericCommand/WRTL8018/WRTL8018 no such partition",
               failureText([] { suspend(1); }));
-    EXPECT_EQ("5/zemCommandCaller/callGenericCommand//No results were found.", failureText([] {
-                  run({2, 1});
-              }));
-}
-
-/// All that comes from the stream until its end, which the stream itself does not wait for.
-std::string drain(FILE* stream) {
-    std::string all;
-    char chunk[4096];
-    while (std::feof(stream) == 0) {
-        pollfd ready = {fileno(stream), POLLIN, 0};
-        poll(&ready, 1, -1);
-        std::clearerr(stream);
-        all.append(chunk, std::fread(chunk, 1, sizeof chunk, stream));
-    }
-    return all;
+    const auto switchOn = [] { run({2, 1}); };
+    EXPECT_EQ("5/zemCommandCaller/callGenericCommand//No results were found.",
+              failureText(switchOn));
 }
 
 TEST(ChangeCallersTest, BackgroundRunsBelongToTheCaller) {
@@ -324,8 +273,7 @@ TEST(ChangeCallersTest, BackgroundRunsBelongToTheCaller) {
     EXPECT_EQ(kRuns, write(gate, std::string(kRuns, '\n').c_str(), kRuns));
     for (const auto& [number, child] : children) {
         const std::string text = std::to_string(number);
-        EXPECT_EQ(std::string(70000 - text.size(), ' ') + text + "err\n", drain(child.second));
-        fclose(child.second);
+        EXPECT_EQ(std::string(70000 - text.size(), ' ') + text + "err\n", readAll(child.second));
         int status = 0;
         EXPECT_EQ(child.first, waitpid(child.first, &status, 0));
         EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == number);

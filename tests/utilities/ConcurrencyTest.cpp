@@ -2,18 +2,14 @@
 //
 // Runs for two seconds; ZEM_SOAK_SECONDS in the environment makes it longer.
 #include <fcntl.h>
-#include <gtest/gtest.h>
-#include <unistd.h>
 
+#include <algorithm>
 #include <atomic>
-#include <chrono>
-#include <cstdlib>
-#include <thread>
-#include <vector>
 
+#include "../cimom/BothBrokers.h"
 #include "BaseProvider.h"
-#include "BaseProviderManager.h"
-#include "Server.h"
+#include "OnThreads.h"
+#include "ProviderFactories.h"
 
 namespace {
 
@@ -26,10 +22,6 @@ class BusyProvider : public zemBaseProvider {
 public:
     BusyProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx), zemBaseProvider(mb, ctx, name) {}
-    static CmpiBaseMI* create(const CmpiBroker& mb, const CmpiContext& ctx, const char* name) {
-        return new BusyProvider(mb, ctx, name);
-    }
-
     CMPIBoolean isValidInstanceClass(const char*) override { return true; }
     CMPIBoolean isValidMethodClass(const char*) override { return true; }
     void populateEssentialKeys(const char*, CmpiArray& keys) override {
@@ -62,10 +54,6 @@ public:
     }
     void performSetInstance(const CmpiContext&, CmpiResult&, const CmpiObjectPath&,
                             const CmpiInstance&, const char**) override {}
-    void performCreateInstance(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
-                               const CmpiInstance&) override {
-        result.returnData(path);
-    }
     void performInvokeMethod(const CmpiContext&, CmpiResult& result, const CmpiObjectPath&,
                              const char*, const CmpiArgs& in, CmpiArgs& out) override {
         out.setArg("Echo", getParmVal(in, "Word"));
@@ -74,17 +62,6 @@ public:
         result.returnData(done);
     }
 };
-
-#define TEST_FACTORY(Kind)                                                                      \
-    CMPI##Kind##MI* make##Kind(const CMPIBroker* mb, const CMPIContext* ctx, CMPIStatus* rc) {  \
-        return zemBaseProviderManager::get##Kind##MI(const_cast<CMPIBroker*>(mb),               \
-                                                     const_cast<CMPIContext*>(ctx), "Busy", rc, \
-                                                     BusyProvider::create);                     \
-    }
-TEST_FACTORY(Instance)
-TEST_FACTORY(Association)
-TEST_FACTORY(Method)
-TEST_FACTORY(Property)
 
 /// Standard output goes nowhere meanwhile: the frame writes some lines an operation.
 class Quiet {
@@ -109,30 +86,29 @@ ObjectPath busy(const char* name) { return {"root/cimv2", kClass, {{"Name", name
 /// One of each operation; how many answered otherwise than they must.
 int mixOperations(Server& server) {
     const Request request;
-    const Instance instance(busy("a"), {{"Name", "a"}});
-    int wrong = 0;
-    const auto expect = [&](bool right) { wrong += right ? 0 : 1; };
-    expect(server.getInstance(request, busy("a")).instances.size() == 1);
+    const ObjectPath all("root/cimv2", kClass), a = busy("a");
     const Reply missing = server.getInstance(request, busy("missing"));
-    expect(missing.rc == CMPI_RC_ERR_NOT_FOUND &&
-           missing.message.find("object missing of class Test_Busy") != std::string::npos);
-    expect(server.getInstance(request, {"root/cimv2", kClass}).rc == CMPI_RC_ERR_INVALID_PARAMETER);
-    expect(server.enumInstances(request, {"root/cimv2", kClass}).instances.size() == 3);
-    expect(server.enumInstanceNames(request, {"root/cimv2", kClass}).paths.size() == 1);
-    expect(server.modifyInstance(request, instance).ok());
-    expect(server.deleteInstance(request, busy("a")).rc == CMPI_RC_ERR_NOT_SUPPORTED);
-    expect(server.associators(request, busy("a")).rc == CMPI_RC_ERR_NOT_SUPPORTED);
-    expect(server.referenceNames(request, busy("a")).rc == CMPI_RC_ERR_NOT_SUPPORTED);
-    const Reply echo = server.invokeMethod(request, busy("a"), "Echo", {{"Word", "w"}});
-    expect(echo.ok() && echo.out.find("Echo") != nullptr && echo.out.find("Echo")->text() == "w");
-    expect(server.invokeMethod(request, busy("a"), "Echo", {{"Other", "w"}}).rc ==
-           CMPI_RC_ERR_FAILED);
-    expect(server.getProperty(request, busy("a"), "Name").value() == Value("a"));
-    expect(server.setProperty(request, busy("a"), "Name", Value("b")).ok());
-    return wrong;
+    const Reply echo = server.invokeMethod(request, a, "Echo", {{"Word", "w"}});
+    const bool right[] = {
+        server.getInstance(request, a).instances.size() == 1,
+        missing.rc == CMPI_RC_ERR_NOT_FOUND &&
+            missing.message.find("object missing of class Test_Busy") != std::string::npos,
+        server.getInstance(request, all).rc == CMPI_RC_ERR_INVALID_PARAMETER,
+        server.enumInstances(request, all).instances.size() == 3,
+        server.enumInstanceNames(request, all).paths.size() == 1,
+        server.modifyInstance(request, Instance(a, {{"Name", "a"}})).ok(),
+        server.deleteInstance(request, a).rc == CMPI_RC_ERR_NOT_SUPPORTED,
+        server.associators(request, a).rc == CMPI_RC_ERR_NOT_SUPPORTED,
+        server.referenceNames(request, a).rc == CMPI_RC_ERR_NOT_SUPPORTED,
+        echo.ok() && echo.out.find("Echo") != nullptr && echo.out.find("Echo")->text() == "w",
+        server.invokeMethod(request, a, "Echo", {{"Other", "w"}}).rc == CMPI_RC_ERR_FAILED,
+        server.getProperty(request, a, "Name").value() == Value("a"),
+        server.setProperty(request, a, "Name", Value("b")).ok(),
+    };
+    return static_cast<int>(std::count(std::begin(right), std::end(right), false));
 }
 
-class Concurrency : public ::testing::TestWithParam<Character> {};
+class Concurrency : public BothBrokers {};
 
 TEST_P(Concurrency, AllOperationsOfOneProviderAtOnce) {
     const char* soak = std::getenv("ZEM_SOAK_SECONDS");
@@ -143,17 +119,12 @@ TEST_P(Concurrency, AllOperationsOfOneProviderAtOnce) {
     {
         const Quiet quiet;
         Server server(Options{GetParam(), "", {}, nullptr});
-        server.registerProvider("Busy", {kClass},
-                                {makeInstance, makeAssociation, makeMethod, nullptr, makeProperty});
+        server.registerProvider("Busy", {kClass}, FactoriesOf<BusyProvider>::all());
         wrong += mixOperations(server);
         const std::size_t before = server.liveObjects();
-        std::vector<std::thread> threads;
-        for (int i = 0; i < 8; ++i)
-            threads.emplace_back([&] {
-                for (; std::chrono::steady_clock::now() < end; ++rounds)
-                    wrong += mixOperations(server);
-            });
-        for (std::thread& thread : threads) thread.join();
+        onThreads(8, [&](int) {
+            for (; std::chrono::steady_clock::now() < end; ++rounds) wrong += mixOperations(server);
+        });
         stale = server.staleUses();
         alive = server.liveObjects() - before;
     }
@@ -163,9 +134,6 @@ TEST_P(Concurrency, AllOperationsOfOneProviderAtOnce) {
     EXPECT_EQ(alive, 0u);
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, Concurrency, ::testing::Values(Character::Full, Character::Lean),
-                         [](const auto& broker) {
-                             return broker.param == Character::Full ? "full" : "lean";
-                         });
+ON_BOTH_BROKERS(Concurrency);
 
 }  // namespace

@@ -1,17 +1,15 @@
 // Calls of the management library, and what its answers become.
 
 #include <gtest/gtest.h>
-#include <unistd.h>
 
 #include <algorithm>
-#include <chrono>
-#include <functional>
-#include <thread>
+#include <tuple>
 
 #include "DNXApiCaller.h"
-#include "Exception.h"
-#include "Faults.h"
+#include "FailureText.h"
+#include "LibraryFaults.h"
 #include "TestAppliance.h"
+#include "TimingTrace.h"
 #include "TraceTool.h"
 
 namespace {
@@ -20,78 +18,26 @@ constexpr const char* kHost = "1111-AAA*0000001";
 constexpr const char* kLpar = "3*1111-AAA*0000001";
 constexpr zemApiReader kReader = {"zemHostSystem", "updateData", "getLparObj"};
 
-// The trace reads its environment once, when the first wrapper is called.
-const std::string kTraceFile = "/tmp/zemapitrace." + std::to_string(getpid());
-const bool kTraced = setenv("VM_CIMPROVIDER_TRACE", "1", 1) == 0 &&
-                     setenv("VM_CIMPROVIDER_TRACE_PATH", kTraceFile.c_str(), 1) == 0;
+const TimingTrace timing("zemapitrace");
 
 class DNXApiCallerTest : public testing::Test {
 protected:
     DNXApiCallerTest() { EXPECT_EQ(0, m_appliance.run("appliance init").exit); }
-    static void TearDownTestSuite() { std::remove(kTraceFile.c_str()); }
-
-    /// Lets the next call of @p operation answer with @p code; without one it answers null.
-    static void plan(const char* operation, std::optional<int> code) {
-        appliance::PlannedFault fault;
-        fault.name = operation;
-        fault.code = code;
-        fault.isNull = !code;
-        appliance::planFault(fault);
-    }
-
     testing_support::TestAppliance m_appliance{ZEM_PROGRAMS};
 };
 
-using OfAll = apiProp* (zemApiCaller::*)(const char*, int);
-using OfKey = apiProp* (zemApiCaller::*)(const char*, const char*, int);
-
-template <class Call>
-struct Operation {
-    const char* name;
-    Call call;
-};
-
-#define OP(NAME) \
-    { #NAME, &zemApiCaller::NAME }
-constexpr Operation<OfAll> kOfAll[] = {OP(getAllCecs),
-                                       OP(getAllLpars),
-                                       OP(getAllLparProfiles),
-                                       OP(getAllLparVirtualSerial),
-                                       OP(getAllLparVirtualScsi),
-                                       OP(getAllLparVirtualEthernet),
-                                       OP(getAllIoSlots),
-                                       OP(getAllCecMemoryCfg),
-                                       OP(getAllCecProcessorCfg),
-                                       OP(getAllCecMemoryPoolCfgs),
-                                       OP(getAllCecProcessorPoolCfg),
-                                       OP(getAllLparMemoryCfgs),
-                                       OP(getAllLparProcessorCfgs)};
-constexpr Operation<OfKey> kOfHost[] = {OP(getCecObj),
-                                        OP(getAllLparsFromCec),
-                                        OP(getAllLparProfilesFromCec),
-                                        OP(getVirtualSerial),
-                                        OP(getVirtualScsi),
-                                        OP(getVirtualEthernet),
-                                        OP(getIoSlots),
-                                        OP(getCecMemoryCfg),
-                                        OP(getCecProcessorCfg),
-                                        OP(getCecMemoryPoolCfg),
-                                        OP(getCecProcessorPoolCfg),
-                                        OP(getAllLparMemoryCfg),
-                                        OP(getAllLparProcessorCfg)};
-constexpr Operation<OfKey> kOfLpar[] = {
-    OP(getLparObj),         OP(getAllLparProfilesFromLpar), OP(getLparVirtualSerial),
-    OP(getLparVirtualScsi), OP(getLparVirtualEthernet),     OP(getLparIoSlots),
-    OP(getLparMemoryCfg),   OP(getLparProcessorCfg)};
-#undef OP
+/// A wrapper by the name of its operation, called for all objects or for those of a key.
+using Wrapper = std::pair<const char*, std::function<apiProp*(zemApiCaller&)>>;
+#define OF_ALL(NAME) Wrapper(#NAME, [](zemApiCaller& api) { return api.NAME("", 2); })
+#define OF(KEY, NAME) Wrapper(#NAME, [](zemApiCaller& api) { return api.NAME("", KEY, 2); })
 
 TEST_F(DNXApiCallerTest, WrappersCallTheirOperationTimed) {
     std::vector<std::string> names;
-    const auto expectCall = [&](const char* name,
-                                const std::function<apiProp*(zemApiCaller&)>& call) {
+    const auto expectCall = [&](const Wrapper& wrapper) {
+        const auto& [name, call] = wrapper;
         names.push_back(name);
         // Whoever answers a planned code is the operation of this name, and only it.
-        plan(name, 40 + static_cast<int>(names.size()));
+        planAnswer(name, 40 + static_cast<int>(names.size()));
         zemApiCaller api;
         apiProp* const faulty = call(api);
         EXPECT_EQ(40 + static_cast<int>(names.size()), api.getReturnCode()) << name;
@@ -102,25 +48,28 @@ TEST_F(DNXApiCallerTest, WrappersCallTheirOperationTimed) {
         api.freeApi();
         EXPECT_EQ(-1, api.getReturnCode());
     };
-    for (const auto& row : kOfAll) {
-        expectCall(row.name, [&](zemApiCaller& api) { return (api.*row.call)("", 2); });
-    }
-    for (const auto& row : kOfHost) {
-        expectCall(row.name, [&](zemApiCaller& api) { return (api.*row.call)("", kHost, 2); });
-    }
-    for (const auto& row : kOfLpar) {
-        expectCall(row.name, [&](zemApiCaller& api) { return (api.*row.call)("", kLpar, 2); });
-    }
-    expectCall("getLparProfile",
-               [&](zemApiCaller& api) { return api.getLparProfile("", kLpar, "normal", 2); });
+    const auto expectCalls = [&](const auto&... wrappers) { (expectCall(wrappers), ...); };
+    expectCalls(OF_ALL(getAllCecs), OF_ALL(getAllLpars), OF_ALL(getAllLparProfiles),
+                OF_ALL(getAllLparVirtualSerial), OF_ALL(getAllLparVirtualScsi),
+                OF_ALL(getAllLparVirtualEthernet), OF_ALL(getAllIoSlots),
+                OF_ALL(getAllCecMemoryCfg), OF_ALL(getAllCecProcessorCfg),
+                OF_ALL(getAllCecMemoryPoolCfgs), OF_ALL(getAllCecProcessorPoolCfg),
+                OF_ALL(getAllLparMemoryCfgs), OF_ALL(getAllLparProcessorCfgs));
+    expectCalls(OF(kHost, getCecObj), OF(kHost, getAllLparsFromCec),
+                OF(kHost, getAllLparProfilesFromCec), OF(kHost, getVirtualSerial),
+                OF(kHost, getVirtualScsi), OF(kHost, getVirtualEthernet), OF(kHost, getIoSlots),
+                OF(kHost, getCecMemoryCfg), OF(kHost, getCecProcessorCfg),
+                OF(kHost, getCecMemoryPoolCfg), OF(kHost, getCecProcessorPoolCfg),
+                OF(kHost, getAllLparMemoryCfg), OF(kHost, getAllLparProcessorCfg));
+    expectCalls(OF(kLpar, getLparObj), OF(kLpar, getAllLparProfilesFromLpar),
+                OF(kLpar, getLparVirtualSerial), OF(kLpar, getLparVirtualScsi),
+                OF(kLpar, getLparVirtualEthernet), OF(kLpar, getLparIoSlots),
+                OF(kLpar, getLparMemoryCfg), OF(kLpar, getLparProcessorCfg));
+    expectCall({"getLparProfile",
+                [](zemApiCaller& api) { return api.getLparProfile("", kLpar, "normal", 2); }});
 
-    // The background thread writes when 50 lines have come together.
-    for (int i = 0; i < 50; ++i) CTimeLogerManager::getInstance()->log("padding");
-    std::string trace;
-    for (int i = 0; i < 100 && trace.find("getLparProfile end") == std::string::npos; ++i) {
-        std::this_thread::sleep_for(std::chrono::milliseconds(50));
-        trace = testing_support::contents(kTraceFile);
-    }
+    const std::string trace = timing.waitFor(
+        "getLparProfile end", [] { CTimeLogerManager::getInstance()->log("padding"); });
     for (const std::string& name : names) {
         const std::size_t begin = trace.find(" zemApiCaller-" + name + " begin at ");
         const std::size_t end = trace.find(" zemApiCaller-" + name + " end at ");
@@ -143,24 +92,12 @@ TEST_F(DNXApiCallerTest, ViewsReadAndForgive) {
     EXPECT_STREQ("alpha", zemApiProp(owner.get() + 1).getProperty("UserDefinedName"));
 }
 
-/// What a failure says: kind, class-method, access method, id, text.
-std::string failureOf(const std::function<void()>& work) {
-    try {
-        work();
-        return "none";
-    } catch (const zemException& e) {
-        return std::to_string(e.getExceptionType()) + '|' + e.getThrowingClass() + '-' +
-               e.getThrowingMethod() + '|' + e.getAccessMethod() + '|' + e.getExceptionId() + '|' +
-               e.getExceptionString();
-    }
-}
+/// All fields of what @p work throws.
+std::string failureOf(const std::function<void()>& work) { return failureText(work, "kcmait"); }
 
 TEST_F(DNXApiCallerTest, CodesBecomeFailures) {
-    const struct {
-        int code;
-        const char* name;
-        const char* end;  ///< of the text
-    } rows[] = {
+    const std::tuple<int, const char*, std::string> rows[] = {
+        // code, its name, end of its text
         {-1, "DNX_API_FAILED", "API operation can not be finished correctly."},
         {1, "DNX_API_INVALID_INPUT", "parameter is invalid, e.g. Null MTMS, etc."},
         {2, "DNX_API_INVALID_STATE", "while it is already in \"Active\" state already."},
@@ -172,37 +109,33 @@ TEST_F(DNXApiCallerTest, CodesBecomeFailures) {
         {8, "DNX_API_UNKNOWN", "Undefined error."},
         {-2, "DNX_API_UNKNOWN", "Undefined error."},
     };
-    for (const auto& row : rows) {
-        EXPECT_STREQ(row.name, errorCodeToString(row.code));
-        const std::string text = getErrorString(row.code), end = row.end;
+    const auto read = [] { zemApiObjects(kReader, zemApiCaller().getLparObj("", kLpar, 1)); };
+    for (const auto& [code, name, end] : rows) {
+        EXPECT_STREQ(name, errorCodeToString(code));
+        const std::string text = getErrorString(code);
         EXPECT_EQ(end, text.substr(text.size() - std::min(text.size(), end.size())));
-        plan("getLparObj", row.code);
-        const char* start = row.code == 6   ? "1|zemHostSystem-updateData||"
-                            : row.code == 7 ? "5|zemHostSystem-updateData|getLparObj|"
-                                            : "6|zemHostSystem-updateData||";
-        EXPECT_EQ(std::string(start) + row.name + '|' + text, failureOf([] {
-                      zemApiObjects(kReader, zemApiCaller().getLparObj("", kLpar, 1));
-                  }));
+        planAnswer("getLparObj", code);
+        const char* start = code == 6   ? "1/zemHostSystem/updateData//"
+                            : code == 7 ? "5/zemHostSystem/updateData/getLparObj/"
+                                        : "6/zemHostSystem/updateData//";
+        EXPECT_EQ(std::string(start) + name + '/' + text, failureOf(read));
     }
     EXPECT_STREQ("DNX_API_SUCCESS", errorCodeToString(0));
 }
 
 TEST_F(DNXApiCallerTest, NoResultIsTheReadersDecision) {
-    const struct {
-        const char* id;
-        std::string failure;
-    } rows[] = {
-        {"-1", "||-1|Internal Error:API(\"getLparObj\") calling failed"},
-        {"UNKNOWN", "||UNKNOWN|Internal Error:API(\"getLparObj\") calling failed"},
-        {nullptr, std::string("||DNX_API_FAILED|") + getErrorString(-1)},
+    const std::pair<const char*, std::string> rows[] = {
+        // the reader's id, and what it gives
+        {"-1", "//-1/Internal Error:API(\"getLparObj\") calling failed"},
+        {"UNKNOWN", "//UNKNOWN/Internal Error:API(\"getLparObj\") calling failed"},
+        {nullptr, std::string("//DNX_API_FAILED/") + getErrorString(-1)},
     };
-    for (const auto& row : rows) {
+    for (const auto& [id, failure] : rows) {
         zemApiReader reader = kReader;
-        reader.nullId = row.id;
-        plan("getLparObj", {});
-        EXPECT_EQ("6|zemHostSystem-updateData" + row.failure, failureOf([&] {
-                      zemApiObjects(reader, zemApiCaller().getLparObj("", kLpar, 1));
-                  }));
+        reader.nullId = id;
+        planAnswer("getLparObj", {});
+        const auto read = [&] { zemApiObjects(reader, zemApiCaller().getLparObj("", kLpar, 1)); };
+        EXPECT_EQ("6/zemHostSystem/updateData" + failure, failureOf(read));
     }
 }
 
@@ -227,7 +160,7 @@ TEST_F(DNXApiCallerTest, ObjectsAreWalked) {
     const zemApiObjects none(kReader, zemApiCaller().getAllLparsFromCec("", "1111-AAD*0000004", 1));
     EXPECT_EQ(0U, none.size());
     EXPECT_EQ(none.begin(), none.end());
-    EXPECT_EQ("5|zemHostSystem-updateData|||the key", failureOf([&] { none.only("the key"); }));
+    EXPECT_EQ("5/zemHostSystem/updateData///the key", failureOf([&] { none.only("the key"); }));
     zemApiReader forgiving = kReader;
     forgiving.notFoundIsEmpty = true;
     const char* missing = "99*1111-AAA*0000001";

@@ -6,13 +6,29 @@
 
 #include "Exception.h"
 
-/// "kind/class/method/id/text", or "" if @p operation throws nothing.
-inline std::string failureText(const std::function<void()>& operation) {
+/// The fields that @p letters ask for, with "/" between them: kind, class, method, access method,
+/// id, text.
+inline std::string fieldsOf(const zemException& e, const std::string& letters) {
+    std::string all;
+    for (const char letter : letters) {
+        if (!all.empty()) all += '/';
+        all += letter == 'k'   ? std::to_string(e.getExceptionType()).c_str()
+               : letter == 'c' ? e.getThrowingClass()
+               : letter == 'm' ? e.getThrowingMethod()
+               : letter == 'a' ? e.getAccessMethod()
+               : letter == 'i' ? e.getExceptionId()
+                               : e.getExceptionString();
+    }
+    return all;
+}
+
+/// The fields of what @p operation throws, or "" if it throws nothing.
+inline std::string failureText(const std::function<void()>& operation,
+                               const std::string& letters = "kcmit") {
     try {
         operation();
     } catch (const zemException& e) {
-        return std::to_string(e.getExceptionType()) + '/' + e.getThrowingClass() + '/' +
-               e.getThrowingMethod() + '/' + e.getExceptionId() + '/' + e.getExceptionString();
+        return fieldsOf(e, letters);
     }
     return "";
 }

@@ -2,7 +2,6 @@
 
 #include <cstring>
 #include <set>
-#include <string>
 
 #include "Guid.h"
 
@@ -11,10 +10,7 @@ namespace {
 constexpr char zero[] = "00000000-0000-0000-0000-000000000000";
 
 TEST(GuidTest, ReadsAndPrints) {
-    const struct {
-        const char* text;
-        const char* printed;
-    } rows[] = {
+    const std::pair<const char*, const char*> rows[] = {
         {"0123abcd-4567-89ab-cdef-0123456789ab", "0123ABCD-4567-89AB-CDEF-0123456789AB"},
         {"0123abcd-4567-89ab-cdef-0123456789a", zero},
         {"0123abcd-4567-89ab-cdef-0123456789abc", zero},
@@ -24,11 +20,9 @@ TEST(GuidTest, ReadsAndPrints) {
         {"", zero},
         {nullptr, zero},
     };
-    for (const auto& row : rows) {
-        EXPECT_STREQ(zemGuid(row.text).toString(), row.printed);
-    }
-    EXPECT_TRUE(zemGuid(rows[0].text) == zemGuid(rows[0].printed));
-    EXPECT_FALSE(zemGuid(rows[0].text) == zemGuid());
+    for (const auto& [text, printed] : rows) EXPECT_STREQ(zemGuid(text).toString(), printed);
+    EXPECT_TRUE(zemGuid(rows[0].first) == zemGuid(rows[0].second));
+    EXPECT_FALSE(zemGuid(rows[0].first) == zemGuid());
 }
 
 TEST(GuidTest, PartsStandInMemoryInTheOrderOfTheText) {
@@ -41,9 +35,8 @@ TEST(GuidTest, PartsStandInMemoryInTheOrderOfTheText) {
 
 TEST(GuidTest, NewOnesDiffer) {
     std::set<std::string> seen;
-    for (int i = 0; i < 1000; ++i) {
+    for (int i = 0; i < 1000; ++i)
         seen.insert(static_cast<const char*>(zemGuid::getNewGuid().toString()));
-    }
     EXPECT_EQ(seen.size(), 1000U);
 }
 

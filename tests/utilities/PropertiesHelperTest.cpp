@@ -1,69 +1,68 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
-#include <poll.h>
 #include <sys/ptrace.h>
-#include <unistd.h>
 
 #include <chrono>
-#include <climits>
 #include <csignal>
 #include <cstring>
 #include <ctime>
-#include <thread>
 #include <tuple>
-#include <vector>
 
 #include "CommandLine.h"
+#include "OnThreads.h"
 #include "PollPlan.h"
 #include "PropertiesHelper.h"
 #include "ToolFolder.h"
 
 using namespace std::chrono_literals;
+using Helper = zemPropertiesHelper;
 
 namespace {
 
+const std::string kThrower = "zemPropertiesHelper/executeCommand/";
+
+/// A run of a tool, and "kind/id/access method/text" of its failure.
 struct ToolRun {
     zemString out;
     zemString err;
     int exitCode = 99;
-    std::string failure = {};
+    std::string failure;
 
     explicit ToolRun(const std::string& command, const char* user = nullptr, int waitTime = 0,
                      const char* locale = nullptr) {
-        failure = failureOf([&] {
-            try {
-                zemPropertiesHelper::executeCommand(command.c_str(), out, err, &exitCode, user,
-                                                    waitTime, locale, true);
-            } catch (const zemException& e) {
-                EXPECT_STREQ("zemPropertiesHelper", e.getThrowingClass());
-                EXPECT_STREQ("executeCommand", e.getThrowingMethod());
-                throw;
-            }
-        });
+        failure = failureText(
+            [&] {
+                Helper::executeCommand(command.c_str(), out, err, &exitCode, user, waitTime, locale,
+                                       true);
+            },
+            "cmkiat");
+        if (failure.empty()) return;
+        EXPECT_EQ(0U, failure.find(kThrower));
+        failure.erase(0, kThrower.size());
     }
 };
 
-/// Reads a non-blocking stream to its end and closes it.
-std::string readAll(FILE* stream) {
-    std::string text;
-    for (char buffer[4096];;) {
-        pollfd ready = {fileno(stream), POLLIN, 0};
-        poll(&ready, 1, -1);
-        const ssize_t n = read(fileno(stream), buffer, sizeof buffer);
-        if (n <= 0) {
-            break;
-        }
-        text.append(buffer, static_cast<size_t>(n));
+/// A tool that goes on running; its stream, which does not block, and its process.
+struct Running {
+    FILE* stream = nullptr;
+    pid_t pid = 0;
+
+    explicit Running(const char* command, const char* user = nullptr,
+                     const char* locale = nullptr) {
+        EXPECT_EQ(0, Helper::asynExecuteCommand(command, &pid, &stream, user, locale));
     }
-    fclose(stream);
-    return text;
-}
+    /// Its exit code, once it has ended.
+    int end() const {
+        int status = 0;
+        EXPECT_EQ(pid, waitpid(pid, &status, 0));
+        return WEXITSTATUS(status);
+    }
+};
 
 /// The process that a tool wrote to the file "pid"; throws if none does within ten seconds.
 pid_t waitForPid(const ToolFolder& tools) {
-    for (int i = 0; i < 10000 && tools.read("pid").find('\n') == std::string::npos; ++i) {
+    for (int i = 0; i < 10000 && tools.read("pid").find('\n') == std::string::npos; ++i)
         std::this_thread::sleep_for(1ms);
-    }
     return std::stoi(tools.read("pid"));
 }
 
@@ -86,9 +85,7 @@ TEST(CommandLineTest, SplitsLikeAShell) {
     for (const auto& [command, arguments, fault] : rows) {
         const zemCommandLine line = zemSplitCommandLine(command);
         std::string joined;
-        for (const std::string& argument : line.arguments) {
-            joined += argument + '|';
-        }
+        for (const std::string& argument : line.arguments) joined += argument + '|';
         EXPECT_EQ(arguments + '|', joined) << command;
         EXPECT_EQ(line.danglingBackslash, fault == 'd') << command;
         EXPECT_EQ(line.unbalancedQuote, fault == 'u') << command;
@@ -96,8 +93,9 @@ TEST(CommandLineTest, SplitsLikeAShell) {
 }
 
 TEST(PollPlanTest, LimitsCountInTenthsOfASecond) {
+    using Length = std::chrono::microseconds;
     // waitTime, passes (1000: no limit), their length
-    const std::tuple<int, int, std::chrono::microseconds>
+    const std::tuple<int, int, Length>
         rows[] =
             {
                 {50, 0, 0us},          {99999, 0, 0us},
@@ -112,9 +110,7 @@ TEST(PollPlanTest, LimitsCountInTenthsOfASecond) {
         zemPollPlan plan(waitTime);
         std::chrono::microseconds slept(0);
         int count = 0;
-        for (; count < 1000 && !plan.expired(); ++count) {
-            slept += plan.pause();
-        }
+        for (; count < 1000 && !plan.expired(); ++count) slept += plan.pause();
         EXPECT_EQ(passes, count) << waitTime;
         EXPECT_EQ(total, slept) << waitTime;
     }
@@ -127,9 +123,8 @@ TEST(PollPlanTest, BacksOffAfterTwentyMinutes) {
         ASSERT_EQ(2ms, plan.pause());
     }
     EXPECT_EQ(0ms, plan.pause());
-    for (int wait = 1; wait <= 32768; wait *= 2) {
+    for (int wait = 1; wait <= 32768; wait *= 2)
         EXPECT_EQ(std::chrono::milliseconds(wait), plan.pause());
-    }
     EXPECT_EQ(1min, plan.pause());
     EXPECT_EQ(1min, plan.pause());
 }
@@ -231,11 +226,8 @@ TEST(ExecuteCommandTest, LimitLeavesTheToolRunning) {
 
 TEST(ExecuteCommandTest, TakesMuchOutputOnBothStreams) {
     ToolFolder tools;
-    tools.script("flood",
-                 "for i in 1 2 3 4 5; do\n"
-                 "  head -c 2000000 /dev/zero | tr '\\0' o\n"
-                 "  head -c 2000000 /dev/zero | tr '\\0' e >&2\n"
-                 "done");
+    tools.script("some", "head -c 2000000 /dev/zero | tr '\\0' $1");
+    tools.script("flood", "for i in 1 2 3 4 5; do some o; some e >&2; done");
     const ToolRun run("flood");
     EXPECT_EQ(std::string(10000000, 'o'), std::string(run.out));
     EXPECT_EQ(std::string(10000000, 'e'), std::string(run.err));
@@ -250,22 +242,14 @@ TEST(ExecuteCommandTest, ManyRunsLeaveNothingBehind) {
         const ToolRun run(i % 4 == 0 ? "nosuchtool" : i % 4 == 1 ? "echo 'x" : "echo x");
         EXPECT_EQ(i % 4 > 1, run.failure.empty());
     }
-    std::vector<std::thread> threads;
-    for (int t = 0; t < 8; ++t) {
-        threads.emplace_back([&descriptors] {
-            for (int i = 0; i < 8; ++i) {
-                EXPECT_EQ(descriptors, std::string(ToolRun("count").out));
-                FILE* stream = nullptr;
-                pid_t pid = 0;
-                zemPropertiesHelper::asynExecuteCommand("count", &pid, &stream, nullptr, nullptr);
-                EXPECT_EQ(descriptors, readAll(stream));
-                EXPECT_EQ(pid, waitpid(pid, nullptr, 0));
-            }
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
+    onThreads(8, [&descriptors](int) {
+        for (int i = 0; i < 8; ++i) {
+            EXPECT_EQ(descriptors, std::string(ToolRun("count").out));
+            const Running running("count");
+            EXPECT_EQ(descriptors, readAll(running.stream));
+            running.end();
+        }
+    });
     EXPECT_EQ(before, openDescriptors());
     EXPECT_FALSE(hasChildren());
 }
@@ -276,16 +260,12 @@ TEST(ExecuteCommandTest, WorksWithoutStandardDescriptors) {
             close(STDIN_FILENO);
             close(STDOUT_FILENO);
             close(STDERR_FILENO);
+            const char* const both = "sh -c 'echo o; echo e >&2'";
             zemString out;
             zemString err;
-            zemPropertiesHelper::executeCommand("sh -c 'echo o; echo e >&2'", out, err, nullptr,
-                                                nullptr, 0, nullptr, false);
-            pid_t pid = 0;
-            FILE* stream = nullptr;
-            zemPropertiesHelper::asynExecuteCommand("sh -c 'echo o; echo e >&2'", &pid, &stream,
-                                                    nullptr, nullptr);
-            const bool good = out == "o\n" && err == "e\n" && readAll(stream) == "o\ne\n";
-            _exit(good ? 0 : 1);
+            Helper::executeCommand(both, out, err, nullptr, nullptr, 0, nullptr, false);
+            const bool good = out == "o\n" && err == "e\n";
+            _exit(good && readAll(Running(both).stream) == "o\ne\n" ? 0 : 1);
         },
         testing::ExitedWithCode(0), "");
 }
@@ -302,14 +282,12 @@ TEST(ExecuteCommandTest, FullDescriptorTableIsAFailureOfThePipe) {
 }
 
 TEST(UserContextTest, SwitchesGroupAndUser) {
-    if (geteuid() != 0) {
-        GTEST_SKIP() << "needs root";
-    }
+    if (geteuid() != 0) GTEST_SKIP() << "needs root";
     // First, as its process starts the test anew and leaves by the shortest way.
     EXPECT_EXIT(
         {
-            const int there = zemPropertiesHelper::changeProcessUserContext("nobody");
-            const int back = zemPropertiesHelper::changeProcessUserContext("root");
+            const int there = Helper::changeProcessUserContext("nobody");
+            const int back = Helper::changeProcessUserContext("root");
             _exit(there == 0 && geteuid() == 65534 && back == EPERM ? 0 : 1);
         },
         testing::ExitedWithCode(0), "");
@@ -317,8 +295,8 @@ TEST(UserContextTest, SwitchesGroupAndUser) {
     tools.script("who", "id -u; id -g");
     EXPECT_STREQ("65534\n65534\n", ToolRun("who", "nobody").out);
     EXPECT_STREQ("0\n0\n", ToolRun("who", "root").out);
-    EXPECT_EQ(0, zemPropertiesHelper::changeProcessUserContext("root"));
-    EXPECT_EQ(-1, zemPropertiesHelper::changeProcessUserContext("no such user"));
+    EXPECT_EQ(0, Helper::changeProcessUserContext("root"));
+    EXPECT_EQ(-1, Helper::changeProcessUserContext("no such user"));
 }
 
 TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {
@@ -334,56 +312,43 @@ TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {
         {"marker \\", "", std::string("-1:Invalid command parameter:\\") + '\0' + "ran\n", 0},
     };
     for (const auto& [command, user, output, exitCode] : rows) {
-        pid_t pid = 0;
-        FILE* stream = nullptr;
-        EXPECT_EQ(0, zemPropertiesHelper::asynExecuteCommand(command, &pid, &stream, user, "xx"));
-        EXPECT_NE(0, fcntl(fileno(stream), F_GETFL) & O_NONBLOCK);
-        EXPECT_EQ(output, readAll(stream));
-        int status = 0;
-        EXPECT_EQ(pid, waitpid(pid, &status, 0));
-        EXPECT_EQ(exitCode, WEXITSTATUS(status)) << command;
+        const Running running(command, user, "xx");
+        EXPECT_NE(0, fcntl(fileno(running.stream), F_GETFL) & O_NONBLOCK);
+        EXPECT_EQ(output, readAll(running.stream));
+        EXPECT_EQ(exitCode, running.end()) << command;
     }
 }
 
 TEST(HostTest, NamesAndAddresses) {
     char name[257] = {};
     gethostname(name, sizeof name - 1);
-    std::vector<std::thread> threads;
-    for (int t = 0; t < 4; ++t) {
-        threads.emplace_back([&name] {
-            EXPECT_STREQ(name, zemPropertiesHelper::getHostName());
-            zemPropertiesHelper::getFullHostName();
-        });
-    }
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
-    EXPECT_EQ(&zemPropertiesHelper::getHostName(), &zemPropertiesHelper::getHostName());
+    onThreads(4, [&name](int) {
+        EXPECT_STREQ(name, Helper::getHostName());
+        Helper::getFullHostName();
+    });
+    EXPECT_EQ(&Helper::getHostName(), &Helper::getHostName());
 
-    EXPECT_EQ(0x0A010203U, zemPropertiesHelper::getHostIPAddress("10.1.2.3"));
-    EXPECT_EQ(0xFFFFFFFFU, zemPropertiesHelper::getHostIPAddress(nullptr));
-    EXPECT_EQ(0xFFFFFFFFU, zemPropertiesHelper::getHostIPAddress("no such host"));
-    EXPECT_STREQ("10.1.2.3", zemPropertiesHelper::getHostIP("10.1.2.3"));
-    EXPECT_STREQ("", zemPropertiesHelper::getHostIP("no such host"));
-    EXPECT_TRUE(zemPropertiesHelper::isSameHost("127.0.0.1"));
-    EXPECT_FALSE(zemPropertiesHelper::isSameHost("no such host"));
-    EXPECT_FALSE(zemPropertiesHelper::isSameHost("192.0.2.1"));
+    EXPECT_EQ(0x0A010203U, Helper::getHostIPAddress("10.1.2.3"));
+    EXPECT_EQ(0xFFFFFFFFU, Helper::getHostIPAddress(nullptr));
+    EXPECT_EQ(0xFFFFFFFFU, Helper::getHostIPAddress("no such host"));
+    EXPECT_STREQ("10.1.2.3", Helper::getHostIP("10.1.2.3"));
+    EXPECT_STREQ("", Helper::getHostIP("no such host"));
+    EXPECT_TRUE(Helper::isSameHost("127.0.0.1"));
+    EXPECT_FALSE(Helper::isSameHost("no such host"));
+    EXPECT_FALSE(Helper::isSameHost("192.0.2.1"));
 }
 
 TEST(ValidatorTest, AddressesAndNames) {
-    for (const char* good : {"1.2.3.4", "1..2.3.4", "-1.2.3.4", "255.255.255.255", "1.2.3.4x"}) {
-        EXPECT_EQ(1, zemPropertiesHelper::isValidIPAddress(good)) << good;
-    }
-    for (const char* bad : {"", "1.2.3", "1.2.3.256", "a.b.c.d"}) {
-        EXPECT_EQ(0, zemPropertiesHelper::isValidIPAddress(bad)) << bad;
-    }
+    for (const char* good : {"1.2.3.4", "1..2.3.4", "-1.2.3.4", "255.255.255.255", "1.2.3.4x"})
+        EXPECT_EQ(1, Helper::isValidIPAddress(good)) << good;
+    for (const char* bad : {"", "1.2.3", "1.2.3.256", "a.b.c.d"})
+        EXPECT_EQ(0, Helper::isValidIPAddress(bad)) << bad;
     const std::tuple<const char*, const char*, int> rows[] = {
         {"$ab", "", 1},  {"a9$#@", "", 1}, {"9a", "", 0},   {"a_b", "", 0},
         {"$ab", "_", 0}, {"a_b", "_", 1},  {"a$b", "_", 0}, {"", "", 0},
         {"", "_", 0},    {"_a", "_", 0},   {"Zz", "", 1},   {"\xe4", "", 0}};
-    for (const auto& [name, extra, valid] : rows) {
-        EXPECT_EQ(valid, zemPropertiesHelper::isValidName(name, extra)) << name;
-    }
+    for (const auto& [name, extra, valid] : rows)
+        EXPECT_EQ(valid, Helper::isValidName(name, extra)) << name;
 }
 
 std::string local(long seconds) {
@@ -401,15 +366,14 @@ TEST(TimeStampTest, AreLocalTime) {
     char blank[] = "             ";
     char date[] = "20130102";
     char time[] = "030405";
-    EXPECT_EQ("2013-01-02 03:04:05", local(zemPropertiesHelper::getTimeFromTimeStamp13(stamp)));
-    EXPECT_EQ("1999-12-31 23:59:59", local(zemPropertiesHelper::getTimeFromTimeStamp13(old)));
-    EXPECT_EQ(0, zemPropertiesHelper::getTimeFromTimeStamp13(blank));
-    EXPECT_EQ("2013-01-02 03:04:05",
-              local(zemPropertiesHelper::getTimeFromDateTimeStamps(date, time)));
-    EXPECT_EQ(0, zemPropertiesHelper::getTimeFromDateTimeStamps(blank, time));
-    EXPECT_EQ(0, zemPropertiesHelper::getTimeFromDateTimeStamps(date, blank));
-    const long now = zemPropertiesHelper::getLocalDateTime();
-    EXPECT_LE(std::labs(now - zemPropertiesHelper::getCurrentTimeBaseSec()), 1);
+    EXPECT_EQ("2013-01-02 03:04:05", local(Helper::getTimeFromTimeStamp13(stamp)));
+    EXPECT_EQ("1999-12-31 23:59:59", local(Helper::getTimeFromTimeStamp13(old)));
+    EXPECT_EQ(0, Helper::getTimeFromTimeStamp13(blank));
+    EXPECT_EQ("2013-01-02 03:04:05", local(Helper::getTimeFromDateTimeStamps(date, time)));
+    EXPECT_EQ(0, Helper::getTimeFromDateTimeStamps(blank, time));
+    EXPECT_EQ(0, Helper::getTimeFromDateTimeStamps(date, blank));
+    const long now = Helper::getLocalDateTime();
+    EXPECT_LE(std::labs(now - Helper::getCurrentTimeBaseSec()), 1);
 }
 
 }  // namespace

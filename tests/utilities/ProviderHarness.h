@@ -3,19 +3,16 @@
 #ifndef PROVIDER_HARNESS_H
 #define PROVIDER_HARNESS_H
 
-#include <gtest/gtest.h>
-
-#include <functional>
 #include <map>
 #include <regex>
 #include <string>
 #include <vector>
 
+#include "../cimom/BothBrokers.h"
 #include "BaseProvider.h"
-#include "BaseProviderManager.h"
 #include "ClassRepository.h"
-#include "Exception.h"
-#include "Server.h"
+#include "FailureText.h"
+#include "ProviderFactories.h"
 
 /// What the provider answers, and what it was asked.
 struct Script {
@@ -49,9 +46,8 @@ public:
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {
         script.argsOf = std::string(className) + "." + method;
-        for (const std::string& name : script.methodArgs) {
+        for (const std::string& name : script.methodArgs)
             args.addElement(new zemString(name.c_str()));
-        }
     }
     const char* getMessageBundlePath() override { return script.bundle.c_str(); }
 };
@@ -132,12 +128,8 @@ class Harness {
 public:
     using M = zemBaseProviderManager;
 
-    template <class Provider>
-    static CmpiBaseMI* make(const CmpiBroker& mb, const CmpiContext& ctx, const char* name) {
-        return new Provider(mb, ctx, name);
-    }
-
-    explicit Harness(cimom::Character character, createMI create = make<ScriptedProvider>,
+    explicit Harness(cimom::Character character,
+                     createMI create = FactoriesOf<ScriptedProvider>::create,
                      const cimom::Request& request = {}, const std::string& messageFolder = "")
         : server({character, messageFolder, {}, classes()}), scope(server, request) {
         script = Script();
@@ -149,11 +141,8 @@ public:
         property = M::getPropertyMI(mb, ctx(), "TestProvider", nullptr, create);
     }
     ~Harness() {
-        instance->ft->cleanup(instance, ctx(), true);
-        association->ft->cleanup(association, ctx(), true);
-        method->ft->cleanup(method, ctx(), true);
-        indication->ft->cleanup(indication, ctx(), true);
-        property->ft->cleanup(property, ctx(), true);
+        const auto cleanup = [this](auto*... mi) { (mi->ft->cleanup(mi, ctx(), true), ...); };
+        cleanup(instance, association, method, indication, property);
         EXPECT_EQ(0U, server.staleUses());
     }
     Harness(const Harness&) = delete;
@@ -217,17 +206,5 @@ public:
     CMPIIndicationMI* indication;
     CMPIPropertyMI* property;
 };
-
-/// Runs a test with both kinds of broker.
-class BothBrokers : public testing::TestWithParam<cimom::Character> {};
-
-inline std::string brokerName(const testing::TestParamInfo<cimom::Character>& info) {
-    return info.param == cimom::Character::Full ? "Full" : "Lean";
-}
-
-#define ON_BOTH_BROKERS(suite)                                                                \
-    INSTANTIATE_TEST_SUITE_P(Brokers, suite,                                                  \
-                             testing::Values(cimom::Character::Full, cimom::Character::Lean), \
-                             brokerName)
 
 #endif

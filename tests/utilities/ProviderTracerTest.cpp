@@ -1,7 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <string>
-
 #include "Log.h"
 #include "ProviderTracer.h"
 #include "cmpift.h"

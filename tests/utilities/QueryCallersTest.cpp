@@ -2,10 +2,8 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <ctime>
-#include <functional>
-#include <string>
+#include <tuple>
 
 #include "CommandLine.h"
 #include "QyallocCmdCaller.h"
@@ -35,20 +33,18 @@ struct Row {
 void checkAll(const std::vector<Row>& rows) {
     for (const Row& row : rows) {
         ToolFolder tools;
-        tools.recorder(row.line.substr(0, row.line.find(' ')), "1\n2\n");
+        const std::string tool = row.line.substr(0, row.line.find(' '));
+        tools.recorder(tool, "1\n2\n");
         testing::internal::CaptureStdout();
         const zemRecordSetsType records = row.query();
         const std::string log = testing::internal::GetCapturedStdout();
         const size_t begin = log.find("<zem350Log-prefix>" + row.line + " -F ") + 18;
         ASSERT_GE(begin, 18U) << row.line << '\n' << log;
         const std::string line = log.substr(begin, log.find('\n', begin) - begin);
-        std::string received;
-        for (const std::string& argument : zemSplitCommandLine(line.c_str()).arguments) {
-            received += (received.empty() ? "" : "|") + argument;
-        }
-        EXPECT_EQ(received,
-                  row.line.substr(0, row.line.find(' ') + 1).replace(row.line.find(' '), 1, "|") +
-                      tools.arguments());
+        std::string logged;
+        for (const auto& argument : zemSplitCommandLine(line.c_str()).arguments)
+            logged += argument + '|';
+        EXPECT_EQ(logged, tool + '|' + tools.arguments() + '|');
         const std::string fields = line.substr(row.line.size() + 4);
         EXPECT_EQ(row.count, fields.empty() ? 0 : std::count(fields.begin(), fields.end(), ',') + 1)
             << line;
@@ -161,6 +157,35 @@ TEST(QueryCallersTest, LinesOfTheOtherTools) {
     });
 }
 // clang-format on
+
+TEST(QueryCallersTest, EnumeratorsArePositionsAndKeys) {
+    using System = zemQyplatCmdCaller::ManagedSystemAttribute;
+    const std::tuple<int, System::Attribute, const char*> rows[] = {
+        {0, System::ATTR_NAME, "name"},
+        {28, System::ATTR_7460_APPLICATION_CAPABLE, "7460_application_capable"},
+        {34, System::ATTR_ASSIGN_7460_WKL_PERCENT, "assign_7460_wkl_percent"},
+        {50, System::ATTR_SP_BOTT_MINOR_TYPE, "sp_boot_minor_type"},
+        {52, System::ATTR_CURR_MFG_DEFAULT_IPL_SOURCW, "curr_mfg_default_ipl_source"},
+        {58, System::ATTR_CORALHV_LPAR_REMOTE_RESTART_CAPABLE,
+         "coralhv_lpar_remote_restart_capable"},
+        {61, System::ATTR_ACTIVE_MEMORY_SHARING_CAPABLE, "active_mem_sharing_capable"},
+    };
+    for (const auto& [position, attribute, name] : rows) {
+        EXPECT_EQ(position, attribute);
+        EXPECT_STREQ(name, System::m_attributeName[attribute]);
+    }
+    EXPECT_EQ(-1, System::ATTR_END);
+    EXPECT_EQ(18, zemQyplatCmdCaller::PartitionAttribute::ATTR_MIGRATION_STATE);
+    EXPECT_EQ(43, zemQyplatCmdCaller::PartitionProfileAttribute::ATTR_REDUNDANT_ERR_PATH_REPORTING);
+
+    ToolFolder tools;
+    tools.recorder("qyplat", "one,\"two,2\"\n");
+    int wanted[] = {System::ATTR_SERIAL_NUM, System::ATTR_NAME, System::ATTR_END};
+    zemQyplatCmdCaller caller(nullptr, nullptr);
+    const zemRecordSetsType hosts = caller.getManagedSystemInformation(wanted, "m x");
+    EXPECT_EQ("-r|sys|-m|m x|-F|serial_num,name", tools.arguments());
+    EXPECT_STREQ("two,2", (*hosts.getElementAt(0))[System::ATTR_NAME]);
+}
 
 TEST(QueryCallersTest, ListsAndNumbersOfPools) {
     ToolFolder tools;

@@ -1,8 +1,5 @@
 #include <gtest/gtest.h>
 
-#include <string>
-#include <vector>
-
 #include "StringUtils.h"
 
 namespace {
@@ -13,15 +10,8 @@ std::string bytes(const zemString& s) {
     return std::string(static_cast<const char*>(s), s.isEmpty() ? 0 : s.length());
 }
 
-struct Row {
-    zemString got;
-    std::string want;
-};
-
-void expectRows(const std::vector<Row>& rows) {
-    for (const Row& row : rows) {
-        EXPECT_EQ(bytes(row.got), row.want);
-    }
+void expectRows(const std::vector<std::pair<zemString, std::string>>& rows) {
+    for (const auto& [got, want] : rows) EXPECT_EQ(bytes(got), want);
 }
 
 TEST(StringTest, TextsOfConstructorsAndTransformations) {
@@ -77,28 +67,23 @@ TEST(StringTest, ClearedStringKeepsItsLengthAndTakesNewText) {
     text = "hi";  // shorter than before: the old size must not be trusted
     EXPECT_STREQ(text, "hi");
     text.clear();
-    for (int i = 0; i < 100; ++i) {
-        text += 'x';
-    }
+    for (int i = 0; i < 100; ++i) text += 'x';
     EXPECT_EQ(bytes(text), std::string(100, 'x'));
 }
 
 TEST(StringTest, Equality) {
-    const struct {
-        const char *a, *b;
-        bool same, alike;
-    } rows[] = {{"abc", "abc", true, true},  {"abc", "aBc", false, true},
-                {"abc", "ab", false, false}, {"", "", true, true},
-                {none, none, true, true},    {none, "x", false, false}};
-    for (const auto& row : rows) {
-        const zemString a(row.a);
-        const zemString b(row.b);
-        EXPECT_EQ(zemString::equals(row.a, row.b), row.same);
-        EXPECT_EQ(zemString::equals(a, row.b), row.same);
-        EXPECT_EQ(a == b, row.same);
-        EXPECT_EQ(zemString::equalsIgnoreCase(row.a, row.b), row.alike);
-        EXPECT_EQ(zemString::equalsIgnoreCase(a, row.b), row.alike);
-        EXPECT_EQ(zemString::equalsIgnoreCase(a, b), row.alike);
+    // two texts, whether they are the same and whether they differ by case only
+    const std::tuple<const char*, const char*, bool, bool> rows[] = {
+        {"abc", "abc", true, true}, {"abc", "aBc", false, true}, {"abc", "ab", false, false},
+        {"", "", true, true},       {none, none, true, true},    {none, "x", false, false}};
+    for (const auto& [a, b, same, alike] : rows) {
+        const zemString first(a), second(b);
+        EXPECT_EQ(zemString::equals(a, b), same);
+        EXPECT_EQ(zemString::equals(first, b), same);
+        EXPECT_EQ(first == second, same);
+        EXPECT_EQ(zemString::equalsIgnoreCase(a, b), alike);
+        EXPECT_EQ(zemString::equalsIgnoreCase(first, b), alike);
+        EXPECT_EQ(zemString::equalsIgnoreCase(first, second), alike);
     }
     EXPECT_TRUE(zemString("") == none && zemString() == "" && !zemString::equals(none, ""));
 }
@@ -148,9 +133,7 @@ TEST(StringTest, Format) {
 
 TEST(StringPairsTest, KeepsOrderAndDuplicates) {
     zemStringPairs pairs;
-    for (int i = 0; i < 25; ++i) {
-        pairs.addPair(zemString(i % 20), zemString(100 + i));
-    }
+    for (int i = 0; i < 25; ++i) pairs.addPair(zemString(i % 20), zemString(100 + i));
     zemString key("k");
     zemString value("v");
     EXPECT_EQ(pairs.getPair(24, key, value), 24);

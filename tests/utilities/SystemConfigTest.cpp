@@ -1,18 +1,11 @@
 #include <gtest/gtest.h>
 #include <sched.h>
 #include <sys/mount.h>
-#include <sys/wait.h>
-#include <unistd.h>
 
-#include <cstdio>
-#include <functional>
-#include <memory>
-#include <string>
-#include <vector>
+#include <tuple>
 
 #include "EdplatCmdCaller.h"
-#include "FailureText.h"
-#include "Faults.h"
+#include "LibraryFaults.h"
 #include "NwplatCmdCaller.h"
 #include "SystemConfig.h"
 #include "ToolFolder.h"
@@ -22,8 +15,6 @@ namespace {
 namespace fs = std::filesystem;
 
 constexpr char kHost[] = "1111-AAA*0000001";
-
-using Pairs = zemDynamicArray<tagAttributePair>;
 
 /// A record as the management library would give it.
 std::unique_ptr<apiProp> object(
@@ -42,14 +33,6 @@ protected:
         ASSERT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance init").exit);
         m_host = zemManagerSystem::getHostSystemByName(kHost, "");
     }
-    static void plan(const char* operation, std::optional<int> code) {
-        appliance::PlannedFault fault;
-        fault.name = operation;
-        fault.code = code;
-        fault.isNull = !code;
-        appliance::planFault(fault);
-    }
-
     ToolFolder m_tools;
     zemHostSystem m_host{kHost, "", ""};
     zemVirtualSystem m_partition{"3", m_host, "", ""};
@@ -88,22 +71,22 @@ TEST_F(SystemConfigTest, ProductDataIsReadOnce) {
             "file : /opt/wrt/data/dnxvpd.properties.") {
             return 1;
         }
+        const auto known = [] {
+            return zemManagerSystem::getDNXUUID() == "a=b" &&
+                   zemManagerSystem::getMTMS("") == "1111-AAA*0000001";
+        };
         write("uuid=a=b\nMODELTYPE=1111-AAA\nSERIALNUMBER=0000001\nUUID=second\n");
-        if (!(zemManagerSystem::getDNXUUID() == "a=b")) return 2;
-        if (!(zemManagerSystem::getMTMS("") == "1111-AAA*0000001")) return 3;
+        if (!known()) return 2;
         write("UUID=other\n");
-        if (!(zemManagerSystem::getDNXUUID() == "a=b")) return 4;
-        return zemManagerSystem::getMTMS("") == "1111-AAA*0000001" ? 0 : 5;
+        return known() ? 0 : 3;
     });
     if (failed == 77) GTEST_SKIP() << "this machine allows no mounts";
     EXPECT_EQ(0, failed);
 }
 
 TEST_F(SystemConfigTest, ProductData) {
-    const struct {
-        const char* text;
-        const char* mtms;
-    } rows[] = {
+    const std::pair<const char*, const char*> rows[] = {
+        // a file, and the host of it
         {"modeltype=1111\nSerialNumber=ABC\n", "1111*ABC"},
         {"UUID=u\n\nno value\nSERIALNUMBER=A=B\nMODELTYPE=1111", "1111*A=B"},
         {"MODELTYPE=1\nMODELTYPE=2\n", "2*"},
@@ -112,9 +95,9 @@ TEST_F(SystemConfigTest, ProductData) {
     };
     const std::string file = m_tools.file("vpd");
     EXPECT_STREQ("", zemManagerSystem::getMTMSByName(file.c_str()));
-    for (const auto& row : rows) {
-        std::ofstream(file) << row.text;
-        EXPECT_STREQ(row.mtms, zemManagerSystem::getMTMSByName(file.c_str())) << row.text;
+    for (const auto& [text, mtms] : rows) {
+        std::ofstream(file) << text;
+        EXPECT_STREQ(mtms, zemManagerSystem::getMTMSByName(file.c_str())) << text;
     }
     if (access("/opt/wrt/data/dnxvpd.properties", F_OK) != 0) {
         EXPECT_STREQ("", zemManagerSystem::getMTMS(""));
@@ -162,12 +145,7 @@ TEST_F(SystemConfigTest, FailuresOfTheLibrary) {
     const std::string internal = "Internal Error:API(\"";
     const std::string unknown = "/DNX_API_UNKNOWN/Undefined error.";
     // clang-format off
-    const struct {
-        const char* operation;
-        std::optional<int> code;
-        std::string failure;
-        std::function<void()> read;
-    } rows[] = {
+    const std::tuple<const char*, std::optional<int>, std::string, std::function<void()>> rows[] = {
         {"getCecObj", {}, "6/zemManagerSystem/getHostSystemByName/-1/" + internal + "getCecObj\") calling failed", [] { zemManagerSystem::getHostSystemByName(kHost, ""); }},
         {"getAllCecs", {}, "6/zemManagerSystem/getAllHostSystem/UNKNOWN/" + internal + "getAllCecs\") calling failed", [] { zemManagerSystem::getAllHostSystem(""); }},
         {"getAllLparsFromCec", {}, "6/zemHostSystem/getAllVirtualSystem/UNKNOWN/" + internal + "getAllLparsFromCec\") calling failed", [&] { m_host.getAllVirtualSystem(); }},
@@ -178,9 +156,9 @@ TEST_F(SystemConfigTest, FailuresOfTheLibrary) {
         {"getCecObj", 0, "5/zemManagerSystem/getHostSystemByName//1111-AAA*0000001", [] { zemManagerSystem::getHostSystemByName(kHost, ""); }},
     };
     // clang-format on
-    for (const auto& row : rows) {
-        plan(row.operation, row.code);
-        EXPECT_EQ(row.failure, failureText(row.read)) << row.operation;
+    for (const auto& [operation, code, failure, read] : rows) {
+        planAnswer(operation, code);
+        EXPECT_EQ(failure, failureText(read)) << operation;
     }
     appliance::clearFaults();
     EXPECT_EQ(
@@ -189,32 +167,28 @@ TEST_F(SystemConfigTest, FailuresOfTheLibrary) {
         failureText([&] { m_host.getVirtualSystemById("99"); }));
     EXPECT_NE("", failureText([] { zemHostSystem().getMTMS(); }));
     for (const std::optional<int> code : {std::optional<int>(), std::optional<int>(5)}) {
-        plan("getAllLparsFromCec", code);
+        planAnswer("getAllLparsFromCec", code);
         EXPECT_FALSE(m_host.IsUnusedLparId("99"));
     }
 }
 
 TEST_F(SystemConfigTest, ParsesProperties) {
-    const struct {
-        const char* definition;
-        const char* env;
-        const char* profile;
-        const char* name;
-    } rows[] = {
+    // DefinitionState and what it says, Default_prof and the name in it
+    const std::tuple<const char*, const char*, const char*, const char*> rows[] = {
         {"2", "tmxlinux", "1,a,b", "a,b"},
         {"3", "xbrgserver", "NULL,a", ""},
         {"130", "osq00", ",a", ""},
         {"77", "77", "normal", ""},
     };
-    for (const auto& row : rows) {
+    for (const auto& [definition, env, profile, name] : rows) {
         const auto prop = object({{"Name", "12*T*S"},
-                                  {"DefinitionState", row.definition},
-                                  {"Default_prof", row.profile},
+                                  {"DefinitionState", definition},
+                                  {"Default_prof", profile},
                                   {"MigrationState", "14"}});
         zemVirtualSystem partition(*prop, "", "");
         EXPECT_STREQ("12*T*S", partition.getLparIDAndMTMS());
-        EXPECT_STREQ(row.env, partition.getEnv());
-        EXPECT_STREQ(row.name, partition.getDefaultProfileName());
+        EXPECT_STREQ(env, partition.getEnv());
+        EXPECT_STREQ(name, partition.getDefaultProfileName());
         EXPECT_TRUE(partition.getRedundantPath());
         EXPECT_FALSE(partition.isLive());
         EXPECT_STREQ("Migration In Progress", partition.getMigrationStateString());
@@ -249,17 +223,11 @@ TEST_F(SystemConfigTest, ParsesProperties) {
 TEST_F(SystemConfigTest, ChangesThroughTheTools) {
     const std::string m = std::string("-m|") + kHost;
     const std::string prof = "-r|prof|" + m + "|-i|\"name=normal\",\"lpar_id=3\"";
-    Pairs slots;
-    slots.addElement(new tagAttributePair{
-        zemEdplatCmdCaller::PartitionProfileAttribute::ATTR_IO_SLOTS, "21//0"});
-    Pairs ids;
-    ids.addElement(new tagAttributePair{zemNwplatCmdCaller::PartitionAttribute::ATTR_LPAR_ID, "9"});
+    const auto slots =
+        pairs({{zemEdplatCmdCaller::PartitionProfileAttribute::ATTR_IO_SLOTS, "21//0"}});
+    const auto ids = pairs({{zemNwplatCmdCaller::PartitionAttribute::ATTR_LPAR_ID, "9"}});
     // clang-format off
-    const struct {
-        const char* tool;
-        std::string arguments;
-        std::function<int()> change;
-    } rows[] = {
+    const std::tuple<const char*, std::string, std::function<int()>> rows[] = {
         {"dlplat", "-r|lpar|" + m + "|--id|3", [&] { return m_host.destoryVirtualSystem("3"); }},
         {"nwplat", "-r|lpar|" + m + "|-i|\"lpar_id=9\"", [&] { return m_host.createVirtualSystem(ids); }},
         {"edpower", "-r|lpar|-o|chkey|-k|norm|--id|3|" + m, [&] { return m_partition.setKeylock("norm"); }},
@@ -276,26 +244,17 @@ TEST_F(SystemConfigTest, ChangesThroughTheTools) {
         {"domove", "-o|m|" + m + "|-t|T|--ip|x|--id|3", [&] { pid_t pid = 0; FILE* stream = nullptr; const int rc = m_partition.migrateTo("T", true, "x", nullptr, &pid, &stream); EXPECT_EQ(pid, waitpid(pid, nullptr, 0)); return rc + fclose(stream); }},
     };
     // clang-format on
-    for (const auto& row : rows) {
-        m_tools.recorder(row.tool);
-        EXPECT_EQ(0, row.change()) << row.arguments;
-        EXPECT_EQ(row.arguments, m_tools.arguments());
+    for (const auto& [tool, arguments, change] : rows) {
+        m_tools.recorder(tool);
+        EXPECT_EQ(0, change()) << arguments;
+        EXPECT_EQ(arguments, m_tools.arguments());
     }
     EXPECT_STREQ("n", m_profile.getName());
 }
 
 TEST_F(SystemConfigTest, FailuresOfTheTools) {
-    const auto fail = [&](const std::string& id) {
-        for (const char* tool : {"edplat", "edpower", "qyplat", "domove"}) {
-            m_tools.script(tool, "echo '" + id + " gone' >&2; exit 1");
-        }
-    };
     // clang-format off
-    const struct {
-        const char* who;
-        bool isQuery;
-        std::function<void()> operation;
-    } rows[] = {
+    const std::tuple<const char*, bool, std::function<void()>> rows[] = {  // true: a query
         {"zemVirtualSystem/setVirtualSystemName", false, [&] { m_partition.setName("n"); }},
         {"zemVirtualSystem/setDefaultProfile", false, [&] { m_partition.setDefaultProfile("n"); }},
         {"zemVirtualSystem/setKeylock", false, [&] { m_partition.setKeylock("n"); }},
@@ -306,23 +265,22 @@ TEST_F(SystemConfigTest, FailuresOfTheTools) {
     };
     // clang-format on
     for (const std::string id : {"WRTL8018", "WRTL8011", "WRTL8010", "WRTL8019"}) {
-        fail(id);
-        for (const auto& row : rows) {
-            const bool unknown = id != "WRTL8019" && !(row.isQuery && id == "WRTL8010");
-            EXPECT_EQ(
-                (unknown ? "5/" + std::string(row.who) : "6/zemCommandCaller/callGenericCommand") +
-                    "/" + id + "/" + id + " gone",
-                failureText(row.operation));
+        for (const char* tool : {"edplat", "edpower", "qyplat", "domove"})
+            m_tools.script(tool, "echo '" + id + " gone' >&2; exit 1");
+        for (const auto& [who, isQuery, operation] : rows) {
+            const bool unknown = id != "WRTL8019" && !(isQuery && id == "WRTL8010");
+            const std::string caller = "6/zemCommandCaller/callGenericCommand";
+            EXPECT_EQ((unknown ? std::string("5/") + who : caller) + "/" + id + "/" + id + " gone",
+                      failureText(operation));
         }
     }
     EXPECT_STREQ("normal", m_profile.getName());
+    const auto stop = [&] { m_partition.stopMigration("T", false, "", nullptr, 0); };
     EXPECT_EQ("6/zemHostSystem/getVirtualSystemByName/WRTL8019/gone\n",
               failureText([&] { m_partition.validateMigratebility("T", false, "", nullptr); }));
-    EXPECT_EQ("6/zemHostSystem/stopMigration/WRTL8019/gone\n",
-              failureText([&] { m_partition.stopMigration("T", false, "", nullptr, 0); }));
+    EXPECT_EQ("6/zemHostSystem/stopMigration/WRTL8019/gone\n", failureText(stop));
     m_tools.script("domove", "printf 'moveless'; exit 2");
-    EXPECT_EQ("6/zemHostSystem/stopMigration/UNKNOWN/moveless",
-              failureText([&] { m_partition.stopMigration("T", false, "", nullptr, 0); }));
+    EXPECT_EQ("6/zemHostSystem/stopMigration/UNKNOWN/moveless", failureText(stop));
     m_tools.recorder("qyplat");
     EXPECT_EQ(
         "5/zemHostSystem/getVirtualSystemByName//The requested patition(name:x) was not found "
@@ -337,16 +295,13 @@ TEST_F(SystemConfigTest, FailuresOfTheTools) {
 }
 
 TEST_F(SystemConfigTest, Migrations) {
-    const struct {
-        const char* output;
-        int percent;
-    } rows[] = {{"0,0\n", 0},    {"50,50\n", 45},
-                {"7,0\n", 90},   {"1,999\n", 0},
-                {"", -1},        {"18446744073709551615,1\n", 90},
-                {"\"1,1\n", -1}, {"No results were found.", -1}};
-    for (const auto& row : rows) {
-        m_tools.recorder("qymove", row.output);
-        EXPECT_EQ(row.percent, m_partition.getMigrationPercentComplete("")) << row.output;
+    const std::pair<const char*, int> rows[] = {{"0,0\n", 0},    {"50,50\n", 45},
+                                                {"7,0\n", 90},   {"1,999\n", 0},
+                                                {"", -1},        {"18446744073709551615,1\n", 90},
+                                                {"\"1,1\n", -1}, {"No results were found.", -1}};
+    for (const auto& [output, percent] : rows) {
+        m_tools.recorder("qymove", output);
+        EXPECT_EQ(percent, m_partition.getMigrationPercentComplete("")) << output;
     }
     m_tools.recorder("qymove", "1\n");
     EXPECT_TRUE(zemManagerSystem::isEnableRemoteRelocation(""));

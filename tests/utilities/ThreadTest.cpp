@@ -2,14 +2,10 @@
 #include <unistd.h>
 
 #include <atomic>
-#include <cerrno>
 #include <chrono>
-#include <ctime>
-#include <functional>
-#include <thread>
-#include <vector>
 
 #include "AtomicType.h"
+#include "OnThreads.h"
 #include "Thread.h"
 
 namespace {
@@ -18,37 +14,22 @@ using Clock = std::chrono::steady_clock;
 using std::chrono::milliseconds;
 
 bool eventually(const std::function<bool()>& holds) {
-    for (int i = 0; i < 20000 && !holds(); ++i) {
-        usleep(1000);
-    }
+    for (int i = 0; i < 20000 && !holds(); ++i) usleep(1000);
     return holds();
-}
-
-void onThreads(int count, const std::function<void()>& work,
-               const std::function<void()>& meanwhile) {
-    std::vector<std::thread> threads;
-    for (int i = 0; i < count; ++i) {
-        threads.emplace_back(work);
-    }
-    meanwhile();
-    for (std::thread& thread : threads) {
-        thread.join();
-    }
 }
 
 TEST(ThreadSynchronizerTest, IsRecursiveAndKeepsOthersOut) {
     zemSynchronizerContext context;
     zemAtomicType<int> counted(5);
     int plain = 0;
-    const auto count = [&] {
+    onThreads(4, [&](int) {
         for (int i = 0; i < 5000; ++i) {
             ++counted;
             zemSynchronizer outer(context);
             zemSynchronizer inner(context);
             ++plain;
         }
-    };
-    onThreads(3, count, count);
+    });
     EXPECT_EQ(plain, 20000);
     EXPECT_EQ(counted++, 20005);
     EXPECT_EQ(counted -= 6, 20000);
@@ -70,7 +51,7 @@ TEST(ThreadConditionTest, TimedWaitCrossesASecond) {
 TEST(ThreadConditionTest, SignalWakesAllWaiters) {
     zemCondition condition;
     std::atomic<int> awake{0};
-    const auto wait = [&] {
+    const auto wait = [&](int) {
         condition.wait();
         ++awake;
     };
@@ -78,9 +59,7 @@ TEST(ThreadConditionTest, SignalWakesAllWaiters) {
         usleep(100000);
         condition.signal();
         EXPECT_TRUE(eventually([&] { return awake > 1; })) << "a broadcast";
-        while (awake < 4) {  // one that came late to its wait
-            condition.signal();
-        }
+        while (awake < 4) condition.signal();  // one that came late to its wait
     });
 }
 
@@ -143,7 +122,7 @@ TEST(ThreadTest, EndsQuietlyHoweverTheMethodEnds) {
 TEST(ThreadQueueTest, DeliversInOrderAndNeverHangs) {
     zemControlledDataCommunication queue;
     int data[5000] = {};
-    const auto produce = [&] {
+    const auto produce = [&](int) {
         for (int i = 0; i < 5000; ++i) {
             data[i] = i;
             queue.putControlledData(&data[i], i + 1);

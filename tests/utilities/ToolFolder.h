@@ -1,15 +1,19 @@
 /// Tools for a test: scripts of its own ahead of the real ones, and what they left behind.
 #pragma once
 
+#include <poll.h>
 #include <sys/wait.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
 #include <iterator>
 #include <string>
+#include <vector>
 
 #include "../support/TestAppliance.h"
-#include "Exception.h"
+#include "CommandCaller.h"
+#include "FailureText.h"
 
 class ToolFolder : public testing_support::TestAppliance {
 public:
@@ -43,16 +47,25 @@ public:
     }
 };
 
-/// What an operation throws, "kind/id/access method/text", or "" if it throws nothing.
-template <typename Operation>
-std::string failureOf(Operation operation) {
-    try {
-        operation();
-    } catch (const zemException& e) {
-        return std::to_string(e.getExceptionType()) + '/' + e.getExceptionId() + '/' +
-               e.getAccessMethod() + '/' + e.getExceptionString();
+/// Reads a stream, blocking or not, to its end and closes it.
+inline std::string readAll(FILE* stream) {
+    std::string text;
+    for (char buffer[4096];;) {
+        pollfd ready = {fileno(stream), POLLIN, 0};
+        poll(&ready, 1, -1);
+        const ssize_t n = read(fileno(stream), buffer, sizeof buffer);
+        if (n <= 0) break;
+        text.append(buffer, static_cast<size_t>(n));
     }
-    return "";
+    fclose(stream);
+    return text;
+}
+
+/// Attributes for a change tool.
+inline zemDynamicArray<tagAttributePair> pairs(const std::vector<tagAttributePair>& list) {
+    zemDynamicArray<tagAttributePair> all;
+    for (const tagAttributePair& pair : list) all.addElement(new tagAttributePair(pair));
+    return all;
 }
 
 /// Descriptors that this process holds open, and whether it has a child, ended or not.

@@ -1,33 +1,19 @@
 #include <gtest/gtest.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <chrono>
-#include <cstdio>
-#include <cstdlib>
-#include <filesystem>
-#include <fstream>
-#include <functional>
 #include <regex>
-#include <string>
-#include <thread>
-#include <vector>
 
+#include "../support/TestAppliance.h"
+#include "OnThreads.h"
 #include "TraceTool.h"
 
 namespace {
 
 namespace fs = std::filesystem;
-
-std::vector<std::string> linesOf(const std::string& file) {
-    std::vector<std::string> lines;
-    std::ifstream in(file);
-    for (std::string line; std::getline(in, line);) {
-        lines.push_back(line);
-    }
-    return lines;
-}
+using testing_support::contents;
+using testing_support::lines;
 
 // The manager reads the environment once in the life of a process, so each case is a process:
 // a fork of this one, which itself never touches the manager.
@@ -45,28 +31,23 @@ protected:
         const pid_t child = fork();
         if (child == 0) {
             std::freopen(m_output.c_str(), "w", stdout);
-            trace == nullptr ? unsetenv("VM_CIMPROVIDER_TRACE")
-                             : setenv("VM_CIMPROVIDER_TRACE", trace, 1);
-            path == nullptr ? unsetenv("VM_CIMPROVIDER_TRACE_PATH")
-                            : setenv("VM_CIMPROVIDER_TRACE_PATH", path, 1);
+            const auto set = [](const char* name, const char* value) {
+                value == nullptr ? unsetenv(name) : setenv(name, value, 1);
+            };
+            set("VM_CIMPROVIDER_TRACE", trace);
+            set("VM_CIMPROVIDER_TRACE_PATH", path);
             work();
             std::exit(HasFailure() ? 1 : 0);
         }
         int status = -1;
         EXPECT_EQ(waitpid(child, &status, 0), child);
-        std::string text;
-        for (const std::string& line : linesOf(m_output)) {
-            text += line + "\n";
-        }
-        EXPECT_EQ(status, 0) << text;
-        return text;
+        EXPECT_EQ(status, 0) << contents(m_output);
+        return contents(m_output);
     }
 
     bool waitForLines(std::size_t count) const {
-        for (int i = 0; i < 1000 && linesOf(m_trace).size() < count; ++i) {
-            usleep(50000);
-        }
-        return linesOf(m_trace).size() == count;
+        for (int i = 0; i < 1000 && lines(contents(m_trace)).size() < count; ++i) usleep(50000);
+        return lines(contents(m_trace)).size() == count;
     }
 
     const std::string m_trace = testing::TempDir() + "timing" + std::to_string(getpid());
@@ -92,10 +73,9 @@ TEST_F(TraceToolTest, OffUnlessAskedFor) {
 TEST_F(TraceToolTest, SaysWhereTheDefaultFileIsAndEndsWithoutWaitingForThePoll) {
     const bool wasThere = fs::exists("/tmp/CIMTestPerfData.txt");
     const auto start = std::chrono::steady_clock::now();
-    for (int i = 0; i < 5; ++i) {
+    for (int i = 0; i < 5; ++i)
         EXPECT_EQ(run("", nullptr, CTimeLogerManager::getInstance),
                   "env not set for VM_CIMPROVIDER_TRACE_PATH\npath:/tmp/CIMTestPerfData.txt\n");
-    }
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2400));
     if (!wasThere) fs::remove("/tmp/CIMTestPerfData.txt");
 }
@@ -109,54 +89,43 @@ TEST_F(TraceToolTest, FiftyLinesAreWrittenFewerWait) {
         logger->begin(std::string(10000, 'k').c_str());
         logger->end("short");
         logger->log("a", "b", "c");
-        for (int i = 3; i < 49; ++i) {
-            manager->log("fill");
-        }
+        for (int i = 3; i < 49; ++i) manager->log("fill");
         usleep(1200000);  // two polls of the drain
-        EXPECT_TRUE(linesOf(m_trace).empty());
+        EXPECT_TRUE(lines(contents(m_trace)).empty());
         manager->log("fill");
         EXPECT_TRUE(waitForLines(50));
     });
     EXPECT_EQ(output, "path:" + m_trace + "\n");
-    std::vector<std::string> lines = linesOf(m_trace);
-    ASSERT_EQ(lines.size(), 50U);
-    const std::size_t key = lines[0].find("kkk");
-    EXPECT_EQ(lines[0].substr(key, 10000), std::string(10000, 'k'));
-    lines[0].erase(key, 9999);
+    std::vector<std::string> written = lines(contents(m_trace));
+    ASSERT_EQ(written.size(), 50U);
+    const std::size_t key = written[0].find("kkk");
+    EXPECT_EQ(written[0].substr(key, 10000), std::string(10000, 'k'));
+    written[0].erase(key, 9999);
     const char* const forms[] = {R"(\+\+\+op:-?\d+ op-k begin at \d{16}\.)",
                                  R"(\+\+\+op:-?\d+ op-short end at \d{16}\.)",
                                  R"(\+\+\+op:-?\d+,\d{16}, op,a-b,c)"};
-    for (std::size_t i = 0; i < 3; ++i) {
-        EXPECT_TRUE(std::regex_match(lines[i], std::regex(forms[i]))) << lines[i];
-    }
+    for (std::size_t i = 0; i < 3; ++i)
+        EXPECT_TRUE(std::regex_match(written[i], std::regex(forms[i]))) << written[i];
 }
 
 TEST_F(TraceToolTest, ThreadsLinesArriveWholeAndInOrder) {
     constexpr int threadCount = 8;
     constexpr int lineCount = 4000;
     run("", m_trace.c_str(), [this] {
-        std::vector<std::thread> threads;
-        for (int t = 0; t < threadCount; ++t) {
-            threads.emplace_back([t] {
-                for (int i = 0; i < lineCount; ++i) {
-                    zemString key;
-                    key.format("<%d/%d>", t, i);
-                    // Half of the loggers are shared.
-                    CTimeLogerManager::getInstance()->getLogger(zemString(t / 2))->begin(key);
-                }
-            });
-        }
-        for (std::thread& thread : threads) {
-            thread.join();
-        }
-        for (int i = 0; i < 50; ++i) {
-            CTimeLogerManager::getInstance()->log("fill");
-        }
+        onThreads(threadCount, [](int number) {
+            for (int i = 0; i < lineCount; ++i) {
+                zemString key;
+                key.format("<%d/%d>", number, i);
+                // Half of the loggers are shared.
+                CTimeLogerManager::getInstance()->getLogger(zemString(number / 2))->begin(key);
+            }
+        });
+        for (int i = 0; i < 50; ++i) CTimeLogerManager::getInstance()->log("fill");
         EXPECT_TRUE(waitForLines(threadCount * lineCount + 50));
     });
     int next[threadCount] = {};
     const std::regex form(R"(\+\+\+\d:-?\d+ (\d)-<(\d)/(\d+)> begin at \d{16}\.)");
-    for (const std::string& line : linesOf(m_trace)) {
+    for (const std::string& line : lines(contents(m_trace))) {
         std::smatch match;
         if (line != "fill") {
             ASSERT_TRUE(std::regex_match(line, match, form)) << line;
@@ -171,7 +140,7 @@ TEST_F(TraceToolTest, FileLoggerWritesAtOnce) {
     fs::remove(path);
     CTimeFileLoger logger("id");
     logger.end("k");
-    const std::string line = linesOf(path).at(0);
+    const std::string line = lines(contents(path)).at(0);
     fs::remove(path);
     const std::regex form(R"(\+\+id: \+\+\+id:-?\d+ id-k end at \d{16}\.)");
     EXPECT_TRUE(std::regex_match(line, form)) << line;

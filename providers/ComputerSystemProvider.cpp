@@ -9,14 +9,24 @@ namespace {
 
 constexpr const char kStateChange[] = "RequestStateChange";
 
-/// States that a client may ask for, and the answer to each of them.
+/// States that a client may ask for, and answers to it.
 constexpr CMPIUint16 kRequestableStates[] = {2, 3, 4, 6, 7, 8, 9, 10, 11};
-constexpr CMPIUint32 kNotSupported = 1;
+constexpr CMPIUint32 kNotSupported = 1, kTimeoutNotSupported = 4098;
 
 CmpiData uint32(CMPIUint32 value) {
     CmpiData data;
     data.setUint32(value);
     return data;
+}
+
+/// Whether the client limits the time that a change may take.
+bool hasTimeout(const CmpiArgs& in) {
+    try {
+        const CmpiData limit = in.getArg("TimeoutPeriod");
+        return !limit.isNullValue() && limit.getDateTime().getDateTime() != 0;
+    } catch (const CmpiStatus&) {
+        return false;  // it was not given, in the way of some servers
+    }
 }
 
 }  // namespace
@@ -37,7 +47,7 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
     const CmpiString name = getKeyBinding(path, "Name").getString();
     std::unique_ptr<CmpiInstance> found;
     if (strcasecmp(creationClass.charPtr(), m_className) == 0) {
-        zemQyplatCmdCaller tool = toolFor(context);
+        zemQyplatCmdCaller tool = toolFor(clientOf(context));
         find(tool, name.charPtr(), attributesFor(m_rows, m_identity, properties).data(),
              [&](const std::string& foundName, const zemRecordType& record) {
                  found = std::make_unique<CmpiInstance>(
@@ -51,7 +61,7 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
 void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, CmpiResult& result,
                                                   const CmpiObjectPath& path,
                                                   const char** properties) {
-    zemQyplatCmdCaller tool = toolFor(context);
+    zemQyplatCmdCaller tool = toolFor(clientOf(context));
     walk(tool, attributesFor(m_rows, m_identity, properties).data(),
          [&](const std::string& name, const zemRecordType& record) {
              result.returnData(systemInstance(path, properties, name, record));
@@ -61,7 +71,7 @@ void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, Cm
 void ComputerSystemProvider::performEnumInstanceNames(const CmpiContext& context,
                                                       CmpiResult& result,
                                                       const CmpiObjectPath& path) {
-    zemQyplatCmdCaller tool = toolFor(context);
+    zemQyplatCmdCaller tool = toolFor(clientOf(context));
     walk(tool, attributesFor({}, m_identity, nullptr).data(),
          [&](const std::string& name, const zemRecordType&) {
              result.returnData(systemPath(path, name));
@@ -73,23 +83,37 @@ void ComputerSystemProvider::performSetInstance(const CmpiContext& context, Cmpi
                                                 const CmpiInstance& instance,
                                                 const char** properties) {
     const CmpiInstance present = performGetInstance(context, path, nullptr);
+    std::vector<std::pair<std::string, std::string>> changes;
     for (unsigned i = 0; i < instance.getPropertyCount(); ++i) {
         CmpiString name;
-        instance.getProperty(static_cast<int>(i), &name);
-        if (containsProperty(properties, name.charPtr()))
+        const CmpiData value = instance.getProperty(static_cast<int>(i), &name);
+        if (!containsProperty(properties, name.charPtr())) continue;
+        if (!isChangeable(name.charPtr()))
             validateUnmodifiableProperty(present, instance, name.charPtr());
+        else if (!value.isNullValue() &&
+                 !(cmpidata2String(value) == cmpidata2String(present.getProperty(name.charPtr()))))
+            changes.emplace_back(name.charPtr(), value.getString().charPtr());
     }
+    const CmpiString name = getKeyBinding(path, "Name").getString();
+    for (const auto& [property, value] : changes)
+        change(clientOf(context), name.charPtr(), property.c_str(), value);
 }
 
-void ComputerSystemProvider::performInvokeMethod(const CmpiContext&, CmpiResult& result,
-                                                 const CmpiObjectPath&, const char* method,
+void ComputerSystemProvider::performInvokeMethod(const CmpiContext& context, CmpiResult& result,
+                                                 const CmpiObjectPath& path, const char* method,
                                                  const CmpiArgs& in, CmpiArgs&) {
     if (strcasecmp(method, kStateChange) != 0) throwMethodNotFoundExc(method, m_className);
     const CmpiData asked = getParmVal(in, "RequestedState");
+    const CMPIUint16 state = asked.getUint16();
     const auto* end = std::end(kRequestableStates);
-    if (std::find(std::begin(kRequestableStates), end, asked.getUint16()) == end)
+    if (std::find(std::begin(kRequestableStates), end, state) == end)
         throwInvalidMethodArgValueExc("RequestedState", cmpidata2String(asked), method);
-    result.returnData(uint32(kNotSupported));
+    if (hasTimeout(in)) {
+        result.returnData(uint32(kTimeoutNotSupported));
+        return;
+    }
+    const CmpiString name = getKeyBinding(path, "Name").getString();
+    result.returnData(uint32(requestState(clientOf(context), name.charPtr(), state)));
 }
 
 CMPIBoolean ComputerSystemProvider::isValidInstanceClass(const char* className) {
@@ -114,10 +138,23 @@ void ComputerSystemProvider::populateMethodArgs(const char*, zemDynamicArray<zem
 
 const char* ComputerSystemProvider::getMessageBundlePath() { return ""; }
 
+bool ComputerSystemProvider::isChangeable(const char*) const { return false; }
+
+void ComputerSystemProvider::change(const Client&, const std::string&, const char*,
+                                    const std::string&) {}
+
+CMPIUint32 ComputerSystemProvider::requestState(const Client&, const std::string&, CMPIUint16) {
+    return kNotSupported;
+}
+
 void ComputerSystemProvider::complete(CmpiInstance&, const std::string&, const char**) {}
 
-zemQyplatCmdCaller ComputerSystemProvider::toolFor(const CmpiContext& context) {
-    return zemQyplatCmdCaller(getUserContext(context), getExternalLanguageName(context));
+ComputerSystemProvider::Client ComputerSystemProvider::clientOf(const CmpiContext& context) {
+    return {getUserContext(context), getExternalLanguageName(context)};
+}
+
+zemQyplatCmdCaller ComputerSystemProvider::toolFor(const Client& client) {
+    return zemQyplatCmdCaller(client.user, client.locale);
 }
 
 CmpiObjectPath ComputerSystemProvider::systemPath(const CmpiObjectPath& near,

@@ -1,14 +1,18 @@
-/// What the providers of hosts and partitions share: a CIM_ComputerSystem read from qyplat.
+/// What the providers of hosts and partitions share: a CIM_ComputerSystem read
+/// from qyplat.
 ///
-/// A subclass names its class and the rows that turn tool attributes into CIM properties, and
-/// says how to find one system and how to walk all. The tool runs under the client's user and in
-/// the client's language, and is asked only for the attributes that the wanted properties need.
+/// A subclass names its class and the rows that turn tool attributes into CIM
+/// properties, and says how to find one system and how to walk all. The tool
+/// runs under the client's user and in the client's language, and is asked only
+/// for the attributes that the wanted properties need.
 ///
-/// A modification may repeat what is already so, and is refused when it would change anything.
-/// RequestStateChange answers "Not Supported" to every state there is.
+/// A modification changes what the subclass can change; of the rest it may only
+/// repeat what is already so, and is refused before anything is changed.
+/// RequestStateChange answers "Not Supported" to every state there is unless
+/// the subclass knows better.
 ///
-/// Thread-safety: as the frame demands, no state beside the constant rows; any number of
-/// operations at once.
+/// Thread-safety: as the frame demands, no state beside the constant rows; any
+/// number of operations at once.
 #ifndef COMPUTER_SYSTEM_PROVIDER_H
 #define COMPUTER_SYSTEM_PROVIDER_H
 
@@ -22,6 +26,12 @@
 
 class ComputerSystemProvider : public zemBaseZemProvider {
 protected:
+    /// On whose behalf tools run, and in which language they speak.
+    struct Client {
+        zemString user;
+        zemString locale;
+    };
+
     /// Receives each record found, with the value of the Name key.
     using Sink = std::function<void(const std::string& name, const zemRecordType& record)>;
 
@@ -29,8 +39,8 @@ protected:
                            const char* className, std::vector<PropertyRow> rows,
                            Attributes identity);
 
-    /// Hands the system with this Name to @p sink; a Name that no system can have, or that none
-    /// has, leaves the sink uncalled.
+    /// Hands the system with this Name to @p sink; a Name that no system can
+    /// have, or that none has, leaves the sink uncalled.
     /// @param attributes  those to ask the tool for, closed by ATTR_END
     virtual void find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
                       const Sink& sink) = 0;
@@ -39,7 +49,17 @@ protected:
     /// Adds what follows from the Name alone.
     virtual void complete(CmpiInstance& instance, const std::string& name, const char** properties);
 
-    zemQyplatCmdCaller toolFor(const CmpiContext& context);
+    /// Whether change() can change the property.
+    virtual bool isChangeable(const char* property) const;
+    virtual void change(const Client& client, const std::string& name, const char* property,
+                        const std::string& value);
+    /// Brings the system into a state that clients may ask for.
+    /// @return an answer of RequestStateChange
+    virtual CMPIUint32 requestState(const Client& client, const std::string& name,
+                                    CMPIUint16 state);
+
+    static Client clientOf(const CmpiContext& context);
+    static zemQyplatCmdCaller toolFor(const Client& client);
     /// Path of the system with this Name, in the namespace of @p near.
     CmpiObjectPath systemPath(const CmpiObjectPath& near, const std::string& name);
 

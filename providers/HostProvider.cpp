@@ -67,7 +67,7 @@ void HostProvider::performInvokeMethod(const CmpiContext& context, CmpiResult& r
     const CmpiString wanted = getParmVal(in, "ElementName").getString();
     int attributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_NAME,
                         Host::ATTR_END};
-    zemQyplatCmdCaller tool = toolFor(context);
+    zemQyplatCmdCaller tool = toolFor(clientOf(context));
     std::string found;
     walk(tool, attributes, [&](const std::string& name, const zemRecordType& host) {
         if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;

@@ -1,5 +1,10 @@
+// Reading of ORXC_LPAR_CS; what changes partitions stands in
+// PartitionChanges.cpp.
 #include "PartitionProvider.h"
 
+#include <map>
+
+#include "PartitionRows.h"
 #include "ProviderFactories.h"
 
 namespace {
@@ -7,57 +12,78 @@ namespace {
 using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
 
-const std::vector<PropertyRow> kRows = {
-    {"ElementName", ValueKind::Text, Partition::ATTR_NAME},
-    {"Caption", ValueKind::Text, Partition::ATTR_NAME},
-    {"EnabledState", ValueKind::EnabledState, Partition::ATTR_STATE},
-    {"OperationalStatus", ValueKind::Status, Partition::ATTR_STATE},
-    {"LparID", ValueKind::Uint16, Partition::ATTR_LPAR_ID},
-    {"State", ValueKind::Text, Partition::ATTR_STATE},
-    {"LparEnvironment", ValueKind::Text, Partition::ATTR_LPAR_ENV},
-    {"OSVersion", ValueKind::Text, Partition::ATTR_OS_VERSION},
-    {"LogicalSerialNumber", ValueKind::Text, Partition::ATTR_LOGICAL_SERIAL_NUM},
-    {"DefaultProfile", ValueKind::Text, Partition::ATTR_DEFAULT_PROFILE},
-    {"CurrentProfile", ValueKind::Text, Partition::ATTR_CURR_PROFILE},
-    {"ResourceConfig", ValueKind::Uint16, Partition::ATTR_RESOURCE_CONFIG},
-    {"BootMode", ValueKind::Text, Partition::ATTR_BOOT_MODE},
-    {"Keylock", ValueKind::Text, Partition::ATTR_LPAR_KEYLOCK},
-    {"AutoStart", ValueKind::Flag, Partition::ATTR_AUTO_START},
-    {"DesiredProcCompatMode", ValueKind::Text, Partition::ATTR_DESIRED_LPAR_PROC_COMPAT_MODE},
-    {"CurrentProcCompatMode", ValueKind::Text, Partition::ATTR_CURR_LPAR_PROC_COMPAT_MODE},
-    {"AllowPerfCollection", ValueKind::Flag, Partition::ATTR_ALLOW_PERF_COLLECTION},
-    {"SuspendCapable", ValueKind::Flag, Partition::ATTR_SUSPEND_CAPABLE},
-    {"RemoteRestartCapable", ValueKind::Flag, Partition::ATTR_REMOTE_RESTART_CAPABLE},
-    {"RemoteRestartStatus", ValueKind::Text, Partition::ATTR_REMOTE_RESTART_STATUS},
+using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
+
+/// Profiles by the ID of their partition and their name.
+using Profiles = std::map<std::pair<std::string, std::string>, const zemRecordType*>;
+
+/// The attributes of partitions that a query needs, and those of their default
+/// profiles.
+struct Needs {
+    explicit Needs(const int* attributes) {
+        for (; *attributes != Partition::ATTR_END; ++attributes)
+            (*attributes < kOfProfile ? partition : profile).push_back(*attributes % kOfProfile);
+        ofProfile = profile;
+        if (!profile.empty()) {
+            partition.push_back(Partition::ATTR_DEFAULT_PROFILE);
+            for (int key : {Profile::ATTR_LPAR_ID, Profile::ATTR_NAME}) profile.push_back(key);
+        }
+        for (Attributes* list : {&partition, &profile}) {
+            std::sort(list->begin(), list->end());
+            list->erase(std::unique(list->begin(), list->end()), list->end());
+            list->push_back(Partition::ATTR_END);
+        }
+    }
+
+    Attributes partition, profile;  ///< what to ask for, closed by ATTR_END
+    Attributes ofProfile;           ///< wanted ones alone
 };
 
-std::string partitionName(const zemRecordType& partition, const std::string& host) {
-    return std::string(partition[Partition::ATTR_LPAR_ID]) + "*" + host;
-}
-
-/// Splits <lparId>*<host> where the ID is all digits and the host has its form.
-bool splitName(const std::string& name, std::string& id, std::string& host) {
-    const std::size_t star = std::min(name.find('*'), name.size());
-    id = name.substr(0, star);
-    host = star < name.size() ? name.substr(star + 1) : "";
-    return zemString(id.c_str()).isDigit() && isHostName(host);
+/// Hands partitions of one host to @p sink, each with what is wanted of its
+/// default profile.
+void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host,
+                    const char* filter,
+                    const std::function<void(const std::string&, const zemRecordType&)>& sink) {
+    const zemRecordSetsType partitions =
+        tool.getPartitionsInformation(needs.partition.data(), host.c_str(), filter);
+    zemRecordSetsType records;
+    Profiles profiles;
+    if (!needs.ofProfile.empty()) {
+        records = tool.getPartitionsProfileInformation(needs.profile.data(), host.c_str(), filter);
+        for (int i = 0; i < records.size(); ++i) {
+            const zemRecordType& profile = *records[i];
+            profiles[{static_cast<const char*>(profile[Profile::ATTR_LPAR_ID]),
+                      static_cast<const char*>(profile[Profile::ATTR_NAME])}] = &profile;
+        }
+    }
+    for (int i = 0; i < partitions.size(); ++i) {
+        zemRecordType& partition = *partitions[i];
+        const std::string id(partition[Partition::ATTR_LPAR_ID]);
+        if (!needs.ofProfile.empty()) {
+            const auto found = profiles.find(
+                {id, static_cast<const char*>(partition[Partition::ATTR_DEFAULT_PROFILE])});
+            for (int key : needs.ofProfile)
+                partition.insert(kOfProfile + key,
+                                 found == profiles.end() ? zemString() : (*found->second)[key]);
+        }
+        sink(id + "*" + host, partition);
+    }
 }
 
 }  // namespace
 
 PartitionProvider::PartitionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
     : CmpiBaseMI(mb, ctx),
-      ComputerSystemProvider(mb, ctx, name, "ORXC_LPAR_CS", kRows, {Partition::ATTR_LPAR_ID}) {}
+      ComputerSystemProvider(mb, ctx, name, kPartitionClass, partitionRows(),
+                             {Partition::ATTR_LPAR_ID}) {}
 
 void PartitionProvider::find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
                              const Sink& sink) {
-    std::string id, host;
-    if (!splitName(name, id, host)) return;
-    const std::string filter = "\"lpar_ids=" + id + "\"";
+    PartitionName key;
+    if (!splitPartitionName(name, key)) return;
+    Needs needs(attributes);
     try {
-        const zemRecordSetsType partitions =
-            tool.getPartitionsInformation(attributes, host.c_str(), filter.c_str());
-        if (partitions.size() == 1) sink(partitionName(*partitions[0], host), *partitions[0]);
+        readPartitions(tool, needs, key.host, ("\"lpar_ids=" + key.id + "\"").c_str(), sink);
     } catch (const zemException& e) {
         if (!isUnknownObject(e)) throw;
     }
@@ -66,15 +92,13 @@ void PartitionProvider::find(zemQyplatCmdCaller& tool, const std::string& name, 
 void PartitionProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
     int hostAttributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_END};
     const zemRecordSetsType hosts = tool.getManagedSystemInformation(hostAttributes, nullptr);
+    Needs needs(attributes);
     for (int i = 0; i < hosts.size(); ++i) {
-        const std::string host = hostName(*hosts[i]);
         try {
-            const zemRecordSetsType partitions =
-                tool.getPartitionsInformation(attributes, host.c_str(), nullptr);
-            for (int k = 0; k < partitions.size(); ++k)
-                sink(partitionName(*partitions[k], host), *partitions[k]);
+            readPartitions(tool, needs, hostName(*hosts[i]), nullptr, sink);
         } catch (const zemException& e) {
-            // a host without partitions answers so; one removed meanwhile has none either
+            // a host without partitions answers so; one removed meanwhile has none
+            // either
             if (!isUnknownObject(e)) throw;
         }
     }

@@ -54,6 +54,20 @@ bool parseNumber(const char* text, unsigned long limit, unsigned long& value) {
     return std::isdigit(static_cast<unsigned char>(*text)) != 0 && *end == '\0' && value <= limit;
 }
 
+/// The whole text as a decimal number with at most two places behind the point,
+/// in hundredths.
+bool parseHundredths(const char* text, unsigned long& value) {
+    const std::string number = text;
+    const std::size_t point = std::min(number.find('.'), number.size());
+    std::string places = number.substr(std::min(point + 1, number.size()));
+    if (places.size() > 2 || places.find_first_not_of("0123456789") != std::string::npos)
+        return false;
+    places.resize(2, '0');
+    if (!parseNumber(number.substr(0, point).c_str(), 0xFFFFFFFF / 100 - 1, value)) return false;
+    value = value * 100 + std::strtoul(places.c_str(), nullptr, 10);
+    return true;
+}
+
 CmpiArray textList(const std::string& text) {
     const auto count = static_cast<CMPICount>(1 + std::count(text.begin(), text.end(), ','));
     CmpiArray list(count, CMPI_chars);
@@ -75,7 +89,8 @@ CmpiArray oneNumber(CMPIUint16 value) {
 }
 
 /// Sets @p data from the text of an attribute.
-/// @return false when the text is empty or of another form, so that the property stays null
+/// @return false when the text is empty or of another form, so that the
+/// property stays null
 bool convert(ValueKind kind, const char* text, CmpiData& data) {
     unsigned long value = 0;
     std::tm when = {};
@@ -92,6 +107,10 @@ bool convert(ValueKind kind, const char* text, CmpiData& data) {
             return true;
         case ValueKind::Uint32:
             if (!parseNumber(text, 0xFFFFFFFF, value)) return false;
+            data.setUint32(static_cast<CMPIUint32>(value));
+            return true;
+        case ValueKind::Hundredths:
+            if (!parseHundredths(text, value)) return false;
             data.setUint32(static_cast<CMPIUint32>(value));
             return true;
         case ValueKind::Flag:

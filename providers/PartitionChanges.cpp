@@ -1,0 +1,253 @@
+// What clients change of partitions: making, changing and deleting them, and
+// their state.
+#include <strings.h>
+
+#include <algorithm>
+#include <iterator>
+
+#include "EdpowerCaller.h"
+#include "EdsuspCaller.h"
+#include "NwplatCmdCaller.h"
+#include "PartitionProvider.h"
+#include "PartitionRows.h"
+#include "SystemConfig.h"
+
+namespace {
+
+using Partition = zemQyplatCmdCaller::PartitionAttribute;
+using New = zemNwplatCmdCaller::PartitionAttribute;
+
+/// What a client may say of a partition that is to be made.
+struct CreationRow {
+    const char* property;
+    int attribute;
+};
+
+constexpr CreationRow kCreation[] = {
+    {"ElementName", New::ATTR_NAME},
+    {"DefaultProfile", New::ATTR_PROFILE_NAME},
+    {"LparEnvironment", New::ATTR_LPAR_ENV},
+    {"BootMode", New::ATTR_BOOT_MODE},
+    {"AutoStart", New::ATTR_AUTO_START},
+    {"AllowPerfCollection", New::ATTR_ALLOW_PERF_COLLECTION},
+    {"DesiredProcCompatMode", New::ATTR_LPAR_PROC_COMPAT_MODE},
+    {"MemoryMode", New::ATTR_MEM_MODE},
+    {"MinMemory", New::ATTR_MIN_MEM},
+    {"DesiredMemory", New::ATTR_DESIRED_MEM},
+    {"MaxMemory", New::ATTR_MAX_MEM},
+    {"ProcessorMode", New::ATTR_PROC_MODE},
+    {"SharingMode", New::ATTR_SHARING_MODE},
+    {"UncappedWeight", New::ATTR_UNCAP_WEIGHT},
+    {"MinProcessors", New::ATTR_MIN_PROCS},
+    {"DesiredProcessors", New::ATTR_DESIRED_PROCS},
+    {"MaxProcessors", New::ATTR_MAX_PROCS},
+    {"MinProcessingUnits", New::ATTR_MIN_PROC_UNITS},
+    {"DesiredProcessingUnits", New::ATTR_DESIRED_PROC_UNITS},
+    {"MaxProcessingUnits", New::ATTR_MAX_PROC_UNITS},
+    {"MaxVirtualSlots", New::ATTR_MAX_VIRTUAL_SLOTS},
+};
+
+struct ChangeRow {
+    const char* property;
+    int (zemVirtualSystem::*set)(const zemString& value);
+    bool isItem;  ///< the value goes into an attribute list, not into an option of
+                  ///< its own
+};
+
+const ChangeRow kChanges[] = {
+    {"ElementName", &zemVirtualSystem::setName, true},
+    {"DefaultProfile", &zemVirtualSystem::setDefaultProfile, true},
+    {"Keylock", &zemVirtualSystem::setKeylock, false},
+};
+
+template <typename Rows>
+auto rowOf(const Rows& rows, const char* property) {
+    return std::find_if(std::begin(rows), std::end(rows),
+                        [&](const auto& row) { return strcasecmp(row.property, property) == 0; });
+}
+
+/// How a partition comes from one state to another.
+struct Transition {
+    CMPIUint16 requested;
+    const char* from;
+    enum Tool { Power, Suspend } tool;
+    int operation;  ///< of the tool's caller
+    bool immediately = false;
+    bool restart = false;
+};
+
+constexpr Transition kTransitions[] = {
+    {2, "Not Activated", Transition::Power, 1},
+    {2, "Suspended", Transition::Suspend, 2},
+    {3, "Running", Transition::Power, 2, true},
+    {3, "Open Firmware", Transition::Power, 2, true},
+    {3, "Suspended", Transition::Suspend, 6},
+    {4, "Running", Transition::Power, 3},
+    {6, "Running", Transition::Suspend, 1},
+    {10, "Running", Transition::Power, 3, false, true},
+    {11, "Running", Transition::Power, 2, true, true},
+    {11, "Open Firmware", Transition::Power, 2, true, true},
+};
+
+constexpr CMPIUint32 kCompleted = 0, kNotSupported = 1, kInvalidTransition = 4097;
+
+/// @p text as it must stand between the double quotes of a command line, so
+/// that the splitter gives it to the tool unchanged, whatever a client wrote.
+std::string escaped(const std::string& text) {
+    std::string result;
+    for (char c : text) {
+        if (c == '"' || c == '\\') result += '\\';
+        result += c;
+    }
+    return result;
+}
+
+/// Likewise for the value of an item in an attribute list, which the tool reads
+/// as a quoted field.
+std::string itemText(const std::string& text) {
+    std::string doubled;
+    for (char c : text) {
+        if (c == '"') doubled += c;
+        doubled += c;
+    }
+    return escaped(doubled);
+}
+
+/// The text that the tool has for the value of a property.
+std::string toolText(ValueKind kind, const CmpiData& value) {
+    if (kind == ValueKind::Flag) return value.getBoolean() ? "1" : "0";
+    if (kind == ValueKind::Text) return itemText(value.getString().charPtr());
+    if (kind == ValueKind::Uint16) return std::to_string(value.getUint16());
+    const CMPIUint32 number = value.getUint32();
+    if (kind == ValueKind::Uint32) return std::to_string(number);
+    const std::string places = std::to_string(100 + number % 100).substr(1);
+    return std::to_string(number / 100) + "." + places;
+}
+
+/// The number of the host's partition with this name; empty when there is none.
+std::string idOfName(zemQyplatCmdCaller& tool, const std::string& host, const std::string& name) {
+    int attributes[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_NAME, Partition::ATTR_END};
+    const zemRecordSetsType all = tool.getPartitionsInformation(attributes, host.c_str(), nullptr);
+    for (int i = 0; i < all.size(); ++i)
+        if ((*all[i])[Partition::ATTR_NAME] == name.c_str())
+            return std::string((*all[i])[Partition::ATTR_LPAR_ID]);
+    return "";
+}
+
+}  // namespace
+
+void PartitionProvider::addCreationPairs(const CmpiInstance& instance,
+                                         zemDynamicArray<tagAttributePair>& pairs) {
+    for (unsigned i = 0; i < instance.getPropertyCount(); ++i) {
+        CmpiString property;
+        const CmpiData value = instance.getProperty(static_cast<int>(i), &property);
+        const char* said = property.charPtr();
+        if (value.isNullValue() || strcasecmp(said, "Name") == 0 ||
+            strcasecmp(said, "CreationClassName") == 0)
+            continue;
+        const auto row = rowOf(kCreation, said);
+        if (row == std::end(kCreation)) {
+            validateCannotSpecifiedProperty(instance, said);
+            continue;
+        }
+        const std::string text = toolText(rowOf(partitionRows(), said)->kind, value);
+        pairs.addElement(new tagAttributePair{row->attribute, text.c_str()});
+    }
+}
+
+void PartitionProvider::performCreateInstance(const CmpiContext& context, CmpiResult& result,
+                                              const CmpiObjectPath& path,
+                                              const CmpiInstance& instance) {
+    const std::string name = instance.getProperty("Name").getString().charPtr();
+    const bool anyNumber = !name.empty() && name.front() == '*';
+    PartitionName key;
+    if (!splitPartitionName(anyNumber ? "0" + name : name, key))
+        throwInvalidKeyExc("createInstance", kPartitionClass, "Name");
+
+    const Client client = clientOf(context);
+    zemQyplatCmdCaller tool = toolFor(client);
+    zemDynamicArray<tagAttributePair> pairs;
+    if (!anyNumber) {
+        int justTheNumber[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_END};
+        find(tool, name, justTheNumber, [&](const std::string&, const zemRecordType&) {
+            throw zemObjectAlreadyExistsException(
+                "PartitionProvider", "performCreateInstance",
+                ("There is a partition " + name + " already.").c_str());
+        });
+        pairs.addElement(new tagAttributePair{New::ATTR_LPAR_ID, key.id.c_str()});
+    }
+    addCreationPairs(instance, pairs);
+    zemHostSystem(key.host.c_str(), client.user, client.locale).createVirtualSystem(pairs);
+    if (anyNumber) {
+        const CmpiString elementName = getPropVal(instance, "ElementName").getString();
+        key.id = idOfName(tool, key.host, elementName.charPtr());
+    }
+    result.returnData(systemPath(path, key.id + "*" + key.host));
+}
+
+void PartitionProvider::performDeleteInstance(const CmpiContext& context, CmpiResult&,
+                                              const CmpiObjectPath& path) {
+    static const char* justTheKey[] = {"Name", nullptr};
+    performGetInstance(context, path, justTheKey);
+    PartitionName key;
+    splitPartitionName(getKeyBinding(path, "Name").getString().charPtr(), key);
+    const Client client = clientOf(context);
+    zemHostSystem(key.host.c_str(), client.user, client.locale)
+        .destoryVirtualSystem(key.id.c_str());
+}
+
+bool PartitionProvider::isChangeable(const char* property) const {
+    return rowOf(kChanges, property) != std::end(kChanges);
+}
+
+void PartitionProvider::change(const Client& client, const std::string& name, const char* property,
+                               const std::string& value) {
+    PartitionName key;
+    splitPartitionName(name, key);
+    const ChangeRow& row = *rowOf(kChanges, property);
+    zemVirtualSystem partition(key.id.c_str(),
+                               zemHostSystem(key.host.c_str(), client.user, client.locale),
+                               client.user, client.locale);
+    (partition.*row.set)((row.isItem ? itemText(value) : escaped(value)).c_str());
+}
+
+CMPIUint32 PartitionProvider::requestState(const Client& client, const std::string& name,
+                                           CMPIUint16 state) {
+    const auto requested = [&](const Transition& row) { return row.requested == state; };
+    if (std::none_of(std::begin(kTransitions), std::end(kTransitions), requested))
+        return kNotSupported;
+
+    int attributes[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_STATE,
+                        Partition::ATTR_DEFAULT_PROFILE, Partition::ATTR_END};
+    zemQyplatCmdCaller tool = toolFor(client);
+    std::string present, profile;
+    find(tool, name, attributes, [&](const std::string&, const zemRecordType& record) {
+        present = static_cast<const char*>(record[Partition::ATTR_STATE]);
+        profile = static_cast<const char*>(record[Partition::ATTR_DEFAULT_PROFILE]);
+    });
+    const auto row = std::find_if(
+        std::begin(kTransitions), std::end(kTransitions),
+        [&](const Transition& t) { return t.requested == state && present == t.from; });
+    if (row == std::end(kTransitions)) return kInvalidTransition;
+
+    PartitionName key;
+    splitPartitionName(name, key);
+    if (row->tool == Transition::Suspend) {
+        EdsuspCaller suspend(client.user, client.locale);
+        suspend.setManagedSystem(key.host.c_str());
+        suspend.setLparId(std::stoi(key.id));
+        suspend.setOperation(row->operation);
+        suspend.run();
+    } else {
+        EdpowerCaller power(client.user, client.locale);
+        power.setResource(1);
+        power.setManagedSystem(key.host.c_str());
+        power.setLparId(std::stoi(key.id));
+        power.setLparProfileName(("\"" + escaped(profile) + "\"").c_str());
+        power.setOperation(row->operation);
+        power.setImmed(row->immediately);
+        power.setRestart(row->restart);
+        power.run();
+    }
+    return kCompleted;
+}

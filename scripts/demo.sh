@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds, and shows a CIM request's whole road: an appliance, its tool
-# asked by hand, the same asked through CIM, and what a client reads when a thing is not there.
+# asked by hand, the same asked through CIM, a partition made, started, renamed, moved to another
+# host, stopped and deleted, and what a client reads when a thing is not there.
 #
 #   scripts/demo.sh
 #
@@ -67,10 +68,38 @@ show 0 cimom gi "$host\"$mtms\""
 say "its partitions, by way of an association"
 show 0 cimom ain "$host\"$mtms\"" --assoc-class ORXC_HostedPartition
 
+say "a partition made through CIM, with the first number that is free"
+made=$(cimom ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS "Name=*$mtms" \
+    'ElementName=made "by hand", 1' LparEnvironment=tmxlinux ProcessorMode=shared SharingMode=cap \
+    MinProcessors=1 DesiredProcessors=1 MaxProcessors=2 MinProcessingUnits=10 \
+    DesiredProcessingUnits=50 MaxProcessingUnits=100 MinMemory=256 DesiredMemory=512 MaxMemory=1024)
+printf '\n%s\n' "$made"
+show 0 cimom im "$made" RequestStateChange RequestedState=2
+show 0 cimom mi "$made" 'ElementName=renamed while it runs'
+show 1 cimom di "$made"
+
+say "moved to another host, and seen half way"
+id=${made##*=\"} id=${id%%\**}
+show 0 edpower -r lpar --id 1 -o on -f normal -m "beta lab"     # serves its disks there
+printf '\n$ domove -o m -m %s -t "beta lab" --id %s &\n' "$(quoted "$mtms")" "$id"
+APPLIANCE_MOVE_SECONDS=2 domove -o m -m "$mtms" -t "beta lab" --id "$id" &
+sleep 1
+show 0 qymove -r lpar -m "$mtms" --filter "lpar_ids=$id" \
+    -F name,migration_state,dest_sys_name,bytes_transmitted,bytes_remaining
+wait $!
+show 0 qyplat -r lpar -m "beta lab" -F lpar_id,name,state
+
+say "stopped and deleted there"
+id=$(qyplat -r lpar -m "beta lab" -F lpar_id,name | sed -n 's/,renamed.*//p')
+there="ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"$id*1111-AAB*0000002\""
+show 0 cimom im "$there" RequestStateChange RequestedState=3
+show 0 cimom di "$there"
+show 0 appliance check
+
 say "what a client reads when a thing is not there"
 show 5 cimom gi 'ORXC_Unknown.Name="1"'
 show 6 cimom gi "$host\"9999-ZZZ*0000000\""
 show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
-printf '\nShown: %s hosts and %s partitions through CIM, one object by path,\nits partitions by association, two failures by name, one of them in German too.\n' \
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions by\nassociation, the life of a partition, a move between hosts, two failures by name, one of them\nin German too.\n' \
     "$(cimom ein ORXC_CEC_CS | wc -l)" "$(cimom ein ORXC_LPAR_CS | wc -l)"

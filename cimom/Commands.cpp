@@ -16,7 +16,7 @@ namespace cimom {
 namespace {
 
 ObjectPath readPath(const Session& session, const std::string& text) {
-    ObjectPath path = parsePath(text);
+    ObjectPath path = parsePath(text, session.unfit);
     if (path.nameSpace.empty()) path.nameSpace = session.request.nameSpace;
     return session.classes ? typedKeys(path, *session.classes, session.unfit) : path;
 }
@@ -31,7 +31,8 @@ Value readValue(const Session& session, const CimElement* declared, const std::s
                     : guessValue(text);
 }
 
-/// What to say of a name that is not declared; nothing where the provider is to judge.
+/// What to say of a name that is not declared or stands twice; nothing where the provider is to
+/// judge.
 void refuseName(const Session& session, CMPIrc rc, const std::string& message) {
     if (session.unfit == Unfit::Refused) throw Failure(rc, message);
 }
@@ -51,8 +52,8 @@ NamedValues readAssignments(const Session& session, const NamedList<T>* declared
         const T* element = declared ? declared->find(name) : nullptr;
         if (declared && !element) refuseName(session, unknown, "there is no '" + name + "' to set");
         if (values.find(name))
-            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + name + "' is given twice");
-        values.set(element ? element->name : name,
+            refuseName(session, CMPI_RC_ERR_INVALID_PARAMETER, "'" + name + "' is given twice");
+        values.add(element ? element->name : name,
                    readValue(session, element, text.substr(equals + 1)));
     }
     return values;

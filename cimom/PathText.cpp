@@ -167,7 +167,7 @@ public:
             const std::string name = word("=;}");
             if (name.empty() || !take('=')) fail("name = value is missing");
             skipBlanks();
-            read.properties.set(name, literal(";}"));
+            read.properties.add(name, literal(";}"));
             skipBlanks();
             if (peek() != '}' && !take(';')) fail("a semicolon is missing");
         }
@@ -332,14 +332,16 @@ Instance typedInstance(Instance instance, const ClassRepository* classes, Unfit 
         if (!property && unfit == Unfit::Refused)
             throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
                           "class " + cls->name + " has no property " + name);
+        if (typed.find(name) && unfit == Unfit::Refused)
+            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "property " + name + " stands twice");
         Value own = value;
         if (!own.isNull() && own.type() == CMPI_instance)
             own = Value(typedInstance(own.instance(), classes, unfit));
         if (!property) {
-            typed.set(name, std::move(own));
+            typed.add(name, std::move(own));
             continue;
         }
-        typed.set(property->name, declaredValue(own, typeOf(*property),
+        typed.add(property->name, declaredValue(own, typeOf(*property),
                                                 "property " + cls->name + "." + name, unfit));
         if (property->isKey) instance.path.keys.set(property->name, *typed.find(name));
     }
@@ -410,7 +412,7 @@ std::string printPath(const ObjectPath& path) {
     return out;
 }
 
-ObjectPath parsePath(const std::string& text) {
+ObjectPath parsePath(const std::string& text, Unfit unfit) {
     ObjectPath path;
     std::size_t at = 0;
     if (text.compare(0, 2, "//") == 0) {
@@ -435,9 +437,10 @@ ObjectPath parsePath(const std::string& text) {
         scanner.skipBlanks();
         const std::string key = scanner.word("=,\"");
         if (key.empty() || !scanner.take('=')) scanner.fail("key=value is missing");
-        if (path.keys.find(key)) scanner.fail("key " + key + " stands twice");
+        if (path.keys.find(key) && unfit == Unfit::Refused)
+            scanner.fail("key " + key + " stands twice");
         scanner.skipBlanks();
-        path.keys.set(key, scanner.literal(","));
+        path.keys.add(key, scanner.literal(","));
         scanner.skipBlanks();
     } while (scanner.take(','));
     if (!scanner.atEnd()) scanner.fail("a comma is missing");
@@ -476,7 +479,8 @@ Value parseDeclared(const std::string& text, CMPIType type, const ClassRepositor
             if (!Value(text).convertTo(type, result)) mismatch(text, type);
             return result;
         case CMPI_ref:
-            return Value(classes ? typedKeys(parsePath(text), *classes, unfit) : parsePath(text));
+            return Value(classes ? typedKeys(parsePath(text, unfit), *classes, unfit)
+                                 : parsePath(text, unfit));
         case CMPI_instance:
             return Value(typedInstance(wholeInstance(text), classes, unfit));
         default:
@@ -515,13 +519,17 @@ ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes, Unf
     const CimClass* cls = classes.findClass(path.className);
     if (!cls) return path;
     ObjectPath typed = path;
+    typed.keys = {};
     for (const auto& [name, value] : path.keys) {
         const CimProperty* property = cls->properties.find(name);
-        if (!property || value.isNull()) continue;
+        if (!property || value.isNull()) {
+            typed.keys.add(name, value);
+            continue;
+        }
         Value key =
             declaredValue(value, typeOf(*property), "key " + name + " of " + cls->name, unfit);
         if (key.type() == CMPI_ref) key = Value(typedKeys(key.reference(), classes, unfit));
-        typed.keys.set(name, std::move(key));
+        typed.keys.add(name, std::move(key));
     }
     return typed;
 }

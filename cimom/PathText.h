@@ -15,13 +15,14 @@
 
 namespace cimom {
 
-/// What becomes of a value that is not of its declared type, and in an instance of a property that
-/// its class does not have: refused, or kept as it could be read, for the provider to judge.
+/// What becomes of a value that is not of its declared type, of a name that stands twice, and in an
+/// instance of a property that its class does not have: refused, or kept as it could be read, for
+/// the provider to judge.
 enum class Unfit { Refused, Kept };
 
 std::string printPath(const ObjectPath& path);
 /// @throws Failure CMPI_RC_ERR_INVALID_PARAMETER with the place of the mistake
-ObjectPath parsePath(const std::string& text);
+ObjectPath parsePath(const std::string& text, Unfit unfit = Unfit::Refused);
 
 /// The value as it stands in MOF and in paths: quoted texts, {a, b} arrays, NULL.
 std::string printValue(const Value& value);

@@ -266,7 +266,7 @@ NamedValues typedArguments(const Broker& broker, const ObjectPath& path, const s
         const CimParameter* parameter = declared->parameters.find(name);
         Value converted;
         const bool fits = parameter && value.convertTo(typeOf(*parameter), converted);
-        typed.set(name, fits ? converted : value);
+        typed.add(name, fits ? converted : value);
     }
     return typed;
 }

@@ -41,9 +41,9 @@ enum class Character {
     Full,
     /// Like small servers in the field: function tables report version 1 or 0 and end early (the
     /// remaining entries are null), there are no message files and no CMPIError, logMessage and
-    /// trace answer CMPI_RC_ERR_NOT_SUPPORTED, unknown property names are taken, new instances
-    /// are filled with null properties when the class is known, and without a user the principal
-    /// is a string whose text is null.
+    /// trace answer CMPI_RC_ERR_NOT_SUPPORTED, unknown property names, keys of another type and
+    /// names that stand twice are taken, new instances are filled with null properties when the
+    /// class is known, and without a user the principal is a string whose text is null.
     Lean,
 };
 

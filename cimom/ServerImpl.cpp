@@ -55,7 +55,7 @@ ObjectPath Server::Impl::complete(const Request& request, const ObjectPath& path
     if (!classes) return full;
     if (!broker.classOf(full) && !(broker.lean() && routes.count(full.className)))
         throw Failure(CMPI_RC_ERR_INVALID_CLASS, "no class " + full.className);
-    return typedKeys(full, *classes);
+    return typedKeys(full, *classes, broker.lean() ? Unfit::Kept : Unfit::Refused);
 }
 
 Provider* Server::Impl::routeOf(const std::string& className, const std::string& nameSpace,

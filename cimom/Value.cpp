@@ -298,11 +298,15 @@ void NamedValues::makeOwn(std::size_t room) {
 
 void NamedValues::set(const std::string& name, Value value) {
     const std::size_t at = indexOf(name);
-    makeOwn(std::max(size(), at + 1));
-    if (at == size())
-        new (m_block->entries() + m_block->size++) Entry{name, std::move(value)};
-    else
-        m_block->entries()[at].value = std::move(value);
+    if (at == size()) return add(name, std::move(value));
+    makeOwn(size());
+    m_block->entries()[at].value = std::move(value);
+}
+
+void NamedValues::add(const std::string& name, Value value) {
+    makeOwn(size() + 1);
+    new (m_block->entries() + m_block->size) Entry{name, std::move(value)};
+    ++m_block->size;
 }
 
 const Value* NamedValues::find(const std::string& name) const {

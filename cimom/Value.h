@@ -134,7 +134,7 @@ private:
     CMPIType m_type = CMPI_null;
 };
 
-/// Values by name, in the order in which they came; names differ by more than case.
+/// Values by name, in the order in which they came; names that were set differ by more than case.
 /// The keys of a path, the properties of an instance, the arguments of a method, the entries
 /// of a context.
 class NamedValues {
@@ -156,6 +156,9 @@ public:
 
     /// Replaces the value of that name, or appends.
     void set(const std::string& name, Value value);
+    /// Appends, even to a value of that name: what a client sends may be wrong, and small servers
+    /// leave it to the provider to say so. find() and set() know the first.
+    void add(const std::string& name, Value value);
     /// @return null when there is none; valid until the next change
     const Value* find(const std::string& name) const;
 

@@ -39,6 +39,19 @@ struct Needs {
     Attributes ofProfile;           ///< wanted ones alone
 };
 
+/// The profiles of these partitions; none when no attribute of a profile is wanted.
+zemRecordSetsType readProfiles(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host,
+                               const char* filter) {
+    if (needs.ofProfile.empty()) return zemRecordSetsType();
+    try {
+        return tool.getPartitionsProfileInformation(needs.profile.data(), host.c_str(), filter);
+    } catch (const zemException& e) {
+        // partitions without a profile are partitions still
+        if (!isUnknownObject(e)) throw;
+        return zemRecordSetsType();
+    }
+}
+
 /// Hands partitions of one host to @p sink, each with what is wanted of its
 /// default profile.
 void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host,
@@ -46,15 +59,12 @@ void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& h
                     const std::function<void(const std::string&, const zemRecordType&)>& sink) {
     const zemRecordSetsType partitions =
         tool.getPartitionsInformation(needs.partition.data(), host.c_str(), filter);
-    zemRecordSetsType records;
+    const zemRecordSetsType records = readProfiles(tool, needs, host, filter);
     Profiles profiles;
-    if (!needs.ofProfile.empty()) {
-        records = tool.getPartitionsProfileInformation(needs.profile.data(), host.c_str(), filter);
-        for (int i = 0; i < records.size(); ++i) {
-            const zemRecordType& profile = *records[i];
-            profiles[{static_cast<const char*>(profile[Profile::ATTR_LPAR_ID]),
-                      static_cast<const char*>(profile[Profile::ATTR_NAME])}] = &profile;
-        }
+    for (int i = 0; i < records.size(); ++i) {
+        const zemRecordType& profile = *records[i];
+        profiles[{static_cast<const char*>(profile[Profile::ATTR_LPAR_ID]),
+                  static_cast<const char*>(profile[Profile::ATTR_NAME])}] = &profile;
     }
     for (int i = 0; i < partitions.size(); ++i) {
         zemRecordType& partition = *partitions[i];
@@ -66,7 +76,8 @@ void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& h
                 partition.insert(kOfProfile + key,
                                  found == profiles.end() ? zemString() : (*found->second)[key]);
         }
-        sink(id + "*" + host, partition);
+        std::string name = id;
+        sink(name.append("*").append(host), partition);
     }
 }
 

@@ -43,7 +43,7 @@ struct Records {
     OfKey ofHost, ofLpar;  // null where there is none
     Kind kind;
     std::vector<Door> doors;
-    std::string untold;  // keys that no tool prints, with semicolons between them
+    std::string untold = "";  // keys that no tool prints, with semicolons between them
 };
 
 const std::map<std::string, std::string> kWords = {
@@ -104,8 +104,7 @@ const std::vector<Records> kRecords = {
        "Default_prof:default_profile|,;Curr_prof:curr_profile|,;"
        "Keylock:lpar_keylock|norm=4,manual=2;RedundantPath:redundant_err_path_reporting;"
        "ProcCompatMode:desired_lpar_proc_compat_mode|modes;"
-       "ActualProcCompatMode:curr_lpar_proc_compat_mode|modes;PowerOnWithHypervisor:auto_start"}},
-     ""},
+       "ActualProcCompatMode:curr_lpar_proc_compat_mode|modes;PowerOnWithHypervisor:auto_start"}}},
     {getAllLparProfiles, getAllLparProfilesFromCec, getAllLparProfilesFromLpar, Kind::Profile,
      {{"qyplat -r prof",
        "Name:lpar_id*@|>;PartitionName:lpar_id*@;UserDefinedName:name;lpar_env;lpar_name;"
@@ -124,37 +123,31 @@ const std::vector<Records> kRecords = {
        "ECSDRCIndex:op_console_slot;virtual_serial_adapters;virtual_scsi_adapters;"
        "virtual_eth_adapters;io_slots"},
       {"qyplat -r lpar", "DefinitionState:lpar_env/resource_config|definition",
-       "PartitionName:lpar_id*@"}},
-     ""},
+       "PartitionName:lpar_id*@"}}},
     {getAllCecMemoryCfg, getCecMemoryCfg, nullptr, Kind::Host,
      {{"qyalloc -r mem --level sys",
        "Name:@;ConfigurableMem:configurable_sys_mem;InstalledMemory:installed_sys_mem;"
-       "MaxMemPools:max_mem_pools;PendAvailMem:pend_avail_sys_mem;LMBSize:mem_region_size"}},
-     ""},
+       "MaxMemPools:max_mem_pools;PendAvailMem:pend_avail_sys_mem;LMBSize:mem_region_size"}}},
     {getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, nullptr, Kind::MemPool,
-     {{"qyalloc -r mempool", "SystemName:@;curr_pool_mem;pend_pool_mem;pend_avail_pool_mem"}},
-     ""},
+     {{"qyalloc -r mempool", "SystemName:@;curr_pool_mem;pend_pool_mem;pend_avail_pool_mem"}}},
     {getAllCecProcessorCfg, getCecProcessorCfg, nullptr, Kind::Host,
      {{"qyalloc -r proc --level sys",
        "Name:@;ConfigurableProcUnits:configurable_sys_proc_units;"
        "CurAvailProcUnits:curr_avail_sys_proc_units;"
        "InstalledProcessors:installed_sys_proc_units|whole;MaxProcPools:max_shared_proc_pools;"
        "MinProcUnit:min_proc_units_per_virtual_proc;"
-       "PendAvailProcUnits:pend_avail_sys_proc_units"}},
-     ""},
+       "PendAvailProcUnits:pend_avail_sys_proc_units"}}},
     {getAllCecProcessorPoolCfg, getCecProcessorPoolCfg, nullptr, Kind::ProcPool,
      {{"qyalloc -r procpool",
        "SystemName:@;SharedProcPoolId:shared_proc_pool_id;MaxPoolCapacity:max_pool_proc_units;"
-       "PendReservedPoolCapacity:pend_reserved_pool_proc_units;lpar_ids"}},
-     ""},
+       "PendReservedPoolCapacity:pend_reserved_pool_proc_units;lpar_ids"}}},
     {getAllLparMemoryCfgs, getAllLparMemoryCfg, getLparMemoryCfg, Kind::Lpar,
      {{"qyalloc -r mem --level lpar",
        "Name:lpar_id*@;UserDefinedName:lpar_name;CurAllocMem:curr_mem;CurMaxMem:curr_max_mem;"
        "CurMinMem:curr_min_mem;PendAllocMem:pend_mem;PendMaxMem:pend_max_mem;"
        "PendMinMem:pend_min_mem;RuntimeEntMem:run_io_entitled_mem;RuntimeMem:run_mem;"
        "RuntimeVRMWeight:run_mem_weight;RuntimeMinMem:run_min_mem;EntUsage:auto_io_entitled_mem;"
-       "CurrMemMode:mem_mode|mem mode"}},
-     ""},
+       "CurrMemMode:mem_mode|mem mode"}}},
     {getAllLparProcessorCfgs, getAllLparProcessorCfg, getLparProcessorCfg, Kind::Lpar,
      {{"qyalloc -r proc --level lpar",
        "Name:lpar_id*@;UserDefinedName:lpar_name;CurMaxProcs:curr_max_procs;"
@@ -169,8 +162,7 @@ const std::vector<Records> kRecords = {
        "PendAllocProcUnits:pend_proc_units|%;PendDonorMode:pend_sharing_mode|donor;"
        "PendSharingMode:pend_sharing_mode|sharing;PendUncappedWeight:pend_uncap_weight;"
        "RuntimeProcs:run_procs;RuntimeProcUnits:run_proc_units|%;"
-       "RuntimeUncappedWeight:run_uncap_weight"}},
-     ""},
+       "RuntimeUncappedWeight:run_uncap_weight"}}},
     {getAllLparVirtualEthernet, getVirtualEthernet, getLparVirtualEthernet, Kind::Ethernet,
      {{"qyalloc -r virtualio --rsubtype eth --level lpar",
        "Name:lpar_id*@;lpar_id;lpar_name;mac_addr;slot_num;state;ieee_virtual_eth;port_vlan_id;"
@@ -179,22 +171,19 @@ const std::vector<Records> kRecords = {
     {getAllLparVirtualScsi, getVirtualScsi, getLparVirtualScsi, Kind::VirtualScsi,
      {{"qyalloc -r virtualio --rsubtype scsi --level lpar",
        "Name:lpar_id*@;adapter_type|side;backing_devices;lpar_name;remote_lpar_id|any;"
-       "remote_lpar_name;remote_slot_num|any;slot_num;state;is_required|truth"}},
-     ""},
+       "remote_lpar_name;remote_slot_num|any;slot_num;state;is_required|truth"}}},
     {getAllLparVirtualSerial, getVirtualSerial, getLparVirtualSerial, Kind::Serial,
      {{"qyalloc -r virtualio --rsubtype serial --level lpar",
        "Name:lpar_id*@;adapter_type|side;connect_status|unavailable=null,none=0,active=1;"
        "is_required|truth;lpar_name;remote_lpar_id|any;remote_lpar_name;remote_slot_num|any;"
-       "slot_num;state;supports_dnx"}},
-     ""},
+       "slot_num;state;supports_dnx"}}},
     {getAllIoSlots, getIoSlots, getLparIoSlots, Kind::Slot,
      {{"qyalloc -r io --rsubtype slot",
        "SystemName:@;lpar_id|null=;bus_grouping;bus_id;description;drc_index;drc_name;"
        "feature_codes|[;iop|truth;parent_slot_drc_index|none=null;pci_class|x;pci_device_id|x;"
        "pci_revision_id|x;pci_subs_device_id|x;pci_subs_vendor_id|x;pci_vendor_id|x;"
        "slot_io_pool_id|none=65535;unit_phys_loc"},
-      {"qyplat -r lpar", "lpar_name:name", "lpar_id"}},
-     ""},
+      {"qyplat -r lpar", "lpar_name:name", "lpar_id"}}},
 };
 // clang-format on
 

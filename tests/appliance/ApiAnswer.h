@@ -34,14 +34,6 @@ private:
     apiProp* m_result;
 };
 
-class ApiTest : public testing::Test {
-protected:
-    void make(const std::string& command) {
-        const auto outcome = m_appliance.run("appliance " + command);
-        ASSERT_EQ(0, outcome.exit) << outcome.err;
-    }
-
-    testing_support::TestAppliance m_appliance{ZEM_PROGRAMS};
-};
+class ApiTest : public ToolTest {};
 
 #endif

@@ -6,15 +6,15 @@
 #include <set>
 
 #include "Store.h"
-#include "TestAppliance.h"
+#include "ToolRecords.h"
 
 namespace {
 
 using namespace appliance;
-using testing_support::TestAppliance;
 
-TEST(ApplianceTest, EndsWithTheStatusThatTheHelpNames) {
-    TestAppliance appliance(ZEM_PROGRAMS);
+class ApplianceTest : public ToolTest {};
+
+TEST_F(ApplianceTest, EndsWithTheStatusThatTheHelpNames) {
     const struct {
         const char* command;
         int exit;
@@ -43,7 +43,7 @@ TEST(ApplianceTest, EndsWithTheStatusThatTheHelpNames) {
         {"appliance generate --help", 0, "--seed", ""},
     };
     for (const auto& row : rows) {
-        const auto outcome = appliance.run(row.command);
+        const auto outcome = run(row.command);
         EXPECT_EQ(row.exit, outcome.exit) << row.command << '\n' << outcome.err;
         EXPECT_NE(std::string::npos, outcome.out.find(row.out)) << row.command << outcome.out;
         EXPECT_NE(std::string::npos, outcome.err.find(row.err)) << row.command << outcome.err;
@@ -51,9 +51,8 @@ TEST(ApplianceTest, EndsWithTheStatusThatTheHelpNames) {
     }
 }
 
-TEST(ApplianceTest, TheDemoHasACaseOfEverythingHard) {
-    TestAppliance appliance(ZEM_PROGRAMS);
-    ASSERT_EQ(0, appliance.run("appliance init").exit);
+TEST_F(ApplianceTest, TheDemoHasACaseOfEverythingHard) {
+    make("init");
     std::set<std::string> states, envs;
     std::string names;
     Store store = Store::open(Database::Access::Read);
@@ -72,21 +71,20 @@ TEST(ApplianceTest, TheDemoHasACaseOfEverythingHard) {
     }
 }
 
-TEST(ApplianceTest, TheSameSeedMakesTheSameAppliance) {
-    TestAppliance appliance(ZEM_PROGRAMS);
+TEST_F(ApplianceTest, TheSameSeedMakesTheSameAppliance) {
     const auto made = [&](const std::string& options) {
         const std::string generate = "appliance generate --force --hosts 3 --lpars 40 ";
-        EXPECT_EQ(0, appliance.run(generate + options).exit);
-        EXPECT_EQ("", appliance.run("appliance check").out);
-        return appliance.run("appliance show --format json").out;
+        EXPECT_EQ(0, run(generate + options).exit);
+        EXPECT_EQ("", run("appliance check").out);
+        return shown();
     };
     const std::string first = made("--seed 7");
     EXPECT_EQ(first, made("--seed 7"));
     EXPECT_NE(first, made("--seed 8"));
-    EXPECT_EQ("120\n", appliance.run("qyplat -r lpar | wc -l").out);
+    EXPECT_EQ("120\n", run("qyplat -r lpar | wc -l").out);
 }
 
-TEST(ApplianceTest, CheckFindsWhatAHostWouldRefuse) {
+TEST_F(ApplianceTest, CheckFindsWhatAHostWouldRefuse) {
     const struct {
         Kind kind;
         Place place;
@@ -114,9 +112,8 @@ TEST(ApplianceTest, CheckFindsWhatAHostWouldRefuse) {
         {Kind::Ethernet, {1, 3, 3}, "mac_addr", "0", "shares its virtual slot"},
         {Kind::Slot, {1, 1, 1}, "drc_index", "30000002", "has the DRC index of another"},
     };
-    TestAppliance appliance(ZEM_PROGRAMS);
     for (const auto& row : rows) {
-        ASSERT_EQ(0, appliance.run("appliance init --force").exit);
+        make("init --force");
         Store store = Store::open(Database::Access::Write);
         Transaction change = store.write();
         Object changed(row.kind, row.place);
@@ -134,36 +131,34 @@ TEST(ApplianceTest, CheckFindsWhatAHostWouldRefuse) {
         }
         store.put(changed);
         change.commit();
-        const auto outcome = appliance.run("appliance check");
+        const auto outcome = run("appliance check");
         EXPECT_EQ(1, outcome.exit) << row.attribute << outcome.err;
         EXPECT_NE(std::string::npos, outcome.out.find(row.finding))
             << row.attribute << ' ' << outcome.out << outcome.err;
     }
 }
 
-TEST(ApplianceTest, AToolSeesTheOldApplianceOrTheNewOne) {
-    TestAppliance appliance(ZEM_PROGRAMS);
-    ASSERT_EQ(0, appliance.run("appliance generate --hosts 2 --lpars 50").exit);
-    const auto outcome = appliance.run(
-        "appliance generate --force --hosts 2 --lpars 3000 & "
-        "while kill -0 $! 2>/dev/null; do qyplat -r lpar -F lpar_id | wc -l; done; "
-        "qyplat -r lpar -F lpar_id | wc -l");
+TEST_F(ApplianceTest, AToolSeesTheOldApplianceOrTheNewOne) {
+    make("generate --hosts 2 --lpars 50");
+    const auto outcome =
+        run("appliance generate --force --hosts 2 --lpars 3000 & "
+            "while kill -0 $! 2>/dev/null; do qyplat -r lpar -F lpar_id | wc -l; done; "
+            "qyplat -r lpar -F lpar_id | wc -l");
     EXPECT_EQ("", outcome.err);
     const auto counts = testing_support::lines(outcome.out);
     for (const std::string& count : counts) EXPECT_TRUE(count == "100" || count == "6000") << count;
     EXPECT_EQ("6000", counts.back());
 }
 
-TEST(ApplianceTest, UsersWhoMayOnlyReadTheFolderCanAsk) {
+TEST_F(ApplianceTest, UsersWhoMayOnlyReadTheFolderCanAsk) {
     if (geteuid() != 0) GTEST_SKIP() << "needs another user";
-    TestAppliance appliance(ZEM_PROGRAMS);
-    ASSERT_EQ(0, appliance.run("umask 022 && appliance init").exit);
+    ASSERT_EQ(0, run("umask 022 && appliance init").exit);
     const auto asOther = [&](const std::string& command) {
-        return appliance.run("setpriv --reuid=65534 --regid=65534 --clear-groups " + command);
+        return run("setpriv --reuid=65534 --regid=65534 --clear-groups " + command);
     };
     EXPECT_EQ("14\n", asOther("qyplat -r lpar -F name | wc -l").out);
     EXPECT_EQ(3, asOther("appliance init --force").exit);
-    EXPECT_EQ("14\n", appliance.run("qyplat -r lpar -F name | wc -l").out);
+    EXPECT_EQ("14\n", run("qyplat -r lpar -F name | wc -l").out);
 }
 
 }  // namespace

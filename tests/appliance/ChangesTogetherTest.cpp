@@ -9,34 +9,25 @@
 #include <map>
 #include <random>
 
-#include "TestAppliance.h"
+#include "ToolRecords.h"
 
 namespace {
 
 using testing_support::lines;
 using testing_support::Outcome;
-using testing_support::TestAppliance;
 
 int rounds(int usual) {
     const char* wanted = std::getenv("ZEM_CHANGES");
     return wanted == nullptr ? usual : std::atoi(wanted);
 }
 
-class ChangesTogetherTest : public testing::Test {
+class ChangesTogetherTest : public ToolTest {
 protected:
-    ChangesTogetherTest() { EXPECT_EQ("", out("appliance init")); }
-
-    std::string out(const std::string& command) {
-        const Outcome outcome = m_appliance.run(command);
-        EXPECT_EQ("", outcome.err) << command;
-        return outcome.out;
-    }
+    ChangesTogetherTest() { make("init"); }
     std::int64_t lineCount(const std::string& command) {
         return static_cast<std::int64_t>(lines(out(command)).size());
     }
     std::int64_t journalLines() { return lineCount("appliance journal"); }
-
-    TestAppliance m_appliance{ZEM_PROGRAMS};
 };
 
 TEST_F(ChangesTogetherTest, WhatSucceedsAddsUp) {
@@ -88,12 +79,12 @@ TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
     const std::vector<std::string> make = {
         "nwplat", "-r", "lpar", "-m", "gamma", "-i", "name=k,lpar_env=tmxlinux,all_resources=1"};
     const std::vector<std::string> remove = {"dlplat", "-r", "lpar", "-m", "gamma", "--id", "3"};
-    const std::string without = out("appliance show --format json");
+    const std::string without = shown();
     const auto start = std::chrono::steady_clock::now();
     out("nwplat -r lpar -m gamma -i name=k,lpar_env=tmxlinux,all_resources=1");
     const std::chrono::microseconds usual = std::chrono::duration_cast<std::chrono::microseconds>(
         std::chrono::steady_clock::now() - start);
-    const std::string with = out("appliance show --format json");
+    const std::string with = shown();
     ASSERT_NE(without, with);
 
     std::mt19937 engine(1);  // NOLINT(cert-msc51-cpp): the same moments in every run
@@ -102,7 +93,7 @@ TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
     for (int i = rounds(40); i > 0; --i) {
         runKilled(before == with ? remove : make, engine() % (usual.count() * 3 / 2));
         ASSERT_EQ("", out("appliance check"));
-        const std::string after = out("appliance show --format json");
+        const std::string after = shown();
         ASSERT_TRUE(after == with || after == without) << after;
         changes += after == before ? 0 : 1;
         before = after;
@@ -113,7 +104,7 @@ TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
 }
 
 TEST_F(ChangesTogetherTest, AFullDiskIsAFailureAndNoChange) {
-    const std::string before = out("appliance show --format json");
+    const std::string before = shown();
     const std::string change =
         "nwplat -r lpar -m gamma -i name=k,lpar_env=tmxlinux,all_resources=1";
     // The limits, in half kilobytes, are met at the first, second and third page of a change.
@@ -122,10 +113,10 @@ TEST_F(ChangesTogetherTest, AFullDiskIsAFailureAndNoChange) {
             m_appliance.run(std::string("trap '' XFSZ; ulimit -f ") + limit + "; " + change);
         EXPECT_EQ(3, outcome.exit) << limit << outcome.out;
         EXPECT_EQ(0U, outcome.err.find("WRTL2005 ")) << outcome.err;
-        EXPECT_EQ(before, out("appliance show --format json"));
+        EXPECT_EQ(before, shown());
     }
     EXPECT_NE(0, m_appliance.run("ulimit -f 9; " + change).exit);
-    EXPECT_EQ(before, out("appliance show --format json"));
+    EXPECT_EQ(before, shown());
     EXPECT_EQ(0, journalLines());
     EXPECT_EQ("", out(change));
     EXPECT_EQ(1, journalLines());

@@ -28,13 +28,6 @@ protected:
         out("edpower -r lpar --id 1 -o on -f normal -m 'beta lab'");
     }
 
-    std::string out(const std::string& command) {
-        const auto outcome = m_appliance.run(command);
-        EXPECT_EQ("", outcome.err) << command;
-        return outcome.out;
-    }
-    std::string state() { return out("appliance show --format json"); }
-
     testing_support::ScopedEnvironment m_seconds{"APPLIANCE_MOVE_SECONDS", "1"};
 };
 
@@ -63,18 +56,17 @@ TEST_F(MoveTest, RunsInTheBackground) {
     EXPECT_LT(0, seen);
 
     // clang-format off
-    const ToolRow rows[] = {
-        {"appliance check", 0, "", ""},
-        {"qyplat -r lpar -m alpha --filter lpar_names=traveller", 1, "", "WRTL8010 The partition with the name \"traveller\" was not found.\n"},
-        {"qyplat -r lpar -m 'beta lab' --filter lpar_ids=2 -F name,state,migration_state", 0, "traveller,Running,Not Migrating\n", ""},
-        {"qyplat -r prof -m 'beta lab' --filter lpar_ids=2 -F name,virtual_scsi_adapters", 0, "\"day, night\",3/client/1/xbrg/3/1\n", ""},
-        {"qyalloc -r virtualio --rsubtype scsi --level lpar -m 'beta lab' --filter lpar_ids=1,2,slots=3 -F lpar_id,state,remote_lpar_id,remote_slot_num,backing_devices", 0, "1,1,2,3,disk7\n2,1,1,3,none\n", ""},
-        {"qyalloc -r virtualio --rsubtype scsi --level lpar -m alpha --filter lpar_ids=2 -F slot_num", 0, "14\n", ""},
-        {"qyalloc -r mem --level lpar -m 'beta lab' --filter lpar_ids=2 -F curr_mem,run_mem", 0, "2048,2048\n", ""},
-        {"qymove -r sys -m alpha -F num_active_migrations_in_progress", 0, "0\n", ""},
-    };
+    expectRows({
+        {"appliance check"},
+        {"qyplat -r lpar -m alpha --filter lpar_names=traveller", "WRTL8010 The partition with the name \"traveller\" was not found.\n"},
+        {"qyplat -r lpar -m 'beta lab' --filter lpar_ids=2 -F name,state,migration_state", "traveller,Running,Not Migrating\n"},
+        {"qyplat -r prof -m 'beta lab' --filter lpar_ids=2 -F name,virtual_scsi_adapters", "\"day, night\",3/client/1/xbrg/3/1\n"},
+        {"qyalloc -r virtualio --rsubtype scsi --level lpar -m 'beta lab' --filter lpar_ids=1,2,slots=3 -F lpar_id,state,remote_lpar_id,remote_slot_num,backing_devices", "1,1,2,3,disk7\n2,1,1,3,none\n"},
+        {"qyalloc -r virtualio --rsubtype scsi --level lpar -m alpha --filter lpar_ids=2 -F slot_num", "14\n"},
+        {"qyalloc -r mem --level lpar -m 'beta lab' --filter lpar_ids=2 -F curr_mem,run_mem", "2048,2048\n"},
+        {"qymove -r sys -m alpha -F num_active_migrations_in_progress", "0\n"},
+    });
     // clang-format on
-    expectRows(m_appliance, rows);
     const Answer there(getLparObj("", "2*1111-AAB*0000002", 2));
     EXPECT_EQ("2", there.value(0, "PartitionState"));
     EXPECT_EQ("0,day, night", there.value(0, "Curr_prof"));
@@ -107,22 +99,22 @@ TEST_F(MoveTest, RunsInTheBackground) {
 
 TEST_F(MoveTest, ThatIsStoppedOrKilledLeavesNothing) {
     setenv("APPLIANCE_MOVE_SECONDS", "4", 1);
-    const std::string before = state();
+    const std::string before = shown();
     const auto stopped =
         m_appliance.run(std::string(kUnderWay) + "domove -o s -m alpha --id 7 && wait $p; echo $?");
     EXPECT_EQ("1\n", stopped.out);
     EXPECT_EQ("WRTL8074 The move of the partition with the ID 7 was stopped.\n", stopped.err);
-    EXPECT_EQ(before, state());
+    EXPECT_EQ(before, shown());
     EXPECT_EQ("", out("appliance check"));
 
     m_appliance.run(std::string(kUnderWay) + "kill -9 $p; wait $p");
-    EXPECT_NE(before, state());
+    EXPECT_NE(before, shown());
     EXPECT_EQ("", out("appliance check"));
     EXPECT_EQ("WRTL8050", m_appliance.run(kMove).err.substr(0, 8));
     // What of the place is to be changed is refused until someone decides.
     EXPECT_EQ("WRTL8050", m_appliance.run("dlplat -r lpar -m 'beta lab' --id 2").err.substr(0, 8));
     EXPECT_EQ("", out("domove -o s -m alpha --id 7"));
-    EXPECT_EQ(before, state());
+    EXPECT_EQ(before, shown());
     EXPECT_EQ("", out("appliance check"));
     setenv("APPLIANCE_MOVE_SECONDS", "0", 1);
     EXPECT_EQ("", out(kMove));
@@ -136,16 +128,15 @@ TEST_F(MoveTest, TwoAtOnce) {
     EXPECT_EQ("", out("appliance check"));
     // The way back is a move like any other; a profile of before starts what came.
     // clang-format off
-    const ToolRow rows[] = {
-        {"qyplat -r lpar -m 'beta lab' --filter lpar_ids=2,5 -F name,state", 0, "traveller,Running\n\"say \"\"hi\"\"\",Not Activated\n", ""},
-        {"domove -o m -m 'beta lab' -t alpha --id 5", 0, "", ""},
-        {"edpower -r lpar --id 5 -o on -f normal -m alpha", 0, "", ""},
-        {"domove -o m -m 'beta lab' -t alpha --id 2", 0, "", ""},
-        {"qyplat -r lpar -m alpha --filter lpar_ids=5,7 -F name,state", 0, "\"say \"\"hi\"\"\",Running\ntraveller,Running\n", ""},
-        {"appliance check", 0, "", ""},
-    };
+    expectRows({
+        {"qyplat -r lpar -m 'beta lab' --filter lpar_ids=2,5 -F name,state", "traveller,Running\n\"say \"\"hi\"\"\",Not Activated\n"},
+        {"domove -o m -m 'beta lab' -t alpha --id 5"},
+        {"edpower -r lpar --id 5 -o on -f normal -m alpha"},
+        {"domove -o m -m 'beta lab' -t alpha --id 2"},
+        {"qyplat -r lpar -m alpha --filter lpar_ids=5,7 -F name,state", "\"say \"\"hi\"\"\",Running\ntraveller,Running\n"},
+        {"appliance check"},
+    });
     // clang-format on
-    expectRows(m_appliance, rows);
 }
 
 TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
@@ -195,7 +186,7 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
             change.commit();
         };
         if (usual) put(*usual, row.value);
-        const std::string before = state(), journal = out("appliance journal");
+        const std::string before = shown(), journal = out("appliance journal");
         for (const std::string operation : {"v", "m"}) {
             const auto outcome =
                 m_appliance.run("domove -o " + operation + " -m alpha " + row.options);
@@ -203,7 +194,7 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
             EXPECT_EQ("", outcome.out);
             EXPECT_NE(0, outcome.exit);
         }
-        EXPECT_EQ(before, state()) << row.options << row.code;
+        EXPECT_EQ(before, shown()) << row.options << row.code;
         EXPECT_EQ(journal, out("appliance journal"));
         if (usual) put(*usual, nullptr);
     }

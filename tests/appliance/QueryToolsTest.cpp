@@ -9,13 +9,10 @@ namespace {
 
 using appliance::hundredths;
 using appliance::number;
-using testing_support::Outcome;
-using testing_support::TestAppliance;
 
-class QueryToolsTest : public testing::Test {
+class QueryToolsTest : public ToolTest {
 protected:
-    QueryToolsTest() { EXPECT_EQ(0, run("appliance init").exit); }
-    Outcome run(const std::string& command) { return m_appliance.run(command); }
+    QueryToolsTest() { make("init"); }
 
     /// The values of one field.
     std::vector<std::string> column(const std::string& command) {
@@ -23,8 +20,6 @@ protected:
         for (const Record& record : recordsOf(run(command).out)) values.push_back(record[0]);
         return values;
     }
-
-    TestAppliance m_appliance{ZEM_PROGRAMS};
 };
 
 TEST_F(QueryToolsTest, EveryAttributeAnswers) {
@@ -118,71 +113,67 @@ TEST_F(QueryToolsTest, EveryAttributeAnswers) {
 }
 
 TEST_F(QueryToolsTest, AnswersAndFailures) {
-    const ToolRow rows[] = {
+    expectRows({
         {"qyalloc -r virtualio --rsubtype eth -m alpha --filter lpar_ids=4,slots=5 --level lpar "
          "-F port_vlan_id,addl_vlan_ids",
-         0, "7,\"20,30\"\n", ""},
+         "7,\"20,30\"\n"},
         {"qyalloc -r virtualio --rsubtype slot --level slot -m alpha --filter lpar_ids=4 "
          "-F slot_num,config",
-         0, "0,serial\n1,serial\n2,ethernet\n3,scsi\n5,ethernet\n6,serial\n", ""},
+         "0,serial\n1,serial\n2,ethernet\n3,scsi\n5,ethernet\n6,serial\n"},
         {"qyalloc -r virtualio --rsubtype scsi --level lpar -m alpha --filter 'lpar_names=db,main' "
          "-F remote_lpar_name,remote_slot_num",
-         0, "xbrg2,14\n", ""},
-        {"qyalloc -r procpool -m alpha -F name,lpar_names,lpar_ids", 0,
+         "xbrg2,14\n"},
+        {"qyalloc -r procpool -m alpha -F name,lpar_names,lpar_ids",
          "DefaultPool,\"xbrg2,\"\"say \"\"\"\"hi\"\"\"\"\"\",traveller\",\"2,5,7\"\n"
-         "\"web, db\",\"web server,\"\"db,main\"\"\",\"3,4\"\n",
-         ""},
-        {"qyalloc -r mempool -m gamma", 0, "No results were found.\n", ""},
-        {"qyalloc -r io --rsubtype slot -m gamma --filter lpar_names=xbrg -F drc_index", 0,
-         "30000001\n30000002\n", ""},
-        {"qyalloc -r io --rsubtype taggedio -F lpar_name,console_slot", 0,
-         "Büro-Prüfstand,dnx\nosq dev,dnx\n", ""},
+         "\"web, db\",\"web server,\"\"db,main\"\"\",\"3,4\"\n"},
+        {"qyalloc -r mempool -m gamma", "No results were found.\n"},
+        {"qyalloc -r io --rsubtype slot -m gamma --filter lpar_names=xbrg -F drc_index",
+         "30000001\n30000002\n"},
+        {"qyalloc -r io --rsubtype taggedio -F lpar_name,console_slot",
+         "Büro-Prüfstand,dnx\nosq dev,dnx\n"},
         // Asked with a bare -F by callers that only count.
-        {"qyalloc -r hca --level lpar -F | wc -l", 0, "1\n", ""},
-        {"qyalloc -r hca --level sys -F | wc -l", 0, "2\n", ""},
-        {"qyalloc -r sni -m alpha -F | wc -l", 0, "1\n", ""},
-        {"qyalloc -r mem --level sys --maxmem 65536 -m alpha -F required_min_mem_tmx_linux", 0,
-         "1280\n", ""},
-        {"qyalloc -r mem -F", 2, "", "WRTL1003 The option --level is missing.\n"},
-        {"qyalloc -r virtualio -F", 2, "", "WRTL1003 The option --rsubtype is missing.\n"},
-        {"qyalloc -r virtualio --rsubtype scsi --level sys -F", 2, "",
+        {"qyalloc -r hca --level lpar -F | wc -l", "1\n"},
+        {"qyalloc -r hca --level sys -F | wc -l", "2\n"},
+        {"qyalloc -r sni -m alpha -F | wc -l", "1\n"},
+        {"qyalloc -r mem --level sys --maxmem 65536 -m alpha -F required_min_mem_tmx_linux",
+         "1280\n"},
+        {"qyalloc -r mem -F", "WRTL1003 The option --level is missing.\n"},
+        {"qyalloc -r virtualio -F", "WRTL1003 The option --rsubtype is missing.\n"},
+        {"qyalloc -r virtualio --rsubtype scsi --level sys -F",
          "WRTL1004 The option --level cannot have the value \"sys\".\n"},
-        {"qyalloc -r io --rsubtype unit --level frame -F", 2, "",
+        {"qyalloc -r io --rsubtype unit --level frame -F",
          "WRTL1004 The option --level cannot have the value \"frame\".\n"},
-        {"qyalloc -r mem --level sys --maxmem 0", 2, "",
+        {"qyalloc -r mem --level sys --maxmem 0",
          "WRTL1004 The option --maxmem cannot have the value \"0\".\n"},
-        {"qymove -r sys -m alpha -F num_active_migrations_in_progress", 0, "1\n", ""},
-        {"qymove -r lpar -m '' --filter lpar_names=traveller -F bytes_transmitted", 0,
-         "1073741824\n1073741824\n", ""},
-        {"qyfault -r lpar -m alpha --filter lpar_ids=3 -F refcode", 0, "A1000042\n", ""},
-        {"qylink -r all -m 'delta, spare' -F sp,state", 0,
-         "primary,No Connection\nsecondary,No Connection\n", ""},
-        {"qylwh", 1, "", "WRTL3001 This appliance is not the manager of a single host.\n"},
+        {"qymove -r sys -m alpha -F num_active_migrations_in_progress", "1\n"},
+        {"qymove -r lpar -m '' --filter lpar_names=traveller -F bytes_transmitted",
+         "1073741824\n1073741824\n"},
+        {"qyfault -r lpar -m alpha --filter lpar_ids=3 -F refcode", "A1000042\n"},
+        {"qylink -r all -m 'delta, spare' -F sp,state",
+         "primary,No Connection\nsecondary,No Connection\n"},
+        {"qylwh", "WRTL3001 This appliance is not the manager of a single host.\n"},
         // Running, suspended, moving away.
-        {"qydyn -dlpar -c 1111-AAA_0000001 | grep '^[357][*]'", 0,
+        {"qydyn -dlpar -c 1111-AAA_0000001 | grep '^[357][*]'",
          "3*1111-AAA*0000001,DCaps:<7>\n5*1111-AAA*0000001,DCaps:<0>\n"
-         "7*1111-AAA*0000001,DCaps:<0>\n",
-         ""},
-        {"qydyn -dlpar -c 9999-ZZZ_0000001", 1, "",
+         "7*1111-AAA*0000001,DCaps:<0>\n"},
+        {"qydyn -dlpar -c 9999-ZZZ_0000001",
          "WRTL8018 The managed system \"9999-ZZZ_0000001\" was not found.\n"},
-        {"qydyn -c alpha", 2, "", "WRTL1003 The option -dlpar is missing.\n"},
-        {"qydyn -dlpar -c 'delta, spare'", 0, "No results were found.\n", ""},
-        {"xbrgcli -m alpha --id 1 -c version", 0, "XBRG 2.1\n", ""},
-        {"xbrgcli -m alpha --id 2 -c mappings", 0,
-         "14,4,\"db,main\",3,disk4\n17,7,traveller,3,disk7\n", ""},
-        {"xbrgcli -m alpha --id 3 -c version", 1, "",
+        {"qydyn -c alpha", "WRTL1003 The option -dlpar is missing.\n"},
+        {"qydyn -dlpar -c 'delta, spare'", "No results were found.\n"},
+        {"xbrgcli -m alpha --id 1 -c version", "XBRG 2.1\n"},
+        {"xbrgcli -m alpha --id 2 -c mappings",
+         "14,4,\"db,main\",3,disk4\n17,7,traveller,3,disk7\n"},
+        {"xbrgcli -m alpha --id 3 -c version",
          "WRTL8019 The partition with the ID 3 is no I/O server.\n"},
-        {"xbrgcli -m 'beta lab' --id 1 -c version", 1, "",
+        {"xbrgcli -m 'beta lab' --id 1 -c version",
          "WRTL8020 The partition with the ID 1 is not running.\n"},
-        {"xbrgcli -m alpha --id 99 -c version", 1, "",
+        {"xbrgcli -m alpha --id 99 -c version",
          "WRTL8011 The partition with the ID 99 was not found.\n"},
-        {"xbrgcli --id 1 -c version", 2, "", "WRTL1003 The option -m is missing.\n"},
-        {"xbrgcli -m alpha --id 1 -c 'version now'", 2, "",
+        {"xbrgcli --id 1 -c version", "WRTL1003 The option -m is missing.\n"},
+        {"xbrgcli -m alpha --id 1 -c 'version now'",
          "WRTL1004 The option -c cannot have the value \"version now\".\n"},
-        {"appliance generate --force --hosts 1 --lpars 2 && qylwh | cut -d, -f2,3", 0,
-         "0000001,1\n", ""},
-    };
-    expectRows(m_appliance, rows);
+        {"appliance generate --force --hosts 1 --lpars 2 && qylwh | cut -d, -f2,3", "0000001,1\n"},
+    });
 }
 
 TEST_F(QueryToolsTest, SamplesCoverTheTimeAskedFor) {

@@ -38,24 +38,6 @@ inline std::vector<Record> recordsOf(const std::string& output) {
     return records;
 }
 
-/// A command line and all that comes of it.
-struct ToolRow {
-    const char* command;
-    int exit;
-    const char* out;
-    const char* err;
-};
-
-template <std::size_t N>
-void expectRows(testing_support::TestAppliance& appliance, const ToolRow (&rows)[N]) {
-    for (const ToolRow& row : rows) {
-        const auto outcome = appliance.run(row.command);
-        EXPECT_EQ(row.exit, outcome.exit) << row.command;
-        EXPECT_EQ(row.out, outcome.out) << row.command;
-        EXPECT_EQ(row.err, outcome.err) << row.command;
-    }
-}
-
 /// Whether the values of an attribute change from one call to the next.
 inline bool moves(const std::string& attribute) {
     return attribute.find("time") != std::string::npos ||
@@ -91,5 +73,58 @@ inline std::string faultsOfTable(testing_support::TestAppliance& appliance,
     }
     return faults;
 }
+
+/// A command line, and what it answers: on standard error if that begins with a message's code.
+struct ToolRow {
+    std::string command;
+    std::string answer = "";
+
+    /// 1 is a refusal, 2 a wrong command line, 3 a state and 4 an output that cannot be used.
+    int exit() const {
+        if (answer.rfind("WRTL", 0) != 0) return 0;
+        const std::string code = answer.substr(4, 4);
+        if (code == "1011") return 1;  // a value that the host refuses
+        if (code == "2007") return 4;
+        return code[0] == '1' ? 2 : code[0] == '2' ? 3 : 1;
+    }
+};
+
+/// A test that runs the built programs.
+class ToolTest : public testing::Test {
+protected:
+    testing_support::Outcome run(const std::string& command) { return m_appliance.run(command); }
+
+    /// What a command that succeeds prints.
+    std::string out(const std::string& command) {
+        const auto outcome = run(command);
+        EXPECT_EQ("", outcome.err) << command;
+        return outcome.out;
+    }
+    void make(const std::string& command) { ASSERT_EQ(0, run("appliance " + command).exit); }
+    std::string shown() { return out("appliance show --format json"); }
+
+    void expectRows(const std::vector<ToolRow>& rows) {
+        for (const ToolRow& row : rows) {
+            const auto outcome = run(row.command);
+            EXPECT_EQ(row.exit(), outcome.exit) << row.command;
+            EXPECT_EQ(row.exit() == 0 ? row.answer : "", outcome.out) << row.command;
+            EXPECT_EQ(row.exit() == 0 ? "" : row.answer, outcome.err) << row.command;
+        }
+    }
+
+    /// Of answers these rows give the beginning.
+    void expectRefused(const std::vector<ToolRow>& rows) {
+        const std::string before = shown() + out("appliance journal");
+        for (const ToolRow& row : rows) {
+            const auto outcome = run(row.command);
+            EXPECT_EQ(row.exit(), outcome.exit) << row.command;
+            EXPECT_EQ("", outcome.out) << row.command;
+            EXPECT_EQ(0U, outcome.err.find(row.answer)) << row.command << '\n' << outcome.err;
+            ASSERT_EQ(before, shown() + out("appliance journal")) << row.command;
+        }
+    }
+
+    testing_support::TestAppliance m_appliance{ZEM_PROGRAMS};
+};
 
 #endif

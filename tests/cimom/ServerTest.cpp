@@ -90,8 +90,10 @@ TEST_P(Operations, ClassesDecideWhoAnswers) {
         EXPECT_EQ(reply.rc, rc) << path.className;
         EXPECT_EQ(reply.paths.size(), rc == CMPI_RC_OK ? 2U : 0U) << path.className;
     }
-    EXPECT_EQ(m_server.getInstance(m_request, {"", "Fix_Thing", {{"Name", 5}}}).rc,
-              CMPI_RC_ERR_INVALID_PARAMETER);
+    // a key of another type is left to the provider by the lean one
+    EXPECT_EQ(
+        m_server.getInstance(m_request, {"", "Fix_Thing", {{"Name", 5}}}).rc,
+        GetParam() == Character::Lean ? CMPI_RC_ERR_NOT_FOUND : CMPI_RC_ERR_INVALID_PARAMETER);
 }
 
 TEST_P(Operations, AssociationsAreFetchedByUpcalls) {

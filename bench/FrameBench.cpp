@@ -9,6 +9,7 @@
 #include <algorithm>
 
 #include "ProviderInBench.h"
+#include "TraceTool.h"
 
 namespace {
 
@@ -53,5 +54,16 @@ void Worker_EnumInstanceNames(benchmark::State& state) {
     }
 }
 BENCHMARK(Worker_EnumInstanceNames)->Unit(benchmark::kMicrosecond);
+
+// What the timing trace costs a tool's run or an operation while nobody has switched it on.
+void TimingOff_OneOperation(benchmark::State& state) {
+    if (CTimeLogerManager::getInstance()->isEnabled()) state.SkipWithError("the trace is on");
+    for (auto _ : state) {
+        CTimeLoger* timing = CTimeLogerManager::getInstance()->getLogger("enumInstanceNames");
+        timing->begin("Bench_Disk");
+        timing->end("Bench_Disk");
+    }
+}
+BENCHMARK(TimingOff_OneOperation)->Unit(benchmark::kMicrosecond);
 
 }  // namespace

@@ -50,6 +50,7 @@ ROWS = [
     ("Broker_EnumInstances/10000", "Broker_EnumInstances/100", 125.0, 0),
     ("Broker_GetInstance/10000", "Broker_GetInstance/100", 125.0, 0),
     ("Frame_EnumInstanceNames", "Worker_EnumInstanceNames", None, 0),
+    ("TimingOff_OneOperation", "Frame_EnumInstanceNames", 0.05, 0),
     ("HashJoin_EnumNames/100", "CrossProduct_EnumNames/100", None, 0),
     ("HashJoin_EnumNames/1000", "CrossProduct_EnumNames/1000", 0.02, 0),
     ("HashJoin_EnumNames/4000", "HashJoin_EnumNames/1000", 6.0, 0),

@@ -21,12 +21,13 @@ CmpiData uint32(CMPIUint32 value) {
 
 /// Whether the client limits the time that a change may take.
 bool hasTimeout(const CmpiArgs& in) {
+    CmpiData limit;
     try {
-        const CmpiData limit = in.getArg("TimeoutPeriod");
-        return !limit.isNullValue() && limit.getDateTime().getDateTime() != 0;
+        limit = in.getArg("TimeoutPeriod");
     } catch (const CmpiStatus&) {
         return false;  // it was not given, in the way of some servers
     }
+    return !limit.isNullValue() && limit.getDateTime().getDateTime() != 0;
 }
 
 }  // namespace

@@ -1,18 +1,15 @@
-/// What the providers of hosts and partitions share: a CIM_ComputerSystem read
-/// from qyplat.
+/// What the providers of hosts and partitions share: a CIM_ComputerSystem read from qyplat.
 ///
-/// A subclass names its class and the rows that turn tool attributes into CIM
-/// properties, and says how to find one system and how to walk all. The tool
-/// runs under the client's user and in the client's language, and is asked only
-/// for the attributes that the wanted properties need.
+/// A subclass names its class and the rows that turn tool attributes into CIM properties, and says
+/// how to find one system and how to walk all. The tool runs under the client's user and in the
+/// client's language, and is asked only for the attributes that the wanted properties need.
 ///
-/// A modification changes what the subclass can change; of the rest it may only
-/// repeat what is already so, and is refused before anything is changed.
-/// RequestStateChange answers "Not Supported" to every state there is unless
-/// the subclass knows better.
+/// A modification changes what the subclass can change; of the rest it may only repeat what is
+/// already so, and is refused before anything is changed. RequestStateChange answers "Not
+/// Supported" to every state there is unless the subclass knows better.
 ///
-/// Thread-safety: as the frame demands, no state beside the constant rows; any
-/// number of operations at once.
+/// Thread-safety: as the frame demands, no state beside the constant rows; any number of operations
+/// at once.
 #ifndef COMPUTER_SYSTEM_PROVIDER_H
 #define COMPUTER_SYSTEM_PROVIDER_H
 
@@ -39,8 +36,8 @@ protected:
                            const char* className, std::vector<PropertyRow> rows,
                            Attributes identity);
 
-    /// Hands the system with this Name to @p sink; a Name that no system can
-    /// have, or that none has, leaves the sink uncalled.
+    /// Hands the system with this Name to @p sink; a Name that no system can have, or that none
+    /// has, leaves the sink uncalled.
     /// @param attributes  those to ask the tool for, closed by ATTR_END
     virtual void find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
                       const Sink& sink) = 0;

@@ -1,5 +1,4 @@
-// What clients change of partitions: making, changing and deleting them, and
-// their state.
+// What clients change of partitions: making, changing and deleting them, and their state.
 #include <strings.h>
 
 #include <algorithm>
@@ -91,8 +90,8 @@ constexpr Transition kTransitions[] = {
 
 constexpr CMPIUint32 kCompleted = 0, kNotSupported = 1, kInvalidTransition = 4097;
 
-/// @p text as it must stand between the double quotes of a command line, so
-/// that the splitter gives it to the tool unchanged, whatever a client wrote.
+/// @p text as it must stand between the double quotes of a command line, so that the splitter gives
+/// it to the tool unchanged, whatever a client wrote.
 std::string escaped(const std::string& text) {
     std::string result;
     for (char c : text) {
@@ -102,8 +101,7 @@ std::string escaped(const std::string& text) {
     return result;
 }
 
-/// Likewise for the value of an item in an attribute list, which the tool reads
-/// as a quoted field.
+/// Likewise for the value of an item in an attribute list, which the tool reads as a quoted field.
 std::string itemText(const std::string& text) {
     std::string doubled;
     for (char c : text) {

@@ -1,5 +1,4 @@
-// Reading of ORXC_LPAR_CS; what changes partitions stands in
-// PartitionChanges.cpp.
+// Reading of ORXC_LPAR_CS; what changes partitions stands in PartitionChanges.cpp.
 #include "PartitionProvider.h"
 
 #include <map>
@@ -17,8 +16,7 @@ using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
 /// Profiles by the ID of their partition and their name.
 using Profiles = std::map<std::pair<std::string, std::string>, const zemRecordType*>;
 
-/// The attributes of partitions that a query needs, and those of their default
-/// profiles.
+/// The attributes of partitions that a query needs, and those of their default profiles.
 struct Needs {
     explicit Needs(const int* attributes) {
         for (; *attributes != Partition::ATTR_END; ++attributes)
@@ -52,8 +50,7 @@ zemRecordSetsType readProfiles(zemQyplatCmdCaller& tool, Needs& needs, const std
     }
 }
 
-/// Hands partitions of one host to @p sink, each with what is wanted of its
-/// default profile.
+/// Hands partitions of one host to @p sink, each with what is wanted of its default profile.
 void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host,
                     const char* filter,
                     const std::function<void(const std::string&, const zemRecordType&)>& sink) {
@@ -108,8 +105,7 @@ void PartitionProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Si
         try {
             readPartitions(tool, needs, hostName(*hosts[i]), nullptr, sink);
         } catch (const zemException& e) {
-            // a host without partitions answers so; one removed meanwhile has none
-            // either
+            // a host without partitions answers so; one removed meanwhile has none either
             if (!isUnknownObject(e)) throw;
         }
     }

@@ -1,22 +1,20 @@
-/// ORXC_LPAR_CS: the logical partitions of all hosts. Name is <lparId>*<Name of
-/// the host>.
+/// ORXC_LPAR_CS: the logical partitions of all hosts. Name is <lparId>*<Name of the host>.
 ///
 /// What a partition has when it is activated is read from its default profile.
 ///
-/// A client makes a partition with an instance whose Name is that of the new
-/// partition, or "*" and the Name of the host for the host's first free number.
-/// It starts and stops partitions by RequestStateChange, which has done its
-/// work when it answers:
+/// A client makes a partition with an instance whose Name is that of the new partition, or "*" and
+/// the Name of the host for the host's first free number. It starts and stops partitions by
+/// RequestStateChange, which has done its work when it answers:
 ///
 ///     2 Enabled    activates with the default profile, or resumes
-///     3 Disabled   switches off at once; a suspended partition loses what it
-///     kept 4 Shut Down  has the system in the partition shut down 6 Offline
-///     suspends 10 Reboot    as Shut Down, and starts again 11 Reset     as
-///     Disabled, and starts again
+///     3 Disabled   switches off at once; a suspended partition loses what it kept
+///     4 Shut Down  has the system in the partition shut down
+///     6 Offline    suspends
+///     10 Reboot    as Shut Down, and starts again
+///     11 Reset     as Disabled, and starts again
 ///
-/// The answer is 0 when it is done, 1 for another state, 4097 when the
-/// partition cannot come to that state from its own. What the appliance refuses
-/// fails with the tool's words.
+/// The answer is 0 when it is done, 1 for another state, 4097 when the partition cannot come to
+/// that state from its own. What the appliance refuses fails with the tool's words.
 #ifndef PARTITION_PROVIDER_H
 #define PARTITION_PROVIDER_H
 

@@ -54,8 +54,7 @@ bool parseNumber(const char* text, unsigned long limit, unsigned long& value) {
     return std::isdigit(static_cast<unsigned char>(*text)) != 0 && *end == '\0' && value <= limit;
 }
 
-/// The whole text as a decimal number with at most two places behind the point,
-/// in hundredths.
+/// The whole text as a decimal number with at most two places behind the point, in hundredths.
 bool parseHundredths(const char* text, unsigned long& value) {
     const std::string number = text;
     const std::size_t point = std::min(number.find('.'), number.size());
@@ -89,8 +88,7 @@ CmpiArray oneNumber(CMPIUint16 value) {
 }
 
 /// Sets @p data from the text of an attribute.
-/// @return false when the text is empty or of another form, so that the
-/// property stays null
+/// @return false when the text is empty or of another form, so that the property stays null
 bool convert(ValueKind kind, const char* text, CmpiData& data) {
     unsigned long value = 0;
     std::tm when = {};

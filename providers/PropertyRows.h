@@ -1,10 +1,8 @@
-/// What all providers here share: rows that turn attributes of a tool's record
-/// into CIM properties, and the few facts about hosts on which every class
-/// depends.
+/// What all providers here share: rows that turn attributes of a tool's record into CIM properties,
+/// and the few facts about hosts on which every class depends.
 ///
-/// A provider names its rows once. From them follow the attributes that a query
-/// must ask for and the properties that an instance gets, so that the tool is
-/// asked for nothing that nobody wants.
+/// A provider names its rows once. From them follow the attributes that a query must ask for and
+/// the properties that an instance gets, so that the tool is asked for nothing that nobody wants.
 ///
 /// Thread-safety: functions on their arguments alone.
 #ifndef PROPERTY_ROWS_H
@@ -17,8 +15,7 @@
 #include "CommandCaller.h"
 #include "Exception.h"
 
-/// How the text of a tool attribute becomes the value of a property. An empty
-/// text is null.
+/// How the text of a tool attribute becomes the value of a property. An empty text is null.
 enum class ValueKind {
     Text,
     TextList,      ///< "a,b" as an array of texts
@@ -27,10 +24,8 @@ enum class ValueKind {
     Hundredths,    ///< "1.25" as the 32-bit number 125
     Flag,          ///< "1" true, "0" false
     Timestamp,     ///< "MM/DD/YYYY HH:MM:SS" as a date-time
-    EnabledState,  ///< state word as the number of
-                   ///< CIM_EnabledLogicalElement.EnabledState
-    Status         ///< state word as a one-element
-                   ///< CIM_ManagedSystemElement.OperationalStatus
+    EnabledState,  ///< state word as the number of CIM_EnabledLogicalElement.EnabledState
+    Status         ///< state word as a one-element CIM_ManagedSystemElement.OperationalStatus
 };
 
 /// One property and the attribute that fills it.
@@ -42,19 +37,18 @@ struct PropertyRow {
 
 using Attributes = std::vector<int>;  ///< enumerators of one tool table
 
-/// The attributes of @p identity and those of the wanted properties, each once,
-/// closed by -1 as the callers want their lists.
+/// The attributes of @p identity and those of the wanted properties, each once, closed by -1 as the
+/// callers want their lists.
 /// @param properties  null-ended list of wanted properties; null or empty: all
 Attributes attributesFor(const std::vector<PropertyRow>& rows, const Attributes& identity,
                          const char** properties);
 
-/// Sets the wanted properties that have a value in @p record; the others stay
-/// null.
+/// Sets the wanted properties that have a value in @p record; the others stay null.
 void setProperties(CmpiInstance& instance, const std::vector<PropertyRow>& rows,
                    const char** properties, const zemRecordType& record);
 
-/// Whether a text has the form of a host's key, <type_model>*<serial_num>. Keys
-/// come from clients and go into command lines, so nothing else may pass.
+/// Whether a text has the form of a host's key, <type_model>*<serial_num>. Keys come from clients
+/// and go into command lines, so nothing else may pass.
 bool isHostName(const std::string& text);
 
 /// Whether a tool failed because it knows no such host or partition.

@@ -1,7 +1,7 @@
 // What does a run of a tool cost beyond starting the program?
 //
-// The other side is posix_spawn, one read to the end and waitpid. The runner polls, so it may take
-// one polling step (2 ms) longer, plus a quarter.
+// The other side is posix_spawn, one read to the end and waitpid. The runner has three pipes to
+// make and to watch, and resets the signals of the child; it may take half as long again.
 
 #include <benchmark/benchmark.h>
 

@@ -30,7 +30,8 @@
 
 /// Hash functions: each reduces a key to the index of its chain among @p count chains.
 ZEM_EXPORT inline unsigned hashFunc(const int& key, unsigned count) {
-    return static_cast<unsigned>(key) % count;
+    const auto value = static_cast<unsigned>(key);
+    return value < count ? value : value % count;  // a record's keys seldom need the division
 }
 
 ZEM_EXPORT inline unsigned cecHashFunc(const zemString& key, unsigned count) {
@@ -186,7 +187,8 @@ protected:
 
     /// Puts a new entry at the head of its chain. Returns 0; 1 if there can be no chains; 2 if
     /// the key has to be @p unique and is there already.
-    int add(const K& key, const V& value, bool unique) {
+    template <class Value>
+    int add(const K& key, Value&& value, bool unique) {
         if (m_bucketLen == 0) {
             return noHeads;
         }
@@ -196,7 +198,7 @@ protected:
         if (unique && findFrom(head, hash, key) != nullptr) {
             return duplicate;
         }
-        head = make(head, hash, key, value);
+        head = make(head, hash, key, std::forward<Value>(value));
         return done;
     }
 
@@ -250,11 +252,12 @@ private:
         m_bucketArray = nullptr;
     }
 
-    Bucket* make(Bucket* next, unsigned hash, const K& key, const V& value) {
+    template <class Value>
+    Bucket* make(Bucket* next, unsigned hash, const K& key, Value&& value) {
         if (unused() == blockEnd()) {
-            return new Bucket{next, hash, {key, value}};
+            return new Bucket{next, hash, {key, std::forward<Value>(value)}};
         }
-        Bucket* const bucket = new (unused()) Bucket{next, hash, {key, value}};
+        Bucket* const bucket = new (unused()) Bucket{next, hash, {key, std::forward<Value>(value)}};
         ++unused();
         return bucket;
     }
@@ -297,6 +300,7 @@ public:
     /// Adds an entry. Returns 0; 2 if the key is there already, which changes nothing; 1 if the
     /// table has no chains.
     int insert(const K& key, const V& value) { return this->add(key, value, true); }
+    int insert(const K& key, V&& value) { return this->add(key, std::move(value), true); }
 
     /// The value of @p key, owned by the table.
     /// @throws int 3 if the key is absent

@@ -28,6 +28,9 @@ public:
         m_passesLeft = m_unit != 0 ? waitTime / m_unit : -1;
     }
 
+    /// Whether there is a limit, so that the number of passes counts.
+    bool limited() const { return m_limited; }
+
     /// Begins a pass: true when the limit is used up.
     bool expired() {
         if (m_limited && m_passesLeft == 0) {

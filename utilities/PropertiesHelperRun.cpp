@@ -8,6 +8,7 @@
 #include <algorithm>
 #include <cerrno>
 #include <chrono>
+#include <climits>
 #include <csignal>
 #include <cstdlib>
 #include <cstring>
@@ -32,6 +33,9 @@ constexpr int kEarlyEnd = 255;  // exit status of a child that did not reach its
 
 /// Output counts in pieces of this size: a zero byte hides the rest of its piece.
 constexpr size_t kPiece = 1023;
+
+/// Who is woken at the child's end looks at times only, for a child that a debugger has stopped.
+constexpr std::chrono::microseconds kPauseUntilWoken = std::chrono::milliseconds(100);
 
 [[noreturn]] void throwFailed(const char* accessMethod, int error, const char* text) {
     throw zemOperationFailedException(kClass, kMethod, accessMethod, zemString(error), text);
@@ -111,8 +115,8 @@ const std::vector<std::string>& errorTexts() {
     return texts;
 }
 
-/// All that a child needs, made while threads, locks and memory are still in order: between fork
-/// and exec the child then calls nothing that could wait for a thread it does not have.
+/// All that a child needs, made while threads, locks and memory are still in order: up to its exec
+/// the child then calls nothing that takes a lock or memory.
 class PreparedCommand {
 public:
     PreparedCommand(const char* command, const char* userName, const char* locale)
@@ -136,6 +140,14 @@ public:
     PreparedCommand& operator=(const PreparedCommand&) = delete;
 
     const zemCommandLine& line() const { return m_line; }
+
+    /// Whether the child does nothing but wire itself and become the program: it changes no user,
+    /// and what it may report fits an empty pipe.
+    bool isPlain() const {
+        return m_line.valid() && m_line.program.size() < PIPE_BUF && !m_user.needed &&
+               m_user.failure == 0;
+    }
+
     const UserSwitch& user() const { return m_user; }
 
     /// What is wrong with the command line, empty if nothing is.
@@ -215,10 +227,11 @@ void setNonBlocking(zemPipe& pipe) { fcntl(pipe.getReadingPipe(), F_SETFL, O_NON
 
 /// What sets the children of the two runners apart.
 struct ChildWiring {
-    int out;        // becomes descriptor 1
-    int err;        // becomes descriptor 2
-    int report;     // where the child says why it did not reach its program
-    bool numbered;  // reports begin with their number and the exit status is kEarlyEnd
+    int out;             // becomes descriptor 1
+    int err;             // becomes descriptor 2
+    int report;          // where the child says why it did not reach its program
+    bool numbered;       // reports begin with their number and the exit status is kEarlyEnd
+    int parentsEnds[3];  // reading ends, closed in the child; 0 for none
 };
 
 void writeAll(int fd, const char* bytes, size_t size) {
@@ -261,6 +274,9 @@ void report(int fd, const char* text, const char* separator = "", const char* su
 
 /// The child from the fork to the program. The ends that it writes close at exec or exit.
 [[noreturn]] void runChild(const PreparedCommand& command, const ChildWiring& wiring) {
+    for (const int end : wiring.parentsEnds) {
+        if (end != 0) close(end);
+    }
     if (dup2(wiring.out, STDOUT_FILENO) < 0 || dup2(wiring.err, STDERR_FILENO) < 0) {
         endEarly(command, wiring, errno, nullptr);
     }
@@ -280,6 +296,50 @@ void report(int fd, const char* text, const char* separator = "", const char* su
 
 // --- in the parent ------------------------------------------------------------------------------
 
+/// Holds every signal back from the calling thread.
+class SignalsHeld {
+public:
+    SignalsHeld() {
+        sigset_t all;
+        sigfillset(&all);
+        pthread_sigmask(SIG_SETMASK, &all, &m_before);
+    }
+    ~SignalsHeld() { pthread_sigmask(SIG_SETMASK, &m_before, nullptr); }
+    SignalsHeld(const SignalsHeld&) = delete;
+    SignalsHeld& operator=(const SignalsHeld&) = delete;
+
+    /// In the child: what exec makes of the signals, before the first can come. A handler of the
+    /// parent's would run on the memory that both use.
+    void releaseInChild() const {
+        struct sigaction action = {};
+        for (int signal = 1; signal < NSIG; ++signal) {
+            const bool caught = sigaction(signal, nullptr, &action) == 0 &&
+                                action.sa_handler != SIG_DFL && action.sa_handler != SIG_IGN;
+            if (caught) {
+                std::signal(signal, SIG_DFL);
+            }
+        }
+        sigprocmask(SIG_SETMASK, &m_before, nullptr);
+    }
+
+private:
+    sigset_t m_before;
+};
+
+/// Starts a child. A plain one borrows the memory of this process and halts this thread up to its
+/// exec: to fork a large server takes longer than many a tool runs, and every page written next
+/// has to be copied.
+/// @return its id, or -1 with errno set
+pid_t startChild(const PreparedCommand& command, const ChildWiring& wiring) {
+    const SignalsHeld signals;
+    const pid_t pid = command.isPlain() ? vfork() : fork();
+    if (pid == 0) {
+        signals.releaseInChild();
+        runChild(command, wiring);
+    }
+    return pid;
+}
+
 /// Appends @p size bytes of output, each piece up to its first zero byte.
 void appendPieces(std::string& text, const char* bytes, size_t size) {
     for (size_t begin = 0; begin < size; begin += kPiece) {
@@ -294,11 +354,12 @@ public:
     explicit ChildEnd(pid_t pid)
         : m_descriptor(static_cast<int>(syscall(SYS_pidfd_open, pid, 0))) {}
     ~ChildEnd() {
-        if (m_descriptor >= 0) close(m_descriptor);
+        if (isKnown()) close(m_descriptor);
     }
     ChildEnd(const ChildEnd&) = delete;
     ChildEnd& operator=(const ChildEnd&) = delete;
 
+    bool isKnown() const { return m_descriptor >= 0; }
     int descriptor() const { return m_descriptor; }
 
 private:
@@ -322,10 +383,13 @@ public:
         openPipe(m_pfdExp);
     }
 
-    void closeParentEnds() {
-        for (zemPipe* pipe : {&m_pfdStdout, &m_pfdStderr, &m_pfdExp}) {
-            pipe->closeReadingPipe();
-        }
+    ChildWiring wiring() const {
+        return {m_pfdStdout.getWritingPipe(),
+                m_pfdStderr.getWritingPipe(),
+                m_pfdExp.getWritingPipe(),
+                true,
+                {m_pfdStdout.getReadingPipe(), m_pfdStderr.getReadingPipe(),
+                 m_pfdExp.getReadingPipe()}};
     }
 
     void closeChildEnds() {
@@ -353,7 +417,7 @@ public:
             if (ended > 0 || (ended < 0 && error != EINTR)) {
                 return true;
             }
-            rest(plan.pause(), end);
+            rest(end.isKnown() && !plan.limited() ? kPauseUntilWoken : plan.pause(), end);
         }
     }
 
@@ -459,14 +523,9 @@ int zemPropertiesHelper::executeCommand(const char* command, zemString& strStdou
     }
     Supervision run;
     run.open();
-    const pid_t pid = fork();
+    const pid_t pid = startChild(prepared, run.wiring());
     if (pid < 0) {
         throwSystemError("fork", errno);
-    }
-    if (pid == 0) {
-        run.closeParentEnds();
-        runChild(prepared, {run.m_pfdStdout.getWritingPipe(), run.m_pfdStderr.getWritingPipe(),
-                            run.m_pfdExp.getWritingPipe(), true});
     }
     run.closeChildEnds();
     int error = 0;
@@ -500,11 +559,8 @@ int zemPropertiesHelper::asynExecuteCommand(const char* command, pid_t* pid, FIL
         throwFailed("fopen", errno, command);
     }
     const int writing = pfdStdout.getWritingPipe();
-    const pid_t child = fork();
-    if (child == 0) {
-        pfdStdout.closeReadingPipe();
-        runChild(prepared, {writing, writing, STDOUT_FILENO, false});
-    }
+    const pid_t child = startChild(
+        prepared, {writing, writing, STDOUT_FILENO, false, {pfdStdout.getReadingPipe(), 0, 0}});
     const int error = errno;
     pfdStdout.closeWritingPipe();
     pfdStdout.detach();  // the reading end is the stream's

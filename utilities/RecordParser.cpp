@@ -10,56 +10,71 @@ namespace {
 class FieldReader {
 public:
     /// @param record  bytes of the record, without its newline
-    /// @param field  receives each field's value, terminated; has room for the whole record
-    FieldReader(std::string_view record, char* field)
-        : m_next(record.data()), m_end(record.data() + record.size()), m_field(field) {}
+    /// @param pieces  room for fields with quotes; keeps its buffer from record to record
+    FieldReader(std::string_view record, std::string& pieces)
+        : m_next(record.data()), m_end(record.data() + record.size()), m_pieces(pieces) {}
 
     /// Reads the next field, empty when the record has no more.
     /// @return false when the record ends inside a quoted run
-    bool next() {
-        const char* from = m_next;
-        char* to = m_field;
+    bool next(std::string_view& field) {
+        const char* const begin = m_next;
+        const char* const special =
+            std::find_if(begin, m_end, [](char c) { return c == ',' || c == '"' || c == '\0'; });
+        const auto plain = static_cast<size_t>(special - begin);
+        field = {begin, plain};
+        m_next = special;
         bool quoted = false;
-        for (; from != m_end; ++from) {
-            if (*from == '"') {
-                if (!quoted || from + 1 == m_end || from[1] != '"') {
-                    quoted = !quoted;
-                    continue;
-                }
-                ++from;
-            } else if (*from == '\0' || (*from == ',' && !quoted)) {
-                break;
-            }
-            *to++ = *from;
+        if (special != m_end && *special == '"') {
+            m_pieces.assign(begin, plain);
+            quoted = readQuoted();
+            field = m_pieces;
         }
-        *to = '\0';
-        m_next = from != m_end ? from + 1 : m_end;
+        m_next = m_next != m_end ? m_next + 1 : m_end;
         return !quoted;
     }
 
 private:
+    /// Reads on up to the end of the field, from its first quote.
+    /// @return whether the record ends inside a quoted run
+    bool readQuoted() {
+        bool quoted = false;
+        for (; m_next != m_end; ++m_next) {
+            if (*m_next == '"') {
+                if (!quoted || m_next + 1 == m_end || m_next[1] != '"') {
+                    quoted = !quoted;
+                    continue;
+                }
+                ++m_next;
+            } else if (*m_next == '\0' || (*m_next == ',' && !quoted)) {
+                break;
+            }
+            m_pieces += *m_next;
+        }
+        return quoted;
+    }
+
     const char* m_next;
     const char* m_end;
-    char* m_field;
+    std::string& m_pieces;
 };
 
 }  // namespace
 
 bool zemParseRecords(std::string_view output, const int* keys, unsigned count,
                      zemRecordSetsType& results) {
-    std::string field;
-    zemString value;  // keeps its buffer from field to field
+    std::string pieces;
     for (size_t begin = 0; begin < output.size();) {
         const size_t end = std::min(output.find('\n', begin), output.size());
-        field.resize(std::max(field.size(), end - begin + 1));
-        FieldReader fields(output.substr(begin, end - begin), field.data());
+        FieldReader fields(output.substr(begin, end - begin), pieces);
         auto record = std::make_unique<zemRecordType>(count);
         for (unsigned i = 0; i < count; ++i) {
-            if (!fields.next()) {
+            std::string_view field;
+            if (!fields.next(field)) {
                 return false;
             }
-            value = field.c_str();
-            record->insert(keys != nullptr ? keys[i] : static_cast<int>(i), value);
+            const auto size = static_cast<unsigned>(field.size());
+            record->insert(keys != nullptr ? keys[i] : static_cast<int>(i),
+                           size != 0 ? zemString(field.data(), size) : zemString());
         }
         results.addElement(record.get());
         static_cast<void>(record.release());

@@ -184,8 +184,6 @@ private:
 
 }  // namespace
 
-zemString::zemString() : m_buffer(nullptr), m_size(0), m_len(0) {}
-
 zemString::zemString(int value) : zemString() {
     char digits[16];
     const int n = std::snprintf(digits, sizeof digits, "%d", value);
@@ -211,14 +209,6 @@ zemString::zemString(const zemString& source) : zemString() {
         assign(source.m_buffer, source.m_len);
     }
 }
-
-zemString::zemString(zemString&& source) noexcept
-    : m_buffer(source.m_buffer), m_size(source.m_size), m_len(source.m_len) {
-    source.m_buffer = nullptr;
-    source.release();
-}
-
-zemString::~zemString() { delete[] m_buffer; }
 
 void zemString::release() {
     delete[] m_buffer;

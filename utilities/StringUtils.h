@@ -21,7 +21,7 @@
 class ZEM_EXPORT zemString {
 public:
     /// The invalid string: empty, without a buffer.
-    zemString();
+    zemString() : m_buffer(nullptr), m_size(0), m_len(0) {}
 
     /// The decimal text of @p value.
     zemString(int value);
@@ -40,9 +40,13 @@ public:
     zemString(const zemString& source);
 
     /// Leaves @p source invalid.
-    zemString(zemString&& source) noexcept;
+    zemString(zemString&& source) noexcept
+        : m_buffer(source.m_buffer), m_size(source.m_size), m_len(source.m_len) {
+        source.m_buffer = nullptr;
+        source.m_size = source.m_len = 0;
+    }
 
-    ~zemString();
+    ~zemString() { delete[] m_buffer; }
 
     /// Replaces the text; the buffer is reused if it suffices. Null makes the string invalid;
     /// the text may be part of this string.

@@ -233,6 +233,28 @@ TEST(ExecuteCommandTest, TakesMuchOutputOnBothStreams) {
     EXPECT_EQ(std::string(10000000, 'e'), std::string(run.err));
 }
 
+TEST(ExecuteCommandTest, KeepsWhatTheCallerDoesWithSignals) {
+    const auto blockedAndIgnored = [] {
+        std::ifstream status("/proc/thread-self/status");
+        std::string text;
+        for (std::string line; std::getline(status, line);) {
+            if (line.find("SigBlk") == 0 || line.find("SigIgn") == 0) text += line + '\n';
+        }
+        return text;
+    };
+    sigset_t blocked;
+    sigset_t before;
+    sigemptyset(&blocked);
+    sigaddset(&blocked, SIGUSR1);
+    pthread_sigmask(SIG_BLOCK, &blocked, &before);
+    const auto handler = std::signal(SIGUSR2, SIG_IGN);
+    const std::string own = blockedAndIgnored();
+    EXPECT_EQ(own, std::string(ToolRun("grep -E SigBlk|SigIgn /proc/self/status").out));
+    EXPECT_EQ(own, blockedAndIgnored());
+    std::signal(SIGUSR2, handler);
+    pthread_sigmask(SIG_SETMASK, &before, nullptr);
+}
+
 TEST(ExecuteCommandTest, ManyRunsLeaveNothingBehind) {
     ToolFolder tools;
     tools.script("count", "ls /proc/self/fd | wc -l");
@@ -303,6 +325,7 @@ TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {
     ToolFolder tools;
     tools.script("both", "echo $LC_ALL; echo e >&2; exit 7");
     tools.script("marker", "echo ran");
+    const std::string longName(200000, 'n');  // more than a pipe holds
     const std::tuple<const char*, const char*, std::string, int> rows[] = {
         {"both", "", "xx\ne\n", 7},
         {"nosuchtool a", "", std::string("No such file or directory : nosuchtool") + '\0', 2},
@@ -310,6 +333,7 @@ TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {
          std::string("The given user name \"no such user\" was not found.") + '\0', 255},
         {"marker 'a", "", std::string("-1:Invalid command parameter:'a") + '\0', 255},
         {"marker \\", "", std::string("-1:Invalid command parameter:\\") + '\0' + "ran\n", 0},
+        {longName.c_str(), "", "File name too long : " + longName + '\0', 36},
     };
     for (const auto& [command, user, output, exitCode] : rows) {
         const Running running(command, user, "xx");

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 #include <cstring>
-#include <memory>
 #include <optional>
 #include <stdexcept>
 #include <vector>
@@ -24,11 +23,25 @@ struct Refusal {
     int code;
 };
 
+/// Whose objects an operation gives.
+enum class Of { All, Host, Lpar, Name };
+
+/// What an operation was called with, as it came.
+struct Call {
+    const char* operation;
+    const Family& family;
+    const char* user;
+    int level;
+    Of of;
+    const char* key = nullptr;  ///< of a host or a partition
+    const char* name = nullptr;
+};
+
 /// Whose objects are asked for: of all hosts, of one host, of one of its partitions.
 struct Scope {
     std::string mtms;
     std::optional<std::int64_t> lpar;
-    const char* profile = nullptr;
+    std::optional<std::string> name;
 };
 
 std::string argument(const char* text) {
@@ -36,34 +49,21 @@ std::string argument(const char* text) {
     return text;
 }
 
-Scope allHostsScope() { return {}; }
-
-Scope hostScope(const char* mtms) { return {argument(mtms), {}, nullptr}; }
-
-Scope lparScope(const char* lparKey) {
-    const std::string key = argument(lparKey);
+Scope scopeOf(const Call& call) {
+    if (call.of == Of::All) return {};
+    const std::string key = argument(call.key);
+    if (call.of == Of::Host) return {key, {}, {}};
     const std::size_t star = key.find('*');
     std::int64_t id = 0;
     if (star == std::string::npos || !wholeNumber(key.substr(0, star), &id)) {
         throw Refusal{API_INVALID_INPUT};
     }
-    return {argument(key.c_str() + star + 1), id, nullptr};
-}
-
-Scope profileScope(const char* lparKey, const char* profile) {
-    Scope scope = lparScope(lparKey);
-    argument(profile);
-    scope.profile = profile;
+    Scope scope{argument(key.c_str() + star + 1), id, {}};
+    if (call.of == Of::Name) scope.name = argument(call.name);
     return scope;
 }
 
-bool isIn(const Scope& scope, const Object& object) {
-    return (!scope.lpar || object.place().lpar == *scope.lpar) &&
-           (scope.profile == nullptr || object.get("name") == scope.profile);
-}
-
-std::vector<Row> rowsOf(const std::vector<std::unique_ptr<HostView>>& hosts, Kind kind,
-                        const Scope& scope) {
+std::vector<Row> rowsOf(const Hosts& hosts, Kind kind, const Scope& scope) {
     std::vector<Row> rows;
     bool isKnown = scope.mtms.empty();
     for (const auto& host : hosts) {
@@ -71,25 +71,29 @@ std::vector<Row> rowsOf(const std::vector<std::unique_ptr<HostView>>& hosts, Kin
         isKnown = true;
         if (scope.lpar && host->lpar(*scope.lpar) == nullptr) throw Refusal{API_NOT_FOUND};
         for (const Object& object : host->all(kind)) {
-            if (isIn(scope, object)) rows.push_back(rowOf(*host, object));
+            if (scope.lpar && object.place().lpar != *scope.lpar) continue;
+            if (!scope.name || object.get("name") == *scope.name) {
+                rows.push_back(rowOf(*host, object));
+            }
         }
     }
     if (!isKnown) throw Refusal{API_UNKNOWN_SYSTEM};
-    if (scope.profile != nullptr && rows.empty()) throw Refusal{API_NOT_FOUND};
+    if (scope.name && rows.empty()) throw Refusal{API_NOT_FOUND};
     return rows;
 }
 
-apiProp* read(const Family& family, const Scope& scope, int level) {
-    if (level != 1 && level != 2) throw Refusal{API_INVALID_INPUT};
+apiProp* read(const Call& call) {
+    const Scope scope = scopeOf(call);
+    if (call.level != 1 && call.level != 2) throw Refusal{API_INVALID_INPUT};
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
-    const auto hosts = allHosts(store);
-    const std::vector<Row> rows = rowsOf(hosts, family.kind, scope);
+    const Hosts hosts = allHosts(store);
+    const std::vector<Row> rows = rowsOf(hosts, call.family.kind, scope);
     Result result(rows.size());
     for (const Row& row : rows) {
-        result.addObject(family.classType);
-        for (const Property& property : family) {
-            if (property.level > level) continue;
+        result.addObject(call.family.classType);
+        for (const Property& property : call.family.properties) {
+            if (property.level > call.level) continue;
             result.put(property.key, property.make(row, property.attribute));
         }
     }
@@ -97,18 +101,16 @@ apiProp* read(const Family& family, const Scope& scope, int level) {
 }
 
 /// The whole of an operation: what was planned to go wrong does, nothing else leaves as exception.
-template <typename MakeScope>
-apiProp* answer(const char* operation, const Family& family, const char* user, MakeScope makeScope,
-                int level) noexcept {
+apiProp* answer(const Call& call) noexcept {
     try {
         try {
-            if (const auto fault = takeFault(operation)) {
+            if (const auto fault = takeFault(call.operation)) {
                 pause(*fault);
                 if (fault->isNull) return nullptr;
                 if (fault->code) throw Refusal{*fault->code};
             }
-            if (user == nullptr) throw Refusal{API_INVALID_INPUT};
-            return read(family, makeScope(), level);
+            if (call.user == nullptr) throw Refusal{API_INVALID_INPUT};
+            return read(call);
         } catch (const Refusal& refusal) {
             return Result().release(refusal.code);
         } catch (const std::length_error&) {
@@ -127,24 +129,21 @@ apiProp* answer(const char* operation, const Family& family, const char* user, M
 #define API extern "C" __attribute__((visibility("default")))
 
 // One body for each shape of operation.
-#define OPERATION_ALL(NAME, FAMILY)                               \
-    API apiProp* NAME(const char* user, int level) {              \
-        return answer(#NAME, FAMILY, user, allHostsScope, level); \
+#define OPERATION_ALL(NAME, FAMILY)                           \
+    API apiProp* NAME(const char* user, int level) {          \
+        return answer({#NAME, FAMILY, user, level, Of::All}); \
     }
-#define OPERATION_OF_HOST(NAME, FAMILY)                                   \
-    API apiProp* NAME(const char* user, const char* mtms, int level) {    \
-        return answer(                                                    \
-            #NAME, FAMILY, user, [&] { return hostScope(mtms); }, level); \
+#define OPERATION_OF_HOST(NAME, FAMILY)                                \
+    API apiProp* NAME(const char* user, const char* mtms, int level) { \
+        return answer({#NAME, FAMILY, user, level, Of::Host, mtms});   \
     }
-#define OPERATION_OF_LPAR(NAME, FAMILY)                                      \
-    API apiProp* NAME(const char* user, const char* lparKey, int level) {    \
-        return answer(                                                       \
-            #NAME, FAMILY, user, [&] { return lparScope(lparKey); }, level); \
+#define OPERATION_OF_LPAR(NAME, FAMILY)                                   \
+    API apiProp* NAME(const char* user, const char* lparKey, int level) { \
+        return answer({#NAME, FAMILY, user, level, Of::Lpar, lparKey});   \
     }
-#define OPERATION_NAMED(NAME, FAMILY)                                                          \
-    API apiProp* NAME(const char* user, const char* lparKey, const char* profile, int level) { \
-        return answer(                                                                         \
-            #NAME, FAMILY, user, [&] { return profileScope(lparKey, profile); }, level);       \
+#define OPERATION_NAMED(NAME, FAMILY)                                                       \
+    API apiProp* NAME(const char* user, const char* lparKey, const char* name, int level) { \
+        return answer({#NAME, FAMILY, user, level, Of::Name, lparKey, name});               \
     }
 
 API_OPERATIONS(OPERATION_ALL, OPERATION_OF_HOST, OPERATION_OF_LPAR, OPERATION_NAMED)

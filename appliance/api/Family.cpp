@@ -1,9 +1,8 @@
 #include "Family.h"
 
-#include <algorithm>
 #include <array>
 #include <cstdlib>
-#include <cstring>
+#include <map>
 
 #include "Text.h"
 
@@ -11,171 +10,125 @@ namespace appliance {
 
 namespace {
 
-// Words and codes. A row without a word stands for all other words, one without a code keeps them.
+// Words and codes: "<word>=<code>" with commas between them. "*" stands for all other words, which
+// otherwise keep their words.
 
-struct Code {
-    const char* word;
-    const char* code;
-};
-
-constexpr Code kHostState[] = {
-    {"Standby", "0"},
-    {"Operating", "1"},
-    {"Power Off", "3"},
-    {"Initializing", "6"},
-    {"Error", "12"},
-    {"Error - Dump in progress", "13"},
-    {"Error - Terminated", "14"},
-    {"QCAP Click to Accept", "15"},
-    {"Power Off In Progress", "32"},
-    {"Service Processor Failover In Progress", "33"},
-    {"Failed Authentication", "241"},
-    {"Pending Authentication - Password Updates Required", "242"},
-    {"Version Mismatch", "250"},
-    {"Recovery", "251"},
-    {"Incomplete", "253"},
-    {"No Connection", "254"},
-    {nullptr, "255"},
-};
-
-constexpr Code kLparState[] = {
-    {"Not Activated", "0"}, {"Starting", "1"},        {"Running", "2"},
-    {"Shutting Down", "3"}, {"Error", "4"},           {"Open Firmware", "8"},
-    {"Suspended", "9"},     {"Not Available", "252"}, {nullptr, "255"},
-};
-
-constexpr Code kMigrationState[] = {
-    {"Not Migrating", "9"},
-    {"Migration Starting", "10"},
-    {"Migration Stopped", "12"},
-    {"Migration In Progress", "13"},
-    {"Migration Complete", "16"},
-    {"Lost Connection", "255"},
-    {nullptr, "0"},
-};
-
-constexpr Code kCompatMode[] = {
-    {"CORAL5", "0"},          {"CORAL6_enhanced", "1"},  {"CORAL6", "2"},
-    {"CORAL6+", "3"},         {"CORAL7", "4"},           {"CORAL6+_enhanced", "5"},
-    {"CORAL7_enhanced", "6"}, {"CORAL7+", "7"},          {"CORAL7+_enhanced", "8"},
-    {"CORAL8", "9"},          {"CORAL8_enhanced", "10"}, {"default", "63"},
-    {nullptr, "255"},
-};
-
-constexpr Code kBootMode[] = {
-    {"norm", "1"}, {"ds", "2"}, {"sms", "3"}, {"of", "4"}, {"dd", "5"}, {nullptr, "0"},
-};
-
-constexpr Code kKeylock[] = {{"norm", "4"}, {"manual", "2"}, {nullptr, nullptr}};
-constexpr Code kMemMode[] = {{"ded", "255"}, {nullptr, "0"}};
+constexpr char kHostState[] =
+    "Standby=0,Operating=1,Power Off=3,Initializing=6,Error=12,Error - Dump in progress=13,"
+    "Error - Terminated=14,QCAP Click to Accept=15,Power Off In Progress=32,"
+    "Service Processor Failover In Progress=33,Failed Authentication=241,"
+    "Pending Authentication - Password Updates Required=242,Version Mismatch=250,Recovery=251,"
+    "Incomplete=253,No Connection=254,*=255";
+constexpr char kLparState[] =
+    "Not Activated=0,Starting=1,Running=2,Shutting Down=3,Error=4,Open Firmware=8,Suspended=9,"
+    "Not Available=252,*=255";
+constexpr char kMigrationState[] =
+    "Not Migrating=9,Migration Starting=10,Migration Stopped=12,Migration In Progress=13,"
+    "Migration Complete=16,Lost Connection=255,*=0";
+constexpr char kCompatMode[] =
+    "CORAL5=0,CORAL6_enhanced=1,CORAL6=2,CORAL6+=3,CORAL7=4,CORAL6+_enhanced=5,CORAL7_enhanced=6,"
+    "CORAL7+=7,CORAL7+_enhanced=8,CORAL8=9,CORAL8_enhanced=10,default=63,*=255";
+constexpr char kBootMode[] = "norm=1,ds=2,sms=3,of=4,dd=5,*=0";
+constexpr char kKeylock[] = "norm=4,manual=2";
+constexpr char kMemMode[] = "ded=255,*=0";
 
 // How processors are shared is one word, and two codes: whether the partition is greedy (uncapped,
 // or keeps its idle processors), and whether it donates while it runs.
-constexpr Code kSharing[] = {
-    {"uncap", "1"}, {"keep_idle_procs", "1"}, {"share_idle_procs_active", "1"}, {nullptr, "0"}};
-constexpr Code kDonor[] = {
-    {"share_idle_procs_always", "1"}, {"share_idle_procs_active", "1"}, {nullptr, "0"}};
+constexpr char kSharing[] = "uncap=1,keep_idle_procs=1,share_idle_procs_active=1,*=0";
+constexpr char kDonor[] = "share_idle_procs_always=1,share_idle_procs_active=1,*=0";
 
-constexpr Code kEntitled[] = {{"auto", "0"}, {nullptr, nullptr}};
-constexpr Code kEntitledMode[] = {{"auto", "1"}, {nullptr, "0"}};
+constexpr char kEntitled[] = "auto=0";
+constexpr char kEntitledMode[] = "auto=1,*=0";
+constexpr char kAdapterType[] = "client=0,*=1";
+constexpr char kAny[] = "any=65535";
+constexpr char kConnection[] = "unavailable=null,none=0,active=1,*=2";
+constexpr char kTruth[] = "1=true,*=false";
+constexpr char kNoIds[] = "none=";
+constexpr char kNoPool[] = "none=65535";
+constexpr char kNoParent[] = "none=null";
+constexpr char kNoOwner[] = "null=";  // of a slot that is free
 
-constexpr Code kAdapterType[] = {{"client", "0"}, {nullptr, "1"}};
-constexpr Code kAny[] = {{"any", "65535"}, {nullptr, nullptr}};
-constexpr Code kConnection[] = {
-    {"unavailable", "null"}, {"none", "0"}, {"active", "1"}, {nullptr, "2"}};
-constexpr Code kTruth[] = {{"1", "true"}, {nullptr, "false"}};
-constexpr Code kNoIds[] = {{"none", ""}, {nullptr, nullptr}};
-constexpr Code kNoPool[] = {{"none", "65535"}, {nullptr, nullptr}};
-constexpr Code kNoParent[] = {{"none", "null"}, {nullptr, nullptr}};
-constexpr Code kNoOwner[] = {{"null", ""}, {nullptr, nullptr}};  // of a slot that is free
-
-std::string codeOf(const Code* codes, const std::string& word) {
-    while (codes->word != nullptr && word != codes->word) ++codes;
-    return codes->code == nullptr ? word : codes->code;
+template <const char* codes>
+std::string codeOf(const std::string& word) {
+    static const std::map<std::string, std::string, std::less<>> all = [] {
+        std::map<std::string, std::string, std::less<>> map;
+        for (std::string_view row : namesIn(codes)) {
+            const std::size_t equals = row.find('=');
+            map.emplace(row.substr(0, equals), row.substr(equals + 1));
+        }
+        return map;
+    }();
+    auto found = all.find(word);
+    if (found == all.end()) found = all.find("*");
+    return found == all.end() ? word : found->second;
 }
 
-template <const Code* codes>
-std::string code(const Row& row, const char* attribute) {
-    return codeOf(codes, valueOf(row, attribute));
+template <const char* codes>
+std::string code(const Row& row, const std::string& attribute) {
+    return codeOf<codes>(valueOf(row, attribute));
 }
 
 // Values.
 
-std::string same(const Row& row, const char* attribute) { return valueOf(row, attribute); }
+std::string same(const Row& row, const std::string& attribute) { return valueOf(row, attribute); }
 
-std::string constant(const Row&, const char* value) { return value; }
-
-std::string hostKey(const Row& row, const char*) { return row.view->mtms(); }
-
-std::string lparKey(const Row& row, const char*) {
-    return std::to_string(row.self->place().lpar) + '*' + row.view->mtms();
-}
+std::string constant(const Row&, const std::string& value) { return value; }
 
 /// The key of a profile: its number in front of its partition's key.
-std::string profileKey(const Row& row, const char* attribute) {
-    return std::to_string(row.self->place().number) + '*' + lparKey(row, attribute);
+std::string profileKey(const Row& row, const std::string&) {
+    return std::to_string(row.self->place().number) + '*' + valueOf(row, "lpar_key");
 }
 
-std::string percent(const Row& row, const char* attribute) {
+std::string percent(const Row& row, const std::string& attribute) {
     return std::to_string(hundredths(valueOf(row, attribute)));
 }
 
-std::string whole(const Row& row, const char* attribute) {
+std::string whole(const Row& row, const std::string& attribute) {
     return std::to_string(hundredths(valueOf(row, attribute)) / 100);
 }
 
-std::string bracketed(const Row& row, const char* attribute) {
+std::string bracketed(const Row& row, const std::string& attribute) {
     return '[' + valueOf(row, attribute) + ']';
 }
 
-std::string decimal(const Row& row, const char* attribute) {
+std::string decimal(const Row& row, const std::string& attribute) {
     return std::to_string(std::strtoul(valueOf(row, attribute).c_str(), nullptr, 16));
 }
 
 /// Address of the service processor @p role; empty when the host has no such link.
-std::string addressOf(const Row& row, const char* role) {
-    for (const Object& link : row.view->all(Kind::Link)) {
-        if (link.get("sp") == role) return link.get("ipaddr");
-    }
-    return {};
+std::string addressOf(const Row& row, const std::string& role) {
+    const Object* link = row.view->find(Kind::Link, "sp", role);
+    return link == nullptr ? std::string() : link->get("ipaddr");
 }
 
-std::string compatModes(const Row& row, const char* attribute) {
+std::string compatModes(const Row& row, const std::string& attribute) {
     std::vector<std::string> codes;
     for (const std::string& mode : split(valueOf(row, attribute))) {
-        codes.push_back(codeOf(kCompatMode, mode));
+        codes.push_back(codeOf<kCompatMode>(mode));
     }
     return '[' + joined(codes) + ']';
 }
 
 /// The environment, odd while the partition holds resources.
-std::string definition(const Row& row, const char*) {
+std::string definition(const Row& row, const std::string&) {
     const std::string env = row.lpar->get("lpar_env");
     const int first = env == "tmxlinux" ? 1 : env == "xbrgserver" ? 3 : env == "osq00" ? 129 : 0;
     return std::to_string(first + (first != 0 && row.lpar->get("resource_config") == "0"));
 }
 
 /// "<number>,<name>" of the partition's profile whose name stands in @p attribute.
-std::string profileOf(const Row& row, const char* attribute) {
+std::string profileOf(const Row& row, const std::string& attribute) {
     const std::string name = valueOf(row, attribute);
     if (name.empty()) return "null,";
-    const std::int64_t id = row.self->place().lpar;
-    const auto& profiles = row.view->all(Kind::Profile);
-    auto profile = std::lower_bound(
-        profiles.begin(), profiles.end(), id,
-        [](const Object& object, std::int64_t wanted) { return object.place().lpar < wanted; });
-    for (; profile != profiles.end() && profile->place().lpar == id; ++profile) {
-        if (profile->get("name") == name) {
-            return std::to_string(profile->place().number) + ',' + name;
-        }
-    }
-    return "0," + name;
+    const Object* profile = row.view->profile(row.self->place().lpar, name);
+    return std::to_string(profile == nullptr ? 0 : profile->place().number) + ',' + name;
 }
 
 /// The pool of shared processors, or 255 for dedicated ones; attributes begin with @p prefix.
-std::string procMode(const Row& row, const char* prefix) {
-    const std::string p = prefix;
-    return valueOf(row, p + "proc_mode") == "ded" ? "255" : valueOf(row, p + "shared_proc_pool_id");
+std::string procMode(const Row& row, const std::string& prefix) {
+    return valueOf(row, prefix + "proc_mode") == "ded"
+               ? "255"
+               : valueOf(row, prefix + "shared_proc_pool_id");
 }
 
 /// What a host can do: bits of the words of one list.
@@ -196,7 +149,7 @@ constexpr CapabilityBit kCapabilities[] = {
     {5, 16, "lpar_suspend_capable"},
 };
 
-std::string capabilities(const Row& row, const char*) {
+std::string capabilities(const Row& row, const std::string&) {
     std::array<unsigned, 8> words{};
     for (const CapabilityBit& capability : kCapabilities) {
         if (valueOf(row, capability.attribute) == "1") words[capability.word] |= capability.bit;
@@ -206,234 +159,201 @@ std::string capabilities(const Row& row, const char*) {
     return list + ']';
 }
 
-std::string runtimeCapability(const Row& row, const char* attribute) {
+std::string runtimeCapability(const Row& row, const std::string& attribute) {
     return valueOf(row, attribute) == "1" ? std::to_string(1U << 30) : "0";
 }
 
 // The tables, one for each family.
 
-constexpr Property kCec[] = {
-    {"Name", 1, hostKey, ""},
-    {"UserDefinedName", 1, same, "name"},
-    {"State", 1, code<kHostState>, "state"},
-    {"PrimaryFSP_IP", 1, addressOf, "primary"},
-    {"BackupFSP_IP", 1, addressOf, "secondary"},
-    {"RuntimeCapability", 1, runtimeCapability, "osq00_capable"},
-    {"ProcCompatModesSupported", 2, compatModes, "lpar_proc_compat_modes"},
-    {"Capability", 2, constant, "0"},
-    {"GlvExCaps", 2, capabilities, ""},
+/// Properties in their order: "<key>:<attribute>" with commas between them, or the key alone where
+/// the attribute has its name, or the maker asks for none.
+struct PropertyRow {
+    int level;
+    Make make;
+    const char* properties;
+};
+
+constexpr PropertyRow kCec[] = {
+    {1, same, "Name:type_model_serial_num,UserDefinedName:name"},
+    {1, code<kHostState>, "State:state"},
+    {1, addressOf, "PrimaryFSP_IP:primary,BackupFSP_IP:secondary"},
+    {1, runtimeCapability, "RuntimeCapability:osq00_capable"},
+    {2, compatModes, "ProcCompatModesSupported:lpar_proc_compat_modes"},
+    {2, constant, "Capability:0"},
+    {2, capabilities, "GlvExCaps"},
     // What the pool of all shared processors has, as the tools print it.
-    {"ConfigurableProcUnits", 2, same, "configurable_pool_proc_uints"},
-    {"PendAvailProcUnits", 2, same, "pend_avail_sys_proc_units"},
+    {2, same,
+     "ConfigurableProcUnits:configurable_pool_proc_uints,"
+     "PendAvailProcUnits:pend_avail_sys_proc_units"},
 };
 
-constexpr Property kLpar[] = {
-    {"Name", 1, lparKey, ""},
-    {"UserDefinedName", 1, same, "name"},
-    {"DefinitionState", 1, definition, ""},
-    {"PartitionState", 1, code<kLparState>, "state"},
-    {"BootMode", 1, code<kBootMode>, "boot_mode"},
-    {"MigrationState", 1, code<kMigrationState>, "migration_state"},
-    {"Lpar_env", 1, same, "lpar_env"},
-    {"Default_prof", 2, profileOf, "default_profile"},
-    {"Curr_prof", 2, profileOf, "curr_profile"},
-    {"Keylock", 2, code<kKeylock>, "lpar_keylock"},
-    {"RedundantPath", 2, same, "redundant_err_path_reporting"},
-    {"ProcCompatMode", 2, code<kCompatMode>, "desired_lpar_proc_compat_mode"},
-    {"ActualProcCompatMode", 2, code<kCompatMode>, "curr_lpar_proc_compat_mode"},
-    {"PowerOnWithHypervisor", 2, same, "auto_start"},
+constexpr PropertyRow kLpar[] = {
+    {1, same, "Name:lpar_key,UserDefinedName:name"},
+    {1, definition, "DefinitionState"},
+    {1, code<kLparState>, "PartitionState:state"},
+    {1, code<kBootMode>, "BootMode:boot_mode"},
+    {1, code<kMigrationState>, "MigrationState:migration_state"},
+    {1, same, "Lpar_env:lpar_env"},
+    {2, profileOf, "Default_prof:default_profile,Curr_prof:curr_profile"},
+    {2, code<kKeylock>, "Keylock:lpar_keylock"},
+    {2, same, "RedundantPath:redundant_err_path_reporting"},
+    {2, code<kCompatMode>,
+     "ProcCompatMode:desired_lpar_proc_compat_mode,"
+     "ActualProcCompatMode:curr_lpar_proc_compat_mode"},
+    {2, same, "PowerOnWithHypervisor:auto_start"},
 };
 
-constexpr Property kProfile[] = {
-    {"Name", 1, profileKey, ""},
-    {"PartitionName", 1, lparKey, ""},
-    {"UserDefinedName", 1, same, "name"},
-    {"DefinitionState", 1, definition, ""},
-    {"SFPSurveillance", 1, same, "conn_monitoring"},
-    {"lpar_env", 1, same, "lpar_env"},
-    {"lpar_name", 1, same, "lpar_name"},
-    {"AutoIPLEnabled", 2, same, "auto_start"},
-    {"MaxVirtualSlots", 2, same, "max_virtual_slots"},
-    {"BootMode", 2, code<kBootMode>, "boot_mode"},
-    {"RedundantPath", 2, same, "redundant_err_path_reporting"},
-    {"ProcMode", 2, procMode, ""},
-    {"ProcessorMode", 2, code<kCompatMode>, "lpar_proc_compat_mode"},
-    {"SharingMode", 2, code<kSharing>, "sharing_mode"},
-    {"DonorMode", 2, code<kDonor>, "sharing_mode"},
-    {"UncappedWeight", 2, same, "uncap_weight"},
-    {"MinProcUnit", 2, percent, "min_proc_units"},
-    {"DesiredProcUnit", 2, percent, "desired_proc_units"},
-    {"MaxProcUnit", 2, percent, "max_proc_units"},
-    {"MinimumCPUCount", 2, same, "min_procs"},
-    {"DesiredCPUCount", 2, same, "desired_procs"},
-    {"MaximumCPUCount", 2, same, "max_procs"},
-    {"SharedProcPoolId", 2, same, "shared_proc_pool_id"},
-    {"MinimumMemory", 2, same, "min_mem"},
-    {"DesiredMemory", 2, same, "desired_mem"},
-    {"MaximumMemory", 2, same, "max_mem"},
-    {"MemMode", 2, code<kMemMode>, "mem_mode"},
-    {"VRMWeight", 2, same, "mem_weight"},
-    {"EntitledMode", 2, code<kEntitledMode>, "desired_io_entitled_mem"},
-    {"EntMem", 2, code<kEntitled>, "desired_io_entitled_mem"},
-    {"AltConsoleDRCIndex", 2, same, "alt_console_slot"},
-    {"AltLoadSourceDRCIndex", 2, same, "alt_restart_device_slot"},
-    {"ConsoleDRCIndex", 2, same, "console_slot"},
-    {"LoadSourceDRCIndex", 2, same, "load_source_slot"},
-    {"ECSDRCIndex", 2, same, "op_console_slot"},
-    {"virtual_serial_adapters", 2, same, "virtual_serial_adapters"},
-    {"virtual_scsi_adapters", 2, same, "virtual_scsi_adapters"},
-    {"virtual_eth_adapters", 2, same, "virtual_eth_adapters"},
-    {"io_slots", 2, same, "io_slots"},
+constexpr PropertyRow kProfile[] = {
+    {1, profileKey, "Name"},
+    {1, same, "PartitionName:lpar_key,UserDefinedName:name"},
+    {1, definition, "DefinitionState"},
+    {1, same, "SFPSurveillance:conn_monitoring,lpar_env,lpar_name"},
+    {2, same, "AutoIPLEnabled:auto_start,MaxVirtualSlots:max_virtual_slots"},
+    {2, code<kBootMode>, "BootMode:boot_mode"},
+    {2, same, "RedundantPath:redundant_err_path_reporting"},
+    {2, procMode, "ProcMode:"},
+    {2, code<kCompatMode>, "ProcessorMode:lpar_proc_compat_mode"},
+    {2, code<kSharing>, "SharingMode:sharing_mode"},
+    {2, code<kDonor>, "DonorMode:sharing_mode"},
+    {2, same, "UncappedWeight:uncap_weight"},
+    {2, percent,
+     "MinProcUnit:min_proc_units,DesiredProcUnit:desired_proc_units,MaxProcUnit:max_proc_units"},
+    {2, same,
+     "MinimumCPUCount:min_procs,DesiredCPUCount:desired_procs,MaximumCPUCount:max_procs,"
+     "SharedProcPoolId:shared_proc_pool_id,MinimumMemory:min_mem,DesiredMemory:desired_mem,"
+     "MaximumMemory:max_mem"},
+    {2, code<kMemMode>, "MemMode:mem_mode"},
+    {2, same, "VRMWeight:mem_weight"},
+    {2, code<kEntitledMode>, "EntitledMode:desired_io_entitled_mem"},
+    {2, code<kEntitled>, "EntMem:desired_io_entitled_mem"},
+    {2, same,
+     "AltConsoleDRCIndex:alt_console_slot,AltLoadSourceDRCIndex:alt_restart_device_slot,"
+     "ConsoleDRCIndex:console_slot,LoadSourceDRCIndex:load_source_slot,"
+     "ECSDRCIndex:op_console_slot,virtual_serial_adapters,virtual_scsi_adapters,"
+     "virtual_eth_adapters,io_slots"},
 };
 
-constexpr Property kCecMemoryCfg[] = {
-    {"Name", 1, hostKey, ""},
-    {"ConfigurableMem", 2, same, "configurable_sys_mem"},
-    {"InstalledMemory", 2, same, "installed_sys_mem"},
-    {"MaxMemPools", 2, same, "max_mem_pools"},
-    {"PendAvailMem", 2, same, "pend_avail_sys_mem"},
-    {"LMBSize", 2, same, "mem_region_size"},
+constexpr PropertyRow kCecMemoryCfg[] = {
+    {1, same, "Name:type_model_serial_num"},
+    {2, same,
+     "ConfigurableMem:configurable_sys_mem,InstalledMemory:installed_sys_mem,"
+     "MaxMemPools:max_mem_pools,PendAvailMem:pend_avail_sys_mem,LMBSize:mem_region_size"},
 };
 
-constexpr Property kCecMemoryPool[] = {
-    {"SystemName", 1, hostKey, ""},
-    {"curr_pool_mem", 2, same, "curr_pool_mem"},
-    {"pend_pool_mem", 2, same, "pend_pool_mem"},
-    {"pend_avail_pool_mem", 2, same, "pend_avail_pool_mem"},
+constexpr PropertyRow kCecMemoryPool[] = {
+    {1, same, "SystemName:type_model_serial_num"},
+    {2, same, "curr_pool_mem,pend_pool_mem,pend_avail_pool_mem"},
 };
 
 // Processing units of hosts and pools stand as the tools print them: readers take them as such.
-constexpr Property kCecProcessorCfg[] = {
-    {"Name", 1, hostKey, ""},
-    {"ConfigurableProcUnits", 2, same, "configurable_sys_proc_units"},
-    {"CurAvailProcUnits", 2, same, "curr_avail_sys_proc_units"},
-    {"InstalledProcessors", 2, whole, "installed_sys_proc_units"},
-    {"MaxProcPools", 2, same, "max_shared_proc_pools"},
-    {"MinProcUnit", 2, same, "min_proc_units_per_virtual_proc"},
-    {"PendAvailProcUnits", 2, same, "pend_avail_sys_proc_units"},
+constexpr PropertyRow kCecProcessorCfg[] = {
+    {1, same, "Name:type_model_serial_num"},
+    {2, same,
+     "ConfigurableProcUnits:configurable_sys_proc_units,"
+     "CurAvailProcUnits:curr_avail_sys_proc_units"},
+    {2, whole, "InstalledProcessors:installed_sys_proc_units"},
+    {2, same,
+     "MaxProcPools:max_shared_proc_pools,MinProcUnit:min_proc_units_per_virtual_proc,"
+     "PendAvailProcUnits:pend_avail_sys_proc_units"},
 };
 
-constexpr Property kCecProcessorPool[] = {
-    {"SystemName", 1, hostKey, ""},
-    {"SharedProcPoolId", 1, same, "shared_proc_pool_id"},
-    {"MaxPoolCapacity", 2, same, "max_pool_proc_units"},
-    {"PendReservedPoolCapacity", 2, same, "pend_reserved_pool_proc_units"},
-    {"lpar_ids", 2, same, "lpar_ids"},
+constexpr PropertyRow kCecProcessorPool[] = {
+    {1, same, "SystemName:type_model_serial_num,SharedProcPoolId:shared_proc_pool_id"},
+    {2, same,
+     "MaxPoolCapacity:max_pool_proc_units,PendReservedPoolCapacity:pend_reserved_pool_proc_units,"
+     "lpar_ids"},
 };
 
-constexpr Property kLparMemoryCfg[] = {
-    {"Name", 1, lparKey, ""},
-    {"UserDefinedName", 1, same, "name"},
-    {"CurAllocMem", 2, same, "curr_mem"},
-    {"CurMaxMem", 2, same, "curr_max_mem"},
-    {"CurMinMem", 2, same, "curr_min_mem"},
-    {"PendAllocMem", 2, same, "pend_mem"},
-    {"PendMaxMem", 2, same, "pend_max_mem"},
-    {"PendMinMem", 2, same, "pend_min_mem"},
-    {"RuntimeEntMem", 2, same, "run_io_entitled_mem"},
-    {"RuntimeMem", 2, same, "run_mem"},
-    {"RuntimeVRMWeight", 2, same, "run_mem_weight"},
-    {"RuntimeMinMem", 2, same, "run_min_mem"},
-    {"EntUsage", 2, same, "auto_io_entitled_mem"},
-    {"CurrMemMode", 2, code<kMemMode>, "mem_mode"},
+constexpr PropertyRow kLparMemoryCfg[] = {
+    {1, same, "Name:lpar_key,UserDefinedName:name"},
+    {2, same,
+     "CurAllocMem:curr_mem,CurMaxMem:curr_max_mem,CurMinMem:curr_min_mem,PendAllocMem:pend_mem,"
+     "PendMaxMem:pend_max_mem,PendMinMem:pend_min_mem,RuntimeEntMem:run_io_entitled_mem,"
+     "RuntimeMem:run_mem,RuntimeVRMWeight:run_mem_weight,RuntimeMinMem:run_min_mem,"
+     "EntUsage:auto_io_entitled_mem"},
+    {2, code<kMemMode>, "CurrMemMode:mem_mode"},
 };
 
-constexpr Property kLparProcessorCfg[] = {
-    {"Name", 1, lparKey, ""},
-    {"UserDefinedName", 1, same, "name"},
-    {"CurMaxProcs", 2, same, "curr_max_procs"},
-    {"CurMaxProcUnits", 2, percent, "curr_max_proc_units"},
-    {"CurMinProcs", 2, same, "curr_min_procs"},
-    {"CurMinProcUnits", 2, percent, "curr_min_proc_units"},
-    {"CurProcMode", 2, procMode, "curr_"},
-    {"CurAllocProcs", 2, same, "curr_procs"},
-    {"CurAllocProcUnits", 2, percent, "curr_proc_units"},
-    {"CurDonorMode", 2, code<kDonor>, "curr_sharing_mode"},
-    {"CurSharingMode", 2, code<kSharing>, "curr_sharing_mode"},
-    {"CurUncappedWeight", 2, same, "curr_uncap_weight"},
-    {"PendMaxProcs", 2, same, "pend_max_procs"},
-    {"PendMaxProcUnits", 2, percent, "pend_max_proc_units"},
-    {"PendMinProcs", 2, same, "pend_min_procs"},
-    {"PendMinProcUnits", 2, percent, "pend_min_proc_units"},
-    {"PendProcMode", 2, procMode, "pend_"},
-    {"PendAllocProcs", 2, same, "pend_procs"},
-    {"PendAllocProcUnits", 2, percent, "pend_proc_units"},
-    {"PendDonorMode", 2, code<kDonor>, "pend_sharing_mode"},
-    {"PendSharingMode", 2, code<kSharing>, "pend_sharing_mode"},
-    {"PendUncappedWeight", 2, same, "pend_uncap_weight"},
-    {"RuntimeProcs", 2, same, "run_procs"},
-    {"RuntimeProcUnits", 2, percent, "run_proc_units"},
-    {"RuntimeUncappedWeight", 2, same, "run_uncap_weight"},
+constexpr PropertyRow kLparProcessorCfg[] = {
+    {1, same, "Name:lpar_key,UserDefinedName:name"},
+    {2, same, "CurMaxProcs:curr_max_procs"},
+    {2, percent, "CurMaxProcUnits:curr_max_proc_units"},
+    {2, same, "CurMinProcs:curr_min_procs"},
+    {2, percent, "CurMinProcUnits:curr_min_proc_units"},
+    {2, procMode, "CurProcMode:curr_"},
+    {2, same, "CurAllocProcs:curr_procs"},
+    {2, percent, "CurAllocProcUnits:curr_proc_units"},
+    {2, code<kDonor>, "CurDonorMode:curr_sharing_mode"},
+    {2, code<kSharing>, "CurSharingMode:curr_sharing_mode"},
+    {2, same, "CurUncappedWeight:curr_uncap_weight,PendMaxProcs:pend_max_procs"},
+    {2, percent, "PendMaxProcUnits:pend_max_proc_units"},
+    {2, same, "PendMinProcs:pend_min_procs"},
+    {2, percent, "PendMinProcUnits:pend_min_proc_units"},
+    {2, procMode, "PendProcMode:pend_"},
+    {2, same, "PendAllocProcs:pend_procs"},
+    {2, percent, "PendAllocProcUnits:pend_proc_units"},
+    {2, code<kDonor>, "PendDonorMode:pend_sharing_mode"},
+    {2, code<kSharing>, "PendSharingMode:pend_sharing_mode"},
+    {2, same, "PendUncappedWeight:pend_uncap_weight,RuntimeProcs:run_procs"},
+    {2, percent, "RuntimeProcUnits:run_proc_units"},
+    {2, same, "RuntimeUncappedWeight:run_uncap_weight"},
 };
 
-constexpr Property kEthernet[] = {
-    {"Name", 1, lparKey, ""},
-    {"lpar_id", 1, same, "lpar_id"},
-    {"lpar_name", 1, same, "lpar_name"},
-    {"slot_num", 1, same, "slot_num"},
-    {"state", 1, same, "state"},
-    {"mac_addr", 2, same, "mac_addr"},
-    {"ieee_virtual_eth", 2, same, "ieee_virtual_eth"},
-    {"port_vlan_id", 2, same, "port_vlan_id"},
-    {"addl_vlan_ids", 2, code<kNoIds>, "addl_vlan_ids"},
-    {"is_required", 2, code<kTruth>, "is_required"},
-    {"is_trunk", 2, same, "is_trunk"},
-    {"trunk_priority", 2, same, "trunk_priority"},
-    {"vswitch", 2, same, "vswitch"},
+constexpr PropertyRow kEthernet[] = {
+    {1, same, "Name:lpar_key,lpar_id,lpar_name,slot_num,state"},
+    {2, same, "mac_addr,ieee_virtual_eth,port_vlan_id"},
+    {2, code<kNoIds>, "addl_vlan_ids"},
+    {2, code<kTruth>, "is_required"},
+    {2, same, "is_trunk,trunk_priority,vswitch"},
 };
 
-constexpr Property kScsi[] = {
-    {"Name", 1, lparKey, ""},
-    {"lpar_name", 1, same, "lpar_name"},
-    {"slot_num", 1, same, "slot_num"},
-    {"state", 1, same, "state"},
-    {"adapter_type", 2, code<kAdapterType>, "adapter_type"},
-    {"backing_devices", 2, same, "backing_devices"},
-    {"remote_lpar_id", 2, code<kAny>, "remote_lpar_id"},
-    {"remote_lpar_name", 2, same, "remote_lpar_name"},
-    {"remote_slot_num", 2, code<kAny>, "remote_slot_num"},
-    {"is_required", 2, code<kTruth>, "is_required"},
+constexpr PropertyRow kScsi[] = {
+    {1, same, "Name:lpar_key,lpar_name,slot_num,state"},
+    {2, code<kAdapterType>, "adapter_type"},
+    {2, same, "backing_devices"},
+    {2, code<kAny>, "remote_lpar_id"},
+    {2, same, "remote_lpar_name"},
+    {2, code<kAny>, "remote_slot_num"},
+    {2, code<kTruth>, "is_required"},
 };
 
-constexpr Property kSerial[] = {
-    {"Name", 1, lparKey, ""},
-    {"lpar_name", 1, same, "lpar_name"},
-    {"slot_num", 1, same, "slot_num"},
-    {"state", 1, same, "state"},
-    {"adapter_type", 2, code<kAdapterType>, "adapter_type"},
-    {"connect_status", 2, code<kConnection>, "connect_status"},
-    {"is_required", 2, code<kTruth>, "is_required"},
-    {"remote_lpar_id", 2, code<kAny>, "remote_lpar_id"},
-    {"remote_lpar_name", 2, same, "remote_lpar_name"},
-    {"remote_slot_num", 2, code<kAny>, "remote_slot_num"},
-    {"supports_dnx", 2, same, "supports_dnx"},
+constexpr PropertyRow kSerial[] = {
+    {1, same, "Name:lpar_key,lpar_name,slot_num,state"},
+    {2, code<kAdapterType>, "adapter_type"},
+    {2, code<kConnection>, "connect_status"},
+    {2, code<kTruth>, "is_required"},
+    {2, code<kAny>, "remote_lpar_id"},
+    {2, same, "remote_lpar_name"},
+    {2, code<kAny>, "remote_slot_num"},
+    {2, same, "supports_dnx"},
 };
 
-constexpr Property kIoSlot[] = {
-    {"SystemName", 1, hostKey, ""},
-    {"lpar_id", 1, code<kNoOwner>, "lpar_id"},
-    {"lpar_name", 1, code<kNoOwner>, "lpar_name"},
-    {"drc_index", 1, same, "drc_index"},
-    {"drc_name", 1, same, "drc_name"},
-    {"bus_grouping", 2, same, "bus_grouping"},
-    {"bus_id", 2, same, "bus_id"},
-    {"description", 2, same, "description"},
-    {"feature_codes", 2, bracketed, "feature_codes"},
-    {"iop", 2, code<kTruth>, "iop"},
-    {"parent_slot_drc_index", 2, code<kNoParent>, "parent_slot_drc_index"},
-    {"pci_class", 2, decimal, "pci_class"},
-    {"pci_device_id", 2, decimal, "pci_device_id"},
-    {"pci_revision_id", 2, decimal, "pci_revision_id"},
-    {"pci_subs_device_id", 2, decimal, "pci_subs_device_id"},
-    {"pci_subs_vendor_id", 2, decimal, "pci_subs_vendor_id"},
-    {"pci_vendor_id", 2, decimal, "pci_vendor_id"},
-    {"slot_io_pool_id", 2, code<kNoPool>, "slot_io_pool_id"},
-    {"unit_phys_loc", 2, same, "unit_phys_loc"},
+constexpr PropertyRow kIoSlot[] = {
+    {1, same, "SystemName:type_model_serial_num"},
+    {1, code<kNoOwner>, "lpar_id,lpar_name"},
+    {1, same, "drc_index,drc_name"},
+    {2, same, "bus_grouping,bus_id,description"},
+    {2, bracketed, "feature_codes"},
+    {2, code<kTruth>, "iop"},
+    {2, code<kNoParent>, "parent_slot_drc_index"},
+    {2, decimal,
+     "pci_class,pci_device_id,pci_revision_id,pci_subs_device_id,pci_subs_vendor_id,pci_vendor_id"},
+    {2, code<kNoPool>, "slot_io_pool_id"},
+    {2, same, "unit_phys_loc"},
 };
 
 template <std::size_t N>
-constexpr Family family(int classType, Kind kind, const Property (&properties)[N]) {
-    return {classType, kind, properties, N};
+Family family(int classType, Kind kind, const PropertyRow (&rows)[N]) {
+    Family family{classType, kind, {}};
+    for (const PropertyRow& row : rows) {
+        for (std::string_view property : namesIn(row.properties)) {
+            const std::size_t end = property.find(':');
+            const std::size_t attribute = end == std::string_view::npos ? 0 : end + 1;
+            family.properties.push_back({std::string(property.substr(0, end)), row.level, row.make,
+                                         std::string(property.substr(attribute))});
+        }
+    }
+    return family;
 }
 
 }  // namespace

@@ -6,29 +6,27 @@
 #ifndef APPLIANCE_FAMILY_H
 #define APPLIANCE_FAMILY_H
 
-#include <cstddef>
 #include <string>
+#include <vector>
 
 #include "View.h"
 
 namespace appliance {
 
+using Make = std::string (*)(const Row& row, const std::string& attribute);
+
 struct Property {
-    const char* key;
+    std::string key;
     int level;  ///< 1: in every result, 2: in full ones only
-    std::string (*make)(const Row& row, const char* attribute);
-    const char* attribute;
+    Make make;
+    std::string attribute;
 };
 
 /// A group of operations that return the same kind of record.
 struct Family {
     int classType;
     Kind kind;
-    const Property* properties;
-    std::size_t size;
-
-    const Property* begin() const { return properties; }
-    const Property* end() const { return properties + size; }
+    std::vector<Property> properties;
 };
 
 extern const Family kCecs, kLpars, kProfiles;

@@ -43,14 +43,14 @@ Result::~Result() { free(m_header); }
 
 void Result::addObject(int classType) { m_header[m_header->objCount++].classType = classType; }
 
-void Result::put(const char* key, const std::string& value) {
+void Result::put(const std::string& key, const std::string& value) {
     apiProp* record = &m_header[m_header->objCount - 1];
     const auto index = static_cast<std::size_t>(record->propertyCount);
     const std::size_t entries = value.size() / API_TEXT_SIZE + 1;
-    if (index + entries > API_MAX_PROPERTIES || std::strlen(key) >= API_TEXT_SIZE) {
+    if (index + entries > API_MAX_PROPERTIES || key.size() >= API_TEXT_SIZE) {
         throw std::length_error(key);
     }
-    std::memcpy(entry(record, offsetof(apiProp, name), index), key, std::strlen(key));
+    std::memcpy(entry(record, offsetof(apiProp, name), index), key.data(), key.size());
     std::memcpy(entry(record, offsetof(apiProp, value), index), value.data(), value.size());
     record->propertyCount += static_cast<int>(entries);
 }

@@ -30,7 +30,7 @@ public:
 
     /// A property of the object begun last.
     /// @throws std::length_error the record has no room for it
-    void put(const char* key, const std::string& value);
+    void put(const std::string& key, const std::string& value);
 
     /// Hands the result over to who calls free().
     apiProp* release(int rc = API_SUCCESS);

@@ -66,14 +66,13 @@ void fill(bool force, Fill fillStore) {
     change.commit();
 }
 
-int showState(const std::string& format) {
+void showState(const std::string& format) {
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
     std::cout << (format == "json" ? showJson(store) : showText(store));
-    return 0;
 }
 
-int showJournal(std::int64_t after) {
+void showJournal(std::int64_t after) {
     constexpr std::int64_t kAtOnce = 1000;
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
@@ -82,7 +81,6 @@ int showJournal(std::int64_t after) {
         for (const auto& [number, line] : lines) std::cout << number << ' ' << line << '\n';
         after = lines.back().first;
     }
-    return 0;
 }
 
 int checkState() {
@@ -100,16 +98,28 @@ int run(int argc, char** argv) {
     bool force = false;
     Size size{3, 10, 1};
     std::string format = "text";
+    std::int64_t after = 0;
+    int status = 0;
 
     CLI::App* init = app.add_subcommand(
         "init", "Make the demo appliance: four hosts in four states, fourteen partitions.");
+    init->callback([&] { fill(force, fillDemo); });
     CLI::App* generate = app.add_subcommand(
         "generate", "Make an appliance of any size; the same options always make the same one.");
+    generate->callback([&] {
+        Progress progress(size.hosts);
+        fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
+    });
     CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
+    show->callback([&] { showState(format); });
     CLI::App* journal = app.add_subcommand(
         "journal", "Show the journal of changes, each with its number: oldest first.");
-    CLI::App* verify = app.add_subcommand(
-        "check", "Check that the state obeys the rules of hosts, and print those that it breaks.");
+    journal->callback([&] { showJournal(after); });
+    app.add_subcommand("check",
+                       "Check that the state obeys the rules of hosts, and print those that it "
+                       "breaks.")
+        ->callback([&] { status = checkState(); });
+    addFaultCommand(app);
 
     for (CLI::App* maker : {init, generate}) {
         maker->add_flag("--force", force, "Replace an appliance that is there already");
@@ -124,30 +134,17 @@ int run(int argc, char** argv) {
     show->add_option("--format", format, "text, or json with every attribute that was set")
         ->check(CLI::IsMember({"text", "json"}))
         ->capture_default_str();
-    std::int64_t after = 0;
     journal->add_option("--after", after, "Only changes behind the one with this number")
         ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
-    FaultCommand fault(app);
-    for (CLI::App* verb : {init, generate, show, journal, verify, fault.command()})
-        verb->footer(kFooter);
+    for (CLI::App* verb : app.get_subcommands({})) verb->footer(kFooter);
 
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
         return app.exit(error) == 0 ? 0 : kExitUsage;
     }
-
-    if (init->parsed()) fill(force, fillDemo);
-    if (generate->parsed()) {
-        Progress progress(size.hosts);
-        fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
-    }
-    if (show->parsed()) return showState(format);
-    if (journal->parsed()) return showJournal(after);
-    if (verify->parsed()) return checkState();
-    if (fault.isParsed()) return fault.run();
-    return 0;
+    return status;
 }
 
 }  // namespace

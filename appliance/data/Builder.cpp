@@ -1,6 +1,7 @@
 #include "Builder.h"
 
 #include <algorithm>
+#include <sstream>
 
 #include "Adapters.h"
 #include "LparState.h"
@@ -25,20 +26,21 @@ std::string rounded(std::int64_t mem) {
 
 /// Sets "<prefix>min<suffix>" and its like to a share of the plan's resources: a partition and its
 /// profiles name the same quantities differently.
-void setQuantities(Object& object, const LparPlan& plan, const char* desired, const char* prefix) {
-    const std::string p = prefix, d = desired;
+void setQuantities(Object& object, const LparPlan& plan, const std::string& desired,
+                   const std::string& prefix) {
     const std::int64_t procs = (plan.procUnits + 99) / 100;
     const std::int64_t least =
         isDedicated(plan) ? 100 : std::max<std::int64_t>(5, plan.procUnits / 2);
-    object.set(p + "min_mem", rounded(plan.mem / 2));
-    object.set(d + "mem", rounded(plan.mem));
-    object.set(p + "max_mem", rounded(plan.mem * 2));
-    object.set(p + "min_procs", std::to_string((least + 99) / 100));
-    object.set(d + "procs", std::to_string(procs));
-    object.set(p + "max_procs", std::to_string(procs * 2));
-    object.set(p + "min_proc_units", units(least));
-    object.set(d + "proc_units", units(plan.procUnits));
-    object.set(p + "max_proc_units", units(isDedicated(plan) ? procs * 200 : plan.procUnits * 2));
+    const std::int64_t most = isDedicated(plan) ? procs * 200 : plan.procUnits * 2;
+    object.set(prefix + "min_mem", rounded(plan.mem / 2));
+    object.set(desired + "mem", rounded(plan.mem));
+    object.set(prefix + "max_mem", rounded(plan.mem * 2));
+    object.set(prefix + "min_procs", std::to_string((least + 99) / 100));
+    object.set(desired + "procs", std::to_string(procs));
+    object.set(prefix + "max_procs", std::to_string(procs * 2));
+    object.set(prefix + "min_proc_units", units(least));
+    object.set(desired + "proc_units", units(plan.procUnits));
+    object.set(prefix + "max_proc_units", units(most));
 }
 
 /// Sets how processors are shared, under names that begin with @p prefix.
@@ -64,6 +66,13 @@ void setState(Object& lpar, const LparPlan& plan) {
 
 }  // namespace
 
+void set(Object& object, const std::string& settings) {
+    std::istringstream in(settings);
+    for (std::string name, value; std::getline(in, name, '=') && std::getline(in, value, ';');) {
+        object.set(name, value);
+    }
+}
+
 HostBuilder::HostBuilder(Store& store, std::int64_t number, const HostPlan& plan)
     : m_store(store), m_number(number), m_host(Kind::Host, {number}) {
     m_host.set("name", plan.name);
@@ -80,38 +89,30 @@ HostBuilder::HostBuilder(Store& store, std::int64_t number, const HostPlan& plan
     m_host.set("mac_prefix", "A2" + hex(number, 4));
     addLinks(plan);
 
-    Object pool(Kind::ProcPool, {m_number});
-    pool.set("name", "DefaultPool");
-    m_ofHost.push_back(pool);
+    add(Kind::ProcPool, {m_number}).set("name", "DefaultPool");
     if (plan.memPool == 0) return;
-    Object memPool(Kind::MemPool, {m_number});
-    memPool.set("curr_pool_mem", std::to_string(plan.memPool));
-    m_ofHost.push_back(memPool);
+    add(Kind::MemPool, {m_number}).set("curr_pool_mem", std::to_string(plan.memPool));
 }
 
 void HostBuilder::addLinks(const HostPlan& plan) {
     for (std::int64_t i = 0; i < 2; ++i) {
-        Object link(Kind::Link, {m_number, 0, i});
+        Object& link = add(Kind::Link, {m_number, 0, i});
         link.set("sp", i == 0 ? "primary" : "secondary");
         link.set("sp_phys_loc",
                  'U' + plan.typeModel + '.' + plan.serial + "-P1-C" + std::to_string(i + 1));
         link.set("ipaddr", i == 0 ? m_host.get("ipaddr") : "172." + m_host.get("ipaddr").substr(3));
         if (plan.state == "No Connection") {
-            link.set("state", "No Connection");
-            link.set("connection_error_code", "unreachable");
+            set(link, "state=No Connection;connection_error_code=unreachable");
         }
-        m_ofHost.push_back(link);
     }
 }
 
-Object& HostBuilder::addTo(std::int64_t lpar, Kind kind, std::int64_t number) {
-    auto& objects = m_lpars[lpar];
-    objects.emplace_back(kind, Place{m_number, lpar, number});
-    return objects.back();
+Object& HostBuilder::add(Kind kind, const Place& place) {
+    return m_objects[place.lpar].emplace_back(kind, place);
 }
 
 void HostBuilder::add(const LparPlan& plan) {
-    Object& lpar = addTo(plan.id, Kind::Lpar, 0);
+    Object& lpar = add(Kind::Lpar, {m_number, plan.id});
     lpar.set("name", plan.name);
     lpar.set("lpar_env", plan.env);
     lpar.set("default_profile", plan.profile);
@@ -119,7 +120,7 @@ void HostBuilder::add(const LparPlan& plan) {
     setSharing(lpar, plan, "pend_");
     setState(lpar, plan);
 
-    Object& profile = addTo(plan.id, Kind::Profile, 0);
+    Object& profile = add(Kind::Profile, {m_number, plan.id});
     profile.set("name", plan.profile);
     setQuantities(profile, plan, "desired_", "");
     setSharing(profile, plan, "");
@@ -128,113 +129,87 @@ void HostBuilder::add(const LparPlan& plan) {
     addSlots(plan);
 }
 
-void HostBuilder::add(const Object& object) { objectsOf(object.place().lpar).push_back(object); }
-
-std::vector<Object>& HostBuilder::objectsOf(std::int64_t lpar) {
-    return lpar == 0 ? m_ofHost : m_lpars.at(lpar);
-}
-
 Object& HostBuilder::first(Kind kind, std::int64_t lpar) {
-    auto& objects = objectsOf(lpar);
+    std::vector<Object>& objects = m_objects.at(lpar);
     return *std::find_if(objects.begin(), objects.end(),
                          [&](const Object& object) { return object.kind() == kind; });
 }
 
 void HostBuilder::addProfile(std::int64_t lpar, const std::string& name) {
-    const auto& objects = m_lpars.at(lpar);
+    std::vector<Object>& objects = m_objects.at(lpar);
     const auto number = std::count_if(objects.begin(), objects.end(), [](const Object& object) {
         return object.kind() == Kind::Profile;
     });
     Object profile(Kind::Profile, {m_number, lpar, number}, first(Kind::Profile, lpar).stored());
     profile.set("name", name);
-    profile.set("desired_mem", profile.get("min_mem"));
-    profile.set("desired_proc_units", profile.get("min_proc_units"));
-    profile.set("desired_procs", profile.get("min_procs"));
-    m_lpars[lpar].push_back(profile);
+    for (const std::string quantity : {"mem", "proc_units", "procs"}) {
+        profile.set("desired_" + quantity, profile.get("min_" + quantity));
+    }
+    objects.push_back(profile);
 }
 
 void HostBuilder::addAdapters(const LparPlan& plan) {
     const char* state = plan.state == "Not Activated" ? "0" : "1";
     for (std::int64_t console = 0; console < kFirstFreeSlot; ++console) {
-        addTo(plan.id, Kind::Serial, console).set("state", state);
+        add(Kind::Serial, {m_number, plan.id, console}).set("state", state);
     }
-    Object& eth = addTo(plan.id, Kind::Ethernet, kEthernetSlot);
+    Object& eth = add(Kind::Ethernet, {m_number, plan.id, kEthernetSlot});
     eth.set("state", state);
     eth.set("port_vlan_id", std::to_string(1 + plan.id % 4));
     eth.set("mac_addr", m_host.get("mac_prefix") + hex(plan.id, 4) + hex(kEthernetSlot, 2));
     if (plan.env == "xbrgserver") {
         // The bridge carries the networks of all the others.
-        eth.set("ieee_virtual_eth", "1");
-        eth.set("addl_vlan_ids", "10,20,30");
-        eth.set("is_trunk", "1");
+        set(eth, "ieee_virtual_eth=1;addl_vlan_ids=10,20,30;is_trunk=1");
         eth.set("trunk_priority", std::to_string(plan.id));
     }
     if (plan.scsiServer != 0) addScsi(plan);
 }
 
 void HostBuilder::addScsi(const LparPlan& plan) {
+    const std::string id = std::to_string(plan.id);
     const std::int64_t serverSlot = kFirstScsiServerSlot + plan.id;
-    Object& client = addTo(plan.id, Kind::VirtualScsi, kScsiClientSlot);
-    client.set("adapter_type", "client");
-    client.set("remote_lpar_id", std::to_string(plan.scsiServer));
-    client.set("remote_slot_num", std::to_string(serverSlot));
-    client.set("is_required", "1");
-    Object& server = addTo(plan.scsiServer, Kind::VirtualScsi, serverSlot);
-    server.set("adapter_type", "server");
-    server.set("remote_lpar_id", std::to_string(plan.id));
-    server.set("remote_slot_num", std::to_string(kScsiClientSlot));
-    server.set("backing_devices", "disk" + std::to_string(plan.id));
+    set(add(Kind::VirtualScsi, {m_number, plan.id, kScsiClientSlot}),
+        "adapter_type=client;remote_lpar_id=" + std::to_string(plan.scsiServer) +
+            ";remote_slot_num=" + std::to_string(serverSlot) + ";is_required=1");
+    set(add(Kind::VirtualScsi, {m_number, plan.scsiServer, serverSlot}),
+        "adapter_type=server;remote_lpar_id=" + id +
+            ";remote_slot_num=" + std::to_string(kScsiClientSlot) + ";backing_devices=disk" + id);
 }
 
 void HostBuilder::addSlots(const LparPlan& plan) {
     if (plan.env == "tmxlinux") return;
-    std::vector<Object>& objects = m_lpars[plan.id];
     std::vector<std::string>& list = m_slots[plan.id];
-    const std::string drc = addSlot(objects, plan.id, "Storage controller");
+    const std::string drc = addSlot(plan.id, "Storage controller");
     list.push_back(drc + "/none/1");
     if (plan.env == "xbrgserver") {
-        list.push_back(addSlot(objects, plan.id, "PCI 1Gbps Ethernet") + "/none/0");
+        list.push_back(addSlot(plan.id, "PCI 1Gbps Ethernet") + "/none/0");
         return;
     }
-    for (Object& object : objects) {
-        if (object.kind() != Kind::Lpar && object.kind() != Kind::Profile) continue;
-        object.set("load_source_slot", drc);
-        object.set("alt_restart_device_slot", drc);
-        object.set("console_slot", "dnx");
-    }
+    const std::string tags =
+        "load_source_slot=" + drc + ";alt_restart_device_slot=" + drc + ";console_slot=dnx";
+    for (Kind kind : {Kind::Lpar, Kind::Profile}) set(first(kind, plan.id), tags);
 }
 
-std::string HostBuilder::addSlot(std::vector<Object>& into, std::int64_t lpar,
-                                 const char* description) {
+std::string HostBuilder::addSlot(std::int64_t lpar, const char* description) {
+    constexpr std::int64_t kSlotsPerUnit = kSlotsPerBus * kBusesPerUnit;
     const std::int64_t bus = m_slotCount / kSlotsPerBus + 1;
+    const std::int64_t unitIndex = m_slotCount / kSlotsPerUnit;
+    const std::int64_t inUnit = m_slotCount % kSlotsPerUnit + 1;
     const std::string unit =
-        "U2222.00" + std::to_string((bus - 1) / kBusesPerUnit + 1) + '.' + m_host.get("serial_num");
-    if (m_slotCount % (kSlotsPerBus * kBusesPerUnit) == 0) {
-        Object place(Kind::Unit, {m_number, 0, (bus - 1) / kBusesPerUnit});
-        place.set("unit_phys_loc", unit);
-        m_ofHost.push_back(place);
-    }
+        "U2222.00" + std::to_string(unitIndex + 1) + '.' + m_host.get("serial_num");
+    if (inUnit == 1) add(Kind::Unit, {m_number, 0, unitIndex}).set("unit_phys_loc", unit);
     if (m_slotCount % kSlotsPerBus == 0) {
-        Object place(Kind::Bus, {m_number, 0, bus});
-        place.set("unit_phys_loc", unit);
-        m_ofHost.push_back(place);
+        add(Kind::Bus, {m_number, 0, bus}).set("unit_phys_loc", unit);
     }
-    const std::int64_t inUnit = m_slotCount % (kSlotsPerBus * kBusesPerUnit) + 1;
     std::string drc = hex(0x30000000 + ++m_slotCount, 8);
-    Object& slot = into.emplace_back(Kind::Slot, Place{m_number, lpar, m_slotCount});
-    slot.set("unit_phys_loc", unit);
-    slot.set("bus_id", std::to_string(bus));
-    slot.set("phys_loc", unit + "-P1-C" + std::to_string(inUnit));
-    slot.set("drc_index", drc);
+    Object& slot = add(Kind::Slot, {m_number, lpar, m_slotCount});
+    set(slot, "unit_phys_loc=" + unit + ";bus_id=" + std::to_string(bus) + ";phys_loc=" + unit +
+                  "-P1-C" + std::to_string(inUnit) + ";drc_index=" + drc);
     if (description == nullptr) return drc;
     slot.set("description", description);
-    slot.set("feature_codes", "2201,2202");
-    slot.set("pci_vendor_id", "1234");
-    slot.set("pci_device_id", "0101");
-    slot.set("pci_subs_vendor_id", "1234");
-    slot.set("pci_subs_device_id", "0102");
-    slot.set("pci_class", "0104");
-    slot.set("pci_revision_id", "01");
+    set(slot,
+        "feature_codes=2201,2202;pci_vendor_id=1234;pci_device_id=0101;pci_subs_vendor_id=1234;"
+        "pci_subs_device_id=0102;pci_class=0104;pci_revision_id=01");
     return drc;
 }
 
@@ -268,14 +243,15 @@ void HostBuilder::writeLists(std::vector<Object>& objects) {
 
 void HostBuilder::finish() {
     constexpr int kFreeSlots = 2;
-    for (int i = 0; i < kFreeSlots; ++i) addSlot(m_ofHost, 0, nullptr);
+    for (int i = 0; i < kFreeSlots; ++i) addSlot(0, nullptr);
     m_store.put(m_host);
-    for (const Object& object : m_ofHost) m_store.put(object);
     std::vector<std::string> starts;
-    for (auto& [id, objects] : m_lpars) {
-        writeLists(objects);
+    for (auto& [id, objects] : m_objects) {
+        if (id != 0) {
+            writeLists(objects);
+            starts.push_back(std::to_string(id) + "/0");
+        }
         for (const Object& object : objects) m_store.put(object);
-        starts.push_back(std::to_string(id) + "/0");
     }
     if (starts.empty()) return;
     Object all(Kind::SystemProfile, {m_number});

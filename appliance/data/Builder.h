@@ -42,6 +42,9 @@ struct HostPlan {
 constexpr std::int64_t kFirmwareMem = 2048;
 constexpr std::int64_t kMemRegion = 256;
 
+/// Sets the attributes of a text "name=value;name=value".
+void set(Object& object, const std::string& settings);
+
 class HostBuilder {
 public:
     /// @param number  from 1, and one more than that of the host before
@@ -55,29 +58,26 @@ public:
     /// that a partition has, or the host where @p lpar is 0.
     Object& host() { return m_host; }
     Object& first(Kind kind, std::int64_t lpar);
-    /// A further object of the host or of one of its partitions.
-    void add(const Object& object);
+    /// A further object of the host or of one of its partitions, to be filled.
+    Object& add(Kind kind, const Place& place);
 
     /// Writes the host and all that belongs to it.
     void finish();
 
 private:
-    std::vector<Object>& objectsOf(std::int64_t lpar);
-    Object& addTo(std::int64_t lpar, Kind kind, std::int64_t number);
     void addAdapters(const LparPlan& plan);
     void addScsi(const LparPlan& plan);
     void addSlots(const LparPlan& plan);
     /// @param description  null: the slot is empty
     /// @return its DRC index
-    std::string addSlot(std::vector<Object>& into, std::int64_t lpar, const char* description);
+    std::string addSlot(std::int64_t lpar, const char* description);
     void addLinks(const HostPlan& plan);
     void writeLists(std::vector<Object>& objects);
 
     Store& m_store;
     std::int64_t m_number;
     Object m_host;
-    std::vector<Object> m_ofHost;
-    std::map<std::int64_t, std::vector<Object>> m_lpars;       ///< each partition with what it has
+    std::map<std::int64_t, std::vector<Object>> m_objects;     ///< by partition; 0: the host's own
     std::map<std::int64_t, std::vector<std::string>> m_slots;  ///< elements of its slot list
     std::int64_t m_slotCount = 0;
 };

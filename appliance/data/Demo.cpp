@@ -13,10 +13,8 @@ struct DemoHost {
 /// What makes one object of the demo different from its like.
 struct Particular {
     Kind kind;
-    std::int64_t host;
-    std::int64_t lpar;
-    const char* attribute;
-    const char* value;
+    Place place;
+    const char* settings;  ///< as for set()
 };
 
 std::vector<DemoHost> hosts() {
@@ -42,113 +40,60 @@ std::vector<DemoHost> hosts() {
     };
 }
 
+constexpr const char* kTravel =
+    "migration_state=Migration In Progress;migration_type=active;source_sys_name=alpha;"
+    "dest_sys_name=beta lab;source_lpar_id=7;dest_lpar_id=2;source_msp_name=xbrg1;source_msp_id=1;"
+    "dest_msp_name=xbrg;dest_msp_id=1;bytes_transmitted=1073741824;bytes_remaining=1073741824";
+
+/// Of partitions, their first profiles and the memory pool.
 constexpr Particular kParticulars[] = {
-    {Kind::Lpar, 1, 2, "auto_start", "1"},
-    {Kind::Lpar, 1, 3, "mem_mode", "shared"},
-    {Kind::Lpar, 1, 3, "pend_mem_weight", "128"},
-    {Kind::Lpar, 1, 3, "pend_io_entitled_mem", "256"},
-    {Kind::Lpar, 1, 3, "primary_psp_id", "1"},
-    {Kind::Lpar, 1, 3, "secondary_psp_id", "2"},
-    {Kind::Profile, 1, 3, "mem_mode", "shared"},
-    {Kind::Profile, 1, 3, "mem_weight", "128"},
-    {Kind::Profile, 1, 3, "desired_io_entitled_mem", "auto"},
-    {Kind::Profile, 1, 3, "primary_psp_id", "1"},
-    {Kind::Profile, 1, 3, "secondary_psp_id", "2"},
-    {Kind::Profile, 1, 3, "conn_monitoring", "1"},
-    {Kind::Lpar, 1, 3, "refcode", "A1000042"},
-    {Kind::Lpar, 1, 3, "refcode_time", "11/02/2024 07:30:05"},
-    {Kind::Lpar, 1, 3, "fru_call_out_loc_codes", "U2222.001.0000001-P1-C1"},
-    {Kind::Lpar, 1, 3, "hsl_pool_id", "0"},
-    {Kind::Lpar, 1, 4, "hsl_pool_id", "0"},
-    {Kind::Profile, 1, 3, "hsl_pool_id", "0"},
-    {Kind::Profile, 1, 4, "hsl_pool_id", "0"},
-    {Kind::Lpar, 1, 4, "boot_mode", "sms"},
-    {Kind::Profile, 1, 4, "boot_mode", "sms"},
-    {Kind::Profile, 1, 2, "auto_start", "1"},
-    {Kind::Profile, 1, 4, "lpar_proc_compat_mode", "CORAL6+"},
-    {Kind::Lpar, 1, 4, "lpar_keylock", "manual"},
-    {Kind::Lpar, 1, 4, "desired_lpar_proc_compat_mode", "CORAL6+"},
-    {Kind::Lpar, 1, 4, "curr_lpar_proc_compat_mode", "CORAL6+"},
-    {Kind::Lpar, 1, 5, "suspend_capable", "1"},
-    {Kind::Lpar, 1, 5, "remote_restart_capable", "1"},
-    {Kind::Lpar, 1, 5, "remote_restart_status", "Ready"},
-    {Kind::Lpar, 1, 6, "virtual_opti_pool_id", "0"},
-    {Kind::Profile, 1, 6, "virtual_opti_pool_id", "0"},
-    {Kind::Lpar, 1, 6, "power_ctrl_lpar_ids", "1,2"},
-    {Kind::Lpar, 1, 6, "work_group_id", "1"},
-    {Kind::Lpar, 1, 7, "migration_state", "Migration In Progress"},
-    {Kind::Lpar, 1, 7, "migration_type", "active"},
-    {Kind::Lpar, 1, 7, "source_sys_name", "alpha"},
-    {Kind::Lpar, 1, 7, "dest_sys_name", "beta lab"},
-    {Kind::Lpar, 1, 7, "source_lpar_id", "7"},
-    {Kind::Lpar, 1, 7, "dest_lpar_id", "2"},
-    {Kind::Lpar, 1, 7, "source_msp_name", "xbrg1"},
-    {Kind::Lpar, 1, 7, "source_msp_id", "1"},
-    {Kind::Lpar, 1, 7, "dest_msp_name", "xbrg"},
-    {Kind::Lpar, 1, 7, "dest_msp_id", "1"},
-    {Kind::Lpar, 1, 7, "bytes_transmitted", "1073741824"},
-    {Kind::Lpar, 1, 7, "bytes_remaining", "1073741824"},
+    {Kind::MemPool, {1}, "psp_ids=1,2"},
+    {Kind::Lpar, {1, 2}, "auto_start=1"},
+    {Kind::Profile, {1, 2}, "auto_start=1"},
+    {Kind::Lpar,
+     {1, 3},
+     "mem_mode=shared;pend_mem_weight=128;pend_io_entitled_mem=256;primary_psp_id=1;"
+     "secondary_psp_id=2;refcode=A1000042;refcode_time=11/02/2024 07:30:05;"
+     "fru_call_out_loc_codes=U2222.001.0000001-P1-C1;hsl_pool_id=0"},
+    {Kind::Profile,
+     {1, 3},
+     "mem_mode=shared;mem_weight=128;desired_io_entitled_mem=auto;primary_psp_id=1;"
+     "secondary_psp_id=2;conn_monitoring=1;hsl_pool_id=0"},
+    {Kind::Lpar,
+     {1, 4},
+     "hsl_pool_id=0;boot_mode=sms;lpar_keylock=manual;desired_lpar_proc_compat_mode=CORAL6+;"
+     "curr_lpar_proc_compat_mode=CORAL6+"},
+    {Kind::Profile, {1, 4}, "hsl_pool_id=0;boot_mode=sms;lpar_proc_compat_mode=CORAL6+"},
+    {Kind::Lpar, {1, 5}, "suspend_capable=1;remote_restart_capable=1;remote_restart_status=Ready"},
+    {Kind::Lpar, {1, 6}, "virtual_opti_pool_id=0;power_ctrl_lpar_ids=1,2;work_group_id=1"},
+    {Kind::Profile, {1, 6}, "virtual_opti_pool_id=0"},
     // The place that is kept for the traveller holds nothing before it arrives.
-    {Kind::Lpar, 2, 2, "migration_state", "Migration In Progress"},
-    {Kind::Lpar, 2, 2, "migration_type", "active"},
-    {Kind::Lpar, 2, 2, "source_sys_name", "alpha"},
-    {Kind::Lpar, 2, 2, "dest_sys_name", "beta lab"},
-    {Kind::Lpar, 2, 2, "source_lpar_id", "7"},
-    {Kind::Lpar, 2, 2, "dest_lpar_id", "2"},
-    {Kind::Lpar, 2, 2, "source_msp_name", "xbrg1"},
-    {Kind::Lpar, 2, 2, "source_msp_id", "1"},
-    {Kind::Lpar, 2, 2, "dest_msp_name", "xbrg"},
-    {Kind::Lpar, 2, 2, "dest_msp_id", "1"},
-    {Kind::Lpar, 2, 2, "bytes_transmitted", "1073741824"},
-    {Kind::Lpar, 2, 2, "bytes_remaining", "1073741824"},
+    {Kind::Lpar, {1, 7}, kTravel},
+    {Kind::Lpar, {2, 2}, kTravel},
     // Never activated: it has no current profile and holds nothing yet.
-    {Kind::Lpar, 3, 2, "resource_config", "0"},
-    {Kind::Lpar, 3, 2, "curr_profile", ""},
-    {Kind::Lpar, 3, 2, "curr_mem", "0"},
-    {Kind::Lpar, 3, 2, "curr_procs", "0"},
-    {Kind::Lpar, 3, 2, "curr_proc_units", "0.0"},
+    {Kind::Lpar,
+     {3, 2},
+     "resource_config=0;curr_profile=;curr_mem=0;curr_procs=0;curr_proc_units=0.0"},
 };
 
-Object named(Kind kind, const Place& place,
-             const std::vector<std::pair<const char*, const char*>>& attributes) {
-    Object object(kind, place);
-    for (const auto& [name, value] : attributes) object.set(name, value);
-    return object;
-}
-
-/// The first host also has one of everything that is rare.
-void addRarities(HostBuilder& host) {
-    host.addProfile(4, "small, \"safe\"");
-    host.first(Kind::MemPool, 0).set("psp_ids", "1,2");
-    host.add(
-        named(Kind::ProcPool, {1, 0, 1}, {{"name", "web, db"}, {"max_pool_proc_units", "8.00"}}));
-    host.add(Object(Kind::HslPool, {1, 0, 0}));
-    host.add(Object(Kind::OptiPool, {1, 0, 0}));
-    host.add(named(Kind::Hca, {1, 4, 1},
-                   {{"adapter_id", "30010001"}, {"phys_loc", "U2222.001.0000001-P1-C9"}}));
-    host.add(named(Kind::Hca, {1, 0, 2},
-                   {{"adapter_id", "30010002"}, {"phys_loc", "U2222.001.0000001-P1-C10"}}));
-    host.add(named(Kind::Sni, {1, 4, 0},
-                   {{"adapter_id", "30020001"}, {"phys_loc", "U2222.001.0000001-P1-C11"}}));
-    host.add(named(Kind::Ethernet, {1, 4, 5},
-                   {{"port_vlan_id", "7"},
-                    {"ieee_virtual_eth", "1"},
-                    {"addl_vlan_ids", "20,30"},
-                    {"mac_addr", "A20001000405"},
-                    {"vswitch", "storage"}}));
-    host.add(named(Kind::Serial, {1, 4, 6},
-                   {{"adapter_type", "client"},
-                    {"supports_dnx", "0"},
-                    {"remote_lpar_id", "2"},
-                    {"remote_slot_num", "7"},
-                    {"is_required", "0"}}));
-    host.add(named(Kind::Serial, {1, 2, 7},
-                   {{"supports_dnx", "0"},
-                    {"remote_lpar_id", "4"},
-                    {"remote_slot_num", "6"},
-                    {"connect_status", "active"},
-                    {"is_required", "0"}}));
-}
+/// One of everything that is rare, on the first host.
+constexpr Particular kRarities[] = {
+    {Kind::ProcPool, {1, 0, 1}, "name=web, db;max_pool_proc_units=8.00"},
+    {Kind::HslPool, {1, 0, 0}, ""},
+    {Kind::OptiPool, {1, 0, 0}, ""},
+    {Kind::Hca, {1, 4, 1}, "adapter_id=30010001;phys_loc=U2222.001.0000001-P1-C9"},
+    {Kind::Hca, {1, 0, 2}, "adapter_id=30010002;phys_loc=U2222.001.0000001-P1-C10"},
+    {Kind::Sni, {1, 4, 0}, "adapter_id=30020001;phys_loc=U2222.001.0000001-P1-C11"},
+    {Kind::Ethernet,
+     {1, 4, 5},
+     "port_vlan_id=7;ieee_virtual_eth=1;addl_vlan_ids=20,30;mac_addr=A20001000405;vswitch=storage"},
+    {Kind::Serial,
+     {1, 4, 6},
+     "adapter_type=client;supports_dnx=0;remote_lpar_id=2;remote_slot_num=7;is_required=0"},
+    {Kind::Serial,
+     {1, 2, 7},
+     "supports_dnx=0;remote_lpar_id=4;remote_slot_num=6;connect_status=active;is_required=0"},
+};
 
 }  // namespace
 
@@ -157,11 +102,15 @@ void fillDemo(Store& store) {
     for (const DemoHost& demo : hosts()) {
         HostBuilder host(store, ++number, demo.plan);
         for (const LparPlan& lpar : demo.lpars) host.add(lpar);
-        if (number == 1) addRarities(host);
+        if (number == 1) host.addProfile(4, "small, \"safe\"");
+        for (const Particular& rarity : kRarities) {
+            if (rarity.place.host == number)
+                set(host.add(rarity.kind, rarity.place), rarity.settings);
+        }
         for (const Particular& particular : kParticulars) {
-            if (particular.host != number) continue;
-            host.first(particular.kind, particular.lpar)
-                .set(particular.attribute, particular.value);
+            const Place& place = particular.place;
+            if (place.host == number)
+                set(host.first(particular.kind, place.lpar), particular.settings);
         }
         host.finish();
     }

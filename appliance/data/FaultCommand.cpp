@@ -4,11 +4,13 @@
 #include <csignal>
 #include <iostream>
 #include <limits>
+#include <memory>
 
 #include "Failure.h"
-#include "Help.h"
+#include "Faults.h"
 #include "Operations.h"
 #include "Text.h"
+#include "Tools.h"
 
 namespace appliance {
 
@@ -19,7 +21,7 @@ std::vector<std::string> names() {
 #define NAME(OPERATION, FAMILY) #OPERATION,
     std::vector<std::string> all = {API_OPERATIONS(NAME, NAME, NAME, NAME)};
 #undef NAME
-    for (const ToolName& tool : toolNames()) all.emplace_back(tool.name);
+    for (const ToolName& tool : kToolNames) all.emplace_back(tool.name);
     std::sort(all.begin(), all.end());
     return all;
 }
@@ -34,47 +36,55 @@ std::string describe(const PlannedFault& fault) {
     return text;
 }
 
-}  // namespace
+struct Options {
+    PlannedFault plan;
+    std::string code;
+    bool clear = false;
+};
 
-FaultCommand::FaultCommand(CLI::App& app)
-    : m_command(app.add_subcommand(
-          "fault",
-          "Let the next calls of a tool (qyplat ...) or of an operation of the management library\n"
-          "(getCecObj ...) go wrong. Without a name: show what is planned.")) {
-    constexpr std::int64_t kMost = std::numeric_limits<std::int32_t>::max();
-    m_command->add_option("name", m_plan.name, "Tool or operation")
-        ->check(CLI::IsMember(names()).description(""));
-    m_command->add_option("--calls", m_plan.calls, "How many calls")
-        ->check(CLI::Range(std::int64_t{1}, kMost))
-        ->capture_default_str();
-    m_command->add_option("--code", m_code,
-                          "Exit status of a tool, or return code of an operation; null lets an "
-                          "operation return no result at all");
-    m_command->add_option("--text", m_plan.text, "What a tool writes to standard error");
-    m_command->add_option("--delay", m_plan.delay, "Milliseconds before anything else")
-        ->check(CLI::Range(std::int64_t{0}, kMost));
-    m_command->add_option("--signal", m_plan.signal, "Number of the signal that ends a tool")
-        ->check(CLI::Range(1, SIGRTMAX));
-    m_command->add_flag("--clear", m_clear, "Forget what is planned");
+void carryOut(Options& options) {
+    PlannedFault& plan = options.plan;
+    if (options.clear) clearFaults();
+    if (plan.name.empty()) {
+        for (const PlannedFault& fault : plannedFaults()) std::cout << describe(fault) << '\n';
+        return;
+    }
+    plan.isNull = options.code == "null";
+    if (!options.code.empty() && !plan.isNull) {
+        const bool isNegative = options.code.front() == '-';
+        std::int64_t code = 0;
+        if (!wholeNumber(options.code.substr(isNegative ? 1 : 0), &code) || code > 255) {
+            throw Failure(Fault::BadOptionValue, {"--code", options.code});
+        }
+        plan.code = static_cast<int>(isNegative ? -code : code);
+    }
+    planFault(plan);
 }
 
-int FaultCommand::run() {
-    if (m_clear) clearFaults();
-    if (m_plan.name.empty()) {
-        for (const PlannedFault& fault : plannedFaults()) std::cout << describe(fault) << '\n';
-        return 0;
-    }
-    m_plan.isNull = m_code == "null";
-    if (!m_code.empty() && !m_plan.isNull) {
-        const bool isNegative = m_code.front() == '-';
-        std::int64_t code = 0;
-        if (!wholeNumber(m_code.substr(isNegative ? 1 : 0), &code) || code > 255) {
-            throw Failure(Fault::BadOptionValue, {"--code", m_code});
-        }
-        m_plan.code = static_cast<int>(isNegative ? -code : code);
-    }
-    planFault(m_plan);
-    return 0;
+}  // namespace
+
+void addFaultCommand(CLI::App& app) {
+    constexpr std::int64_t kMost = std::numeric_limits<std::int32_t>::max();
+    const auto options = std::make_shared<Options>();
+    CLI::App* command = app.add_subcommand(
+        "fault",
+        "Let the next calls of a tool (qyplat ...) or of an operation of the management library\n"
+        "(getCecObj ...) go wrong. Without a name: show what is planned.");
+    command->callback([options] { carryOut(*options); });
+    command->add_option("name", options->plan.name, "Tool or operation")
+        ->check(CLI::IsMember(names()).description(""));
+    command->add_option("--calls", options->plan.calls, "How many calls")
+        ->check(CLI::Range(std::int64_t{1}, kMost))
+        ->capture_default_str();
+    command->add_option("--code", options->code,
+                        "Exit status of a tool, or return code of an operation; null lets an "
+                        "operation return no result at all");
+    command->add_option("--text", options->plan.text, "What a tool writes to standard error");
+    command->add_option("--delay", options->plan.delay, "Milliseconds before anything else")
+        ->check(CLI::Range(std::int64_t{0}, kMost));
+    command->add_option("--signal", options->plan.signal, "Number of the signal that ends a tool")
+        ->check(CLI::Range(1, SIGRTMAX));
+    command->add_flag("--clear", options->clear, "Forget what is planned");
 }
 
 }  // namespace appliance

@@ -1,8 +1,8 @@
+#include <algorithm>
 #include <random>
 
 #include "Appliances.h"
 #include "Builder.h"
-#include "Text.h"
 
 namespace appliance {
 

@@ -16,18 +16,11 @@ using Line = std::vector<std::string>;
 constexpr const char* kColumns[] = {"name",           "lpar_env", "state",
                                     "run_proc_units", "run_mem",  "curr_profile"};
 
-/// Characters of UTF-8 text: all bytes but those that continue one.
-std::size_t width(const std::string& text) {
-    return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), [](char c) {
-        return (static_cast<unsigned char>(c) & 0xC0) != 0x80;
-    }));
-}
-
 std::string table(const std::vector<Line>& lines) {
     std::vector<std::size_t> widths(lines.front().size(), 0);
     for (const Line& line : lines) {
         for (std::size_t i = 0; i < line.size(); ++i) {
-            widths[i] = std::max(widths[i], width(line[i]));
+            widths[i] = std::max(widths[i], characters(line[i]));
         }
     }
     std::string text;
@@ -35,7 +28,7 @@ std::string table(const std::vector<Line>& lines) {
         text += "   ";
         for (std::size_t i = 0; i < line.size(); ++i) {
             text += ' ' + line[i];
-            if (i + 1 < line.size()) text.append(widths[i] - width(line[i]) + 1, ' ');
+            if (i + 1 < line.size()) text.append(widths[i] - characters(line[i]) + 1, ' ');
         }
         text += '\n';
     }

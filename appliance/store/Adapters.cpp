@@ -1,7 +1,6 @@
 #include "Adapters.h"
 
 #include <algorithm>
-#include <cstring>
 #include <iterator>
 #include <map>
 #include <set>
@@ -68,15 +67,18 @@ std::optional<std::vector<std::string>> cut(const std::string& text, char separa
     return parts;
 }
 
+/// Fills the field without name in, if @p element has the form's fields up to there.
 std::string withRemoteName(const AdapterForm& form, const HostView& view, std::string element) {
-    std::vector<std::size_t> slashes;
-    for (std::size_t i = 0; i < element.size(); ++i) {
-        if (element[i] == '/') slashes.push_back(i);
+    std::size_t begin = 0, before = 0;
+    for (std::string_view field : namesIn(form.fields)) {
+        if (field.empty()) {
+            return element.insert(begin, view.lparName(element.substr(before, begin - 1 - before)));
+        }
+        before = begin;
+        begin = element.find('/', begin) + 1;
+        if (begin == 0) break;
     }
-    if (slashes.size() < form.remoteName) return element;
-    const std::size_t id = slashes[form.remoteId - 1] + 1;
-    const std::string name = view.lparName(element.substr(id, slashes[form.remoteId] - id));
-    return element.insert(slashes[form.remoteName - 1] + 1, name);
+    return element;
 }
 
 }  // namespace
@@ -89,9 +91,9 @@ const AdapterForm* adapterForm(Kind kind) {
 
 std::string adapterElement(const AdapterForm& form, const Object& adapter) {
     std::string element;
-    for (const char* const* field = form.fields; *field != nullptr; ++field) {
-        if (field != form.fields) element += '/';
-        if (**field != '\0') element += adapter.get(*field);
+    for (std::string_view field : namesIn(form.fields)) {
+        if (!element.empty()) element += '/';
+        if (!field.empty()) element += adapter.get(field);
     }
     return element;
 }
@@ -100,7 +102,7 @@ std::string adapterList(const std::vector<std::string>& elements) {
     return elements.empty() ? "none" : joined(elements);
 }
 
-std::vector<std::string> elementsOf(const char* key, const std::string& list) {
+std::vector<std::string> elementsOf(const std::string& key, const std::string& list) {
     if (list.empty() || list == "none") return {};
     auto elements = cut(list, ',');
     if (!elements) throw Failure(Fault::BadValue, {key, list});
@@ -136,23 +138,22 @@ bool isWhole(const Object& adapter) {
 
 Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std::string& element) {
     const Failure malformed(Fault::BadValue, {form.list, element});
-    const auto fields = cut(element, '/');
-    std::size_t count = 0;
-    while (form.fields[count] != nullptr) ++count;
+    const auto names = namesIn(form.fields);
+    auto fields = cut(element, '/');
     // Of Ethernet adapters, the switch may be missing, and a MAC address may follow.
     const std::size_t slack = form.kind == Kind::Ethernet ? 1 : 0;
-    if (!fields || fields->size() + slack < count || fields->size() > count + slack) {
+    if (!fields || fields->size() + slack < names.size() || fields->size() > names.size() + slack) {
         throw malformed;
     }
+    fields->resize(names.size());
     const auto slot = adapterValue("slot_num", fields->front());
     if (!slot) throw malformed;
     Object adapter(form.kind, {lpar.host, lpar.lpar, number(*slot)});
-    for (std::size_t i = 1; i < count; ++i) {
-        const std::string name = form.fields[i];
-        if (name.empty()) continue;
-        const auto value = adapterValue(name, i < fields->size() ? (*fields)[i] : "");
+    for (std::size_t i = 1; i < names.size(); ++i) {
+        if (names[i].empty()) continue;
+        const auto value = adapterValue(std::string(names[i]), (*fields)[i]);
         if (!value) throw malformed;
-        adapter.set(name, *value);
+        adapter.set(names[i], *value);
     }
     if (form.kind == Kind::Ethernet) {
         adapter.set("is_trunk", adapter.get("trunk_priority") == "0" ? "0" : "1");
@@ -163,7 +164,7 @@ Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std:
     return adapter;
 }
 
-std::vector<Object> adaptersOf(const Object& profile) {
+std::map<std::int64_t, Object> adaptersOf(const Object& profile) {
     const std::int64_t slots = number(profile.get("max_virtual_slots"));
     std::map<std::int64_t, Object> adapters;
     for (const AdapterForm& form : kAdapterForms) {
@@ -175,10 +176,7 @@ std::vector<Object> adaptersOf(const Object& profile) {
             }
         }
     }
-    std::vector<Object> all;
-    all.reserve(adapters.size());
-    for (auto& [slot, adapter] : adapters) all.push_back(std::move(adapter));
-    return all;
+    return adapters;
 }
 
 VirtualSlot slotOf(const Object& adapter) { return {adapter.place().lpar, adapter.place().number}; }
@@ -222,9 +220,7 @@ std::vector<IoSlot> ioSlotsFromList(const std::string& list) {
         const auto fields = cut(element, '/');
         if (!fields || fields->size() != 3) throw malformed;
         const auto required = adapterValue("is_required", (*fields)[2]);
-        IoSlot slot{(*fields)[0], (*fields)[1], required == "1"};
-        const auto upper = [](char c) { return c >= 'a' && c <= 'f' ? c - 'a' + 'A' : c; };
-        std::transform(slot.drcIndex.begin(), slot.drcIndex.end(), slot.drcIndex.begin(), upper);
+        IoSlot slot{upperHex((*fields)[0]), (*fields)[1], required == "1"};
         if (slot.pool.empty()) slot.pool = "none";
         std::int64_t pool = 0;
         const bool fits =
@@ -244,13 +240,13 @@ std::string ioSlotElement(const IoSlot& slot) {
 
 std::string namedAdapters(const Row& row, const char* key) {
     std::string list = row.self->get(key);
-    const auto* form =
-        std::find_if(std::begin(kAdapterForms), std::end(kAdapterForms),
-                     [&](const AdapterForm& f) { return !std::strcmp(f.list, key); });
-    if (list == "none" || form == std::end(kAdapterForms) || form->remoteId == 0) return list;
+    if (list == "none") return list;
     std::vector<std::string> elements = split(list);
-    for (std::string& element : elements) {
-        element = withRemoteName(*form, *row.view, std::move(element));
+    for (const AdapterForm& form : kAdapterForms) {
+        if (std::string_view(form.list) != key) continue;
+        for (std::string& element : elements) {
+            element = withRemoteName(form, *row.view, std::move(element));
+        }
     }
     return joined(elements);
 }

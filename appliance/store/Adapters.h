@@ -9,6 +9,7 @@
 #ifndef APPLIANCE_ADAPTERS_H
 #define APPLIANCE_ADAPTERS_H
 
+#include <map>
 #include <optional>
 #include <string>
 #include <vector>
@@ -17,36 +18,21 @@
 
 namespace appliance {
 
-/// The kinds of adapters that are in virtual slots.
-constexpr Kind kVirtual[] = {Kind::Ethernet, Kind::VirtualScsi, Kind::Serial};
-
 /// One kind of adapter in lists.
 struct AdapterForm {
     Kind kind;
-    const char* list;        ///< attribute of a profile that holds the list
-    const char* fields[8];   ///< attributes of the adapter, then null; "" is the remote name
-    std::size_t remoteId;    ///< field with the remote partition's ID; 0 when there is none
-    std::size_t remoteName;  ///< field with its name
+    const char* list;    ///< attribute of a profile that holds the list
+    const char* fields;  ///< attributes of the adapter; the one without name is the remote
+                         ///< partition's name, behind its ID
 };
 
 constexpr AdapterForm kAdapterForms[] = {
-    {Kind::Serial,
-     "virtual_serial_adapters",
-     {"slot_num", "adapter_type", "supports_dnx", "remote_lpar_id", "", "remote_slot_num",
-      "is_required"},
-     3,
-     4},
-    {Kind::VirtualScsi,
-     "virtual_scsi_adapters",
-     {"slot_num", "adapter_type", "remote_lpar_id", "", "remote_slot_num", "is_required"},
-     2,
-     3},
-    {Kind::Ethernet,
-     "virtual_eth_adapters",
-     {"slot_num", "ieee_virtual_eth", "port_vlan_id", "addl_vlan_ids", "trunk_priority",
-      "is_required", "vswitch"},
-     0,
-     0},
+    {Kind::Serial, "virtual_serial_adapters",
+     "slot_num,adapter_type,supports_dnx,remote_lpar_id,,remote_slot_num,is_required"},
+    {Kind::VirtualScsi, "virtual_scsi_adapters",
+     "slot_num,adapter_type,remote_lpar_id,,remote_slot_num,is_required"},
+    {Kind::Ethernet, "virtual_eth_adapters",
+     "slot_num,ieee_virtual_eth,port_vlan_id,addl_vlan_ids,trunk_priority,is_required,vswitch"},
 };
 
 /// Null when adapters of @p kind stand in no list.
@@ -60,7 +46,7 @@ std::string adapterList(const std::vector<std::string>& elements);
 
 /// The elements of a list, without their quotes; none for "none" and for an empty list.
 /// @throws Failure BadValue with the attribute @p key: a quote is open at the end
-std::vector<std::string> elementsOf(const char* key, const std::string& list);
+std::vector<std::string> elementsOf(const std::string& key, const std::string& list);
 
 /// The adapter that an element describes, in @p lpar, where its slot is its number; Ethernet
 /// without a MAC address.
@@ -71,7 +57,7 @@ Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std:
 /// addresses.
 /// @throws Failure BadValue with list and element: it is malformed, or its slot is taken by another
 ///         or not below the profile's max_virtual_slots
-std::vector<Object> adaptersOf(const Object& profile);
+std::map<std::int64_t, Object> adaptersOf(const Object& profile);
 
 /// How @p value is stored as the attribute @p name of an adapter; nothing when it cannot be its
 /// value. Empty stands for the usual value.

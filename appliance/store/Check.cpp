@@ -13,12 +13,13 @@ namespace appliance {
 
 namespace {
 
-class Findings {
-public:
-    void setHost(const HostView& view) { m_host = view.host().get("name"); }
+/// The sentences about one host.
+struct Findings {
+    std::string host;
+    std::vector<std::string> texts;
 
     void require(bool holds, const std::string& what) {
-        if (!holds) m_texts.push_back(m_host + ": " + what);
+        if (!holds) texts.push_back(host + ": " + what);
     }
     void require(bool holds, const Object& object, const std::string& what) {
         if (holds) return;
@@ -26,27 +27,15 @@ public:
         require(false, std::string(kindName(object.kind())) + ' ' + std::to_string(place.number) +
                            " of partition " + std::to_string(place.lpar) + ' ' + what);
     }
-    void add(const std::vector<std::string>& texts) {
-        m_texts.insert(m_texts.end(), texts.begin(), texts.end());
-    }
-    std::vector<std::string> take() { return std::move(m_texts); }
-
-private:
-    std::string m_host;
-    std::vector<std::string> m_texts;
 };
 
 using Rule = void (*)(const HostView& view, Findings& findings);
 
-constexpr Kind kOfLpar[] = {Kind::Profile, Kind::Ethernet, Kind::VirtualScsi, Kind::Serial,
-                            Kind::Slot,    Kind::Hca,      Kind::Sni};
-
 void ownersExist(const HostView& view, Findings& findings) {
     for (Kind kind : kOfLpar) {
-        const bool mayBeFree = kind == Kind::Slot || kind == Kind::Hca || kind == Kind::Sni;
         for (const Object& object : view.all(kind)) {
             const std::int64_t lpar = object.place().lpar;
-            findings.require((lpar == 0 && mayBeFree) || view.lpar(lpar) != nullptr, object,
+            findings.require((lpar == 0 && isPhysical(kind)) || view.lpar(lpar) != nullptr, object,
                              "belongs to a partition that does not exist");
         }
     }
@@ -74,19 +63,22 @@ void namesAreUnique(const HostView& view, Findings& findings) {
 }
 
 void capacityHolds(const HostView& view, Findings& findings) {
-    const Row row{&view, &view.host()};
-    for (const char* free : {"curr_avail_sys_mem", "pend_avail_sys_mem"}) {
-        findings.require(number(valueOf(row, free)) >= 0,
-                         std::string("the partitions have more memory than there is: ") + free);
-    }
-    for (const char* free : {"curr_avail_sys_proc_units", "pend_avail_sys_proc_units"}) {
-        findings.require(
-            hundredths(valueOf(row, free)) >= 0,
-            std::string("the partitions have more processors than there are: ") + free);
+    constexpr struct {
+        const char* free;
+        const char* what;
+    } kFree[] = {
+        {"curr_avail_sys_mem", "memory than there is"},
+        {"pend_avail_sys_mem", "memory than there is"},
+        {"curr_avail_sys_proc_units", "processors than there are"},
+        {"pend_avail_sys_proc_units", "processors than there are"},
+    };
+    for (const auto& row : kFree) {
+        findings.require(hundredths(valueOf({&view, &view.host()}, row.free)) >= 0,
+                         std::string("the partitions have more ") + row.what + ": " + row.free);
     }
     for (const Object& pool : view.all(Kind::ProcPool)) {
-        const Row poolRow{&view, &pool};
-        findings.require(hundredths(valueOf(poolRow, "pend_avail_pool_proc_units")) >= 0, pool,
+        const std::string left = valueOf({&view, &pool}, "pend_avail_pool_proc_units");
+        findings.require(hundredths(left) >= 0, pool,
                          "is a pool whose partitions have more processors than it may use");
     }
     findings.require(static_cast<std::int64_t>(view.all(Kind::Lpar).size()) <=
@@ -113,10 +105,8 @@ void quantitiesAreWithinLimits(const HostView& view, Findings& findings) {
         findings.require(region > 0 && number(lpar.get("pend_mem")) % region == 0, lpar,
                          "has memory that is no multiple of the region size");
         const std::string pool = lpar.get("pend_shared_proc_pool_id");
-        bool known = pool == "null" && lpar.get("pend_proc_mode") == "ded";
-        for (const Object& other : view.all(Kind::ProcPool)) {
-            known = known || pool == other.get("shared_proc_pool_id");
-        }
+        const bool known = (pool == "null" && lpar.get("pend_proc_mode") == "ded") ||
+                           view.find(Kind::ProcPool, "shared_proc_pool_id", pool) != nullptr;
         findings.require(known, lpar, "is in a processor pool that does not exist: " + pool);
     }
     for (const Object& profile : view.all(Kind::Profile)) {
@@ -124,20 +114,17 @@ void quantitiesAreWithinLimits(const HostView& view, Findings& findings) {
     }
 }
 
-using VirtualSlots = std::map<VirtualSlot, const Object*>;
-
 void virtualSlotsFit(const HostView& view, Findings& findings) {
-    VirtualSlots slots;
+    std::map<VirtualSlot, const Object*> slots;
     std::set<std::string> macs;
     for (Kind kind : kVirtual) {
         for (const Object& adapter : view.all(kind)) {
-            const Place& place = adapter.place();
-            findings.require(slots.emplace(VirtualSlot{place.lpar, place.number}, &adapter).second,
-                             adapter, "shares its virtual slot with another adapter");
-            const Object* lpar = view.lpar(place.lpar);
-            findings.require(
-                lpar != nullptr && place.number < number(lpar->get("curr_max_virtual_slots")),
-                adapter, "lies behind the partition's last virtual slot");
+            findings.require(slots.emplace(slotOf(adapter), &adapter).second, adapter,
+                             "shares its virtual slot with another adapter");
+            const Object* lpar = view.lpar(adapter.place().lpar);
+            findings.require(lpar != nullptr && adapter.place().number <
+                                                    number(lpar->get("curr_max_virtual_slots")),
+                             adapter, "lies behind the partition's last virtual slot");
             findings.require(kind != Kind::Ethernet || macs.insert(adapter.get("mac_addr")).second,
                              adapter, "has the MAC address of another");
         }
@@ -172,9 +159,9 @@ void activeLparsHaveActiveHosts(const HostView& view, Findings& findings) {
 
 /// A partition that moves and the place that is kept for it must name each other.
 void movesHaveTwoEnds(const HostView& view, Findings& findings) {
-    constexpr const char* kSame[] = {
-        "name",           "migration_state", "migration_type",  "source_sys_name",  "dest_sys_name",
-        "source_lpar_id", "dest_lpar_id",    "bytes_remaining", "bytes_transmitted"};
+    const auto same = namesIn(
+        "name,migration_state,migration_type,source_sys_name,dest_sys_name,source_lpar_id,"
+        "dest_lpar_id,bytes_remaining,bytes_transmitted");
     const std::string name = view.host().get("name");
     for (const Object& lpar : view.all(Kind::Lpar)) {
         if (!isMoving(lpar)) continue;
@@ -185,12 +172,12 @@ void movesHaveTwoEnds(const HostView& view, Findings& findings) {
         const std::optional<Object> other =
             view.lparElsewhere(lpar.get(leaves ? "dest_sys_name" : "source_sys_name"),
                                number(lpar.get(leaves ? "dest_lpar_id" : "source_lpar_id")));
-        findings.require(leaves != arrives && other &&
-                             std::all_of(std::begin(kSame), std::end(kSame),
-                                         [&](const char* attribute) {
-                                             return lpar.get(attribute) == other->get(attribute);
-                                         }),
-                         lpar, "is in a move without another end");
+        const auto agrees = [&](std::string_view attribute) {
+            return lpar.get(attribute) == other->get(attribute);
+        };
+        findings.require(
+            leaves != arrives && other && std::all_of(same.begin(), same.end(), agrees), lpar,
+            "is in a move without another end");
     }
 }
 
@@ -206,23 +193,22 @@ constexpr Rule kRules[] = {ownersExist,
 }  // namespace
 
 std::vector<std::string> check(const HostView& view) {
-    Findings findings;
-    findings.setHost(view);
+    Findings findings{view.host().get("name"), {}};
     for (Rule rule : kRules) rule(view, findings);
-    return findings.take();
+    return findings.texts;
 }
 
 std::vector<std::string> check(Store& store) {
-    Findings findings;
+    std::vector<std::string> all;
     std::set<std::string> names;
     for (const auto& view : allHosts(store)) {
-        findings.setHost(*view);
-        findings.require(
-            names.insert(view->host().get("name")).second && names.insert(view->mtms()).second,
-            "another host has the same name or serial number");
-        findings.add(check(*view));
+        Findings findings{view->host().get("name"), {}};
+        findings.require(names.insert(findings.host).second && names.insert(view->mtms()).second,
+                         "another host has the same name or serial number");
+        for (Rule rule : kRules) rule(*view, findings);
+        all.insert(all.end(), findings.texts.begin(), findings.texts.end());
     }
-    return findings.take();
+    return all;
 }
 
 }  // namespace appliance

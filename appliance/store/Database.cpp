@@ -12,23 +12,16 @@ constexpr int kBusyMilliseconds = 60'000;
 /// 64 MiB, for who fills a large state in one transaction.
 constexpr const char* kLargeCache = "PRAGMA cache_size = -65536";
 
-int openFlags(Database::Access access) {
-    switch (access) {
-        case Database::Access::Read:
-            return SQLITE_OPEN_READONLY;
-        case Database::Access::Write:
-            return SQLITE_OPEN_READWRITE;
-        case Database::Access::Create:
-            break;
-    }
-    return SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE;
-}
+/// By Database::Access.
+constexpr int kOpenFlags[] = {SQLITE_OPEN_READONLY, SQLITE_OPEN_READWRITE,
+                              SQLITE_OPEN_READWRITE | SQLITE_OPEN_CREATE};
 
 }  // namespace
 
 Database::Database(std::string path, Access access) : m_path(std::move(path)) {
     sqlite3* handle = nullptr;
-    const int code = sqlite3_open_v2(m_path.c_str(), &handle, openFlags(access), nullptr);
+    const int code = sqlite3_open_v2(m_path.c_str(), &handle,
+                                     kOpenFlags[static_cast<std::size_t>(access)], nullptr);
     m_handle.reset(handle);
     check(code);
     sqlite3_extended_result_codes(handle, 1);
@@ -55,18 +48,18 @@ void Database::check(int code) const {
     throw Failure(Fault::StateUnusable, {m_path, reason});
 }
 
-Statement::Statement(Database& database, const char* sql) : m_database(database) {
+Statement::Statement(Database& database, const std::string& sql) : m_database(database) {
     sqlite3_stmt* handle = nullptr;
-    const int code = sqlite3_prepare_v2(database.handle(), sql, -1, &handle, nullptr);
+    const int code = sqlite3_prepare_v2(database.handle(), sql.c_str(), -1, &handle, nullptr);
     m_handle.reset(handle);
     database.check(code);
 }
 
-void Statement::bind(int parameter, std::int64_t value) {
+void Statement::set(int parameter, std::int64_t value) {
     m_database.check(sqlite3_bind_int64(m_handle.get(), parameter, value));
 }
 
-void Statement::bind(int parameter, std::string_view value) {
+void Statement::set(int parameter, std::string_view value) {
     m_database.check(sqlite3_bind_text64(m_handle.get(), parameter, value.data(), value.size(),
                                          SQLITE_STATIC, SQLITE_UTF8));
 }

@@ -44,15 +44,19 @@ private:
 /// A prepared statement, to be run any number of times.
 ///
 ///     Statement find(database, "SELECT attributes FROM object WHERE host = ?");
-///     find.bind(1, host);
+///     find.bind(host);
 ///     while (find.step()) use(find.text(0));
 class Statement {
 public:
-    Statement(Database& database, const char* sql);
+    Statement(Database& database, const std::string& sql);
 
-    /// Parameters are numbered from 1. A text must stay as it is until the next reset().
-    void bind(int parameter, std::int64_t value);
-    void bind(int parameter, std::string_view value);
+    /// Gives the parameters these values: numbers, and texts, which must stay as they are until
+    /// the next reset().
+    template <typename... Values>
+    void bind(const Values&... values) {
+        int parameter = 0;
+        (set(++parameter, values), ...);
+    }
 
     /// Whether there is a further row. Behind the last one the statement is reset.
     bool step();
@@ -63,6 +67,9 @@ public:
     std::string text(int column) const;
 
 private:
+    void set(int parameter, std::int64_t value);
+    void set(int parameter, std::string_view value);
+
     struct Finalize {
         void operator()(sqlite3_stmt* handle) const { sqlite3_finalize(handle); }
     };

@@ -10,6 +10,8 @@
 #include <string>
 #include <vector>
 
+#include "FaultTexts.h"
+
 namespace appliance {
 
 enum class Language { English, German };
@@ -18,74 +20,11 @@ enum class Language { English, German };
 /// otherwise English. Texts are UTF-8 whatever character set the locale names.
 Language languageOfEnvironment();
 
-/// What can go wrong. The rows of Failure.cpp stand in this order.
+/// What can go wrong; the number is that of the code.
 enum class Fault {
-    UnknownOption,
-    MissingValue,
-    MissingOption,
-    BadOptionValue,
-    RepeatedOption,
-    UnexpectedArgument,
-    UnknownAttribute,
-    UnknownFilter,
-    BadFilter,
-    UnknownTool,
-    BadValue,
-    BadSetting,
-    RepeatedSetting,
-    MissingSetting,
-    NotAList,
-    NoHome,
-    NoState,
-    StateVersion,
-    StateExists,
-    StateUnusable,
-    StateBusy,
-    Output,
-    NoSingleHostManager,
-    LparNameNotFound,
-    LparIdNotFound,
-    HostNotFound,
-    NotIoServer,
-    LparNotRunning,
-    Unsound,
-    ProfileNotFound,
-    NameTaken,
-    IdTaken,
-    TooManyLpars,
-    NotCapable,
-    OutsideLimits,
-    Disagree,
-    NotEnough,
-    ElementThere,
-    ElementMissing,
-    SlotNotFound,
-    SlotNotFree,
-    SlotNotHeld,
-    VirtualSlotNotFree,
-    AdapterNotFound,
-    Required,
-    InUse,
-    HostState,
-    LparState,
-    LparMoving,
-    NoResources,
-    NoSuchSystemProfile,
-    NoPool,
-    NoServerAdapter,
-    LparsActive,
-    NotSuspendable,
-    NoSuspension,
-    LparStays,
-    PhysicalAdapters,
-    JoinedAdapters,
-    NotMovable,
-    TooManyMoves,
-    NoMover,
-    NoServerSlot,
-    NotMoving,
-    MoveStopped,
-    OtherManager,
+#define NUMBER(NAME, CODE, ENGLISH, GERMAN) NAME = (CODE),
+    APPLIANCE_FAULTS(NUMBER)
+#undef NUMBER
 };
 
 /// How a program ends: 0 when the request was met, otherwise one of these.
@@ -112,6 +51,12 @@ private:
     std::vector<std::string> m_words;
     std::string m_english;
 };
+
+/// @param words  are made whether or not they are needed
+/// @throws Failure @p wrong is true
+inline void refuseIf(bool wrong, Fault fault, std::vector<std::string> words = {}) {
+    if (wrong) throw Failure(fault, std::move(words));
+}
 
 }  // namespace appliance
 

@@ -10,6 +10,8 @@
 #include <chrono>
 #include <cstdlib>
 #include <cstring>
+#include <fstream>
+#include <sstream>
 #include <thread>
 
 #include "Failure.h"
@@ -26,16 +28,22 @@ std::string faultsFile() {
     return folder == nullptr || *folder == '\0' ? std::string() : std::string(folder) + "/faults";
 }
 
+enum class Missing { Ignore, Create };
+
 /// The locked file. One line for each plan; its fields have tabs between them.
 class PlanFile {
 public:
-    /// @param flags  O_CREAT or 0
-    explicit PlanFile(int flags) : m_path(faultsFile()) {
-        if (m_path.empty()) return;
-        m_file = open(m_path.c_str(), O_RDWR | O_CLOEXEC | flags, 0666);
-        if (m_file < 0) return;
+    /// @throws Failure NoHome, StateUnusable when it cannot be created
+    explicit PlanFile(Missing missing) : m_path(faultsFile()) {
+        const bool creates = missing == Missing::Create;
+        if (creates && m_path.empty()) throw Failure(Fault::NoHome);
+        m_file = open(m_path.c_str(), O_RDWR | O_CLOEXEC | (creates ? O_CREAT : 0), 0666);
+        if (m_file < 0) {
+            if (creates) throw Failure(Fault::StateUnusable, {m_path, std::strerror(errno)});
+            return;
+        }
         // Tools run as other users too, and count what they take.
-        if ((flags & O_CREAT) != 0) fchmod(m_file, 0666);
+        if (creates) fchmod(m_file, 0666);
         while (flock(m_file, LOCK_EX) != 0 && errno == EINTR) {
         }
     }
@@ -47,11 +55,6 @@ public:
 
     bool isOpen() const { return m_file >= 0; }
 
-    void insist() const {
-        if (m_path.empty()) throw Failure(Fault::NoHome);
-        if (!isOpen()) throw Failure(Fault::StateUnusable, {m_path, std::strerror(errno)});
-    }
-
     Plans read() const;
     bool write(const Plans& plans) const;
 
@@ -61,24 +64,12 @@ private:
 };
 
 Plans PlanFile::read() const {
-    std::string text;
-    char buffer[4096];
-    for (ssize_t n = 0;
-         (n = pread(m_file, buffer, sizeof buffer, static_cast<off_t>(text.size()))) > 0;) {
-        text.append(buffer, static_cast<std::size_t>(n));
-    }
     Plans plans;
-    for (std::size_t begin = 0, end = 0; (end = text.find('\n', begin)) != std::string::npos;
-         begin = end + 1) {
-        std::vector<std::string> fields(1);
-        for (char c : text.substr(begin, end - begin)) {
-            if (c == '\t') {
-                fields.emplace_back();
-            } else {
-                fields.back() += c;
-            }
-        }
-        fields.resize(6);
+    std::ifstream lines(m_path);
+    for (std::string line; std::getline(lines, line) && !lines.eof();) {
+        std::istringstream in(line);
+        std::string fields[6];
+        for (std::string& field : fields) std::getline(in, field, '\t');
         PlannedFault fault;
         fault.name = fields[0];
         fault.calls = number(fields[1]);
@@ -93,15 +84,14 @@ Plans PlanFile::read() const {
 }
 
 bool PlanFile::write(const Plans& plans) const {
-    std::string text;
+    std::ostringstream lines;
     for (const PlannedFault& fault : plans) {
-        const std::string code = fault.isNull ? "null"
-                                 : fault.code ? std::to_string(*fault.code)
-                                              : std::string();
-        text += fault.name + '\t' + std::to_string(fault.calls) + '\t' +
-                std::to_string(fault.delay) + '\t' + code + '\t' + std::to_string(fault.signal) +
-                '\t' + fault.text + '\n';
+        const std::string code = fault.code ? std::to_string(*fault.code) : "";
+        lines << fault.name << '\t' << fault.calls << '\t' << fault.delay << '\t'
+              << (fault.isNull ? "null" : code) << '\t' << fault.signal << '\t' << fault.text
+              << '\n';
     }
+    const std::string text = lines.str();
     return pwrite(m_file, text.data(), text.size(), 0) == static_cast<ssize_t>(text.size()) &&
            ftruncate(m_file, static_cast<off_t>(text.size())) == 0;
 }
@@ -123,32 +113,19 @@ void planFault(const PlannedFault& fault) {
             throw Failure(Fault::BadValue, {"fault", *value});
         }
     }
-    const PlanFile file(O_CREAT);
-    file.insist();
+    const PlanFile file(Missing::Create);
     Plans plans = file.read();
     const auto planned = find(plans, fault.name);
-    if (planned == plans.end()) {
-        plans.push_back(fault);
-    } else {
-        *planned = fault;
-    }
+    *(planned == plans.end() ? plans.emplace(planned) : planned) = fault;
     change(file, plans);
 }
 
-std::vector<PlannedFault> plannedFaults() {
-    const PlanFile file(O_CREAT);
-    file.insist();
-    return file.read();
-}
+std::vector<PlannedFault> plannedFaults() { return PlanFile(Missing::Create).read(); }
 
-void clearFaults() {
-    const PlanFile file(O_CREAT);
-    file.insist();
-    change(file, {});
-}
+void clearFaults() { change(PlanFile(Missing::Create), {}); }
 
 std::optional<PlannedFault> takeFault(const std::string& name) {
-    const PlanFile file(0);
+    const PlanFile file(Missing::Ignore);
     if (!file.isOpen()) return {};
     Plans plans = file.read();
     const auto planned = find(plans, name);

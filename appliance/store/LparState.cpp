@@ -1,29 +1,22 @@
 #include "LparState.h"
 
-#include <initializer_list>
+#include "Text.h"
 
 namespace appliance {
 
 namespace {
 
-constexpr const char* kQuantities[] = {"mem",        "min_mem",      "mem_weight",     "procs",
-                                       "proc_units", "uncap_weight", "io_entitled_mem"};
-
-bool isOneOf(const std::string& word, std::initializer_list<const char*> words) {
-    for (const char* other : words) {
-        if (word == other) return true;
-    }
-    return false;
-}
+constexpr const char* kQuantities =
+    "mem,min_mem,mem_weight,procs,proc_units,uncap_weight,io_entitled_mem";
 
 }  // namespace
 
 bool isActive(const Object& lpar) {
-    return !isOneOf(lpar.get("state"), {"Not Activated", "Suspended", "Not Available"});
+    return !isListed("Not Activated,Suspended,Not Available", lpar.get("state"));
 }
 
 bool isMoving(const Object& lpar) {
-    return !isOneOf(lpar.get("migration_state"), {"Not Migrating", "Migration Complete"});
+    return !isListed("Not Migrating,Migration Complete", lpar.get("migration_state"));
 }
 
 const char* osVersion(const std::string& env) {
@@ -32,7 +25,7 @@ const char* osVersion(const std::string& env) {
 
 void setActive(Object& lpar, const char* state) {
     lpar.set("state", state);
-    for (const std::string quantity : kQuantities) {
+    for (const std::string& quantity : split(kQuantities)) {
         lpar.set("run_" + quantity, lpar.get("curr_" + quantity));
     }
     lpar.set("os_version", osVersion(lpar.get("lpar_env")));
@@ -40,7 +33,7 @@ void setActive(Object& lpar, const char* state) {
 
 void setInactive(Object& lpar, const char* state) {
     lpar.set("state", state);
-    for (const std::string quantity : kQuantities) {
+    for (const std::string& quantity : split(kQuantities)) {
         lpar.set("run_" + quantity, quantity == "proc_units" ? "0.0" : "0");
     }
 }

@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <vector>
 
 namespace appliance {
@@ -35,6 +36,20 @@ enum class Kind {
 };
 constexpr int kKinds = static_cast<int>(Kind::SystemProfile) + 1;
 
+/// The adapters that are in virtual slots.
+constexpr Kind kVirtual[] = {Kind::Ethernet, Kind::VirtualScsi, Kind::Serial};
+
+/// What a host has whether a partition holds it or not.
+constexpr Kind kPhysical[] = {Kind::Slot, Kind::Hca, Kind::Sni};
+
+/// All that belongs to a partition.
+constexpr Kind kOfLpar[] = {Kind::Profile, Kind::Ethernet, Kind::VirtualScsi, Kind::Serial,
+                            Kind::Slot,    Kind::Hca,      Kind::Sni};
+
+constexpr bool isPhysical(Kind kind) {
+    return kind == Kind::Slot || kind == Kind::Hca || kind == Kind::Sni;
+}
+
 /// The word for a kind in the stored state.
 const char* kindName(Kind kind);
 
@@ -43,6 +58,10 @@ struct Place {
     std::int64_t host = 0;    ///< from 1
     std::int64_t lpar = 0;    ///< ID of the partition; 0 for what is the host's own
     std::int64_t number = 0;  ///< slot number, pool ID ... ; 0 where there is only one
+
+    bool operator<(const Place& other) const {
+        return std::tie(host, lpar, number) < std::tie(other.host, other.lpar, other.number);
+    }
 };
 
 class Object {
@@ -62,8 +81,18 @@ public:
     /// @throws std::logic_error as get()
     void set(std::string_view name, std::string_view value);
 
+    /// As set(), but leaves alone what has the value already, so that what is stored stays short.
+    void update(std::string_view name, std::string_view value) {
+        if (get(name) != value) set(name, value);
+    }
+
     /// Gives the attribute the kind's own value again.
     void unset(std::string_view name);
+
+    /// A copy with the same number for the host and partition of @p place.
+    Object movedTo(const Place& place) const {
+        return {m_kind, {place.host, place.lpar, m_place.number}, m_attributes};
+    }
 
     /// The attributes that were set, as the text to store: a line "name=value" for each, with a
     /// line break before every line and behind the last.

@@ -37,9 +37,13 @@ std::filesystem::path home() {
     return folder;
 }
 
-std::filesystem::path stateFile() { return home() / "appliance.db"; }
-
-std::vector<Object> collect(Statement& query, Kind kind) {
+/// The objects of @p kind for which @p condition holds, whose parameters are @p values.
+template <typename... Values>
+std::vector<Object> select(Database& database, Kind kind, const char* condition,
+                           const Values&... values) {
+    const std::string columns = "SELECT host, lpar, number, attributes FROM object WHERE kind = ? ";
+    Statement query(database, columns + condition + " ORDER BY host, lpar, number");
+    query.bind(kindName(kind), values...);
     std::vector<Object> objects;
     while (query.step()) {
         objects.emplace_back(kind, Place{query.integer(0), query.integer(1), query.integer(2)},
@@ -59,7 +63,7 @@ std::int64_t Store::version() {
 }
 
 Store Store::open(Database::Access access) {
-    const auto file = stateFile();
+    const auto file = home() / "appliance.db";
     std::error_code error;
     if (!std::filesystem::exists(file, error)) {
         if (error) throw Failure(Fault::StateUnusable, {file.string(), error.message()});
@@ -75,7 +79,7 @@ Store Store::open(Database::Access access) {
 }
 
 Store Store::create() {
-    const auto file = stateFile();
+    const auto file = home() / "appliance.db";
     std::error_code error;
     std::filesystem::create_directories(home(), error);
     if (error) throw Failure(Fault::StateUnusable, {home().string(), error.message()});
@@ -96,41 +100,30 @@ void Store::put(const Object& object) {
             "INSERT INTO object(kind, host, lpar, number, attributes) VALUES(?, ?, ?, ?, ?) "
             "ON CONFLICT(kind, host, lpar, number) DO UPDATE SET attributes = excluded.attributes");
     }
-    m_put->bind(1, kindName(object.kind()));
-    m_put->bind(2, object.place().host);
-    m_put->bind(3, object.place().lpar);
-    m_put->bind(4, object.place().number);
-    m_put->bind(5, object.stored());
+    const Place& place = object.place();
+    m_put->bind(kindName(object.kind()), place.host, place.lpar, place.number, object.stored());
     m_put->step();
 }
 
 bool Store::remove(Kind kind, const Place& place) {
     Statement query(*m_database,
                     "DELETE FROM object WHERE kind = ? AND host = ? AND lpar = ? AND number = ?");
-    query.bind(1, kindName(kind));
-    query.bind(2, place.host);
-    query.bind(3, place.lpar);
-    query.bind(4, place.number);
+    query.bind(kindName(kind), place.host, place.lpar, place.number);
     query.step();
     return sqlite3_changes(m_database->handle()) != 0;
 }
 
 std::optional<Object> Store::find(Kind kind, const Place& place) {
-    Statement query(*m_database,
-                    "SELECT host, lpar, number, attributes FROM object WHERE kind = ? "
-                    "AND host = ? AND lpar = ? AND number = ?");
-    query.bind(1, kindName(kind));
-    query.bind(2, place.host);
-    query.bind(3, place.lpar);
-    query.bind(4, place.number);
-    std::vector<Object> found = collect(query, kind);
+    std::vector<Object> found =
+        select(*m_database, kind, "AND host = ? AND lpar = ? AND number = ?", place.host,
+               place.lpar, place.number);
     if (found.empty()) return std::nullopt;
     return std::move(found.front());
 }
 
 void Store::append(const std::string& line) {
     Statement insert(*m_database, "INSERT INTO journal(line) VALUES(?)");
-    insert.bind(1, line);
+    insert.bind(line);
     insert.step();
 }
 
@@ -138,28 +131,16 @@ std::vector<std::pair<std::int64_t, std::string>> Store::journal(std::int64_t af
                                                                  std::int64_t most) {
     Statement query(*m_database,
                     "SELECT number, line FROM journal WHERE number > ? ORDER BY number LIMIT ?");
-    query.bind(1, after);
-    query.bind(2, most);
+    query.bind(after, most);
     std::vector<std::pair<std::int64_t, std::string>> lines;
     while (query.step()) lines.emplace_back(query.integer(0), query.text(1));
     return lines;
 }
 
-std::vector<Object> Store::all(Kind kind) {
-    Statement query(*m_database,
-                    "SELECT host, lpar, number, attributes FROM object WHERE kind = ? "
-                    "ORDER BY host, lpar, number");
-    query.bind(1, kindName(kind));
-    return collect(query, kind);
-}
+std::vector<Object> Store::all(Kind kind) { return select(*m_database, kind, ""); }
 
 std::vector<Object> Store::all(Kind kind, std::int64_t host) {
-    Statement query(*m_database,
-                    "SELECT host, lpar, number, attributes FROM object WHERE kind = ? "
-                    "AND host = ? ORDER BY lpar, number");
-    query.bind(1, kindName(kind));
-    query.bind(2, host);
-    return collect(query, kind);
+    return select(*m_database, kind, "AND host = ?", host);
 }
 
 }  // namespace appliance

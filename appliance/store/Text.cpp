@@ -1,5 +1,6 @@
 #include "Text.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstdio>
 
@@ -60,6 +61,23 @@ std::vector<std::string> split(std::string_view text) {
         if (end == text.size()) return fields;
         begin = end + 1;
     }
+}
+
+std::vector<std::string_view> namesIn(std::string_view list) {
+    std::vector<std::string_view> names;
+    for (std::size_t begin = 0, end = 0; end != list.size(); begin = end + 1) {
+        end = std::min(list.find(',', begin), list.size());
+        names.push_back(list.substr(begin, end - begin));
+    }
+    return names;
+}
+
+bool isListed(std::string_view list, std::string_view word) {
+    for (std::size_t begin = 0, end = 0; end != list.size(); begin = end + 1) {
+        end = std::min(list.find(',', begin), list.size());
+        if (list.substr(begin, end - begin) == word) return true;
+    }
+    return false;
 }
 
 std::int64_t hundredths(std::string_view units) {
@@ -123,6 +141,19 @@ std::string timeText(std::time_t time) {
 std::string hex(std::int64_t value, int width) {
     char text[32];
     std::snprintf(text, sizeof text, "%0*llX", width, static_cast<unsigned long long>(value));
+    return text;
+}
+
+std::size_t characters(std::string_view text) {
+    return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), [](char c) {
+        return (static_cast<unsigned char>(c) & 0xC0) != 0x80;
+    }));
+}
+
+std::string upperHex(std::string text) {
+    for (char& c : text) {
+        if (c >= 'a' && c <= 'f') c = static_cast<char>(c - 'a' + 'A');
+    }
     return text;
 }
 

@@ -31,6 +31,12 @@ bool quotedFieldAt(std::string_view text, std::size_t begin, std::size_t* end);
 /// The content of a quoted field, without its outer quotes and with doubled quotes made single.
 std::string unquoted(std::string_view field);
 
+/// The words of a list without quotes, with commas between them, as parts of @p list.
+std::vector<std::string_view> namesIn(std::string_view list);
+
+/// Whether @p word is one of them.
+bool isListed(std::string_view list, std::string_view word);
+
 /// Processing units in hundredths: "1.25" is 125. What is no number counts as 0.
 std::int64_t hundredths(std::string_view units);
 
@@ -53,6 +59,12 @@ std::string timeText(std::time_t time);
 
 /// printf-style "%0<width>llX" of @p value.
 std::string hex(std::int64_t value, int width);
+
+/// How many characters there are in UTF-8 text: all bytes but those that continue one.
+std::size_t characters(std::string_view text);
+
+/// @p text with its hexadecimal digits in upper case, as DRC indexes are stored.
+std::string upperHex(std::string text);
 
 }  // namespace appliance
 

@@ -1,11 +1,10 @@
 // The attributes that are not stored, and how each is worked out.
 
 #include <algorithm>
-#include <array>
 #include <ctime>
-#include <unordered_map>
 
 #include "Adapters.h"
+#include "AttributeIndex.h"
 #include "LparState.h"
 #include "Text.h"
 #include "View.h"
@@ -18,9 +17,10 @@ namespace {
 using Make = std::string (*)(const Row& row, const char* key);
 
 struct Derived {
-    const char* name;
+    Kinds kinds;
+    const char* names;
     Make make;
-    const char* key = "";
+    const char* key = nullptr;  ///< null: the attribute's own name
 };
 
 std::string noneWhenEmpty(const std::string& value) { return value.empty() ? "none" : value; }
@@ -51,7 +51,7 @@ std::string namesOfIds(const Row& row, const char* key) {
 
 // Members of a pool: the partitions in whose attribute @p key the pool's number stands.
 
-bool isMember(const Row& row, const Object& lpar, const char* key) {
+bool isMember(const Row& row, const Object& lpar, const std::string& key) {
     return lpar.get(key) == std::to_string(row.self->place().number);
 }
 
@@ -112,7 +112,8 @@ std::string slotConfig(const Row& row, const char*) { return kindName(row.self->
 // What a host has, and what of it is free. @p key is the attribute of its partitions that counts,
 // and begins with "curr" or "pend". A value below zero says that they hold more than there is.
 
-bool isPending(const char* key) { return *key == 'p'; }
+/// "curr_" or "pend_".
+std::string when(const char* key) { return {key, 5}; }
 
 template <typename Amount>
 std::int64_t sumOfLpars(const Row& row, Amount amount) {
@@ -146,9 +147,8 @@ std::string availableMem(const Row& row, const char* key) {
     const std::int64_t dedicated = sumOfLpars(row, [&](const Object& lpar) {
         return lpar.get("mem_mode") == "shared" ? 0 : number(lpar.get(key));
     });
-    const char* pool = isPending(key) ? "pend_pool_mem" : "curr_pool_mem";
     return std::to_string(systemMem(row) - hostNumber(row, "sys_firmware_mem") - dedicated -
-                          number(ofMemPool(row, pool)));
+                          number(ofMemPool(row, (when(key) + "pool_mem").c_str())));
 }
 
 std::string availablePoolMem(const Row& row, const char* key) {
@@ -172,10 +172,8 @@ std::string configurableUnits(const Row& row, const char*) { return units(system
 std::string availableUnits(const Row& row, const char* key) {
     std::int64_t free = systemUnits(row);
     free -= sumOfLpars(row, [&](const Object& lpar) { return hundredths(lpar.get(key)); });
-    const char* reserved =
-        isPending(key) ? "pend_reserved_pool_proc_units" : "curr_reserved_pool_proc_units";
     for (const Object& pool : row.view->all(Kind::ProcPool)) {
-        free -= hundredths(pool.get(reserved));
+        free -= hundredths(pool.get(when(key) + "reserved_pool_proc_units"));
     }
     return units(free);
 }
@@ -194,7 +192,7 @@ std::string poolUnits(const Row& row, const char* key) {
 
 std::string availablePoolUnits(const Row& row, const char* key) {
     if (row.self->place().number == 0) return availableUnits(row, key);
-    const char* pool = isPending(key) ? "pend_shared_proc_pool_id" : "curr_shared_proc_pool_id";
+    const std::string pool = when(key) + "shared_proc_pool_id";
     const std::int64_t held = sumOfLpars(row, [&](const Object& lpar) {
         return isMember(row, lpar, pool) ? hundredths(lpar.get(key)) : 0;
     });
@@ -236,151 +234,80 @@ std::string uncappedCycles(const Row& row, const char*) {
     return std::to_string(uncapped ? runningCycles(row) / 10 : 0);
 }
 
-/// Of whatever kind.
-constexpr Derived kAny[] = {
-    {"lpar_id", ofLpar, "lpar_id"},
-    {"lpar_name", ofLpar, "name"},
-    {"lpar_env", ofLpar, "lpar_env"},
-    {"sys_name", ofHost, "name"},
-    {"type_model", ofHost, "type_model"},
-    {"serial_num", ofHost, "serial_num"},
-    {"type_model_serial_num", hostMtms},
-    {"sys_time", hostTime},
-    {"time", sampleTime},
-    {"event_type", constant, "sample"},
-    {"curr_7460_wkl_percent", constant, "0.00"},
-};
+constexpr Kinds kAnyKind = Kinds::all();
 
-constexpr Derived kHost[] = {
-    {"resource_type", constant, "sys"},
-    {"configurable_sys_mem", configurableMem},
-    {"curr_avail_sys_mem", availableMem, "curr_mem"},
-    {"pend_avail_sys_mem", availableMem, "pend_mem"},
-    {"required_min_mem_tmx_linux", requiredMem, "256"},
-    {"required_min_mem_osq00", requiredMem, "512"},
-    {"configurable_sys_proc_units", configurableUnits},
-    {"curr_avail_sys_proc_units", availableUnits, "curr_proc_units"},
-    {"pend_avail_sys_proc_units", availableUnits, "pend_proc_units"},
-    {"configurable_pool_proc_uints", sharedUnits, "curr_proc_units"},  // the protocol's spelling
-    {"pend_pool_mem", ofMemPool, "pend_pool_mem"},
-    {"num_active_migrations_in_progress", migrations, "active"},
-    {"num_inactive_migrations_in_progress", migrations, "inactive"},
-    {"remote_lpar_mobility_capable", constant, "1"},
-    {"curr_avail_7460_wkl_percent", constant, "0.00"},
-    {"refcode_num", constant, "0"},
-};
+constexpr Derived kDerived[] = {
+    {kAnyKind, "lpar_id,lpar_env", ofLpar},
+    {kAnyKind, "lpar_name", ofLpar, "name"},
+    {kAnyKind, "sys_name", ofHost, "name"},
+    {kAnyKind, "type_model,serial_num", ofHost},
+    {kAnyKind, "type_model_serial_num", hostMtms},
+    {kAnyKind, "lpar_key", lparKey},
+    {kAnyKind, "sys_time", hostTime},
+    {kAnyKind, "time", sampleTime},
+    {kAnyKind, "event_type", constant, "sample"},
+    {kAnyKind, "curr_7460_wkl_percent", constant, "0.00"},
 
-constexpr Derived kLink[] = {{"resource_type", constant, "sys"}};
+    {{Kind::Host, Kind::Link}, "resource_type", constant, "sys"},
+    {Kind::Host, "configurable_sys_mem", configurableMem},
+    {Kind::Host, "curr_avail_sys_mem", availableMem, "curr_mem"},
+    {Kind::Host, "pend_avail_sys_mem", availableMem, "pend_mem"},
+    {Kind::Host, "required_min_mem_tmx_linux", requiredMem, "256"},
+    {Kind::Host, "required_min_mem_osq00", requiredMem, "512"},
+    {Kind::Host, "configurable_sys_proc_units", configurableUnits},
+    {Kind::Host, "curr_avail_sys_proc_units", availableUnits, "curr_proc_units"},
+    {Kind::Host, "pend_avail_sys_proc_units", availableUnits, "pend_proc_units"},
+    // The protocol's spelling.
+    {Kind::Host, "configurable_pool_proc_uints", sharedUnits, "curr_proc_units"},
+    {Kind::Host, "pend_pool_mem", ofMemPool},
+    {Kind::Host, "num_active_migrations_in_progress", migrations, "active"},
+    {Kind::Host, "num_inactive_migrations_in_progress", migrations, "inactive"},
+    {Kind::Host, "remote_lpar_mobility_capable", constant, "1"},
+    {Kind::Host, "curr_avail_7460_wkl_percent", constant, "0.00"},
+    {Kind::Host, "refcode_num", constant, "0"},
 
-constexpr Derived kBus[] = {
-    {"backplane_phys_loc", backplane},
-    {"bus_drc_name", backplane},
-    {"bus_drc_index", busDrcIndex},
-};
+    {Kind::Bus, "backplane_phys_loc,bus_drc_name", backplane},
+    {Kind::Bus, "bus_drc_index", busDrcIndex},
+    {Kind::Slot, "drc_name", own, "phys_loc"},
 
-constexpr Derived kSlot[] = {{"drc_name", own, "phys_loc"}};
+    {Kind::ProcPool, "configurable_pool_proc_units", poolUnits, "curr_proc_units"},
+    {Kind::ProcPool, "curr_avail_pool_proc_units", availablePoolUnits, "curr_proc_units"},
+    {Kind::ProcPool, "pend_avail_pool_proc_units", availablePoolUnits, "pend_proc_units"},
+    {Kind::ProcPool, "lpar_names", memberNames, "curr_shared_proc_pool_id"},
+    {Kind::ProcPool, "lpar_ids", memberIds, "curr_shared_proc_pool_id"},
+    {Kind::MemPool, "pend_avail_pool_mem", availablePoolMem, "pend_io_entitled_mem"},
+    {Kind::MemPool, "psp_names", namesOfIds, "psp_ids"},
+    {Kind::HslPool, "lpar_names", memberNames, "hsl_pool_id"},
+    {Kind::HslPool, "lpar_ids", memberIds, "hsl_pool_id"},
+    {Kind::OptiPool, "lpar_names", memberNames, "virtual_opti_pool_id"},
+    {Kind::OptiPool, "lpar_ids", memberIds, "virtual_opti_pool_id"},
 
-constexpr Derived kProcPool[] = {
-    {"configurable_pool_proc_units", poolUnits, "curr_proc_units"},
-    {"curr_avail_pool_proc_units", availablePoolUnits, "curr_proc_units"},
-    {"pend_avail_pool_proc_units", availablePoolUnits, "pend_proc_units"},
-    {"lpar_names", memberNames, "curr_shared_proc_pool_id"},
-    {"lpar_ids", memberIds, "curr_shared_proc_pool_id"},
-};
+    {{Kind::Lpar, Kind::Profile}, "primary_psp_name", namesOfIds, "primary_psp_id"},
+    {{Kind::Lpar, Kind::Profile}, "secondary_psp_name", namesOfIds, "secondary_psp_id"},
+    {Kind::Lpar, "curr_psp_name", namesOfIds, "curr_psp_id"},
+    {Kind::Lpar, "resource_type", constant, "lpar"},
+    {Kind::Lpar, "logical_serial_num", logicalSerial},
+    {Kind::Lpar, "dlpar_capabilities", dynamicCapabilities},
+    {Kind::Lpar, "time_cycles", elapsedCycles},
+    {Kind::Lpar, "entitled_cycles", entitledCycles},
+    {Kind::Lpar, "capped_cycles", cappedCycles},
+    {Kind::Lpar, "uncapped_cycles", uncappedCycles},
+    {Kind::Lpar, "time_stamp", own, "refcode_time"},
+    {Kind::Profile, "virtual_serial_adapters,virtual_scsi_adapters", namedAdapters},
 
-constexpr Derived kMemPool[] = {
-    {"pend_avail_pool_mem", availablePoolMem, "pend_io_entitled_mem"},
-    {"psp_names", namesOfIds, "psp_ids"},
-};
-
-constexpr Derived kHslPool[] = {
-    {"lpar_names", memberNames, "hsl_pool_id"},
-    {"lpar_ids", memberIds, "hsl_pool_id"},
-};
-
-constexpr Derived kOptiPool[] = {
-    {"lpar_names", memberNames, "virtual_opti_pool_id"},
-    {"lpar_ids", memberIds, "virtual_opti_pool_id"},
-};
-
-constexpr Derived kLpar[] = {
-    {"resource_type", constant, "lpar"},
-    {"logical_serial_num", logicalSerial},
-    {"lpar_key", lparKey},
-    {"dlpar_capabilities", dynamicCapabilities},
-    {"primary_psp_name", namesOfIds, "primary_psp_id"},
-    {"secondary_psp_name", namesOfIds, "secondary_psp_id"},
-    {"curr_psp_name", namesOfIds, "curr_psp_id"},
-    {"time_cycles", elapsedCycles},
-    {"entitled_cycles", entitledCycles},
-    {"capped_cycles", cappedCycles},
-    {"uncapped_cycles", uncappedCycles},
-    {"time_stamp", own, "refcode_time"},
-};
-
-constexpr Derived kProfile[] = {
-    {"primary_psp_name", namesOfIds, "primary_psp_id"},
-    {"secondary_psp_name", namesOfIds, "secondary_psp_id"},
-    {"virtual_serial_adapters", namedAdapters, "virtual_serial_adapters"},
-    {"virtual_scsi_adapters", namedAdapters, "virtual_scsi_adapters"},
-};
-
-constexpr Derived kEthernet[] = {
-    {"addl_vlan_ids", ownOrNone, "addl_vlan_ids"},
-    {"config", slotConfig},
-    {"drc_name", virtualDrcName},
-};
-
-/// Virtual SCSI and serial.
-constexpr Derived kJoined[] = {
-    {"remote_lpar_name", nameOfId, "remote_lpar_id"},
-    {"config", slotConfig},
-    {"drc_name", virtualDrcName},
-};
-
-using DerivedMap = std::unordered_map<std::string, const Derived*>;
-
-class DerivedMaps {
-public:
-    DerivedMaps() {
-        for (int i = 0; i < kKinds; ++i) add(static_cast<Kind>(i), kAny);
-        add(Kind::Host, kHost);
-        add(Kind::Link, kLink);
-        add(Kind::Bus, kBus);
-        add(Kind::Slot, kSlot);
-        add(Kind::ProcPool, kProcPool);
-        add(Kind::MemPool, kMemPool);
-        add(Kind::HslPool, kHslPool);
-        add(Kind::OptiPool, kOptiPool);
-        add(Kind::Lpar, kLpar);
-        add(Kind::Profile, kProfile);
-        add(Kind::Ethernet, kEthernet);
-        add(Kind::VirtualScsi, kJoined);
-        add(Kind::Serial, kJoined);
-    }
-
-    /// Null for what is stored.
-    const Derived* find(Kind kind, const std::string& name) const {
-        const DerivedMap& map = m_maps[static_cast<std::size_t>(kind)];
-        const auto found = map.find(name);
-        return found == map.end() ? nullptr : found->second;
-    }
-
-private:
-    template <std::size_t N>
-    void add(Kind kind, const Derived (&rows)[N]) {
-        for (const Derived& row : rows) m_maps[static_cast<std::size_t>(kind)][row.name] = &row;
-    }
-
-    std::array<DerivedMap, kKinds> m_maps;
+    {{Kind::Ethernet, Kind::VirtualScsi, Kind::Serial}, "config", slotConfig},
+    {{Kind::Ethernet, Kind::VirtualScsi, Kind::Serial}, "drc_name", virtualDrcName},
+    {Kind::Ethernet, "addl_vlan_ids", ownOrNone},
+    {{Kind::VirtualScsi, Kind::Serial}, "remote_lpar_name", nameOfId, "remote_lpar_id"},
 };
 
 }  // namespace
 
 std::string valueOf(const Row& row, const std::string& name) {
-    static const DerivedMaps maps;
-    const Derived* derived = maps.find(row.self->kind(), name);
-    return derived != nullptr ? derived->make(row, derived->key) : row.self->get(name);
+    static const AttributeIndex<Derived> index(kDerived);
+    const Derived* derived = index.find(row.self->kind(), name);
+    if (derived == nullptr) return row.self->get(name);
+    return derived->make(row, derived->key == nullptr ? name.c_str() : derived->key);
 }
 
 }  // namespace appliance

@@ -17,17 +17,32 @@ const std::vector<Object>& HostView::all(Kind kind) const {
     return m_objects.emplace(kind, m_store.all(kind, m_host.place().host)).first->second;
 }
 
-const Object* HostView::lpar(std::int64_t id) const {
-    const auto& lpars = all(Kind::Lpar);
-    const auto found = std::lower_bound(
-        lpars.begin(), lpars.end(), id,
-        [](const Object& lpar, std::int64_t wanted) { return lpar.place().lpar < wanted; });
-    return found != lpars.end() && found->place().lpar == id ? &*found : nullptr;
+Objects HostView::all(Kind kind, std::int64_t lpar) const {
+    const std::vector<Object>& objects = all(kind);
+    const auto first = std::lower_bound(
+        objects.begin(), objects.end(), lpar,
+        [](const Object& object, std::int64_t wanted) { return object.place().lpar < wanted; });
+    const auto last = std::find_if(
+        first, objects.end(), [&](const Object& object) { return object.place().lpar != lpar; });
+    const Object* data = objects.data();
+    return {data + (first - objects.begin()), data + (last - objects.begin())};
 }
 
-const Object* HostView::lparNamed(const std::string& name) const {
-    for (const Object& lpar : all(Kind::Lpar)) {
-        if (lpar.get("name") == name) return &lpar;
+const Object* HostView::find(Kind kind, const char* attribute, const std::string& value) const {
+    for (const Object& object : all(kind)) {
+        if (object.get(attribute) == value) return &object;
+    }
+    return nullptr;
+}
+
+const Object* HostView::lpar(std::int64_t id) const {
+    const Objects found = all(Kind::Lpar, id);
+    return found.empty() ? nullptr : found.first;
+}
+
+const Object* HostView::profile(std::int64_t lpar, const std::string& name) const {
+    for (const Object& profile : all(Kind::Profile, lpar)) {
+        if (profile.get("name") == name) return &profile;
     }
     return nullptr;
 }

@@ -19,6 +19,16 @@
 
 namespace appliance {
 
+/// Consecutive objects of a view.
+struct Objects {
+    const Object* first;
+    const Object* last;  ///< behind the last one
+
+    const Object* begin() const { return first; }
+    const Object* end() const { return last; }
+    bool empty() const { return first == last; }
+};
+
 /// One host with what belongs to it. Each kind of object is loaded once, when first asked for, so
 /// all of it is one picture when the store's read transaction is. Belongs to one thread.
 class HostView {
@@ -30,9 +40,13 @@ public:
     std::string mtms() const;
     /// By partition and number; valid as long as the view.
     const std::vector<Object>& all(Kind kind) const;
-    /// Null when the host has no such partition.
+    /// Those of one partition.
+    Objects all(Kind kind, std::int64_t lpar) const;
+    /// The first whose attribute has this value; null when there is none.
+    const Object* find(Kind kind, const char* attribute, const std::string& value) const;
+    /// Null when the host has no such partition, or the partition no such profile.
     const Object* lpar(std::int64_t id) const;
-    const Object* lparNamed(const std::string& name) const;
+    const Object* profile(std::int64_t lpar, const std::string& name) const;
     /// The name of that partition, or the empty text. @p id is an attribute's value, which may be
     /// a word such as "any".
     std::string lparName(const std::string& id) const;

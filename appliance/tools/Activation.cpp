@@ -12,55 +12,24 @@ namespace appliance {
 
 namespace {
 
-constexpr const char* kWholePool = "0";  ///< the pool of all processors that are not dedicated
+// Resources; others are further processor pools.
+constexpr const char* kMemory = "mem";
+constexpr const char* kEntitlement = "io_entitled_mem";
+constexpr const char* kWholePool = "0";  ///< of all processors that are not dedicated
 
-/// What a partition takes over from its profile as it is.
-constexpr struct {
-    const char* lpar;
-    const char* profile;
-} kTaken[] = {
-    {"mem_mode", "mem_mode"},
-    {"pend_mem_weight", "mem_weight"},
-    {"primary_psp_id", "primary_psp_id"},
-    {"secondary_psp_id", "secondary_psp_id"},
-    {"pend_proc_mode", "proc_mode"},
-    {"pend_sharing_mode", "sharing_mode"},
-    {"pend_uncap_weight", "uncap_weight"},
-    {"pend_shared_proc_pool_id", "shared_proc_pool_id"},
-    {"pend_max_virtual_slots", "max_virtual_slots"},
-    {"load_source_slot", "load_source_slot"},
-    {"alt_restart_device_slot", "alt_restart_device_slot"},
-    {"console_slot", "console_slot"},
-    {"alt_console_slot", "alt_console_slot"},
-    {"op_console_slot", "op_console_slot"},
-    {"boot_mode", "boot_mode"},
-    {"auto_start", "auto_start"},
-    {"power_ctrl_lpar_ids", "power_ctrl_lpar_ids"},
-    {"work_group_id", "work_group_id"},
-    {"redundant_err_path_reporting", "redundant_err_path_reporting"},
-    {"electronic_err_reporting", "electronic_err_reporting"},
-    {"desired_lpar_proc_compat_mode", "lpar_proc_compat_mode"},
-    {"hsl_pool_id", "hsl_pool_id"},
-    {"virtual_opti_pool_id", "virtual_opti_pool_id"},
-};
+/// What a partition takes over from its profile, where it stands without "pend_" and "desired_".
+constexpr const char* kTaken =
+    "mem_mode,pend_mem_weight,primary_psp_id,secondary_psp_id,pend_proc_mode,pend_sharing_mode,"
+    "pend_uncap_weight,pend_shared_proc_pool_id,pend_max_virtual_slots,load_source_slot,"
+    "alt_restart_device_slot,console_slot,alt_console_slot,op_console_slot,boot_mode,auto_start,"
+    "power_ctrl_lpar_ids,work_group_id,redundant_err_path_reporting,electronic_err_reporting,"
+    "desired_lpar_proc_compat_mode,hsl_pool_id,virtual_opti_pool_id";
 
 /// What is in effect from the start as it was to be: "curr_" as "pend_".
-constexpr const char* kPending[] = {"min_mem",
-                                    "mem",
-                                    "max_mem",
-                                    "mem_weight",
-                                    "io_entitled_mem",
-                                    "proc_mode",
-                                    "min_procs",
-                                    "procs",
-                                    "max_procs",
-                                    "min_proc_units",
-                                    "proc_units",
-                                    "max_proc_units",
-                                    "sharing_mode",
-                                    "uncap_weight",
-                                    "shared_proc_pool_id",
-                                    "max_virtual_slots"};
+constexpr const char* kPending =
+    "min_mem,mem,max_mem,mem_weight,io_entitled_mem,proc_mode,min_procs,procs,max_procs,"
+    "min_proc_units,proc_units,max_proc_units,sharing_mode,uncap_weight,shared_proc_pool_id,"
+    "max_virtual_slots";
 
 /// As much of what is wanted as there is, in whole steps.
 /// @throws Failure NotEnough
@@ -89,49 +58,46 @@ std::string text(std::int64_t value) { return std::to_string(value); }
 
 Activation::Activation(const HostView& host) : m_host(host) {
     const Row row{&host, &host.host()};
-    m_mem = {number(valueOf(row, "curr_avail_sys_mem")),
-             number(valueOf(row, "pend_avail_sys_mem"))};
+    m_left[kMemory] = {number(valueOf(row, "curr_avail_sys_mem")),
+                       number(valueOf(row, "pend_avail_sys_mem"))};
+    Amount& entitlement = m_left[kEntitlement];
     for (const Object& pool : host.all(Kind::MemPool)) {
-        m_entitled.pend = number(valueOf(rowOf(host, pool), "pend_avail_pool_mem"));
-        m_entitled.curr = m_entitled.pend;
+        entitlement.pend = number(valueOf(rowOf(host, pool), "pend_avail_pool_mem"));
+        entitlement.curr = entitlement.pend;
     }
     for (const Object& pool : host.all(Kind::ProcPool)) {
         const Row poolRow = rowOf(host, pool);
-        m_units[pool.get("shared_proc_pool_id")] = {
+        m_left[pool.get("shared_proc_pool_id")] = {
             hundredths(valueOf(poolRow, "curr_avail_pool_proc_units")),
             hundredths(valueOf(poolRow, "pend_avail_pool_proc_units"))};
     }
     for (Kind kind : kVirtual) {
         for (const Object& adapter : host.all(kind)) {
-            const VirtualSlot slot{adapter.place().lpar, adapter.place().number};
-            m_adapters.emplace(slot, adapter);
-            if (const auto server = serverOf(adapter)) m_clients[*server] = slot;
+            m_adapters.emplace(slotOf(adapter), adapter);
+            if (const auto server = serverOf(adapter)) m_clients[*server] = slotOf(adapter);
         }
     }
     for (const Object& slot : host.all(Kind::Slot)) m_slots.emplace(slot.get("drc_index"), slot);
 }
 
-Activation::Left Activation::memoryOf(const Object& lpar) {
-    if (lpar.get("mem_mode") == "shared") return {0, 0};
-    return {number(lpar.get("curr_mem")), number(lpar.get("pend_mem"))};
+Activation::Amounts Activation::held(const Object& lpar) {
+    Amounts held;
+    if (lpar.get("mem_mode") == "shared") {
+        const std::int64_t entitled = number(lpar.get("pend_io_entitled_mem"));
+        held[kEntitlement] = {entitled, entitled};
+    } else {
+        held[kMemory] = {number(lpar.get("curr_mem")), number(lpar.get("pend_mem"))};
+    }
+    const Amount units{hundredths(lpar.get("curr_proc_units")),
+                       hundredths(lpar.get("pend_proc_units"))};
+    held[lpar.get("curr_shared_proc_pool_id")].curr = units.curr;
+    held[lpar.get("pend_shared_proc_pool_id")].pend = units.pend;
+    held[kWholePool] = units;
+    return held;
 }
 
-Activation::Left Activation::entitlementOf(const Object& lpar) {
-    if (lpar.get("mem_mode") != "shared") return {0, 0};
-    const std::int64_t pend = number(lpar.get("pend_io_entitled_mem"));
-    return {pend, pend};
-}
-
-Activation::Left Activation::unitsOf(const Object& lpar, const std::string& pool) {
-    const auto held = [&](const std::string& when) {
-        const bool counts = pool == kWholePool || lpar.get(when + "_shared_proc_pool_id") == pool;
-        return counts ? hundredths(lpar.get(when + "_proc_units")) : 0;
-    };
-    return {held("curr"), held("pend")};
-}
-
-/// What @p own would have if it gave back what it has.
-std::int64_t Activation::room(const Left& left, const Left& own) {
+std::int64_t Activation::room(const std::string& resource, const Object& lpar) const {
+    const Amount left = m_left.at(resource), own = held(lpar)[resource];
     return std::min(left.curr + own.curr, left.pend + own.pend);
 }
 
@@ -139,7 +105,7 @@ void Activation::setMemory(const Object& before, const Object& profile, Object& 
     const std::int64_t region = number(m_host.host().get("mem_region_size"));
     const std::int64_t wanted = number(profile.get("desired_mem"));
     if (lpar.get("mem_mode") != "shared") {
-        const std::int64_t free = room(m_mem, memoryOf(before));
+        const std::int64_t free = room(kMemory, before);
         const std::int64_t least = wantsAll(profile) ? region : number(profile.get("min_mem"));
         const std::int64_t given =
             granted("pend_avail_sys_mem", free, region, least, wantsAll(profile) ? free : wanted);
@@ -148,12 +114,12 @@ void Activation::setMemory(const Object& before, const Object& profile, Object& 
         lpar.set("auto_io_entitled_mem", "0");
         return;
     }
-    if (m_host.all(Kind::MemPool).empty()) throw Failure(Fault::NoPool, {"mem_mode"});
+    refuseIf(m_host.all(Kind::MemPool).empty(), Fault::NoPool, {"mem_mode"});
     // The appliance's own choice is that of the time before, or else one region.
     const std::string entitled = profile.get("desired_io_entitled_mem");
     std::int64_t share = number(entitled == "auto" ? before.get("pend_io_entitled_mem") : entitled);
     if (entitled == "auto" && share == 0) share = region;
-    granted("pend_avail_pool_mem", room(m_entitled, entitlementOf(before)), 1, share, share);
+    granted("pend_avail_pool_mem", room(kEntitlement, before), 1, share, share);
     setQuantity(lpar, profile, "mem", text(wanted));
     lpar.set("pend_io_entitled_mem", text(share));
     lpar.set("auto_io_entitled_mem", entitled == "auto" ? "1" : "0");
@@ -163,7 +129,7 @@ void Activation::setProcessors(const Object& before, const Object& profile, Obje
     const bool all = wantsAll(profile);
     const auto quantity = [&](const char* name) { return hundredths(profile.get(name)); };
     const char* const attribute = "pend_avail_sys_proc_units";
-    std::int64_t free = room(m_units.at(kWholePool), unitsOf(before, kWholePool));
+    std::int64_t free = room(kWholePool, before);
     if (profile.get("proc_mode") == "ded") {
         const std::int64_t given = granted(attribute, free, 100, all ? 100 : quantity("min_procs"),
                                            all ? free : quantity("desired_procs"));
@@ -174,9 +140,8 @@ void Activation::setProcessors(const Object& before, const Object& profile, Obje
         return;
     }
     const std::string pool = profile.get("shared_proc_pool_id");
-    const auto left = m_units.find(pool);
-    if (left == m_units.end()) throw Failure(Fault::NoPool, {"shared_proc_pool_id"});
-    free = std::min(free, room(left->second, unitsOf(before, pool)));
+    refuseIf(m_left.count(pool) == 0, Fault::NoPool, {"shared_proc_pool_id"});
+    free = std::min(free, room(pool, before));
     // A virtual processor needs its share of units: fewer units may mean fewer processors.
     const std::int64_t share =
         std::max<std::int64_t>(1, hundredths(m_host.host().get("min_proc_units_per_virtual_proc")));
@@ -184,9 +149,7 @@ void Activation::setProcessors(const Object& before, const Object& profile, Obje
                                        all ? free : quantity("desired_proc_units"));
     const std::int64_t procs =
         all ? (given + 99) / 100 : std::min(quantity("desired_procs") / 100, given / share);
-    if (procs * 100 < quantity("min_procs")) {
-        throw Failure(Fault::NotEnough, {attribute, units(free)});
-    }
+    refuseIf(procs * 100 < quantity("min_procs"), Fault::NotEnough, {attribute, units(free)});
     setQuantity(lpar, profile, "procs", text(procs));
     setQuantity(lpar, profile, "proc_units", units(given));
 }
@@ -197,16 +160,15 @@ void Activation::requireServer(const Object& client) const {
     const auto other = m_clients.find(slot);
     const std::int64_t id = client.place().lpar;
     const bool isFree = other == m_clients.end() || other->second.first == id;
-    if (slot.first == id || !isFree || server == m_adapters.end() ||
-        !serves(server->second, client)) {
-        throw Failure(Fault::NoServerAdapter, {text(client.place().number)});
-    }
+    refuseIf(slot.first == id || !isFree || server == m_adapters.end() ||
+                 !serves(server->second, client),
+             Fault::NoServerAdapter, {text(client.place().number)});
 }
 
 std::map<VirtualSlot, Object> Activation::adaptersFor(const Object& lpar,
                                                       const Object& profile) const {
     std::map<VirtualSlot, Object> adapters;
-    for (const Object& wanted : adaptersOf(profile)) {
+    for (const auto& [number, wanted] : adaptersOf(profile)) {
         // What the profile does not say of an adapter that was there before stays: its MAC
         // address, the devices behind it.
         const auto old = m_adapters.find(slotOf(wanted));
@@ -234,9 +196,8 @@ std::map<std::string, Object> Activation::slotsFor(const Object& lpar,
     const std::int64_t id = lpar.place().lpar;
     std::map<std::string, Object> slots;
     const auto give = [&](const Object& slot, std::int64_t owner) -> Object& {
-        const Place place{slot.place().host, owner, slot.place().number};
-        return slots.emplace(slot.get("drc_index"), Object(Kind::Slot, place, slot.stored()))
-            .first->second;
+        const Object given = slot.movedTo({slot.place().host, owner});
+        return slots.emplace(slot.get("drc_index"), given).first->second;
     };
     for (const IoSlot& wanted : ioSlotsFromList(profile.get("io_slots"))) {
         const auto slot = m_slots.find(wanted.drcIndex);
@@ -257,13 +218,11 @@ std::map<std::string, Object> Activation::slotsFor(const Object& lpar,
 }
 
 void Activation::account(const Object& lpar, int sign) {
-    const auto add = [&](Left& left, const Left& held) {
-        left.curr += sign * held.curr;
-        left.pend += sign * held.pend;
-    };
-    add(m_mem, memoryOf(lpar));
-    add(m_entitled, entitlementOf(lpar));
-    for (auto& [pool, left] : m_units) add(left, unitsOf(lpar, pool));
+    Amounts held = Activation::held(lpar);
+    for (auto& [resource, left] : m_left) {
+        left.curr += sign * held[resource].curr;
+        left.pend += sign * held[resource].pend;
+    }
 }
 
 Object Activation::withResources(const Object& before, const Object& profile) const {
@@ -278,11 +237,11 @@ Object Activation::withResources(const Object& before, const Object& profile) co
 void Activation::start(const Object& before, const std::string& profileName,
                        const std::string& bootMode) {
     const std::int64_t id = before.place().lpar;
-    requireState(m_host, {"Operating", "Standby"});
+    requireState(m_host, "Operating,Standby");
     requireStill(before);
-    requireState(before, {"Not Activated"});
-    const Object* profile = profileNamed(m_host, id, profileName);
-    if (profile == nullptr) throw Failure(Fault::ProfileNotFound, {profileName});
+    requireState(before, "Not Activated");
+    const Object* profile = m_host.profile(id, profileName);
+    refuseIf(profile == nullptr, Fault::ProfileNotFound, {profileName});
     Object lpar = withResources(before, *profile);
     std::map<VirtualSlot, Object> adapters = adaptersFor(lpar, *profile);
     std::map<std::string, Object> slots = slotsFor(lpar, *profile);
@@ -291,7 +250,9 @@ void Activation::start(const Object& before, const std::string& profileName,
     const std::int64_t highest = adapters.empty() ? 0 : adapters.rbegin()->first.second;
     lpar.set("pend_max_virtual_slots",
              text(std::max(highest + 1, number(lpar.get("pend_max_virtual_slots")))));
-    for (const std::string name : kPending) lpar.set("curr_" + name, lpar.get("pend_" + name));
+    for (const std::string& name : split(kPending)) {
+        lpar.set("curr_" + name, lpar.get("pend_" + name));
+    }
     const std::string compat = profile->get("lpar_proc_compat_mode");
     const std::string newest = split(m_host.host().get("lpar_proc_compat_modes")).back();
     lpar.set("curr_lpar_proc_compat_mode", compat == "default" ? newest : compat);
@@ -343,25 +304,30 @@ void Activation::apply(Change& change) const {
 }
 
 void enter(Change& change, const HostView& host, std::vector<Object> lpars, const char* state) {
-    std::map<std::int64_t, bool> active;
+    std::vector<Object> adapters;
     for (Object& lpar : lpars) {
         lpar.set("state", state);
-        active[lpar.place().lpar] = isActive(lpar);
-        (isActive(lpar) ? setActive : setInactive)(lpar, state);
-    }
-    for (Kind kind : kVirtual) {
-        for (const Object& adapter : host.all(kind)) {
-            const auto found = active.find(adapter.place().lpar);
-            if (found == active.end()) continue;
-            lpars.push_back(adapter);
-            lpars.back().set("state", found->second ? "1" : "0");
+        const bool runs = isActive(lpar);
+        (runs ? setActive : setInactive)(lpar, state);
+        for (Kind kind : kVirtual) {
+            for (Object adapter : host.all(kind, lpar.place().lpar)) {
+                adapter.set("state", runs ? "1" : "0");
+                adapters.push_back(std::move(adapter));
+            }
         }
     }
     for (const Object& object : lpars) change.put(object);
+    for (const Object& object : adapters) change.put(object);
 }
 
 void takeSettings(const Object& profile, Object& lpar) {
-    for (const auto& row : kTaken) lpar.set(row.lpar, profile.get(row.profile));
+    for (std::string_view name : namesIn(kTaken)) {
+        std::string_view stored = name;
+        for (std::string_view prefix : {"pend_", "desired_"}) {
+            if (name.substr(0, prefix.size()) == prefix) stored.remove_prefix(prefix.size());
+        }
+        lpar.set(name, profile.get(stored));
+    }
 }
 
 void clearRefcode(Object& lpar) {

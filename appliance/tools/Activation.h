@@ -38,16 +38,17 @@ public:
     void apply(Change& change) const;
 
 private:
-    /// What is left of a resource, now and when pending changes are in effect.
-    struct Left {
-        std::int64_t curr;
-        std::int64_t pend;
+    /// Of a resource: now, and when pending changes are in effect.
+    struct Amount {
+        std::int64_t curr = 0;
+        std::int64_t pend = 0;
     };
+    /// Of memory, entitlements to the memory pool's, and of processor pools by their IDs.
+    using Amounts = std::map<std::string, Amount>;
 
-    static std::int64_t room(const Left& left, const Left& own);
-    static Left memoryOf(const Object& lpar);
-    static Left entitlementOf(const Object& lpar);
-    static Left unitsOf(const Object& lpar, const std::string& pool);
+    static Amounts held(const Object& lpar);
+    /// What a partition would have of @p resource if it gave back what it has.
+    std::int64_t room(const std::string& resource, const Object& lpar) const;
     void setMemory(const Object& before, const Object& profile, Object& lpar) const;
     void setProcessors(const Object& before, const Object& profile, Object& lpar) const;
     Object withResources(const Object& before, const Object& profile) const;
@@ -58,9 +59,7 @@ private:
     void account(const Object& lpar, int sign);
 
     const HostView& m_host;
-    Left m_mem{};
-    Left m_entitled{};                    ///< of the memory pool
-    std::map<std::string, Left> m_units;  ///< by ID of the processor pool; "0": all there are
+    Amounts m_left;
     std::map<VirtualSlot, Object> m_adapters;
     std::map<VirtualSlot, VirtualSlot> m_clients;  ///< of server adapters
     std::map<std::string, Object> m_slots;         ///< by DRC index

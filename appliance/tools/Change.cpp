@@ -3,11 +3,12 @@
 #include <algorithm>
 #include <ctime>
 #include <nlohmann/json.hpp>
+#include <set>
 
 #include "Check.h"
 #include "Failure.h"
-#include "Help.h"
 #include "LparState.h"
+#include "Text.h"
 
 namespace appliance {
 
@@ -28,33 +29,26 @@ Json attributes(const Object& object, const std::optional<Object>& other) {
     return json;
 }
 
-std::int64_t needed(const Request& request, const char* option, std::int64_t most) {
-    if (!request.has(option)) throw Failure(Fault::MissingOption, {option});
-    return request.number(option, 1, most, 0);
-}
-
-/// Whether @p state is one of @p states.
-bool isOne(const std::string& state, std::initializer_list<const char*> states) {
-    return std::any_of(states.begin(), states.end(), [&](const char* s) { return state == s; });
-}
-
 }  // namespace
 
-Change::Change(const Request& request)
-    : m_request(request),
-      m_store(Store::open(Database::Access::Write)),
-      m_transaction(m_store.write()),
-      m_host(numberOf(request.value("-m"))) {}
+const HostView& Change::host() {
+    if (!m_session) {
+        m_session = std::make_unique<Session>();
+        m_host = numberOf(m_request.value("-m"));
+    }
+    return view(m_host);
+}
 
 std::int64_t Change::numberOf(const std::string& name) {
-    if (name.empty()) throw Failure(Fault::MissingOption, {"-m"});
-    return hostsNamed(m_store, name, '*').front()->host().place().host;
+    refuseIf(name.empty(), Fault::MissingOption, {"-m"});
+    return hostsNamed(m_session->store, name, '*').front()->host().place().host;
 }
 
 const HostView& Change::view(std::int64_t host) {
-    std::unique_ptr<HostView>& view = m_views[host];
+    std::unique_ptr<HostView>& view = m_session->views[host];
     if (!view) {
-        view = std::make_unique<HostView>(m_store, *m_store.find(Kind::Host, {host, 0, 0}));
+        Store& store = m_session->store;
+        view = std::make_unique<HostView>(store, *store.find(Kind::Host, {host, 0, 0}));
     }
     return *view;
 }
@@ -62,7 +56,7 @@ const HostView& Change::view(std::int64_t host) {
 const HostView& Change::host(const std::string& name) { return view(numberOf(name)); }
 
 bool Change::isHost(const std::string& name) {
-    const Hosts hosts = allHosts(m_store);
+    const Hosts hosts = allHosts(m_session->store);
     return std::any_of(hosts.begin(), hosts.end(), [&](const auto& view) {
         return view->host().get("name") == name || view->mtms() == name;
     });
@@ -70,16 +64,18 @@ bool Change::isHost(const std::string& name) {
 
 Object Change::lpar() {
     constexpr std::int64_t kMost = 65535;
-    const std::int64_t id = needed(m_request, "--id", kMost);
-    std::optional<Object> found = m_store.find(Kind::Lpar, {m_host, id, 0});
-    if (!found) throw Failure(Fault::LparIdNotFound, {m_request.value("--id")});
+    host();
+    refuseIf(!m_request.has("--id"), Fault::MissingOption, {"--id"});
+    const std::int64_t id = m_request.number("--id", 1, kMost, 0);
+    std::optional<Object> found = m_session->store.find(Kind::Lpar, {m_host, id, 0});
+    refuseIf(!found, Fault::LparIdNotFound, {m_request.value("--id")});
     return std::move(*found);
 }
 
 void Change::keep(const Object& object) {
-    const Place& place = object.place();
-    const Key key{object.kind(), place.host, place.lpar, place.number};
-    if (m_before.count(key) == 0) m_before.emplace(key, m_store.find(object.kind(), place));
+    const std::pair key(object.kind(), object.place());
+    if (m_before.count(key) != 0) return;
+    m_before.emplace(key, m_session->store.find(key.first, key.second));
 }
 
 // The object may be one of a view, which goes when the object is no longer used.
@@ -87,36 +83,36 @@ void Change::keep(const Object& object) {
 void Change::put(const Object& object) {
     const std::int64_t host = object.place().host;
     keep(object);
-    m_store.put(object);
-    m_views.erase(host);
+    m_session->store.put(object);
+    m_session->views.erase(host);
 }
 
 void Change::remove(const Object& object) {
     const std::int64_t host = object.place().host;
     keep(object);
-    m_store.remove(object.kind(), object.place());
-    m_views.erase(host);
+    m_session->store.remove(object.kind(), object.place());
+    m_session->views.erase(host);
 }
 
 std::string Change::journalLine() {
     Json objects = Json::array();
     for (const auto& [key, before] : m_before) {
-        const auto& [kind, host, lpar, number] = key;
-        const std::optional<Object> after = m_store.find(kind, {host, lpar, number});
+        const auto& [kind, place] = key;
+        const std::optional<Object> after = m_session->store.find(kind, place);
         if (!before && !after) continue;
         const char* event = !before ? "add" : !after ? "delete" : "modify";
         Json object = {{"event", event},
                        {"kind", kindName(kind)},
-                       {"host", view(host).mtms()},
-                       {"lpar", lpar},
-                       {"number", number}};
+                       {"host", view(place.host).mtms()},
+                       {"lpar", place.lpar},
+                       {"number", place.number}};
         if (before) object["old"] = attributes(*before, after);
         if (after) object["new"] = attributes(*after, before);
         const bool same = before && after && object["new"].empty();
         if (!same) objects.push_back(std::move(object));
     }
     if (objects.empty()) return {};
-    Json line = {{"tool", toolName(m_request.tool())}, {"time", std::time(nullptr)}};
+    Json line = {{"tool", m_request.tool().name}, {"time", std::time(nullptr)}};
     for (const auto& [name, values] : m_notes) {
         for (const auto& [key, value] : values) line[name][key] = value;
     }
@@ -131,7 +127,7 @@ void Change::note(const char* name, std::vector<std::pair<const char*, std::stri
 
 void Change::verify() {
     std::set<std::int64_t> hosts;
-    for (const auto& [key, before] : m_before) hosts.insert(std::get<1>(key));
+    for (const auto& [key, before] : m_before) hosts.insert(key.second.host);
     for (std::int64_t host : hosts) {
         const std::vector<std::string> findings = check(view(host));
         if (!findings.empty()) throw Failure(Fault::Unsound, {findings.front()});
@@ -139,31 +135,31 @@ void Change::verify() {
 }
 
 void Change::commit() {
+    if (!m_session) return;
     verify();
     const std::string line = journalLine();
-    if (!line.empty()) m_store.append(line);
-    m_transaction.commit();
+    if (!line.empty()) m_session->store.append(line);
+    m_session->transaction.commit();
+    m_session.reset();
 }
 
-void requireState(const HostView& host, std::initializer_list<const char*> states) {
+void requireState(const HostView& host, const char* states) {
     const std::string state = host.host().get("state");
-    if (!isOne(state, states)) throw Failure(Fault::HostState, {host.host().get("name"), state});
+    refuseIf(!isListed(states, state), Fault::HostState, {host.host().get("name"), state});
 }
 
 void requireConnection(const HostView& host) {
     const std::string state = host.host().get("state");
-    if (state == "No Connection") {
-        throw Failure(Fault::HostState, {host.host().get("name"), state});
-    }
+    refuseIf(state == "No Connection", Fault::HostState, {host.host().get("name"), state});
 }
 
-void requireState(const Object& lpar, std::initializer_list<const char*> states) {
+void requireState(const Object& lpar, const char* states) {
     const std::string state = lpar.get("state");
-    if (!isOne(state, states)) throw Failure(Fault::LparState, {lpar.get("lpar_id"), state});
+    refuseIf(!isListed(states, state), Fault::LparState, {lpar.get("lpar_id"), state});
 }
 
 void requireStill(const Object& lpar) {
-    if (isMoving(lpar)) throw Failure(Fault::LparMoving, {lpar.get("lpar_id")});
+    refuseIf(isMoving(lpar), Fault::LparMoving, {lpar.get("lpar_id")});
 }
 
 }  // namespace appliance

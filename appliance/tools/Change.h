@@ -19,12 +19,10 @@
 #ifndef APPLIANCE_CHANGE_H
 #define APPLIANCE_CHANGE_H
 
-#include <initializer_list>
 #include <map>
+#include <memory>
 #include <optional>
-#include <set>
 #include <string>
-#include <tuple>
 #include <vector>
 
 #include "Request.h"
@@ -34,23 +32,29 @@ namespace appliance {
 
 class Change {
 public:
-    /// Starts a change of the host that -m names, and waits until no other change is under way.
-    /// @throws Failure MissingOption, HostNotFound, and those of Store::open
-    explicit Change(const Request& request);
+    /// Of the host that -m names. Starts when host() or lpar() is first called, so that what is
+    /// wrong with the command line alone can be judged before, and then waits until no other change
+    /// is under way.
+    explicit Change(const Request& request) : m_request(request) {}
+
+    const Request& request() const { return m_request; }
 
     /// The host that -m names, as it stands now. A view of a host, and what it gives, holds until
     /// something of that host is put or removed.
-    const HostView& host() { return view(m_host); }
+    /// @throws Failure MissingOption, HostNotFound, and those of Store::open
+    const HostView& host();
+    /// The partition that --id names.
+    /// @throws Failure those of host(); MissingOption, BadOptionValue, LparIdNotFound
+    Object lpar();
+
+    // What follows is for a change that has started.
+
     /// Another host, by its name or type and serial number.
     /// @throws Failure HostNotFound
     const HostView& host(const std::string& name);
 
     /// Whether a host is called so, or has this type and serial number.
     bool isHost(const std::string& name);
-
-    /// The partition that --id names.
-    /// @throws Failure MissingOption, BadOptionValue, LparIdNotFound
-    Object lpar();
 
     /// Adds @p object, or replaces the one in its place.
     void put(const Object& object);
@@ -64,34 +68,38 @@ public:
     /// @throws Failure Unsound the change breaks a rule
     void verify();
 
+    /// Ends the change; nothing can be asked of it any more.
     /// @throws Failure Unsound as verify(); StateUnusable, with nothing changed
     void commit();
 
 private:
-    using Key = std::tuple<Kind, std::int64_t, std::int64_t, std::int64_t>;
-
     const HostView& view(std::int64_t host);
     std::int64_t numberOf(const std::string& name);
     /// Keeps what is in the place of @p object before its first change.
     void keep(const Object& object);
     std::string journalLine();
 
+    struct Session {
+        Store store = Store::open(Database::Access::Write);
+        Transaction transaction = store.write();
+        std::map<std::int64_t, std::unique_ptr<HostView>> views = {};
+    };
+
     const Request& m_request;
-    Store m_store;
-    Transaction m_transaction;
-    std::int64_t m_host;
-    std::map<std::int64_t, std::unique_ptr<HostView>> m_views;
-    std::map<Key, std::optional<Object>> m_before;
+    std::unique_ptr<Session> m_session;  ///< while the change is under way
+    std::int64_t m_host = 0;
+    std::map<std::pair<Kind, Place>, std::optional<Object>> m_before;
     std::map<std::string, std::vector<std::pair<const char*, std::string>>> m_notes;
 };
 
-/// @throws Failure HostState the host is in none of @p states
-void requireState(const HostView& host, std::initializer_list<const char*> states);
+/// @param states  with commas between them
+/// @throws Failure HostState the host is in none of them
+void requireState(const HostView& host, const char* states);
 /// @throws Failure HostState what the appliance knows of the host may be out of date
 void requireConnection(const HostView& host);
 
 /// @throws Failure LparState
-void requireState(const Object& lpar, std::initializer_list<const char*> states);
+void requireState(const Object& lpar, const char* states);
 
 /// @throws Failure LparMoving the partition is on its way to another host, or from there
 void requireStill(const Object& lpar);

@@ -21,8 +21,7 @@ bool isNone(const std::string& value) { return value.empty() || value == kNone; 
 
 /// One of the words of @p argument.
 Value words(const HostView&, const std::string& value, const char* argument) {
-    const std::vector<std::string> all = split(argument);
-    return std::find(all.begin(), all.end(), value) == all.end() ? Value() : value;
+    return isListed(argument, value) ? value : Value();
 }
 
 /// A number within the first two of @p argument, or the word behind them.
@@ -72,10 +71,8 @@ Value poolId(const HostView& host, const std::string& value, const char* argumen
 }
 
 Value procPoolNamed(const HostView& host, const std::string& value, const char*) {
-    for (const Object& pool : host.all(Kind::ProcPool)) {
-        if (pool.get("name") == value) return std::to_string(pool.place().number);
-    }
-    return std::nullopt;
+    const Object* pool = host.find(Kind::ProcPool, "name", value);
+    return pool == nullptr ? Value() : std::to_string(pool->place().number);
 }
 
 /// The ID of a partition, of the environment @p argument unless that is empty.
@@ -83,25 +80,20 @@ Value lparId(const HostView& host, const std::string& value, const char* argumen
     if (isNone(value)) return kNone;
     std::int64_t id = 0;
     const Object* lpar = wholeNumber(value, &id) ? host.lpar(id) : nullptr;
-    if (lpar == nullptr || (*argument != '\0' && lpar->get("lpar_env") != argument)) {
-        return std::nullopt;
-    }
-    return std::to_string(id);
+    const bool fits = lpar != nullptr && (*argument == '\0' || lpar->get("lpar_env") == argument);
+    return fits ? std::to_string(id) : Value();
 }
 
 Value lparNamed(const HostView& host, const std::string& value, const char* argument) {
     if (isNone(value)) return kNone;
-    const Object* lpar = host.lparNamed(value);
+    const Object* lpar = host.find(Kind::Lpar, "name", value);
     return lpar == nullptr ? Value() : lparId(host, lpar->get("lpar_id"), argument);
 }
 
 /// A physical slot by its DRC index, a virtual slot by its number, or the word @p argument.
 Value taggedSlot(const HostView& host, const std::string& value, const char* argument) {
     if (isNone(value)) return kNone;
-    if (value == argument) return value;
-    for (const Object& slot : host.all(Kind::Slot)) {
-        if (slot.get("drc_index") == value) return value;
-    }
+    if (value == argument || host.find(Kind::Slot, "drc_index", value) != nullptr) return value;
     return adapterValue("slot_num", value);
 }
 
@@ -121,10 +113,7 @@ Value eachOf(const HostView& host, const std::string& list, const char* argument
 
 Value hca(const HostView& host, const std::string& value, const char*) {
     const std::string id = value.substr(0, value.find('/'));
-    for (const Object& adapter : host.all(Kind::Hca)) {
-        if (adapter.get("adapter_id") == id) return value;
-    }
-    return std::nullopt;
+    return host.find(Kind::Hca, "adapter_id", id) == nullptr ? Value() : value;
 }
 
 Value adapters(const HostView&, const std::string& list, const char* argument) {
@@ -150,7 +139,7 @@ constexpr const char* kConsoles = "virtual_serial_adapters";  ///< in its slots 
 std::string keyOf(const std::string& element) { return element.substr(0, element.find('/')); }
 
 /// @p list with the elements of @p changes added or removed.
-std::string merged(const char* key, Setting::Operator op, const std::string& list,
+std::string merged(const std::string& key, Setting::Operator op, const std::string& list,
                    const std::string& changes) {
     std::vector<std::string> elements = elementsOf(key, list);
     std::set<std::string> keys;
@@ -158,11 +147,11 @@ std::string merged(const char* key, Setting::Operator op, const std::string& lis
     for (const std::string& element : elementsOf(key, changes)) {
         const std::string changed = keyOf(element);
         if (op != Setting::Operator::Remove) {
-            if (!keys.insert(changed).second) throw Failure(Fault::ElementThere, {key, changed});
+            refuseIf(!keys.insert(changed).second, Fault::ElementThere, {key, changed});
             elements.push_back(element);
         } else if (keys.erase(changed) == 0) {
             throw Failure(Fault::ElementMissing, {key, changed});
-        } else if (std::string(key) == kConsoles && (changed == "0" || changed == "1")) {
+        } else if (key == kConsoles && (changed == "0" || changed == "1")) {
             throw Failure(Fault::Required, {changed});
         }
     }
@@ -173,7 +162,7 @@ std::string merged(const char* key, Setting::Operator op, const std::string& lis
 
 const AttributeRule& ruleFor(const AttributeRules& rules, const std::string& name) {
     return *std::find_if(rules.begin(), rules.end(),
-                         [&](const AttributeRule& rule) { return name == rule.name; });
+                         [&](const AttributeRule& rule) { return isListed(rule.names, name); });
 }
 
 constexpr const char* kFlag = "0,1";
@@ -184,114 +173,95 @@ constexpr const char* kIoServer = "xbrgserver";
 const AttributeRules& hostRules() {
     // What the next start takes up is pending until then.
     static const AttributeRules rules = {
-        {"new_name", "name", printable},
-        {"power_off_policy", "power_off_policy", words, kFlag},
-        {"service_lpar_id", "service_lpar_id", lparId},
-        {"service_lpar_name", "service_lpar_id", lparNamed},
-        {"power_on_option", "pend_power_on_option", words, "standby,autostart"},
-        {"power_on_side", "pend_power_on_side", words, "temp,perm"},
-        {"power_on_speed", "pend_power_on_speed", words, "fast,slow"},
-        {"power_on_speed_override", "pend_power_on_speed_override", words, "none,fast,slow"},
-        {"sp_failover_enabled", "sp_failover_enabled", words, kFlag},
+        {"new_name", printable, "", "name"},
+        {"power_off_policy", words, kFlag},
+        {"service_lpar_id", lparId},
+        {"service_lpar_name", lparNamed, "", "service_lpar_id"},
+        {"power_on_option", words, "standby,autostart", "pend_power_on_option"},
+        {"power_on_side", words, "temp,perm", "pend_power_on_side"},
+        {"power_on_speed", words, "fast,slow", "pend_power_on_speed"},
+        {"power_on_speed_override", words, "none,fast,slow", "pend_power_on_speed_override"},
+        {"sp_failover_enabled", words, kFlag},
     };
     return rules;
 }
 
 const AttributeRules& lparRules() {
     static const AttributeRules rules = {
-        {"new_name", "name", printable},
-        {"work_group_id", "work_group_id", numberIn, "1,32,none"},
-        {"default_profile", "default_profile", printable},
-        {"ipl_source", "ipl_source", words, "a,b,c,d"},
-        {"allow_perf_collection", "allow_perf_collection", words, kFlag},
-        {"lpar_avail_priority", "lpar_avail_priority", numberIn, "0,255"},
-        {"electronic_err_reporting", "electronic_err_reporting", words, kFlag},
+        {"new_name", printable, "", "name"},
+        {"work_group_id", numberIn, "1,32,none"},
+        {"default_profile", printable},
+        {"ipl_source", words, "a,b,c,d"},
+        {"allow_perf_collection", words, kFlag},
+        {"lpar_avail_priority", numberIn, "0,255"},
+        {"electronic_err_reporting", words, kFlag},
     };
     return rules;
 }
 
-// NOLINTNEXTLINE(readability-function-size): one table
 const AttributeRules& profileRules() {
     static const AttributeRules rules = {
-        {"min_mem", "min_mem", memory},
-        {"desired_mem", "desired_mem", memory},
-        {"max_mem", "max_mem", memory},
-        {"mem_mode", "mem_mode", words, "ded,shared"},
-        {"mem_weight", "mem_weight", numberIn, "0,255"},
-        {"desired_io_entitled_mem", "desired_io_entitled_mem", numberIn, "0,1073741824,auto"},
-        {"primary_psp_id", "primary_psp_id", lparId, kIoServer},
-        {"primary_psp_name", "primary_psp_id", lparNamed, kIoServer},
-        {"secondary_psp_id", "secondary_psp_id", lparId, kIoServer},
-        {"secondary_psp_name", "secondary_psp_id", lparNamed, kIoServer},
-        {"min_procs", "min_procs", numberIn, "1,1000000"},
-        {"desired_procs", "desired_procs", numberIn, "1,1000000"},
-        {"max_procs", "max_procs", numberIn, "1,1000000"},
-        {"min_proc_units", "min_proc_units", procUnits},
-        {"desired_proc_units", "desired_proc_units", procUnits},
-        {"max_proc_units", "max_proc_units", procUnits},
-        {"proc_mode", "proc_mode", words, "ded,shared"},
-        {"sharing_mode", "sharing_mode", words,
+        {"min_mem,desired_mem,max_mem", memory},
+        {"mem_mode", words, "ded,shared"},
+        {"mem_weight", numberIn, "0,255"},
+        {"desired_io_entitled_mem", numberIn, "0,1073741824,auto"},
+        {"primary_psp_id", lparId, kIoServer},
+        {"primary_psp_name", lparNamed, kIoServer, "primary_psp_id"},
+        {"secondary_psp_id", lparId, kIoServer},
+        {"secondary_psp_name", lparNamed, kIoServer, "secondary_psp_id"},
+        {"min_procs,desired_procs,max_procs", numberIn, "1,1000000"},
+        {"min_proc_units,desired_proc_units,max_proc_units", procUnits},
+        {"proc_mode", words, "ded,shared"},
+        {"sharing_mode", words,
          "cap,uncap,keep_idle_procs,share_idle_procs,share_idle_procs_active,"
          "share_idle_procs_always"},
-        {"uncap_weight", "uncap_weight", numberIn, "0,255"},
-        {"lpar_proc_compat_mode", "lpar_proc_compat_mode", compatMode},
-        {"shared_proc_pool_id", "shared_proc_pool_id", poolId<Kind::ProcPool>, "null"},
-        {"shared_proc_pool_name", "shared_proc_pool_id", procPoolNamed},
-        {"boot_mode", "boot_mode", words, "norm,dd,ds,of,sms"},
-        {"auto_start", "auto_start", words, kFlag},
-        {"max_virtual_slots", "max_virtual_slots", numberIn, "2,65534"},
-        {"virtual_eth_adapters", "virtual_eth_adapters", adapters, "virtual_eth_adapters", true},
-        {"virtual_scsi_adapters", "virtual_scsi_adapters", adapters, "virtual_scsi_adapters", true},
-        {"virtual_serial_adapters", kConsoles, adapters, kConsoles, true},
-        {"io_slots", "io_slots", ioSlots, "", true},
-        {"load_source_slot", "load_source_slot", taggedSlot},
-        {"alt_restart_device_slot", "alt_restart_device_slot", taggedSlot},
-        {"console_slot", "console_slot", taggedSlot, "dnx"},
-        {"alt_console_slot", "alt_console_slot", taggedSlot},
-        {"op_console_slot", "op_console_slot", taggedSlot},
-        {"lpar_io_pool_ids", "lpar_io_pool_ids", eachOf<numberIn>, "0,254", true},
-        {"conn_monitoring", "conn_monitoring", words, kFlag},
-        {"virtual_opti_pool_id", "virtual_opti_pool_id", poolId<Kind::OptiPool>, kNone},
-        {"hsl_pool_id", "hsl_pool_id", poolId<Kind::HslPool>, kNone},
-        {"power_ctrl_lpar_ids", "power_ctrl_lpar_ids", eachOf<lparId>, "", true},
-        {"power_ctrl_lpar_names", "power_ctrl_lpar_ids", eachOf<lparNamed>, "", true},
-        {"hca_adapters", "hca_adapters", eachOf<hca>, "", true},
-        {"work_group_id", "work_group_id", numberIn, "1,32,none"},
-        {"redundant_err_path_reporting", "redundant_err_path_reporting", words, kFlag},
-        {"electronic_err_reporting", "electronic_err_reporting", words, kFlag},
-        {"min_num_huge_pages", nullptr, nothing},
-        {"desired_num_huge_pages", nullptr, nothing},
-        {"max_num_huge_pages", nullptr, nothing},
-        {"bsr_arrays", nullptr, nothing},
-        {"min_7460_wkl_percent", nullptr, nothing},
-        {"desired_7460_wkl_percent", nullptr, nothing},
-        {"max_7460_wkl_percent", nullptr, nothing},
-        {"lhea_logical_ports", nullptr, nothing},
-        {"lhea_capabilities", nullptr, nothing},
-        {"lhea_capabilities ", nullptr, nothing},  // nwplat's callers write the blank
-        {"sni_device_ids", nullptr, nothing},
+        {"uncap_weight", numberIn, "0,255"},
+        {"lpar_proc_compat_mode", compatMode},
+        {"shared_proc_pool_id", poolId<Kind::ProcPool>, "null"},
+        {"shared_proc_pool_name", procPoolNamed, "", "shared_proc_pool_id"},
+        {"boot_mode", words, "norm,dd,ds,of,sms"},
+        {"auto_start", words, kFlag},
+        {"max_virtual_slots", numberIn, "2,65534"},
+        {"virtual_eth_adapters", adapters, "virtual_eth_adapters", nullptr, true},
+        {"virtual_scsi_adapters", adapters, "virtual_scsi_adapters", nullptr, true},
+        {"virtual_serial_adapters", adapters, "virtual_serial_adapters", nullptr, true},
+        {"io_slots", ioSlots, "", nullptr, true},
+        {"load_source_slot,alt_restart_device_slot", taggedSlot},
+        {"console_slot", taggedSlot, "dnx"},
+        {"alt_console_slot,op_console_slot", taggedSlot},
+        {"lpar_io_pool_ids", eachOf<numberIn>, "0,254", nullptr, true},
+        {"conn_monitoring", words, kFlag},
+        {"virtual_opti_pool_id", poolId<Kind::OptiPool>, kNone},
+        {"hsl_pool_id", poolId<Kind::HslPool>, kNone},
+        {"power_ctrl_lpar_ids", eachOf<lparId>, "", nullptr, true},
+        {"power_ctrl_lpar_names", eachOf<lparNamed>, "", "power_ctrl_lpar_ids", true},
+        {"hca_adapters", eachOf<hca>, "", nullptr, true},
+        {"work_group_id", numberIn, "1,32,none"},
+        {"redundant_err_path_reporting,electronic_err_reporting", words, kFlag},
+        // nwplat's callers write the blank behind one of these.
+        {"min_num_huge_pages,desired_num_huge_pages,max_num_huge_pages,bsr_arrays,"
+         "min_7460_wkl_percent,desired_7460_wkl_percent,max_7460_wkl_percent,lhea_logical_ports,"
+         "lhea_capabilities,lhea_capabilities ,sni_device_ids",
+         nothing},
     };
     return rules;
 }
 
-std::string namesOf(const AttributeRules& rules, const std::string& others) {
-    std::string names = others;
-    for (const AttributeRule& rule : rules) names += std::string(",") + rule.name;
-    return names;
+std::string namesOf(const AttributeRules& rules, std::string others) {
+    for (const AttributeRule& rule : rules) others.append(",").append(rule.names);
+    return others.substr(others[0] == ',');
 }
 
 std::string checkedValue(const HostView& host, const AttributeRules& rules,
                          const Setting& setting) {
     const AttributeRule& rule = ruleFor(rules, setting.name);
     const bool replaces = setting.op == Setting::Operator::Set;
-    if (!replaces && !rule.isList) throw Failure(Fault::NotAList, {setting.name});
+    refuseIf(!replaces && !rule.isList, Fault::NotAList, {setting.name});
     // What is removed from a list need not be written in full.
-    if (setting.op == Setting::Operator::Remove && setting.name == rule.stored) {
-        return setting.value;
-    }
+    if (setting.op == Setting::Operator::Remove && rule.stored == nullptr) return setting.value;
     Value value = rule.rule(host, setting.value, rule.argument);
     if (value) return std::move(*value);
-    const Fault fault = rule.stored == nullptr ? Fault::NotCapable : Fault::BadValue;
+    const Fault fault = rule.rule == nothing ? Fault::NotCapable : Fault::BadValue;
     throw Failure(fault, {setting.name, setting.value});
 }
 
@@ -299,26 +269,11 @@ void apply(const HostView& host, const AttributeRules& rules, const Setting& set
            Object& object) {
     const AttributeRule& rule = ruleFor(rules, setting.name);
     const std::string value = checkedValue(host, rules, setting);
-    if (rule.stored == nullptr) return;
-    if (!rule.isList) return object.set(rule.stored, value);
+    if (rule.rule == nothing) return;
+    const std::string name = rule.stored == nullptr ? setting.name : rule.stored;
+    if (!rule.isList) return object.set(name, value);
     const bool replaces = setting.op == Setting::Operator::Set;
-    const std::string before = replaces ? kNone : object.get(rule.stored);
-    object.set(rule.stored, merged(rule.stored, setting.op, before, value));
-}
-
-std::optional<std::string> given(const std::vector<Setting>& settings, const std::string& name) {
-    for (const Setting& setting : settings) {
-        if (setting.name != name) continue;
-        if (setting.op != Setting::Operator::Set) throw Failure(Fault::NotAList, {name});
-        return setting.value;
-    }
-    return std::nullopt;
-}
-
-std::string needed(const std::vector<Setting>& settings, const std::string& name) {
-    Value value = given(settings, name);
-    if (!value) throw Failure(Fault::MissingSetting, {name});
-    return std::move(*value);
+    object.set(name, merged(name, setting.op, replaces ? kNone : object.get(name), value));
 }
 
 bool sharesPool(const std::string& sharingMode) {
@@ -326,18 +281,10 @@ bool sharesPool(const std::string& sharingMode) {
 }
 
 bool isPrintable(const std::string& name) {
-    constexpr std::ptrdiff_t kMost = 47;  // characters, not bytes
+    constexpr std::size_t kMost = 47;
     const auto isControl = [](char c) { return static_cast<unsigned char>(c) < ' ' || c == 127; };
-    const auto begins = [](char c) { return (static_cast<unsigned char>(c) & 0xC0) != 0x80; };
     return !name.empty() && std::none_of(name.begin(), name.end(), isControl) &&
-           std::count_if(name.begin(), name.end(), begins) <= kMost;
-}
-
-const Object* profileNamed(const HostView& host, std::int64_t lpar, const std::string& name) {
-    for (const Object& profile : host.all(Kind::Profile)) {
-        if (profile.place().lpar == lpar && profile.get("name") == name) return &profile;
-    }
-    return nullptr;
+           characters(name) <= kMost;
 }
 
 }  // namespace appliance

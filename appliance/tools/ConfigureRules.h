@@ -20,11 +20,11 @@ using Rule = std::optional<std::string> (*)(const HostView& host, const std::str
                                             const char* argument);
 
 struct AttributeRule {
-    const char* name;    ///< as it is set
-    const char* stored;  ///< as it is stored
+    const char* names;  ///< as they are set, with commas between them
     Rule rule;
-    const char* argument = "";  ///< what the rule makes of it is its own
-    bool isList = false;        ///< elements can be added and removed
+    const char* argument = "";     ///< what the rule makes of it is its own
+    const char* stored = nullptr;  ///< the name under which it is stored; null: its own
+    bool isList = false;           ///< elements can be added and removed
 };
 
 using AttributeRules = std::vector<AttributeRule>;
@@ -35,7 +35,7 @@ const AttributeRules& lparRules();
 const AttributeRules& profileRules();
 
 /// The names of @p rules, with commas between them, behind @p others.
-std::string namesOf(const AttributeRules& rules, const std::string& others);
+std::string namesOf(const AttributeRules& rules, std::string others);
 
 /// How the value of @p setting, which one of @p rules is about, is stored.
 /// @throws Failure BadValue, NotCapable, NotAList
@@ -47,25 +47,17 @@ std::string checkedValue(const HostView& host, const AttributeRules& rules, cons
 void apply(const HostView& host, const AttributeRules& rules, const Setting& setting,
            Object& object);
 
-/// The value that @p settings give an attribute, if any.
-std::optional<std::string> given(const std::vector<Setting>& settings, const std::string& name);
-/// @throws Failure MissingSetting
-std::string needed(const std::vector<Setting>& settings, const std::string& name);
-
 /// Sets what follows from the settings that were applied to a profile (units of dedicated
 /// processors, the usual weight of an uncapped partition, consoles ...), and judges whether its
 /// values go together.
 /// @throws Failure OutsideLimits, Disagree, BadValue, SlotNotFound
-void settle(const HostView& host, const std::vector<Setting>& settings, Object& profile);
+void settle(const HostView& host, const Settings& settings, Object& profile);
 
 /// Whether this way of sharing is one of shared processors; all others are of dedicated ones.
 bool sharesPool(const std::string& sharingMode);
 
 /// Whether people can read @p name on one line of the usual length.
 bool isPrintable(const std::string& name);
-
-/// The partition's profile of that name; null when there is none.
-const Object* profileNamed(const HostView& host, std::int64_t lpar, const std::string& name);
 
 }  // namespace appliance
 

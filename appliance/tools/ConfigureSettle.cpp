@@ -1,7 +1,6 @@
 // What follows from the settings of a profile, and whether they go together.
 
 #include <algorithm>
-#include <set>
 
 #include "Adapters.h"
 #include "ConfigureRules.h"
@@ -17,44 +16,34 @@ constexpr const char* kUsualWeight = "128";
 
 constexpr const char* kLeastToMost[] = {"min_", "desired_", "max_"};
 
-/// Sets what differs, so that the journal shows no more than that.
-void update(Object& object, const char* name, const std::string& value) {
-    if (object.get(name) != value) object.set(name, value);
-}
-
 void requireRise(const Object& profile, const std::string& quantity, std::int64_t least) {
     for (const char* edge : kLeastToMost) {
         const std::int64_t size = hundredths(profile.get(edge + quantity));
-        if (size < least) throw Failure(Fault::OutsideLimits, {edge + quantity});
+        refuseIf(size < least, Fault::OutsideLimits, {edge + quantity});
         least = size;
     }
 }
 
-void settleMemory(const HostView& host, const std::vector<Setting>& settings, Object& profile) {
+void settleMemory(const HostView& host, const Settings& settings, Object& profile) {
     if (profile.get("mem_mode") == "ded") {
         for (const Setting& setting : settings) {
             const bool isOfPool = setting.name.find("_psp_") != std::string::npos ||
                                   setting.name == "desired_io_entitled_mem";
-            const bool isNone =
-                setting.value.empty() || setting.value == "none" || setting.value == "null";
-            if (isOfPool && !isNone) {
-                throw Failure(Fault::Disagree, {setting.name, "mem_mode"});
-            }
+            refuseIf(isOfPool && !isListed(",none,null", setting.value), Fault::Disagree,
+                     {setting.name, "mem_mode"});
         }
-        update(profile, "mem_weight", "0");
-        update(profile, "desired_io_entitled_mem", "null");
-        update(profile, "primary_psp_id", "none");
-        update(profile, "secondary_psp_id", "none");
+        profile.update("mem_weight", "0");
+        profile.update("desired_io_entitled_mem", "null");
+        profile.update("primary_psp_id", "none");
+        profile.update("secondary_psp_id", "none");
         return;
     }
     const auto& pools = host.all(Kind::MemPool);
-    if (pools.empty()) throw Failure(Fault::BadValue, {"mem_mode", "shared"});
-    if (profile.get("proc_mode") == "ded") {
-        throw Failure(Fault::Disagree, {"mem_mode", "proc_mode"});
-    }
+    refuseIf(pools.empty(), Fault::BadValue, {"mem_mode", "shared"});
+    refuseIf(profile.get("proc_mode") == "ded", Fault::Disagree, {"mem_mode", "proc_mode"});
     if (!given(settings, "mem_mode")) return;
     if (profile.get("primary_psp_id") == "none") {
-        update(profile, "primary_psp_id", split(pools.front().get("psp_ids")).front());
+        profile.update("primary_psp_id", split(pools.front().get("psp_ids")).front());
     }
     if (!given(settings, "mem_weight") && profile.get("mem_weight") == "0") {
         profile.set("mem_weight", kUsualWeight);
@@ -64,34 +53,32 @@ void settleMemory(const HostView& host, const std::vector<Setting>& settings, Ob
     }
 }
 
-void settleSharing(const std::vector<Setting>& settings, Object& profile) {
+void settleSharing(const Settings& settings, Object& profile) {
     const bool isDedicated = profile.get("proc_mode") == "ded";
     if (sharesPool(profile.get("sharing_mode")) == isDedicated) {
-        if (given(settings, "sharing_mode")) {
-            throw Failure(Fault::Disagree, {"sharing_mode", "proc_mode"});
-        }
+        refuseIf(given(settings, "sharing_mode").has_value(), Fault::Disagree,
+                 {"sharing_mode", "proc_mode"});
         profile.set("sharing_mode", isDedicated ? "share_idle_procs" : "cap");
     }
     if (isDedicated) {
         for (const char* pool : {"shared_proc_pool_id", "shared_proc_pool_name"}) {
-            if (given(settings, pool).value_or("null") != "null") {
-                throw Failure(Fault::Disagree, {pool, "proc_mode"});
-            }
+            refuseIf(given(settings, pool).value_or("null") != "null", Fault::Disagree,
+                     {pool, "proc_mode"});
         }
-        update(profile, "shared_proc_pool_id", "null");
+        profile.update("shared_proc_pool_id", "null");
     } else if (profile.get("shared_proc_pool_id") == "null") {
         profile.set("shared_proc_pool_id", "0");
     }
     // Callers name a weight whatever the mode is; it counts for an uncapped partition alone.
     if (profile.get("sharing_mode") != "uncap") {
-        update(profile, "uncap_weight", "0");
+        profile.update("uncap_weight", "0");
     } else if (given(settings, "sharing_mode") && !given(settings, "uncap_weight") &&
                profile.get("uncap_weight") == "0") {
         profile.set("uncap_weight", kUsualWeight);
     }
 }
 
-void settleProcessors(const HostView& host, const std::vector<Setting>& settings, Object& profile) {
+void settleProcessors(const HostView& host, const Settings& settings, Object& profile) {
     requireRise(profile, "procs", 100);
     const bool isDedicated = profile.get("proc_mode") == "ded";
     const std::int64_t least = hundredths(host.host().get("min_proc_units_per_virtual_proc"));
@@ -101,9 +88,8 @@ void settleProcessors(const HostView& host, const std::vector<Setting>& settings
         const std::int64_t count = number(profile.get(procs));
         if (isDedicated) {
             const std::optional<std::string> wanted = given(settings, unitsName);
-            if (wanted && hundredths(*wanted) != count * 100) {
-                throw Failure(Fault::Disagree, {unitsName, procs});
-            }
+            refuseIf(wanted && hundredths(*wanted) != count * 100, Fault::Disagree,
+                     {unitsName, procs});
             profile.set(unitsName, units(count * 100));
         } else if (const std::int64_t size = hundredths(profile.get(unitsName));
                    size < count * least || size > count * 100) {
@@ -123,19 +109,18 @@ void settleSlots(const HostView& host, Object& profile) {
         serial.insert(serial.begin() + std::min<std::ptrdiff_t>(console, size),
                       adapterElement(*adapterForm(Kind::Serial), {Kind::Serial, {0, 0, console}}));
     }
-    update(profile, kSerial, adapterList(serial));
+    profile.update(kSerial, adapterList(serial));
     adaptersOf(profile);
 
-    std::set<std::string> known;
-    for (const Object& slot : host.all(Kind::Slot)) known.insert(slot.get("drc_index"));
     for (const IoSlot& slot : ioSlotsFromList(profile.get("io_slots"))) {
-        if (known.count(slot.drcIndex) == 0) throw Failure(Fault::SlotNotFound, {slot.drcIndex});
+        refuseIf(host.find(Kind::Slot, "drc_index", slot.drcIndex) == nullptr, Fault::SlotNotFound,
+                 {slot.drcIndex});
     }
 }
 
 }  // namespace
 
-void settle(const HostView& host, const std::vector<Setting>& settings, Object& profile) {
+void settle(const HostView& host, const Settings& settings, Object& profile) {
     settleMemory(host, settings, profile);
     settleSharing(settings, profile);
     settleSlots(host, profile);

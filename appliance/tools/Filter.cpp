@@ -1,9 +1,11 @@
 #include "Filter.h"
 
 #include <algorithm>
+#include <optional>
 #include <unordered_set>
 
 #include "Failure.h"
+#include "Rows.h"
 #include "Text.h"
 
 namespace appliance {
@@ -29,13 +31,12 @@ struct Item {
 struct Rule {
     const char* name;
     const char* attribute;
-    bool ofLpars = false;
-    Fault unknown = Fault::BadFilter;
+    std::optional<Fault> unknown = {};  ///< of filters that name partitions
 };
 
 constexpr Rule kRules[] = {
-    {"lpar_ids", "lpar_id", true, Fault::LparIdNotFound},
-    {"lpar_names", "lpar_name", true, Fault::LparNameNotFound},
+    {"lpar_ids", "lpar_id", Fault::LparIdNotFound},
+    {"lpar_names", "lpar_name", Fault::LparNameNotFound},
     {"profile_names", "name"},
     {"sys_names", "sys_name"},
     {"lpar_envs", "lpar_env"},
@@ -55,62 +56,31 @@ std::size_t headLength(const std::string& field) {
     return end != 0 && end != std::string::npos && field[end] == '=' ? end + 1 : 0;
 }
 
-class Parser {
-public:
-    explicit Parser(const std::string& text) : m_text(text) {}
-
-    std::vector<Item> parse() {
-        readFields(m_text, true);
-        return std::move(m_items);
-    }
-
-private:
-    /// @param outermost  whether a quoted field can be an item of its own
-    void readFields(const std::string& text, bool outermost) {
-        bool fresh = true;  // the first field must name its filter
-        for (std::size_t begin = 0; begin < text.size(); ++begin, fresh = false) {
-            std::size_t end = 0;
-            if (quotedFieldAt(text, begin, &end)) {
-                const std::string content = unquoted(text.substr(begin, end - begin));
-                if (outermost && headLength(content) != 0) {
-                    readFields(content, false);
-                } else {
-                    add(content, true);
-                }
-                begin = end;
-                continue;
-            }
-            const std::size_t head =
-                fresh || outermost ? headLength(text.substr(begin, text.find(',', begin) - begin))
-                                   : 0;
-            if (head != 0) {
-                m_items.push_back({text.substr(begin, head - 1), {}});
-                begin += head;
-            }
-            begin = readValue(text, begin);
+/// Adds what @p text has to @p items.
+/// @param outermost  whether a quoted field can hold items of its own
+/// @throws Failure BadFilter the first value stands behind no name
+void parse(const std::string& text, bool outermost, std::vector<Item>& items) {
+    for (std::size_t begin = 0, end = 0; begin < text.size(); begin = end + 1) {
+        std::size_t head = 0;
+        bool quoted = quotedFieldAt(text, begin, &end);
+        // Inside a quoted field, only its beginning names a filter.
+        if (!quoted && (begin == 0 || outermost)) {
+            head = headLength(text.substr(begin, text.find(',', begin) - begin));
+            if (head != 0) items.push_back({text.substr(begin, head - 1), {}});
+            begin += head;
+            quoted = quotedFieldAt(text, begin, &end);
         }
-    }
-
-    /// @return the position of the comma behind the value, or the end of the text
-    std::size_t readValue(const std::string& text, std::size_t begin) {
-        std::size_t end = 0;
-        if (quotedFieldAt(text, begin, &end)) {
-            add(unquoted(text.substr(begin, end - begin)), true);
-            return end;
+        if (!quoted) end = std::min(text.find(',', begin), text.size());
+        std::string value = text.substr(begin, end - begin);
+        if (quoted) value = unquoted(value);
+        if (quoted && outermost && head == 0 && headLength(value) != 0) {
+            parse(value, false, items);
+            continue;
         }
-        end = std::min(text.find(',', begin), text.size());
-        add(text.substr(begin, end - begin), false);
-        return end;
+        refuseIf(items.empty(), Fault::BadFilter, {text});
+        items.back().values.push_back({std::move(value), quoted});
     }
-
-    void add(std::string value, bool quoted) {
-        if (m_items.empty()) throw Failure(Fault::BadFilter, {m_text});
-        m_items.back().values.push_back({std::move(value), quoted});
-    }
-
-    const std::string& m_text;
-    std::vector<Item> m_items;
-};
+}
 
 /// The values of @p item, with those runs joined that are one of @p known; values that are not
 /// known go to @p strangers.
@@ -146,11 +116,9 @@ Words resolve(const Item& item, const Words& known, std::vector<std::string>& st
 
 /// @param names  of the filters that the resource has
 /// @throws Failure UnknownFilter
-const Rule& ruleFor(const Item& item, const std::vector<std::string>& names) {
-    if (std::find(names.begin(), names.end(), item.name) != names.end()) {
-        for (const Rule& rule : kRules) {
-            if (item.name == rule.name) return rule;
-        }
+const Rule& ruleFor(const Item& item, const char* names) {
+    for (const Rule& rule : kRules) {
+        if (item.name == rule.name && isListed(names, item.name)) return rule;
     }
     throw Failure(Fault::UnknownFilter, {item.name});
 }
@@ -158,7 +126,7 @@ const Rule& ruleFor(const Item& item, const std::vector<std::string>& names) {
 /// Every value that the filter's attribute has.
 Words valuesOf(const Rule& rule, const Hosts& hosts, const std::vector<Row>& rows) {
     Words words;
-    if (!rule.ofLpars) {
+    if (!rule.unknown) {
         for (const Row& row : rows) words.insert(valueOf(row, rule.attribute));
         return words;
     }
@@ -174,16 +142,14 @@ Words valuesOf(const Rule& rule, const Hosts& hosts, const std::vector<Row>& row
 
 void applyFilter(const std::string& text, const char* names, const Hosts& hosts,
                  std::vector<Row>& rows) {
-    const std::vector<std::string> known = split(names);
-    for (const Item& item : Parser(text).parse()) {
-        const Rule& rule = ruleFor(item, known);
+    std::vector<Item> items;
+    parse(text, true, items);
+    for (const Item& item : items) {
+        const Rule& rule = ruleFor(item, names);
         std::vector<std::string> strangers;
         const Words chosen = resolve(item, valuesOf(rule, hosts, rows), strangers);
-        if (rule.ofLpars && !strangers.empty()) throw Failure(rule.unknown, {strangers.front()});
-        const auto isOther = [&](const Row& row) {
-            return chosen.count(valueOf(row, rule.attribute)) == 0;
-        };
-        rows.erase(std::remove_if(rows.begin(), rows.end(), isOther), rows.end());
+        if (rule.unknown && !strangers.empty()) throw Failure(*rule.unknown, {strangers.front()});
+        keep(rows, [&](const Row& row) { return chosen.count(valueOf(row, rule.attribute)) != 0; });
     }
 }
 

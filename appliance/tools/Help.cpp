@@ -58,57 +58,49 @@ std::string wrapped(const char* heading, const char* names) {
     return text + line + '\n';
 }
 
+/// The row's text in that language.
+template <typename Row>
+const char* textOf(const Row& row, Language language) {
+    return language == Language::German ? row.german : row.english;
+}
+
 std::string optionLines(Tool tool, Language language) {
     constexpr std::size_t kColumn = 36;
     std::string text;
-    for (const Option* option = options(); option->name != nullptr; ++option) {
-        if ((option->tools & tool) == 0) continue;
-        std::string line = std::string("  ") + option->name;
-        if (option->value != nullptr) line += std::string(" ") + option->value;
+    for (const Option& option : optionsOf(tool)) {
+        std::string line = std::string("  ") + option.name;
+        if (option.value != nullptr) line += std::string(" ") + option.value;
         line.resize(std::max(line.size() + 2, kColumn), ' ');
-        text += line + (language == Language::German ? option->german : option->english) + '\n';
+        text += line + textOf(option, language) + '\n';
     }
     return text;
 }
 
-std::string resourceLines(const Resource& resource, const Words& words) {
+std::string commandLines(const Command& command, const Words& words) {
     std::string text = "\n ";
-    if (resource.type != nullptr) {
-        text += std::string(1, ' ') + typeOption(resource.tool) + ' ' + resource.type;
+    const auto options = selectorsOf(command.tool), values = command.words();
+    for (std::size_t i = 0; i < options.size(); ++i) {
+        if (values[i] == nullptr || values[i] == std::string(kAnyLevel)) continue;
+        text += std::string(" ") + options[i] + ' ' + values[i];
     }
-    if (resource.subtype != nullptr) text += std::string(" --rsubtype ") + resource.subtype;
-    if (resource.level != nullptr) text += std::string(" --level ") + resource.level;
-    text += '\n' + wrapped(words.attributes, resource.attributes);
-    return *resource.filters == '\0' ? text : text + wrapped(words.filters, resource.filters);
-}
-
-std::string operationLines(const Operation& operation, const Words& words) {
-    std::string text = "\n ";
-    if (operation.type != nullptr) text += std::string(" -r ") + operation.type;
-    if (operation.subtype != nullptr) text += std::string(" --rsubtype ") + operation.subtype;
-    if (operation.name != nullptr) text += std::string(" -o ") + operation.name;
     text += '\n';
-    const char* attributes = operation.attributes;
-    return *attributes == '\0' ? text : text + wrapped(words.attributes, attributes);
+    if (*command.attributes != '\0') text += wrapped(words.attributes, command.attributes);
+    if (*command.filters != '\0') text += wrapped(words.filters, command.filters);
+    return text;
 }
 
 }  // namespace
 
-std::string help(Tool tool, Language language) {
-    const bool german = language == Language::German;
-    const Words& words = german ? kGerman : kEnglish;
-    std::string text;
-    for (const ToolName& row : toolNames()) {
-        if (row.tool != tool) continue;
-        text = std::string(words.usage) + ' ' + row.name + ' ' + words.call + '\n' + row.name +
-               ' ' + (german ? row.german : row.english) + ".\n\n";
-    }
-    text += std::string(words.options) + '\n' + optionLines(tool, language);
+std::string help(const ToolName& tool, Language language) {
+    const Words& words = language == Language::German ? kGerman : kEnglish;
+    std::string text = std::string(words.usage) + ' ' + tool.name + ' ' + words.call + '\n' +
+                       tool.name + ' ' + textOf(tool, language) + ".\n\n" + words.options + '\n' +
+                       optionLines(tool.tool, language);
     for (const Resource& resource : resources()) {
-        if (resource.tool == tool) text += resourceLines(resource, words);
+        if (resource.tool == tool.tool) text += commandLines(resource, words);
     }
-    const std::vector<Operation> operations = operationsOf(tool);
-    for (const Operation& operation : operations) text += operationLines(operation, words);
+    const std::vector<Operation> operations = operationsOf(tool.tool);
+    for (const Operation& operation : operations) text += commandLines(operation, words);
     return text + '\n' + (operations.empty() ? words.records : "") + words.ends;
 }
 

@@ -11,8 +11,9 @@
 #include <cstring>
 
 #include "Faults.h"
+#include "Help.h"
 #include "Operation.h"
-#include "Query.h"
+#include "Resource.h"
 
 namespace {
 
@@ -22,9 +23,16 @@ void writeAll(const std::string& text) {
     for (std::size_t done = 0; done < text.size();) {
         const ssize_t written = write(STDOUT_FILENO, text.data() + done, text.size() - done);
         if (written < 0 && errno == EINTR) continue;
-        if (written < 0) throw Failure(Fault::Output, {std::strerror(errno)});
+        refuseIf(written < 0, Fault::Output, {std::strerror(errno)});
         done += static_cast<std::size_t>(written);
     }
+}
+
+const ToolName& toolNamed(const std::string& name) {
+    for (const ToolName& tool : kToolNames) {
+        if (name == tool.name) return tool;
+    }
+    throw Failure(Fault::UnknownTool, {name});
 }
 
 /// Does what was planned to go wrong with this call.
@@ -42,6 +50,26 @@ bool failsAsPlanned(const std::string& name, int* status) {
     return fault->code || !fault->text.empty();
 }
 
+int run(const std::string& name, const char* const* arguments, Language language) {
+    const ToolName& tool = toolNamed(name);
+    int status = 0;
+    if (failsAsPlanned(name, &status)) return status;
+    const Request request(tool, arguments);
+    if (request.has("--help")) {
+        writeAll(help(tool, language));
+    } else if (operationsOf(tool.tool).empty()) {
+        writeAll(answer(request));
+    } else {
+        carryOut(request);
+    }
+    return 0;
+}
+
+int report(const Failure& failure, Language language) {
+    std::fprintf(stderr, "%s\n", failure.text(language).c_str());
+    return failure.exitStatus();
+}
+
 }  // namespace
 
 int main(int, char** argv) {
@@ -50,19 +78,10 @@ int main(int, char** argv) {
     const Language language = languageOfEnvironment();
     try {
         const std::string program = argv[0] == nullptr ? "" : argv[0];
-        const std::string name = program.substr(program.rfind('/') + 1);
-        const Tool tool = toolNamed(name);
-        int status = 0;
-        if (failsAsPlanned(name, &status)) return status;
-        const bool changes = !operationsOf(tool).empty();
-        writeAll((changes ? carryOut : answer)(tool, argv + 1, language));
-        return 0;
+        return run(program.substr(program.rfind('/') + 1), argv + 1, language);
     } catch (const Failure& failure) {
-        std::fprintf(stderr, "%s\n", failure.text(language).c_str());
-        return failure.exitStatus();
+        return report(failure, language);
     } catch (const std::exception& damage) {
-        const Failure failure(Fault::StateUnusable, {"appliance.db", damage.what()});
-        std::fprintf(stderr, "%s\n", failure.text(language).c_str());
-        return failure.exitStatus();
+        return report(Failure(Fault::StateUnusable, {"appliance.db", damage.what()}), language);
     }
 }

@@ -26,12 +26,13 @@ namespace appliance {
 namespace {
 
 constexpr int kSteps = 10;
+constexpr const char* kIoServer = "xbrgserver";
 
 /// What tells of a move at both of its ends.
-constexpr const char* kTelling[] = {
-    "migration_state",   "migration_type",  "source_sys_name", "dest_sys_name", "source_lpar_id",
-    "dest_lpar_id",      "source_msp_name", "source_msp_id",   "dest_msp_name", "dest_msp_id",
-    "bytes_transmitted", "bytes_remaining", "migration_token"};
+constexpr const char* kTelling =
+    "migration_state,migration_type,source_sys_name,dest_sys_name,source_lpar_id,dest_lpar_id,"
+    "source_msp_name,source_msp_id,dest_msp_name,dest_msp_id,bytes_transmitted,bytes_remaining,"
+    "migration_token";
 
 std::string typeOf(const Object& lpar) { return isActive(lpar) ? "active" : "inactive"; }
 
@@ -39,20 +40,27 @@ bool holds(const Object& lpar, const Object& object) {
     return object.place().lpar == lpar.place().lpar;
 }
 
+/// The adapter to which a client is joined; null for other adapters.
+const Object* serverOf(const HostView& host, const Object& client) {
+    const auto server = serverOf(client);
+    if (!server) return nullptr;
+    for (const Object& other : host.all(client.kind(), server->first)) {
+        if (other.place().number == server->second) return &other;
+    }
+    return nullptr;
+}
+
 // What is refused.
 
 void requireMovable(const HostView& source, const Object& lpar) {
     const std::string id = lpar.get("lpar_id");
     requireStill(lpar);
-    requireState(lpar, {"Running", "Not Activated"});
-    if (lpar.get("resource_config") == "0") throw Failure(Fault::NoResources, {id});
-    if (lpar.get("lpar_env") == "xbrgserver" || source.host().get("service_lpar_id") == id) {
-        throw Failure(Fault::LparStays, {id});
-    }
-    for (Kind kind : {Kind::Slot, Kind::Hca, Kind::Sni}) {
-        for (const Object& adapter : source.all(kind)) {
-            if (holds(lpar, adapter)) throw Failure(Fault::PhysicalAdapters, {id});
-        }
+    requireState(lpar, "Running,Not Activated");
+    refuseIf(lpar.get("resource_config") == "0", Fault::NoResources, {id});
+    refuseIf(lpar.get("lpar_env") == kIoServer || source.host().get("service_lpar_id") == id,
+             Fault::LparStays, {id});
+    for (Kind kind : kPhysical) {
+        refuseIf(!source.all(kind, lpar.place().lpar).empty(), Fault::PhysicalAdapters, {id});
     }
     // Only for disks is there another server where the partition goes.
     for (Kind kind : {Kind::VirtualScsi, Kind::Serial}) {
@@ -70,63 +78,45 @@ void requireMovable(const HostView& source, const Object& lpar) {
 void requireCapable(const HostView& host, const std::string& type) {
     const Row row{&host, &host.host()};
     const std::string name = host.host().get("name");
-    requireState(host, {"Operating"});
-    if (host.host().get(type + "_lpar_mobility_capable") != "1") {
-        throw Failure(Fault::NotMovable, {name});
-    }
+    requireState(host, "Operating");
+    refuseIf(host.host().get(type + "_lpar_mobility_capable") != "1", Fault::NotMovable, {name});
     const std::int64_t moves = number(valueOf(row, "num_" + type + "_migrations_in_progress"));
-    if (moves >= number(host.host().get("num_" + type + "_migrations_supported"))) {
-        throw Failure(Fault::TooManyMoves, {name});
-    }
+    refuseIf(moves >= number(host.host().get("num_" + type + "_migrations_supported")),
+             Fault::TooManyMoves, {name});
 }
 
 void requireRoom(const HostView& target, const Object& lpar) {
-    constexpr struct {
-        const char* left;
-        const char* needed;
-        bool isMemory;
-    } kRoom[] = {
-        {"curr_avail_sys_mem", "curr_mem", true},
-        {"pend_avail_sys_mem", "pend_mem", true},
-        {"curr_avail_sys_proc_units", "curr_proc_units", false},
-        {"pend_avail_sys_proc_units", "pend_proc_units", false},
-    };
     const bool isShared = lpar.get("mem_mode") == "shared";
-    if (isShared && target.all(Kind::MemPool).empty()) throw Failure(Fault::NoPool, {"mem_mode"});
-    for (const auto& row : kRoom) {
-        if (row.isMemory && isShared) continue;
-        const std::string left = valueOf({&target, &target.host()}, row.left);
-        if (hundredths(left) < hundredths(lpar.get(row.needed))) {
-            throw Failure(Fault::NotEnough, {row.left, left});
+    refuseIf(isShared && target.all(Kind::MemPool).empty(), Fault::NoPool, {"mem_mode"});
+    for (const std::string quantity : {"mem", "proc_units"}) {
+        if (isShared && quantity == "mem") continue;
+        for (const std::string when : {"curr_", "pend_"}) {
+            const std::string attribute = std::string(when).append("avail_sys_").append(quantity);
+            const std::string left = valueOf({&target, &target.host()}, attribute);
+            refuseIf(hundredths(left) < hundredths(lpar.get(when + quantity)), Fault::NotEnough,
+                     {attribute, left});
         }
     }
-    const std::vector<std::string> modes = split(target.host().get("lpar_proc_compat_modes"));
+    const std::string modes = target.host().get("lpar_proc_compat_modes");
     for (const char* mode : {"desired_lpar_proc_compat_mode", "curr_lpar_proc_compat_mode"}) {
-        if (std::find(modes.begin(), modes.end(), lpar.get(mode)) == modes.end()) {
-            throw Failure(Fault::NotCapable, {mode});
-        }
+        refuseIf(!isListed(modes, lpar.get(mode)), Fault::NotCapable, {mode});
     }
+}
+
+/// Whether a partition can do what I/O servers do for a move.
+bool isRunningServer(const Object& lpar) {
+    return lpar.get("lpar_env") == kIoServer && lpar.get("state") == "Running";
 }
 
 /// The I/O server that carries the memory of active partitions.
 const Object& moverOf(const HostView& host) {
     for (const Object& lpar : host.all(Kind::Lpar)) {
-        if (lpar.get("lpar_env") == "xbrgserver" && lpar.get("state") == "Running") return lpar;
+        if (isRunningServer(lpar)) return lpar;
     }
     throw Failure(Fault::NoMover, {host.host().get("name")});
 }
 
 // The place.
-
-/// A copy of what a partition has, for a partition of another host.
-Object movedTo(const Place& place, const Object& object) {
-    return {object.kind(), {place.host, place.lpar, object.place().number}, object.stored()};
-}
-
-/// Leaves alone what has the value already, so that a copy stays as short as the original.
-void reset(Object& object, const char* name, const std::string& value) {
-    if (object.get(name) != value) object.set(name, value);
-}
 
 /// Adapters that serve the clients of a partition that comes to a host.
 class Servers {
@@ -156,10 +146,8 @@ private:
     VirtualSlot take() {
         constexpr std::int64_t kFirst = 2;  // behind the consoles
         for (const Object& lpar : m_host.all(Kind::Lpar)) {
-            if (lpar.get("lpar_env") != "xbrgserver" ||
-                (m_mustRun && lpar.get("state") != "Running")) {
+            if (lpar.get("lpar_env") != kIoServer || (m_mustRun && !isRunningServer(lpar)))
                 continue;
-            }
             const std::int64_t end = number(lpar.get("curr_max_virtual_slots"));
             for (std::int64_t slot = kFirst; slot < end; ++slot) {
                 if (m_used.emplace(lpar.place().lpar, slot).second) {
@@ -179,21 +167,17 @@ private:
 std::vector<Object> adaptersFor(const HostView& source, const Object& lpar, const HostView& target,
                                 const Place& place) {
     Servers servers(target, isActive(lpar));
-    std::set<std::string> macs;
-    for (const Object& other : target.all(Kind::Ethernet)) macs.insert(other.get("mac_addr"));
     std::vector<Object> adapters;
     for (Kind kind : kVirtual) {
-        for (const Object& adapter : source.all(kind)) {
-            if (!holds(lpar, adapter)) continue;
-            Object moved = movedTo(place, adapter);
+        for (const Object& adapter : source.all(kind, lpar.place().lpar)) {
+            Object moved = adapter.movedTo(place);
             moved.set("state", "0");
-            if (kind == Kind::Ethernet && macs.count(moved.get("mac_addr")) != 0) {
+            if (kind == Kind::Ethernet &&
+                target.find(kind, "mac_addr", moved.get("mac_addr")) != nullptr) {
                 moved.set("mac_addr", newMac(target, moved.place()));
             }
-            const auto server = serverOf(adapter);
-            for (const Object& other : source.all(kind)) {
-                if (!server || slotOf(other) != *server) continue;
-                adapters.push_back(servers.join(moved, other));
+            if (const Object* server = serverOf(source, adapter)) {
+                adapters.push_back(servers.join(moved, *server));
             }
             adapters.push_back(std::move(moved));
         }
@@ -217,7 +201,7 @@ void rejoin(Object& profile, const std::vector<Object>& adapters) {
         }
         elements.push_back(adapterElement(form, adapter));
     }
-    reset(profile, form.list, adapterList(elements));
+    profile.update(form.list, adapterList(elements));
 }
 
 /// Takes from a partition or a profile what only its former host has.
@@ -225,29 +209,28 @@ void detach(Object& object, const HostView& target) {
     const bool isProfile = object.kind() == Kind::Profile;
     for (const char* name :
          {"power_ctrl_lpar_ids", "work_group_id", "hsl_pool_id", "virtual_opti_pool_id"}) {
-        reset(object, name, "none");
+        object.update(name, "none");
     }
-    if (isProfile) reset(object, "io_slots", "none");
+    if (isProfile) object.update("io_slots", "none");
     for (const std::string when : {"pend_", "curr_"}) {
         const std::string name = (isProfile ? "" : when) + "shared_proc_pool_id";
-        if (object.get(name) != "null") reset(object, name.c_str(), "0");
+        if (object.get(name) != "null") object.update(name, "0");
     }
     if (object.get("mem_mode") != "shared" || target.all(Kind::MemPool).empty()) return;
     const auto servers = split(target.all(Kind::MemPool).front().get("psp_ids"));
-    reset(object, "primary_psp_id", servers.front());
-    reset(object, "secondary_psp_id", servers.size() > 1 ? servers[1] : "none");
-    if (!isProfile) reset(object, "curr_psp_id", servers.front());
+    object.update("primary_psp_id", servers.front());
+    object.update("secondary_psp_id", servers.size() > 1 ? servers[1] : "none");
+    if (!isProfile) object.update("curr_psp_id", servers.front());
 }
 
 /// The partition as it will be, not active yet, and all that it will have; itself first.
 std::vector<Object> placeFor(const HostView& source, const Object& lpar, const HostView& target) {
     const Place place{target.host().place().host, newId(target, {}), 0};
-    std::vector<Object> objects = {movedTo(place, lpar)};
+    std::vector<Object> objects = {lpar.movedTo(place)};
     setInactive(objects.front(), "Not Activated");
     const std::vector<Object> adapters = adaptersFor(source, lpar, target, place);
-    for (const Object& profile : source.all(Kind::Profile)) {
-        if (!holds(lpar, profile)) continue;
-        objects.push_back(movedTo(place, profile));
+    for (const Object& profile : source.all(Kind::Profile, lpar.place().lpar)) {
+        objects.push_back(profile.movedTo(place));
         rejoin(objects.back(), adapters);
     }
     for (Object& object : objects) detach(object, target);
@@ -257,14 +240,9 @@ std::vector<Object> placeFor(const HostView& source, const Object& lpar, const H
 
 /// Removes a partition with all that it has, and the adapters that serve it.
 void vacate(Change& change, const HostView& host, const Object& lpar) {
-    const auto& adapters = host.all(Kind::VirtualScsi);
     std::vector<Object> servers;
-    for (const Object& client : adapters) {
-        const auto server = serverOf(client);
-        if (!server || !holds(lpar, client)) continue;
-        for (const Object& other : adapters) {
-            if (slotOf(other) == *server) servers.push_back(other);
-        }
+    for (const Object& client : host.all(Kind::VirtualScsi, lpar.place().lpar)) {
+        if (const Object* server = serverOf(host, client)) servers.push_back(*server);
     }
     eraseLpar(change, host, lpar);
     for (const Object& server : servers) change.remove(server);
@@ -277,12 +255,12 @@ struct Ends {
     Object lpar;
     Object place;
 
-    void tell(const char* name, const std::string& value) {
+    void tell(const std::string& name, const std::string& value) {
         lpar.set(name, value);
         place.set(name, value);
     }
     void beStill() {
-        for (const char* name : kTelling) {
+        for (std::string_view name : namesIn(kTelling)) {
             lpar.unset(name);
             place.unset(name);
         }
@@ -314,24 +292,23 @@ std::string newToken() {
 
 /// Keeps the place for the partition that --id names on the host that -t names.
 /// @return the partition, which now tells of its move
-Object reserve(Change& change, const Request& request) {
+Object reserve(Change& change) {
+    const Request& request = change.request();
+    const HostView& from = change.host();
     const std::string target = request.value("-t");
-    if (target.empty()) throw Failure(Fault::MissingOption, {"-t"});
-    if (request.has("--ip")) throw Failure(Fault::OtherManager, {request.value("--ip")});
+    refuseIf(target.empty(), Fault::MissingOption, {"-t"});
+    refuseIf(request.has("--ip"), Fault::OtherManager, {request.value("--ip")});
     const Object lpar = change.lpar();
-    const HostView &from = change.host(), &to = change.host(target);
+    const HostView& to = change.host(target);
     const std::string type = typeOf(lpar);
-    if (&from == &to) throw Failure(Fault::NotMovable, {to.host().get("name")});
+    refuseIf(&from == &to, Fault::NotMovable, {to.host().get("name")});
     requireMovable(from, lpar);
     requireCapable(from, type);
     requireCapable(to, type);
     requireFreeName(to, lpar.get("name"));
     requireRoom(to, lpar);
-    const Object* movers[] = {nullptr, nullptr};
-    if (isActive(lpar)) {
-        movers[0] = &moverOf(from);
-        movers[1] = &moverOf(to);
-    }
+    const Object* movers[] = {isActive(lpar) ? &moverOf(from) : nullptr,
+                              isActive(lpar) ? &moverOf(to) : nullptr};
 
     std::vector<Object> objects = placeFor(from, lpar, to);
     Ends ends{lpar, objects.front()};
@@ -348,8 +325,8 @@ Object reserve(Change& change, const Request& request) {
     ends.tell("migration_token", newToken());
     for (int end = 0; end < 2 && movers[end] != nullptr; ++end) {
         const std::string msp = end == 0 ? "source_msp_" : "dest_msp_";
-        ends.tell((msp + "name").c_str(), movers[end]->get("name"));
-        ends.tell((msp + "id").c_str(), movers[end]->get("lpar_id"));
+        ends.tell(msp + "name", movers[end]->get("name"));
+        ends.tell(msp + "id", movers[end]->get("lpar_id"));
     }
     objects.front() = ends.place;
     change.put(ends.lpar);
@@ -363,35 +340,31 @@ Ends endsOf(Change& change) {
     Object lpar = change.lpar();
     const HostView& from = change.host();
     auto place = from.lparElsewhere(lpar.get("dest_sys_name"), number(lpar.get("dest_lpar_id")));
-    if (!isMoving(lpar) || lpar.get("source_sys_name") != from.host().get("name") || !place) {
-        throw Failure(Fault::NotMoving, {lpar.get("lpar_id")});
-    }
+    refuseIf(!isMoving(lpar) || lpar.get("source_sys_name") != from.host().get("name") || !place,
+             Fault::NotMoving, {lpar.get("lpar_id")});
     return {std::move(lpar), std::move(*place)};
 }
 
 /// The ends of the move with this token.
 /// @throws Failure MoveStopped there is no such move any more
-Ends endsOf(Change& change, const Request& request, const std::string& token) {
-    const Failure stopped(Fault::MoveStopped, {request.value("--id")});
+Ends endsOf(Change& change, const std::string& token) {
+    change.host();  // what keeps it from starting has not stopped the move
     try {
         Ends ends = endsOf(change);
-        if (ends.lpar.get("migration_token") != token) throw stopped;
-        return ends;
+        if (ends.lpar.get("migration_token") == token) return ends;
     } catch (const Failure&) {
-        throw stopped;
+        // Of whatever kind: the partition itself may be gone.
     }
+    throw Failure(Fault::MoveStopped, {change.request().value("--id")});
 }
 
 void advance(Change& change, Ends ends, int step) {
-    const std::int64_t sent = number(ends.lpar.get("bytes_transmitted"));
-    const std::int64_t total = sent + number(ends.lpar.get("bytes_remaining"));
+    const std::int64_t before = number(ends.lpar.get("bytes_transmitted"));
+    const std::int64_t total = before + number(ends.lpar.get("bytes_remaining"));
+    const std::int64_t sent = step == kSteps ? total : total / kSteps * step;
     ends.tell("migration_state", "Migration In Progress");
-    ends.tell("bytes_transmitted", std::to_string(total / kSteps * step));
-    ends.tell("bytes_remaining", std::to_string(total - total / kSteps * step));
-    if (step == kSteps) {
-        ends.tell("bytes_transmitted", std::to_string(total));
-        ends.tell("bytes_remaining", "0");
-    }
+    ends.tell("bytes_transmitted", std::to_string(sent));
+    ends.tell("bytes_remaining", std::to_string(total - sent));
     change.put(ends.lpar);
     change.put(ends.place);
     note(change, ends.lpar, "Migration In Progress");
@@ -427,48 +400,38 @@ double duration() {
 
 // The operations.
 
-void validateMove(const Request& request, const Operation&) {
-    Change change(request);
-    reserve(change, request);
-    change.verify();
-}
+void validateMove(Change& change, const Operation&) { reserve(change); }
 
-void move(const Request& request, const Operation&) {
+void move(Change& first, const Operation&) {
     const auto start = std::chrono::steady_clock::now();
     const std::chrono::duration<double> pause(duration() / kSteps);
-    std::string token;
-    {
-        Change change(request);
-        token = reserve(change, request).get("migration_token");
-        change.commit();
-    }
+    const std::string token = reserve(first).get("migration_token");
+    first.commit();
+    const Request& request = first.request();
     try {
         for (int step = 1; step <= kSteps; ++step) {
             std::this_thread::sleep_until(start + step * pause);
             Change change(request);
-            advance(change, endsOf(change, request, token), step);
+            advance(change, endsOf(change, token), step);
         }
         Change change(request);
-        arrive(change, endsOf(change, request, token));
+        arrive(change, endsOf(change, token));
     } catch (const Failure& failure) {
         if (failure.fault() == Fault::MoveStopped) throw;
         Change change(request);
-        giveUp(change, endsOf(change, request, token));
+        giveUp(change, endsOf(change, token));
         throw;
     }
 }
 
-void stopMove(const Request& request, const Operation&) {
-    Change change(request);
-    giveUp(change, endsOf(change));
-}
+void stopMove(Change& change, const Operation&) { giveUp(change, endsOf(change)); }
 
 }  // namespace
 
 const std::vector<Operation> kMoveOperations = {
-    {kDomove, nullptr, nullptr, "v", validateMove},
-    {kDomove, nullptr, nullptr, "m", move},
-    {kDomove, nullptr, nullptr, "s", stopMove},
+    {{kDomove, nullptr, nullptr, "v"}, validateMove, true},
+    {{kDomove, nullptr, nullptr, "m"}, move},
+    {{kDomove, nullptr, nullptr, "s"}, stopMove},
 };
 
 }  // namespace appliance

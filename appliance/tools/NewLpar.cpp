@@ -12,8 +12,6 @@ namespace appliance {
 
 namespace {
 
-using Settings = std::vector<Setting>;
-
 /// What a partition runs, and what its host must be capable of for that.
 struct Environment {
     const char* word;
@@ -29,12 +27,7 @@ constexpr Environment kEnvironments[] = {
 /// Attributes that are handled here, and those that are the partition's own; all others are its
 /// profile's.
 constexpr const char* kOwn = "lpar_id,name,profile_name,lpar_env,all_resources";
-constexpr const char* kOfLpar = "allow_perf_collection,lpar_avail_priority";
-
-bool isOneOf(const char* names, const std::string& name) {
-    const std::vector<std::string> all = split(names);
-    return std::find(all.begin(), all.end(), name) != all.end();
-}
+constexpr const char* kLparNames = "allow_perf_collection,lpar_avail_priority";
 
 constexpr const char* kEdges[] = {"min_", "desired_", "max_"};
 
@@ -42,9 +35,8 @@ std::string environment(const HostView& host, const Settings& settings) {
     std::string word = needed(settings, "lpar_env");
     for (const Environment& known : kEnvironments) {
         if (word != known.word) continue;
-        if (known.capability != nullptr && host.host().get(known.capability) != "1") {
-            throw Failure(Fault::NotCapable, {"lpar_env"});
-        }
+        refuseIf(known.capability != nullptr && host.host().get(known.capability) != "1",
+                 Fault::NotCapable, {"lpar_env"});
         return word;
     }
     throw Failure(Fault::BadValue, {"lpar_env", word});
@@ -61,9 +53,9 @@ void requireQuantities(const Settings& settings) {
 
 Object newProfile(const HostView& host, const Settings& settings, const Place& place) {
     const std::string name = given(settings, "profile_name").value_or("normal");
-    if (!isPrintable(name)) throw Failure(Fault::BadValue, {"profile_name", name});
+    refuseIf(!isPrintable(name), Fault::BadValue, {"profile_name", name});
     const std::string all = given(settings, "all_resources").value_or("0");
-    if (all != "0" && all != "1") throw Failure(Fault::BadValue, {"all_resources", all});
+    refuseIf(all != "0" && all != "1", Fault::BadValue, {"all_resources", all});
     if (all == "0") requireQuantities(settings);
 
     Object profile(Kind::Profile, place);
@@ -75,7 +67,7 @@ Object newProfile(const HostView& host, const Settings& settings, const Place& p
         profile.set(edge + "proc_units", "0.0");
     }
     for (const Setting& setting : settings) {
-        if (isOneOf(kOwn, setting.name) || isOneOf(kOfLpar, setting.name)) continue;
+        if (isListed(kOwn, setting.name) || isListed(kLparNames, setting.name)) continue;
         apply(host, profileRules(), setting, profile);
     }
     settle(host, settings, profile);
@@ -85,7 +77,7 @@ Object newProfile(const HostView& host, const Settings& settings, const Place& p
 Object newLpar(const HostView& host, const Settings& settings, const Object& profile) {
     Object lpar(Kind::Lpar, {profile.place().host, profile.place().lpar, 0});
     const std::string name = needed(settings, "name");
-    if (!isPrintable(name)) throw Failure(Fault::BadValue, {"name", name});
+    refuseIf(!isPrintable(name), Fault::BadValue, {"name", name});
     requireFreeName(host, name);
     lpar.set("name", name);
     lpar.set("lpar_env", environment(host, settings));
@@ -100,34 +92,40 @@ Object newLpar(const HostView& host, const Settings& settings, const Object& pro
     }
     takeSettings(profile, lpar);
     for (const Setting& setting : settings) {
-        if (isOneOf(kOfLpar, setting.name)) apply(host, lparRules(), setting, lpar);
+        if (isListed(kLparNames, setting.name)) apply(host, lparRules(), setting, lpar);
     }
     return lpar;
 }
 
-/// The objects that name @p id as one that they can do without, without that name.
+/// Takes those that @p isGone tells from the list that is the object's @p attribute.
+/// @return whether there were such
+template <typename IsGone>
+bool takeFrom(Object& object, const char* attribute, const std::string& empty, IsGone isGone) {
+    std::vector<std::string> elements = split(object.get(attribute));
+    const auto gone = std::remove_if(elements.begin(), elements.end(), isGone);
+    if (gone == elements.end()) return false;
+    elements.erase(gone, elements.end());
+    object.set(attribute, elements.empty() ? empty : joined(elements));
+    return true;
+}
+
+/// The objects that name a partition as one that they can do without, without that name.
 std::vector<Object> freed(const HostView& host, std::int64_t lpar) {
     const std::string id = std::to_string(lpar);
+    const auto isId = [&](const std::string& element) { return element == id; };
+    const auto isStart = [&](const std::string& element) {
+        return element.rfind(id + '/', 0) == 0;
+    };
     std::vector<Object> changed;
     for (Kind kind : {Kind::Lpar, Kind::Profile}) {
         for (Object user : host.all(kind)) {
-            std::vector<std::string> ids = split(user.get("power_ctrl_lpar_ids"));
-            const auto gone = std::remove(ids.begin(), ids.end(), id);
-            if (user.place().lpar == lpar || gone == ids.end()) continue;
-            ids.erase(gone, ids.end());
-            user.set("power_ctrl_lpar_ids", ids.empty() ? "none" : joined(ids));
-            changed.push_back(std::move(user));
+            if (user.place().lpar != lpar && takeFrom(user, "power_ctrl_lpar_ids", "none", isId)) {
+                changed.push_back(std::move(user));
+            }
         }
     }
     for (Object system : host.all(Kind::SystemProfile)) {
-        std::vector<std::string> starts = split(system.get("lpar_profiles"));
-        const auto gone = std::remove_if(starts.begin(), starts.end(), [&](const std::string& s) {
-            return s.rfind(id + '/', 0) == 0;
-        });
-        if (gone == starts.end()) continue;
-        starts.erase(gone, starts.end());
-        system.set("lpar_profiles", joined(starts));
-        changed.push_back(std::move(system));
+        if (takeFrom(system, "lpar_profiles", "", isStart)) changed.push_back(std::move(system));
     }
     if (host.host().get("service_lpar_id") == id) {
         changed.push_back(host.host());
@@ -142,15 +140,12 @@ std::int64_t newId(const HostView& host, const Settings& settings) {
     const std::string limit = host.host().get("max_lpars");
     const std::int64_t most = number(limit);
     const auto& lpars = host.all(Kind::Lpar);
-    if (static_cast<std::int64_t>(lpars.size()) >= most) {
-        throw Failure(Fault::TooManyLpars, {limit});
-    }
+    refuseIf(static_cast<std::int64_t>(lpars.size()) >= most, Fault::TooManyLpars, {limit});
     std::int64_t id = 1;
     if (const auto wanted = given(settings, "lpar_id")) {
-        if (!wholeNumber(*wanted, &id) || id < 1 || id > most) {
-            throw Failure(Fault::BadValue, {"lpar_id", *wanted});
-        }
-        if (host.lpar(id) != nullptr) throw Failure(Fault::IdTaken, {*wanted});
+        refuseIf(!wholeNumber(*wanted, &id) || id < 1 || id > most, Fault::BadValue,
+                 {"lpar_id", *wanted});
+        refuseIf(host.lpar(id) != nullptr, Fault::IdTaken, {*wanted});
         return id;
     }
     for (const Object& lpar : lpars) {
@@ -161,38 +156,32 @@ std::int64_t newId(const HostView& host, const Settings& settings) {
 }
 
 void requireFreeName(const HostView& host, const std::string& name) {
-    if (host.lparNamed(name) != nullptr) throw Failure(Fault::NameTaken, {name});
+    refuseIf(host.find(Kind::Lpar, "name", name) != nullptr, Fault::NameTaken, {name});
 }
 
 const char* newLparNames() {
-    static const std::string names = namesOf(profileRules(), std::string(kOwn) + ',' + kOfLpar);
+    static const std::string names = namesOf(profileRules(), std::string(kOwn) + ',' + kLparNames);
     return names.c_str();
 }
 
-void makeLpar(const Request& request, const Operation& operation) {
-    Change change(request);
-    const Settings settings = settingsOf(request, "-i", operation.attributes);
+void makeLpar(Change& change, const Operation& operation) {
     const HostView& host = change.host();
+    const Settings settings = settingsOf(change.request(), "-i", operation.attributes);
     requireConnection(host);
     const Place place{host.host().place().host, newId(host, settings), 0};
     const Object profile = newProfile(host, settings, place);
     const Object lpar = newLpar(host, settings, profile);
     change.put(lpar);
     change.put(profile);
-    change.commit();
 }
 
 void eraseLpar(Change& change, const HostView& host, const Object& lpar) {
     const std::int64_t id = lpar.place().lpar;
     std::vector<Object> kept = freed(host, id), gone = {lpar};
-    for (Kind kind : {Kind::Profile, Kind::Ethernet, Kind::VirtualScsi, Kind::Serial, Kind::Slot,
-                      Kind::Hca, Kind::Sni}) {
-        for (const Object& object : host.all(kind)) {
-            if (object.place().lpar != id) continue;
+    for (Kind kind : kOfLpar) {
+        for (const Object& object : host.all(kind, id)) {
             gone.push_back(object);
-            if (kind != Kind::Slot && kind != Kind::Hca && kind != Kind::Sni) continue;
-            const Place free{object.place().host, 0, object.place().number};
-            kept.emplace_back(kind, free, object.stored());
+            if (isPhysical(kind)) kept.push_back(object.movedTo({object.place().host, 0}));
         }
     }
     for (const Object& object : gone) change.remove(object);

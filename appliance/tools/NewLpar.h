@@ -11,14 +11,14 @@ namespace appliance {
 
 /// Makes the partition that the request's "-i" describes. It holds nothing until it is activated:
 /// its resources and adapters are those of its profile from then on.
-void makeLpar(const Request& request, const Operation& operation);
+void makeLpar(Change& change, const Operation& operation);
 
 /// The names of what can be set, with commas between them.
 const char* newLparNames();
 
 /// The ID that the settings ask for as "lpar_id", or else the lowest that is free.
 /// @throws Failure TooManyLpars, IdTaken, BadValue
-std::int64_t newId(const HostView& host, const std::vector<Setting>& settings);
+std::int64_t newId(const HostView& host, const Settings& settings);
 
 /// @throws Failure NameTaken a partition of the host has this name
 void requireFreeName(const HostView& host, const std::string& name);

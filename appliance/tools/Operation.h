@@ -8,19 +8,16 @@
 
 #include <vector>
 
-#include "Failure.h"
-#include "Request.h"
+#include "Change.h"
+#include "Command.h"
 
 namespace appliance {
 
-struct Operation {
-    Tool tool;
-    const char* type;     ///< value of -r; null for a tool without resources
-    const char* subtype;  ///< value of --rsubtype; null when there is none
-    const char* name;     ///< value of -o; null when the tool has but one operation
-    /// Carries it out. The state is as before whenever this throws a Failure.
-    void (*run)(const Request& request, const Operation& operation);
-    const char* attributes = "";  ///< that -a or -i may set, with commas between them
+struct Operation : Command {
+    /// Makes the change, which is committed behind it. The state is as before whenever this throws
+    /// a Failure.
+    void (*run)(Change& change, const Operation& operation);
+    bool isTest = false;  ///< only tells whether it could be done
 };
 
 extern const std::vector<Operation> kAllocateOperations;
@@ -31,11 +28,9 @@ extern const std::vector<Operation> kMoveOperations;
 /// All operations of @p tool, in the order of the help; none for a query tool.
 std::vector<Operation> operationsOf(Tool tool);
 
-/// Does what the command line asks of a change tool, and gives what it prints: nothing, or its
-/// help.
-/// @param arguments  null-terminated, without the program's name
+/// Does what the command line asks of a change tool.
 /// @throws Failure whatever is wrong with the request or the state, with nothing changed
-std::string carryOut(Tool tool, const char* const* arguments, Language language);
+void carryOut(const Request& request);
 
 }  // namespace appliance
 

@@ -15,12 +15,9 @@ namespace {
 /// The option's value, which must be one of @p words (with commas between them).
 /// @throws Failure MissingOption, BadOptionValue
 std::string oneOf(const Request& request, const char* option, const char* words) {
-    if (!request.has(option)) throw Failure(Fault::MissingOption, {option});
-    const std::vector<std::string> all = split(words);
+    refuseIf(!request.has(option), Fault::MissingOption, {option});
     std::string value = request.value(option);
-    if (std::find(all.begin(), all.end(), value) == all.end()) {
-        throw Failure(Fault::BadOptionValue, {option, value});
-    }
+    refuseIf(!isListed(words, value), Fault::BadOptionValue, {option, value});
     return value;
 }
 
@@ -30,55 +27,45 @@ std::string oneOf(const Request& request, const char* option, const char* words)
 void requireNoMoveThrough(const HostView& host, const Object& server) {
     for (const Object& lpar : host.all(Kind::Lpar)) {
         const bool leaves = lpar.get("source_sys_name") == host.host().get("name");
-        if (isMoving(lpar) &&
-            lpar.get(leaves ? "source_msp_id" : "dest_msp_id") == server.get("lpar_id")) {
-            throw Failure(Fault::InUse, {lpar.get("lpar_id")});
-        }
+        refuseIf(isMoving(lpar) &&
+                     lpar.get(leaves ? "source_msp_id" : "dest_msp_id") == server.get("lpar_id"),
+                 Fault::InUse, {lpar.get("lpar_id")});
     }
 }
 
-void startLpar(const Request& request, const Operation&) {
+void startLpar(Change& change, const Operation&) {
+    const Request& request = change.request();
     const std::string bootMode =
         request.has("-b") ? oneOf(request, "-b", "norm,dd,ds,of,sms") : std::string();
-    Change change(request);
     const Object lpar = change.lpar();
     const std::string last = lpar.get("curr_profile");
     const std::string usual = last.empty() ? lpar.get("default_profile") : last;
     Activation activation(change.host());
     activation.start(lpar, request.has("-f") ? request.value("-f") : usual, bootMode);
     activation.apply(change);
-    change.commit();
 }
 
-void stopLpar(const Request& request, const Operation& operation) {
-    Change change(request);
+void stopLpar(Change& change, const Operation& operation) {
     Object lpar = change.lpar();
-    requireState(change.host(), {"Operating"});
+    requireState(change.host(), "Operating");
     requireStill(lpar);
-    if (std::string(operation.name) == "shutdown") {
-        requireState(lpar, {"Running", "Open Firmware", "Error"});
-    } else {
-        requireState(lpar, {"Running"});  // so that the system can end itself, or write its dump
-    }
+    // Otherwise it must run, so that the system can end itself, or write its dump.
+    const bool isHard = std::string(operation.last) == "shutdown";
+    requireState(lpar, isHard ? "Running,Open Firmware,Error" : "Running");
     requireNoMoveThrough(change.host(), lpar);
-    if (request.has("--restart") || std::string(operation.name) == "dumprestart") {
-        clearRefcode(lpar);
-        enter(change, change.host(), {lpar}, "Running");
-    } else {
-        enter(change, change.host(), {lpar}, "Not Activated");
-    }
-    change.commit();
+    const bool restarts =
+        change.request().has("--restart") || std::string(operation.last) == "dumprestart";
+    if (restarts) clearRefcode(lpar);
+    enter(change, change.host(), {lpar}, restarts ? "Running" : "Not Activated");
 }
 
-void turnKey(const Request& request, const Operation&) {
-    const std::string position = oneOf(request, "-k", "norm,manual");
-    Change change(request);
+void turnKey(Change& change, const Operation&) {
+    const std::string position = oneOf(change.request(), "-k", "norm,manual");
     Object lpar = change.lpar();
     requireConnection(change.host());
     requireStill(lpar);
     lpar.set("lpar_keylock", position);
     change.put(lpar);
-    change.commit();
 }
 
 // System profiles.
@@ -90,21 +77,19 @@ struct LparProfile {
 
 /// @throws Failure NoSuchSystemProfile
 std::vector<LparProfile> systemProfile(const HostView& host, const std::string& name) {
+    const Object* system = host.find(Kind::SystemProfile, "name", name);
+    refuseIf(system == nullptr, Fault::NoSuchSystemProfile, {name});
     std::map<std::string, std::string> profiles;
     for (const Object& profile : host.all(Kind::Profile)) {
         const Place& place = profile.place();
         profiles[std::to_string(place.lpar) + '/' + std::to_string(place.number)] =
             profile.get("name");
     }
-    for (const Object& system : host.all(Kind::SystemProfile)) {
-        if (system.get("name") != name) continue;
-        std::vector<LparProfile> lpars;
-        for (const std::string& element : split(system.get("lpar_profiles"))) {
-            lpars.push_back({number(element), profiles[element]});
-        }
-        return lpars;
+    std::vector<LparProfile> lpars;
+    for (const std::string& element : split(system->get("lpar_profiles"))) {
+        lpars.push_back({number(element), profiles[element]});
     }
-    throw Failure(Fault::NoSuchSystemProfile, {name});
+    return lpars;
 }
 
 /// Starts those that do not run yet, in this order.
@@ -122,17 +107,15 @@ void start(Activation& activation, const HostView& host, const std::vector<LparP
     }
 }
 
-void startSystemProfile(const Request& request, const Operation& operation) {
-    if (!request.has("-n")) throw Failure(Fault::MissingOption, {"-n"});
-    const bool isTest = operation.name == nullptr;
-    if (!isTest && request.has("--test")) throw Failure(Fault::BadOptionValue, {"-o", "on"});
-    Change change(request);
+void startSystemProfile(Change& change, const Operation& operation) {
+    const Request& request = change.request();
+    refuseIf(!request.has("-n"), Fault::MissingOption, {"-n"});
+    refuseIf(!operation.isTest && request.has("--test"), Fault::BadOptionValue, {"-o", "on"});
     const HostView& host = change.host();
-    requireState(host, {"Operating", "Standby"});
+    requireState(host, "Operating,Standby");
     Activation activation(host);
     start(activation, host, systemProfile(host, request.value("-n")), request.has("--continue"));
     activation.apply(change);
-    isTest ? change.verify() : change.commit();
 }
 
 // Hosts.
@@ -152,9 +135,9 @@ std::vector<LparProfile> lparsToStart(const HostView& host, const Request& reque
 void setState(Change& change, const std::string& state) {
     Object host = change.host().host();
     if (state != "Power Off" && host.get("state") != "Standby") {
-        for (const std::string what :
-             {"sys_keylock", "power_on_side", "power_on_speed", "power_on_speed_override",
-              "mfg_default_ipl_source", "mfg_default_boot_mode"}) {
+        for (const std::string& what :
+             split("sys_keylock,power_on_side,power_on_speed,power_on_speed_override,"
+                   "mfg_default_ipl_source,mfg_default_boot_mode")) {
             host.set("curr_" + what, host.get("pend_" + what));
         }
         host.set("power_on_option", host.get("pend_power_on_option"));
@@ -164,73 +147,55 @@ void setState(Change& change, const std::string& state) {
 }
 
 /// Makes a host without active partitions operate. What cannot start does not keep it from that.
-void operate(Change& change, const Request& request) {
-    const std::vector<LparProfile> lpars = lparsToStart(change.host(), request);
+void operate(Change& change) {
+    const std::vector<LparProfile> lpars = lparsToStart(change.host(), change.request());
     setState(change, "Operating");
     Activation activation(change.host());
     start(activation, change.host(), lpars, true);
     activation.apply(change);
 }
 
-void startHost(const Request& request, const Operation& operation) {
-    const bool standsBy = std::string(operation.name) == "onstandby";
-    if (std::string(operation.name) == "onsysprof" && !request.has("-f")) {
-        throw Failure(Fault::MissingOption, {"-f"});
-    }
-    Change change(request);
-    if (standsBy) {
-        requireState(change.host(), {"Power Off"});
-        setState(change, "Standby");
-    } else {
-        requireState(change.host(), {"Power Off", "Standby"});
-        operate(change, request);
-    }
-    change.commit();
+void startHost(Change& change, const Operation& operation) {
+    const std::string name = operation.last;
+    refuseIf(name == "onsysprof" && !change.request().has("-f"), Fault::MissingOption, {"-f"});
+    const bool standsBy = name == "onstandby";
+    requireState(change.host(), standsBy ? "Power Off" : "Power Off,Standby");
+    if (standsBy) return setState(change, "Standby");
+    operate(change);
 }
 
-void stopHost(const Request& request, const Operation&) {
-    if (request.has("--restart") && !request.has("--immed")) {
-        throw Failure(Fault::MissingOption, {"--immed"});
-    }
-    Change change(request);
+void stopHost(Change& change, const Operation&) {
+    const bool restarts = change.request().has("--restart");
+    const bool isImmediate = change.request().has("--immed");
+    refuseIf(restarts && !isImmediate, Fault::MissingOption, {"--immed"});
     const HostView& host = change.host();
-    requireState(host, {"Operating", "Standby", "Error"});
+    requireState(host, "Operating,Standby,Error");
     std::vector<Object> active;
     for (const Object& lpar : host.all(Kind::Lpar)) {
         requireStill(lpar);
         if (isActive(lpar)) active.push_back(lpar);
     }
-    if (!active.empty() && !request.has("--immed")) throw Failure(Fault::LparsActive);
+    refuseIf(!active.empty() && !isImmediate, Fault::LparsActive);
     enter(change, host, active, "Not Activated");
-    if (request.has("--restart")) {
-        operate(change, request);
-    } else {
-        setState(change, "Power Off");
-    }
-    change.commit();
+    if (restarts) return operate(change);
+    setState(change, "Power Off");
 }
 
 /// The appliance keeps nothing of a host that could differ from the host itself, so there is
 /// nothing to build anew: only a host that it cannot reach refuses.
-void rebuildHost(const Request& request, const Operation&) {
-    Change change(request);
-    requireConnection(change.host());
-}
+void rebuildHost(Change& change, const Operation&) { requireConnection(change.host()); }
 
 // Suspension. It takes no time here, so it is never found under way, nor does it fail halfway.
 
 void requireSuspendable(const HostView& host, const Object& lpar) {
-    requireState(host, {"Operating"});
+    requireState(host, "Operating");
     requireStill(lpar);
-    requireState(lpar, {"Running"});
+    requireState(lpar, "Running");
     const std::string id = lpar.get("lpar_id");
-    if (host.host().get("lpar_suspend_capable") != "1" || lpar.get("suspend_capable") != "1") {
-        throw Failure(Fault::NotSuspendable, {id});
-    }
-    if (lpar.get("lpar_env") == "xbrgserver") throw Failure(Fault::LparStays, {id});
-    for (const Object& slot : host.all(Kind::Slot)) {
-        if (slot.place().lpar == lpar.place().lpar) throw Failure(Fault::PhysicalAdapters, {id});
-    }
+    refuseIf(host.host().get("lpar_suspend_capable") != "1" || lpar.get("suspend_capable") != "1",
+             Fault::NotSuspendable, {id});
+    refuseIf(lpar.get("lpar_env") == "xbrgserver", Fault::LparStays, {id});
+    refuseIf(!host.all(Kind::Slot, lpar.place().lpar).empty(), Fault::PhysicalAdapters, {id});
 }
 
 /// What each operation on a suspension needs, and to which state it leads.
@@ -247,46 +212,44 @@ constexpr Suspension kSuspensions[] = {
     {"recover", true, nullptr, nullptr},        {"shutdown", true, "Suspended", "Not Activated"},
 };
 
-void suspend(const Request& request, const Operation& operation) {
+void suspend(Change& change, const Operation& operation) {
     const Suspension& row =
         *std::find_if(std::begin(kSuspensions), std::end(kSuspensions),
-                      [&](const Suspension& s) { return std::string(s.name) == operation.name; });
+                      [&](const Suspension& s) { return std::string(s.name) == operation.last; });
+    const Request& request = change.request();
     if (row.hasSubject || request.has("-t")) oneOf(request, "-t", "suspend");
-    Change change(request);
     const Object lpar = change.lpar();
-    if (row.from == nullptr) throw Failure(Fault::NoSuspension, {request.value("--id")});
+    refuseIf(row.from == nullptr, Fault::NoSuspension, {request.value("--id")});
     if (std::string(row.from) == "Running") {
         requireSuspendable(change.host(), lpar);
     } else {
-        requireState(change.host(), {"Operating"});
-        requireState(lpar, {row.from});
+        requireState(change.host(), "Operating");
+        requireState(lpar, row.from);
     }
-    if (row.to == nullptr) return;
-    enter(change, change.host(), {lpar}, row.to);
-    change.commit();
+    if (row.to != nullptr) enter(change, change.host(), {lpar}, row.to);
 }
 
 }  // namespace
 
 const std::vector<Operation> kPowerOperations = {
-    {kEdpower, "lpar", nullptr, "on", startLpar},
-    {kEdpower, "lpar", nullptr, "shutdown", stopLpar},
-    {kEdpower, "lpar", nullptr, "osshutdown", stopLpar},
-    {kEdpower, "lpar", nullptr, "dumprestart", stopLpar},
-    {kEdpower, "lpar", nullptr, "chkey", turnKey},
-    {kEdpower, "sys", nullptr, "on", startHost},
-    {kEdpower, "sys", nullptr, "onstandby", startHost},
-    {kEdpower, "sys", nullptr, "onsysprof", startHost},
-    {kEdpower, "sys", nullptr, "off", stopHost},
-    {kEdpower, "sys", nullptr, "rebuild", rebuildHost},
-    {kEdpower, "sysprof", nullptr, "on", startSystemProfile},
-    {kEdpower, "sysprof", nullptr, nullptr, startSystemProfile},
-    {kEdsusp, nullptr, nullptr, "suspend", suspend},
-    {kEdsusp, nullptr, nullptr, "resume", suspend},
-    {kEdsusp, nullptr, nullptr, "validate", suspend},
-    {kEdsusp, nullptr, nullptr, "cancel", suspend},
-    {kEdsusp, nullptr, nullptr, "recover", suspend},
-    {kEdsusp, nullptr, nullptr, "shutdown", suspend},
+    {{kEdpower, "lpar", nullptr, "on"}, startLpar},
+    {{kEdpower, "lpar", nullptr, "shutdown"}, stopLpar},
+    {{kEdpower, "lpar", nullptr, "osshutdown"}, stopLpar},
+    {{kEdpower, "lpar", nullptr, "dumprestart"}, stopLpar},
+    {{kEdpower, "lpar", nullptr, "chkey"}, turnKey},
+    {{kEdpower, "sys", nullptr, "on"}, startHost},
+    {{kEdpower, "sys", nullptr, "onstandby"}, startHost},
+    {{kEdpower, "sys", nullptr, "onsysprof"}, startHost},
+    {{kEdpower, "sys", nullptr, "off"}, stopHost},
+    {{kEdpower, "sys", nullptr, "rebuild"}, rebuildHost},
+    {{kEdpower, "sysprof", nullptr, "on"}, startSystemProfile},
+    {{kEdpower, "sysprof", nullptr, nullptr}, startSystemProfile, true},
+    {{kEdsusp, nullptr, nullptr, "suspend"}, suspend},
+    {{kEdsusp, nullptr, nullptr, "resume"}, suspend},
+    {{kEdsusp, nullptr, nullptr, "validate"}, suspend},
+    {{kEdsusp, nullptr, nullptr, "cancel"}, suspend},
+    {{kEdsusp, nullptr, nullptr, "recover"}, suspend},
+    {{kEdsusp, nullptr, nullptr, "shutdown"}, suspend},
 };
 
 }  // namespace appliance

@@ -98,14 +98,11 @@ constexpr Option kOptions[] = {
      "wer dieses System verwaltet, wenn es ein anderer ist"},
     {"-u", kDomove, "<user>", "the user on that manager", "der Benutzer bei diesem Verwalter"},
     {"--help", kAll, nullptr, "this text", "dieser Text"},
-    {nullptr, 0, nullptr, nullptr, nullptr},
 };
 
 const Option& find(Tool tool, const std::string& name) {
     for (const Option& option : kOptions) {
-        if (option.name != nullptr && name == option.name && (option.tools & tool) != 0) {
-            return option;
-        }
+        if (name == option.name && (option.tools & tool) != 0) return option;
     }
     throw Failure(name.rfind('-', 0) == 0 ? Fault::UnknownOption : Fault::UnexpectedArgument,
                   {name});
@@ -113,11 +110,17 @@ const Option& find(Tool tool, const std::string& name) {
 
 }  // namespace
 
-const Option* options() { return kOptions; }
+std::vector<Option> optionsOf(Tool tool) {
+    std::vector<Option> options;
+    for (const Option& option : kOptions) {
+        if ((option.tools & tool) != 0) options.push_back(option);
+    }
+    return options;
+}
 
-Request::Request(Tool tool, const char* const* arguments) : m_tool(tool) {
+Request::Request(const ToolName& tool, const char* const* arguments) : m_tool(tool) {
     while (*arguments != nullptr) {
-        const Option& option = find(tool, *arguments++);
+        const Option& option = find(tool.tool, *arguments++);
         std::string value;
         if (option.value != nullptr) {
             // The bare -F at the end of a line asks for all attributes.
@@ -128,9 +131,8 @@ Request::Request(Tool tool, const char* const* arguments) : m_tool(tool) {
                 throw Failure(Fault::MissingValue, {option.name});
             }
         }
-        if (!m_values.emplace(option.name, value).second) {
-            throw Failure(Fault::RepeatedOption, {option.name});
-        }
+        refuseIf(!m_values.emplace(option.name, value).second, Fault::RepeatedOption,
+                 {option.name});
     }
 }
 
@@ -143,9 +145,8 @@ std::int64_t Request::number(const char* option, std::int64_t least, std::int64_
                              std::int64_t absent) const {
     if (!has(option)) return absent;
     std::int64_t number = 0;
-    if (!wholeNumber(value(option), &number) || number < least || number > most) {
-        throw Failure(Fault::BadOptionValue, {option, value(option)});
-    }
+    refuseIf(!wholeNumber(value(option), &number) || number < least || number > most,
+             Fault::BadOptionValue, {option, value(option)});
     return number;
 }
 

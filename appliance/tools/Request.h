@@ -4,28 +4,11 @@
 
 #include <map>
 #include <string>
+#include <vector>
+
+#include "Tools.h"
 
 namespace appliance {
-
-/// The tools of the program, as bits, so that an option can name those that have it.
-enum Tool : unsigned {
-    kQyplat = 1,
-    kQyalloc = 2,
-    kQymove = 4,
-    kQyusage = 8,
-    kQyfault = 16,
-    kQylink = 32,
-    kQylwh = 64,
-    kQydyn = 128,
-    kXbrgcli = 256,
-    kEdalloc = 512,
-    kEdplat = 1024,
-    kNwplat = 2048,
-    kDlplat = 4096,
-    kEdpower = 8192,
-    kEdsusp = 16384,
-    kDomove = 32768,
-};
 
 struct Option {
     const char* name;
@@ -35,16 +18,15 @@ struct Option {
     const char* german;
 };
 
-/// All options of all tools, for the help. The row behind the last has no name.
-const Option* options();
+std::vector<Option> optionsOf(Tool tool);
 
 class Request {
 public:
     /// @param arguments  null-terminated, without the program's name
     /// @throws Failure of kind kExitUsage
-    Request(Tool tool, const char* const* arguments);
+    Request(const ToolName& tool, const char* const* arguments);
 
-    Tool tool() const { return m_tool; }
+    const ToolName& tool() const { return m_tool; }
     bool has(const char* option) const { return m_values.count(option) != 0; }
     /// The option's value, empty when it was not given.
     std::string value(const char* option) const;
@@ -54,7 +36,7 @@ public:
                         std::int64_t absent) const;
 
 private:
-    Tool m_tool;
+    const ToolName& m_tool;
     std::map<std::string, std::string> m_values;
 };
 

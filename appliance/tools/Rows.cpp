@@ -73,8 +73,7 @@ std::vector<Row> hostCapacity(const Hosts& hosts, const Request& request) {
 
 std::vector<Row> taggedLpars(const Hosts& hosts, const Request& request) {
     std::vector<Row> rows = each<Kind::Lpar>(hosts, request);
-    const auto isOther = [](const Row& row) { return row.lpar->get("lpar_env") != "osq00"; };
-    rows.erase(std::remove_if(rows.begin(), rows.end(), isOther), rows.end());
+    keep(rows, [](const Row& row) { return row.lpar->get("lpar_env") == "osq00"; });
     return rows;
 }
 
@@ -102,30 +101,29 @@ std::vector<Row> singleHostManager(const Hosts& hosts, const Request& request) {
 }
 
 std::vector<Row> dynamicLpars(const Hosts& hosts, const Request& request) {
-    if (!request.has("-dlpar")) throw Failure(Fault::MissingOption, {"-dlpar"});
+    refuseIf(!request.has("-dlpar"), Fault::MissingOption, {"-dlpar"});
     return each<Kind::Lpar>(hosts, request);
 }
 
 std::vector<Row> ioServer(const Hosts& hosts, const Request& request) {
     for (const char* option : {"-m", "--id"}) {
-        if (request.value(option).empty()) throw Failure(Fault::MissingOption, {option});
+        refuseIf(request.value(option).empty(), Fault::MissingOption, {option});
     }
     const std::string id = request.value("--id");
     const HostView& host = *hosts.front();
     const Object* lpar = host.lpar(request.number("--id", 1, 65'535, 0));
-    if (lpar == nullptr) throw Failure(Fault::LparIdNotFound, {id});
-    if (lpar->get("lpar_env") != "xbrgserver") throw Failure(Fault::NotIoServer, {id});
-    if (lpar->get("state") != "Running") throw Failure(Fault::LparNotRunning, {id});
+    refuseIf(lpar == nullptr, Fault::LparIdNotFound, {id});
+    refuseIf(lpar->get("lpar_env") != "xbrgserver", Fault::NotIoServer, {id});
+    refuseIf(lpar->get("state") != "Running", Fault::LparNotRunning, {id});
     return {rowOf(host, *lpar)};
 }
 
 std::vector<Row> ioServerMappings(const Hosts& hosts, const Request& request) {
     const Object* server = ioServer(hosts, request).front().lpar;
     std::vector<Row> rows = each<Kind::VirtualScsi>(hosts, request);
-    const auto isOther = [&](const Row& row) {
-        return row.lpar != server || row.self->get("adapter_type") != "server";
-    };
-    rows.erase(std::remove_if(rows.begin(), rows.end(), isOther), rows.end());
+    keep(rows, [&](const Row& row) {
+        return row.lpar == server && row.self->get("adapter_type") == "server";
+    });
     return rows;
 }
 

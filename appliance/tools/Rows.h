@@ -1,4 +1,4 @@
-/// The records that resources cover: functions of the type Rows.
+/// The records that resources cover.
 #ifndef APPLIANCE_ROWS_H
 #define APPLIANCE_ROWS_H
 
@@ -7,6 +7,13 @@
 #include "Resource.h"
 
 namespace appliance {
+
+/// Leaves those of @p rows for which @p holds.
+template <typename Condition>
+void keep(std::vector<Row>& rows, Condition holds) {
+    const auto isOther = [&](const Row& row) { return !holds(row); };
+    rows.erase(std::remove_if(rows.begin(), rows.end(), isOther), rows.end());
+}
 
 std::vector<Row> eachHost(const Hosts& hosts, const Request& request);
 
@@ -21,8 +28,7 @@ std::vector<Row> each(const Hosts& hosts, const Request&) {
         }
         if (sizeof...(kinds) == 1) continue;
         std::stable_sort(rows.begin() + begin, rows.end(), [](const Row& a, const Row& b) {
-            const Place &p = a.self->place(), &q = b.self->place();
-            return p.lpar != q.lpar ? p.lpar < q.lpar : p.number < q.number;
+            return a.self->place() < b.self->place();
         });
     }
     return rows;
@@ -32,8 +38,7 @@ std::vector<Row> each(const Hosts& hosts, const Request&) {
 template <Kind kind>
 std::vector<Row> eachUsed(const Hosts& hosts, const Request& request) {
     std::vector<Row> rows = each<kind>(hosts, request);
-    const auto isFree = [](const Row& row) { return row.lpar == nullptr; };
-    rows.erase(std::remove_if(rows.begin(), rows.end(), isFree), rows.end());
+    keep(rows, [](const Row& row) { return row.lpar != nullptr; });
     return rows;
 }
 

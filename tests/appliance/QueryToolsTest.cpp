@@ -2,6 +2,12 @@
 
 #include <gtest/gtest.h>
 
+#include "QyallocCmdCaller.h"
+#include "QyfaultCmdCaller.h"
+#include "QylinkCmdCaller.h"
+#include "QymoveCmdCaller.h"
+#include "QyplatCmdCaller.h"
+#include "QyusageCmdCaller.h"
 #include "Text.h"
 #include "ToolRecords.h"
 
@@ -20,96 +26,84 @@ protected:
         for (const Record& record : recordsOf(run(command).out)) values.push_back(record[0]);
         return values;
     }
+
+    /// Asks for every attribute alone, and for all at once with their names and with a bare -F.
+    void expectAnswers(const std::string& command, const std::vector<std::string>& attributes) {
+        std::string names;
+        for (const std::string& name : attributes) names += (names.empty() ? "" : ",") + name;
+        const auto whole = recordsOf(out(command + " -F " + names));
+        const auto bare = recordsOf(out(command + " -F"));
+        ASSERT_EQ(whole.size(), bare.size()) << command;
+        for (std::size_t i = 0; i < attributes.size(); ++i) {
+            const auto one = recordsOf(out(command + " -F " + attributes[i]));
+            ASSERT_EQ(whole.size(), one.size()) << command << ' ' << attributes[i];
+            bool hasValue = false;
+            for (std::size_t row = 0; row < one.size(); ++row) {
+                ASSERT_EQ(1U, one[row].size()) << command << ' ' << attributes[i];
+                ASSERT_EQ(attributes.size(), whole[row].size()) << command;
+                ASSERT_EQ(attributes.size(), bare[row].size()) << command;
+                hasValue = hasValue || !one[row][0].empty();
+                // Values that change from one call to the next.
+                if (attributes[i].find("time") != std::string::npos) continue;
+                if (attributes[i].find("cycles") != std::string::npos) continue;
+                EXPECT_EQ(whole[row][i], one[row][0]) << command << ' ' << attributes[i];
+                EXPECT_EQ(whole[row][i], bare[row][i]) << command << ' ' << attributes[i];
+            }
+            EXPECT_TRUE(hasValue) << command << ' ' << attributes[i];
+        }
+    }
 };
 
+// The names, and their order, are those by which the library asks.
 TEST_F(QueryToolsTest, EveryAttributeAnswers) {
+    using Alloc = zemQyallocCmdCaller;
+    using Memory = Alloc::MemoryResourceAttribute;
+    using Processors = Alloc::ProcessorResourceAttribute;
+    using Virtual = Alloc::VirtualIOResourceAttribute;
+    using Physical = Alloc::PhyIOResourceAttribute;
+    // clang-format off
     const struct {
         const char* command;
-        const char* names;
+        zemAttributeNames attributes;
     } rows[] = {
-        {"qyalloc -r mem --level lpar",
-         "lpar_id,lpar_name,curr_min_mem,curr_mem,curr_max_mem,pend_min_mem,pend_mem,pend_max_mem,"
-         "run_min_mem,run_mem,mem_mode,pend_mem_weight,curr_mem_weight,run_mem_weight,"
-         "pend_io_entitled_mem,curr_io_entitled_mem,run_io_entitled_mem,auto_io_entitled_mem,"
-         "primary_psp_name,primary_psp_id,secondary_psp_name,secondary_psp_id,curr_psp_id,"
-         "curr_psp_name"},
-        {"qyalloc -r mem --level sys --maxmem 512",
-         "configurable_sys_mem,curr_avail_sys_mem,pend_avail_sys_mem,installed_sys_mem,"
-         "deconfig_sys_mem,sys_firmware_mem,mem_region_size,required_min_mem_tmx_linux,"
-         "required_min_mem_osq00,max_mem_pools"},
-        {"qyalloc -r proc --level lpar",
-         "lpar_id,lpar_name,curr_shared_proc_pool_id,curr_proc_mode,curr_min_proc_units,"
-         "curr_proc_units,curr_max_proc_units,curr_min_procs,curr_procs,curr_max_procs,"
-         "curr_sharing_mode,curr_uncap_weight,pend_shared_proc_pool_id,pend_proc_mode,"
-         "pend_min_proc_units,pend_proc_units,pend_max_proc_units,pend_min_procs,pend_procs,"
-         "pend_max_procs,pend_sharing_mode,pend_uncap_weight,run_proc_units,run_procs,"
-         "run_uncap_weight"},
-        {"qyalloc -r proc --level pool",
-         "shared_proc_pool_id,configurable_pool_proc_units,curr_avail_pool_proc_units,"
-         "pend_avail_pool_proc_units"},
-        {"qyalloc -r proc --level sys --procunits 2",
-         "configurable_sys_proc_units,curr_avail_sys_proc_units,pend_avail_sys_proc_units,"
-         "installed_sys_proc_units,deconfig_sys_proc_units,min_proc_units_per_virtual_proc,"
-         "max_shared_proc_pools,configurable_pool_proc_uints,pend_pool_mem"},
-        {"qyalloc -r mempool",
-         "curr_pool_mem,pend_pool_mem,curr_max_pool_mem,pend_max_pool_mem,sys_firmware_pool_mem,"
-         "pend_avail_pool_mem,psp_names,psp_ids"},
-        {"qyalloc -r procpool",
-         "name,shared_proc_pool_id,max_pool_proc_units,curr_reserved_pool_proc_units,"
-         "pend_reserved_pool_proc_units,lpar_names,lpar_ids"},
-        {"qyalloc -r virtualio --rsubtype eth --level lpar",
-         "lpar_id,lpar_name,slot_num,state,ieee_virtual_eth,port_vlan_id,addl_vlan_ids,is_trunk,"
-         "is_required,mac_addr,trunk_priority"},
-        {"qyalloc -r virtualio --rsubtype eth --level sys", "max_vlans_per_port,mac_prefix"},
-        {"qyalloc -r virtualio --rsubtype hsl", "hsl_pool_id,lpar_names,lpar_ids"},
-        {"qyalloc -r virtualio --rsubtype virtualopti --level sys",
-         "virtual_opti_pool_id,lpar_names,lpar_ids"},
-        {"qyalloc -r virtualio --rsubtype scsi --level lpar",
-         "lpar_id,lpar_name,slot_num,state,adapter_type,remote_lpar_id,remote_lpar_name,"
-         "remote_slot_num,is_required,backing_devices"},
-        {"qyalloc -r virtualio --rsubtype serial --level lpar",
-         "lpar_id,lpar_name,slot_num,state,is_required,connect_status,adapter_type,supports_dnx,"
-         "remote_lpar_id,remote_lpar_name,remote_slot_num"},
-        {"qyalloc -r virtualio --rsubtype slot --level lpar",
-         "lpar_id,lpar_name,curr_max_virtual_slots,pend_max_virtual_slots"},
-        {"qyalloc -r virtualio --rsubtype slot --level slot",
-         "lpar_id,lpar_name,slot_num,config,state,drc_name"},
-        {"qyalloc -r io --rsubtype unit", "unit_phys_loc"},
-        {"qyalloc -r io --rsubtype bus",
-         "unit_phys_loc,bus_id,backplane_phys_loc,bus_drc_index,bus_drc_name"},
-        {"qyalloc -r io --rsubtype slot",
-         "lpar_id,unit_phys_loc,bus_id,phys_loc,drc_index,slot_io_pool_id,description,"
-         "feature_codes,pci_vendor_id,pci_device_id,pci_subs_vendor_id,pci_subs_device_id,"
-         "pci_class,pci_revision_id,bus_grouping,iop,parent_slot_drc_index,drc_name"},
-        {"qyalloc -r io --rsubtype iopool --level pool", "max_io_pools"},
-        {"qyalloc -r io --rsubtype taggedio",
-         "lpar_id,lpar_name,load_source_slot,alt_restart_device_slot,"
-         "recent_alt_restart_device_slot,console_slot,alt_console_slot,op_console_slot"},
-        {"qymove -r lpar",
-         "name,lpar_id,migration_state,migration_type,source_sys_name,dest_sys_name,"
-         "source_lpar_id,dest_lpar_id,source_msp_name,source_msp_id,dest_msp_name,dest_msp_id,"
-         "bytes_transmitted,bytes_remaining"},
-        {"qymove -r sys",
-         "inactive_lpar_mobility_capable,num_inactive_migrations_supported,"
-         "num_inactive_migrations_in_progress,active_lpar_mobility_capable,"
-         "num_active_migrations_supported,num_active_migrations_in_progress"},
-        {"qymove -r manager", "remote_lpar_mobility_capable"},
-        {"qyusage -r sys --endyear 2100 -n 1 ",
-         "time,event_type,resource_type,sys_time,state,configurable_sys_proc_units,"
-         "configurable_sys_mem,curr_avail_sys_proc_units,curr_avail_7460_wkl_percent,"
-         "curr_avail_sys_mem,sys_firmware_mem,proc_cycles_per_second"},
-        {"qyusage -r lpar -n 1",
-         "time,event_type,resource_type,sys_time,time_cycles,lpar_name,lpar_id,curr_proc_mode,"
-         "curr_procs,curr_sharing_mode,curr_7460_wkl_percent,curr_mem,entitled_cycles,"
-         "capped_cycles,uncapped_cycles,mem_mode"},
-        {"qyusage -r config", "type_model_serial_num,name,sample_rate"},
-        {"qylink -r all",
-         "resource_type,type_model_serial_num,sp,sp_phys_loc,ipaddr,alt_ipaddr,state,"
-         "connection_error_code"},
-        {"qyfault -r lpar", "lpar_name,lpar_id,time_stamp,refcode,word2,fru_call_out_loc_codes"},
-        {"qyfault -r sys", "refcode_num,refcode"},
+        {"qyplat -r sys", zemQyplatCmdCaller::ManagedSystemAttribute::m_attributeName},
+        {"qyplat -r lpar", zemQyplatCmdCaller::PartitionAttribute::m_attributeName},
+        {"qyplat -r prof", zemQyplatCmdCaller::PartitionProfileAttribute::m_attributeName},
+        {"qyalloc -r mem --level lpar", Memory::LparLevelAttribute::m_attributeName},
+        {"qyalloc -r mem --level sys --maxmem 512", Memory::SysLevelAttribute::m_attributeName},
+        {"qyalloc -r proc --level lpar", Processors::LparLevelAttribute::m_attributeName},
+        {"qyalloc -r proc --level pool", Processors::PoolLevelAttribute::m_attributeName},
+        {"qyalloc -r proc --level sys --procunits 2", Processors::SysLevelAttribute::m_attributeName},
+        {"qyalloc -r mempool", Alloc::MemoryPoolAttribute::m_attributeName},
+        {"qyalloc -r procpool", Alloc::ProcessorPoolAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype eth --level lpar", Virtual::EthLparLevelAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype eth --level sys", Virtual::EthSysLevelAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype hsl", Virtual::HSLAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype virtualopti --level sys", Virtual::VirtualOptiAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype scsi --level lpar", Virtual::SCSILparLevelAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype serial --level lpar", Virtual::SerialLparLevelAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype slot --level lpar", Virtual::SlotLparLevelAttribute::m_attributeName},
+        {"qyalloc -r virtualio --rsubtype slot --level slot", Virtual::SlotSlotLevelAttribute::m_attributeName},
+        {"qyalloc -r io --rsubtype unit", Physical::UnitAttribute::m_attributeName},
+        {"qyalloc -r io --rsubtype bus", Physical::BusAttribute::m_attributeName},
+        {"qyalloc -r io --rsubtype slot", Physical::SlotAttribute::m_attributeName},
+        {"qyalloc -r io --rsubtype iopool --level pool", Physical::IOPoolAttribute::m_attributeName},
+        {"qyalloc -r io --rsubtype taggedio", Physical::TaggedIOAttribute::m_attributeName},
+        {"qymove -r lpar", zemQymoveCmdCaller::PartitionAttribute::m_attributeName},
+        {"qymove -r sys", zemQymoveCmdCaller::ManagedSystemAttribute::m_attributeName},
+        {"qymove -r manager", zemQymoveCmdCaller::ManagerSystemAttribute::m_attributeName},
+        {"qyusage -r sys --endyear 2100 -n 1 ", zemQyusageCmdCaller::ManagedSystemAttribute::m_attributeName},
+        {"qyusage -r lpar -n 1", zemQyusageCmdCaller::PartitionAttribute::m_attributeName},
+        {"qyusage -r config", zemQyusageCmdCaller::ConfigurationAttribute::m_attributeName},
+        {"qylink -r all", zemQylinkCmdCaller::ALL::m_attributeName},
+        {"qyfault -r lpar", zemQyfaultCmdCaller::PartitionAttribute::m_attributeName},
+        {"qyfault -r sys", zemQyfaultCmdCaller::ManagedSystemAttribute::m_attributeName},
     };
-    for (const auto& row : rows) EXPECT_EQ("", faultsOfTable(m_appliance, row.command, row.names));
+    // clang-format on
+    for (const auto& row : rows) {
+        const char* const* first = row.attributes.names;
+        expectAnswers(row.command, {first, first + row.attributes.count});
+    }
 }
 
 TEST_F(QueryToolsTest, AnswersAndFailures) {

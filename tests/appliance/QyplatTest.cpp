@@ -14,54 +14,6 @@ protected:
     QyplatTest() { make("init"); }
 };
 
-TEST_F(QyplatTest, EveryAttributeAnswers) {
-    EXPECT_EQ(
-        "",
-        faultsOfTable(
-            m_appliance, "qyplat -r sys",
-            "name,type_model,serial_num,ipaddr,state,sys_time,power_off_policy,cod_mem_capable,"
-            "cod_proc_capable,micro_lpar_capable,osq00_capable,max_lpars,max_power_ctrl_lpars,"
-            "service_lpar_id,mfg_default_config,active_lpar_mobility_capable,"
-            "inactive_lpar_mobility_capable,lpar_proc_compat_mode_capable,lpar_proc_compat_modes,"
-            "virtual_io_server_capable,lhea_capable,virtual_switch_capable,"
-            "active_lpar_share_idle_procs_capable,bsr_capable,electronic_err_reporting_capable,"
-            "hca_capable,huge_page_mem_capable,lpar_avail_priority_capable,7460_application_"
-            "capable,"
-            "redundant_err_path_reporting_capable,shared_eth_failover_capable,"
-            "sni_msg_passing_capable,sp_failover_capable,vet_activation_capable,"
-            "assign_7460_wkl_percent,curr_sys_keylock,pend_sys_keylock,curr_power_on_side,"
-            "pend_power_on_side,curr_power_on_speed,pend_power_on_speed,curr_power_on_speed_"
-            "override,"
-            "pend_power_on_speed_override,power_on_type,power_on_option,pend_power_on_option,"
-            "power_on_method,power_on_attr,sp_boot_attr,sp_boot_major_type,sp_boot_minor_type,"
-            "sp_version,curr_mfg_default_ipl_source,pend_mfg_default_ipl_source,"
-            "curr_mfg_default_boot_mode,pend_mfg_default_boot_mode,sp_failover_enabled,"
-            "lpar_suspend_capable,coralhv_lpar_remote_restart_capable,max_suspend_capable_lpars,"
-            "max_remote_restart_capable_lpars,active_mem_sharing_capable"));
-    EXPECT_EQ("", faultsOfTable(
-                      m_appliance, "qyplat -r lpar",
-                      "lpar_id,name,lpar_env,state,resource_config,os_version,logical_serial_num,"
-                      "default_profile,curr_profile,work_group_id,shared_proc_pool_util_auth,"
-                      "allow_perf_collection,power_ctrl_lpar_ids,boot_mode,lpar_keylock,auto_start,"
-                      "desired_lpar_proc_compat_mode,curr_lpar_proc_compat_mode,migration_state,"
-                      "redundant_err_path_reporting,suspend_capable,remote_restart_capable,"
-                      "remote_restart_status"));
-    EXPECT_EQ(
-        "",
-        faultsOfTable(
-            m_appliance, "qyplat -r prof",
-            "lpar_id,lpar_name,name,lpar_env,all_resources,min_mem,desired_mem,max_mem,mem_mode,"
-            "mem_weight,desired_io_entitled_mem,primary_psp_id,primary_psp_name,secondary_psp_id,"
-            "secondary_psp_name,proc_mode,min_proc_units,desired_proc_units,max_proc_units,min_"
-            "procs,"
-            "desired_procs,max_procs,sharing_mode,uncap_weight,io_slots,load_source_slot,"
-            "alt_restart_device_slot,console_slot,alt_console_slot,op_console_slot,lpar_io_pool_"
-            "ids,"
-            "max_virtual_slots,virtual_serial_adapters,virtual_scsi_adapters,virtual_eth_adapters,"
-            "boot_mode,conn_monitoring,auto_start,power_ctrl_lpar_ids,shared_proc_pool_id,"
-            "lpar_proc_compat_mode,hca_adapters,work_group_id,redundant_err_path_reporting"));
-}
-
 TEST_F(QyplatTest, AnswersAndFailures) {
     expectRows({
         // Which hosts.

@@ -4,7 +4,6 @@
 
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <string>
 #include <vector>
 
@@ -36,42 +35,6 @@ inline std::vector<Record> recordsOf(const std::string& output) {
         records.push_back(fieldsOf(line));
     }
     return records;
-}
-
-/// Whether the values of an attribute change from one call to the next.
-inline bool moves(const std::string& attribute) {
-    return attribute.find("time") != std::string::npos ||
-           attribute.find("cycles") != std::string::npos;
-}
-
-/// Asks for every attribute of @p names (with commas between them) alone, and for all at once.
-/// @return what is wrong, empty when each has a value in some record and the answers agree
-inline std::string faultsOfTable(testing_support::TestAppliance& appliance,
-                                 const std::string& command, const std::string& names) {
-    const auto whole = recordsOf(appliance.run(command + " -F " + names).out);
-    const auto bare = recordsOf(appliance.run(command + " -F").out);
-    const Record attributes = fieldsOf(names);
-    const auto agree = [&](const std::vector<Record>& records, std::size_t width, std::size_t from,
-                           std::size_t at) {
-        if (records.size() != whole.size()) return false;
-        for (std::size_t i = 0; i < records.size(); ++i) {
-            if (records[i].size() != width || whole[i].size() != attributes.size()) return false;
-            if (!moves(attributes[at]) && records[i][from] != whole[i][at]) return false;
-        }
-        return true;
-    };
-    std::string faults;
-    for (std::size_t i = 0; i < attributes.size(); ++i) {
-        const auto one = appliance.run(command + " -F " + attributes[i]);
-        const auto records = recordsOf(one.out);
-        const bool hasValue = std::any_of(records.begin(), records.end(),
-                                          [](const Record& record) { return record[0] != ""; });
-        if (one.exit != 0 || !hasValue || !agree(records, 1, 0, i) ||
-            !agree(bare, attributes.size(), i, i)) {
-            faults += command + ' ' + attributes[i] + ": " + one.err + '\n';
-        }
-    }
-    return faults;
 }
 
 /// A command line, and what it answers: on standard error if that begins with a message's code.

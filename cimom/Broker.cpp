@@ -72,17 +72,16 @@ const CimClass* Broker::classOf(const ObjectPath& path) const {
 
 void Broker::setLogHook(std::function<void(const LogLine&)> hook) {
     std::lock_guard<std::mutex> lock(m_hookMutex);
-    m_hook = hook ? std::make_shared<const std::function<void(const LogLine&)>>(std::move(hook))
-                  : nullptr;
+    m_hook = std::move(hook);
 }
 
 void Broker::log(const LogLine& line) {
-    std::shared_ptr<const std::function<void(const LogLine&)>> hook;
+    std::function<void(const LogLine&)> hook;
     {
         std::lock_guard<std::mutex> lock(m_hookMutex);
         hook = m_hook;
     }
-    if (hook) (*hook)(line);
+    if (hook) hook(line);
 }
 
 void* Broker::allocate(void* old, std::size_t size, bool zeroed) {
@@ -102,6 +101,12 @@ void Broker::freeBlock(void* block) {
         std::free(block);
     else
         countStaleUse();
+}
+
+std::vector<std::string> namesIn(const char** names) {
+    const char** end = names;
+    while (*end) ++end;
+    return {names, end};
 }
 
 // -- Activation -----------------------------------------------------------------------------------
@@ -137,12 +142,12 @@ NamedValues contextOf(const Request& request, bool lean) {
 Request requestOf(const NamedValues& contextEntries) {
     Request request;
     for (const auto& [name, value] : contextEntries) {
-        const bool isText = value.type() == CMPI_string;
-        if (sameName(name, CMPIPrincipal) && isText) {
-            if (!value.isNull()) request.user = value.text();
-        } else if (sameName(name, CMPIAcceptLanguage) && isText && !value.isNull()) {
+        const bool isText = value.type() == CMPI_string && !value.isNull();
+        if (sameName(name, CMPIPrincipal) && value.type() == CMPI_string) {
+            if (isText) request.user = value.text();
+        } else if (sameName(name, CMPIAcceptLanguage) && isText) {
             request.language = value.text();
-        } else if (sameName(name, CMPIInitNameSpace) && isText && !value.isNull()) {
+        } else if (sameName(name, CMPIInitNameSpace) && isText) {
             request.nameSpace = value.text();
         } else if (sameName(name, CMPIInvocationFlags) && value.type() == CMPI_uint32 &&
                    !value.isNull()) {

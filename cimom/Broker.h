@@ -12,7 +12,7 @@
 #include <string>
 #include <unordered_set>
 
-#include "Classes.h"
+#include "ClassRepository.h"
 #include "Messages.h"
 #include "Objects.h"
 #include "Server.h"
@@ -62,7 +62,7 @@ private:
     MessageStore m_messages;
 
     std::mutex m_hookMutex;
-    std::shared_ptr<const std::function<void(const LogLine&)>> m_hook;
+    std::function<void(const LogLine&)> m_hook;
     std::mutex m_blocksMutex;
     std::unordered_set<void*> m_blocks;
     std::atomic<std::ptrdiff_t> m_live{0};
@@ -109,6 +109,18 @@ CMPIStatus brokerStatus(const CMPIBroker* mb, F body) {
     brokerEntry(mb, &status, body);
     return status;
 }
+template <auto Body, class R, class... A>
+struct EntryPoint<const CMPIBroker, Body, R (*)(Broker&, A...)> {
+    static R run(const CMPIBroker* mb, A... arguments, CMPIStatus* rc) {
+        return brokerEntry(mb, rc, [&](Broker& broker) { return Body(broker, arguments...); });
+    }
+};
+template <auto Body, class... A>
+struct EntryPoint<const CMPIBroker, Body, void (*)(Broker&, A...)> {
+    static CMPIStatus run(const CMPIBroker* mb, A... arguments) {
+        return brokerStatus(mb, [&](Broker& broker) { Body(broker, arguments...); });
+    }
+};
 
 // -- the function tables, by source --------------------------------------------------------------
 
@@ -118,6 +130,14 @@ void endTableAfter(T& table, M T::*last) {
     char* const begin = reinterpret_cast<char*>(&table);
     char* const end = reinterpret_cast<char*>(&(table.*last)) + sizeof(M);
     std::fill(end, begin + sizeof(T), '\0');
+}
+
+/// A table with its version; small brokers have another one and end behind @p leanEnd.
+template <class T, class M, class... Entries>
+T brokerTable(bool lean, int leanVersion, M T::*leanEnd, Entries... entries) {
+    T table = {lean ? leanVersion : CMPIVersion200, entries...};
+    if (lean) endTableAfter(table, leanEnd);
+    return table;
 }
 
 CMPIBrokerFT operationTable(bool lean);         // BrokerOperations.cpp
@@ -140,6 +160,8 @@ InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path);
 /// @throws Failure CMPI_RC_ERR_NO_SUCH_PROPERTY, CMPI_RC_ERR_TYPE_MISMATCH
 void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& name, Value value);
 
+/// The names of a null-terminated list.
+std::vector<std::string> namesIn(const char** names);
 /// Whether an instance is of the query's class, or one below it, and meets its condition.
 bool instanceMatches(Broker& broker, const Query& query, const Instance& instance);
 /// The fields of a new CMPIError.

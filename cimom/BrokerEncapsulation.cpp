@@ -14,85 +14,58 @@ namespace {
 
 // -- making -----------------------------------------------------------------------------------
 
-CMPIInstance* newInstance(const CMPIBroker* mb, const CMPIObjectPath* path, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [path](Broker& broker) {
-        return make<CMPIInstance>(broker, newInstanceOf(broker, bodyOf(path)));
-    });
+CMPIInstance* newInstance(Broker& broker, const CMPIObjectPath* path) {
+    return make<CMPIInstance>(broker, newInstanceOf(broker, bodyOf(path)));
 }
-CMPIObjectPath* newObjectPath(const CMPIBroker* mb, const char* nameSpace, const char* className,
-                              CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        return make<CMPIObjectPath>(broker, ObjectPath(textOf(nameSpace), textOf(className)));
-    });
+CMPIObjectPath* newObjectPath(Broker& broker, const char* nameSpace, const char* className) {
+    return make<CMPIObjectPath>(broker, ObjectPath(textOf(nameSpace), textOf(className)));
 }
-CMPIArgs* newArgs(const CMPIBroker* mb, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [](Broker& broker) { return make<CMPIArgs>(broker, {}); });
+CMPIArgs* newArgs(Broker& broker) { return make<CMPIArgs>(broker, {}); }
+CMPIString* newString(Broker& broker, const char* text) { return makeString(broker, textOf(text)); }
+CMPIArray* newArray(Broker& broker, CMPICount size, CMPIType type) {
+    const Value null = readValue(nullptr, type);
+    if (null.isArray() || null.type() == CMPI_null || !isValueType(null.type()))
+        throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE, "type " + std::to_string(type));
+    return make<CMPIArray>(broker, {null.type(), Value::Array(size, null)});
 }
-CMPIString* newString(const CMPIBroker* mb, const char* text, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [text](Broker& broker) { return makeString(broker, textOf(text)); });
+CMPIDateTime* newDateTime(Broker& broker) { return make<CMPIDateTime>(broker, DateTime::now()); }
+CMPIDateTime* newDateTimeFromBinary(Broker& broker, CMPIUint64 micros, CMPIBoolean interval) {
+    return make<CMPIDateTime>(broker, DateTime::fromBinary(micros, interval != 0));
 }
-CMPIArray* newArray(const CMPIBroker* mb, CMPICount size, CMPIType type, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        const Value null = readValue(nullptr, type);
-        if (null.isArray() || null.type() == CMPI_null || !isValueType(null.type()))
-            throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE, "type " + std::to_string(type));
-        return make<CMPIArray>(broker, {null.type(), Value::Array(size, null)});
-    });
+CMPIDateTime* newDateTimeFromChars(Broker& broker, const char* text) {
+    DateTime when;
+    if (!DateTime::parse(textOf(text), when))
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no date-time: " + textOf(text));
+    return make<CMPIDateTime>(broker, when);
 }
-CMPIDateTime* newDateTime(const CMPIBroker* mb, CMPIStatus* rc) {
-    return brokerEntry(mb, rc,
-                       [](Broker& broker) { return make<CMPIDateTime>(broker, DateTime::now()); });
+CMPISelectExp* newSelectExp(Broker& broker, const char* text, const char* language,
+                            CMPIArray** projection) {
+    auto query = Query::parse(textOf(text), textOf(language));
+    if (projection) {
+        const auto& names = query->projection();
+        *projection = names.empty()
+                          ? nullptr
+                          : make<CMPIArray>(broker, {CMPI_string, {names.begin(), names.end()}});
+    }
+    return make<CMPISelectExp>(broker, std::move(query));
 }
-CMPIDateTime* newDateTimeFromBinary(const CMPIBroker* mb, CMPIUint64 micros, CMPIBoolean interval,
-                                    CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        return make<CMPIDateTime>(broker, DateTime::fromBinary(micros, interval != 0));
-    });
-}
-CMPIDateTime* newDateTimeFromChars(const CMPIBroker* mb, const char* text, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [text](Broker& broker) {
-        DateTime when;
-        if (!DateTime::parse(textOf(text), when))
-            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no date-time: " + textOf(text));
-        return make<CMPIDateTime>(broker, when);
-    });
-}
-CMPISelectExp* newSelectExp(const CMPIBroker* mb, const char* text, const char* language,
-                            CMPIArray** projection, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        auto query = Query::parse(textOf(text), textOf(language));
-        if (projection) {
-            Value::Array names;
-            for (const std::string& name : query->projection()) names.emplace_back(name);
-            *projection =
-                names.empty() ? nullptr : make<CMPIArray>(broker, {CMPI_string, std::move(names)});
-        }
-        return make<CMPISelectExp>(broker, std::move(query));
-    });
-}
-CMPIError* newError(const CMPIBroker* mb, const char* owner, const char* messageId,
-                    const char* message, const CMPIErrorSeverity severity,
-                    const CMPIErrorProbableCause cause, const CMPIrc code, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        return make<CMPIError>(broker,
-                               newErrorFields(owner, messageId, message, severity, cause, code));
-    });
+CMPIError* newError(Broker& broker, const char* owner, const char* messageId, const char* message,
+                    CMPIErrorSeverity severity, CMPIErrorProbableCause cause, CMPIrc code) {
+    return make<CMPIError>(broker,
+                           newErrorFields(owner, messageId, message, severity, cause, code));
 }
 
 // -- asking -----------------------------------------------------------------------------------
 
-CMPIBoolean classPathIsA(const CMPIBroker* mb, const CMPIObjectPath* path, const char* className,
-                         CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) -> CMPIBoolean {
-        const std::string& mine = bodyOf(path).className;
-        const std::string other = textOf(className);
-        if (other.empty()) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no class name");
-        if (sameName(mine, other)) return 1;
-        if (!broker.classes()) return 0;
-        if (!broker.lean() && !broker.classes()->findClass(mine))
-            throw Failure(CMPI_RC_ERR_NOT_FOUND, "no class " + mine);
-        return broker.classes()->isA(mine, other) ? 1 : 0;
-    });
+CMPIBoolean classPathIsA(Broker& broker, const CMPIObjectPath* path, const char* className) {
+    const std::string& mine = bodyOf(path).className;
+    const std::string other = textOf(className);
+    if (other.empty()) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no class name");
+    if (sameName(mine, other)) return 1;
+    if (!broker.classes()) return 0;
+    if (!broker.lean() && !broker.classes()->findClass(mine))
+        throw Failure(CMPI_RC_ERR_NOT_FOUND, "no class " + mine);
+    return broker.classes()->isA(mine, other);
 }
 
 // In the order of Kinds.
@@ -136,19 +109,15 @@ std::string describe(Node& node) {
     });
 }
 
-CMPIString* objectText(const CMPIBroker* mb, const void* object, CMPIStatus* rc) {
-    return brokerEntry(
-        mb, rc, [object](Broker& broker) { return makeString(broker, describe(anyNode(object))); });
+CMPIString* objectText(Broker& broker, const void* object) {
+    return makeString(broker, describe(anyNode(object)));
 }
-CMPIBoolean isOfType(const CMPIBroker* mb, const void* object, const char* type, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker&) -> CMPIBoolean {
-        return textOf(type) == kObjectTypes[anyNode(object).chunk->kind] ? 1 : 0;
-    });
+const char* typeOfObject(const void* object) { return kObjectTypes[anyNode(object).chunk->kind]; }
+CMPIBoolean isOfType(Broker&, const void* object, const char* type) {
+    return textOf(type) == typeOfObject(object);
 }
-CMPIString* getType(const CMPIBroker* mb, const void* object, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [object](Broker& broker) {
-        return makeString(broker, kObjectTypes[anyNode(object).chunk->kind]);
-    });
+CMPIString* getType(Broker& broker, const void* object) {
+    return makeString(broker, typeOfObject(object));
 }
 
 // -- messages ---------------------------------------------------------------------------------
@@ -196,31 +165,29 @@ std::vector<std::string> languagesOf(const Broker& broker) {
     Activation* activation = Activation::current(broker);
     if (!activation) return {};
     const NamedValues& context = bodyOf(activation->context());
-    const Value* local = context.find("UseProcessLocale");
-    if (local && !local->isNull() && local->type() == CMPI_boolean && local->boolean()) {
+    const auto given = [&context](const char* name, CMPIType type) {
+        const Value* value = context.find(name);
+        return value && !value->isNull() && value->type() == type ? value : nullptr;
+    };
+    const Value* local = given("UseProcessLocale", CMPI_boolean);
+    if (local && local->boolean()) {
         for (const char* variable : {"LC_ALL", "LC_MESSAGES", "LANG"})
             if (const char* locale = std::getenv(variable))
                 if (*locale) return wantedLanguages(locale);
         return {};
     }
-    const Value* accepted = context.find(CMPIAcceptLanguage);
-    const bool given = accepted && !accepted->isNull() && accepted->type() == CMPI_string;
-    return given ? wantedLanguages(accepted->text()) : std::vector<std::string>{};
+    const Value* accepted = given(CMPIAcceptLanguage, CMPI_string);
+    return accepted ? wantedLanguages(accepted->text()) : std::vector<std::string>{};
 }
 
-CMPIStatus openMessageFile(const CMPIBroker* mb, const char* file, CMPIMsgFileHandle* handle) {
-    if (handle) *handle = nullptr;
-    return brokerStatus(mb, [=](Broker& broker) {
-        if (!handle) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no place for the handle");
-        *handle =
-            const_cast<MessageTexts*>(broker.messages().open(textOf(file), languagesOf(broker)));
-    });
+void openMessageFile(Broker& broker, const char* file, CMPIMsgFileHandle* handle) {
+    if (!handle) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no place for the handle");
+    *handle = nullptr;
+    *handle = const_cast<MessageTexts*>(broker.messages().open(textOf(file), languagesOf(broker)));
 }
-CMPIStatus closeMessageFile(const CMPIBroker* mb, const CMPIMsgFileHandle handle) {
-    return brokerStatus(mb, [handle](Broker& broker) {
-        if (!broker.messages().close(static_cast<MessageStore::Handle>(handle)))
-            throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "message file not open");
-    });
+void closeMessageFile(Broker& broker, CMPIMsgFileHandle handle) {
+    if (!broker.messages().close(static_cast<MessageStore::Handle>(handle)))
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "message file not open");
 }
 
 CMPIString* message(const CMPIBroker* mb, const char* id, CMPIMsgFileHandle handle,
@@ -246,12 +213,12 @@ CMPIString* getMessage2(const CMPIBroker* mb, const char* id, const CMPIMsgFileH
 CMPIString* getMessage(const CMPIBroker* mb, const char* id, const char* text, CMPIStatus* rc,
                        CMPICount count, ...) {
     CMPIMsgFileHandle handle = nullptr;
-    openMessageFile(mb, "", &handle);
+    brokerStatus(mb, [&](Broker& broker) { openMessageFile(broker, "", &handle); });
     std::va_list list;
     va_start(list, count);
     CMPIString* result = message(mb, id, handle, text, rc, count, list);
     va_end(list);
-    if (handle) closeMessageFile(mb, handle);
+    if (handle) brokerStatus(mb, [&](Broker& broker) { closeMessageFile(broker, handle); });
     return result;
 }
 
@@ -281,32 +248,13 @@ CMPIStatus trace(const CMPIBroker* mb, CMPILevel level, const char* component, c
 }  // namespace
 
 CMPIBrokerEncFT encapsulationTable(bool lean) {
-    CMPIBrokerEncFT table = {CMPIVersion200,
-                             newInstance,
-                             newObjectPath,
-                             newArgs,
-                             newString,
-                             newArray,
-                             newDateTime,
-                             newDateTimeFromBinary,
-                             newDateTimeFromChars,
-                             newSelectExp,
-                             classPathIsA,
-                             objectText,
-                             isOfType,
-                             getType,
-                             getMessage,
-                             logMessage,
-                             trace,
-                             newError,
-                             openMessageFile,
-                             closeMessageFile,
-                             getMessage2};
-    if (lean) {
-        table.ftVersion = 1;
-        endTableAfter(table, &CMPIBrokerEncFT::trace);
-    }
-    return table;
+    return brokerTable(lean, 1, &CMPIBrokerEncFT::trace, entryOf<newInstance>,
+                       entryOf<newObjectPath>, entryOf<newArgs>, entryOf<newString>,
+                       entryOf<newArray>, entryOf<newDateTime>, entryOf<newDateTimeFromBinary>,
+                       entryOf<newDateTimeFromChars>, entryOf<newSelectExp>, entryOf<classPathIsA>,
+                       entryOf<objectText>, entryOf<isOfType>, entryOf<getType>, getMessage,
+                       logMessage, trace, entryOf<newError>, entryOf<openMessageFile>,
+                       entryOf<closeMessageFile>, getMessage2);
 }
 
 }  // namespace cimom

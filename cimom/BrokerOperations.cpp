@@ -7,199 +7,156 @@ namespace cimom {
 
 namespace {
 
+// As the tables name them.
+using Context = const CMPIContext*;
+using Path = const CMPIObjectPath*;
+using Text = const char*;
+
 // -- threads of providers ---------------------------------------------------------------------
 
 // Requests that attached threads run in, the innermost last.
 thread_local std::vector<std::unique_ptr<Activation>> attachments;
 
-CMPIContext* prepareAttachThread(const CMPIBroker* mb, const CMPIContext* context) {
-    return brokerEntry(mb, nullptr, [context](Broker&) { return cloneObject(context, nullptr); });
-}
-CMPIStatus attachThread(const CMPIBroker* mb, const CMPIContext* context) {
-    return brokerStatus(mb, [context](Broker& broker) {
-        attachments.push_back(std::make_unique<Activation>(broker, bodyOf(context)));
+CMPIContext* prepareAttachThread(const CMPIBroker* mb, Context context) {
+    return brokerEntry(mb, nullptr, [context](Broker& broker) {
+        return cloneBody<CMPIContext>(bodyOf(context), broker);
     });
 }
-CMPIStatus detachThread(const CMPIBroker* mb, const CMPIContext* context) {
-    return brokerStatus(mb, [context](Broker& broker) {
-        if (attachments.empty() || Activation::current(broker) != attachments.back().get())
-            throw Failure(CMPI_RC_ERR_FAILED, "the thread is not attached");
-        nodeOf(context);
-        attachments.pop_back();
-        releaseObject(const_cast<CMPIContext*>(context));  // made by prepareAttachThread
-    });
+void attachThread(Broker& broker, Context context) {
+    attachments.push_back(std::make_unique<Activation>(broker, bodyOf(context)));
+}
+void detachThread(Broker& broker, Context context) {
+    if (attachments.empty() || Activation::current(broker) != attachments.back().get())
+        throw Failure(CMPI_RC_ERR_FAILED, "the thread is not attached");
+    nodeOf(context);
+    attachments.pop_back();
+    releaseObject(const_cast<CMPIContext*>(context));  // made by prepareAttachThread
 }
 
 // -- upcalls ----------------------------------------------------------------------------------
 
-/// Runs an operation as the request that @p context stands for, and hands its reply on.
-/// @throws Failure with what the operation answered
-template <class F>
-Reply upcall(Broker& broker, const CMPIContext* context, const char** properties, F operation) {
+Request requestIn(Context context, const char** properties = nullptr) {
     Request request = requestOf(bodyOf(context));
-    if (properties) {
-        request.properties.emplace();
-        for (const char** name = properties; *name; ++name) request.properties->push_back(*name);
-    }
-    Reply reply = operation(broker.server(), request);
+    if (properties) request.properties = namesIn(properties);
+    return request;
+}
+
+/// What a provider is handed of a reply: nothing but its success, or an enumeration of a part.
+/// @throws Failure with what the operation answered
+Reply succeeded(Reply reply) {
     if (!reply.ok()) throw Failure(reply.rc, reply.message);
     return reply;
 }
-
-/// Upcalls by what they answer: a status, or an enumeration of one part of the reply.
-template <class F>
-CMPIStatus statusOf(const CMPIBroker* mb, const CMPIContext* context, const char** properties,
-                    F operation) {
-    return brokerStatus(mb,
-                        [&](Broker& broker) { upcall(broker, context, properties, operation); });
-}
-template <auto Part, class F>
-CMPIEnumeration* enumerationOf(const CMPIBroker* mb, const CMPIContext* context,
-                               const char** properties, CMPIStatus* rc, F operation) {
-    return brokerEntry(mb, rc, [&](Broker& broker) {
-        const auto items = upcall(broker, context, properties, operation).*Part;
-        return make<CMPIEnumeration>(broker, {Value::Array(items.begin(), items.end()), 0});
-    });
+template <class List>
+CMPIEnumeration* enumerationOf(Broker& broker, const List& items) {
+    return make<CMPIEnumeration>(broker, {Value::Array(items.begin(), items.end()), 0});
 }
 
 /// An instance as it is to be, under the path given with it.
-Instance instanceAt(const CMPIObjectPath* path, const CMPIInstance* instance) {
+Instance instanceAt(Path path, const CMPIInstance* instance) {
     Instance placed = bodyOf(instance).value;
     if (path) placed.path = bodyOf(path);
     return placed;
 }
 
-CMPIStatus deliverIndication(const CMPIBroker* mb, const CMPIContext* context, const char* ns,
-                             const CMPIInstance* indication) {
-    return statusOf(mb, context, nullptr, [=](Server& server, Request& request) {
-        if (ns && *ns) request.nameSpace = ns;
-        return server.deliver(request, bodyOf(indication).value);
-    });
+void deliverIndication(Broker& broker, Context context, Text ns, const CMPIInstance* indication) {
+    Request request = requestIn(context);
+    if (ns && *ns) request.nameSpace = ns;
+    succeeded(broker.server().deliver(request, bodyOf(indication).value));
 }
 
-CMPIEnumeration* enumInstanceNames(const CMPIBroker* mb, const CMPIContext* context,
-                                   const CMPIObjectPath* path, CMPIStatus* rc) {
-    return enumerationOf<&Reply::paths>(mb, context, nullptr, rc,
-                                        [=](Server& server, auto& request) {
-                                            return server.enumInstanceNames(request, bodyOf(path));
-                                        });
+CMPIEnumeration* enumInstanceNames(Broker& broker, Context context, Path path) {
+    Server& server = broker.server();
+    return enumerationOf(
+        broker, succeeded(server.enumInstanceNames(requestIn(context), bodyOf(path))).paths);
 }
-CMPIEnumeration* enumInstances(const CMPIBroker* mb, const CMPIContext* context,
-                               const CMPIObjectPath* path, const char** properties,
-                               CMPIStatus* rc) {
-    return enumerationOf<&Reply::instances>(
-        mb, context, properties, rc,
-        [=](Server& server, auto& request) { return server.enumInstances(request, bodyOf(path)); });
+CMPIEnumeration* enumInstances(Broker& broker, Context context, Path path,
+                               const char** properties) {
+    const Request request = requestIn(context, properties);
+    return enumerationOf(broker,
+                         succeeded(broker.server().enumInstances(request, bodyOf(path))).instances);
 }
-CMPIInstance* getInstance(const CMPIBroker* mb, const CMPIContext* context,
-                          const CMPIObjectPath* path, const char** properties, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        Reply reply = upcall(broker, context, properties, [=](Server& server, auto& request) {
-            return server.getInstance(request, bodyOf(path));
-        });
-        return make<CMPIInstance>(broker, instanceBody(broker, reply.instances.front()));
-    });
+CMPIInstance* getInstance(Broker& broker, Context context, Path path, const char** properties) {
+    const Request request = requestIn(context, properties);
+    const Reply reply = succeeded(broker.server().getInstance(request, bodyOf(path)));
+    return make<CMPIInstance>(broker, instanceBody(broker, reply.instances.front()));
 }
-CMPIObjectPath* createInstance(const CMPIBroker* mb, const CMPIContext* context,
-                               const CMPIObjectPath* path, const CMPIInstance* instance,
-                               CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        Reply reply = upcall(broker, context, nullptr, [=](Server& server, auto& request) {
-            return server.createInstance(request, instanceAt(path, instance));
-        });
-        return make<CMPIObjectPath>(broker, reply.paths.front());
-    });
+CMPIObjectPath* createInstance(Broker& broker, Context context, Path path,
+                               const CMPIInstance* instance) {
+    const Request request = requestIn(context);
+    const Reply reply =
+        succeeded(broker.server().createInstance(request, instanceAt(path, instance)));
+    return make<CMPIObjectPath>(broker, reply.paths.front());
 }
-CMPIStatus modifyInstance(const CMPIBroker* mb, const CMPIContext* context,
-                          const CMPIObjectPath* path, const CMPIInstance* instance,
-                          const char** properties) {
-    return statusOf(mb, context, properties, [=](Server& server, auto& request) {
-        return server.modifyInstance(request, instanceAt(path, instance));
-    });
+void modifyInstance(Broker& broker, Context context, Path path, const CMPIInstance* instance,
+                    const char** properties) {
+    const Request request = requestIn(context, properties);
+    succeeded(broker.server().modifyInstance(request, instanceAt(path, instance)));
 }
-CMPIStatus deleteInstance(const CMPIBroker* mb, const CMPIContext* context,
-                          const CMPIObjectPath* path) {
-    return statusOf(mb, context, nullptr, [=](Server& server, auto& request) {
-        return server.deleteInstance(request, bodyOf(path));
-    });
+void deleteInstance(Broker& broker, Context context, Path path) {
+    succeeded(broker.server().deleteInstance(requestIn(context), bodyOf(path)));
 }
-CMPIEnumeration* execQuery(const CMPIBroker* mb, const CMPIContext* context,
-                           const CMPIObjectPath* path, const char* query, const char* language,
-                           CMPIStatus* rc) {
-    return enumerationOf<&Reply::instances>(
-        mb, context, nullptr, rc, [=](Server& server, Request& request) {
-            if (path) request.nameSpace = bodyOf(path).nameSpace;
-            return server.execQuery(request, textOf(query), textOf(language));
-        });
+CMPIEnumeration* execQuery(Broker& broker, Context context, Path path, Text query, Text language) {
+    Request request = requestIn(context);
+    if (path) request.nameSpace = bodyOf(path).nameSpace;
+    const Reply reply =
+        succeeded(broker.server().execQuery(request, textOf(query), textOf(language)));
+    return enumerationOf(broker, reply.instances);
 }
 
-CMPIEnumeration* associators(const CMPIBroker* mb, const CMPIContext* context,
-                             const CMPIObjectPath* path, const char* assocClass,
-                             const char* resultClass, const char* role, const char* resultRole,
-                             const char** properties, CMPIStatus* rc) {
-    return enumerationOf<&Reply::instances>(
-        mb, context, properties, rc, [=](Server& server, auto& request) {
-            return server.associators(
-                request, bodyOf(path),
-                {textOf(assocClass), textOf(resultClass), textOf(role), textOf(resultRole)});
-        });
+/// The four operations on associations, by what they answer.
+using Navigation = Reply (Server::*)(const Request&, const ObjectPath&, const AssociationFilter&);
+template <auto Part>
+CMPIEnumeration* navigate(Broker& broker, const Request& request, Path path,
+                          const AssociationFilter& filter, Navigation operation) {
+    return enumerationOf(
+        broker, succeeded((broker.server().*operation)(request, bodyOf(path), filter)).*Part);
 }
-CMPIEnumeration* associatorNames(const CMPIBroker* mb, const CMPIContext* context,
-                                 const CMPIObjectPath* path, const char* assocClass,
-                                 const char* resultClass, const char* role, const char* resultRole,
-                                 CMPIStatus* rc) {
-    return enumerationOf<&Reply::paths>(
-        mb, context, nullptr, rc, [=](Server& server, auto& request) {
-            return server.associatorNames(
-                request, bodyOf(path),
-                {textOf(assocClass), textOf(resultClass), textOf(role), textOf(resultRole)});
-        });
+CMPIEnumeration* associators(Broker& broker, Context context, Path path, Text assocClass,
+                             Text resultClass, Text role, Text resultRole,
+                             const char** properties) {
+    return navigate<&Reply::instances>(
+        broker, requestIn(context, properties), path,
+        {textOf(assocClass), textOf(resultClass), textOf(role), textOf(resultRole)},
+        &Server::associators);
 }
-CMPIEnumeration* references(const CMPIBroker* mb, const CMPIContext* context,
-                            const CMPIObjectPath* path, const char* resultClass, const char* role,
-                            const char** properties, CMPIStatus* rc) {
-    return enumerationOf<&Reply::instances>(
-        mb, context, properties, rc, [=](Server& server, auto& request) {
-            return server.references(request, bodyOf(path),
-                                     {"", textOf(resultClass), textOf(role), ""});
-        });
+CMPIEnumeration* associatorNames(Broker& broker, Context context, Path path, Text assocClass,
+                                 Text resultClass, Text role, Text resultRole) {
+    return navigate<&Reply::paths>(
+        broker, requestIn(context), path,
+        {textOf(assocClass), textOf(resultClass), textOf(role), textOf(resultRole)},
+        &Server::associatorNames);
 }
-CMPIEnumeration* referenceNames(const CMPIBroker* mb, const CMPIContext* context,
-                                const CMPIObjectPath* path, const char* resultClass,
-                                const char* role, CMPIStatus* rc) {
-    return enumerationOf<&Reply::paths>(
-        mb, context, nullptr, rc, [=](Server& server, auto& request) {
-            return server.referenceNames(request, bodyOf(path),
-                                         {"", textOf(resultClass), textOf(role), ""});
-        });
+CMPIEnumeration* references(Broker& broker, Context context, Path path, Text resultClass, Text role,
+                            const char** properties) {
+    return navigate<&Reply::instances>(broker, requestIn(context, properties), path,
+                                       {"", textOf(resultClass), textOf(role), ""},
+                                       &Server::references);
+}
+CMPIEnumeration* referenceNames(Broker& broker, Context context, Path path, Text resultClass,
+                                Text role) {
+    return navigate<&Reply::paths>(broker, requestIn(context), path,
+                                   {"", textOf(resultClass), textOf(role), ""},
+                                   &Server::referenceNames);
 }
 
-CMPIData invokeMethod(const CMPIBroker* mb, const CMPIContext* context, const CMPIObjectPath* path,
-                      const char* method, const CMPIArgs* in, CMPIArgs* out, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        Reply reply = upcall(broker, context, nullptr, [=](Server& server, auto& request) {
-            return server.invokeMethod(request, bodyOf(path), textOf(method),
-                                       in ? bodyOf(in) : NamedValues());
-        });
-        if (out)
-            for (const auto& [name, value] : reply.out) bodyOf(out).set(name, value);
-        return makeData(broker, reply.value());
-    });
+CMPIData invokeMethod(Broker& broker, Context context, Path path, Text method, const CMPIArgs* in,
+                      CMPIArgs* out) {
+    const Reply reply = succeeded(broker.server().invokeMethod(
+        requestIn(context), bodyOf(path), textOf(method), in ? bodyOf(in) : NamedValues()));
+    if (out)
+        for (const auto& [name, value] : reply.out) bodyOf(out).set(name, value);
+    return makeData(broker, reply.value());
 }
-CMPIStatus setProperty(const CMPIBroker* mb, const CMPIContext* context, const CMPIObjectPath* path,
-                       const char* name, const CMPIValue* value, CMPIType type) {
-    return statusOf(mb, context, nullptr, [=](Server& server, auto& request) {
-        return server.setProperty(request, bodyOf(path), textOf(name), readValue(value, type));
-    });
+void setProperty(Broker& broker, Context context, Path path, Text name, const CMPIValue* value,
+                 CMPIType type) {
+    succeeded(broker.server().setProperty(requestIn(context), bodyOf(path), textOf(name),
+                                          readValue(value, type)));
 }
-CMPIData getProperty(const CMPIBroker* mb, const CMPIContext* context, const CMPIObjectPath* path,
-                     const char* name, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [=](Broker& broker) {
-        Reply reply = upcall(broker, context, nullptr, [=](Server& server, auto& request) {
-            return server.getProperty(request, bodyOf(path), textOf(name));
-        });
-        return makeData(broker, reply.value());
-    });
+CMPIData getProperty(Broker& broker, Context context, Path path, Text name) {
+    const Reply reply =
+        succeeded(broker.server().getProperty(requestIn(context), bodyOf(path), textOf(name)));
+    return makeData(broker, reply.value());
 }
 
 constexpr unsigned kFullCapabilities =
@@ -216,23 +173,23 @@ CMPIBrokerFT operationTable(bool lean) {
             lean ? 1U : static_cast<unsigned>(CMPIVersion200),
             lean ? "cimom, lean" : "cimom",
             prepareAttachThread,
-            attachThread,
-            detachThread,
-            deliverIndication,
-            enumInstanceNames,
-            getInstance,
-            createInstance,
-            modifyInstance,
-            deleteInstance,
-            execQuery,
-            enumInstances,
-            associators,
-            associatorNames,
-            references,
-            referenceNames,
-            invokeMethod,
-            setProperty,
-            getProperty};
+            entryOf<attachThread>,
+            entryOf<detachThread>,
+            entryOf<deliverIndication>,
+            entryOf<enumInstanceNames>,
+            entryOf<getInstance>,
+            entryOf<createInstance>,
+            entryOf<modifyInstance>,
+            entryOf<deleteInstance>,
+            entryOf<execQuery>,
+            entryOf<enumInstances>,
+            entryOf<associators>,
+            entryOf<associatorNames>,
+            entryOf<references>,
+            entryOf<referenceNames>,
+            entryOf<invokeMethod>,
+            entryOf<setProperty>,
+            entryOf<getProperty>};
 }
 
 }  // namespace cimom

@@ -17,7 +17,7 @@ namespace {
 // -- threads ----------------------------------------------------------------------------------
 
 static_assert(sizeof(pthread_t) <= sizeof(void*), "a thread's name fits a pointer");
-static_assert(sizeof(pthread_key_t) == sizeof(CMPI_THREAD_KEY_TYPE), "keys are the system's");
+static_assert(std::is_same_v<pthread_key_t, CMPI_THREAD_KEY_TYPE>, "keys are the system's");
 
 pthread_t threadOf(CMPI_THREAD_TYPE thread) { return reinterpret_cast<pthread_t>(thread); }
 pthread_mutex_t* mutexOf(CMPI_MUTEX_TYPE mutex) { return static_cast<pthread_mutex_t*>(mutex); }
@@ -50,37 +50,25 @@ int threadOnce(int* once, void (*init)()) {
     }
     return 0;
 }
-int createThreadKey(CMPI_THREAD_KEY_TYPE* key, void (*cleanup)(void*)) {
-    return pthread_key_create(key, cleanup);
-}
-int destroyThreadKey(CMPI_THREAD_KEY_TYPE key) { return pthread_key_delete(key); }
-void* getThreadSpecific(CMPI_THREAD_KEY_TYPE key) { return pthread_getspecific(key); }
 int setThreadSpecific(CMPI_THREAD_KEY_TYPE key, void* value) {
     return pthread_setspecific(key, value);
 }
 
 // -- mutexes and conditions -------------------------------------------------------------------
 
-CMPI_MUTEX_TYPE newMutex(int) {
-    auto* mutex = new pthread_mutex_t;
-    pthread_mutex_init(mutex, nullptr);
-    return mutex;
+template <class T, auto Init>
+void* newPrimitive(int) {
+    auto* made = new T;
+    Init(made, nullptr);
+    return made;
 }
-void destroyMutex(CMPI_MUTEX_TYPE mutex) {
-    pthread_mutex_destroy(mutexOf(mutex));
-    delete mutexOf(mutex);
+template <class T, auto Destroy>
+void destroyPrimitive(void* primitive) {
+    Destroy(static_cast<T*>(primitive));
+    delete static_cast<T*>(primitive);
 }
 void lockMutex(CMPI_MUTEX_TYPE mutex) { pthread_mutex_lock(mutexOf(mutex)); }
 void unlockMutex(CMPI_MUTEX_TYPE mutex) { pthread_mutex_unlock(mutexOf(mutex)); }
-CMPI_COND_TYPE newCondition(int) {
-    auto* condition = new pthread_cond_t;
-    pthread_cond_init(condition, nullptr);
-    return condition;
-}
-void destroyCondition(CMPI_COND_TYPE condition) {
-    pthread_cond_destroy(conditionOf(condition));
-    delete conditionOf(condition);
-}
 int condWait(CMPI_COND_TYPE condition, CMPI_MUTEX_TYPE mutex) {
     return pthread_cond_wait(conditionOf(condition), mutexOf(mutex));
 }
@@ -93,19 +81,15 @@ int signalCondition(CMPI_COND_TYPE condition) {
 
 // -- memory -----------------------------------------------------------------------------------
 
-CMPIGcStat* mark(const CMPIBroker* mb, CMPIStatus* rc) {
-    return brokerEntry(mb, rc, [](Broker& broker) -> CMPIGcStat* {
-        Activation* activation = Activation::current(broker);
-        if (!activation) throw Failure(CMPI_RC_ERR_FAILED, "no request on this thread");
-        return const_cast<void*>(activation->pool().mark());
-    });
+CMPIGcStat* mark(Broker& broker) {
+    Activation* activation = Activation::current(broker);
+    if (!activation) throw Failure(CMPI_RC_ERR_FAILED, "no request on this thread");
+    return const_cast<void*>(activation->pool().mark());
 }
-CMPIStatus release(const CMPIBroker* mb, const CMPIGcStat* level) {
-    return brokerStatus(mb, [level](Broker& broker) {
-        Activation* activation = Activation::current(broker);
-        if (!activation || !activation->pool().release(level))
-            throw Failure(CMPI_RC_ERR_FAILED, "no such mark in the request of this thread");
-    });
+void release(Broker& broker, const CMPIGcStat* level) {
+    Activation* activation = Activation::current(broker);
+    if (!activation || !activation->pool().release(level))
+        throw Failure(CMPI_RC_ERR_FAILED, "no such mark in the request of this thread");
 }
 
 void* allocate(const CMPIBroker* mb, void* old, std::size_t size, bool zeroed) {
@@ -139,50 +123,22 @@ void freeObject(const CMPIBroker*, C* object) {
 }  // namespace
 
 CMPIBrokerExtFT extensionTable(bool lean) {
-    return {lean ? 1 : CMPIVersion200,
-            resolveFileName,
-            newThread,
-            joinThread,
-            exitThread,
-            cancelThread,
-            threadSleep,
-            threadOnce,
-            createThreadKey,
-            destroyThreadKey,
-            getThreadSpecific,
-            setThreadSpecific,
-            newMutex,
-            destroyMutex,
-            lockMutex,
-            unlockMutex,
-            newCondition,
-            destroyCondition,
-            condWait,
-            timedCondWait,
-            signalCondition};
+    return brokerTable(lean, 1, &CMPIBrokerExtFT::signalCondition, resolveFileName, newThread,
+                       joinThread, exitThread, cancelThread, threadSleep, threadOnce,
+                       pthread_key_create, pthread_key_delete, pthread_getspecific,
+                       setThreadSpecific, newPrimitive<pthread_mutex_t, pthread_mutex_init>,
+                       destroyPrimitive<pthread_mutex_t, pthread_mutex_destroy>, lockMutex,
+                       unlockMutex, newPrimitive<pthread_cond_t, pthread_cond_init>,
+                       destroyPrimitive<pthread_cond_t, pthread_cond_destroy>, condWait,
+                       timedCondWait, signalCondition);
 }
 
 CMPIBrokerMemFT memoryTable(bool lean) {
-    CMPIBrokerMemFT table = {CMPIVersion200,
-                             mark,
-                             release,
-                             cmpiMalloc,
-                             cmpiCalloc,
-                             cmpiRealloc,
-                             cmpiStrDup,
-                             cmpiFree,
-                             freeObject<CMPIInstance>,
-                             freeObject<CMPIObjectPath>,
-                             freeObject<CMPIArgs>,
-                             freeObject<CMPIString>,
-                             freeObject<CMPIArray>,
-                             freeObject<CMPIDateTime>,
-                             freeObject<CMPISelectExp>};
-    if (lean) {
-        table.ftVersion = 0;
-        endTableAfter(table, &CMPIBrokerMemFT::release);
-    }
-    return table;
+    return brokerTable(lean, 0, &CMPIBrokerMemFT::release, entryOf<mark>, entryOf<release>,
+                       cmpiMalloc, cmpiCalloc, cmpiRealloc, cmpiStrDup, cmpiFree,
+                       freeObject<CMPIInstance>, freeObject<CMPIObjectPath>, freeObject<CMPIArgs>,
+                       freeObject<CMPIString>, freeObject<CMPIArray>, freeObject<CMPIDateTime>,
+                       freeObject<CMPISelectExp>);
 }
 
 }  // namespace cimom

@@ -62,30 +62,25 @@ private:
     // ---- qualifiers
 
     void linkQualifierType(const MofQualifierType& declared) {
-        auto type = std::make_shared<CimQualifierType>();
-        type->name = declared.name;
-        type->type = declared.type.type;
-        type->isArray = declared.type.isArray;
-        type->scopes = declared.scopes;
-        type->flavors = declared.flavors;
-        if (declared.defaultValue) convert(*declared.defaultValue, declared.type, type->value);
-        if (!m_repository.m_qualifierTypes.add(type))
+        Value unused;  // a default is checked and has no further use
+        if (declared.defaultValue) convert(*declared.defaultValue, declared.type, unused);
+        if (!m_repository.m_qualifierTypes.add(std::make_shared<CimQualifierType>(declared)))
             fault(declared.place, "qualifier " + in(declared.name) + " is declared already");
     }
 
-    void convert(const MofInitializer& initializer, const MofType& type, CimValue& value) {
+    void convert(const MofInitializer& initializer, const CimType& type, Value& value) {
         std::string why = convertMofValue(initializer, type, value);
         if (!why.empty()) fault(initializer.place, why);
     }
 
     // Qualifiers declared on something and those that it takes over from @p base, if any.
     NamedList<CimQualifier> linkQualifiers(const std::vector<MofQualifier>& declared,
-                                           unsigned scope, const NamedList<CimQualifier>* base) {
+                                           unsigned scope, const CimQualified* base) {
         NamedList<CimQualifier> all;
         for (const MofQualifier& one : declared) {
             auto qualifier = linkQualifier(one, scope);
             if (!qualifier) continue;
-            const CimQualifier* inherited = base ? base->find(one.name) : nullptr;
+            const CimQualifier* inherited = base ? base->qualifiers.find(one.name) : nullptr;
             if (inherited &&
                 (inherited->flavors & (DisableOverride | Restricted)) == DisableOverride &&
                 inherited->value != qualifier->value)
@@ -95,15 +90,9 @@ private:
                 fault(one.place, "qualifier " + in(one.name) + " is given twice");
         }
         static const NamedList<CimQualifier> none;
-        for (const auto& inherited : base ? *base : none) {
-            if ((inherited->flavors & Restricted) != 0 || all.find(inherited->name)) continue;
-            if (inherited->isPropagated) {
-                all.add(inherited);
-                continue;
-            }
-            auto propagated = std::make_shared<CimQualifier>(*inherited);
-            propagated->isPropagated = true;
-            all.add(std::move(propagated));
+        for (const auto& inherited : base ? base->qualifiers : none) {
+            const bool goesDown = (inherited->flavors & Restricted) == 0;
+            if (goesDown) all.add(inherited);  // unless there is one of its own
         }
         m_listed += all.size();
         return all;
@@ -119,33 +108,13 @@ private:
             fault(declared.place, "qualifier " + in(type->name) + " is not for this element");
         auto qualifier = std::make_shared<CimQualifier>();
         qualifier->name = type->name;
-        qualifier->type = type->type;
-        qualifier->isArray = type->isArray;
         qualifier->flavors = (type->flavors & ~declared.flavorsOff) | declared.flavorsOn;
-        MofType valueType;
-        valueType.type = type->type;
-        valueType.isArray = type->isArray;
+        qualifier->value = Value::null(type->type.cmpiType());
         if (declared.value)
-            convert(*declared.value, valueType, qualifier->value);
-        else if (type->type == CimType::Boolean && !type->isArray)
-            qualifier->value = yes();
+            convert(*declared.value, type->type, qualifier->value);
+        else if (type->type.cmpiType() == CMPI_boolean)
+            qualifier->value = true;
         return qualifier;
-    }
-
-    static CimValue yes() {
-        static const CimValue value =
-            std::make_shared<const std::vector<CimScalar>>(1, CimScalar(true));
-        return value;
-    }
-
-    static bool areEqual(const CimValue& a, const CimValue& b) {
-        return a == b || (a && b && *a == *b);
-    }
-
-    static const std::string* text(const NamedList<CimQualifier>& qualifiers, const char* name) {
-        const CimQualifier* found = qualifiers.find(name);
-        if (!found || !found->value || found->value->empty()) return nullptr;
-        return std::get_if<std::string>(&found->value->front());
     }
 
     // ---- the tree
@@ -217,19 +186,15 @@ private:
     void linkClassQualifiers(const MofClass& declared, CimClass& cls) {
         auto has = [&](const char* name) {
             return std::any_of(declared.qualifiers.begin(), declared.qualifiers.end(),
-                               [&](const MofQualifier& q) { return NameEqual()(q.name, name); });
+                               [&](const MofQualifier& q) { return sameName(q.name, name); });
         };
         const CimClass* base = cls.superclass;
         unsigned scope = ScopeClass;
         if ((base && base->isAssociation) || has("Association")) scope |= ScopeAssociation;
         if ((base && base->isIndication) || has("Indication")) scope |= ScopeIndication;
-        CimElement flags;  // reads the boolean qualifiers
-        flags.qualifiers =
-            linkQualifiers(declared.qualifiers, scope, base ? &base->qualifiers : nullptr);
-        cls.isAssociation = flags.flag("Association");
-        cls.isIndication = flags.flag("Indication");
-        cls.isAbstract = flags.flag("Abstract");
-        cls.qualifiers = std::move(flags.qualifiers);
+        cls.qualifiers = linkQualifiers(declared.qualifiers, scope, base);
+        cls.isAssociation = cls.flag("Association");
+        cls.isIndication = cls.flag("Indication");
     }
 
     // ---- features
@@ -252,7 +217,7 @@ private:
         std::size_t references = 0;
         for (const auto& property : cls.properties) {
             if (property->isKey) cls.keys.push_back(property.get());
-            if (property->type == CimType::Reference) ++references;
+            if (property->type == CMPI_ref) ++references;
         }
         if (cls.isAssociation && references < 2)
             fault(declared.place, "association " + in(cls.name) + " has fewer than two references");
@@ -265,17 +230,14 @@ private:
     void linkElement(const MofParameter& declared, unsigned scope, const CimElement* base,
                      CimElement& element) {
         element.name = declared.name;
-        element.type = declared.type.type;
-        element.isArray = declared.type.isArray;
-        element.arraySize = declared.type.arraySize;
-        element.qualifiers =
-            linkQualifiers(declared.qualifiers, scope, base ? &base->qualifiers : nullptr);
-        if (element.type == CimType::Reference)
-            element.referenceClass = classNamed(declared.type.className, declared);
-        const std::string* embedded = text(element.qualifiers, "EmbeddedInstance");
+        static_cast<CimType&>(element) = declared.type;
+        element.qualifiers = linkQualifiers(declared.qualifiers, scope, base);
+        if (element.type == CMPI_ref)
+            element.referenceClass = classNamed(element.referenceClass, declared);
+        const std::string* embedded = element.text("EmbeddedInstance");
         element.isEmbeddedObject = embedded || element.flag("EmbeddedObject");
         if (embedded) element.embeddedClass = classNamed(*embedded, declared);
-        if (element.isEmbeddedObject && element.type != CimType::String)
+        if (element.isEmbeddedObject && element.type != CMPI_string)
             fault(declared.place,
                   in(element.name) + " carries an instance and so must be a string");
         if (base) checkOverride(declared, *base, element);
@@ -293,8 +255,8 @@ private:
                        const CimElement& element) {
         if (element.type != base.type || element.isArray != base.isArray ||
             element.arraySize != base.arraySize)
-            fault(declared.place,
-                  in(element.name) + " overrides one of another type, " + typeText(base));
+            fault(declared.place, in(element.name) + " overrides one of another type, " +
+                                      mofTypeWord(base) + mofBrackets(base));
         else if (!isDeclaredBelow(element.referenceClass, base.referenceClass) ||
                  !isDeclaredBelow(element.embeddedClass, base.embeddedClass))
             fault(declared.place, in(element.name) + " overrides one of class " +
@@ -302,19 +264,12 @@ private:
                                       ", of which its own is no subclass");
     }
 
-    static std::string typeText(const CimElement& element) {
-        std::string text = cimTypeName(element.type);
-        if (element.isArray)
-            text += "[" + (element.arraySize ? std::to_string(element.arraySize) : "") + "]";
-        return text;
-    }
-
     // By the declarations, since a class referred to may not be linked yet.
     bool isDeclaredBelow(const std::string& name, const std::string& base) const {
         if (base.empty()) return true;
         std::string_view at = name;
         for (std::size_t i = 0; i < kMaxLineage && !at.empty(); ++i) {
-            if (NameEqual()(at, base)) return true;
+            if (sameName(at, base)) return true;
             auto found = m_declared.find(at);
             at = found == m_declared.end() ? std::string_view() : found->second->superclass;
         }
@@ -323,29 +278,21 @@ private:
 
     // The qualifier Override must name what is overridden, with or without the class.
     void checkOverrideName(const MofFeature& feature, const CimElement& element, bool hasBase) {
-        const std::string* name = text(element.qualifiers, "Override");
+        const std::string* name = element.text("Override");
         if (!name) return;
         std::size_t dot = name->rfind('.');
         std::string last = dot == std::string::npos ? *name : name->substr(dot + 1);
-        if (!hasBase || !NameEqual()(last, feature.name))
+        if (!hasBase || !sameName(last, feature.name))
             fault(feature.place, in(feature.name) + " overrides " + in(*name) +
                                      ", which is no feature of that name in a superclass");
-    }
-
-    // A feature's home: the class itself, and where the name came up first.
-    template <class T>
-    static void setOrigin(T& feature, const T* base, const CimClass& cls) {
-        feature.declaringClass = cls.name;
-        feature.originClass = base ? base->originClass : cls.name;
     }
 
     void linkProperty(const MofFeature& feature, CimClass& cls) {
         const CimProperty* base = cls.properties.find(feature.name);
         auto property = std::make_shared<CimProperty>();
-        bool isReference = feature.type.type == CimType::Reference;
+        bool isReference = feature.type.type == CMPI_ref;
         linkElement(feature, isReference ? ScopeReference : ScopeProperty, base, *property);
         checkOverrideName(feature, *property, base != nullptr);
-        setOrigin(*property, base, cls);
         if (feature.defaultValue)
             convert(*feature.defaultValue, feature.type, property->defaultValue);
         else if (base)
@@ -370,13 +317,10 @@ private:
         auto method = std::make_shared<CimMethod>();
         linkElement(feature, ScopeMethod, base, *method);
         checkOverrideName(feature, *method, base != nullptr);
-        setOrigin(*method, base, cls);
         for (const MofParameter& declared : feature.parameters) {
             auto parameter = std::make_shared<CimParameter>();
             const CimParameter* old = base ? base->parameters.find(declared.name) : nullptr;
             linkElement(declared, ScopeParameter, old, *parameter);
-            parameter->isIn = parameter->flag("In", true);
-            parameter->isOut = parameter->flag("Out");
             if (!method->parameters.add(std::move(parameter)))
                 fault(declared.place, "parameter " + in(declared.name) + " is declared twice");
         }

@@ -6,11 +6,32 @@
 
 namespace cimom {
 
-bool CimElement::flag(std::string_view qualifier, bool otherwise) const {
-    const CimQualifier* found = qualifiers.find(qualifier);
-    if (!found || !found->value || found->value->empty()) return otherwise;
-    const bool* value = std::get_if<bool>(&found->value->front());
-    return value ? *value : otherwise;
+namespace {
+
+// The value of a qualifier, or the first of its values; null when there is none.
+const Value* firstValue(const CimQualified& of, std::string_view qualifier) {
+    const CimQualifier* found = of.qualifiers.find(qualifier);
+    const Value* value = found && !found->value.isNull() ? &found->value : nullptr;
+    if (!value || !value->isArray()) return value;
+    return value->elements().empty() ? nullptr : &value->elements().front();
+}
+
+}  // namespace
+
+bool CimQualified::flag(std::string_view qualifier, bool otherwise) const {
+    const Value* value = firstValue(*this, qualifier);
+    return value && value->type() == CMPI_boolean && !value->isNull() ? value->boolean()
+                                                                      : otherwise;
+}
+
+const std::string* CimQualified::text(std::string_view qualifier) const {
+    const Value* value = firstValue(*this, qualifier);
+    return value && value->type() == CMPI_string && !value->isNull() ? &value->text() : nullptr;
+}
+
+CMPIType typeOf(const CimElement& element) {
+    if (!element.isEmbeddedObject) return element.cmpiType();
+    return element.isArray ? CMPI_instanceA : CMPI_instance;
 }
 
 bool CimClass::isA(const CimClass& base) const {
@@ -37,17 +58,15 @@ namespace {
 // Prints classes; knows which flavors go without saying.
 class Printer {
 public:
-    Printer(const NamedList<CimQualifierType>& types, bool all) : m_types(types), m_all(all) {}
+    explicit Printer(const NamedList<CimQualifierType>& types) : m_types(types) {}
 
     std::string print(const CimClass& cls) {
         addQualifiers(cls.qualifiers, "");
         m_text += "class " + cls.name;
         if (cls.superclass) m_text += " : " + cls.superclass->name;
         m_text += " {\n";
-        for (const auto& property : cls.properties)
-            if (m_all || property->declaringClass == cls.name) addProperty(cls, *property);
-        for (const auto& method : cls.methods)
-            if (m_all || method->declaringClass == cls.name) addMethod(*method);
+        for (const auto& property : cls.properties) addProperty(cls, *property);
+        for (const auto& method : cls.methods) addMethod(*method);
         return m_text + "};\n";
     }
 
@@ -56,8 +75,8 @@ private:
         addElement(property, "    ");
         const CimProperty* base =
             cls.superclass ? cls.superclass->properties.find(property.name) : nullptr;
-        if (property.defaultValue || (base && base->defaultValue))  // NULL is said against another
-            m_text += " = " + printMofValue(property.defaultValue, property.type, property.isArray);
+        if (!property.defaultValue.isNull() || (base && !base->defaultValue.isNull()))
+            m_text += " = " + printMofValue(property.defaultValue);  // NULL against another
         m_text += ";\n";
     }
 
@@ -73,18 +92,14 @@ private:
 
     void addElement(const CimElement& element, const std::string& indent) {
         addQualifiers(element.qualifiers, indent);
-        bool isReference = element.type == CimType::Reference;
         m_text += indent;
-        m_text += isReference ? element.referenceClass + " ref" : cimTypeName(element.type);
-        m_text += " " + element.name;
-        if (!element.isArray) return;
-        m_text += element.arraySize > 0 ? "[" + std::to_string(element.arraySize) + "]" : "[]";
+        if (element.type == CMPI_ref) m_text += element.referenceClass + " ";
+        m_text += mofTypeWord(element) + " " + element.name + mofBrackets(element);
     }
 
     void addQualifiers(const NamedList<CimQualifier>& qualifiers, const std::string& indent) {
         std::string list;
         for (const auto& qualifier : qualifiers) {
-            if (qualifier->isPropagated && !m_all) continue;
             if (!list.empty()) list += ",\n" + indent + " ";
             list += qualifierText(*qualifier);
         }
@@ -93,8 +108,8 @@ private:
 
     std::string qualifierText(const CimQualifier& qualifier) const {
         std::string text = qualifier.name;
-        std::string value = printMofValue(qualifier.value, qualifier.type, qualifier.isArray);
-        bool isFlag = qualifier.type == CimType::Boolean && value == "true";
+        std::string value = printMofValue(qualifier.value);
+        bool isFlag = qualifier.value.type() == CMPI_boolean && value == "true";
         if (value[0] == '{')
             text += value;
         else if (!isFlag)
@@ -114,14 +129,13 @@ private:
     }
 
     const NamedList<CimQualifierType>& m_types;
-    const bool m_all;
     std::string m_text;
 };
 
 }  // namespace
 
-std::string ClassRepository::toMof(const CimClass& cls, Features features) const {
-    return Printer(m_qualifierTypes, features == Features::All).print(cls);
+std::string ClassRepository::toMof(const CimClass& cls) const {
+    return Printer(m_qualifierTypes).print(cls);
 }
 
 }  // namespace cimom

@@ -69,68 +69,44 @@ private:
     std::unordered_map<std::string_view, std::size_t, NameHash, NameEqual> m_index;
 };
 
-/// One element of a value. monostate is NULL; uintN and char16 are held as uint64_t, sintN as
-/// int64_t, realN as double; string, datetime and references as text.
-using CimScalar =
-    std::variant<std::monostate, bool, std::uint64_t, std::int64_t, double, std::string>;
-
-/// A value that fits its declared type; a null pointer is NULL. A scalar has exactly one element.
-/// Values are shared between a declaration and those that inherit it.
-using CimValue = std::shared_ptr<const std::vector<CimScalar>>;
-
 struct CimQualifier {
     std::string name;
-    CimType type = CimType::Boolean;
-    bool isArray = false;
-    CimValue value;
-    unsigned flavors = 0;       ///< MofFlavor bits in effect here
-    bool isPropagated = false;  ///< came down from the superclass's element
+    Value value;           ///< of the declared type, null or not
+    unsigned flavors = 0;  ///< MofFlavor bits in effect here
 };
 
-struct CimQualifierType {
-    std::string name;
-    CimType type = CimType::Boolean;
-    bool isArray = false;
-    CimValue value;       ///< default
-    unsigned scopes = 0;  ///< MofScope bits
-    unsigned flavors = 0;
-};
-
-/// What properties, parameters and methods (by what they return) have in common.
-struct CimElement {
-    std::string name;
-    CimType type = CimType::Boolean;
-    bool isArray = false;
-    std::uint32_t arraySize = 0;         ///< 0: any number of elements
-    std::string referenceClass;          ///< of a Reference; else empty
-    bool isEmbeddedObject = false;       ///< a String that carries an instance, or a class
-    std::string embeddedClass;           ///< class of the embedded instances; empty: any class
-    NamedList<CimQualifier> qualifiers;  ///< own ones and those propagated
+/// What has qualifiers: own ones and those propagated.
+struct CimQualified {
+    NamedList<CimQualifier> qualifiers;
 
     /// Value of a boolean qualifier, or @p otherwise when it is absent or NULL.
     bool flag(std::string_view qualifier, bool otherwise = false) const;
+    /// Value of a qualifier that is a text; null when it is absent, NULL or something else.
+    const std::string* text(std::string_view qualifier) const;
 };
 
-struct CimParameter : CimElement {
-    bool isIn = true;
-    bool isOut = false;
+/// What properties, parameters and methods (by what they return) have in common.
+struct CimElement : CimType, CimQualified {
+    std::string name;
+    bool isEmbeddedObject = false;  ///< a string that carries an instance, or a class
+    std::string embeddedClass;      ///< class of the embedded instances; empty: any class
 };
+/// CMPI type of a declared element; strings that carry instances are CMPI_instance.
+CMPIType typeOf(const CimElement& element);
+
+using CimParameter = CimElement;
 
 struct CimProperty : CimElement {
     bool isKey = false;
-    CimValue defaultValue;
-    std::string originClass;     ///< class that introduced the name
-    std::string declaringClass;  ///< class whose declaration this is: origin, or an override
+    Value defaultValue;
 };
 
 struct CimMethod : CimElement {
     NamedList<CimParameter> parameters;
-    std::string originClass;
-    std::string declaringClass;
 };
 
 /// A class with all that it inherits. Inherited features come first, in the superclass's order.
-struct CimClass {
+struct CimClass : CimQualified {
     std::string name;
     const CimClass* superclass = nullptr;     ///< null for a root
     std::vector<const CimClass*> lineage;     ///< root first, this class last
@@ -138,8 +114,6 @@ struct CimClass {
     std::vector<const CimProperty*> keys;     ///< key properties
     bool isAssociation = false;
     bool isIndication = false;
-    bool isAbstract = false;
-    NamedList<CimQualifier> qualifiers;
     NamedList<CimProperty> properties;  ///< references included
     NamedList<CimMethod> methods;
 
@@ -151,9 +125,6 @@ struct CimClass {
 
 class ClassRepository {
 public:
-    /// Which features a printed class shows.
-    enum class Features { Own, All };
-
     /// Reads the MOF file @p path and all that it includes.
     ///
     /// Superclasses and referenced classes may be declared after their use. Instance
@@ -172,9 +143,9 @@ public:
     const NamedList<CimClass>& classes() const { return m_classes; }
     const NamedList<CimQualifierType>& qualifierTypes() const { return m_qualifierTypes; }
 
-    /// The class as MOF text, which load() reads again given the class's surroundings.
-    /// Own shows what the class itself declared, All what it inherits too.
-    std::string toMof(const CimClass& cls, Features features = Features::Own) const;
+    /// The class with all that it inherits as MOF text, which load() reads again given the
+    /// class's surroundings.
+    std::string toMof(const CimClass& cls) const;
 
 private:
     friend class ClassLinker;

@@ -7,7 +7,6 @@
 #include <cerrno>
 #include <csignal>
 
-#include "Classes.h"
 #include "Failure.h"
 #include "PathText.h"
 
@@ -35,6 +34,16 @@ Value readValue(const Session& session, const CimElement* declared, const std::s
 /// judge.
 void refuseName(const Session& session, CMPIrc rc, const std::string& message) {
     if (session.unfit == Unfit::Refused) throw Failure(rc, message);
+}
+
+/// The method or property that is named; null where it is not known and left to the provider.
+template <class T>
+const T* named(const Session& session, const std::string& name, const CimClass* cls,
+               NamedList<T> CimClass::*members, CMPIrc unknown, const char* what) {
+    const T* found = cls ? (cls->*members).find(name) : nullptr;
+    if (cls && !found)
+        refuseName(session, unknown, "class " + cls->name + " has no " + what + " " + name);
+    return found;
 }
 
 /// Values given as name=value.
@@ -70,17 +79,12 @@ Reply printed(Session& session, Reply reply, bool instances) {
 
 // -- instances --------------------------------------------------------------------------------
 
-Reply enumInstances(Session& session, const Arguments& arguments) {
+using Operation = Reply (Server::*)(const Request&, const ObjectPath&);
+
+template <Operation Get, bool Instances>
+Reply fetch(Session& session, const Arguments& arguments) {
     const ObjectPath path = readPath(session, arguments.object);
-    return printed(session, session.server.enumInstances(session.request, path), true);
-}
-Reply enumInstanceNames(Session& session, const Arguments& arguments) {
-    const ObjectPath path = readPath(session, arguments.object);
-    return printed(session, session.server.enumInstanceNames(session.request, path), false);
-}
-Reply getInstance(Session& session, const Arguments& arguments) {
-    const ObjectPath path = readPath(session, arguments.object);
-    return printed(session, session.server.getInstance(session.request, path), true);
+    return printed(session, (session.server.*Get)(session.request, path), Instances);
 }
 
 Instance readInstance(const Session& session, const Arguments& arguments) {
@@ -117,7 +121,7 @@ using AssociationOperation = Reply (Server::*)(const Request&, const ObjectPath&
 template <AssociationOperation Operation, bool Instances>
 Reply navigate(Session& session, const Arguments& arguments) {
     const ObjectPath path = readPath(session, arguments.object);
-    return printed(session, (session.server.*Operation)(session.request, path, arguments.filter),
+    return printed(session, (session.server.*Operation)(session.request, path, arguments),
                    Instances);
 }
 
@@ -125,11 +129,8 @@ Reply navigate(Session& session, const Arguments& arguments) {
 
 Reply invokeMethod(Session& session, const Arguments& arguments) {
     const ObjectPath path = readPath(session, arguments.object);
-    const CimClass* cls = classOf(session, path);
-    const CimMethod* method = cls ? cls->methods.find(arguments.name) : nullptr;
-    if (cls && !method)
-        refuseName(session, CMPI_RC_ERR_METHOD_NOT_FOUND,
-                   "class " + cls->name + " has no method " + arguments.name);
+    const CimMethod* method = named(session, arguments.name, classOf(session, path),
+                                    &CimClass::methods, CMPI_RC_ERR_METHOD_NOT_FOUND, "method");
     const NamedValues in = readAssignments(session, method ? &method->parameters : nullptr,
                                            arguments.assignments, CMPI_RC_ERR_INVALID_PARAMETER);
     Reply reply = session.server.invokeMethod(session.request, path, arguments.name, in);
@@ -144,11 +145,9 @@ Reply getProperty(Session& session, const Arguments& arguments) {
 }
 Reply setProperty(Session& session, const Arguments& arguments) {
     const ObjectPath path = readPath(session, arguments.object);
-    const CimClass* cls = classOf(session, path);
-    const CimProperty* property = cls ? cls->properties.find(arguments.name) : nullptr;
-    if (cls && !property)
-        refuseName(session, CMPI_RC_ERR_NO_SUCH_PROPERTY,
-                   "class " + cls->name + " has no property " + arguments.name);
+    const CimProperty* property =
+        named(session, arguments.name, classOf(session, path), &CimClass::properties,
+              CMPI_RC_ERR_NO_SUCH_PROPERTY, "property");
     return session.server.setProperty(session.request, path, arguments.name,
                                       readValue(session, property, arguments.value));
 }
@@ -167,7 +166,7 @@ const CimClass& knownClass(const Session& session, const std::string& name) {
 }
 Reply getClass(Session& session, const Arguments& arguments) {
     const CimClass& cls = knownClass(session, arguments.object);
-    const std::string mof = repository(session).toMof(cls, ClassRepository::Features::All);
+    const std::string mof = repository(session).toMof(cls);
     session.out.write(session.format == Format::Json ? render(Value(mof), session.format) : mof);
     return {};
 }
@@ -227,28 +226,29 @@ Reply watch(Session& session, const Arguments& arguments) {
 
 const std::vector<Verb>& verbs() {
     static const std::vector<Verb> rows = {
-        {"ei", "Enumerate the instances of a class", Takes::Class, true, enumInstances},
-        {"ein", "Enumerate the paths of the instances of a class", Takes::Class, false,
-         enumInstanceNames},
-        {"gi", "Get an instance", Takes::Path, true, getInstance},
-        {"ci", "Create an instance and print its path", Takes::ClassAndValues, false,
-         createInstance},
-        {"mi", "Modify properties of an instance", Takes::PathAndValues, false, modifyInstance},
-        {"di", "Delete an instance", Takes::Path, false, deleteInstance},
-        {"ai", "Get the instances associated with an instance", Takes::Navigation, true,
+        {"ei", "Enumerate the instances of a class", kClass | kPropertyList,
+         fetch<&Server::enumInstances, true>},
+        {"ein", "Enumerate the paths of the instances of a class", kClass,
+         fetch<&Server::enumInstanceNames, false>},
+        {"gi", "Get an instance", kPath | kPropertyList, fetch<&Server::getInstance, true>},
+        {"ci", "Create an instance and print its path", kClass | kPropertyValues, createInstance},
+        {"mi", "Modify properties of an instance", kPath | kPropertyValues, modifyInstance},
+        {"di", "Delete an instance", kPath, deleteInstance},
+        {"ai", "Get the instances associated with an instance",
+         kPath | kPropertyList | kAssociationEnds | kNavigation,
          navigate<&Server::associators, true>},
-        {"ain", "Get the paths of the instances associated with an instance", Takes::Navigation,
-         false, navigate<&Server::associatorNames, false>},
-        {"ri", "Get the associations that refer to an instance", Takes::Navigation, true,
-         navigate<&Server::references, true>},
-        {"rin", "Get the paths of the associations that refer to an instance", Takes::Navigation,
-         false, navigate<&Server::referenceNames, false>},
-        {"im", "Invoke a method", Takes::Method, false, invokeMethod},
-        {"gp", "Get a property of an instance", Takes::Property, false, getProperty},
-        {"sp", "Set a property of an instance", Takes::PropertyAndValue, false, setProperty},
-        {"gc", "Print the declaration of a class", Takes::Class, false, getClass},
-        {"ec", "List all classes, or those below one", Takes::OptionalClass, false, enumClasses},
-        {"watch", "Print indications until interrupted", Takes::Filter, false, watch},
+        {"ain", "Get the paths of the instances associated with an instance",
+         kPath | kAssociationEnds | kNavigation, navigate<&Server::associatorNames, false>},
+        {"ri", "Get the associations that refer to an instance",
+         kPath | kPropertyList | kNavigation, navigate<&Server::references, true>},
+        {"rin", "Get the paths of the associations that refer to an instance", kPath | kNavigation,
+         navigate<&Server::referenceNames, false>},
+        {"im", "Invoke a method", kPath | kMethodName | kInputValues, invokeMethod},
+        {"gp", "Get a property of an instance", kPath | kPropertyName, getProperty},
+        {"sp", "Set a property of an instance", kPath | kPropertyName | kValue, setProperty},
+        {"gc", "Print the declaration of a class", kClass, getClass},
+        {"ec", "List all classes, or those below one", kOptionalClass, enumClasses},
+        {"watch", "Print indications until interrupted", kFilter, watch},
     };
     return rows;
 }

@@ -13,12 +13,11 @@
 namespace cimom {
 
 /// What stands behind a verb, as text.
-struct Arguments {
+struct Arguments : AssociationFilter {
     std::string object;  ///< class or path
     std::string name;    ///< method or property
     std::string value;
     std::vector<std::string> assignments;  ///< name=value
-    AssociationFilter filter;
     std::string query;
     std::string queryLanguage = "WQL";
     std::size_t count = 0;  ///< indications to wait for; 0 for any number
@@ -35,25 +34,26 @@ struct Session {
     ResultStream& out;
 };
 
-/// What a verb takes; the command line is made from it.
-enum class Takes {
-    Class,
-    OptionalClass,
-    Path,
-    ClassAndValues,
-    PathAndValues,
-    Navigation,
-    Method,
-    Property,
-    PropertyAndValue,
-    Filter
+/// What a verb may take, as bits; the command line is made from it.
+enum Takes : unsigned {
+    kClass = 1,
+    kOptionalClass = 2,
+    kPath = 4,
+    kMethodName = 8,
+    kPropertyName = 16,
+    kValue = 32,
+    kPropertyValues = 64,
+    kInputValues = 128,
+    kPropertyList = 256,
+    kAssociationEnds = 512,  ///< --assoc-class and --result-role
+    kNavigation = 1024,      ///< --result-class and --role
+    kFilter = 2048,
 };
 
 struct Verb {
     const char* name;
     const char* help;
-    Takes takes;
-    bool propertyList;  ///< has --properties
+    unsigned takes;
     Reply (*run)(Session& session, const Arguments& arguments);
 };
 

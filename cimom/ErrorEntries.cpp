@@ -22,90 +22,60 @@ constexpr char kStatus[] = "CIMStatusCode";
 constexpr char kStatusText[] = "CIMStatusCodeDescription";
 constexpr char kArguments[] = "MessageArguments";
 
-template <const char* Field>
-CMPIString* getText(const CMPIError* error, CMPIStatus* rc) {
-    return objectEntry(error, rc, [](NamedValues& fields, Broker& broker) -> CMPIString* {
-        const Value* value = fields.find(Field);
-        return value && !value->isNull() ? makeString(broker, value->text()) : nullptr;
-    });
+// A field that has not been set is null, or code 0.
+template <const char* Field, auto Member, class R>
+R getField(NamedValues& fields, Broker& broker) {
+    const Value* value = fields.find(Field);
+    const CMPIValue data = value ? makeData(broker, *value).value : CMPIValue{};
+    return static_cast<R>(data.*Member);
 }
 template <const char* Field>
-CMPIStatus setText(CMPIError* error, const char* text) {
-    return objectStatus(error,
-                        [text](NamedValues& fields, Broker&) { fields.set(Field, Value(text)); });
+constexpr auto getText = entryOf<getField<Field, &CMPIValue::string, CMPIString*>>;
+template <const char* Field>
+constexpr auto getTexts = entryOf<getField<Field, &CMPIValue::array, CMPIArray*>>;
+template <const char* Field, class Enum>
+constexpr auto getCode = entryOf<getField<Field, &CMPIValue::uint32, Enum>>;
+
+Value fieldOf(const char* text) { return Value(text); }
+Value fieldOf(const CMPIArray* texts) {
+    const ArrayBody& body = bodyOf(texts);
+    if (body.elementType != CMPI_string)
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "not an array of strings");
+    return Value::array(CMPI_string, body.elements);
+}
+template <class Enum, class = std::enable_if_t<std::is_enum_v<Enum>>>
+Value fieldOf(Enum code) {
+    return Value(static_cast<std::uint32_t>(code));
 }
 
-template <const char* Field, class Enum>
-Enum getCode(const CMPIError* error, CMPIStatus* rc) {
-    return objectEntry(error, rc, [](NamedValues& fields, Broker&) {
-        const Value* value = fields.find(Field);
-        return static_cast<Enum>(value ? value->uint() : 0);
-    });
+template <const char* Field, class T>
+void setField(NamedValues& fields, Broker&, T given) {
+    fields.set(Field, fieldOf(given));
 }
-template <const char* Field, class Enum>
-CMPIStatus setCode(CMPIError* error, const Enum code) {
-    return objectStatus(error, [code](NamedValues& fields, Broker&) {
-        fields.set(Field, Value(static_cast<std::uint32_t>(code)));
-    });
-}
-
-template <const char* Field>
-CMPIArray* getTexts(const CMPIError* error, CMPIStatus* rc) {
-    return objectEntry(error, rc, [](NamedValues& fields, Broker& broker) -> CMPIArray* {
-        const Value* value = fields.find(Field);
-        return value ? makeData(broker, *value).value.array : nullptr;
-    });
-}
-template <const char* Field, class Array>
-CMPIStatus setTexts(CMPIError* error, Array* texts) {
-    return objectStatus(error, [texts](NamedValues& fields, Broker&) {
-        const ArrayBody& body = bodyOf(static_cast<const CMPIArray*>(texts));
-        if (body.elementType != CMPI_string)
-            throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "not an array of strings");
-        fields.set(Field, Value::array(CMPI_string, body.elements));
-    });
-}
+template <const char* Field, class T>
+constexpr auto set = entryOf<setField<Field, T>>;
 
 }  // namespace
 
 NamedValues newErrorFields(const char* owner, const char* messageId, const char* message,
                            CMPIErrorSeverity severity, CMPIErrorProbableCause cause, CMPIrc rc) {
-    return {{kOwner, Value(owner)},
-            {kMessageId, Value(messageId)},
-            {kMessage, Value(message)},
-            {kSeverity, Value(static_cast<std::uint32_t>(severity))},
-            {kCause, Value(static_cast<std::uint32_t>(cause))},
-            {kStatus, Value(static_cast<std::uint32_t>(rc))}};
+    return {{kOwner, fieldOf(owner)},     {kMessageId, fieldOf(messageId)},
+            {kMessage, fieldOf(message)}, {kSeverity, fieldOf(severity)},
+            {kCause, fieldOf(cause)},     {kStatus, fieldOf(rc)}};
 }
 
 void fillErrorTable(ObjectTables& tables) {
-    std::get<CMPIErrorFT>(tables) = {0,
-                                     releaseObject<CMPIError>,
-                                     cloneObject<CMPIError>,
-                                     getCode<kType, CMPIErrorType>,
-                                     getText<kOtherType>,
-                                     getText<kOwner>,
-                                     getText<kMessageId>,
-                                     getText<kMessage>,
-                                     getCode<kSeverity, CMPIErrorSeverity>,
-                                     getCode<kCause, CMPIErrorProbableCause>,
-                                     getText<kCauseText>,
-                                     getTexts<kActions>,
-                                     getText<kSource>,
-                                     getCode<kSourceFormat, CMPIErrorSrcFormat>,
-                                     getText<kOtherSourceFormat>,
-                                     getCode<kStatus, CMPIrc>,
-                                     getText<kStatusText>,
-                                     getTexts<kArguments>,
-                                     setCode<kType, CMPIErrorType>,
-                                     setText<kOtherType>,
-                                     setText<kCauseText>,
-                                     setTexts<kActions, const CMPIArray>,
-                                     setText<kSource>,
-                                     setCode<kSourceFormat, CMPIErrorSrcFormat>,
-                                     setText<kOtherSourceFormat>,
-                                     setText<kStatusText>,
-                                     setTexts<kArguments, CMPIArray>};
+    std::get<CMPIErrorFT>(tables) = tableOf<CMPIError>(
+        getCode<kType, CMPIErrorType>, getText<kOtherType>, getText<kOwner>, getText<kMessageId>,
+        getText<kMessage>, getCode<kSeverity, CMPIErrorSeverity>,
+        getCode<kCause, CMPIErrorProbableCause>, getText<kCauseText>, getTexts<kActions>,
+        getText<kSource>, getCode<kSourceFormat, CMPIErrorSrcFormat>, getText<kOtherSourceFormat>,
+        getCode<kStatus, CMPIrc>, getText<kStatusText>, getTexts<kArguments>,
+        // what can be set
+        set<kType, CMPIErrorType>, set<kOtherType, const char*>, set<kCauseText, const char*>,
+        set<kActions, const CMPIArray*>, set<kSource, const char*>,
+        set<kSourceFormat, CMPIErrorSrcFormat>, set<kOtherSourceFormat, const char*>,
+        set<kStatusText, const char*>, set<kArguments, CMPIArray*>);
 }
 
 }  // namespace cimom

@@ -1,7 +1,5 @@
 // Entries of CMPIInstance, and the rules by which the class of an instance checks its properties.
 
-#include <algorithm>
-
 #include "NamedEntries.h"
 #include "PathText.h"
 
@@ -13,25 +11,15 @@ const CimProperty* declared(const InstanceBody& body, const std::string& name) {
     return body.cls ? body.cls->properties.find(name) : nullptr;
 }
 
-// Without its class, an instance has the keys of its path.
-bool isKey(const InstanceBody& body, const std::string& name) {
-    if (!body.cls) return body.value.path.keys.find(name) != nullptr;
-    const CimProperty* element = declared(body, name);
-    return element && element->isKey;
-}
-
 bool passesFilter(const InstanceBody& body, const std::string& name) {
-    return !body.filter ||
-           std::any_of(body.filter->begin(), body.filter->end(),
-                       [&](const std::string& each) { return sameName(each, name); });
+    return !body.filter || containsName(*body.filter, name);
 }
 
 // An embedded instance may also come as a text that shows it.
 bool typeAgrees(const CimProperty& element, const Value& value) {
-    if (value.type() == typeOf(element)) return true;
-    const auto bare = [](CMPIType type) { return static_cast<CMPIType>(type & ~CMPI_ARRAY); };
-    return value.isArray() == ((typeOf(element) & CMPI_ARRAY) != 0) &&
-           bare(typeOf(element)) == CMPI_instance && bare(value.type()) == CMPI_string;
+    const CMPIType wanted = typeOf(element);
+    return value.type() == wanted || (wanted == CMPI_instance && value.type() == CMPI_string) ||
+           (wanted == CMPI_instanceA && value.type() == CMPI_stringA);
 }
 
 // The value as the class declares it; @p element is null when it has no such property.
@@ -72,66 +60,53 @@ void takeKeys(InstanceBody& body) {
     }
 }
 
-CMPIData getProperty(const CMPIInstance* instance, const char* name, CMPIStatus* rc) {
-    return objectEntry(instance, rc, [name](InstanceBody& body, Broker& broker) {
-        const std::string wanted = textOf(name);
-        if (const Value* value = body.value.properties.find(wanted))
-            return namedData<CMPIInstance>(broker, body, wanted, *value);
-        // A property of the class that has not been set is there, and null.
-        const CimProperty* element = passesFilter(body, wanted) ? declared(body, wanted) : nullptr;
-        if (!element) throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "no property " + wanted);
-        return namedData<CMPIInstance>(broker, body, wanted, Value::null(typeOf(*element)));
-    });
+CMPIData getProperty(InstanceBody& body, Broker& broker, const char* name) {
+    const std::string wanted = textOf(name);
+    if (const Value* value = body.value.properties.find(wanted))
+        return namedData<CMPIInstance>(broker, body, wanted, *value);
+    // A property of the class that has not been set is there, and null.
+    const CimProperty* element = passesFilter(body, wanted) ? declared(body, wanted) : nullptr;
+    if (!element) throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "no property " + wanted);
+    return namedData<CMPIInstance>(broker, body, wanted, Value::null(typeOf(*element)));
 }
 
-CMPIStatus setProperty(const CMPIInstance* instance, const char* name, const CMPIValue* value,
-                       CMPIType type) {
-    return objectStatus(instance, [=](InstanceBody& body, Broker& broker) {
-        if (!name || !*name) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
-        setInstanceProperty(broker, body, name, readValue(value, type));
-    });
+void setProperty(InstanceBody& body, Broker& broker, const char* name, const CMPIValue* value,
+                 CMPIType type) {
+    if (!name || !*name) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
+    setInstanceProperty(broker, body, name, readValue(value, type));
 }
-CMPIStatus setPropertyWithOrigin(const CMPIInstance* instance, const char* name,
-                                 const CMPIValue* value, const CMPIType type, const char*) {
-    return setProperty(instance, name, value, type);
+void setPropertyWithOrigin(InstanceBody& body, Broker& broker, const char* name,
+                           const CMPIValue* value, CMPIType type, const char*) {
+    setProperty(body, broker, name, value, type);
 }
 
-CMPIObjectPath* getObjectPath(const CMPIInstance* instance, CMPIStatus* rc) {
-    return objectEntry(instance, rc, [](InstanceBody& body, Broker& broker) {
-        return make<CMPIObjectPath>(broker, body.value.path);
-    });
+CMPIObjectPath* getObjectPath(InstanceBody& body, Broker& broker) {
+    return make<CMPIObjectPath>(broker, body.value.path);
 }
-CMPIStatus setObjectPath(CMPIInstance* instance, const CMPIObjectPath* path) {
-    return objectStatus(instance, [path](InstanceBody& body, Broker& broker) {
-        body.value.path = bodyOf(path);
-        body.cls = broker.classOf(body.value.path);
-        takeKeys(body);
-    });
+void setObjectPath(InstanceBody& body, Broker& broker, const CMPIObjectPath* path) {
+    body.value.path = bodyOf(path);
+    body.cls = broker.classOf(body.value.path);
+    takeKeys(body);
 }
 
 // The key list of the call is ignored, as the standard has come to say: keys stay by the class.
-CMPIStatus setPropertyFilter(CMPIInstance* instance, const char** properties, const char**) {
-    return objectStatus(instance, [properties](InstanceBody& body, Broker&) {
-        body.filter.reset();
-        if (!properties) return;
-        const char** end = properties;
-        while (*end) ++end;
-        body.filter = std::make_shared<const std::vector<std::string>>(properties, end);
-        NamedValues kept;
-        for (const auto& [name, value] : body.value.properties)
-            if (passesFilter(body, name) || isKey(body, name)) kept.set(name, value);
-        body.value.properties = std::move(kept);
-    });
+void setPropertyFilter(InstanceBody& body, Broker&, const char** properties, const char**) {
+    body.filter.reset();
+    if (!properties) return;
+    body.filter = std::make_shared<const std::vector<std::string>>(namesIn(properties));
+    NamedValues kept;
+    for (const auto& [name, value] : body.value.properties)
+        if (passesFilter(body, name) || isKey(body, name)) kept.set(name, value);
+    body.value.properties = std::move(kept);
 }
 
 }  // namespace
 
-template <>
-CMPIData namedData<CMPIInstance>(Broker& broker, const InstanceBody& body, const std::string& name,
-                                 const Value& value) {
-    CMPIData data = makeData(broker, value);
-    if (isKey(body, name)) data.state |= CMPI_keyValue;
-    return data;
+// Without its class, an instance has the keys of its path.
+bool isKey(const InstanceBody& body, const std::string& name) {
+    if (!body.cls) return body.value.path.keys.find(name) != nullptr;
+    const CimProperty* element = declared(body, name);
+    return element && element->isKey;
 }
 
 InstanceBody instanceBody(Broker& broker, Instance value) {
@@ -160,17 +135,10 @@ void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& 
 }
 
 void fillInstanceTables(ObjectTables& tables) {
-    std::get<CMPIInstanceFT>(tables) = {0,
-                                        releaseObject<CMPIInstance>,
-                                        cloneObject<CMPIInstance>,
-                                        getProperty,
-                                        getNamedAt<CMPIInstance>,
-                                        countNamed<CMPIInstance>,
-                                        setProperty,
-                                        getObjectPath,
-                                        setPropertyFilter,
-                                        setObjectPath,
-                                        setPropertyWithOrigin};
+    std::get<CMPIInstanceFT>(tables) = tableOf<CMPIInstance>(
+        entryOf<getProperty>, entryOf<getNamedAt<CMPIInstance>>, entryOf<countNamed<CMPIInstance>>,
+        entryOf<setProperty>, entryOf<getObjectPath>, entryOf<setPropertyFilter>,
+        entryOf<setObjectPath>, entryOf<setPropertyWithOrigin>);
 }
 
 }  // namespace cimom

@@ -18,7 +18,6 @@
 namespace {
 
 using cimom::Arguments;
-using cimom::Takes;
 
 constexpr int kUsageError = 64;
 constexpr int kSetupError = 78;
@@ -28,8 +27,6 @@ struct Settings {
     cimom::Request request;
     std::vector<std::string> registrations;
     std::string schema;
-    std::string user;
-    std::string properties;
     std::string providerOutput = "discard";
     int traceLevel = -1;
     cimom::Format format = cimom::Format::Text;
@@ -77,7 +74,9 @@ void addGlobals(CLI::App& app, Settings& settings) {
     app.add_option("--messages", settings.options.messageFolder,
                    "Folder with translated messages of providers")
         ->option_text("FOLDER");
-    app.add_option("--user", settings.user, "User in whose name to ask; nobody when not given")
+    app.add_option_function<std::string>(
+           "--user", [&settings](const std::string& user) { settings.request.user = user; },
+           "User in whose name to ask; nobody when not given")
         ->option_text("NAME");
     app.add_option("--language", settings.request.language,
                    "Languages wanted, as in de-DE,en;q=0.5")
@@ -98,65 +97,56 @@ void addGlobals(CLI::App& app, Settings& settings) {
         ->option_text("LEVEL");
 }
 
-void addPositionals(CLI::App& verb, Takes takes, Arguments& arguments) {
-    const bool ofClass =
-        takes == Takes::Class || takes == Takes::ClassAndValues || takes == Takes::OptionalClass;
-    const bool values = takes == Takes::ClassAndValues || takes == Takes::PathAndValues;
-    if (takes == Takes::Filter) {
-        verb.add_option("filter", arguments.query, "Class of the indications, or a query")
-            ->required();
-        verb.add_option("--query-language", arguments.queryLanguage, "Language of the query [WQL]");
-        verb.add_option("--count", arguments.count, "End after this many indications");
-        return;
-    }
-    auto* object = verb.add_option(ofClass ? "class" : "path", arguments.object,
-                                   ofClass ? "Name of the class" : "Object path");
-    object->required(takes != Takes::OptionalClass);
-    if (takes == Takes::Method || takes == Takes::Property || takes == Takes::PropertyAndValue) {
-        const bool method = takes == Takes::Method;
-        verb.add_option(method ? "method" : "property", arguments.name,
-                        method ? "Name of the method" : "Name of the property")
-            ->required();
-    }
-    if (takes == Takes::PropertyAndValue)
-        verb.add_option("value", arguments.value, "New value")->required();
-    if (values || takes == Takes::Method)
-        verb.add_option(
-                "values", arguments.assignments,
-                values ? "Properties, each as name=value" : "Input arguments, each as name=value")
-            ->option_text("name=value ...");
-}
+struct TextArgument {
+    unsigned takenBy;  ///< bits of Takes
+    const char* name;
+    std::string Arguments::*place;
+    const char* help;
+    bool required;
+};
+constexpr TextArgument kTextArguments[] = {
+    {cimom::kClass, "class", &Arguments::object, "Name of the class", true},
+    {cimom::kOptionalClass, "class", &Arguments::object, "Name of the class", false},
+    {cimom::kPath, "path", &Arguments::object, "Object path", true},
+    {cimom::kMethodName, "method", &Arguments::name, "Name of the method", true},
+    {cimom::kPropertyName, "property", &Arguments::name, "Name of the property", true},
+    {cimom::kValue, "value", &Arguments::value, "New value", true},
+    {cimom::kFilter, "filter", &Arguments::query, "Class of the indications, or a query", true},
+    {cimom::kFilter, "--query-language", &Arguments::queryLanguage, "Language of the query [WQL]",
+     false},
+    {cimom::kAssociationEnds, "--assoc-class", &Arguments::assocClass,
+     "Only through associations of this class", false},
+    {cimom::kNavigation, "--result-class", &Arguments::resultClass, "Only results of this class",
+     false},
+    {cimom::kNavigation, "--role", &Arguments::role,
+     "Only where the given instance stands in this role", false},
+    {cimom::kAssociationEnds, "--result-role", &Arguments::resultRole,
+     "Only where the result stands in this role", false},
+};
 
-void addVerb(CLI::App& app, const cimom::Verb& row, Settings& settings, Arguments& arguments) {
+CLI::App* addVerb(CLI::App& app, const cimom::Verb& row, Settings& settings, Arguments& arguments) {
     CLI::App* verb = app.add_subcommand(row.name, row.help);
     verb->fallthrough();
-    addPositionals(*verb, row.takes, arguments);
-    if (row.propertyList)
-        verb->add_option("--properties", settings.properties,
-                         "Names of the properties wanted, separated by commas")
+    if (row.takes & cimom::kPropertyList)
+        verb->add_option_function<std::string>(
+                "--properties",
+                [&settings](const std::string& names) {
+                    settings.request.properties = cimom::splitAtCommas(names);
+                },
+                "Names of the properties wanted, separated by commas")
             ->option_text("NAMES");
-    if (row.takes != Takes::Navigation) return;
-    const std::string name = row.name;
-    const bool associators = name[0] == 'a';
-    if (associators)
-        verb->add_option("--assoc-class", arguments.filter.assocClass,
-                         "Only through associations of this class");
-    verb->add_option("--result-class", arguments.filter.resultClass, "Only results of this class");
-    verb->add_option("--role", arguments.filter.role,
-                     "Only where the given instance stands in this role");
-    if (associators)
-        verb->add_option("--result-role", arguments.filter.resultRole,
-                         "Only where the result stands in this role");
-}
-
-std::vector<std::string> splitNames(const std::string& text) {
-    std::vector<std::string> names;
-    for (std::size_t at = 0; at < text.size();) {
-        const std::size_t comma = std::min(text.find(',', at), text.size());
-        if (comma > at) names.push_back(text.substr(at, comma - at));
-        at = comma + 1;
-    }
-    return names;
+    for (const TextArgument& argument : kTextArguments)
+        if (row.takes & argument.takenBy)
+            verb->add_option(argument.name, arguments.*argument.place, argument.help)
+                ->required(argument.required);
+    if (row.takes & cimom::kFilter)
+        verb->add_option("--count", arguments.count, "End after this many indications");
+    if (row.takes & (cimom::kPropertyValues | cimom::kInputValues))
+        verb->add_option("values", arguments.assignments,
+                         row.takes & cimom::kPropertyValues ? "Properties, each as name=value"
+                                                            : "Input arguments, each as name=value")
+            ->option_text("name=value ...");
+    return verb;
 }
 
 int reportFailure(CMPIrc rc, const std::string& message) {
@@ -229,7 +219,7 @@ int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments)
                            settings.format,
                            out};
     const std::string what = arguments.name.empty() ? verb.name : arguments.name;
-    Waiting waiting(verb.takes == Takes::Filter ? "" : what);
+    Waiting waiting(verb.takes == cimom::kFilter ? "" : what);
     out.beforeFirstWrite([&] { waiting.end(); });
     try {
         const cimom::Reply reply = verb.run(session, arguments);
@@ -249,21 +239,15 @@ int runCommandLine(int argc, char** argv) {
     Settings settings;
     Arguments arguments;
     addGlobals(app, settings);
-    for (const cimom::Verb& row : cimom::verbs()) addVerb(app, row, settings, arguments);
+    const cimom::Verb* chosen = nullptr;
+    for (const cimom::Verb& row : cimom::verbs())
+        addVerb(app, row, settings, arguments)->callback([&chosen, verb = &row] { chosen = verb; });
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
         return app.exit(error) == 0 ? 0 : kUsageError;
     }
-    if (app.count("--user")) settings.request.user = settings.user;
-    const CLI::App& chosen = *app.get_subcommands().front();
-    const auto* option = chosen.get_option_no_throw("--properties");
-    if (option && option->count()) settings.request.properties = splitNames(settings.properties);
-    const auto& rows = cimom::verbs();
-    const auto verb = std::find_if(rows.begin(), rows.end(), [&](const cimom::Verb& row) {
-        return chosen.get_name() == row.name;
-    });
-    return run(*verb, settings, arguments);
+    return run(*chosen, settings, arguments);
 }
 
 }  // namespace

@@ -6,6 +6,7 @@
 #include <nlohmann/json.hpp>
 
 #include "Failure.h"
+#include "Literal.h"
 
 namespace cimom {
 
@@ -41,15 +42,13 @@ Wish parseWish(const std::string& item) {
 
 std::vector<std::string> wantedLanguages(const std::string& acceptLanguage) {
     std::vector<Wish> wishes;
-    for (std::size_t at = 0; at <= acceptLanguage.size();) {
-        const std::size_t comma = std::min(acceptLanguage.find(',', at), acceptLanguage.size());
-        Wish wish = parseWish(acceptLanguage.substr(at, comma - at));
+    for (const std::string& item : splitAtCommas(acceptLanguage)) {
+        Wish wish = parseWish(item);
         // A language names part of a file: nothing but letters, digits and underscores.
         const bool plain = std::all_of(wish.language.begin(), wish.language.end(), [](char c) {
             return std::isalnum(static_cast<unsigned char>(c)) || c == '_';
         });
         if (!wish.language.empty() && plain && wish.weight > 0) wishes.push_back(std::move(wish));
-        at = comma + 1;
     }
     std::stable_sort(wishes.begin(), wishes.end(),
                      [](const Wish& a, const Wish& b) { return a.weight > b.weight; });

@@ -22,28 +22,28 @@
 }
 
 %code {
+#include <set>
+
 // Something stands where its first token stands.
 #define YYLLOC_DEFAULT(Current, Rhs, N) (Current) = YYRHSLOC(Rhs, (N) ? 1 : 0)
 
 cimom::MofGrammar::symbol_type mofNextToken(void* scanner);
 static cimom::MofGrammar::symbol_type yylex(void* scanner) { return mofNextToken(scanner); }
 
-static void setBrackets(cimom::MofType& type, const cimom::MofType& brackets) {
+static void setBrackets(cimom::CimType& type, const cimom::CimType& brackets) {
     type.isArray = brackets.isArray;
     type.arraySize = brackets.arraySize;
 }
 }
 
 %token END 0 "the end of the file"
-%token PRAGMA "'#pragma'" CLASS "'class'" REF "'ref'" NIL "null"
+%token PRAGMA "'#pragma'" CLASS "'class'" REF "'ref'"
 %token <std::string> AS "'as'" FLAVOR "'flavor'" INSTANCE "'instance'" OF "'of'"
 %token <std::string> QUALIFIER "'qualifier'" SCOPE "'scope'"
 %token <std::string> IDENTIFIER "a name" ALIAS "an alias" STRING "a string"
-%token <CimType> DATATYPE "a type"
+%token <CMPIType> DATATYPE "a type"
 %token <MofInteger> INTEGER "an integer"
-%token <double> REAL "a real number"
-%token <MofCharacter> CHARACTER "a character"
-%token <bool> BOOLEAN "a boolean"
+%token <Value> LITERAL "a literal"
 %token BRACKET_OPEN "'['" BRACKET_CLOSE "']'" PAREN_OPEN "'('" PAREN_CLOSE "')'"
 %token BRACE_OPEN "'{'" BRACE_CLOSE "'}'" COLON "':'" SEMICOLON "';'" COMMA "','" EQUALS "'='"
 
@@ -59,7 +59,7 @@ static void setBrackets(cimom::MofType& type, const cimom::MofType& brackets) {
 %type <MofFeature> feature
 %type <MofParameter> element parameter
 %type <std::vector<MofParameter>> parameters parameterList
-%type <MofType> type brackets
+%type <CimType> type brackets
 %type <unsigned> scopes scopeName
 
 %%
@@ -79,10 +79,9 @@ production:
   | qualifiers INSTANCE OF name alias "'{'" members "'}'" "';'"
   | QUALIFIER name "':'" DATATYPE brackets default
         "','" SCOPE "'('" scopes "')'" defaultFlavors "';'" {
-        MofType type = $5;
-        type.type = $4;
-        input.declarations().qualifierTypes.push_back(
-            {@2, $2, std::move(type), $6, $10, $12.flavorsOn});
+        MofQualifierType declared{{$2, $5, $10, $12.flavorsOn}, @2, $6};
+        declared.type.type = $4;
+        input.declarations().qualifierTypes.push_back(std::move(declared));
     }
 ;
 
@@ -156,13 +155,13 @@ feature:
     element brackets default "';'" {
         static_cast<MofParameter&>($$) = $1;
         setBrackets($$.type, $2);
-        if ($$.type.type == CimType::Reference && $$.type.isArray)
+        if ($$.type.type == CMPI_ref && $$.type.isArray)
             MofInput::fail(@2, "a reference property cannot be an array");
         $$.defaultValue = $3;
     }
   | element "'('" parameters "')'" "';'" {
         static_cast<MofParameter&>($$) = $1;
-        if ($$.type.type == CimType::Reference)
+        if ($$.type.type == CMPI_ref)
             MofInput::fail($$.place, "a method cannot return a reference");
         $$.isMethod = true;
         $$.parameters = $3;
@@ -180,8 +179,8 @@ element: qualifiers type name {
 type:
     DATATYPE { $$.type = $1; }
   | name REF {
-        $$.type = CimType::Reference;
-        $$.className = $1;
+        $$.type = CMPI_ref;
+        $$.referenceClass = $1;
     }
 ;
 
@@ -226,12 +225,9 @@ literalList:
 ;
 
 literal:
-    BOOLEAN { $$ = MofLiteral{@1, $1}; }
+    LITERAL { $$ = MofLiteral{@1, $1}; }
   | INTEGER { $$ = MofLiteral{@1, $1}; }
-  | REAL { $$ = MofLiteral{@1, $1}; }
-  | CHARACTER { $$ = MofLiteral{@1, $1}; }
-  | string { $$ = MofLiteral{@1, $1}; }
-  | NIL { $$ = MofLiteral{@1, {}}; }
+  | string { $$ = MofLiteral{@1, Value($1)}; }
 ;
 
 string: STRING | string STRING { $$ = $1; $$ += $2; };
@@ -262,31 +258,25 @@ const Group kGroups[] = {
     {"a name",
      {Kind::S_IDENTIFIER, Kind::S_AS, Kind::S_FLAVOR, Kind::S_INSTANCE, Kind::S_OF,
       Kind::S_QUALIFIER, Kind::S_SCOPE}},
-    {"a value",
-     {Kind::S_STRING, Kind::S_INTEGER, Kind::S_REAL, Kind::S_CHARACTER, Kind::S_BOOLEAN,
-      Kind::S_NIL}},
+    {"a value", {Kind::S_STRING, Kind::S_INTEGER, Kind::S_LITERAL}},
 };
 
 }  // namespace
 
 void MofGrammar::report_syntax_error(const context& where) const {
     std::vector<symbol_kind_type> kinds(YYNTOKENS);
-    int count = where.expected_tokens(kinds.data(), YYNTOKENS);
-    kinds.resize(static_cast<std::size_t>(count));
+    const int count = where.expected_tokens(kinds.data(), YYNTOKENS);
+    std::set<symbol_kind_type> expected(kinds.begin(), kinds.begin() + count);
 
     std::vector<std::string> words;
     for (const Group& group : kGroups) {
-        auto isExpected = [&](symbol_kind_type kind) {
-            return std::find(kinds.begin(), kinds.end(), kind) != kinds.end();
-        };
-        if (!std::all_of(group.kinds.begin(), group.kinds.end(), isExpected)) continue;
-        auto isOfGroup = [&](symbol_kind_type kind) {
-            return std::find(group.kinds.begin(), group.kinds.end(), kind) != group.kinds.end();
-        };
-        kinds.erase(std::remove_if(kinds.begin(), kinds.end(), isOfGroup), kinds.end());
+        if (!std::all_of(group.kinds.begin(), group.kinds.end(),
+                         [&](symbol_kind_type kind) { return expected.count(kind) != 0; }))
+            continue;
+        for (symbol_kind_type kind : group.kinds) expected.erase(kind);
         words.push_back(group.word);
     }
-    for (symbol_kind_type kind : kinds) words.push_back(symbol_name(kind));
+    for (symbol_kind_type kind : expected) words.push_back(symbol_name(kind));
 
     std::string text = "expected ";
     for (std::size_t i = 0; i < words.size(); ++i) {

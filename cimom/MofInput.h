@@ -46,7 +46,7 @@ public:
     double real() const;
     /// Text of the token, a quoted string, without its quotes and with its escapes resolved.
     std::string unquoted() const;
-    MofCharacter character() const;
+    std::uint16_t character() const;
 
     // -- for the grammar
 
@@ -68,9 +68,6 @@ private:
     MofPlace m_end;
     std::string m_lexeme;
 };
-
-/// The data type of that MOF name, or nothing.
-std::optional<CimType> cimTypeByName(std::string_view name);
 
 }  // namespace cimom
 

@@ -3,14 +3,16 @@
 #include <sys/stat.h>
 
 #include <algorithm>
+#include <cctype>
 #include <cerrno>
 #include <charconv>
-#include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <memory>
 #include <system_error>
 #include <utility>
 
+#include "Literal.h"
 #include "MofGrammar.h"
 #include "MofInput.h"
 
@@ -29,47 +31,36 @@ constexpr std::size_t kMaxIncludeDepth = 16;
 constexpr std::size_t kMaxFiles = 4096;
 constexpr std::size_t kShownLength = 40;
 
-// In the order of CimType.
-constexpr const char* kTypeNames[] = {"boolean", "uint8",  "sint8",  "uint16",   "sint16",
-                                      "uint32",  "sint32", "uint64", "sint64",   "real32",
-                                      "real64",  "char16", "string", "datetime", "ref"};
-
-struct FlavorWord {
+// A word that stands for bits, or for their opposite.
+struct Word {
     const char* word;
-    unsigned flavor;
-    bool isOn;
+    unsigned bits;
+    bool isOn = true;
 };
 
-constexpr FlavorWord kFlavors[] = {
-    {"DisableOverride", DisableOverride, true}, {"EnableOverride", DisableOverride, false},
-    {"Restricted", Restricted, true},           {"ToSubclass", Restricted, false},
-    {"Translatable", Translatable, true},       {"ToInstance", 0, true},
+constexpr Word kFlavors[] = {
+    {"DisableOverride", DisableOverride}, {"EnableOverride", DisableOverride, false},
+    {"Restricted", Restricted},           {"ToSubclass", Restricted, false},
+    {"Translatable", Translatable},       {"ToInstance", 0},
 };
 
-struct ScopeWord {
-    const char* word;
-    unsigned scope;
-};
-
-constexpr ScopeWord kScopes[] = {
+constexpr Word kScopes[] = {
     {"Class", ScopeClass},           {"Association", ScopeAssociation},
     {"Indication", ScopeIndication}, {"Property", ScopeProperty},
     {"Reference", ScopeReference},   {"Method", ScopeMethod},
     {"Parameter", ScopeParameter},   {"Any", ScopeAny},
 };
 
-// The row of a table of words, or a fault that lists the words.
-template <class Row, std::size_t N>
-const Row& rowOf(const Row (&rows)[N], const MofPlace& place, const std::string& word) {
+// The row of a table, or a fault that lists the words.
+template <std::size_t N>
+const Word& rowOf(const Word (&rows)[N], const MofPlace& place, const std::string& word) {
     std::string words;
-    for (const Row& row : rows) {
-        if (NameEqual()(row.word, word)) return row;
+    for (const Word& row : rows) {
+        if (sameName(row.word, word)) return row;
         words += (words.empty() ? "" : ", ") + std::string(row.word);
     }
     MofInput::fail(place, "expected one of " + words + "; found '" + word + "'");
 }
-
-char lower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
 
 std::string describe(const std::vector<MofFault>& faults) {
     std::string all;
@@ -83,19 +74,6 @@ std::string describe(const std::vector<MofFault>& faults) {
     return all;
 }
 
-void appendUtf8(std::string& text, unsigned code) {
-    if (code < 0x80) {
-        text += static_cast<char>(code);
-    } else if (code < 0x800) {
-        text += static_cast<char>(0xC0 | (code >> 6));
-        text += static_cast<char>(0x80 | (code & 0x3F));
-    } else {
-        text += static_cast<char>(0xE0 | (code >> 12));
-        text += static_cast<char>(0x80 | ((code >> 6) & 0x3F));
-        text += static_cast<char>(0x80 | (code & 0x3F));
-    }
-}
-
 // Reads the hexadecimal digits, up to four, at @p at and leaves @p at behind them.
 unsigned readHex(const std::string& text, std::size_t& at) {
     const char* begin = text.data() + at;
@@ -105,50 +83,7 @@ unsigned readHex(const std::string& text, std::size_t& at) {
     return code;
 }
 
-// A flex scanner over one text.
-class Scanner {
-public:
-    Scanner(MofInput& input, std::string_view text) {
-        if (moflex_init_extra(&input, &m_scanner) != 0) throw std::bad_alloc();
-        try {
-            mof_scan_bytes(text.data(), static_cast<int>(text.size()), m_scanner);
-        } catch (...) {
-            moflex_destroy(m_scanner);
-            throw;
-        }
-    }
-    ~Scanner() { moflex_destroy(m_scanner); }
-    Scanner(const Scanner&) = delete;
-    Scanner& operator=(const Scanner&) = delete;
-
-    void* get() const { return m_scanner; }
-
-private:
-    void* m_scanner = nullptr;
-};
-
 }  // namespace
-
-// ---- names and types
-
-const char* cimTypeName(CimType type) { return kTypeNames[static_cast<std::size_t>(type)]; }
-
-std::optional<CimType> cimTypeByName(std::string_view name) {
-    for (std::size_t i = 0; i < static_cast<std::size_t>(CimType::Reference); ++i)
-        if (NameEqual()(kTypeNames[i], name)) return static_cast<CimType>(i);
-    return std::nullopt;
-}
-
-bool NameEqual::operator()(std::string_view a, std::string_view b) const {
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                      [](char x, char y) { return lower(x) == lower(y); });
-}
-
-std::size_t NameHash::operator()(std::string_view name) const {
-    std::uint64_t hash = 14695981039346656037u;  // FNV-1a
-    for (char c : name) hash = (hash ^ static_cast<unsigned char>(lower(c))) * 1099511628211u;
-    return static_cast<std::size_t>(hash);
-}
 
 // ---- files
 
@@ -194,8 +129,11 @@ void MofSession::parseFile(const std::string& path, const MofPlace* includedAt) 
     m_open.push_back(name);
     m_declarations.files.push_back(name);
     MofInput input(*this, &m_declarations.files.back());
-    Scanner scanner(input, body);
-    MofGrammar(input, scanner.get()).parse();
+    void* scanner = nullptr;
+    if (moflex_init_extra(&input, &scanner) != 0) throw std::bad_alloc();
+    const std::unique_ptr<void, int (*)(void*)> freed(scanner, moflex_destroy);
+    mof_scan_bytes(body.data(), static_cast<int>(body.size()), scanner);
+    MofGrammar(input, scanner).parse();
     m_open.pop_back();
 }
 
@@ -258,8 +196,6 @@ double MofInput::real() const {
 }
 
 std::string MofInput::unquoted() const {
-    static constexpr char kLetters[] = "btnfr";
-    static constexpr char kControls[] = "\b\t\n\f\r";
     std::string text;
     text.reserve(m_lexeme.size());
     const std::size_t end = m_lexeme.size() - 1;
@@ -269,51 +205,37 @@ std::string MofInput::unquoted() const {
             text += c;
             continue;
         }
-        c = lower(m_lexeme[i++]);
-        if (c == 'x') {
-            unsigned code = readHex(m_lexeme, i);
-            if (code == 0 || (code >= 0xD800 && code < 0xE000))
-                fail(m_start, "a \\x escape here names no character");
-            appendUtf8(text, code);
-        } else if (const char* letter = std::strchr(kLetters, c)) {
-            text += kControls[letter - kLetters];
-        } else {
-            text += c;
+        c = static_cast<char>(std::tolower(static_cast<unsigned char>(m_lexeme[i++])));
+        if (c != 'x') {
+            text += meaningOfEscape(c);
+            continue;
         }
+        unsigned code = readHex(m_lexeme, i);
+        if (code == 0 || (code >= 0xD800 && code < 0xE000))
+            fail(m_start, "a \\x escape here names no character");
+        text += utf8(code);
     }
     return text;
 }
 
-MofCharacter MofInput::character() const {
-    const std::string utf8 = unquoted();
-    auto bits = [&](std::size_t i, unsigned mask) {
-        return static_cast<unsigned>(static_cast<unsigned char>(utf8[i]) & mask);
-    };
-    unsigned code = 0;
-    switch (utf8.size()) {
-        case 1:
-            code = bits(0, 0x7F);
-            break;
-        case 2:
-            code = bits(0, 0x1F) << 6 | bits(1, 0x3F);
-            break;
-        case 3:
-            code = bits(0, 0x0F) << 12 | bits(1, 0x3F) << 6 | bits(2, 0x3F);
-            break;
-        default:
-            fail(m_start, "this character does not fit 16 bits");
-    }
-    return {static_cast<char16_t>(code)};
+std::uint16_t MofInput::character() const {
+    const std::string text = unquoted();
+    if (text.size() > 3) fail(m_start, "this character does not fit 16 bits");
+    static constexpr unsigned kBitsOfFirst[] = {0x7F, 0x1F, 0x0F};  // of one, two, three bytes
+    unsigned code = static_cast<unsigned char>(text[0]) & kBitsOfFirst[text.size() - 1];
+    for (std::size_t i = 1; i < text.size(); ++i)
+        code = code << 6 | (static_cast<unsigned char>(text[i]) & 0x3F);
+    return static_cast<std::uint16_t>(code);
 }
 
 void MofInput::pragma(const MofPlace& place, const std::string& name,
                       const std::vector<MofLiteral>& arguments) {
-    if (!NameEqual()(name, "include")) return;
-    const std::string* path =
-        arguments.size() == 1 ? std::get_if<std::string>(&arguments[0].value) : nullptr;
-    if (!path || path->empty()) fail(place, "expected one path in quotes behind 'include'");
+    if (!sameName(name, "include")) return;
+    const Value* path = arguments.size() == 1 ? std::get_if<Value>(&arguments[0].value) : nullptr;
+    if (!path || path->type() != CMPI_string || path->text().empty())
+        fail(place, "expected one path in quotes behind 'include'");
     std::filesystem::path here(*place.file);
-    m_session.parseFile((here.parent_path() / *path).string(), &arguments[0].place);
+    m_session.parseFile((here.parent_path() / path->text()).string(), &arguments[0].place);
 }
 
 std::uint32_t MofInput::arraySize(const MofPlace& place, const MofInteger& size) const {
@@ -324,12 +246,12 @@ std::uint32_t MofInput::arraySize(const MofPlace& place, const MofInteger& size)
 
 void MofInput::addFlavor(const MofPlace& place, const std::string& name,
                          MofQualifier& qualifier) const {
-    const FlavorWord& row = rowOf(kFlavors, place, name);
-    (row.isOn ? qualifier.flavorsOn : qualifier.flavorsOff) |= row.flavor;
+    const Word& row = rowOf(kFlavors, place, name);
+    (row.isOn ? qualifier.flavorsOn : qualifier.flavorsOff) |= row.bits;
 }
 
 unsigned MofInput::scope(const MofPlace& place, const std::string& name) const {
-    return rowOf(kScopes, place, name).scope;
+    return rowOf(kScopes, place, name).bits;
 }
 
 }  // namespace cimom

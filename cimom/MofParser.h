@@ -6,47 +6,18 @@
 #ifndef CIMOM_MOF_PARSER_H
 #define CIMOM_MOF_PARSER_H
 
-#include <cstddef>
 #include <cstdint>
 #include <deque>
 #include <functional>
 #include <optional>
 #include <stdexcept>
 #include <string>
-#include <string_view>
 #include <variant>
 #include <vector>
 
+#include "Value.h"
+
 namespace cimom {
-
-enum class CimType : std::uint8_t {
-    Boolean,
-    Uint8,
-    Sint8,
-    Uint16,
-    Sint16,
-    Uint32,
-    Sint32,
-    Uint64,
-    Sint64,
-    Real32,
-    Real64,
-    Char16,
-    String,
-    DateTime,
-    Reference
-};
-
-/// MOF spelling of @p type ("uint32"); "ref" for Reference.
-const char* cimTypeName(CimType type);
-
-/// Equality and hash of CIM names: ASCII letters compare without regard to case.
-struct NameEqual {
-    bool operator()(std::string_view a, std::string_view b) const;
-};
-struct NameHash {
-    std::size_t operator()(std::string_view name) const;
-};
 
 /// Flavors of a qualifier, as bits. Override and propagation are on unless switched off.
 enum MofFlavor : unsigned { DisableOverride = 1, Restricted = 2, Translatable = 4 };
@@ -100,15 +71,9 @@ struct MofInteger {
     bool isNegative = false;
 };
 
-/// A character literal: one UTF-16 unit.
-struct MofCharacter {
-    char16_t unit = 0;
-};
-
-/// A literal; monostate is NULL.
 struct MofLiteral {
     MofPlace place;
-    std::variant<std::monostate, bool, MofInteger, double, MofCharacter, std::string> value;
+    std::variant<Value, MofInteger> value;
 };
 
 /// What stands behind "=" or in a qualifier's parentheses or braces.
@@ -126,18 +91,20 @@ struct MofQualifier {
     unsigned flavorsOff = 0;  ///< bits whose opposite is named
 };
 
-/// Type part of a property, parameter, method or qualifier type.
-struct MofType {
-    CimType type = CimType::Boolean;
-    std::string className;  ///< of a reference
+/// A type as it is declared: of a property, parameter, method or qualifier.
+struct CimType {
+    CMPIType type = CMPI_boolean;  ///< of the value, or of each element
     bool isArray = false;
-    std::uint32_t arraySize = 0;  ///< 0: not given
+    std::uint32_t arraySize = 0;  ///< 0: any number of elements
+    std::string referenceClass;   ///< of a CMPI_ref; else empty
+
+    CMPIType cmpiType() const { return static_cast<CMPIType>(type | (isArray ? CMPI_ARRAY : 0)); }
 };
 
 struct MofParameter {
     MofPlace place;
     std::string name;
-    MofType type;
+    CimType type;
     std::vector<MofQualifier> qualifiers;
 };
 
@@ -157,13 +124,16 @@ struct MofClass {
     std::vector<MofFeature> features;
 };
 
-struct MofQualifierType {
-    MofPlace place;
+struct CimQualifierType {
     std::string name;
-    MofType type;
+    CimType type;
+    unsigned scopes = 0;   ///< MofScope bits
+    unsigned flavors = 0;  ///< MofFlavor bits
+};
+
+struct MofQualifierType : CimQualifierType {
+    MofPlace place;
     std::optional<MofInitializer> defaultValue;
-    unsigned scopes = 0;
-    unsigned flavors = 0;
 };
 
 struct MofDeclarations {

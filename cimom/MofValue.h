@@ -4,17 +4,20 @@
 
 #include <string>
 
-#include "ClassRepository.h"
+#include "MofParser.h"
 
 namespace cimom {
 
 /// Turns @p initializer into a value of @p type.
 /// @return why it does not fit; empty when it does
-std::string convertMofValue(const MofInitializer& initializer, const MofType& type,
-                            CimValue& value);
+std::string convertMofValue(const MofInitializer& initializer, const CimType& type, Value& value);
 
-/// MOF text of @p value: a literal, or literals in braces when @p isArray.
-std::string printMofValue(const CimValue& value, CimType type, bool isArray);
+/// MOF text of @p value: a literal, or literals in braces.
+std::string printMofValue(const Value& value);
+
+/// How MOF declares a type: the word before a name, and the brackets behind it.
+std::string mofTypeWord(const CimType& type);
+std::string mofBrackets(const CimType& type);
 
 }  // namespace cimom
 

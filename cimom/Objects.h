@@ -240,6 +240,14 @@ BodyOf<C>& bodyOf(const C* object) {
 
 /// A text made into an object of the request.
 CMPIString* makeString(Broker& broker, const std::string& text);
+/// The element of a list that a caller asks for by its position.
+/// @throws Failure CMPI_RC_ERR_NO_SUCH_PROPERTY when there is none
+template <class List>
+auto& elementAt(List& list, CMPICount index) {
+    if (index >= list.size())
+        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "index " + std::to_string(index));
+    return list.begin()[index];
+}
 /// Reads a C value. A null @p value gives a null of the type; CMPI_chars values are the text
 /// itself, as everywhere in CMPI.
 /// @throws Failure CMPI_RC_ERR_INVALID_DATA_TYPE for a type that a value cannot have
@@ -275,7 +283,7 @@ auto entry(CMPIStatus* rc, Broker* broker, F body) -> decltype(body()) {
         return {};
 }
 
-/// The same for entries on an object that answer a value.
+/// Runs @p body with the content of an object and its broker.
 template <class C, class F>
 auto objectEntry(const C* object, CMPIStatus* rc, F body) {
     Broker* broker =
@@ -286,15 +294,44 @@ auto objectEntry(const C* object, CMPIStatus* rc, F body) {
     });
 }
 
-/// The same for entries on an object that answer a status alone.
-template <class C, class F>
-CMPIStatus objectStatus(const C* object, F body) {
-    CMPIStatus status{CMPI_RC_OK, nullptr};
-    objectEntry(object, &status, [&](auto& content, Broker& broker) { body(content, broker); });
-    return status;
-}
+/// The C function that runs a body of C++, for objects `R body(BodyOf<C>&, Broker&, arguments...)`
+/// and for the broker `R body(Broker&, arguments...)`. It reports by the CMPIStatus* behind the
+/// arguments, or, where the body answers nothing, by the status that it returns.
+template <class Object, auto Body, class Signature = decltype(Body)>
+struct EntryPoint;
+template <class Object, auto Body, class R, class Content, class... A>
+struct EntryPoint<Object, Body, R (*)(Content&, Broker&, A...)> {
+    static R run(Object* object, A... arguments, CMPIStatus* rc) {
+        return objectEntry(object, rc, [&](Content& content, Broker& broker) {
+            return Body(content, broker, arguments...);
+        });
+    }
+};
+template <class Object, auto Body, class Content, class... A>
+struct EntryPoint<Object, Body, void (*)(Content&, Broker&, A...)> {
+    static CMPIStatus run(Object* object, A... arguments) {
+        CMPIStatus status{CMPI_RC_OK, nullptr};
+        objectEntry(object, &status,
+                    [&](Content& content, Broker& broker) { Body(content, broker, arguments...); });
+        return status;
+    }
+};
 
-/// release and clone, the same for every kind.
+/// Stands for that function in a table, whose entry says which object it takes, const or not.
+template <auto Body>
+struct Entry {
+    template <class R, class Object, class... A>
+    using Function = R (*)(Object*, A...);
+
+    template <class R, class Object, class... A>
+    constexpr operator Function<R, Object, A...>() const {  // NOLINT: a table takes it as it is
+        return EntryPoint<Object, Body>::run;
+    }
+};
+template <auto Body>
+constexpr Entry<Body> entryOf{};
+
+/// release, the same for every kind.
 template <class C>
 CMPIStatus releaseObject(C* object) {
     CMPIStatus status{CMPI_RC_OK, nullptr};
@@ -305,10 +342,15 @@ CMPIStatus releaseObject(C* object) {
     return status;
 }
 template <class C>
-C* cloneObject(const C* object, CMPIStatus* rc) {
-    return objectEntry(object, rc, [](const BodyOf<C>& body, Broker& broker) {
-        return makeIn<C>(strayPool(broker), body);
-    });
+C* cloneBody(const BodyOf<C>& body, Broker& broker) {
+    return makeIn<C>(strayPool(broker), body);
+}
+
+/// The table of a kind: release, clone, and the entries of its own. The version is set by the
+/// broker.
+template <class C, class... Entries>
+TableOf<C> tableOf(Entries... own) {
+    return {0, releaseObject<C>, entryOf<cloneBody<C>>, own...};
 }
 
 }  // namespace cimom

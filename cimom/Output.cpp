@@ -59,27 +59,10 @@ Json toJson(const Value& value) {
         for (const Value& element : value.elements()) array.push_back(toJson(element));
         return array;
     }
-    switch (value.type()) {
-        case CMPI_boolean:
-            return value.boolean();
-        case CMPI_real32:
-        case CMPI_real64:
-            return value.real();
-        case CMPI_instance:
-            return toJson(value.instance());
-        case CMPI_uint8:
-        case CMPI_uint16:
-        case CMPI_uint32:
-        case CMPI_uint64:
-            return value.uint();
-        case CMPI_sint8:
-        case CMPI_sint16:
-        case CMPI_sint32:
-        case CMPI_sint64:
-            return value.sint();
-        default:
-            return plainText(value);
-    }
+    if (value.type() == CMPI_boolean) return value.boolean();
+    if (isReal(value.type())) return value.real();
+    if (isInteger(value.type())) return value.isSigned() ? Json(value.sint()) : Json(value.uint());
+    return value.type() == CMPI_instance ? toJson(value.instance()) : Json(plainText(value));
 }
 
 Json toJson(const NamedValues& values) {
@@ -93,8 +76,6 @@ Json toJson(const Instance& instance) {
             {"class", instance.path.className},
             {"properties", toJson(instance.properties)}};
 }
-Json toJson(const ObjectPath& path) { return printPath(path); }
-Json toJson(const std::string& name) { return name; }
 
 std::string toText(const Instance& instance) { return printInstance(instance); }
 std::string toText(const ObjectPath& path) { return printPath(path) + "\n"; }

@@ -15,62 +15,8 @@ namespace cimom {
 
 namespace {
 
-struct TypeName {
-    CMPIType type;
-    const char* name;
-};
-constexpr TypeName kTypeNames[] = {
-    {CMPI_null, "null"},         {CMPI_boolean, "boolean"}, {CMPI_char16, "char16"},
-    {CMPI_real32, "real32"},     {CMPI_real64, "real64"},   {CMPI_uint8, "uint8"},
-    {CMPI_uint16, "uint16"},     {CMPI_uint32, "uint32"},   {CMPI_uint64, "uint64"},
-    {CMPI_sint8, "sint8"},       {CMPI_sint16, "sint16"},   {CMPI_sint32, "sint32"},
-    {CMPI_sint64, "sint64"},     {CMPI_string, "string"},   {CMPI_dateTime, "datetime"},
-    {CMPI_instance, "instance"}, {CMPI_ref, "reference"},   {CMPI_ptr, "pointer"},
-};
-
-struct Escape {
-    char letter;
-    char meant;
-};
 constexpr std::string_view kInstanceOf = "instance of ";
 constexpr int kDeepest = 50;
-
-constexpr Escape kEscapes[] = {{'"', '"'},  {'\\', '\\'}, {'\'', '\''}, {'n', '\n'},
-                               {'t', '\t'}, {'r', '\r'},  {'b', '\b'},  {'f', '\f'}};
-
-void appendEscaped(std::string& out, char c, char quote) {
-    for (const Escape& escape : kEscapes)
-        if (escape.meant == c && (c == quote || (c != '"' && c != '\''))) {
-            out += '\\';
-            out += escape.letter;
-            return;
-        }
-    if (static_cast<unsigned char>(c) >= 0x20) {
-        out += c;
-        return;
-    }
-    char text[8];
-    std::snprintf(text, sizeof text, "\\x%04X", static_cast<unsigned>(c));
-    out += text;
-}
-
-std::string quoted(const std::string& text) {
-    std::string out = "\"";
-    for (char c : text) appendEscaped(out, c, '"');
-    return out + '"';
-}
-
-std::string printChar16(std::uint64_t unit) {
-    std::string out = "'";
-    if (unit >= 0x20 && unit < 0x7F) {
-        appendEscaped(out, static_cast<char>(unit), '\'');
-    } else {
-        char text[16];
-        std::snprintf(text, sizeof text, "\\x%04X", static_cast<unsigned>(unit));
-        out += text;
-    }
-    return out + "'";
-}
 
 // The shortest text that reads back as the same number, with something that shows it is a real.
 std::string printReal(double value, bool single) {
@@ -88,7 +34,8 @@ std::string printReal(double value, bool single) {
     return out;
 }
 
-// A whole text as a number of the type.
+}  // namespace
+
 bool parseNumber(const std::string& text, CMPIType type, Value& result) {
     if (text.empty() || std::strchr(" \t\n", text[0])) return false;
     char* end = nullptr;
@@ -106,6 +53,8 @@ bool parseNumber(const std::string& text, CMPIType type, Value& result) {
     return end == text.c_str() + text.size() && (errno == 0 || tiny) &&
            wide.convertTo(type, result);
 }
+
+namespace {
 
 // Reads texts of the forms above from left to right.
 class Scanner {
@@ -193,17 +142,9 @@ private:
             m_unit = static_cast<std::uint16_t>(unit);
             return utf8(m_unit);
         }
-        for (const Escape& escape : kEscapes)
-            if (escape.letter == letter) return std::string(1, escape.meant);
-        fail("unknown escape");
-    }
-
-    static std::string utf8(std::uint16_t unit) {
-        const auto byte = [](int value) { return static_cast<char>(value); };
-        if (unit < 0x80) return {byte(unit)};
-        if (unit < 0x800) return {byte(0xC0 | unit >> 6), byte(0x80 | (unit & 0x3F))};
-        return {byte(0xE0 | unit >> 12), byte(0x80 | (unit >> 6 & 0x3F)),
-                byte(0x80 | (unit & 0x3F))};
+        const char meant = meaningOfEscape(letter);
+        if (meant == 0) fail("unknown escape");
+        return {meant};
     }
 
     Value charLiteral() {
@@ -269,17 +210,17 @@ std::string valueText(const Value& value, const std::string& indent) {
         case CMPI_boolean:
             return value.boolean() ? "true" : "false";
         case CMPI_char16:
-            return printChar16(value.uint());
+            return quotedUnit(value.uint(), Controls::ByLetter);
         case CMPI_real32:
             return printReal(value.real(), true);
         case CMPI_real64:
             return printReal(value.real(), false);
         case CMPI_string:
-            return quoted(value.text());
+            return quoted(value.text(), '"', Controls::ByLetter);
         case CMPI_dateTime:
-            return quoted(value.dateTime().text());
+            return quoted(value.dateTime().text(), '"', Controls::ByLetter);
         case CMPI_ref:
-            return quoted(printPath(value.reference()));
+            return quoted(printPath(value.reference()), '"', Controls::ByLetter);
         case CMPI_instance:
             return instanceText(value.instance(), indent);
         case CMPI_ptr:
@@ -287,8 +228,7 @@ std::string valueText(const Value& value, const std::string& indent) {
         default:
             break;
     }
-    return (value.type() & CMPI_SINT) == CMPI_SINT ? std::to_string(value.sint())
-                                                   : std::to_string(value.uint());
+    return value.isSigned() ? std::to_string(value.sint()) : std::to_string(value.uint());
 }
 
 void appendProperties(std::string& out, const Instance& instance, const std::string& indent) {
@@ -386,18 +326,6 @@ Value parseArray(const std::string& text, CMPIType elementType, const ClassRepos
 }
 
 }  // namespace
-
-bool isValueType(CMPIType type) {
-    return std::any_of(std::begin(kTypeNames), std::end(kTypeNames),
-                       [type](const TypeName& row) { return row.type == (type & ~CMPI_ARRAY); });
-}
-
-std::string typeName(CMPIType type) {
-    for (const TypeName& row : kTypeNames)
-        if (row.type == (type & ~CMPI_ARRAY))
-            return std::string(row.name) + (type & CMPI_ARRAY ? "[]" : "");
-    return "type " + std::to_string(type);
-}
 
 std::string printPath(const ObjectPath& path) {
     std::string out;

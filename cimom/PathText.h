@@ -10,8 +10,8 @@
 
 #include <string>
 
-#include "Classes.h"
-#include "Value.h"
+#include "ClassRepository.h"
+#include "Literal.h"
 
 namespace cimom {
 
@@ -34,15 +34,14 @@ std::string plainText(const Value& value);
 /// @throws Failure CMPI_RC_ERR_TYPE_MISMATCH when the text is no such value
 Value parseValue(const std::string& text, CMPIType type, const ClassRepository* classes = nullptr,
                  Unfit unfit = Unfit::Refused);
+/// Reads a whole text as a number of the type.
+/// @return false, leaving @p result, when it is none
+bool parseNumber(const std::string& text, CMPIType type, Value& result);
 /// Reads a text whose type nobody knows: whatever printValue could have printed, else a string.
 Value guessValue(const std::string& text);
 
 /// "instance of Class { ... };" with one property a line, preceded by its path as a comment.
 std::string printInstance(const Instance& instance);
-
-/// CIM name of a type, "uint32[]" for arrays.
-std::string typeName(CMPIType type);
-bool isValueType(CMPIType type);
 
 /// The path with its keys as its class declares them, and so the paths in its keys; a path of
 /// an unknown class stays as it is.

@@ -15,20 +15,10 @@ namespace {
 
 using Json = nlohmann::json;
 
-struct InterfaceName {
-    const char* name;
-    Interface bit;
-};
-constexpr InterfaceName kInterfaceNames[] = {{"instance", kInstance},
-                                             {"association", kAssociation},
-                                             {"method", kMethod},
-                                             {"indication", kIndication},
-                                             {"property", kProperty}};
-
 unsigned interfaceBit(const std::string& name) {
-    for (const InterfaceName& row : kInterfaceNames)
-        if (name == row.name) return row.bit;
-    throw std::runtime_error("unknown interface '" + name + "'");
+    const unsigned bit = interfacesThat([&](const auto& kind) { return name == kind.name; });
+    if (bit == 0) throw std::runtime_error("unknown interface '" + name + "'");
+    return bit;
 }
 
 std::vector<std::string> oneOrMore(const Json& json) {
@@ -110,15 +100,14 @@ CMPIrc cleanUp(MI* mi, const CMPIContext* context, bool terminating) {
 // The factory of the provider's name goes before the generic one of its library.
 template <class MI>
 MI* Provider::create(Broker& broker, const CMPIContext* context, CMPIStatus& status) {
-    using Named = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
     using Generic = MI* (*)(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
     if (m_file.empty()) {
-        const Named factory = m_factories.*InterfaceTraits<MI>::kFactory;
+        const Factory<MI> factory = m_factories.*kindOfInterface<MI>().factory;
         return factory ? factory(broker.face(), context, &status) : nullptr;
     }
-    const std::string suffix = std::string("_Create_") + InterfaceTraits<MI>::kName;
+    const std::string suffix = std::string("_Create_") + kindOfInterface<MI>().factoryName;
     if (void* symbol = dlsym(m_library, (m_name + suffix).c_str()))
-        return reinterpret_cast<Named>(symbol)(broker.face(), context, &status);
+        return reinterpret_cast<Factory<MI>>(symbol)(broker.face(), context, &status);
     if (void* symbol = dlsym(m_library, ("_Generic" + suffix).c_str()))
         return reinterpret_cast<Generic>(symbol)(broker.face(), context, m_name.c_str(), &status);
     throw Failure(CMPI_RC_ERR_FAILED,
@@ -135,7 +124,7 @@ MI& Provider::interface(Broker& broker, const CMPIContext* context) {
     MI* fresh = create<MI>(broker, context, status);
     if (!fresh || status.rc != CMPI_RC_OK || !fresh->ft) {
         std::string text =
-            "provider " + m_name + ": its factory made no " + InterfaceTraits<MI>::kName;
+            "provider " + m_name + ": its factory made no " + kindOfInterface<MI>().factoryName;
         if (status.rc != CMPI_RC_OK) text += std::string(", ") + statusName(status.rc);
         if (status.msg) text += ": " + bodyOf(status.msg).text;
         throw Failure(CMPI_RC_ERR_FAILED, text);

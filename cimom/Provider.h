@@ -45,37 +45,31 @@ std::string libraryFileName(const std::string& name);
 
 /// What distinguishes the five kinds of interfaces.
 template <class MI>
-struct InterfaceTraits;
-template <>
-struct InterfaceTraits<CMPIInstanceMI> {
-    static constexpr Interface kBit = kInstance;
-    static constexpr const char* kName = "InstanceMI";
-    static constexpr auto kFactory = &Factories::instance;
+struct InterfaceKind {
+    Interface bit;
+    const char* name;         ///< in registrations
+    const char* factoryName;  ///< behind the "_Create_" of a library's factories
+    Factory<MI> Factories::*factory;
 };
-template <>
-struct InterfaceTraits<CMPIAssociationMI> {
-    static constexpr Interface kBit = kAssociation;
-    static constexpr const char* kName = "AssociationMI";
-    static constexpr auto kFactory = &Factories::association;
-};
-template <>
-struct InterfaceTraits<CMPIMethodMI> {
-    static constexpr Interface kBit = kMethod;
-    static constexpr const char* kName = "MethodMI";
-    static constexpr auto kFactory = &Factories::method;
-};
-template <>
-struct InterfaceTraits<CMPIIndicationMI> {
-    static constexpr Interface kBit = kIndication;
-    static constexpr const char* kName = "IndicationMI";
-    static constexpr auto kFactory = &Factories::indication;
-};
-template <>
-struct InterfaceTraits<CMPIPropertyMI> {
-    static constexpr Interface kBit = kProperty;
-    static constexpr const char* kName = "PropertyMI";
-    static constexpr auto kFactory = &Factories::property;
-};
+constexpr std::tuple kInterfaceKinds{
+    InterfaceKind<CMPIInstanceMI>{kInstance, "instance", "InstanceMI", &Factories::instance},
+    InterfaceKind<CMPIAssociationMI>{kAssociation, "association", "AssociationMI",
+                                     &Factories::association},
+    InterfaceKind<CMPIMethodMI>{kMethod, "method", "MethodMI", &Factories::method},
+    InterfaceKind<CMPIIndicationMI>{kIndication, "indication", "IndicationMI",
+                                    &Factories::indication},
+    InterfaceKind<CMPIPropertyMI>{kProperty, "property", "PropertyMI", &Factories::property}};
+template <class MI>
+constexpr const InterfaceKind<MI>& kindOfInterface() {
+    return std::get<InterfaceKind<MI>>(kInterfaceKinds);
+}
+/// The bits of the interfaces for which @p has holds.
+template <class Predicate>
+unsigned interfacesThat(Predicate has) {
+    return std::apply(
+        [&](const auto&... kind) { return ((has(kind) ? unsigned{kind.bit} : 0U) | ...); },
+        kInterfaceKinds);
+}
 
 /// One provider with the interfaces that have been asked for so far. Thread-safe.
 class Provider {

@@ -3,7 +3,6 @@
 #include <strings.h>
 
 #include <algorithm>
-#include <array>
 #include <cctype>
 
 #include "Failure.h"
@@ -14,10 +13,11 @@ namespace cimom {
 // A leaf compares; an inner node joins its operands. NOT is gone after parsing: it turns the
 // operators of the leaves around and swaps AND and OR.
 struct Query::Expression {
-    bool leaf = true;
-    bool all = true;  // inner: AND, otherwise OR
-    Predicate predicate;
+    Predicate predicate;  // of a leaf
+    bool all = true;      // inner: AND, otherwise OR
     std::vector<std::shared_ptr<const Expression>> operands;
+
+    bool isLeaf() const { return operands.empty(); }
 };
 
 namespace {
@@ -27,26 +27,32 @@ using ExpressionPtr = std::shared_ptr<const Query::Expression>;
 constexpr std::size_t kMostParts = 1000;
 constexpr int kDeepestNesting = 100;
 
+// How the value of a property may stand to a literal, as bits.
+enum Order : unsigned { kBelow = 1, kEqual = 2, kAbove = 4 };
+
 struct Operator {
     const char* text;
     CMPIPredOp op;
     CMPIPredOp negated;
     CMPIPredOp mirrored;  // with its sides exchanged
+    unsigned orders;      // for which it holds
 };
 constexpr Operator kOperators[] = {
-    {"=", CMPI_PredOp_Equals, CMPI_PredOp_NotEquals, CMPI_PredOp_Equals},
-    {"<>", CMPI_PredOp_NotEquals, CMPI_PredOp_Equals, CMPI_PredOp_NotEquals},
-    {"!=", CMPI_PredOp_NotEquals, CMPI_PredOp_Equals, CMPI_PredOp_NotEquals},
-    {"<", CMPI_PredOp_LessThan, CMPI_PredOp_GreaterThanOrEquals, CMPI_PredOp_GreaterThan},
-    {">", CMPI_PredOp_GreaterThan, CMPI_PredOp_LessThanOrEquals, CMPI_PredOp_LessThan},
-    {"<=", CMPI_PredOp_LessThanOrEquals, CMPI_PredOp_GreaterThan, CMPI_PredOp_GreaterThanOrEquals},
-    {">=", CMPI_PredOp_GreaterThanOrEquals, CMPI_PredOp_LessThan, CMPI_PredOp_LessThanOrEquals},
-    {"ISA", CMPI_PredOp_Isa, CMPI_PredOp_NotIsa, CMPI_PredOp_Isa},
-    {"", CMPI_PredOp_NotIsa, CMPI_PredOp_Isa, CMPI_PredOp_NotIsa},
-    {"LIKE", CMPI_PredOp_Like, CMPI_PredOp_NotLike, CMPI_PredOp_Like},
-    {"", CMPI_PredOp_NotLike, CMPI_PredOp_Like, CMPI_PredOp_NotLike},
-    {"", CMPI_PredOp_Null, CMPI_PredOp_Not_Null, CMPI_PredOp_Null},
-    {"", CMPI_PredOp_Not_Null, CMPI_PredOp_Null, CMPI_PredOp_Not_Null},
+    {"=", CMPI_PredOp_Equals, CMPI_PredOp_NotEquals, CMPI_PredOp_Equals, kEqual},
+    {"<>", CMPI_PredOp_NotEquals, CMPI_PredOp_Equals, CMPI_PredOp_NotEquals, kBelow | kAbove},
+    {"!=", CMPI_PredOp_NotEquals, CMPI_PredOp_Equals, CMPI_PredOp_NotEquals, kBelow | kAbove},
+    {"<", CMPI_PredOp_LessThan, CMPI_PredOp_GreaterThanOrEquals, CMPI_PredOp_GreaterThan, kBelow},
+    {">", CMPI_PredOp_GreaterThan, CMPI_PredOp_LessThanOrEquals, CMPI_PredOp_LessThan, kAbove},
+    {"<=", CMPI_PredOp_LessThanOrEquals, CMPI_PredOp_GreaterThan, CMPI_PredOp_GreaterThanOrEquals,
+     kBelow | kEqual},
+    {">=", CMPI_PredOp_GreaterThanOrEquals, CMPI_PredOp_LessThan, CMPI_PredOp_LessThanOrEquals,
+     kEqual | kAbove},
+    {"ISA", CMPI_PredOp_Isa, CMPI_PredOp_NotIsa, CMPI_PredOp_Isa, 0},
+    {"", CMPI_PredOp_NotIsa, CMPI_PredOp_Isa, CMPI_PredOp_NotIsa, 0},
+    {"LIKE", CMPI_PredOp_Like, CMPI_PredOp_NotLike, CMPI_PredOp_Like, 0},
+    {"", CMPI_PredOp_NotLike, CMPI_PredOp_Like, CMPI_PredOp_NotLike, 0},
+    {"", CMPI_PredOp_Null, CMPI_PredOp_Not_Null, CMPI_PredOp_Null, 0},
+    {"", CMPI_PredOp_Not_Null, CMPI_PredOp_Null, CMPI_PredOp_Not_Null, 0},
 };
 
 const Operator& rowOf(CMPIPredOp op) {
@@ -55,22 +61,16 @@ const Operator& rowOf(CMPIPredOp op) {
 }
 
 ExpressionPtr leaf(Predicate predicate) {
-    auto made = std::make_shared<Query::Expression>();
-    made->predicate = std::move(predicate);
-    return made;
+    return std::make_shared<Query::Expression>(Query::Expression{std::move(predicate), true, {}});
 }
 
 ExpressionPtr join(bool all, std::vector<ExpressionPtr> operands) {
     if (operands.size() == 1) return operands.front();
-    auto made = std::make_shared<Query::Expression>();
-    made->leaf = false;
-    made->all = all;
-    made->operands = std::move(operands);
-    return made;
+    return std::make_shared<Query::Expression>(Query::Expression{{}, all, std::move(operands)});
 }
 
 ExpressionPtr negated(const ExpressionPtr& expression) {
-    if (expression->leaf) {
+    if (expression->isLeaf()) {
         Predicate predicate = expression->predicate;
         predicate.op = rowOf(predicate.op).negated;
         return leaf(std::move(predicate));
@@ -207,22 +207,13 @@ private:
                                      m_token[0] == '-' || m_token[0] == '+'));
     }
     Value literal() {
-        Value value;
-        if (m_quoted) {
-            value = Value(m_token);
-        } else if (strcasecmp(m_token.c_str(), "true") == 0 ||
-                   strcasecmp(m_token.c_str(), "false") == 0) {
-            value = parseValue(m_token, CMPI_boolean);
-        } else if (isLiteral()) {
-            const bool real = m_token.find_first_of(".eE") != std::string::npos;
-            try {
-                value = parseValue(m_token, real ? CMPI_real64 : CMPI_sint64);
-            } catch (const Failure&) {
-                fail("'" + m_token + "' is no number");
-            }
-        } else {
-            fail("a literal is missing");
-        }
+        if (accept("true")) return true;
+        if (accept("false")) return false;
+        if (!isLiteral()) fail("a literal is missing");
+        Value value(m_token);
+        const bool real = m_token.find_first_of(".eE") != std::string::npos;
+        if (!m_quoted && !parseNumber(m_token, real ? CMPI_real64 : CMPI_sint64, value))
+            fail("'" + m_token + "' is no number");
         advance();
         return value;
     }
@@ -234,9 +225,7 @@ private:
 };
 
 std::shared_ptr<const Query> Query::parse(const std::string& text, const std::string& language) {
-    constexpr std::array<const char*, 4> kLanguages = {"WQL", "CQL", "CIM:CQL", "DMTF:CQL"};
-    if (std::none_of(kLanguages.begin(), kLanguages.end(),
-                     [&](const char* known) { return sameName(language, known); }))
+    if (!containsName({"WQL", "CQL", "CIM:CQL", "DMTF:CQL"}, language))
         throw Failure(CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED, "query language " + language);
     auto query = std::make_shared<Query>();
     QueryParser(text).parseInto(*query);
@@ -267,32 +256,28 @@ bool like(const char* text, const char* pattern) {
     return *pattern == '\0';
 }
 
-// -1, 0, 1; false when the two cannot be compared.
-bool compare(const Value& value, const Value& literal, int& order) {
-    const auto sign = [&order](auto a, auto b) {
-        order = a < b ? -1 : b < a ? 1 : 0;
-        return true;
+// How a value stands to a literal; 0 when the two cannot be compared.
+unsigned compare(const Value& value, const Value& literal) {
+    const auto order = [](const auto& a, const auto& b) -> unsigned {
+        return a < b ? kBelow : b < a ? kAbove : kEqual;
     };
-    Value other;
-    if (value.type() == CMPI_string && literal.type() == CMPI_string) {
-        order = strcasecmp(value.text().c_str(), literal.text().c_str());
-        return true;
-    }
+    if (value.type() == CMPI_string && literal.type() == CMPI_string)
+        return order(strcasecmp(value.text().c_str(), literal.text().c_str()), 0);
+    Value mine, other;
     if (value.type() == CMPI_dateTime && literal.convertTo(CMPI_dateTime, other))
-        return sign(value.dateTime().binary(), other.dateTime().binary());
+        return order(value.dateTime().binary(), other.dateTime().binary());
     if (value.type() == CMPI_boolean && literal.type() == CMPI_boolean)
-        return sign(value.boolean(), literal.boolean());
-    Value mine;
+        return order(value.boolean(), literal.boolean());
     if (value.convertTo(CMPI_sint64, mine) && literal.convertTo(CMPI_sint64, other))
-        return sign(mine.sint(), other.sint());
+        return order(mine.sint(), other.sint());
     if (value.convertTo(CMPI_real64, mine) && literal.convertTo(CMPI_real64, other))
-        return sign(mine.real(), other.real());
-    return false;
+        return order(mine.real(), other.real());
+    return 0;
 }
 
 bool evaluate(const Query::Expression& expression, const Query::Accessor& property,
               const Query::IsA& isA) {
-    if (expression.leaf)
+    if (expression.isLeaf())
         return holds(expression.predicate, property(expression.predicate.name), isA);
     const auto test = [&](const ExpressionPtr& operand) {
         return evaluate(*operand, property, isA);
@@ -304,7 +289,7 @@ bool evaluate(const Query::Expression& expression, const Query::Accessor& proper
 
 // Parts of the normal form; @p outer tells which joint is the outer one.
 std::vector<SubCondition> normalize(const Query::Expression& expression, bool outerIsAnd) {
-    if (expression.leaf) return {SubCondition{{expression.predicate}}};
+    if (expression.isLeaf()) return {SubCondition{{expression.predicate}}};
     std::vector<SubCondition> parts;
     if (expression.all != outerIsAnd) parts.emplace_back();
     for (const ExpressionPtr& operand : expression.operands) {
@@ -345,22 +330,7 @@ bool holds(const Predicate& predicate, const Value& value, const Query::IsA& isA
         const bool yes = isaOp ? isA(left, right) : like(left.c_str(), right.c_str());
         return yes == (predicate.op == CMPI_PredOp_Isa || predicate.op == CMPI_PredOp_Like);
     }
-    int order = 0;
-    if (!compare(value, predicate.literal, order)) return false;
-    switch (predicate.op) {
-        case CMPI_PredOp_Equals:
-            return order == 0;
-        case CMPI_PredOp_NotEquals:
-            return order != 0;
-        case CMPI_PredOp_LessThan:
-            return order < 0;
-        case CMPI_PredOp_LessThanOrEquals:
-            return order <= 0;
-        case CMPI_PredOp_GreaterThan:
-            return order > 0;
-        default:
-            return order >= 0;
-    }
+    return (compare(value, predicate.literal) & rowOf(predicate.op).orders) != 0;
 }
 
 bool Query::matches(const Accessor& property, const IsA& isA) const {

@@ -27,98 +27,58 @@ Query::Accessor through(CMPIAccessor* accessor, void* parm) {
     };
 }
 
-CMPIBoolean evaluate(const CMPISelectExp* expression, const CMPIInstance* instance,
-                     CMPIStatus* rc) {
-    return objectEntry(expression, rc, [=](QueryPtr& query, Broker& broker) -> CMPIBoolean {
-        return instanceMatches(broker, *query, bodyOf(instance).value) ? 1 : 0;
-    });
+CMPIBoolean evaluate(QueryPtr& query, Broker& broker, const CMPIInstance* instance) {
+    return instanceMatches(broker, *query, bodyOf(instance).value);
 }
-CMPIBoolean evaluateThrough(const CMPISelectExp* expression, CMPIAccessor* accessor, void* parm,
-                            CMPIStatus* rc) {
-    return objectEntry(expression, rc, [=](QueryPtr& query, Broker& broker) -> CMPIBoolean {
-        return query->matches(through(accessor, parm), isAIn(broker)) ? 1 : 0;
-    });
+CMPIBoolean evaluateThrough(QueryPtr& query, Broker& broker, CMPIAccessor* accessor, void* parm) {
+    return query->matches(through(accessor, parm), isAIn(broker));
 }
-CMPIString* queryText(const CMPISelectExp* expression, CMPIStatus* rc) {
-    return objectEntry(expression, rc, [](QueryPtr& query, Broker& broker) {
-        return makeString(broker, query->text());
-    });
-}
+CMPIString* queryText(QueryPtr& query, Broker& broker) { return makeString(broker, query->text()); }
 template <CMPISelectCondType Type>
-CMPISelectCond* normalForm(const CMPISelectExp* expression, CMPIStatus* rc) {
-    return objectEntry(expression, rc, [](QueryPtr& query, Broker& broker) {
-        return make<CMPISelectCond>(broker,
-                                    std::make_shared<const Condition>(query->normalForm(Type)));
-    });
+CMPISelectCond* normalForm(QueryPtr& query, Broker& broker) {
+    return make<CMPISelectCond>(broker, std::make_shared<const Condition>(query->normalForm(Type)));
 }
 
-CMPICount conditionCount(const CMPISelectCond* condition, int* type, CMPIStatus* rc) {
-    return objectEntry(condition, rc, [type](ConditionPtr& body, Broker&) {
-        if (type) *type = body->type;
-        return static_cast<CMPICount>(body->parts.size());
-    });
+CMPICount conditionCount(ConditionPtr& body, Broker&, int* type) {
+    if (type) *type = body->type;
+    return static_cast<CMPICount>(body->parts.size());
 }
-
-[[noreturn]] void outOfRange(CMPICount index) {
-    throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "index " + std::to_string(index));
+CMPISubCond* subConditionAt(ConditionPtr& body, Broker& broker, CMPICount index) {
+    return make<CMPISubCond>(broker, SubConditionPtr(body, &elementAt(body->parts, index)));
 }
-CMPISubCond* subConditionAt(const CMPISelectCond* condition, CMPICount index, CMPIStatus* rc) {
-    return objectEntry(condition, rc, [index](ConditionPtr& body, Broker& broker) {
-        if (index >= body->parts.size()) outOfRange(index);
-        return make<CMPISubCond>(broker, SubConditionPtr(body, &body->parts[index]));
-    });
+CMPICount predicateCount(SubConditionPtr& body, Broker&) {
+    return static_cast<CMPICount>(body->predicates.size());
 }
-CMPICount predicateCount(const CMPISubCond* condition, CMPIStatus* rc) {
-    return objectEntry(condition, rc, [](SubConditionPtr& body, Broker&) {
-        return static_cast<CMPICount>(body->predicates.size());
-    });
+CMPIPredicate* predicateAt(SubConditionPtr& body, Broker& broker, CMPICount index) {
+    return make<CMPIPredicate>(broker, PredicatePtr(body, &elementAt(body->predicates, index)));
 }
-CMPIPredicate* predicateAt(const CMPISubCond* condition, CMPICount index, CMPIStatus* rc) {
-    return objectEntry(condition, rc, [index](SubConditionPtr& body, Broker& broker) {
-        if (index >= body->predicates.size()) outOfRange(index);
-        return make<CMPIPredicate>(broker, PredicatePtr(body, &body->predicates[index]));
-    });
-}
-CMPIPredicate* predicateOf(const CMPISubCond* condition, const char* name, CMPIStatus* rc) {
-    return objectEntry(condition, rc, [name](SubConditionPtr& body, Broker& broker) {
-        for (const Predicate& predicate : body->predicates)
-            if (sameName(predicate.name, textOf(name)))
-                return make<CMPIPredicate>(broker, PredicatePtr(body, &predicate));
-        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, textOf(name));
-    });
+CMPIPredicate* predicateOf(SubConditionPtr& body, Broker& broker, const char* name) {
+    for (const Predicate& predicate : body->predicates)
+        if (sameName(predicate.name, textOf(name)))
+            return make<CMPIPredicate>(broker, PredicatePtr(body, &predicate));
+    throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, textOf(name));
 }
 
 // The kind of literal, which the property is compared with.
 CMPIType literalType(const Predicate& predicate) {
-    switch (predicate.literal.type()) {
-        case CMPI_string:
-            return CMPI_charString;
-        case CMPI_sint64:
-            return CMPI_integerString;
-        case CMPI_real64:
-            return CMPI_realString;
-        case CMPI_boolean:
-            return CMPI_booleanString;
-        default:
-            return CMPI_null;
-    }
+    constexpr std::pair<CMPIType, CMPIType> kKinds[] = {{CMPI_string, CMPI_charString},
+                                                        {CMPI_sint64, CMPI_integerString},
+                                                        {CMPI_real64, CMPI_realString},
+                                                        {CMPI_boolean, CMPI_booleanString}};
+    for (const auto& [type, kind] : kKinds)
+        if (type == predicate.literal.type()) return kind;
+    return CMPI_null;
 }
-CMPIStatus predicateData(const CMPIPredicate* predicate, CMPIType* type, CMPIPredOp* op,
-                         CMPIString** left, CMPIString** right) {
-    return objectStatus(predicate, [=](PredicatePtr& body, Broker& broker) {
-        if (type) *type = literalType(*body);
-        if (op) *op = body->op;
-        if (left) *left = makeString(broker, body->name);
-        if (right)
-            *right =
-                body->literal.isNull() ? nullptr : makeString(broker, plainText(body->literal));
-    });
+void predicateData(PredicatePtr& body, Broker& broker, CMPIType* type, CMPIPredOp* op,
+                   CMPIString** left, CMPIString** right) {
+    const Value& literal = body->literal;
+    if (type) *type = literalType(*body);
+    if (op) *op = body->op;
+    if (left) *left = makeString(broker, body->name);
+    if (right) *right = literal.isNull() ? nullptr : makeString(broker, plainText(literal));
 }
-CMPIBoolean predicateHolds(const CMPIPredicate* predicate, CMPIAccessor* accessor, void* parm,
-                           CMPIStatus* rc) {
-    return objectEntry(predicate, rc, [=](PredicatePtr& body, Broker& broker) -> CMPIBoolean {
-        return holds(*body, through(accessor, parm)(body->name), isAIn(broker)) ? 1 : 0;
-    });
+CMPIBoolean predicateHolds(PredicatePtr& body, Broker& broker, CMPIAccessor* accessor, void* parm) {
+    return holds(*body, through(accessor, parm)(body->name), isAIn(broker));
 }
 
 // The value of a name such as SourceInstance.Name; the class of the query may stand before it.
@@ -147,20 +107,15 @@ bool instanceMatches(Broker& broker, const Query& query, const Instance& instanc
 }
 
 void fillQueryTables(ObjectTables& tables) {
-    std::get<CMPISelectExpFT>(tables) = {
-        0,         releaseObject<CMPISelectExp>, cloneObject<CMPISelectExp>, evaluate,
-        queryText, normalForm<CMPI_COND_DOC>,    normalForm<CMPI_COND_COD>,  evaluateThrough};
-    std::get<CMPISelectCondFT>(tables) = {0, releaseObject<CMPISelectCond>,
-                                          cloneObject<CMPISelectCond>, conditionCount,
-                                          subConditionAt};
-    std::get<CMPISubCondFT>(tables) = {0,
-                                       releaseObject<CMPISubCond>,
-                                       cloneObject<CMPISubCond>,
-                                       predicateCount,
-                                       predicateAt,
-                                       predicateOf};
-    std::get<CMPIPredicateFT>(tables) = {0, releaseObject<CMPIPredicate>,
-                                         cloneObject<CMPIPredicate>, predicateData, predicateHolds};
+    std::get<CMPISelectExpFT>(tables) = tableOf<CMPISelectExp>(
+        entryOf<evaluate>, entryOf<queryText>, entryOf<normalForm<CMPI_COND_DOC>>,
+        entryOf<normalForm<CMPI_COND_COD>>, entryOf<evaluateThrough>);
+    std::get<CMPISelectCondFT>(tables) =
+        tableOf<CMPISelectCond>(entryOf<conditionCount>, entryOf<subConditionAt>);
+    std::get<CMPISubCondFT>(tables) =
+        tableOf<CMPISubCond>(entryOf<predicateCount>, entryOf<predicateAt>, entryOf<predicateOf>);
+    std::get<CMPIPredicateFT>(tables) =
+        tableOf<CMPIPredicate>(entryOf<predicateData>, entryOf<predicateHolds>);
 }
 
 }  // namespace cimom

@@ -30,11 +30,6 @@ CMPIInstance* wrapInstance(Broker& broker, const Instance& instance) {
     return make<CMPIInstance>(broker, instanceBody(broker, instance));
 }
 
-std::string folderOf(const std::string& file) {
-    const std::size_t slash = file.rfind('/');
-    return slash == std::string::npos ? "." : file.substr(0, slash);
-}
-
 }  // namespace
 
 Server::Server(const Options& options) : m_impl(std::make_unique<Impl>(*this, options)) {}
@@ -47,16 +42,6 @@ Server::~Server() {
 }
 
 // -- providers --------------------------------------------------------------------------------
-
-void Server::loadRegistration(const std::string& file) {
-    for (const Registration& row : readRegistration(file)) m_impl->add(row, folderOf(file));
-}
-
-void Server::registerProvider(const std::string& name, const std::vector<std::string>& classes,
-                              const Factories& factories,
-                              const std::vector<std::string>& nameSpaces) {
-    m_impl->add(name, classes, factories, nameSpaces);
-}
 
 std::vector<std::string> Server::unloadProviders(bool terminating) {
     std::vector<std::string> stayed;
@@ -75,8 +60,7 @@ namespace {
 template <class Body>
 Reply enumerate(Server::Impl& impl, const Request& request, const ObjectPath& classPath,
                 Body body) {
-    return answer([&] {
-        const ObjectPath path = impl.complete(request, classPath);
+    return answerAt(impl, request, classPath, [&](const ObjectPath& path) {
         Reply reply = impl.callAll<CMPIInstanceMI>(request, impl.targetsBelow(path, kInstance),
                                                    path, true, body);
         Server::Impl::finish(request, path, reply);
@@ -88,15 +72,13 @@ Reply enumerate(Server::Impl& impl, const Request& request, const ObjectPath& cl
 
 Reply Server::enumInstances(const Request& request, const ObjectPath& classPath) {
     NameList names(request.properties);
-    return enumerate(*m_impl, request, classPath, [&](CMPIInstanceMI* mi, const Call& call) {
-        return mi->ft->enumerateInstances(mi, call.context, call.result, call.path, names.get());
-    });
+    return enumerate(*m_impl, request, classPath,
+                     calling(&CMPIInstanceMIFT::enumerateInstances, names.get()));
 }
 
 Reply Server::enumInstanceNames(const Request& request, const ObjectPath& classPath) {
-    return enumerate(*m_impl, request, classPath, [](CMPIInstanceMI* mi, const Call& call) {
-        return mi->ft->enumerateInstanceNames(mi, call.context, call.result, call.path);
-    });
+    return enumerate(*m_impl, request, classPath,
+                     calling(&CMPIInstanceMIFT::enumerateInstanceNames));
 }
 
 // Providers that do not answer queries are enumerated and sifted here.
@@ -107,10 +89,9 @@ Reply Server::execQuery(const Request& request, const std::string& query,
         const ObjectPath path(request.nameSpace, parsed->className());
         Request all = request;
         all.properties.reset();
-        Reply reply = enumerate(*m_impl, all, path, [&](CMPIInstanceMI* mi, const Call& call) {
-            return mi->ft->execQuery(mi, call.context, call.result, call.path, query.c_str(),
-                                     language.c_str());
-        });
+        Reply reply =
+            enumerate(*m_impl, all, path,
+                      calling(&CMPIInstanceMIFT::execQuery, query.c_str(), language.c_str()));
         if (reply.rc == CMPI_RC_ERR_NOT_SUPPORTED) {
             reply = enumInstances(all, path);
             auto& found = reply.instances;
@@ -126,16 +107,13 @@ Reply Server::execQuery(const Request& request, const std::string& query,
 }
 
 Reply Server::getInstance(const Request& request, const ObjectPath& path) {
-    return answer([&] {
-        const ObjectPath full = m_impl->complete(request, path);
+    return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
         NameList names(request.properties);
         Reply reply = m_impl->callFor<CMPIInstanceMI>(
-            request, full, [&](CMPIInstanceMI* mi, const Call& call) {
-                return mi->ft->getInstance(mi, call.context, call.result, call.path, names.get());
-            });
+            request, full, calling(&CMPIInstanceMIFT::getInstance, names.get()));
         if (reply.ok() && reply.instances.empty()) {
-            reply.rc = CMPI_RC_ERR_NOT_FOUND;
-            reply.message = "the provider returned no instance of " + printPath(full);
+            reply.fail(CMPI_RC_ERR_NOT_FOUND,
+                       "the provider returned no instance of " + printPath(full));
         }
         Impl::finish(request, full, reply);
         return reply;
@@ -143,39 +121,35 @@ Reply Server::getInstance(const Request& request, const ObjectPath& path) {
 }
 
 Reply Server::createInstance(const Request& request, const Instance& instance) {
-    return answer([&] {
-        Instance full = instance;
-        full.path = m_impl->complete(request, instance.path);
+    return answerAt(*m_impl, request, instance.path, [&](const ObjectPath& path) {
         Reply reply = m_impl->callFor<CMPIInstanceMI>(
-            request, full.path, [&](CMPIInstanceMI* mi, const Call& call) {
-                return mi->ft->createInstance(mi, call.context, call.result, call.path,
-                                              wrapInstance(m_impl->broker, full));
+            request, path, [&](CMPIInstanceMI* mi, const Call& call) {
+                return calling(&CMPIInstanceMIFT::createInstance,
+                               wrapInstance(m_impl->broker, Instance(path, instance.properties)))(
+                    mi, call);
             });
-        if (reply.ok() && reply.paths.empty()) reply.paths.push_back(full.path);
-        Impl::finish(request, full.path, reply);
+        if (reply.ok() && reply.paths.empty()) reply.paths.push_back(path);
+        Impl::finish(request, path, reply);
         return reply;
     });
 }
 
 Reply Server::modifyInstance(const Request& request, const Instance& instance) {
-    return answer([&] {
-        Instance full = instance;
-        full.path = m_impl->complete(request, instance.path);
+    return answerAt(*m_impl, request, instance.path, [&](const ObjectPath& path) {
         NameList names(request.properties);
         return m_impl->callFor<CMPIInstanceMI>(
-            request, full.path, [&](CMPIInstanceMI* mi, const Call& call) {
-                return mi->ft->modifyInstance(mi, call.context, call.result, call.path,
-                                              wrapInstance(m_impl->broker, full), names.get());
+            request, path, [&](CMPIInstanceMI* mi, const Call& call) {
+                return calling(&CMPIInstanceMIFT::modifyInstance,
+                               wrapInstance(m_impl->broker, Instance(path, instance.properties)),
+                               names.get())(mi, call);
             });
     });
 }
 
 Reply Server::deleteInstance(const Request& request, const ObjectPath& path) {
-    return answer([&] {
-        return m_impl->callFor<CMPIInstanceMI>(
-            request, m_impl->complete(request, path), [](CMPIInstanceMI* mi, const Call& call) {
-                return mi->ft->deleteInstance(mi, call.context, call.result, call.path);
-            });
+    return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
+        return m_impl->callFor<CMPIInstanceMI>(request, full,
+                                               calling(&CMPIInstanceMIFT::deleteInstance));
     });
 }
 
@@ -184,17 +158,19 @@ Reply Server::deleteInstance(const Request& request, const ObjectPath& path) {
 namespace {
 
 /// The four operations differ in the class to go by and in what they call, and nothing else.
-template <class Body>
+template <class Entry, class... A>
 Reply navigate(Server::Impl& impl, const Request& request, const ObjectPath& path,
-               const std::string& association, Body body) {
-    return answer([&] {
-        const ObjectPath full = impl.complete(request, path);
+               const std::string& association, Entry entry, A... more) {
+    return answerAt(impl, request, path, [&](const ObjectPath& full) {
         const std::vector<Target> targets =
             association.empty()
                 ? impl.associationTargets(full)
                 : impl.targetsBelow(impl.complete(request, {full.nameSpace, association}),
                                     kAssociation);
-        Reply reply = impl.callAll<CMPIAssociationMI>(request, targets, full, false, body);
+        Reply reply = impl.callAll<CMPIAssociationMI>(
+            request, targets, full, false, [&](CMPIAssociationMI* mi, const Call& call) {
+                return calling(entry, call.className, more...)(mi, call);
+            });
         Server::Impl::finish(request, full, reply);
         return reply;
     });
@@ -205,41 +181,29 @@ Reply navigate(Server::Impl& impl, const Request& request, const ObjectPath& pat
 Reply Server::associators(const Request& request, const ObjectPath& path,
                           const AssociationFilter& filter) {
     NameList names(request.properties);
-    return navigate(
-        *m_impl, request, path, filter.assocClass, [&](CMPIAssociationMI* mi, const Call& call) {
-            return mi->ft->associators(mi, call.context, call.result, call.path, call.className,
-                                       orNull(filter.resultClass), orNull(filter.role),
-                                       orNull(filter.resultRole), names.get());
-        });
+    return navigate(*m_impl, request, path, filter.assocClass, &CMPIAssociationMIFT::associators,
+                    orNull(filter.resultClass), orNull(filter.role), orNull(filter.resultRole),
+                    names.get());
 }
 
 Reply Server::associatorNames(const Request& request, const ObjectPath& path,
                               const AssociationFilter& filter) {
-    return navigate(
-        *m_impl, request, path, filter.assocClass, [&](CMPIAssociationMI* mi, const Call& call) {
-            return mi->ft->associatorNames(mi, call.context, call.result, call.path, call.className,
-                                           orNull(filter.resultClass), orNull(filter.role),
-                                           orNull(filter.resultRole));
-        });
+    return navigate(*m_impl, request, path, filter.assocClass,
+                    &CMPIAssociationMIFT::associatorNames, orNull(filter.resultClass),
+                    orNull(filter.role), orNull(filter.resultRole));
 }
 
 Reply Server::references(const Request& request, const ObjectPath& path,
                          const AssociationFilter& filter) {
     NameList names(request.properties);
-    return navigate(*m_impl, request, path, filter.resultClass,
-                    [&](CMPIAssociationMI* mi, const Call& call) {
-                        return mi->ft->references(mi, call.context, call.result, call.path,
-                                                  call.className, orNull(filter.role), names.get());
-                    });
+    return navigate(*m_impl, request, path, filter.resultClass, &CMPIAssociationMIFT::references,
+                    orNull(filter.role), names.get());
 }
 
 Reply Server::referenceNames(const Request& request, const ObjectPath& path,
                              const AssociationFilter& filter) {
     return navigate(*m_impl, request, path, filter.resultClass,
-                    [&](CMPIAssociationMI* mi, const Call& call) {
-                        return mi->ft->referenceNames(mi, call.context, call.result, call.path,
-                                                      call.className, orNull(filter.role));
-                    });
+                    &CMPIAssociationMIFT::referenceNames, orNull(filter.role));
 }
 
 // -- methods and properties -------------------------------------------------------------------
@@ -275,8 +239,7 @@ NamedValues typedArguments(const Broker& broker, const ObjectPath& path, const s
 
 Reply Server::invokeMethod(const Request& request, const ObjectPath& path,
                            const std::string& method, const NamedValues& in) {
-    return answer([&] {
-        const ObjectPath full = m_impl->complete(request, path);
+    return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
         Broker& broker = m_impl->broker;
         const NamedValues typed = typedArguments(broker, full, method, in);
         return withValues(
@@ -292,14 +255,10 @@ Reply Server::invokeMethod(const Request& request, const ObjectPath& path,
 }
 
 Reply Server::getProperty(const Request& request, const ObjectPath& path, const std::string& name) {
-    return answer([&] {
-        const ObjectPath full = m_impl->complete(request, path);
-        if (m_impl->serves(full, kProperty))
+    return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
+        if (m_impl->providerOf(full, kProperty))
             return withValues(m_impl->callFor<CMPIPropertyMI>(
-                request, full, [&](CMPIPropertyMI* mi, const Call& call) {
-                    return mi->ft->getProperty(mi, call.context, call.result, call.path,
-                                               name.c_str());
-                }));
+                request, full, calling(&CMPIPropertyMIFT::getProperty, name.c_str())));
         Request one = request;
         one.properties = {name};
         Reply reply = getInstance(one, full);
@@ -314,13 +273,12 @@ Reply Server::getProperty(const Request& request, const ObjectPath& path, const 
 
 Reply Server::setProperty(const Request& request, const ObjectPath& path, const std::string& name,
                           const Value& value) {
-    return answer([&] {
-        const ObjectPath full = m_impl->complete(request, path);
-        if (m_impl->serves(full, kProperty))
+    return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
+        if (m_impl->providerOf(full, kProperty))
             return m_impl->callFor<CMPIPropertyMI>(
                 request, full, [&](CMPIPropertyMI* mi, const Call& call) {
-                    return mi->ft->setProperty(mi, call.context, call.result, call.path,
-                                               name.c_str(), makeData(m_impl->broker, value));
+                    return calling(&CMPIPropertyMIFT::setProperty, name.c_str(),
+                                   makeData(m_impl->broker, value))(mi, call);
                 });
         Request one = request;
         one.properties = {name};

@@ -89,6 +89,10 @@ struct Reply {
     bool done = false;
 
     bool ok() const { return rc == CMPI_RC_OK; }
+    void fail(CMPIrc code, std::string text) {
+        rc = code;
+        message = std::move(text);
+    }
     /// The first value, or a null.
     Value value() const { return values.empty() ? Value() : values.front(); }
 };
@@ -111,12 +115,14 @@ enum Interface : unsigned {
 };
 
 /// Factories of a provider linked into the process; null for interfaces that it does not have.
+template <class MI>
+using Factory = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
 struct Factories {
-    CMPIInstanceMI* (*instance)(const CMPIBroker*, const CMPIContext*, CMPIStatus*) = nullptr;
-    CMPIAssociationMI* (*association)(const CMPIBroker*, const CMPIContext*, CMPIStatus*) = nullptr;
-    CMPIMethodMI* (*method)(const CMPIBroker*, const CMPIContext*, CMPIStatus*) = nullptr;
-    CMPIIndicationMI* (*indication)(const CMPIBroker*, const CMPIContext*, CMPIStatus*) = nullptr;
-    CMPIPropertyMI* (*property)(const CMPIBroker*, const CMPIContext*, CMPIStatus*) = nullptr;
+    Factory<CMPIInstanceMI> instance = nullptr;
+    Factory<CMPIAssociationMI> association = nullptr;
+    Factory<CMPIMethodMI> method = nullptr;
+    Factory<CMPIIndicationMI> indication = nullptr;
+    Factory<CMPIPropertyMI> property = nullptr;
 };
 
 /// One line that a provider wrote through the broker's trace or logMessage.
@@ -147,7 +153,7 @@ public:
 
     // -- providers ------------------------------------------------------------------------
 
-    /// Reads a registration file (form: Registration.h) and adds its providers. Libraries are
+    /// Reads a registration file (form: Provider.h) and adds its providers. Libraries are
     /// loaded when first needed.
     /// @throws std::runtime_error with the file and the reason; nothing is added then
     void loadRegistration(const std::string& file);

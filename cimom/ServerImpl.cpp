@@ -3,6 +3,7 @@
 #include "ServerImpl.h"
 
 #include <algorithm>
+#include <set>
 
 #include "PathText.h"
 
@@ -11,41 +12,35 @@ namespace cimom {
 namespace {
 
 bool servesNameSpace(const std::vector<std::string>& nameSpaces, const std::string& wanted) {
-    return nameSpaces.empty() ||
-           std::any_of(nameSpaces.begin(), nameSpaces.end(),
-                       [&](const std::string& each) { return sameName(each, wanted); });
-}
-
-[[noreturn]] void unserved(const std::string& nameSpace, const std::string& className) {
-    throw Failure(CMPI_RC_ERR_NOT_SUPPORTED,
-                  "no provider serves class " + className + " in " + nameSpace + " for this");
+    return nameSpaces.empty() || containsName(nameSpaces, wanted);
 }
 
 }  // namespace
 
-void Server::Impl::add(const Registration& row, const std::string& folder) {
-    const auto known = std::find_if(providers.begin(), providers.end(), [&](const Provider& each) {
-        return each.name() == row.provider && each.file() == row.library;
-    });
-    Provider* provider = known == providers.end() ? nullptr : &*known;
-    if (!provider) {
-        std::vector<std::string> folders{folder};
-        const auto& more = broker.options().libraryFolders;
-        folders.insert(folders.end(), more.begin(), more.end());
-        provider = &providers.emplace_back(row.provider, row.library, folders);
+void Server::loadRegistration(const std::string& file) {
+    const std::size_t slash = file.rfind('/');
+    std::vector<std::string> folders{slash == std::string::npos ? "." : file.substr(0, slash)};
+    const auto& more = m_impl->broker.options().libraryFolders;
+    folders.insert(folders.end(), more.begin(), more.end());
+    std::list<Provider>& providers = m_impl->providers;
+    for (const Registration& row : readRegistration(file)) {
+        auto known = std::find_if(providers.begin(), providers.end(), [&](const Provider& each) {
+            return each.name() == row.provider && each.file() == row.library;
+        });
+        if (known == providers.end())
+            known = providers.emplace(known, row.provider, row.library, folders);
+        m_impl->routes[row.className].push_back({row.nameSpaces, row.interfaces, &*known});
     }
-    routes[row.className].push_back({row.nameSpaces, row.interfaces, provider});
 }
 
-void Server::Impl::add(const std::string& name, const std::vector<std::string>& classes,
-                       const Factories& factories, const std::vector<std::string>& nameSpaces) {
+void Server::registerProvider(const std::string& name, const std::vector<std::string>& classes,
+                              const Factories& factories,
+                              const std::vector<std::string>& nameSpaces) {
     const unsigned interfaces =
-        (factories.instance ? kInstance : 0U) | (factories.association ? kAssociation : 0U) |
-        (factories.method ? kMethod : 0U) | (factories.indication ? kIndication : 0U) |
-        (factories.property ? kProperty : 0U);
-    Provider& provider = providers.emplace_back(name, factories);
+        interfacesThat([&](const auto& kind) { return factories.*kind.factory != nullptr; });
+    Provider& provider = m_impl->providers.emplace_back(name, factories);
     for (const std::string& className : classes)
-        routes[className].push_back({nameSpaces, interfaces, &provider});
+        m_impl->routes[className].push_back({nameSpaces, interfaces, &provider});
 }
 
 ObjectPath Server::Impl::complete(const Request& request, const ObjectPath& path) const {
@@ -68,21 +63,17 @@ Provider* Server::Impl::routeOf(const std::string& className, const std::string&
     return nullptr;
 }
 
-bool Server::Impl::serves(const ObjectPath& path, Interface bit) const {
-    if (routeOf(path.className, path.nameSpace, bit)) return true;
-    const CimClass* cls = broker.classOf(path);
-    return cls && std::any_of(cls->lineage.begin(), cls->lineage.end(), [&](const CimClass* each) {
-               return routeOf(each->name, path.nameSpace, bit) != nullptr;
-           });
+Provider* Server::Impl::providerOf(const ObjectPath& path, Interface bit) const {
+    Provider* provider = routeOf(path.className, path.nameSpace, bit);
+    for (const CimClass* cls = broker.classOf(path); cls && !provider; cls = cls->superclass)
+        provider = routeOf(cls->name, path.nameSpace, bit);
+    return provider;
 }
 
 Target Server::Impl::targetOf(const ObjectPath& path, Interface bit) const {
-    if (Provider* provider = routeOf(path.className, path.nameSpace, bit))
-        return {provider, path.className};
-    for (const CimClass* cls = broker.classOf(path); cls; cls = cls->superclass)
-        if (Provider* provider = routeOf(cls->name, path.nameSpace, bit))
-            return {provider, path.className};
-    unserved(path.nameSpace, path.className);
+    if (Provider* provider = providerOf(path, bit)) return {provider, path.className};
+    throw Failure(CMPI_RC_ERR_NOT_SUPPORTED, "no provider serves class " + path.className + " in " +
+                                                 path.nameSpace + " for this");
 }
 
 std::vector<Target> Server::Impl::targetsBelow(const ObjectPath& classPath, Interface bit) const {
@@ -98,36 +89,25 @@ std::vector<Target> Server::Impl::targetsBelow(const ObjectPath& classPath, Inte
     return targets;
 }
 
-std::vector<Target> Server::Impl::associationTargets(const ObjectPath& path) const {
+std::vector<Target> Server::Impl::associationTargets(const ObjectPath& path) {
     const ClassRepository* classes = broker.classes();
     const auto mayHold = [&](const std::string& association) {
         const CimClass* cls = classes ? classes->findClass(association) : nullptr;
         if (!cls) return true;
         return std::any_of(cls->properties.begin(), cls->properties.end(), [&](const auto& end) {
-            return end->type == CimType::Reference &&
-                   (classes->isA(path.className, end->referenceClass) ||
-                    classes->isA(end->referenceClass, path.className));
+            return end->type == CMPI_ref && (classes->isA(path.className, end->referenceClass) ||
+                                             classes->isA(end->referenceClass, path.className));
         });
     };
-    std::vector<Target> targets;
+    std::set<const Provider*> asked;
     for (const auto& [className, rows] : routes)
-        for (const Route& row : rows) {
-            const bool known = std::any_of(
-                targets.begin(), targets.end(),
-                [&row = row](const Target& target) { return target.provider == row.provider; });
-            if (!known && (row.interfaces & kAssociation) &&
+        for (const Route& row : rows)
+            if ((row.interfaces & kAssociation) != 0 &&
                 servesNameSpace(row.nameSpaces, path.nameSpace) && mayHold(className))
-                targets.push_back({row.provider, ""});
-        }
-    // In the order of registration, not of the table.
-    const auto rank = [this](const Target& target) {
-        return std::find_if(providers.begin(), providers.end(),
-                            [&](const Provider& each) { return &each == target.provider; });
-    };
-    std::sort(targets.begin(), targets.end(), [&](const Target& a, const Target& b) {
-        return std::distance(providers.begin(), rank(a)) <
-               std::distance(providers.begin(), rank(b));
-    });
+                asked.insert(row.provider);
+    std::vector<Target> targets;  // in the order of registration
+    for (Provider& each : providers)
+        if (asked.count(&each) != 0) targets.push_back({&each, ""});
     return targets;
 }
 
@@ -139,9 +119,7 @@ void Server::Impl::finish(const Request& request, const ObjectPath& path, Reply&
         if (!request.properties) continue;
         NamedValues wanted;
         for (const auto& [name, value] : instance.properties)
-            if (std::any_of(request.properties->begin(), request.properties->end(),
-                            [&n = name](const std::string& each) { return sameName(each, n); }))
-                wanted.set(name, value);
+            if (containsName(*request.properties, name)) wanted.set(name, value);
         instance.properties = std::move(wanted);
     }
 }

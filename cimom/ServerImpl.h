@@ -46,24 +46,20 @@ class Server::Impl {
 public:
     Impl(Server& server, const Options& options) : broker(server, options) {}
 
-    void add(const Registration& row, const std::string& folder);
-    void add(const std::string& name, const std::vector<std::string>& classes,
-             const Factories& factories, const std::vector<std::string>& nameSpaces);
-
     /// The path in the request's namespace where it has none, its keys typed by the class.
     /// @throws Failure CMPI_RC_ERR_INVALID_CLASS, CMPI_RC_ERR_INVALID_PARAMETER
     ObjectPath complete(const Request& request, const ObjectPath& path) const;
 
-    /// The provider of a class, or of the nearest class above it that has one.
-    /// @throws Failure CMPI_RC_ERR_NOT_SUPPORTED when there is none
+    /// The provider of a class, or of the nearest class above it that has one; null for none.
+    Provider* providerOf(const ObjectPath& path, Interface bit) const;
+    /// The same. @throws Failure CMPI_RC_ERR_NOT_SUPPORTED when there is none
     Target targetOf(const ObjectPath& path, Interface bit) const;
-    bool serves(const ObjectPath& path, Interface bit) const;
     /// The providers of a class and of those below it.
     /// @throws Failure CMPI_RC_ERR_NOT_SUPPORTED when there is none
     std::vector<Target> targetsBelow(const ObjectPath& classPath, Interface bit) const;
     /// The providers of all associations in which the class of the path may stand, one by one
     /// and with an empty class name.
-    std::vector<Target> associationTargets(const ObjectPath& path) const;
+    std::vector<Target> associationTargets(const ObjectPath& path);
 
     /// Calls one provider in a request of its own; nothing that goes wrong is thrown.
     /// @param body  takes the interface and a Call, and returns the provider's status
@@ -72,7 +68,7 @@ public:
     /// Calls the provider of a path.
     template <class MI, class Body>
     Reply callFor(const Request& request, const ObjectPath& path, Body body) {
-        return call<MI>(request, targetOf(path, InterfaceTraits<MI>::kBit), path, body);
+        return call<MI>(request, targetOf(path, kindOfInterface<MI>().bit), path, body);
     }
     /// Calls all targets and puts their answers together.
     /// @param perClass  each target is called for its own class instead of the path
@@ -111,6 +107,14 @@ private:
                       Interface bit) const;
 };
 
+/// A body that calls an entry of an interface with what all entries take, and these behind it.
+template <class Entry, class... A>
+auto calling(Entry entry, A... more) {
+    return [=](auto* mi, const Call& call) {
+        return (mi->ft->*entry)(mi, call.context, call.result, call.path, more...);
+    };
+}
+
 /// Runs an operation of the facade: a Failure becomes its reply.
 template <class F>
 Reply answer(F operation) {
@@ -118,10 +122,16 @@ Reply answer(F operation) {
         return operation();
     } catch (const Failure& failure) {
         Reply reply;
-        reply.rc = failure.rc();
-        reply.message = failure.what();
+        reply.fail(failure.rc(), failure.what());
         return reply;
     }
+}
+
+/// The same for one on a path, which is completed first.
+template <class F>
+Reply answerAt(const Server::Impl& impl, const Request& request, const ObjectPath& path,
+               F operation) {
+    return answer([&] { return operation(impl.complete(request, path)); });
 }
 
 template <class MI, class Body>
@@ -139,16 +149,14 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
         reply->rc = status.rc;
         if (status.msg) reply->message = bodyOf(status.msg).text;
     } catch (const Failure& failure) {
-        reply->rc = failure.rc();
-        reply->message = failure.what();
+        reply->fail(failure.rc(), failure.what());
     } catch (const std::exception& e) {
-        reply->rc = CMPI_RC_ERR_FAILED;
-        reply->message = "provider " + target.provider->name() + " threw: " + e.what();
+        reply->fail(CMPI_RC_ERR_FAILED,
+                    "provider " + target.provider->name() + " threw: " + e.what());
     } catch (abi::__forced_unwind&) {
         throw;  // a cancelled thread must end
     } catch (...) {
-        reply->rc = CMPI_RC_ERR_FAILED;
-        reply->message = "provider " + target.provider->name() + " threw";
+        reply->fail(CMPI_RC_ERR_FAILED, "provider " + target.provider->name() + " threw");
     }
     return std::move(*reply);
 }
@@ -178,10 +186,7 @@ Reply Server::Impl::callAll(const Request& request, const std::vector<Target>& t
         all.done = all.done && one.done;
         // Of several providers, one that does not know the operation does not spoil it.
         const bool refuses = one.rc == CMPI_RC_ERR_NOT_SUPPORTED && ++refused < targets.size();
-        if (all.ok() && !one.ok() && !refuses) {
-            all.rc = one.rc;
-            all.message = one.message;
-        }
+        if (all.ok() && !one.ok() && !refuses) all.fail(one.rc, one.message);
     }
     return all;
 }

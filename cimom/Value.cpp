@@ -1,6 +1,5 @@
 #include "Value.h"
 
-#include <strings.h>
 #include <sys/time.h>
 
 #include <algorithm>
@@ -10,7 +9,6 @@
 #include <ctime>
 #include <limits>
 #include <new>
-#include <stdexcept>
 
 namespace cimom {
 
@@ -74,13 +72,30 @@ bool integerFits(CMPIType type, bool negative, std::uint64_t magnitude) {
     return negative ? magnitude <= limit : magnitude < limit;
 }
 
-bool isInteger(CMPIType type) { return (type & CMPI_UINT) != 0 && (type & ~0x00F0) == 0; }
-bool isReal(CMPIType type) { return type == CMPI_real32 || type == CMPI_real64; }
+// Whatever the locale says.
+char lower(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c; }
 
 }  // namespace
 
-bool sameName(const std::string& a, const std::string& b) {
-    return a.size() == b.size() && strcasecmp(a.c_str(), b.c_str()) == 0;
+bool isInteger(CMPIType type) { return (type & CMPI_UINT) != 0 && (type & ~0x00F0) == 0; }
+bool isReal(CMPIType type) { return type == CMPI_real32 || type == CMPI_real64; }
+
+// -- names ----------------------------------------------------------------------------------
+
+bool sameName(std::string_view a, std::string_view b) {
+    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                      [](char x, char y) { return x == y || lower(x) == lower(y); });
+}
+
+std::size_t NameHash::operator()(std::string_view name) const {
+    std::uint64_t hash = 14695981039346656037u;  // FNV-1a
+    for (char c : name) hash = (hash ^ static_cast<unsigned char>(lower(c))) * 1099511628211u;
+    return static_cast<std::size_t>(hash);
+}
+
+bool containsName(const std::vector<std::string>& names, const std::string& name) {
+    return std::any_of(names.begin(), names.end(),
+                       [&](const std::string& each) { return sameName(each, name); });
 }
 
 // -- DateTime -------------------------------------------------------------------------------
@@ -135,11 +150,11 @@ bool DateTime::isInterval() const { return m_text[kSignAt] == ':'; }
 
 std::uint64_t DateTime::binary() const {
     if (isInterval()) {
-        std::uint64_t value = fieldValue(m_text, kIntervalFields[0]);
-        value = value * 24 + fieldValue(m_text, kIntervalFields[1]);
-        value = value * 60 + fieldValue(m_text, kIntervalFields[2]);
-        value = value * 60 + fieldValue(m_text, kIntervalFields[3]);
-        return value * kMicrosPerSecond + fieldValue(m_text, kIntervalFields[4]);
+        constexpr std::uint64_t kOfTheOneBefore[] = {1, 24, 60, 60, kMicrosPerSecond};
+        std::uint64_t value = 0;
+        for (std::size_t i = 0; i < std::size(kIntervalFields); ++i)
+            value = value * kOfTheOneBefore[i] + fieldValue(m_text, kIntervalFields[i]);
+        return value;
     }
     const auto field = [this](std::size_t i) {
         return static_cast<int>(fieldValue(m_text, kTimestampFields[i]));
@@ -169,6 +184,12 @@ Value Value::null(CMPIType type) {
 Value Value::char16(std::uint16_t unit) {
     Value value(unit);
     value.m_type = CMPI_char16;
+    return value;
+}
+
+Value Value::real(CMPIType type, double number) {
+    Value value(number);
+    value.m_type = type;
     return value;
 }
 
@@ -217,9 +238,8 @@ bool Value::convertTo(CMPIType type, Value& result) const {
         return true;
     }
     if (isInteger(m_type) || m_type == CMPI_char16) {
-        const bool isSigned = (m_type & CMPI_SINT) == CMPI_SINT;
-        const bool negative = isSigned && sint() < 0;
-        const std::uint64_t raw = isSigned ? static_cast<std::uint64_t>(sint()) : uint();
+        const bool negative = isSigned() && sint() < 0;
+        const std::uint64_t raw = isSigned() ? static_cast<std::uint64_t>(sint()) : uint();
         if (isReal(type)) {
             result.m_data = negative ? static_cast<double>(sint()) : static_cast<double>(raw);
         } else if (isInteger(type) && integerFits(type, negative, negative ? ~raw + 1 : raw)) {
@@ -247,18 +267,16 @@ bool Value::convertTo(CMPIType type, Value& result) const {
 
 bool Value::operator==(const Value& other) const {
     if (m_type != other.m_type || m_data.index() != other.m_data.index()) return false;
-    if (std::holds_alternative<PathPtr>(m_data)) return reference() == other.reference();
-    if (std::holds_alternative<InstancePtr>(m_data)) return instance() == other.instance();
-    if (std::holds_alternative<CMPIValuePtr>(m_data))
-        return pointer().ptr == other.pointer().ptr && pointer().length == other.pointer().length;
     return std::visit(
         [&other](const auto& mine) {
             using T = std::decay_t<decltype(mine)>;
-            if constexpr (std::is_same_v<T, PathPtr> || std::is_same_v<T, InstancePtr> ||
-                          std::is_same_v<T, CMPIValuePtr>)
-                return false;
+            const T& theirs = std::get<T>(other.m_data);
+            if constexpr (std::is_same_v<T, PathPtr> || std::is_same_v<T, InstancePtr>)
+                return *mine == *theirs;
+            else if constexpr (std::is_same_v<T, CMPIValuePtr>)
+                return mine.ptr == theirs.ptr && mine.length == theirs.length;
             else
-                return mine == std::get<T>(other.m_data);
+                return mine == theirs;
         },
         m_data);
 }
@@ -320,11 +338,6 @@ std::size_t NamedValues::indexOf(const std::string& name) const {
         std::find_if(begin(), end(),
                      [&](const Entry& entry) { return sameName(entry.name, name); }) -
         begin());
-}
-
-const NamedValues::Entry& NamedValues::at(std::size_t index) const {
-    if (index >= size()) throw std::out_of_range("NamedValues::at");
-    return begin()[index];
 }
 
 bool NamedValues::operator==(const NamedValues& other) const {

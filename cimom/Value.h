@@ -12,6 +12,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <type_traits>
 #include <utility>
 #include <variant>
@@ -25,7 +26,19 @@ struct ObjectPath;
 struct Instance;
 
 /// True when both are equal but for the case of ASCII letters, as names are in CIM.
-bool sameName(const std::string& a, const std::string& b);
+bool sameName(std::string_view a, std::string_view b);
+bool containsName(const std::vector<std::string>& names, const std::string& name);
+
+/// For containers by name.
+struct NameEqual {
+    bool operator()(std::string_view a, std::string_view b) const { return sameName(a, b); }
+};
+struct NameHash {
+    std::size_t operator()(std::string_view name) const;
+};
+
+bool isInteger(CMPIType type);
+bool isReal(CMPIType type);
 
 /// A point in time or an interval, held in the 25-character text form of CIM:
 /// "yyyymmddhhmmss.mmmmmmsutc" or "ddddddddhhmmss.mmmmmm:000".
@@ -62,6 +75,8 @@ public:
     Value() = default;
     static Value null(CMPIType type);
     static Value char16(std::uint16_t unit);
+    /// A number as it stands, even one that a CMPI_real32 has to round.
+    static Value real(CMPIType type, double number);
     /// A raw memory area, as context entries may hold; the memory is not owned.
     static Value pointer(CMPIValuePtr area);
     /// @param elementType  without CMPI_ARRAY
@@ -88,6 +103,8 @@ public:
     CMPIType type() const { return m_type; }
     bool isNull() const { return m_data.index() == 0; }
     bool isArray() const { return (m_type & CMPI_ARRAY) != 0; }
+    /// Whether it is an integer with a sign.
+    bool isSigned() const { return (m_type & CMPI_SINT) == CMPI_SINT; }
     /// Gives a null its type; a value keeps its own.
     void retypeNull(CMPIType type);
 
@@ -164,7 +181,6 @@ public:
 
     std::size_t size() const { return m_block ? m_block->size : 0; }
     bool empty() const { return size() == 0; }
-    const Entry& at(std::size_t index) const;
     const Entry* begin() const { return m_block ? m_block->entries() : nullptr; }
     const Entry* end() const { return begin() + size(); }
 

@@ -1,4 +1,4 @@
-# The class repository and its MOF parser: static library cimom_mof.
+# Values, the class repository and its MOF parser: static library cimom_mof.
 
 find_package(BISON 3.8 REQUIRED)
 find_package(FLEX 2.6 REQUIRED)
@@ -16,10 +16,14 @@ set_source_files_properties(${BISON_MofGrammar_OUTPUT_SOURCE} ${FLEX_MofLexer_OU
 add_library(cimom_mof STATIC
   ${CMAKE_CURRENT_LIST_DIR}/ClassLinker.cpp
   ${CMAKE_CURRENT_LIST_DIR}/ClassRepository.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/Literal.cpp
   ${CMAKE_CURRENT_LIST_DIR}/MofParser.cpp
   ${CMAKE_CURRENT_LIST_DIR}/MofValue.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/PathText.cpp
+  ${CMAKE_CURRENT_LIST_DIR}/Value.cpp
   ${BISON_MofGrammar_OUTPUTS}
   ${FLEX_MofLexer_OUTPUTS})
 target_include_directories(cimom_mof PUBLIC ${CMAKE_CURRENT_LIST_DIR})
+target_link_libraries(cimom_mof PUBLIC cmpi::headers)
 target_include_directories(cimom_mof SYSTEM PRIVATE ${mof_generated})
 zem_target(cimom_mof)

@@ -4,7 +4,6 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
-#include <filesystem>
 #include <fstream>
 #include <nlohmann/json.hpp>
 #include <sstream>
@@ -12,8 +11,6 @@
 #include "Fixture.h"
 
 namespace {
-
-namespace fs = std::filesystem;
 
 class CommandLine : public testing::Test {
 protected:
@@ -24,9 +21,7 @@ protected:
     };
 
     CommandLine() {
-        std::string name = (fs::temp_directory_path() / "commandXXXXXX").string();
-        m_folder = mkdtemp(name.data());
-        std::ofstream(m_folder / "fixture.mof") << fixture::kMof;
+        m_folder.write("fixture.mof", fixture::kMof);
         const nlohmann::json row = {
             {"provider", "Fixture"},
             {"interfaces", {"instance", "association", "method", "indication", "property"}}};
@@ -34,9 +29,8 @@ protected:
             {"namespace", "root/cimv2"},
             {"library", FIXTURE_LIBRARY},
             {"classes", {{"Fix_Thing", row}, {"Fix_Link", row}, {"Fix_Event", row}}}};
-        std::ofstream(m_folder / "fixture.json") << json.dump();
+        m_folder.write("fixture.json", json.dump());
     }
-    ~CommandLine() override { fs::remove_all(m_folder); }
 
     pid_t start(std::vector<std::string> arguments) {
         arguments.insert(arguments.begin(), CIMOM_PROGRAM);
@@ -45,7 +39,7 @@ protected:
         argv.push_back(nullptr);
         const pid_t child = fork();
         if (child == 0) {
-            if (chdir(m_folder.c_str()) != 0 || !freopen("out", "w", stdout) ||
+            if (chdir((m_folder / "").c_str()) != 0 || !freopen("out", "w", stdout) ||
                 !freopen("err", "w", stderr))
                 _exit(99);
             setenv("CIMOM_REGISTRATION", "fixture.json", 1);
@@ -71,7 +65,7 @@ protected:
         return text.str();
     }
 
-    fs::path m_folder;
+    const fixture::Folder m_folder;
 };
 
 TEST_F(CommandLine, PathsThatArePrintedCanBeGivenBack) {

@@ -108,10 +108,10 @@ const zemString* zemAssociationData::matchRole(const char* role) const {
 
 const zemString* zemAssociationData::matchClass(const CmpiObjectPath& cop,
                                                 const char* className) const {
-    const CmpiString nameSpace = cop.getNameSpace();
+    const zemString nameSpace = zemTextOf(cop.getNameSpace());
     for (const zemString* side : {&m_refClassName1, &m_refClassName2}) {
         if (zemBaseProvider::compareClassNames(className, *side) ||
-            zemClassIsA(nameSpace.charPtr(), *side, className))
+            zemClassIsA(nameSpace, *side, className))
             return side;
     }
     return nullptr;

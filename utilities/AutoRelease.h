@@ -12,6 +12,7 @@
 template <class T, class Deleter>
 class ZEM_EXPORT zemAutoRelease {
 public:
+    /// Owns @p pointer from here on.
     explicit zemAutoRelease(T* pointer = nullptr) : _Ptr(pointer) {}
     ~zemAutoRelease() { reset(nullptr); }
     zemAutoRelease(const zemAutoRelease&) = delete;
@@ -33,6 +34,7 @@ public:
         return pointer;
     }
 
+    /// The pointer, still owned here; null when none is held.
     T* get() const { return _Ptr; }
 
 private:

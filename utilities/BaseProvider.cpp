@@ -80,7 +80,9 @@ CmpiStatus zemBaseProvider::returnOK() const { return CmpiStatus(CMPI_RC_OK); }
 
 CmpiStatus zemBaseProvider::returnStatus(CMPIrc rc, const char* text) const {
     CMPIBroker* raw = rawBroker();
-    if (raw == nullptr || raw->eft == nullptr) return CmpiStatus(rc);
+    if (raw == nullptr || raw->eft == nullptr || raw->eft->newString == nullptr) {
+        return CmpiStatus(rc);
+    }
     const CMPIStatus status = {rc, raw->eft->newString(raw, text, nullptr)};
     return CmpiStatus(status);
 }

@@ -222,9 +222,10 @@ public:
     /// itself, ahead of this library in the order of symbol lookup.
     CMPIBoolean isProviderEnabled(const CmpiContext& ctx);
 
+    /// The status of success, without a message.
     CmpiStatus returnOK() const;
 
-    /// A status with a message, made by the broker; without a broker, the bare code.
+    /// A status with a message, made by the broker; without one that makes strings, the bare code.
     CmpiStatus returnStatus(CMPIrc rc, const char* text) const;
 
     /// Hands @p text to the server's trace alone, at level 0 under the name "ProviderAgent".
@@ -291,8 +292,11 @@ public:
     /// Name of the user on whose behalf the operation runs; empty if the server does not say.
     static zemString getUserContext(const CmpiContext& ctx);
 
-    /// The standard failures. Each throws a zemException with one localised text; the names say
-    /// which, the row of the family's table which kind. @p M is the method, @p K the class.
+    /// The standard failures. Each throws a zemException whose only content is one localised text
+    /// (throwInvalidMethodArgValueExc: its English one). @p M is the method, @p K the class.
+    /// @throws zemNotSupportedException, zemMethodNotFoundException, zemAccessDeniedException,
+    ///         zemObjectNotFoundException  as the name says
+    /// @throws zemInvalidParameterException  all others, for a missing property as well
     [[noreturn]] void throwMethodNotSupportedExc(const char* M, const char* K) const;
     [[noreturn]] void throwMethodNotFoundExc(const char* M, const char* K) const;
     [[noreturn]] void throwUserAccessDeniedExc(const char* M, const char* K,
@@ -349,14 +353,15 @@ public:
     /// A key of a path; a value that tests as not found when it cannot be read.
     static CmpiData getKeyBinding(const CmpiObjectPath& path, const char* name);
 
-    /// An argument or a property that must be there.
+    /// An argument or a property that must be there: its value, which is never null.
     /// @throws zemInvalidParameterException  when it is missing, null or unreadable
     CmpiData getParmVal(const CmpiArgs& args, const char* name) const;
     CmpiData getPropVal(const CmpiInstance& instance, const char* name) const;
 
+    /// An array of CMPI_chars with these texts; a null pointer leaves its element null.
     static CmpiArray convertStringArray(const zemDynamicArray<zemString>& strings);
     static CmpiArray convertStringArray(const zemArray<const char*>& strings);
-    /// The texts of an array, "" for a null element.
+    /// The texts of an array, "" for a null element; the result owns them.
     static zemDynamicArray<zemString> convertStringArray(const CmpiArray& strings);
 
     /// Compares ignoring case. A @p compareName that begins with "_" stands for every class with

@@ -72,8 +72,6 @@ constexpr zemOperationRow kRows[] = {
 constexpr const char* kDisabledText =
     "The XBRG is managed by DNX, this provider on the XGRB in dissabled.";
 
-const char* orEmpty(const char* text) { return text != nullptr ? text : ""; }
-
 }  // namespace
 
 zemOperationFrame::zemOperationFrame(zemBaseProvider& provider, zemOperation operation,
@@ -161,13 +159,12 @@ void zemOperationFrame::traceExit() const {
 void zemOperationFrame::traceStatus(const CmpiStatus& status) const {
     PROV_TRACE_LOCALS_OF(m_provider);
     PROV_TRACE_STRING(4, "CMPI STATUS:%s  %s", zemBaseProvider::cmpiRcToString(status.rc()),
-                      orEmpty(status.msg()));
+                      zemOrEmpty(status.msg()));
 }
 
 void zemOperationFrame::traceBanner() const {
     PROV_TRACE_LOCALS_OF(m_provider);
-    zemString path;
-    if (!zemPrint(*m_path, path)) path = zemBaseProvider::objectPathToString(*m_path);
+    const zemString path = zemPathText(*m_path);
     if (m_method != nullptr) {
         PROV_TRACE_STRING(4, m_row.banner, m_method, static_cast<const char*>(path));
     } else {

@@ -211,12 +211,16 @@ zemBaseProviderManager::BaseMIItem* zemBaseProviderManager::getBaseMIItem(CMPIBr
     BaseMIItem* item = getBaseMIItem(name);
     if (item != nullptr) return item;
     try {
-        CmpiBaseMI* mi = create(CmpiBroker(mb), CmpiContext(ctx), name);
-        if (mi != nullptr) addBaseMI(name, mi);
+        std::unique_ptr<CmpiBaseMI> mi(create(CmpiBroker(mb), CmpiContext(ctx), name));
+        if (mi == nullptr) return nullptr;
+        addBaseMI(name, mi.get());
+        item = getBaseMIItem(name);
+        // A creation function that asks for its own name meanwhile has made another, which stays.
+        if (item->m_mi == mi.get()) static_cast<void>(mi.release());
+        return item;
     } catch (...) {
         return nullptr;  // the server, which may be written in C, cannot take an exception
     }
-    return getBaseMIItem(name);
 }
 
 void zemBaseProviderManager::addBaseMI(const char* name, CmpiBaseMI* mi) {

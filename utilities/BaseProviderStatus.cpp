@@ -54,8 +54,6 @@ constexpr LanguageRow kLanguages[] = {
 };
 constexpr const char* kOtherLocale = "en_US";
 
-const char* orEmpty(const char* text) { return text != nullptr ? text : ""; }
-
 zemString contextText(const CmpiContext& ctx, const char* entry) {
     zemString text;
     if (ctx.isNull()) return text;
@@ -125,7 +123,7 @@ public:
         m_handle = nullptr;
         PROV_TRACE_OF(m_broker, m_component);
         PROV_TRACE_STRING(2, "OPEN MESSAGE BUNDLE FILE(%s) FAILED,RETURN DEFAULT STRING %s:%s",
-                          orEmpty(bundle), orEmpty(key), orEmpty(dfltString));
+                          zemOrEmpty(bundle), zemOrEmpty(key), zemOrEmpty(dfltString));
         return false;
     }
 
@@ -133,25 +131,24 @@ public:
               const char* const (&a)[kMaxInserts], zemString& text) {
         if (m_handle == nullptr) return false;
         PROV_TRACE_OF(m_broker, m_component);
-        PROV_TRACE_STRING(4, "READ ICU MESSAGE %s FROM %s", orEmpty(key), orEmpty(bundle));
+        PROV_TRACE_STRING(4, "READ ICU MESSAGE %s FROM %s", zemOrEmpty(key), zemOrEmpty(bundle));
         if (m_broker->eft->getMessage2 == nullptr) return false;
         CMPICount count = 0;
         while (count < kMaxInserts && a[count] != nullptr) ++count;
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
-        CMPIString* message = nullptr;
         try {
-            message = m_broker->eft->getMessage2(
+            CMPIStatus status = {CMPI_RC_OK, nullptr};
+            CMPIString* message = m_broker->eft->getMessage2(
                 m_broker, key, m_handle, dfltString, &status, count, CMPI_chars, a[0], CMPI_chars,
                 a[1], CMPI_chars, a[2], CMPI_chars, a[3], CMPI_chars, a[4], CMPI_chars, a[5],
                 CMPI_chars, a[6], CMPI_chars, a[7], CMPI_chars, a[8], CMPI_chars, a[9]);
+            if (status.rc != CMPI_RC_OK || message == nullptr) return false;
+            const char* chars = message->ft->getCharPtr(message, nullptr);
+            if (chars != nullptr) text = chars;
+            message->ft->release(message);
+            return chars != nullptr;
         } catch (...) {
             return false;
         }
-        if (status.rc != CMPI_RC_OK || message == nullptr) return false;
-        const char* chars = message->ft->getCharPtr(message, nullptr);
-        if (chars != nullptr) text = chars;
-        message->ft->release(message);
-        return chars != nullptr;
     }
 
     void close() {
@@ -180,7 +177,7 @@ CmpiStatus zemBaseProvider::handleException(const char* accessMethod, const zemE
     if (e.getThrowingClass()[0] != '\0') {
         const char* behalf = e.getAccessMethod();
         std::string sentence = "An exception occurred during executing method ";
-        sentence.append(orEmpty(accessMethod))
+        sentence.append(zemOrEmpty(accessMethod))
             .append(" on provider ")
             .append(static_cast<const char*>(m_providerName))
             .append(". The exception was thrown from method ")
@@ -252,11 +249,11 @@ zemString zemBaseProvider::retrieveLocalizedString(
         const bool found = lookup.read(msgBundle, msgKey, dfltString, inserts, text);
         lookup.close();
         if (found) {
-            PROV_TRACE_STRING(4, "ICU MESSAGE %s: %s", orEmpty(msgKey),
+            PROV_TRACE_STRING(4, "ICU MESSAGE %s: %s", zemOrEmpty(msgKey),
                               static_cast<const char*>(text));
         } else {
-            PROV_TRACE_STRING(2, "RETURN DEFAULT STRING %s:%s", orEmpty(msgKey),
-                              orEmpty(dfltString));
+            PROV_TRACE_STRING(2, "RETURN DEFAULT STRING %s:%s", zemOrEmpty(msgKey),
+                              zemOrEmpty(dfltString));
         }
     }
     PROV_TRACE_EXIT();
@@ -271,8 +268,8 @@ void zemBaseProvider::logMessage(int severity, const char* id, const char* text)
 void zemBaseProvider::logMessage(CMPIBroker* brkr, const char* providerName, int severity,
                                  const char* id, const char* text) {
     if (brkr == nullptr || (id == nullptr && text == nullptr)) return;
-    std::string message = orEmpty(text);
-    if (orEmpty(id)[0] != '\0') message = std::string(id) + ": " + message;
+    std::string message = zemOrEmpty(text);
+    if (zemOrEmpty(id)[0] != '\0') message = std::string(id) + ": " + message;
 
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_STRING(4, "LOG MESSAGE: %s", message.c_str());
@@ -316,7 +313,8 @@ void zemBaseProvider::logICUMessage(CMPIBroker* brkr, CMPIContext* ctx, const ch
         }
     }
     PROV_TRACE_OF(brkr, providerName);
-    PROV_TRACE_STRING(4, "LOG ICU MESSAGE %s: %s", orEmpty(msgKey), static_cast<const char*>(text));
+    PROV_TRACE_STRING(4, "LOG ICU MESSAGE %s: %s", zemOrEmpty(msgKey),
+                      static_cast<const char*>(text));
     logMessage(brkr, providerName, severity, msgId, text);
 }
 

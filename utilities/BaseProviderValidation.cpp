@@ -48,14 +48,12 @@ const char* firstRepeated(const std::vector<const char*>& names) {
     return first < names.size() ? names[first] : nullptr;
 }
 
-// Integers wrap to the width asked for; a real that does not fit cannot be converted.
+// Integers wrap to the width asked for; a real that no integer of it holds cannot be converted.
 template <class To, class From>
 bool convert(From from, To& to) {
-    if constexpr (std::is_floating_point_v<From> && !std::is_same_v<From, To>) {
+    if constexpr (std::is_floating_point_v<From> && std::is_integral_v<To>) {
         const double value = static_cast<double>(from);
-        const double limit = std::is_integral_v<To>
-                                 ? std::ldexp(1.0, std::numeric_limits<To>::digits)
-                                 : static_cast<double>(std::numeric_limits<To>::max());
+        const double limit = std::ldexp(1.0, std::numeric_limits<To>::digits);
         const double low = std::is_signed_v<To> ? -limit : 0.0;
         if (!(value >= low && value < limit)) return false;
     }
@@ -63,39 +61,42 @@ bool convert(From from, To& to) {
     return true;
 }
 
-template <class To>
-bool readNumber(const CmpiData& data, To& number) {
+// What @p use says of the number in @p data; false when there is none.
+template <class Use>
+bool withNumber(const CmpiData& data, Use use) {
     switch (data.getType()) {
         case CMPI_uint8:
-            return convert(data.getUint8(), number);
+            return use(data.getUint8());
         case CMPI_uint16:
-            return convert(data.getUint16(), number);
+            return use(data.getUint16());
         case CMPI_uint32:
-            return convert(data.getUint32(), number);
+            return use(data.getUint32());
         case CMPI_uint64:
-            return convert(data.getUint64(), number);
+            return use(data.getUint64());
         case CMPI_sint8:
-            return convert(data.getSint8(), number);
+            return use(data.getSint8());
         case CMPI_sint16:
-            return convert(data.getSint16(), number);
+            return use(data.getSint16());
         case CMPI_sint32:
-            return convert(data.getSint32(), number);
+            return use(data.getSint32());
         case CMPI_sint64:
-            return convert(data.getSint64(), number);
+            return use(data.getSint64());
         case CMPI_real32:
-            return convert(data.getReal32(), number);
+            return use(data.getReal32());
         case CMPI_real64:
-            return convert(data.getReal64(), number);
+            return use(data.getReal64());
         default:
             return false;
     }
 }
 
-template <class Width>
 bool equalNumbers(const CmpiData& value1, const CmpiData& value2) {
-    Width number1{};
-    Width number2{};
-    return readNumber(value1, number1) && readNumber(value2, number2) && number1 == number2;
+    return withNumber(value1, [&value2](auto number) {
+        return withNumber(value2, [number](auto given) {
+            auto converted = number;
+            return convert(given, converted) && converted == number;
+        });
+    });
 }
 
 bool equalTexts(const CmpiData& value1, const CmpiData& value2, zemString& text1,
@@ -108,10 +109,10 @@ bool equalTexts(const CmpiData& value1, const CmpiData& value2, zemString& text1
 bool equalPaths(const CmpiData& value1, const CmpiData& value2, zemString& text1,
                 zemString& text2) {
     if (value2.getType() != CMPI_ref) return false;
-    CmpiObjectPath path1 = value1.getObjectPath();
-    CmpiObjectPath path2 = value2.getObjectPath();
-    text1 = zemTextOf(path1.toString());
-    text2 = zemTextOf(path2.toString());
+    const CmpiObjectPath path1 = value1.getObjectPath();
+    const CmpiObjectPath path2 = value2.getObjectPath();
+    text1 = zemPathText(path1);
+    text2 = zemPathText(path2);
     if (path1.getKeyCount() != path2.getKeyCount() ||
         strcasecmp(zemTextOf(path1.getNameSpace()), zemTextOf(path2.getNameSpace())) != 0 ||
         strcasecmp(zemTextOf(path1.getClassName()), zemTextOf(path2.getClassName())) != 0) {
@@ -131,33 +132,13 @@ bool equalValues(const CmpiData& value1, const CmpiData& value2, zemString& text
         case CMPI_string:
         case CMPI_chars:
             return equalTexts(value1, value2, text1, text2);
-        case CMPI_uint8:
-            return equalNumbers<CMPIUint8>(value1, value2);
-        case CMPI_uint16:
-            return equalNumbers<CMPIUint16>(value1, value2);
-        case CMPI_uint32:
-            return equalNumbers<CMPIUint32>(value1, value2);
-        case CMPI_uint64:
-            return equalNumbers<CMPIUint64>(value1, value2);
-        case CMPI_sint8:
-            return equalNumbers<CMPISint8>(value1, value2);
-        case CMPI_sint16:
-            return equalNumbers<CMPISint16>(value1, value2);
-        case CMPI_sint32:
-            return equalNumbers<CMPISint32>(value1, value2);
-        case CMPI_sint64:
-            return equalNumbers<CMPISint64>(value1, value2);
-        case CMPI_real32:
-            return equalNumbers<CMPIReal32>(value1, value2);
-        case CMPI_real64:
-            return equalNumbers<CMPIReal64>(value1, value2);
         case CMPI_dateTime:
             return value2.getType() == CMPI_dateTime &&
                    value1.getDateTime().getDateTime() == value2.getDateTime().getDateTime();
         case CMPI_ref:
             return equalPaths(value1, value2, text1, text2);
         default:
-            return false;
+            return equalNumbers(value1, value2);
     }
 }
 

@@ -68,8 +68,6 @@ constexpr TypeRow kTypes[] = {
 constexpr const char* kZeroInterval = "00000000000000.000000:000";
 constexpr const char* kDefaultNameSpace = "root/cimv2";
 
-const char* orEmpty(const char* text) { return text != nullptr ? text : ""; }
-
 std::string formatted(const char* format, ...) __attribute__((format(printf, 1, 2)));
 std::string formatted(const char* format, ...) {
     char text[128];
@@ -130,7 +128,7 @@ std::string valueText(const CmpiData& data) {
             return std::string("\"") + static_cast<const char*>(text) + "\"";
         }
         case CMPI_dateTime:
-            return orEmpty(data.getDateTime().toString().charPtr());
+            return zemOrEmpty(data.getDateTime().toString().charPtr());
         case CMPI_instance: {
             CmpiInstance instance = data.getInstance();
             return static_cast<const char*>(zemBaseProvider::instanceToString(instance));
@@ -154,7 +152,7 @@ std::string pathText(const CmpiObjectPath& path) {
     for (unsigned i = 0; i < count; ++i) {
         CmpiString name;
         const CmpiData value = path.getKey(static_cast<int>(i), &name);
-        text.append(i == 0 ? "." : ",").append(orEmpty(name.charPtr())).append("=");
+        text.append(i == 0 ? "." : ",").append(zemOrEmpty(name.charPtr())).append("=");
         text.append(zemBaseProvider::cmpidata2String(value));
     }
     return text;
@@ -185,7 +183,7 @@ std::string stripQuotes(const std::string& value) {
 }
 
 bool belongsToSharedSchema(const char* className) {
-    return strncasecmp(orEmpty(className), "ORXDSG_", 7) == 0;
+    return strncasecmp(zemOrEmpty(className), "ORXDSG_", 7) == 0;
 }
 
 }  // namespace
@@ -225,7 +223,7 @@ zemString zemBaseProvider::instanceToString(CmpiInstance& instance) {
             CmpiString name;
             const CmpiData value = instance.getProperty(static_cast<int>(i), &name);
             text.append("    ").append(cmpiDataTypeToString(value.getType())).append(" ");
-            text.append(orEmpty(name.charPtr())).append(" = ").append(cmpidata2String(value));
+            text.append(zemOrEmpty(name.charPtr())).append(" = ").append(cmpidata2String(value));
         }
     } catch (const CmpiStatus&) {
         // A trace shows what could be read.
@@ -337,19 +335,13 @@ CmpiData zemBaseProvider::getParmVal(const CmpiArgs& args, const char* name) con
 }
 
 CmpiData zemBaseProvider::getPropVal(const CmpiInstance& instance, const char* name) const {
-    zemString className;
     try {
         const CmpiData value = instance.getProperty(name);
         if (!zemIsMissing(value)) return value;
     } catch (...) {
         // Missing, in the way of some servers.
     }
-    try {
-        className = zemTextOf(instance.getObjectPath().getClassName());
-    } catch (...) {
-        // The text then names no class.
-    }
-    throwPropertyNotFoundExc(className, name);
+    throwPropertyNotFoundExc(zemClassOf(instance), name);
 }
 
 CmpiArray zemBaseProvider::convertStringArray(const zemDynamicArray<zemString>& strings) {
@@ -382,9 +374,9 @@ zemDynamicArray<zemString> zemBaseProvider::convertStringArray(const CmpiArray& 
 }
 
 CMPIBoolean zemBaseProvider::compareClassNames(const char* className, const char* compareName) {
-    const char* name = orEmpty(className);
-    const char* other = orEmpty(compareName);
-    if (other[0] == '_') name = orEmpty(strchr(name, '_'));
+    const char* name = zemOrEmpty(className);
+    const char* other = zemOrEmpty(compareName);
+    if (other[0] == '_') name = zemOrEmpty(strchr(name, '_'));
     return strcasecmp(name, other) == 0;
 }
 

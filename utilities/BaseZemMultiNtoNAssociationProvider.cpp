@@ -333,13 +333,13 @@ bool zemProviderPairAssociation<Provider>::CheckClassNameInAssociationPair(
 
 template <class Provider>
 bool zemProviderPairAssociation<Provider>::CheckRolesAndResultClass(
-    const char* resultRole, const char* role, const char* resultClass, const CmpiObjectPath& cop,
+    const char* resultRole, const char* role, const char* resultClass,
     const zemMultiTargetAssociationData& target) const {
     const zemMultiNtoNAssociationData& side = target.m_AssoData;
     return fitsFilter(role, side.m_assoPropname) &&
            fitsFilter(resultRole, target.m_OtherSidePropName) &&
            (!zemIsGiven(resultClass) ||
-            zemClassIsA(zemNameSpaceOr(side.m_nameSpace, cop), side.m_className, resultClass));
+            zemClassIsA(side.m_nameSpace, side.m_className, resultClass));
 }
 
 template <class Provider>
@@ -352,7 +352,8 @@ void zemProviderPairAssociation<Provider>::collectTargets(
         if (!pair.isOf(assocClass) || !CheckClassNameInAssociationPair(ctx, cop, pair, isFirst))
             continue;
         auto target = std::make_unique<zemMultiTargetAssociationData>(pair, isFirst);
-        if (CheckRolesAndResultClass(resultRole, role, resultClass, cop, *target))
+        target->m_AssoData.m_nameSpace = zemNameSpaceOr(target->m_AssoData.m_nameSpace, cop);
+        if (CheckRolesAndResultClass(resultRole, role, resultClass, *target))
             targets.addElement(target.release());
     }
 }

@@ -138,8 +138,8 @@ protected:
     /// Whether the class of @p cop is on a side of the pair, and on which.
     bool CheckClassNameInAssociationPair(const CmpiContext& ctx, const CmpiObjectPath& cop,
                                          const zemMultiNtoNAssociationPair& pair, bool& isFirst);
+    /// Whether a target passes the filters of a request; null and empty ones do not restrict.
     bool CheckRolesAndResultClass(const char* resultRole, const char* role, const char* resultClass,
-                                  const CmpiObjectPath& cop,
                                   const zemMultiTargetAssociationData& target) const;
     /// The body of CheckAssociationOperationParameters().
     void collectTargets(const CmpiContext& ctx, const CmpiObjectPath& cop, const char* assocClass,
@@ -197,7 +197,8 @@ public:
     virtual bool isFirstClassWhen2ClassTheSame(const CmpiContext& ctx, const CmpiObjectPath& cop);
 
     /// Whether the left and the right object belong together; by default all do. In a navigation
-    /// the side of the source in @p pair has the namespace of the request.
+    /// the sides in @p pair have the namespace of the request where none is configured, that of the
+    /// source always.
     virtual bool isValidateAssociation(const CmpiContext& ctx, const CmpiObjectPath& cop1,
                                        const CmpiObjectPath& cop2,
                                        const zemMultiNtoNAssociationPair& pair);

@@ -72,10 +72,6 @@ constexpr zemFailure kPropertyValueDoesntMatch = {
                     {'r', kind}});
 }
 
-Text orEmpty(Text text) { return text != nullptr ? text : ""; }
-
-zemString classOf(const CmpiInstance& instance) { return zemClassOf(instance.getObjectPath()); }
-
 // Characters and strings are one type to a client.
 CMPIType comparable(CMPIType type) {
     constexpr CMPIType array = CMPI_ARRAY;
@@ -98,13 +94,13 @@ CmpiData zemBaseZemValidator::getInstanceProperty(const CmpiInstance& instance, 
         value = instance.getProperty(name);
     } catch (const CmpiStatus& status) {
         if (status.rc() == CMPI_RC_ERR_NO_SUCH_PROPERTY) return CmpiData();
-        const zemString className = classOf(instance);
+        const zemString className = zemClassOf(instance);
         PROV_TRACE_STRING(4, "Internal error.Get property:\"%s\" of %s failed. CMPI STATUS:%s  %s",
                           name, Text(className), cmpiRcToString(status.rc()),
-                          orEmpty(status.msg()));
+                          zemOrEmpty(status.msg()));
         zemString text;
         text.format("Get Property:\"%s\" of %s failed. %s", name, Text(className),
-                    orEmpty(status.msg()));
+                    zemOrEmpty(status.msg()));
         throw zemOperationFailedException(text);
     }
     if (zemIsMissing(value) || expected == CMPI_null ||
@@ -125,7 +121,7 @@ void zemBaseZemValidator::validateRequestedProperty(const CmpiInstance& instance
     if (!zemIsMissing(anyProperty(instance, name))) return;
     PROV_TRACE_LOCALS();
     PROV_TRACE_STRING(4, "Invalid \"%s\"", name);
-    fail(kRequested, {{'p', name}, {'K', classOf(instance)}});
+    fail(kRequested, {{'p', name}, {'K', zemClassOf(instance)}});
 }
 
 void zemBaseZemValidator::validateUnsupportedProperty(const CmpiInstance& instance, Text name) {
@@ -148,7 +144,8 @@ void zemBaseZemValidator::validateUnmodifiableProperty(const CmpiInstance& oldIn
     const zemString newText = cmpidata2String(newValue);
     if (oldText == newText) return;
     traceInvalid(newInstance, name);
-    fail(kUnmodifiable, {{'p', name}, {'K', classOf(newInstance)}, {'v', oldText}, {'w', newText}});
+    fail(kUnmodifiable,
+         {{'p', name}, {'K', zemClassOf(newInstance)}, {'v', oldText}, {'w', newText}});
 }
 
 void zemBaseZemValidator::validateFixedValueProperty(const CmpiInstance& instance,
@@ -160,7 +157,7 @@ void zemBaseZemValidator::validateFixedValueProperty(const CmpiInstance& instanc
     if (!zemReadText(found, text)) text = cmpidata2String(found);
     if (text == value) return;
     traceInvalid(instance, propertyName);
-    throwPropertyValueDoesntMatchExc(classOf(instance), propertyName, text, value);
+    throwPropertyValueDoesntMatchExc(zemClassOf(instance), propertyName, text, value);
 }
 
 void zemBaseZemValidator::validateEmbededInstanceProerties(const CmpiInstance& instance,
@@ -179,7 +176,7 @@ CmpiInstance zemBaseZemValidator::validateEmbeddedObject(const CmpiContext& ctx,
         PROV_TRACE_LOCALS();
         Text code = cmpiRcToString(status.rc());
         PROV_TRACE_STRING(4, "Validate \"%s\" element:%s failed. CMPI STATUS:%s  %s",
-                          orEmpty(parameterName), Text(path), code, orEmpty(status.msg()));
+                          zemOrEmpty(parameterName), Text(path), code, zemOrEmpty(status.msg()));
         if (status.rc() == CMPI_RC_ERR_NOT_FOUND || status.rc() == CMPI_RC_ERR_INVALID_PARAMETER) {
             throwInvalidMethodArgValueExc(parameterName, path, methodName);
         }
@@ -245,7 +242,7 @@ void zemBaseZemValidator::refuseValue(const CmpiInstance& instance, Text name, T
     const CmpiData value = anyProperty(instance, name);
     if (zemIsMissing(value)) return;
     traceInvalid(instance, name);
-    fail(sentence, {{'p', name}, {'K', classOf(instance)}, {'v', cmpidata2String(value)}});
+    fail(sentence, {{'p', name}, {'K', zemClassOf(instance)}, {'v', cmpidata2String(value)}});
 }
 
 void zemBaseZemValidator::traceInvalid(const CmpiInstance& instance, Text name) const {

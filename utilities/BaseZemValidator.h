@@ -2,7 +2,7 @@
 /// incoming instances, and the failures of the resource providers.
 ///
 /// Final providers derive from zemBaseZemProvider or zemBaseZemInstanceProvider, which both stand
-/// on this class. It has no state; everything but the broker calls is safe on any thread.
+/// on this class. It has no state, and any thread may call.
 ///
 /// All failures are zemInvalidParameterException unless said otherwise.
 #ifndef ZEM_BASE_ZEM_VALIDATOR_H
@@ -19,6 +19,7 @@ public:
     /// A property of an incoming instance; a missing or null value comes back as it is.
     /// @param expected  type that a value must have, strings and characters being one; CMPI_null
     ///                  for any
+    /// @throws zemInvalidParameterException  for a value of another type
     /// @throws zemOperationFailedException  when the server cannot read the property
     virtual CmpiData getInstanceProperty(const CmpiInstance& instance, const char* name,
                                          CMPIType expected);

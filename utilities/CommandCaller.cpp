@@ -69,17 +69,6 @@ void removeTrailingCommas(std::string& line) { line.erase(line.find_last_not_of(
 
 bool isGiven(const char* text) { return text != nullptr && *text != '\0'; }
 
-bool namesSystem(zemQuery::SystemTest test, const char* managedSystem) {
-    switch (test) {
-        case zemQuery::WHEN_NOT_EMPTY:
-            return isGiven(managedSystem);
-        case zemQuery::WHEN_NOT_NULL:
-            return managedSystem != nullptr;
-        default:
-            return false;
-    }
-}
-
 }  // namespace
 
 zemCommandCaller::zemCommandCaller(const char* auth, const char* locale)
@@ -200,8 +189,8 @@ zemRecordSetsType zemCommandCaller::query(const zemQuery& query, int* paramAttr,
                                           const char* managedSystem, const char* filter,
                                           const char* firstOptions, const char* lastOptions) {
     std::string line = std::string(query.command) + firstOptions;
-    if (namesSystem(query.systemTest, managedSystem)) {
-        line += std::string(" -m \"") + managedSystem + '"';
+    if (query.systemTest == zemQuery::WHEN_NOT_NULL || isGiven(managedSystem)) {
+        line += systemOption(managedSystem);
     }
     if (isGiven(filter)) {
         line += std::string(" --filter ") + filter;
@@ -212,4 +201,16 @@ zemRecordSetsType zemCommandCaller::query(const zemQuery& query, int* paramAttr,
     callLsCommand(line.c_str(), query.attributes.count > 0 ? paramAttr : nullptr, kListEnd,
                   query.attributes.names, query.attributes.count, results);
     return results;
+}
+
+std::string zemCommandCaller::systemOption(const char* managedSystem) {
+    return managedSystem != nullptr ? std::string(" -m \"") + managedSystem + '"' : std::string();
+}
+
+void zemCommandCaller::callStateChange(const char* what, const std::string& line) {
+    const std::string rule(28, '+');
+    zemLog::LogSysOut(rule.c_str());
+    zemLog::LogSysOut((what + line).c_str());
+    zemLog::LogSysOut(rule.c_str());
+    callGenericCommand(line.c_str(), nullptr, false);
 }

@@ -14,6 +14,8 @@
 #ifndef COMMAND_CALLER_H
 #define COMMAND_CALLER_H
 
+#include <string>
+
 #include "AttributeTable.h"
 #include "DynamicArray.h"
 #include "RecordSets.h"
@@ -29,7 +31,7 @@ struct tagAttributePair {
 /// One query of a tool: what its lines begin with, which fields there are, and when the line names
 /// the managed system.
 struct zemQuery {
-    enum SystemTest { WHEN_NOT_EMPTY, WHEN_NOT_NULL, NEVER };
+    enum SystemTest { WHEN_NOT_EMPTY, WHEN_NOT_NULL };
 
     const char* command;
     zemAttributeNames attributes;
@@ -47,12 +49,13 @@ public:
     zemCommandCaller(const char* auth, const char* locale);
     virtual ~zemCommandCaller();
 
-    /// Runs @p command without a time limit.
+    /// Runs @p command without a time limit, timed by the logger "callGenericCommand".
     /// @param pCmdOutput  receives standard output if not null
+    /// @param forceTimeOut  has no effect; callers say true for queries and false for changes
     /// @return 0
     /// @throws zemObjectNotFoundException the tool says "No results were found."
     /// @throws zemOperationFailedException the tool fails: the id is the code beginning with "WRTL"
-    ///         in its text, else "UNKNOWN"
+    ///         in its text, else "UNKNOWN". Of both the access method is the quoted line.
     int callGenericCommand(const char* command, zemString* pCmdOutput, bool forceTimeOut);
 
     /// The same for @p command as arguments of "xbrgcli".
@@ -71,7 +74,7 @@ protected:
                                zemRecordSetsType& results);
 
     /// Runs the change @p cmd, of which at most 512 bytes count, with the option that
-    /// BuildChCmdString() adds.
+    /// BuildChCmdString() adds, and throws what that throws. Returns 0.
     virtual int callChCommand(const char* cmd,
                               const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
                               const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
@@ -79,7 +82,8 @@ protected:
                               CH_OP_TYPE op, const char* attrOpt);
 
     /// Runs the creation @p cmd, of which at most 512 bytes count, with the option -i and
-    /// @p attrPairs; the option stands even if they are empty.
+    /// @p attrPairs; the option stands even if they are empty. Returns 0.
+    /// @throws zemInvalidParameterException id "INVALID_INDEX": a position outside the table
     virtual int callMkCommand(const char* cmd, const zemDynamicArray<tagAttributePair>& attrPairs,
                               const char* const* allAttrNames, unsigned int allAttrNumber);
 
@@ -104,6 +108,12 @@ protected:
     zemRecordSetsType query(const zemQuery& query, int* paramAttr, const char* managedSystem,
                             const char* filter = nullptr, const char* firstOptions = "",
                             const char* lastOptions = "");
+
+    /// The option -m with @p managedSystem in double quotes; nothing for null.
+    static std::string systemOption(const char* managedSystem);
+
+    /// Logs @p line behind @p what, between two rules, and runs it.
+    void callStateChange(const char* what, const std::string& line);
 
     zemString m_auth;
     zemString m_locale;

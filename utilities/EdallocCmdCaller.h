@@ -64,7 +64,8 @@ public:
     int removeProcessing(const char* managedSystem, const zemString& lparID, std::int64_t procs,
                          std::int64_t procUnits, pid_t* pid, FILE** fpOutput);
 
-    /// Sets the sharing mode and the weight that @p rasd holds.
+    /// Sets the sharing mode and the weight of @p rasd, which must not be null; what is not set
+    /// there is left out.
     int modifyProcessing(const char* managedSystem, const zemString& lparID, zemRASD* rasd,
                          pid_t* pid, FILE** fpOutput);
 
@@ -77,7 +78,7 @@ public:
     int removeMemory(const char* managedSystem, const zemString& lparID, std::int64_t size,
                      std::int64_t vsize, pid_t* pid, FILE** fpOutput);
 
-    /// Sets the memory weight that @p rasd holds.
+    /// Sets the memory weight of @p rasd, which must not be null.
     int modifyMemory(const char* managedSystem, const zemString& lparID, zemRASD* rasd, pid_t* pid,
                      FILE** fpOutput);
 

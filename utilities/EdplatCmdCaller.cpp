@@ -13,10 +13,7 @@ zemEdplatCmdCaller::zemEdplatCmdCaller(const char* auth, const char* locale)
 
 int zemEdplatCmdCaller::change(const char* resource, const Pairs& identity, const Pairs& attrPairs,
                                const char* managedSystem, zemAttributeNames table, CH_OP_TYPE op) {
-    std::string line = std::string("edplat -r ") + resource;
-    if (managedSystem != nullptr) {
-        line += std::string(" -m \"") + managedSystem + '"';
-    }
+    const std::string line = std::string("edplat -r ") + resource + systemOption(managedSystem);
     return callChCommand(line.c_str(), identity, attrPairs, table.names, table.count, op, " -i ");
 }
 

@@ -105,6 +105,7 @@ public:
     zemEdplatCmdCaller(const char* auth, const char* locale);
 
     /// Adds to, sets or takes from attributes of a host, a partition or a profile.
+    /// @param profName,lparId  name of the profile, number of the partition
     /// @param attrPairs  positions in the table of the resource, and their values
     /// @param managedSystem  key or name of the host; null: the line does not name it
     /// @throws zemInvalidParameterException id "INVALID_INDEX": a position outside the table

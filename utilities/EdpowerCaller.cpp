@@ -3,7 +3,6 @@
 #include <iterator>
 
 #include "Exception.h"
-#include "Log.h"
 
 namespace {
 
@@ -23,8 +22,6 @@ enum SystemProfileOperation { VALIDATE = 0, PROFILE_ON = 1 };
 
 /// By boot mode; 0 stands for none.
 constexpr const char* kBootModes[] = {nullptr, "norm", "dd", "ds", "of", "sms"};
-
-constexpr char kRule[] = "++++++++++++++++++++++++++++";
 
 [[noreturn]] void refuse(const char* method, const std::string& text) {
     throw zemNotSupportedException("EdpowerCaller", method, text.c_str());
@@ -171,10 +168,5 @@ void EdpowerCaller::run() {
         default:
             line += systemProfilePart();
     }
-    line += std::string(" -m \"") + static_cast<const char*>(m_mtms) + '"';
-    zemLog::LogSysOut(kRule);
-    zemLog::LogSysOut(("Change system state:" + line).c_str());
-    zemLog::LogSysOut(kRule);
-    zemString output;
-    callGenericCommand(line.c_str(), &output, false);
+    callStateChange("Change system state:", line + systemOption(m_mtms));
 }

@@ -1,10 +1,8 @@
 #include "EdsuspCaller.h"
 
 #include <iterator>
-#include <string>
 
 #include "Exception.h"
-#include "Log.h"
 
 namespace {
 
@@ -16,8 +14,6 @@ constexpr const char* kOperations[] = {nullptr,
                                        "cancel -t suspend ",
                                        "recover -t suspend ",
                                        "shutdown -t suspend "};
-
-constexpr char kRule[] = "++++++++++++++++++++++++++++";
 
 }  // namespace
 
@@ -33,12 +29,7 @@ void EdsuspCaller::validateParms() const {
 
 void EdsuspCaller::run() {
     validateParms();
-    const std::string line = std::string("edsusp  -o ") + kOperations[m_Operation] + " -m \"" +
-                             static_cast<const char*>(m_mtms) + "\" --id " +
-                             std::to_string(m_Lparid);
-    zemLog::LogSysOut(kRule);
-    zemLog::LogSysOut(("Change lpar state:" + line).c_str());
-    zemLog::LogSysOut(kRule);
-    zemString output;
-    callGenericCommand(line.c_str(), &output, false);
+    callStateChange("Change lpar state:", std::string("edsusp  -o ") + kOperations[m_Operation] +
+                                              systemOption(m_mtms) + " --id " +
+                                              std::to_string(m_Lparid));
 }

@@ -99,10 +99,11 @@ public:
             return absent;
         }
         int result = absent;
-        const unsigned hash = HashFn(key, m_bucketLen);
+        const K wanted(key);  // the caller's may stand in an entry that goes
+        const unsigned hash = HashFn(wanted, m_bucketLen);
         for (Bucket** link = &m_bucketArray[hash]; *link != nullptr;) {
             Bucket* const bucket = *link;
-            if (holds(bucket, hash, key)) {
+            if (holds(bucket, hash, wanted)) {
                 *link = bucket->m_next;
                 dispose(bucket);
                 result = done;

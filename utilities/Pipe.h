@@ -28,6 +28,7 @@ public:
     int read(void* data, std::size_t size);
     int write(const void* data, std::size_t size);
 
+    /// The descriptors, 0 for an end that is closed; they stay the object's.
     int getReadingPipe() const { return m_pipe[0]; }
     int getWritingPipe() const { return m_pipe[1]; }
 

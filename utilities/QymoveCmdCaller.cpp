@@ -3,8 +3,7 @@
 namespace {
 
 constexpr zemQuery kManager = {"qymove -r manager",
-                               zemQymoveCmdCaller::ManagerSystemAttribute::m_attributeName,
-                               zemQuery::NEVER};
+                               zemQymoveCmdCaller::ManagerSystemAttribute::m_attributeName};
 constexpr zemQuery kSystems = {"qymove -r sys",
                                zemQymoveCmdCaller::ManagedSystemAttribute::m_attributeName,
                                zemQuery::WHEN_NOT_NULL};

@@ -242,7 +242,8 @@ public:
     /// when it cannot be told. Throws nothing.
     int getMigrationPercentComplete(const char* userName);
 
-    /// Changes of the partition. Each returns 0.
+    /// Changes of the partition; @p keylockPos is a word of the tool's, as "norm". Each returns 0.
+    /// @throws zemObjectNotFoundException there is no such partition
     int setDefaultProfile(const zemString& profileName);
     int setName(const zemString& systemName);
     int setKeylock(const zemString& keylockPos);

@@ -197,17 +197,16 @@ int zemHostSystem::createVirtualSystem(const zemDynamicArray<tagAttributePair>& 
 bool zemHostSystem::IsUnusedLparId(const zemString& lparId) try {
     const zemString mtms = getMTMS();
     const zemString key = lparId + "*" + mtms;
-    const zemAutoReleaseApiProp result(
-        zemApiCaller().getAllLparsFromCec(m_requestUserContext, mtms, 1));
-    if (result.get() == nullptr || zemApiCaller::getReturnCode(result.get()) != 0) {
-        return false;
-    }
-    for (int i = 1; i < result.get()->objCount; ++i) {
-        if (zemApiProp(result.get() + i).getProperty("Name") == key) {
+    const zemApiReader reader = {kClass, "IsUnusedLparId", "getAllLparsFromCec"};
+    for (apiProp& partition :
+         zemApiObjects(reader, zemApiCaller().getAllLparsFromCec(m_requestUserContext, mtms, 1))) {
+        if (zemApiProp(&partition).getProperty("Name") == key) {
             return false;
         }
     }
     return true;
+} catch (const zemException&) {
+    return false;  // the library cannot tell
 } catch (...) {
-    return true;
+    return true;  // up to here no partition had the number
 }

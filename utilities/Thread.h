@@ -65,6 +65,7 @@ public:
     static int getCurrentThreadId();
     int getThreadId() const;
 
+    /// Whether the method runs: true from start() until it ends or is cancelled.
     bool isStarted() const;
 
     /// Operations of the thread's own condition.
@@ -106,6 +107,7 @@ public:
     zemControlledDataCommunication(const zemControlledDataCommunication&) = delete;
     zemControlledDataCommunication& operator=(const zemControlledDataCommunication&) = delete;
 
+    /// Appends an entry, which wakes the consumer if the queue was empty.
     void putControlledData(void* data, int size);
 
     /// Blocks until there is an entry; returns its data, and its size in @p size.

@@ -38,7 +38,8 @@ public:
     /// Takes a reading and returns it; a non-zero @p setBegin makes it the begin mark as well.
     std::uint64_t timer(int setBegin);
 
-    /// From the previous reading or the begin mark to the current reading; 0 for other intervals.
+    /// From the previous reading or the begin mark to the current reading, in milliseconds or
+    /// microseconds, negative after the clock was set back; 0 for other intervals.
     int getElapsedTime(tagTimeIntervalType interval, tagTimerPrecisionType precision) const;
 
 private:

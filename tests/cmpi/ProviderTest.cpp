@@ -11,7 +11,7 @@
 #include "CmpiInstanceMI.h"
 #include "CmpiMethodMI.h"
 #include "CmpiPropertyMI.h"
-#include "FakeServer.h"
+#include "Server.h"
 
 namespace {
 
@@ -70,9 +70,7 @@ public:
     Status setInstance(Ctx, Out, Path, const CmpiInstance&, List) override { return act("set"); }
     Status deleteInstance(Ctx, Out, Path) override { return act("delete"); }
     Status execQuery(Ctx, Out, Path, Text first, Text) override { return act(first); }
-    Status associators(Ctx, Out, Path, Text, Text, Text, Text, List) override {
-        return act("associators");
-    }
+    Status associators(Ctx, Out, Path, Text, Text, Text, Text, List) override { return act("all"); }
     Status associatorNames(Ctx, Out, Path, Text, Text, Text, Text r) override { return act(r); }
     Status references(Ctx, Out, Path, Text, Text, List) override { return act("references"); }
     Status referenceNames(Ctx, Out, Path, Text, Text) override { return act("names"); }
@@ -87,11 +85,9 @@ public:
     Status getProperty(Ctx, Out, Path, Text name) override { return act(name); }
     Status authorizeFilter(Ctx, Filter, Text, Path, Text user) override { return act(user); }
     Status mustPoll(Ctx, Filter, Text, Path) override { return act("poll"); }
-    Status activateFilter(Ctx, Filter, Text, Path, Flag f) override {
-        return act(f ? "first" : "");
-    }
+    Status activateFilter(Ctx, Filter, Text, Path, Flag f) override { return act(f ? "on" : ""); }
     Status deActivateFilter(Ctx, Filter, Text, Path, Flag f) override {
-        return act(f ? "last" : "");
+        return act(f ? "off" : "");
     }
     Status enableIndications(Ctx) override { return act("enable"); }
     Status disableIndications(Ctx) override { return act("disable"); }
@@ -115,6 +111,11 @@ CmpiStatus throwMemory() { throw std::bad_alloc(); }
 CmpiStatus throwNumber() { throw 42; }
 CmpiStatus answerText() { return CmpiStatus(CMPI_RC_ERR_FAILED, "answered"); }
 
+using I = CMPIInstanceMIFT;
+using A = CMPIAssociationMIFT;
+using M = CMPIMethodMIFT;
+using P = CMPIPropertyMIFT;
+
 struct ProviderTest : testing::Test {
     ProviderTest() { script = &m_script; }
     ~ProviderTest() override {
@@ -124,64 +125,68 @@ struct ProviderTest : testing::Test {
     }
 
     CMPIInstanceMI* load() {
-        m_instance = SampleProvider_Create_InstanceMI(&m_server.broker, m_ctx, &m_rc);
+        m_instance = SampleProvider_Create_InstanceMI(m_mb, m_ctx, &m_rc);
         return m_instance;
     }
     CMPIStatus cleanup(bool terminating) {
         return m_instance->ft->cleanup(m_instance, m_ctx, terminating);
     }
-    CMPIStatus enumerate() {
-        return m_instance->ft->enumerateInstances(m_instance, m_ctx, m_result, m_path, nullptr);
+    /// Calls an entry of a record's table.
+    template <class MI, class Entry, class... Args>
+    CMPIStatus call(MI* mi, Entry entry, Args... args) {
+        return (mi->ft->*entry)(mi, m_ctx, m_result, m_path, args...);
     }
+    CMPIStatus enumerate() { return call(m_instance, &I::enumerateInstances, nullptr); }
     static std::string text(const CMPIStatus& status) {
-        return status.msg ? static_cast<const char*>(status.msg->hdl) : "(none)";
+        return status.msg ? status.msg->ft->getCharPtr(status.msg, nullptr) : "(none)";
     }
 
     Script m_script;
-    FakeServer m_server;
+    cimom::Server m_server;
+    cimom::Reply m_reply;
+    cimom::RequestScope m_scope{m_server};
+    CMPIBroker* m_mb = m_server.broker();
     CMPIStatus m_rc{CMPI_RC_OK, nullptr};
-    CMPIContext* m_ctx = m_server.make<CMPIContext>(m_server.contextFt);
-    CMPIResult* m_result = m_server.make<CMPIResult>(m_server.resultFt);
-    CMPIObjectPath* m_path = m_server.make<CMPIObjectPath>(m_server.pathFt);
+    CMPIContext* m_ctx = m_scope.context();
+    CMPIResult* m_result = m_scope.result(m_reply);
+    CMPIObjectPath* m_path = m_scope.wrap(cimom::ObjectPath("root", "C"));
     CMPIInstanceMI* m_instance = nullptr;
 };
 
 TEST_F(ProviderTest, EveryEntryReachesItsOperation) {
     CMPIInstanceMI* i = load();
-    CMPIAssociationMI* a = SampleProvider_Create_AssociationMI(&m_server.broker, m_ctx, &m_rc);
-    CMPIMethodMI* m = SampleProvider_Create_MethodMI(&m_server.broker, m_ctx, &m_rc);
-    CMPIPropertyMI* p = SampleProvider_Create_PropertyMI(&m_server.broker, m_ctx, &m_rc);
-    CMPIIndicationMI* n = SampleProvider_Create_IndicationMI(&m_server.broker, m_ctx, &m_rc);
+    CMPIAssociationMI* a = SampleProvider_Create_AssociationMI(m_mb, m_ctx, &m_rc);
+    CMPIMethodMI* m = SampleProvider_Create_MethodMI(m_mb, m_ctx, &m_rc);
+    CMPIPropertyMI* p = SampleProvider_Create_PropertyMI(m_mb, m_ctx, &m_rc);
+    CMPIIndicationMI* n = SampleProvider_Create_IndicationMI(m_mb, m_ctx, &m_rc);
     EXPECT_EQ(m_script.alive, 1);
     EXPECT_STREQ(n->ft->miName, "indicationSampleProvider");
 
-    CMPIInstance* inst = m_server.make<CMPIInstance>(m_server.instanceFt);
-    CMPIArgs* args = m_server.make<CMPIArgs>(m_server.argsFt);
+    CMPIInstance* inst = m_scope.wrap(cimom::Instance());
+    CMPIArgs* args = m_scope.wrap(cimom::NamedValues());
     CMPIData value{CMPI_sint64, CMPI_goodValue, {}};
     value.value.sint64 = INT64_MIN;
     const auto ctx = m_ctx;
-    const auto r = m_result;
     const auto op = m_path;
     const std::pair<const char*, std::function<CMPIStatus()>> kEntries[] = {
-        {"enumNames", [=] { return i->ft->enumerateInstanceNames(i, ctx, r, op); }},
-        {"enum", [=] { return i->ft->enumerateInstances(i, ctx, r, op, nullptr); }},
-        {"get", [=] { return i->ft->getInstance(i, ctx, r, op, nullptr); }},
-        {"create", [=] { return i->ft->createInstance(i, ctx, r, op, inst); }},
-        {"set", [=] { return i->ft->modifyInstance(i, ctx, r, op, inst, nullptr); }},
-        {"delete", [=] { return i->ft->deleteInstance(i, ctx, r, op); }},
-        {"query", [=] { return i->ft->execQuery(i, ctx, r, op, "query", "lang"); }},
-        {"associators",
-         [=] { return a->ft->associators(a, ctx, r, op, "A", "R", "r", "rr", nullptr); }},
-        {"rr", [=] { return a->ft->associatorNames(a, ctx, r, op, "A", "R", "r", "rr"); }},
-        {"references", [=] { return a->ft->references(a, ctx, r, op, "R", "r", nullptr); }},
-        {"names", [=] { return a->ft->referenceNames(a, ctx, r, op, "R", "r"); }},
-        {"invoke", [=] { return m->ft->invokeMethod(m, ctx, r, op, "Start", args, args); }},
-        {"setProperty", [=] { return p->ft->setProperty(p, ctx, r, op, "Name", value); }},
-        {"Name", [=] { return p->ft->getProperty(p, ctx, r, op, "Name"); }},
+        {"enumNames", [=] { return call(i, &I::enumerateInstanceNames); }},
+        {"enum", [=] { return call(i, &I::enumerateInstances, nullptr); }},
+        {"get", [=] { return call(i, &I::getInstance, nullptr); }},
+        {"create", [=] { return call(i, &I::createInstance, inst); }},
+        {"set", [=] { return call(i, &I::modifyInstance, inst, nullptr); }},
+        {"delete", [=] { return call(i, &I::deleteInstance); }},
+        {"query", [=] { return call(i, &I::execQuery, "query", "lang"); }},
+        {"all", [=] { return call(a, &A::associators, "A", "R", "r", "rr", nullptr); }},
+        {"rr", [=] { return call(a, &A::associatorNames, "A", "R", "r", "rr"); }},
+        {"references", [=] { return call(a, &A::references, "R", "r", nullptr); }},
+        {"names", [=] { return call(a, &A::referenceNames, "R", "r"); }},
+        {"invoke", [=] { return call(m, &M::invokeMethod, "Start", args, args); }},
+        {"setProperty", [=] { return call(p, &P::setProperty, "Name", value); }},
+        {"Name", [=] { return call(p, &P::getProperty, "Name"); }},
         {"user", [=] { return n->ft->authorizeFilter(n, ctx, nullptr, "C", op, "user"); }},
         {"poll", [=] { return n->ft->mustPoll(n, ctx, nullptr, "C", op); }},
-        {"first", [=] { return n->ft->activateFilter(n, ctx, nullptr, "C", op, 1); }},
-        {"last", [=] { return n->ft->deActivateFilter(n, ctx, nullptr, "C", op, 1); }},
+        {"on", [=] { return n->ft->activateFilter(n, ctx, nullptr, "C", op, 1); }},
+        {"off", [=] { return n->ft->deActivateFilter(n, ctx, nullptr, "C", op, 1); }},
         {"enable", [=] { return n->ft->enableIndications(n, ctx); }},
         {"disable", [=] { return n->ft->disableIndications(n, ctx); }},
     };
@@ -192,8 +197,8 @@ TEST_F(ProviderTest, EveryEntryReachesItsOperation) {
         m_script.operation = throwError;
         EXPECT_EQ(text(entry()), "disk on fire") << called;
     }
-    EXPECT_EQ(FakeServer::bag(args).values.front().second.value.uint32, 7u);
-    EXPECT_EQ(FakeServer::bag(r).values.front().second.value.sint64, INT64_MIN);
+    EXPECT_EQ(*cimom::RequestScope::read(args).find("Out"), cimom::Value(CMPIUint32(7)));
+    EXPECT_EQ(m_reply.value(), cimom::Value(CMPISint64(INT64_MIN)));
 }
 
 TEST_F(ProviderTest, NothingButAStatusCrosses) {
@@ -213,13 +218,13 @@ TEST_F(ProviderTest, NothingButAStatusCrosses) {
         EXPECT_EQ(text(status), words);
     }
     // Without a way to make the text, the code still arrives.
-    m_server.eft.newString = nullptr;
-    m_script.operation = throwError;
-    EXPECT_EQ(enumerate().rc, CMPI_RC_ERR_FAILED);
-    m_server.eft.newString = [](const CMPIBroker*, const char*, CMPIStatus*) -> CMPIString* {
+    const auto out = [](const CMPIBroker*, const char*, CMPIStatus*) -> CMPIString* {
         throw std::bad_alloc();
     };
-    EXPECT_EQ(text(enumerate()), "(none)");
+    for (const auto newString : {decltype(+out){nullptr}, +out}) {
+        m_mb->eft->newString = newString;
+        EXPECT_EQ(text(enumerate()), "(none)");
+    }
 }
 
 TEST_F(ProviderTest, CancellationUnwindsTheWholeThread) {
@@ -238,26 +243,26 @@ TEST_F(ProviderTest, CancellationUnwindsTheWholeThread) {
     pthread_t id;
     ASSERT_EQ(pthread_create(&id, nullptr, thread, this), 0);
     void* result = nullptr;
-    ASSERT_EQ(pthread_join(id, &result), 0);
+    EXPECT_EQ(pthread_join(id, &result), 0);
     EXPECT_EQ(result, PTHREAD_CANCELED);
     EXPECT_EQ(m_script.called, "unwound");
 }
 
 TEST_F(ProviderTest, RecordsWithoutAProviderAreRefused) {
-    CMPIInstanceMI* record = load();
-    CMPIInstanceMI gone{nullptr, record->ft};
-    const auto enumNames = record->ft->enumerateInstanceNames;
-    EXPECT_EQ(enumNames(&gone, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_INVALID_HANDLE);
-    EXPECT_EQ(enumNames(nullptr, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_INVALID_HANDLE);
-    EXPECT_EQ(record->ft->cleanup(&gone, m_ctx, 0).rc, CMPI_RC_ERR_INVALID_HANDLE);
+    CMPIInstanceMI gone{nullptr, load()->ft};
+    const auto enumNames = [this](CMPIInstanceMI* mi) {
+        return m_instance->ft->enumerateInstanceNames(mi, m_ctx, m_result, m_path).rc;
+    };
+    EXPECT_EQ(enumNames(&gone), CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(enumNames(nullptr), CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(gone.ft->cleanup(&gone, m_ctx, 0).rc, CMPI_RC_ERR_INVALID_HANDLE);
 
-    CmpiMethodMI methodsOnly(CmpiBroker(&m_server.broker), CmpiContext(m_ctx));
-    CMPIInstanceMI wrongKind{static_cast<CmpiBaseMI*>(&methodsOnly), record->ft};
-    EXPECT_EQ(enumNames(&wrongKind, m_ctx, m_result, m_path).rc, CMPI_RC_ERR_NOT_SUPPORTED);
-    CMPIMethodMI bare{wrongKind.hdl, nullptr};  // its class overrides nothing
-    const auto invoke = CmpiMethodMI::driveInvokeMethod;
-    EXPECT_EQ(invoke(&bare, m_ctx, m_result, m_path, "M", nullptr, nullptr).rc,
-              CMPI_RC_ERR_NOT_SUPPORTED);
+    CmpiMethodMI methodsOnly{CmpiBroker(m_mb), CmpiContext(m_ctx)};
+    CMPIInstanceMI wrongKind{static_cast<CmpiBaseMI*>(&methodsOnly), gone.ft};
+    EXPECT_EQ(enumNames(&wrongKind), CMPI_RC_ERR_NOT_SUPPORTED);
+    M table = {200, 200, "", nullptr, CmpiMethodMI::driveInvokeMethod};
+    CMPIMethodMI bare{wrongKind.hdl, &table};  // its class overrides nothing
+    EXPECT_EQ(call(&bare, &M::invokeMethod, "M", nullptr, nullptr).rc, CMPI_RC_ERR_NOT_SUPPORTED);
 }
 
 TEST_F(ProviderTest, AFailingLoadLeavesNothing) {
@@ -282,13 +287,12 @@ TEST_F(ProviderTest, AFailingLoadLeavesNothing) {
 
 TEST_F(ProviderTest, TheLastCleanupDestroys) {
     load();
-    CMPIMethodMI* method = SampleProvider_Create_MethodMI(&m_server.broker, m_ctx, &m_rc);
+    CMPIMethodMI* method = SampleProvider_Create_MethodMI(m_mb, m_ctx, &m_rc);
     EXPECT_EQ(cleanup(false).rc, CMPI_RC_OK);
     EXPECT_EQ(m_script.alive, 1);
     EXPECT_EQ(method->ft->cleanup(method, m_ctx, 0).rc, CMPI_RC_OK);
     EXPECT_EQ(m_script.alive, 0);
-    EXPECT_EQ(method->ft->invokeMethod(method, m_ctx, m_result, m_path, "M", nullptr, nullptr).rc,
-              CMPI_RC_ERR_INVALID_HANDLE);
+    EXPECT_EQ(call(method, &M::invokeMethod, "M", nullptr, nullptr).rc, CMPI_RC_ERR_INVALID_HANDLE);
     load();
     EXPECT_EQ(m_script.alive, 1);
     EXPECT_EQ(enumerate().rc, CMPI_RC_OK);
@@ -302,8 +306,8 @@ TEST_F(ProviderTest, WhenAProviderMayStay) {
         CMPIrc rc;
         int alive;
     } kCases[] = {
-        {0, nullptr, false, CMPI_RC_ERR_NOT_SUPPORTED, 1},
-        {0, nullptr, true, CMPI_RC_OK, 0},
+        {0, succeed, false, CMPI_RC_ERR_NOT_SUPPORTED, 1},
+        {0, succeed, true, CMPI_RC_OK, 0},
         {1, answerText, false, CMPI_RC_ERR_FAILED, 1},
         {1, answerText, true, CMPI_RC_ERR_FAILED, 1},
         {1, throwText, false, CMPI_RC_ERR_NOT_FOUND, 1},
@@ -313,7 +317,7 @@ TEST_F(ProviderTest, WhenAProviderMayStay) {
     for (const auto& c : kCases) {
         load();
         m_script.unloadable = c.unloadable;
-        if (c.cleanup) m_script.cleanup = c.cleanup;
+        m_script.cleanup = c.cleanup;
         EXPECT_EQ(cleanup(c.terminating).rc, c.rc);
         EXPECT_EQ(m_script.alive, c.alive);
         m_script.cleanup = succeed;
@@ -327,12 +331,11 @@ TEST_F(ProviderTest, WhenAProviderMayStay) {
 TEST_F(ProviderTest, TextsAreMadeByALivingProvidersBroker) {
     EXPECT_EQ(CmpiStatus(CMPI_RC_ERR_FAILED, "nobody to make it").msg(), nullptr);
     const CmpiContext ctx(m_ctx);
-    auto other = std::make_unique<FakeServer>();
-    const CmpiMethodMI first(CmpiBroker(&m_server.broker), ctx);
-    auto second = std::make_unique<CmpiMethodMI>(CmpiBroker(&other->broker), ctx);
-    const int made = other->made();
+    auto other = std::make_unique<cimom::Server>();
+    const CmpiMethodMI first(CmpiBroker(m_mb), ctx);
+    auto second = std::make_unique<CmpiMethodMI>(CmpiBroker(other->broker()), ctx);
     EXPECT_STREQ(CmpiStatus(CMPI_RC_ERR_FAILED, "of the second").msg(), "of the second");
-    EXPECT_EQ(other->made(), made + 1);
+    EXPECT_EQ(other->liveObjects(), 1U);
     second.reset();
     other.reset();
     EXPECT_STREQ(CmpiStatus(CMPI_RC_ERR_FAILED, "of the first").msg(), "of the first");

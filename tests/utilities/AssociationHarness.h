@@ -12,6 +12,7 @@
 #include <memory>
 #include <mutex>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include "AssociationProvider.h"
@@ -85,9 +86,30 @@ struct WorldScript {
 
 inline std::unique_ptr<WorldScript> world;
 
+/// Has something done on another thread while the first pair is looked at.
+inline void whilePairing(const std::function<void()>& other) {
+    world->valid = [other, met = false](const std::string&, const std::string&) mutable {
+        if (!std::exchange(met, true)) std::thread(other).join();
+        return true;
+    };
+}
+
 /// Name of an object, whatever its class.
 inline std::string nameOf(const CmpiObjectPath& path) {
     return path.getKey("Name").getString().charPtr();
+}
+
+/// Notes a call, lets the script act, and gives the objects of a class.
+inline std::vector<CmpiObjectPath> askWorld(const std::string& call, const CmpiObjectPath& path) {
+    const std::string className = path.getClassName().charPtr();
+    world->note(call + ":" + className);
+    world->onCall(call + ":" + className);
+    std::vector<CmpiObjectPath> found;
+    for (const std::string& name : world->objects[className]) {
+        found.emplace_back(path.getNameSpace(), className.c_str());
+        found.back().setKey("Name", CmpiData(name.c_str()));
+    }
+    return found;
 }
 
 class Objects : public CmpiInstanceMI {
@@ -97,18 +119,19 @@ public:
 
     CmpiStatus enumInstanceNames(const CmpiContext&, CmpiResult& result,
                                  const CmpiObjectPath& path) override {
-        for (const CmpiObjectPath& object : ask("names", path)) result.returnData(object);
+        for (const CmpiObjectPath& object : askWorld("names", path)) result.returnData(object);
         return CmpiStatus(CMPI_RC_OK);
     }
     CmpiStatus enumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
                              const char**) override {
-        for (const CmpiObjectPath& object : ask("instances", path)) giveInstance(result, object);
+        for (const CmpiObjectPath& object : askWorld("instances", path))
+            giveInstance(result, object);
         return CmpiStatus(CMPI_RC_OK);
     }
     CmpiStatus getInstance(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
                            const char**) override {
         if (path.getKeyCount() == 0) return CmpiStatus(CMPI_RC_ERR_INVALID_PARAMETER, "no key");
-        for (const CmpiObjectPath& object : ask("get", path)) {
+        for (const CmpiObjectPath& object : askWorld("get", path)) {
             if (nameOf(object) != nameOf(path)) continue;
             giveInstance(result, object);
             return CmpiStatus(CMPI_RC_OK);
@@ -117,19 +140,6 @@ public:
     }
 
 private:
-    static std::vector<CmpiObjectPath> ask(const std::string& call, const CmpiObjectPath& path) {
-        const std::string className = path.getClassName().charPtr();
-        world->note(call + ":" + className);
-        world->onCall(call + ":" + className);
-        std::vector<CmpiObjectPath> found;
-        const auto names = world->objects.find(className);
-        if (names == world->objects.end()) return found;
-        for (const std::string& name : names->second) {
-            found.emplace_back(path.getNameSpace(), className.c_str());
-            found.back().setKey("Name", CmpiData(name.c_str()));
-        }
-        return found;
-    }
     static void giveInstance(CmpiResult& result, const CmpiObjectPath& path) {
         CmpiInstance instance(path);
         instance.setProperty("Name", path.getKey("Name"));

@@ -130,6 +130,14 @@ TEST_F(BaseProviderManager, AnswersNullWhenCreationFails) {
     for (createMI create : failing) EXPECT_EQ(nullptr, get(0, "P", nullptr, create).mi);
     CMPIInstanceMI foreign = {nullptr, nullptr};  // a record that is none of the manager's
     EXPECT_EQ(CMPI_RC_OK, M::cleanupInstanceMI(&foreign, scope.context(), false).rc);
+    // One that has made its own name's object meanwhile: that one stays, the second goes.
+    const Record record = get(0, "P", nullptr, [](auto& mb, auto& ctx, auto name) -> CmpiBaseMI* {
+        const auto create = FactoriesOf<CountedProvider>::create;
+        M::getMethodMI(mb.getEnc(), ctx.getEnc(), name, nullptr, create);
+        return create(mb, ctx, name);
+    });
+    EXPECT_EQ(1, alive);
+    for (const Record& last : {record, get(2)}) last.cleanup(true);
 }
 
 TEST_F(BaseProviderManager, CountsExactlyInAnyOrderAndFromManyThreads) {

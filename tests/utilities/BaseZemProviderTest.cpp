@@ -62,6 +62,17 @@ TEST_P(BaseZemProvider, ReadsPropertiesByType) {
         "3/The data type(\"uint32\") of property \"Size\" is invalid in instance "
         "root/cimv2:Test_Disk.Name=\"d1\", the expected data type is \"uint32[]\"",
         failureText([&] { service.getInstanceProperty(disk, "Size", CMPI_uint32A); }, "kt"));
+    CMPIInstance* const locked = h.disk();
+    static CMPIInstanceFT table = *locked->ft;
+    table.getProperty = [](const CMPIInstance*, const char*, CMPIStatus* rc) {
+        rc->rc = CMPI_RC_ERR_ACCESS_DENIED;
+        return CMPIData{};
+    };
+    table.getObjectPath = nullptr;
+    locked->ft = &table;
+    EXPECT_EQ(
+        "6/Get Property:\"Name\" of  failed. Name",
+        failureText([&] { service.validateRequestedProperty(Instance(locked), "Name"); }, "kt"));
 }
 
 TEST_P(BaseZemProvider, TestsPropertiesOfInstances) {
@@ -124,9 +135,9 @@ TEST_P(BaseZemProvider, ServesArraysThroughTheFrame) {
         answer.text);
 
     auto& provider = dynamic_cast<DiskProvider&>(h.provider());
-    EXPECT_STREQ("3", provider.getLparID("3*9117-MMA*10A"));
-    EXPECT_STREQ("9117-MMA*10A", provider.getMtms("3*9117-MMA*10A"));
-    EXPECT_STREQ("9117-MMA*10A", provider.getMtms("9117-MMA*10A"));
+    EXPECT_STREQ("3", provider.getLparID("3*1111-AAA*0000001"));
+    EXPECT_STREQ("1111-AAA*0000001", provider.getMtms("3*1111-AAA*0000001"));
+    EXPECT_STREQ("1111-AAA*0000001", provider.getMtms("1111-AAA*0000001"));
     EXPECT_EQ(1, provider.isUnloadable());
     EXPECT_EQ(0, service.isUnloadable());
 }

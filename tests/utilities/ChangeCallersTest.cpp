@@ -41,20 +41,11 @@ public:
     Data m_Data;
 };
 
-/// Holds the line that a change prints, and what the tool receives of it, against @p line. These
-/// lines mean the same to the shell, which is asked what the tool would receive of them.
-void check(const std::string& log, const std::string& line, const std::function<void()>& change,
-           const std::string& behind = "") {
-    ToolFolder tools;
-    tools.recorder(line.substr(0, line.find(' ')), "done\n");
-    testing::internal::CaptureStdout();
-    EXPECT_NO_THROW(change()) << line;
+void check(const std::string& log, const std::string& line, const std::string& behind,
+           const std::function<void()>& change) {
+    const LoggedCall call = logged(line.substr(0, line.find(' ')), "done\n", change);
     // The first command of a process is followed by a word of the timing trace.
-    const std::string printed = testing::internal::GetCapturedStdout();
-    EXPECT_EQ(0U, printed.find(log + line + '\n' + behind)) << printed;
-    const std::string received = tools.arguments();
-    tools.run(line);
-    EXPECT_EQ(tools.arguments(), received) << line;
+    EXPECT_EQ(0U, call.log.find(log + line + '\n' + behind)) << call.log;
 }
 
 /// What is logged, how the line goes on, and what makes it.
@@ -63,12 +54,13 @@ using Row = std::tuple<const char*, const char*, std::function<void()>>;
 TEST(ChangeCallersTest, Edalloc) {
     zemEdallocCmdCaller c("", "");
     RASD both("uncap", 128), weight("", 0), none("", -1);
+    pid_t pid = 0;
     pid_t* const p = nullptr;
     FILE* stream = nullptr;
     FILE** const f = nullptr;
     // clang-format off
     const Row rows[] = {
-        {"addProcessing:procs:250;procUnits:0;", "proc -m h*1 -o a --id 3 --procs 2 ", [&] { c.addProcessing("h*1", "3", 250, 0, p, f); }},
+        {"addProcessing:procs:250;procUnits:0;", "proc -m h*1 -o a --id 3 --procs 2 ", [&] { c.addProcessing("h*1", "3", 250, 0, &pid, f); }},
         {"addProcessing:procs:0;procUnits:150;", "proc -m h*1 -o a --id 3 --procunits 1.50", [&] { c.addProcessing("h*1", "3", 0, 150, p, f); }},
         {"removeProcessing:procs:200;procUnits:5;", "proc -m h*1 -o r --id 3 --procs 2 --procunits 0.05", [&] { c.removeProcessing("h*1", "3", 200, 5, p, &stream); }},
         {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "sharing_mode=uncap,uncap_weight=128")", [&] { c.modifyProcessing("h*1", "3", &both, p, f); }},
@@ -88,7 +80,7 @@ TEST(ChangeCallersTest, Edalloc) {
     };
     // clang-format on
     for (const auto& [log, line, change] : rows)
-        check(std::string(kPrefix) + log, std::string("edalloc -r ") + line, change);
+        check(std::string(kPrefix) + log, std::string("edalloc -r ") + line, "", change);
 }
 
 TEST(ChangeCallersTest, EdplatAndNwplat) {
@@ -110,7 +102,8 @@ TEST(ChangeCallersTest, EdplatAndNwplat) {
         {"nwplat -r lpar", R"( -i "")", [&] { create.makePartitionsInformation(pairs({}), nullptr); }},
     };
     // clang-format on
-    for (const auto& [begin, end, change] : rows) check(kPrefix, std::string(begin) + end, change);
+    for (const auto& [begin, end, change] : rows)
+        check(kPrefix, std::string(begin) + end, "", change);
 }
 
 TEST(ChangeCallersTest, ValuesReachTheToolAsTheyAre) {
@@ -142,24 +135,26 @@ TEST(ChangeCallersTest, ValuesReachTheToolAsTheyAre) {
 struct Power {
     int resource;
     int operation;
-    bool immed = false;
-    bool restart = false;
+    std::string flags = "";  // i: at once, r: restart, s: stop on error, v: validate
     const char* sysProfile = "";
-    bool validate = false;
     int bootMode = 0;
     const char* profile = "P";
     int lparId = 3;
 };
 
 void run(const Power& settings, int times = 1) {
+    const auto has = [&settings](char flag) {
+        return settings.flags.find(flag) != std::string::npos;
+    };
     EdpowerCaller c("", "");
     c.setManagedSystem("M");
     c.setResource(settings.resource);
     c.setOperation(settings.operation);
-    c.setImmed(settings.immed);
-    c.setRestart(settings.restart);
+    c.setImmed(has('i'));
+    c.setRestart(has('r'));
+    c.setStopOnError(has('s'));
+    c.setValidateSysProfile(has('v'));
     c.setSysProfName(settings.sysProfile);
-    c.setValidateSysProfile(settings.validate);
     c.setBootMode(settings.bootMode);
     c.setLparProfileName(settings.profile);
     c.setLparId(settings.lparId);
@@ -176,32 +171,27 @@ void suspend(int operation) {
 
 TEST(ChangeCallersTest, EdpowerAndEdsusp) {
     const std::string rule = kPrefix + std::string(28, '+') + '\n';
+    // clang-format off
     const std::pair<Power, const char*> rows[] = {
-        {{1, 1, false, false, "", false, 5}, "lpar --id 3 -o on -b sms -f P"},
-        {{1, 1, false, false, "", false, 0, "P Q"}, "lpar --id 3 -o on -f P Q"},
-        {{1, 2, true, true}, "lpar --id 3 -o shutdown --immed  --restart "},
-        {{1, 3, false, true}, "lpar --id 3 -o osshutdown --restart "},
-        {{1, 4}, "lpar --id 3 -o dumprestart"},
-        {{2, 1}, "sys -o on"},
-        {{2, 6}, "sys -o onstandby"},
-        {{2, 7, false, false, "N"}, "sys -o onsysprof -f N"},
-        {{2, 8}, "sys -o rebuild"},
-        {{2, 9, true, true}, "sys -o off --immed --restart"},
-        {{3, 1, false, false, "N"}, "sysprof -n N -o on  --continue "},
-        {{3, 0, false, false, "N", true}, "sysprof -n N --test "},
+        {{1, 1, "", "", 1}, "lpar --id 3 -o on -b norm -f P"}, {{1, 1, "", "", 2}, "lpar --id 3 -o on -b dd -f P"},
+        {{1, 1, "", "", 3}, "lpar --id 3 -o on -b ds -f P"}, {{1, 1, "", "", 4}, "lpar --id 3 -o on -b of -f P"},
+        {{1, 1, "", "", 5}, "lpar --id 3 -o on -b sms -f P"}, {{1, 1, "", "", 0, "P Q"}, "lpar --id 3 -o on -f P Q"},
+        {{1, 2, "ir"}, "lpar --id 3 -o shutdown --immed  --restart "}, {{1, 3, "r"}, "lpar --id 3 -o osshutdown --restart "},
+        {{1, 4, "", "", 0, ""}, "lpar --id 3 -o dumprestart"},
+        {{2, 1}, "sys -o on"}, {{2, 6}, "sys -o onstandby"}, {{2, 7, "", "N"}, "sys -o onsysprof -f N"},
+        {{2, 8}, "sys -o rebuild"}, {{2, 9}, "sys -o off"}, {{2, 9, "ir"}, "sys -o off --immed --restart"},
+        {{3, 1, "", "N"}, "sysprof -n N -o on  --continue "}, {{3, 1, "s", "N"}, "sysprof -n N -o on "},
+        {{3, 0, "v", "N"}, "sysprof -n N --test "}, {{3, -1, "", "N"}, "sysprof -n N"},
     };
+    const char* const changes[] = {"suspend", "resume", "validate -t suspend ", "cancel -t suspend ", "recover -t suspend ", "shutdown -t suspend "};
+    // clang-format on
     for (const auto& row : rows) {
         const std::string line = std::string("edpower -r ") + row.second + " -m \"M\"";
-        check(
-            rule + kPrefix + "Change system state:", line, [&] { run(row.first); }, rule);
+        check(rule + kPrefix + "Change system state:", line, rule, [&row] { run(row.first); });
     }
-    int operation = 0;
-    for (const char* what : {"suspend", "resume", "validate -t suspend ", "cancel -t suspend ",
-                             "recover -t suspend ", "shutdown -t suspend "}) {
-        const std::string line = std::string("edsusp  -o ") + what + " -m \"M\" --id 3";
-        ++operation;
-        check(
-            rule + kPrefix + "Change lpar state:", line, [&] { suspend(operation); }, rule);
+    for (int i = 0; i < 6; ++i) {
+        const std::string line = std::string("edsusp  -o ") + changes[i] + " -m \"M\" --id 3";
+        check(rule + kPrefix + "Change lpar state:", line, rule, [i] { suspend(i + 1); });
     }
 }
 
@@ -217,14 +207,14 @@ TEST(ChangeCallersTest, RefusalsRunNoTool) {
     // clang-format off
     const std::vector<std::pair<std::string, std::function<void()>>> rows = {
         {parms + "-r lpar operation unsupported: \x05", [] { run({1, 5}); }},
-        {parms + "-r lpar requires --id", [] { run({1, 1, false, false, "", false, 0, "", 0}); }},
-        {parms + "-r lpar requires -f <lpar_profile_name>", [] { run({1, 1, false, false, "", false, 0, ""}); }},
-        {parms + "-r lpar -o shutdown --restart must have --immed", [] { run({2, 9, false, true}); }},
+        {parms + "-r lpar requires --id", [] { run({1, 1, "", "", 0, "", 0}); }},
+        {parms + "-r lpar requires -f <lpar_profile_name>", [] { run({1, 1, "", "", 0, ""}); }},
+        {parms + "-r lpar -o shutdown --restart must have --immed", [] { run({2, 9, "r"}); }},
         {parms + "-r sysprof requires -n <system_profile_name>", [] { run({3, 0}); }},
-        {parms + "-r sysprof cannot have -o and --test", [] { run({3, 2, false, false, "N", true}); }},
-        {parms + "-r sysprof must have -o on", [] { run({3, 2, false, false, "N"}); }},
+        {parms + "-r sysprof cannot have -o and --test", [] { run({3, 2, "v", "N"}); }},
+        {parms + "-r sysprof must have -o on", [] { run({3, 2, "", "N"}); }},
         {parms + "resource type unsupported: \x04", [] { run({4, 1}); }},
-        {mismatch, [] { run({1, 1, false, false, "", false, 6}); }},
+        {mismatch, [] { run({1, 1, "", "", 6}); }},
         {mismatch, [] { run({2, 5}); }},
         {atRun + "The command entered is either missing a required parameter or a parameter value " "is invalid. The parameters that are missing or have an invalid value are -f.", [] { run({2, 7}); }},
         {"4/EdsuspCaller/validateParms//edsusp resource type unsupported: \x07", [] { suspend(7); }},
@@ -239,9 +229,11 @@ TEST(ChangeCallersTest, RefusalsRunNoTool) {
         EXPECT_EQ(words, failureText(operation));
         EXPECT_EQ("", tools.arguments()) << words;
     }
+    // The first run uses settings up: the operation, and the validation.
     const auto twice = [] { run({1, 1}, 2); };
-    EXPECT_EQ(parms + "-r lpar operation unsupported: ", failureText(twice))
-        << "the first run uses the operation up";
+    EXPECT_EQ(parms + "-r lpar operation unsupported: ", failureText(twice));
+    run({3, 0, "v", "N"}, 2);
+    EXPECT_EQ("-r|sysprof|-n|N|-m|M", tools.arguments());
     tools.script("edsusp", "echo 'WRTL8018 no such partition' >&2; exit 1");
     tools.script("edpower", "echo 'No results were found.'");
     EXPECT_EQ("6/zemCommandCaller/callGenericCommand/WRTL8018/WRTL8018 no such partition",
@@ -254,17 +246,21 @@ TEST(ChangeCallersTest, RefusalsRunNoTool) {
 TEST(ChangeCallersTest, BackgroundRunsBelongToTheCaller) {
     constexpr int kRuns = 32;
     ToolFolder tools;
-    ASSERT_EQ(0, mkfifo(tools.file("gate").c_str(), 0600));
+    ASSERT_EQ(0, mkfifo(tools.file("gate").c_str(), 0644));
     tools.script("edalloc",
-                 ": >$here/started.$8; read x <$here/gate; printf '%70000s' $8; echo err >&2; "
-                 "exit $8");
+                 ": >$here/started.$8; read x <$here/gate; printf '%70000s' $8; id -u >&2; "
+                 "echo $LC_ALL; exit $8");
+    const bool isRoot = geteuid() == 0;
+    const std::string end = (isRoot ? "65534" : std::to_string(geteuid())) + "\nxx\n";
+    std::filesystem::permissions(tools.folder(), std::filesystem::perms::all);
     const long before = openDescriptors();
     const int gate = open(tools.file("gate").c_str(), O_RDWR | O_CLOEXEC);
     ASSERT_LE(0, gate);
     std::map<int, std::pair<pid_t, FILE*>> children;
     for (int i = 1; i <= kRuns; ++i) {
         auto& [pid, stream] = children[i];
-        EXPECT_EQ(0, zemEdallocCmdCaller("", "").addMemory("M", zemString(i), 0, 1, &pid, &stream));
+        EXPECT_EQ(0, zemEdallocCmdCaller(isRoot ? "nobody" : "", "xx")
+                         .addMemory("M", zemString(i), 0, 1, &pid, &stream));
     }
     for (int i = 1; i <= kRuns; ++i) {  // all have begun and none can end
         while (access(tools.file("started." + std::to_string(i)).c_str(), F_OK) != 0) usleep(2000);
@@ -273,7 +269,7 @@ TEST(ChangeCallersTest, BackgroundRunsBelongToTheCaller) {
     EXPECT_EQ(kRuns, write(gate, std::string(kRuns, '\n').c_str(), kRuns));
     for (const auto& [number, child] : children) {
         const std::string text = std::to_string(number);
-        EXPECT_EQ(std::string(70000 - text.size(), ' ') + text + "err\n", readAll(child.second));
+        EXPECT_EQ(std::string(70000 - text.size(), ' ') + text + end, readAll(child.second));
         int status = 0;
         EXPECT_EQ(child.first, waitpid(child.first, &status, 0));
         EXPECT_TRUE(WIFEXITED(status) && WEXITSTATUS(status) == number);

@@ -3,6 +3,7 @@
 #include <tuple>
 
 #include "RecordParser.h"
+#include "TimingTrace.h"
 #include "ToolFolder.h"
 
 namespace {
@@ -11,11 +12,12 @@ class Caller : public zemCommandCaller {
 public:
     explicit Caller(const char* auth = "", const char* locale = "")
         : zemCommandCaller(auth, locale) {}
-    using zemCommandCaller::BuildChCmdString;
     using zemCommandCaller::callChCommand;
     using zemCommandCaller::callLsCommand;
     using zemCommandCaller::callMkCommand;
 };
+
+const TimingTrace timing("zemcommandtrace");
 
 constexpr const char* kNames[] = {"lpar_id", "name", "state", "mode"};
 
@@ -69,7 +71,7 @@ TEST(CommandCallerTest, JudgesTheToolsResult) {
         {"echo 'No results were found.'; exit 3", "5//\"tool\"/No results were found.\n"},
         {"echo 'No results were found.' >&2", ""},
         {"echo 'WRTL1234 something'; exit 1", "6/WRTL1234/\"tool\"/WRTL1234 something"},
-        {"echo 'x WRTL9 a\nb\n' >&2; echo out; exit 1", "6/WRTL9/\"tool\"/x WRTL9 a\nb"},
+        {"echo 'WRT WRTL9\nx y\n' >&2; echo out; exit 1", "6/WRTL9\nx/\"tool\"/WRT WRTL9\nx y"},
         {"printf 'see WRTL7' >&2; exit 1", "6/WRTL7/\"tool\"/see WRTL7"},
         {"echo other >&2; exit 255", "6/UNKNOWN/\"tool\"/other"},
         {"exit 1", "6/UNKNOWN/\"tool\"/"},
@@ -84,6 +86,11 @@ TEST(CommandCallerTest, JudgesTheToolsResult) {
     EXPECT_EQ(0, Caller().callXBRGCommand("list -a", &output));
     EXPECT_STREQ("bridged\n", output);
     EXPECT_EQ("list|-a", tools.arguments());
+    const std::string name = " callGenericCommand-xbrgcli list -a ";
+    const std::string trace =
+        timing.waitFor(name + "end", [&output] { Caller().callXBRGCommand("list -a", &output); });
+    const size_t end = trace.find(name + "end at ");
+    EXPECT_TRUE(trace.find(name + "begin at ") < end && end != std::string::npos);
 }
 
 TEST(CommandCallerTest, RunsUnderUserAndLocale) {
@@ -119,11 +126,11 @@ TEST(CommandCallerTest, QueriesNamedFields) {
     const auto query = [&first](int index) {
         int list[] = {index, -1};
         return failureText([&] { Caller().callLsCommand("tool", list, -1, kNames, 4, first); },
-                           "kiat");
+                           "kmiat");
     };
-    EXPECT_EQ("6/INVALID_RECORD/tool -F name/a\n\"b\n", query(1));
+    EXPECT_EQ("6/callLsCommand/INVALID_RECORD/tool -F name/a\n\"b\n", query(1));
     EXPECT_EQ("a;", text(first, {1}));
-    EXPECT_EQ("3/INVALID_INDEX/tool -F /4", query(4));
+    EXPECT_EQ("3/callLsCommand/INVALID_INDEX/tool -F /4", query(4));
     tools.recorder("tool", "");
     EXPECT_EQ("", query(1));
     EXPECT_EQ(1, first.size());
@@ -132,31 +139,25 @@ TEST(CommandCallerTest, QueriesNamedFields) {
 TEST(CommandCallerTest, BuildsChangesAndCreations) {
     ToolFolder tools;
     tools.recorder("tool");
-    zemString line("tool");
-    Caller().BuildChCmdString(line, pairs({}), pairs({}), kNames, 4, Caller::CH_OP_ADD, " -i ");
-    EXPECT_STREQ("tool", line);
-    Caller().BuildChCmdString(line, pairs({{1, "P"}}), pairs({{3, "v"}}), kNames, 4,
-                              Caller::CH_OP_ADD, " -i ");
-    EXPECT_STREQ(R"(tool  -i  "\"name=P\",\"mode+=v\"")", line);
-
     using List = std::vector<tagAttributePair>;
     const List none, single = {{1, "P"}, {0, "3"}}, multi = {{3, "a,b c"}};
     const List low = {{-1, "x"}}, high = {{4, "x"}};
     const struct {
         List single;
         List multi;
-        int op;  // -1: a creation
-        const char* received;
-        const char* failure;
+        int op;              // -1: a creation
+        const char* result;  // what the tool receives, or the failure
     } rows[] = {
-        {single, multi, 2, R"(-r|x|-i|"name=P","lpar_id=3","mode-=a,b c")", ""},
-        {none, multi, 1, R"(-r|x|-i|"mode=a,b c")", ""},
-        {none, none, 0, "-r|x", ""},
-        {single, high, 0, "", R"(3/INVALID_INDEX/tool -r x -i "\"name=P\",\"lpar_id=3\",/4)"},
-        {low, none, 0, "", R"(3/INVALID_INDEX/tool -r x -i "/-1)"},
-        {single, none, -1, R"(-r|x|-i|"name=P","lpar_id=3")", ""},
-        {none, none, -1, "-r|x|-i|", ""},
-        {high, none, -1, "", R"(3/INVALID_INDEX/tool -r x -i "/4)"},
+        {single, multi, 2, R"(-r|x|-i|"name=P","lpar_id=3","mode-=a,b c")"},
+        {single, multi, 0, R"(-r|x|-i|"name=P","lpar_id=3","mode+=a,b c")"},
+        {none, multi, 1, R"(-r|x|-i|"mode=a,b c")"},
+        {none, none, 0, "-r|x"},
+        {single, high, 0,
+         R"(3/BuildChCmdString/INVALID_INDEX/tool -r x -i "\"name=P\",\"lpar_id=3\",/4)"},
+        {low, none, 0, R"(3/BuildChCmdString/INVALID_INDEX/tool -r x -i "/-1)"},
+        {single, none, -1, R"(-r|x|-i|"name=P","lpar_id=3")"},
+        {none, none, -1, "-r|x|-i|"},
+        {high, none, -1, R"(3/callMkCommand/INVALID_INDEX/tool -r x -i "/4)"},
     };
     for (const auto& row : rows) {
         std::filesystem::remove(tools.file("argv"));
@@ -167,8 +168,8 @@ TEST(CommandCallerTest, BuildsChangesAndCreations) {
                 Caller().callChCommand("tool -r x", pairs(row.single), pairs(row.multi), kNames, 4,
                                        static_cast<Caller::CH_OP_TYPE>(row.op), "-i");
         };
-        EXPECT_EQ(row.failure, failureText(run, "kiat"));
-        EXPECT_EQ(row.received, tools.arguments());
+        const std::string failure = failureText(run, "kmiat");
+        EXPECT_EQ(row.result, failure + tools.arguments());
     }
 }
 

@@ -6,10 +6,8 @@
 #include <algorithm>
 #include <atomic>
 
-#include "../cimom/BothBrokers.h"
-#include "BaseProvider.h"
 #include "OnThreads.h"
-#include "ProviderFactories.h"
+#include "ProviderHarness.h"
 
 namespace {
 
@@ -18,20 +16,13 @@ using namespace cimom;
 constexpr const char* kClass = "Test_Busy";
 
 /// Serves everything, and fails where its object has the name "missing".
-class BusyProvider : public zemBaseProvider {
+class BusyProvider : public PlainProvider {
 public:
     BusyProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), zemBaseProvider(mb, ctx, name) {}
-    CMPIBoolean isValidInstanceClass(const char*) override { return true; }
-    CMPIBoolean isValidMethodClass(const char*) override { return true; }
-    void populateEssentialKeys(const char*, CmpiArray& keys) override {
-        keys[0] = CmpiData("Name");
-    }
+        : CmpiBaseMI(mb, ctx), PlainProvider(mb, ctx, name) {}
     void populateMethodArgs(const char*, zemDynamicArray<zemString>& args, const char*) override {
         args.addElement(new zemString("Word"));
     }
-    const char* getMessageBundlePath() override { return ""; }
-
     CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
                                     const char**) override {
         const zemString name(getKeyBinding(path, "Name").getString().charPtr());
@@ -57,9 +48,7 @@ public:
     void performInvokeMethod(const CmpiContext&, CmpiResult& result, const CmpiObjectPath&,
                              const char*, const CmpiArgs& in, CmpiArgs& out) override {
         out.setArg("Echo", getParmVal(in, "Word"));
-        CmpiData done;
-        done.setUint32(0);
-        result.returnData(done);
+        result.returnData(CmpiData(CMPIUint32{0}));
     }
 };
 

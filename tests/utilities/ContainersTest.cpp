@@ -71,9 +71,7 @@ TEST(DynamicArrayTest, IndexesPastTheEndExtend) {
 TEST(ArrayTest, Values) {
     zemArray<zemString> texts(0);
     for (int i = 0; i < 20; ++i) texts.append(zemString(i));
-    for (int i = 0; i < 5; ++i) {
-        texts.append(texts[0]);  // an element of the array that grows
-    }
+    for (int i = 0; i < 5; ++i) texts.append(texts[0]);  // an element of the array that grows
     zemString nine("9");
     EXPECT_EQ(texts.remove(nine), 0);
     EXPECT_EQ(texts.remove(nine), 1);
@@ -90,10 +88,8 @@ TEST(ArrayTest, Values) {
     EXPECT_TRUE(texts[2].isEmpty());
 }
 
-using NumberTable = zemHashTable<int, zemString, hashFunc>;
-
 TEST(HashTableTest, ReturnCodesAndTheThrownThree) {
-    NumberTable table(0);
+    zemHashTable<int, zemString, hashFunc> table(0);
     zemString value("before");
     EXPECT_EQ(table.lookup(1, value), 3);
     EXPECT_EQ(table.remove(1), 3);
@@ -113,36 +109,29 @@ TEST(HashTableTest, ReturnCodesAndTheThrownThree) {
     }
 }
 
-TEST(HashTableTest, CopiesAreDeep) {
-    NumberTable source(1);
-    source.insert(1, "1");
-    source.insert(4, "4");
-    NumberTable assigned(50);
-    assigned.insert(1, "old");
-    assigned = source;
-    const NumberTable copy(assigned);
-    assigned[4] = "changed";
-    EXPECT_STREQ(NumberTable(std::move(assigned)).getElement(4), "changed");
-    EXPECT_STREQ(copy[4], "4");
-    EXPECT_STREQ(copy[1], "1");
-    source = NumberTable(5);
-    EXPECT_THROW(source[4], int);
-}
-
-TEST(HashTableTest, EntriesComeAndGo) {
-    zemHashTable<int, Item, hashFunc> table(3);
+TEST(HashTableTest, EntriesComeAndGoAndCopiesAreDeep) {
+    using Table = zemHashTable<int, Item, hashFunc>;
+    Table table(3);
     const Item item = std::make_shared<int>(0);
-    for (int round = 0; round < 3; ++round) {
+    for (const unsigned chains : {3U, 50U, 1U}) {
         for (int key = 0; key < 9; ++key) {
             table.insert(key, item);
             table.remove(key - 2);
         }
         EXPECT_EQ(item.use_count(), 3) << "the last two and this one";
-        const zemHashTable<int, Item, hashFunc> copy(table);
+        Table assigned(chains);
+        assigned.insert(1, item);
+        assigned = table;
+        const Table copy(assigned);
+        assigned[8] = nullptr;
+        EXPECT_EQ(Table(std::move(assigned)).getElement(8), nullptr);
         table.clear();
-        EXPECT_EQ(copy[8], item);
+        EXPECT_TRUE(copy[7] == item && copy[8] == item);
         EXPECT_EQ(item.use_count(), 3);
+        table = copy;
     }
+    table = Table(5);
+    EXPECT_THROW(table[8], int);
     EXPECT_EQ(item.use_count(), 1);
 }
 

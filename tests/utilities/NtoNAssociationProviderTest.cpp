@@ -1,4 +1,3 @@
-#include <thread>
 #include <tuple>
 
 #include "AssociationHarness.h"
@@ -102,22 +101,16 @@ TEST(NtoNAssociation, OrderOfCalls) {
 // The lock is the provider's: while one pairs, another does.
 TEST(NtoNAssociation, ProvidersRunSideBySide) {
     World<Pair> w;
-    bool met = false;
     w.provider();
-    world->valid = [&](const std::string&, const std::string&) {
-        if (met) return true;
-        met = true;
-        std::thread([&] {
-            const cimom::RequestScope scope(w.server);
-            const CmpiContext ctx(scope.context());
-            cimom::Reply reply;
-            DirectResult result(scope.result(reply));
-            w.provider().performEnumInstances(ctx, result, CmpiObjectPath(scope.wrap(pathOf(""))),
-                                              nullptr);
-            EXPECT_EQ(6U, reply.instances.size());
-        }).join();
-        return true;
-    };
+    whilePairing([&] {
+        const cimom::RequestScope scope(w.server);
+        const CmpiContext ctx(scope.context());
+        cimom::Reply reply;
+        DirectResult result(scope.result(reply));
+        w.provider().performEnumInstances(ctx, result, CmpiObjectPath(scope.wrap(pathOf(""))),
+                                          nullptr);
+        EXPECT_EQ(6U, reply.instances.size());
+    });
     EXPECT_EQ("d1 d2", show(w.run("an", "s1")));
 }
 

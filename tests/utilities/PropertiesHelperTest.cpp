@@ -94,18 +94,14 @@ TEST(CommandLineTest, SplitsLikeAShell) {
 
 TEST(PollPlanTest, LimitsCountInTenthsOfASecond) {
     using Length = std::chrono::microseconds;
-    // waitTime, passes (1000: no limit), their length
-    const std::tuple<int, int, Length>
-        rows[] =
-            {
-                {50, 0, 0us},          {99999, 0, 0us},
-                {100000, 1, 2ms},      {250000, 2, 102ms},
-                {2147483, 21, 2002ms}, {5000000, 50, 4902ms},
-                {3000000, 0, 0us},  // the product wraps: a negative unit larger than the limit
-                {0, 1000, 2s},         {-5, 1000, 2s},
-                {4294967, 1000, 2s},    // a negative unit smaller than the limit
-                {536870912, 1000, 2s},  // a unit of zero
-            };
+    // waitTime, passes (1000: no limit), their length. Longer limits wrap in the product: to a unit
+    // that is negative and larger than the limit, then smaller, then to none.
+    // clang-format off
+    const std::tuple<int, int, Length> rows[] = {
+        {50, 0, 0us}, {99999, 0, 0us}, {100000, 1, 2ms}, {250000, 2, 102ms}, {2147483, 21, 2002ms}, {5000000, 50, 4902ms},
+        {0, 1000, 2s}, {-5, 1000, 2s}, {3000000, 0, 0us}, {4294967, 1000, 2s}, {536870912, 1000, 2s},
+    };
+    // clang-format on
     for (const auto& [waitTime, passes, total] : rows) {
         zemPollPlan plan(waitTime);
         std::chrono::microseconds slept(0);

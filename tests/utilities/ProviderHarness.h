@@ -19,7 +19,6 @@ struct Script {
     bool instanceClass = true, associationClass = false, methodClass = true;
     bool indicationClass = true, staticMethod = false;
     std::vector<std::string> keys = {"Name"};
-    std::vector<std::string> methodArgs;
     std::string argsOf;  ///< class and method whose arguments were asked for
     std::string bundle;
     std::string name;  ///< "Name" of the instances it returns, where that is not the path's
@@ -46,8 +45,7 @@ public:
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {
         script.argsOf = std::string(className) + "." + method;
-        for (const std::string& name : script.methodArgs)
-            args.addElement(new zemString(name.c_str()));
+        args.addElement(new zemString("Reason"));
     }
     const char* getMessageBundlePath() override { return script.bundle.c_str(); }
 };

@@ -1,6 +1,7 @@
 /// Tools for a test: scripts of its own ahead of the real ones, and what they left behind.
 #pragma once
 
+#include <gtest/gtest.h>
 #include <poll.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -46,6 +47,29 @@ public:
         return testing_support::contents(file(name));
     }
 };
+
+/// What an operation prints, and the line of its tool in that.
+struct LoggedCall {
+    std::string log;
+    std::string line;
+};
+
+/// Runs @p operation, whose tool prints @p output, and holds what the tool receives against what
+/// the shell makes of the line that is logged: to it, these lines mean the same.
+inline LoggedCall logged(const std::string& tool, const std::string& output,
+                         const std::function<void()>& operation) {
+    ToolFolder tools;
+    tools.recorder(tool, output);
+    testing::internal::CaptureStdout();
+    EXPECT_NO_THROW(operation());
+    const std::string log = testing::internal::GetCapturedStdout();
+    const size_t begin = log.find(tool + ' ');
+    const std::string line = log.substr(begin, log.find('\n', begin) - begin);
+    const std::string received = tools.read("argv");
+    tools.run(line);
+    EXPECT_EQ(tools.read("argv"), received) << line;
+    return {log, line};
+}
 
 /// Reads a stream, blocking or not, to its end and closes it.
 inline std::string readAll(FILE* stream) {

@@ -7,7 +7,6 @@
 #include <strings.h>
 
 #include <cstdlib>
-#include <memory>
 #include <string>
 
 #include "BaseZemInstanceProvider.h"
@@ -128,7 +127,7 @@ protected:
             const zemApiObjects systems(
                 m_system.oneReader,
                 (zemApiCaller().*m_system.one)(getUserContext(context), name.c_str(), kLevel));
-            fill(out, properties, systems.only(name.c_str()));
+            out = makeInstance(path, properties, systems.only(name.c_str()));
         } catch (const zemException& e) {
             if (!isUnknownSystem(e)) throw;
             return -1;
@@ -138,29 +137,22 @@ protected:
 
     void enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
                            zemDynamicArray<CmpiObjectPath>& out, const CmpiObjectPath&) override {
-        for (apiProp& system : all(context)) {
-            out.addElement(new CmpiObjectPath(systemPath(path, system)));
-        }
+        for (apiProp& system : all(context))
+            out.addElement(new CmpiObjectPath(systemPath(path, m_system.name, nameOf(system))));
     }
 
     void enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                        const char** properties, zemDynamicArray<CmpiInstance>& out,
                        const CmpiObjectPath&) override {
-        for (apiProp& system : all(context)) {
-            auto instance = std::make_unique<CmpiInstance>(systemPath(path, system));
-            fill(*instance, properties, system);
-            out.addElement(instance.release());
-        }
+        for (apiProp& system : all(context))
+            out.addElement(new CmpiInstance(makeInstance(path, properties, system)));
     }
 
     CMPIBoolean isValidInstanceClass(const char* className) override {
-        return strcasecmp(className, m_system.name) == 0;
+        return compareClassNames(className, m_system.name);
     }
 
-    void populateEssentialKeys(const char*, CmpiArray& keys) override {
-        keys[0] = CmpiData("CreationClassName");
-        keys[1] = CmpiData("Name");
-    }
+    void populateEssentialKeys(const char*, CmpiArray& keys) override { listSystemKeys(keys); }
 
 private:
     zemApiObjects all(const CmpiContext& context) {
@@ -168,14 +160,12 @@ private:
                 (zemApiCaller().*m_system.all)(getUserContext(context), kLevel)};
     }
 
-    CmpiObjectPath systemPath(const CmpiObjectPath& near, apiProp& system) {
-        CmpiObjectPath path = createObjectPath(near, m_system.name);
-        path.setKey("CreationClassName", CmpiData(m_system.name));
-        path.setKey("Name", CmpiData(zemApiProp(&system).getProperty("Name")));
-        return path;
+    static std::string nameOf(apiProp& system) {
+        return std::string(zemApiProp(&system).getProperty("Name"));
     }
 
-    void fill(CmpiInstance& instance, const char** properties, apiProp& system) {
+    CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
+                              apiProp& system) {
         const zemApiProp object(&system);
         zemRecordType record(static_cast<unsigned>(m_rows.size()));
         for (const PropertyRow& row : m_rows) {
@@ -183,28 +173,23 @@ private:
             const zemString value = object.getProperty(field.key);
             record.insert(row.attribute, field.words(static_cast<const char*>(value)).c_str());
         }
-        instance.setProperty("CreationClassName", CmpiData(m_system.name));
-        instance.setProperty("Name", CmpiData(object.getProperty("Name")));
+        CmpiInstance instance = systemInstance(near, m_system.name, nameOf(system));
         setProperties(instance, m_rows, properties, record);
+        return instance;
     }
 
     const SystemClass& m_system;
     std::vector<PropertyRow> m_rows;  ///< the fields, each with its own index as attribute
 };
 
-class ApiHostProvider : public ApiSystemProvider {
+template <const SystemClass& (*system)()>
+class ApiProviderOf : public ApiSystemProvider {
 public:
-    ApiHostProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), ApiSystemProvider(mb, ctx, name, hostClass()) {}
-};
-
-class ApiPartitionProvider : public ApiSystemProvider {
-public:
-    ApiPartitionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), ApiSystemProvider(mb, ctx, name, partitionClass()) {}
+    ApiProviderOf(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), ApiSystemProvider(mb, ctx, name, system()) {}
 };
 
 }  // namespace
 
-ZEM_PROVIDER(ORXC_ApiHostProvider, ApiHostProvider)
-ZEM_PROVIDER(ORXC_ApiPartitionProvider, ApiPartitionProvider)
+ZEM_PROVIDER(ORXC_ApiHostProvider, ApiProviderOf<hostClass>)
+ZEM_PROVIDER(ORXC_ApiPartitionProvider, ApiProviderOf<partitionClass>)

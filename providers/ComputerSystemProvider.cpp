@@ -13,12 +13,6 @@ constexpr const char kStateChange[] = "RequestStateChange";
 constexpr CMPIUint16 kRequestableStates[] = {2, 3, 4, 6, 7, 8, 9, 10, 11};
 constexpr CMPIUint32 kNotSupported = 1, kTimeoutNotSupported = 4098;
 
-CmpiData uint32(CMPIUint32 value) {
-    CmpiData data;
-    data.setUint32(value);
-    return data;
-}
-
 /// Whether the client limits the time that a change may take.
 bool hasTimeout(const CmpiArgs& in) {
     CmpiData limit;
@@ -52,7 +46,7 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
         find(tool, name.charPtr(), attributesFor(m_rows, m_identity, properties).data(),
              [&](const std::string& foundName, const zemRecordType& record) {
                  found = std::make_unique<CmpiInstance>(
-                     systemInstance(path, properties, foundName, record));
+                     makeInstance(path, properties, foundName, record));
              });
     }
     if (!found) throwObjectNotFoundExc("getInstance", m_className, objectPathToString(path));
@@ -63,20 +57,20 @@ void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, Cm
                                                   const CmpiObjectPath& path,
                                                   const char** properties) {
     zemQyplatCmdCaller tool = toolFor(clientOf(context));
-    walk(tool, attributesFor(m_rows, m_identity, properties).data(),
-         [&](const std::string& name, const zemRecordType& record) {
-             result.returnData(systemInstance(path, properties, name, record));
-         });
+    readAll(tool, attributesFor(m_rows, m_identity, properties).data(),
+            [&](const std::string& name, const zemRecordType& record) {
+                result.returnData(makeInstance(path, properties, name, record));
+            });
 }
 
 void ComputerSystemProvider::performEnumInstanceNames(const CmpiContext& context,
                                                       CmpiResult& result,
                                                       const CmpiObjectPath& path) {
     zemQyplatCmdCaller tool = toolFor(clientOf(context));
-    walk(tool, attributesFor({}, m_identity, nullptr).data(),
-         [&](const std::string& name, const zemRecordType&) {
-             result.returnData(systemPath(path, name));
-         });
+    readAll(tool, attributesFor({}, m_identity, nullptr).data(),
+            [&](const std::string& name, const zemRecordType&) {
+                result.returnData(systemPath(path, m_className, name));
+            });
 }
 
 void ComputerSystemProvider::performSetInstance(const CmpiContext& context, CmpiResult&,
@@ -110,15 +104,15 @@ void ComputerSystemProvider::performInvokeMethod(const CmpiContext& context, Cmp
     if (std::find(std::begin(kRequestableStates), end, state) == end)
         throwInvalidMethodArgValueExc("RequestedState", cmpidata2String(asked), method);
     if (hasTimeout(in)) {
-        result.returnData(uint32(kTimeoutNotSupported));
+        result.returnData(methodResult(kTimeoutNotSupported));
         return;
     }
     const CmpiString name = getKeyBinding(path, "Name").getString();
-    result.returnData(uint32(requestState(clientOf(context), name.charPtr(), state)));
+    result.returnData(methodResult(requestState(clientOf(context), name.charPtr(), state)));
 }
 
 CMPIBoolean ComputerSystemProvider::isValidInstanceClass(const char* className) {
-    return strcasecmp(className, m_className) == 0;
+    return compareClassNames(className, m_className);
 }
 
 CMPIBoolean ComputerSystemProvider::isValidMethodClass(const char* className) {
@@ -126,8 +120,7 @@ CMPIBoolean ComputerSystemProvider::isValidMethodClass(const char* className) {
 }
 
 void ComputerSystemProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
-    keys[0] = CmpiData("CreationClassName");
-    keys[1] = CmpiData("Name");
+    listSystemKeys(keys);
 }
 
 void ComputerSystemProvider::populateMethodArgs(const char*, zemDynamicArray<zemString>& args,
@@ -136,8 +129,6 @@ void ComputerSystemProvider::populateMethodArgs(const char*, zemDynamicArray<zem
     args.addElement(new zemString("RequestedState"));
     args.addElement(new zemString("TimeoutPeriod"));
 }
-
-const char* ComputerSystemProvider::getMessageBundlePath() { return ""; }
 
 bool ComputerSystemProvider::isChangeable(const char*) const { return false; }
 
@@ -148,7 +139,14 @@ CMPIUint32 ComputerSystemProvider::requestState(const Client&, const std::string
     return kNotSupported;
 }
 
-void ComputerSystemProvider::complete(CmpiInstance&, const std::string&, const char**) {}
+void ComputerSystemProvider::find(zemQyplatCmdCaller& tool, const std::string& name,
+                                  int* attributes, const Sink& sink) {
+    try {
+        read(tool, name, attributes, sink);
+    } catch (const zemException& e) {
+        if (!isUnknownObject(e)) throw;
+    }
+}
 
 ComputerSystemProvider::Client ComputerSystemProvider::clientOf(const CmpiContext& context) {
     return {getUserContext(context), getExternalLanguageName(context)};
@@ -158,22 +156,16 @@ zemQyplatCmdCaller ComputerSystemProvider::toolFor(const Client& client) {
     return zemQyplatCmdCaller(client.user, client.locale);
 }
 
-CmpiObjectPath ComputerSystemProvider::systemPath(const CmpiObjectPath& near,
-                                                  const std::string& name) {
-    CmpiObjectPath path = createObjectPath(near, m_className);
-    path.setKey("CreationClassName", CmpiData(m_className));
-    path.setKey("Name", CmpiData(name.c_str()));
-    return path;
+CmpiData ComputerSystemProvider::methodResult(CMPIUint32 value) {
+    CmpiData data;
+    data.setUint32(value);
+    return data;
 }
 
-CmpiInstance ComputerSystemProvider::systemInstance(const CmpiObjectPath& near,
-                                                    const char** properties,
-                                                    const std::string& name,
-                                                    const zemRecordType& record) {
-    CmpiInstance instance(systemPath(near, name));
-    instance.setProperty("CreationClassName", CmpiData(m_className));
-    instance.setProperty("Name", CmpiData(name.c_str()));
+CmpiInstance ComputerSystemProvider::makeInstance(const CmpiObjectPath& near,
+                                                  const char** properties, const std::string& name,
+                                                  const zemRecordType& record) {
+    CmpiInstance instance = systemInstance(near, m_className, name);
     setProperties(instance, m_rows, properties, record);
-    complete(instance, name, properties);
     return instance;
 }

@@ -1,7 +1,7 @@
 /// What the providers of hosts and partitions share: a CIM_ComputerSystem read from qyplat.
 ///
 /// A subclass names its class and the rows that turn tool attributes into CIM properties, and says
-/// how to find one system and how to walk all. The tool runs under the client's user and in the
+/// how to read one system and how to read all. The tool runs under the client's user and in the
 /// client's language, and is asked only for the attributes that the wanted properties need.
 ///
 /// A modification changes what the subclass can change; of the rest it may only repeat what is
@@ -36,15 +36,15 @@ protected:
                            const char* className, std::vector<PropertyRow> rows,
                            Attributes identity);
 
-    /// Hands the system with this Name to @p sink; a Name that no system can have, or that none
-    /// has, leaves the sink uncalled.
+    /// Hands the system with this Name to @p sink; a Name that no system can have leaves the sink
+    /// uncalled. What the tool says of a Name that none has is find()'s business.
     /// @param attributes  those to ask the tool for, closed by ATTR_END
-    virtual void find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+    virtual void read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
                       const Sink& sink) = 0;
     /// Hands every system to @p sink.
-    virtual void walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) = 0;
-    /// Adds what follows from the Name alone.
-    virtual void complete(CmpiInstance& instance, const std::string& name, const char** properties);
+    virtual void readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) = 0;
+    /// As read(); a Name that no system has leaves the sink uncalled, too.
+    void find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes, const Sink& sink);
 
     /// Whether change() can change the property.
     virtual bool isChangeable(const char* property) const;
@@ -57,8 +57,7 @@ protected:
 
     static Client clientOf(const CmpiContext& context);
     static zemQyplatCmdCaller toolFor(const Client& client);
-    /// Path of the system with this Name, in the namespace of @p near.
-    CmpiObjectPath systemPath(const CmpiObjectPath& near, const std::string& name);
+    static CmpiData methodResult(CMPIUint32 value);
 
     // the frame's hooks
     CmpiInstance performGetInstance(const CmpiContext& context, const CmpiObjectPath& path,
@@ -78,15 +77,15 @@ protected:
     void populateEssentialKeys(const char* className, CmpiArray& keys) override;
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override;
-    const char* getMessageBundlePath() override;
-
-private:
-    CmpiInstance systemInstance(const CmpiObjectPath& near, const char** properties,
-                                const std::string& name, const zemRecordType& record);
 
     const char* const m_className;
+
+private:
+    CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
+                              const std::string& name, const zemRecordType& record);
+
     const std::vector<PropertyRow> m_rows;
-    const Attributes m_identity;  ///< what find and walk need to form the Name
+    const Attributes m_identity;  ///< what it takes to form the Name
 };
 
 #endif

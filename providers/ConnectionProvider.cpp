@@ -1,7 +1,5 @@
 #include "ConnectionProvider.h"
 
-#include <strings.h>
-
 #include <memory>
 
 #include "PropertyRows.h"
@@ -32,6 +30,19 @@ std::string idOf(const zemRecordType& link) {
            ":" + static_cast<const char*>(link[Link::ATTR_SP]);
 }
 
+/// The connections of a host; null: of all.
+zemRecordSetsType readLinks(const CmpiContext& context, const char** properties, const char* host) {
+    zemQylinkCmdCaller tool(zemBaseProvider::getUserContext(context),
+                            zemBaseProvider::getExternalLanguageName(context));
+    return tool.getQylinkInformation(attributesFor(kRows, kIdentity, properties).data(), host);
+}
+
+CmpiObjectPath connectionPath(const CmpiObjectPath& near, const std::string& id) {
+    CmpiObjectPath path = zemBaseProvider::createObjectPath(near, kClass);
+    path.setKey("InstanceID", CmpiData(id.c_str()));
+    return path;
+}
+
 }  // namespace
 
 ConnectionProvider::ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx,
@@ -51,10 +62,8 @@ int ConnectionProvider::getInstance(const CmpiContext& context, const CmpiObject
     const std::string id = getKeyBinding(path, "InstanceID").getString().charPtr();
     const std::string host = hostOf(id);
     if (host.empty()) return -1;
-    zemQylinkCmdCaller tool(getUserContext(context), getExternalLanguageName(context));
     try {
-        const zemRecordSetsType links = tool.getQylinkInformation(
-            attributesFor(kRows, kIdentity, properties).data(), host.c_str());
+        const zemRecordSetsType links = readLinks(context, properties, host.c_str());
         for (int i = 0; i < links.size(); ++i) {
             if (idOf(*links[i]) != id) continue;
             out.setProperty("InstanceID", CmpiData(id.c_str()));
@@ -70,9 +79,8 @@ int ConnectionProvider::getInstance(const CmpiContext& context, const CmpiObject
 void ConnectionProvider::enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
                                            zemDynamicArray<CmpiObjectPath>& out,
                                            const CmpiObjectPath&) {
-    zemQylinkCmdCaller tool(getUserContext(context), getExternalLanguageName(context));
-    const zemRecordSetsType links =
-        tool.getQylinkInformation(attributesFor({}, kIdentity, nullptr).data(), nullptr);
+    static const char* justTheKey[] = {"InstanceID", nullptr};
+    const zemRecordSetsType links = readLinks(context, justTheKey, nullptr);
     for (int i = 0; i < links.size(); ++i)
         out.addElement(new CmpiObjectPath(connectionPath(path, idOf(*links[i]))));
 }
@@ -80,9 +88,7 @@ void ConnectionProvider::enumInstanceNames(const CmpiContext& context, const Cmp
 void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                                        const char** properties, zemDynamicArray<CmpiInstance>& out,
                                        const CmpiObjectPath&) {
-    zemQylinkCmdCaller tool(getUserContext(context), getExternalLanguageName(context));
-    const zemRecordSetsType links =
-        tool.getQylinkInformation(attributesFor(kRows, kIdentity, properties).data(), nullptr);
+    const zemRecordSetsType links = readLinks(context, properties, nullptr);
     for (int i = 0; i < links.size(); ++i) {
         const std::string id = idOf(*links[i]);
         auto instance = std::make_unique<CmpiInstance>(connectionPath(path, id));
@@ -93,18 +99,11 @@ void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObj
 }
 
 CMPIBoolean ConnectionProvider::isValidInstanceClass(const char* className) {
-    return strcasecmp(className, kClass) == 0;
+    return compareClassNames(className, kClass);
 }
 
 void ConnectionProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
     keys[0] = CmpiData("InstanceID");
-}
-
-CmpiObjectPath ConnectionProvider::connectionPath(const CmpiObjectPath& near,
-                                                  const std::string& id) {
-    CmpiObjectPath path = createObjectPath(near, kClass);
-    path.setKey("InstanceID", CmpiData(id.c_str()));
-    return path;
 }
 
 ZEM_PROVIDER(ORXC_HostConnectionProvider, ConnectionProvider)

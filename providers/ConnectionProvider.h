@@ -32,9 +32,6 @@ protected:
                        const CmpiObjectPath& asked) override;
     CMPIBoolean isValidInstanceClass(const char* className) override;
     void populateEssentialKeys(const char* className, CmpiArray& keys) override;
-
-private:
-    CmpiObjectPath connectionPath(const CmpiObjectPath& near, const std::string& id);
 };
 
 #endif

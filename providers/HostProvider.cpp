@@ -1,7 +1,9 @@
-#include "HostProvider.h"
-
+/// ORXC_CEC_CS: the managed hosts of the appliance. Name is <type_model>*<serial_num>.
+///
+/// The static method FindHost answers the path of the host that users know by a name.
 #include <strings.h>
 
+#include "ComputerSystemProvider.h"
 #include "ProviderFactories.h"
 
 namespace {
@@ -34,59 +36,61 @@ const std::vector<PropertyRow> kRows = {
 
 constexpr const char kFindHost[] = "FindHost";
 
+class HostProvider : public ComputerSystemProvider {
+public:
+    HostProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          ComputerSystemProvider(mb, ctx, name, "ORXC_CEC_CS", kRows,
+                                 {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM}) {}
+
+protected:
+    void read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+              const Sink& sink) override {
+        if (isHostName(name)) readHosts(tool, name.c_str(), attributes, sink);
+    }
+
+    void readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) override {
+        readHosts(tool, nullptr, attributes, sink);
+    }
+
+    void performInvokeMethod(const CmpiContext& context, CmpiResult& result,
+                             const CmpiObjectPath& path, const char* method, const CmpiArgs& in,
+                             CmpiArgs& out) override {
+        if (strcasecmp(method, kFindHost) != 0) {
+            ComputerSystemProvider::performInvokeMethod(context, result, path, method, in, out);
+            return;
+        }
+        const CmpiString wanted = getParmVal(in, "ElementName").getString();
+        int attributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_NAME,
+                            Host::ATTR_END};
+        zemQyplatCmdCaller tool = toolFor(clientOf(context));
+        std::string found;
+        readAll(tool, attributes, [&](const std::string& name, const zemRecordType& host) {
+            if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;
+        });
+        if (found.empty()) throwObjectNotFoundExc(kFindHost, m_className, wanted.charPtr());
+        out.setArg("Host", CmpiData(systemPath(path, m_className, found)));
+        result.returnData(methodResult(0));
+    }
+
+    CMPIBoolean isStaticMethod(const char*, const char* method) override {
+        return strcasecmp(method, kFindHost) == 0;
+    }
+
+    void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
+                            const char* method) override {
+        ComputerSystemProvider::populateMethodArgs(className, args, method);
+        if (strcasecmp(method, kFindHost) == 0) args.addElement(new zemString("ElementName"));
+    }
+
+private:
+    static void readHosts(zemQyplatCmdCaller& tool, const char* host, int* attributes,
+                          const Sink& sink) {
+        const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, host);
+        for (int i = 0; i < hosts.size(); ++i) sink(hostName(*hosts[i]), *hosts[i]);
+    }
+};
+
 }  // namespace
-
-HostProvider::HostProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-    : CmpiBaseMI(mb, ctx),
-      ComputerSystemProvider(mb, ctx, name, "ORXC_CEC_CS", kRows,
-                             {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM}) {}
-
-void HostProvider::find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
-                        const Sink& sink) {
-    if (!isHostName(name)) return;
-    try {
-        const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, name.c_str());
-        if (hosts.size() == 1) sink(hostName(*hosts[0]), *hosts[0]);
-    } catch (const zemException& e) {
-        if (!isUnknownObject(e)) throw;
-    }
-}
-
-void HostProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
-    const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, nullptr);
-    for (int i = 0; i < hosts.size(); ++i) sink(hostName(*hosts[i]), *hosts[i]);
-}
-
-void HostProvider::performInvokeMethod(const CmpiContext& context, CmpiResult& result,
-                                       const CmpiObjectPath& path, const char* method,
-                                       const CmpiArgs& in, CmpiArgs& out) {
-    if (strcasecmp(method, kFindHost) != 0) {
-        ComputerSystemProvider::performInvokeMethod(context, result, path, method, in, out);
-        return;
-    }
-    const CmpiString wanted = getParmVal(in, "ElementName").getString();
-    int attributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_NAME,
-                        Host::ATTR_END};
-    zemQyplatCmdCaller tool = toolFor(clientOf(context));
-    std::string found;
-    walk(tool, attributes, [&](const std::string& name, const zemRecordType& host) {
-        if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;
-    });
-    if (found.empty()) throwObjectNotFoundExc(kFindHost, "ORXC_CEC_CS", wanted.charPtr());
-    out.setArg("Host", CmpiData(systemPath(path, found)));
-    CmpiData completed;
-    completed.setUint32(0);
-    result.returnData(completed);
-}
-
-CMPIBoolean HostProvider::isStaticMethod(const char*, const char* method) {
-    return strcasecmp(method, kFindHost) == 0;
-}
-
-void HostProvider::populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
-                                      const char* method) {
-    ComputerSystemProvider::populateMethodArgs(className, args, method);
-    if (strcasecmp(method, kFindHost) == 0) args.addElement(new zemString("ElementName"));
-}
 
 ZEM_PROVIDER(ORXC_CEC_CSProvider, HostProvider)

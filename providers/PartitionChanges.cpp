@@ -8,7 +8,6 @@
 #include "EdsuspCaller.h"
 #include "NwplatCmdCaller.h"
 #include "PartitionProvider.h"
-#include "PartitionRows.h"
 #include "SystemConfig.h"
 
 namespace {
@@ -17,40 +16,34 @@ using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using New = zemNwplatCmdCaller::PartitionAttribute;
 
 /// What a client may say of a partition that is to be made.
-struct CreationRow {
-    const char* property;
-    int attribute;
-};
-
-constexpr CreationRow kCreation[] = {
-    {"ElementName", New::ATTR_NAME},
-    {"DefaultProfile", New::ATTR_PROFILE_NAME},
-    {"LparEnvironment", New::ATTR_LPAR_ENV},
-    {"BootMode", New::ATTR_BOOT_MODE},
-    {"AutoStart", New::ATTR_AUTO_START},
-    {"AllowPerfCollection", New::ATTR_ALLOW_PERF_COLLECTION},
-    {"DesiredProcCompatMode", New::ATTR_LPAR_PROC_COMPAT_MODE},
-    {"MemoryMode", New::ATTR_MEM_MODE},
-    {"MinMemory", New::ATTR_MIN_MEM},
-    {"DesiredMemory", New::ATTR_DESIRED_MEM},
-    {"MaxMemory", New::ATTR_MAX_MEM},
-    {"ProcessorMode", New::ATTR_PROC_MODE},
-    {"SharingMode", New::ATTR_SHARING_MODE},
-    {"UncappedWeight", New::ATTR_UNCAP_WEIGHT},
-    {"MinProcessors", New::ATTR_MIN_PROCS},
-    {"DesiredProcessors", New::ATTR_DESIRED_PROCS},
-    {"MaxProcessors", New::ATTR_MAX_PROCS},
-    {"MinProcessingUnits", New::ATTR_MIN_PROC_UNITS},
-    {"DesiredProcessingUnits", New::ATTR_DESIRED_PROC_UNITS},
-    {"MaxProcessingUnits", New::ATTR_MAX_PROC_UNITS},
-    {"MaxVirtualSlots", New::ATTR_MAX_VIRTUAL_SLOTS},
+constexpr PropertyRow kCreation[] = {
+    {"ElementName", ValueKind::Text, New::ATTR_NAME},
+    {"DefaultProfile", ValueKind::Text, New::ATTR_PROFILE_NAME},
+    {"LparEnvironment", ValueKind::Text, New::ATTR_LPAR_ENV},
+    {"BootMode", ValueKind::Text, New::ATTR_BOOT_MODE},
+    {"AutoStart", ValueKind::Flag, New::ATTR_AUTO_START},
+    {"AllowPerfCollection", ValueKind::Flag, New::ATTR_ALLOW_PERF_COLLECTION},
+    {"DesiredProcCompatMode", ValueKind::Text, New::ATTR_LPAR_PROC_COMPAT_MODE},
+    {"MemoryMode", ValueKind::Text, New::ATTR_MEM_MODE},
+    {"MinMemory", ValueKind::Uint32, New::ATTR_MIN_MEM},
+    {"DesiredMemory", ValueKind::Uint32, New::ATTR_DESIRED_MEM},
+    {"MaxMemory", ValueKind::Uint32, New::ATTR_MAX_MEM},
+    {"ProcessorMode", ValueKind::Text, New::ATTR_PROC_MODE},
+    {"SharingMode", ValueKind::Text, New::ATTR_SHARING_MODE},
+    {"UncappedWeight", ValueKind::Uint16, New::ATTR_UNCAP_WEIGHT},
+    {"MinProcessors", ValueKind::Uint32, New::ATTR_MIN_PROCS},
+    {"DesiredProcessors", ValueKind::Uint32, New::ATTR_DESIRED_PROCS},
+    {"MaxProcessors", ValueKind::Uint32, New::ATTR_MAX_PROCS},
+    {"MinProcessingUnits", ValueKind::Hundredths, New::ATTR_MIN_PROC_UNITS},
+    {"DesiredProcessingUnits", ValueKind::Hundredths, New::ATTR_DESIRED_PROC_UNITS},
+    {"MaxProcessingUnits", ValueKind::Hundredths, New::ATTR_MAX_PROC_UNITS},
+    {"MaxVirtualSlots", ValueKind::Uint16, New::ATTR_MAX_VIRTUAL_SLOTS},
 };
 
 struct ChangeRow {
     const char* property;
     int (zemVirtualSystem::*set)(const zemString& value);
-    bool isItem;  ///< the value goes into an attribute list, not into an option of
-                  ///< its own
+    bool isItem;  ///< the value goes into an attribute list, not into an option of its own
 };
 
 const ChangeRow kChanges[] = {
@@ -148,7 +141,7 @@ void PartitionProvider::addCreationPairs(const CmpiInstance& instance,
             validateCannotSpecifiedProperty(instance, said);
             continue;
         }
-        const std::string text = toolText(rowOf(partitionRows(), said)->kind, value);
+        const std::string text = toolText(row->kind, value);
         pairs.addElement(new tagAttributePair{row->attribute, text.c_str()});
     }
 }
@@ -158,9 +151,9 @@ void PartitionProvider::performCreateInstance(const CmpiContext& context, CmpiRe
                                               const CmpiInstance& instance) {
     const std::string name = instance.getProperty("Name").getString().charPtr();
     const bool anyNumber = !name.empty() && name.front() == '*';
-    PartitionName key;
-    if (!splitPartitionName(anyNumber ? "0" + name : name, key))
-        throwInvalidKeyExc("createInstance", kPartitionClass, "Name");
+    Key key;
+    if (!split(anyNumber ? "0" + name : name, key))
+        throwInvalidKeyExc("createInstance", m_className, "Name");
 
     const Client client = clientOf(context);
     zemQyplatCmdCaller tool = toolFor(client);
@@ -180,15 +173,15 @@ void PartitionProvider::performCreateInstance(const CmpiContext& context, CmpiRe
         const CmpiString elementName = getPropVal(instance, "ElementName").getString();
         key.id = idOfName(tool, key.host, elementName.charPtr());
     }
-    result.returnData(systemPath(path, key.id + "*" + key.host));
+    result.returnData(systemPath(path, m_className, key.id + "*" + key.host));
 }
 
 void PartitionProvider::performDeleteInstance(const CmpiContext& context, CmpiResult&,
                                               const CmpiObjectPath& path) {
     static const char* justTheKey[] = {"Name", nullptr};
     performGetInstance(context, path, justTheKey);
-    PartitionName key;
-    splitPartitionName(getKeyBinding(path, "Name").getString().charPtr(), key);
+    Key key;
+    split(getKeyBinding(path, "Name").getString().charPtr(), key);
     const Client client = clientOf(context);
     zemHostSystem(key.host.c_str(), client.user, client.locale)
         .destoryVirtualSystem(key.id.c_str());
@@ -200,8 +193,8 @@ bool PartitionProvider::isChangeable(const char* property) const {
 
 void PartitionProvider::change(const Client& client, const std::string& name, const char* property,
                                const std::string& value) {
-    PartitionName key;
-    splitPartitionName(name, key);
+    Key key;
+    split(name, key);
     const ChangeRow& row = *rowOf(kChanges, property);
     zemVirtualSystem partition(key.id.c_str(),
                                zemHostSystem(key.host.c_str(), client.user, client.locale),
@@ -228,8 +221,8 @@ CMPIUint32 PartitionProvider::requestState(const Client& client, const std::stri
         [&](const Transition& t) { return t.requested == state && present == t.from; });
     if (row == std::end(kTransitions)) return kInvalidTransition;
 
-    PartitionName key;
-    splitPartitionName(name, key);
+    Key key;
+    split(name, key);
     if (row->tool == Transition::Suspend) {
         EdsuspCaller suspend(client.user, client.locale);
         suspend.setManagedSystem(key.host.c_str());

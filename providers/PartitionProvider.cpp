@@ -1,17 +1,61 @@
 // Reading of ORXC_LPAR_CS; what changes partitions stands in PartitionChanges.cpp.
 #include "PartitionProvider.h"
 
+#include <algorithm>
 #include <map>
 
-#include "PartitionRows.h"
 #include "ProviderFactories.h"
 
 namespace {
 
 using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
-
 using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
+
+/// Added to attributes of a profile, to tell them from those of a partition.
+constexpr int kOfProfile = 1000;
+/// No attribute of a tool, but known from the query.
+constexpr int kHostOfPartition = 2000;
+
+const std::vector<PropertyRow> kRows = {
+    {"ElementName", ValueKind::Text, Partition::ATTR_NAME},
+    {"Caption", ValueKind::Text, Partition::ATTR_NAME},
+    {"EnabledState", ValueKind::EnabledState, Partition::ATTR_STATE},
+    {"OperationalStatus", ValueKind::Status, Partition::ATTR_STATE},
+    {"LparID", ValueKind::Uint16, Partition::ATTR_LPAR_ID},
+    {"HostName", ValueKind::Text, kHostOfPartition},
+    {"State", ValueKind::Text, Partition::ATTR_STATE},
+    {"LparEnvironment", ValueKind::Text, Partition::ATTR_LPAR_ENV},
+    {"OSVersion", ValueKind::Text, Partition::ATTR_OS_VERSION},
+    {"LogicalSerialNumber", ValueKind::Text, Partition::ATTR_LOGICAL_SERIAL_NUM},
+    {"DefaultProfile", ValueKind::Text, Partition::ATTR_DEFAULT_PROFILE},
+    {"CurrentProfile", ValueKind::Text, Partition::ATTR_CURR_PROFILE},
+    {"ResourceConfig", ValueKind::Uint16, Partition::ATTR_RESOURCE_CONFIG},
+    {"BootMode", ValueKind::Text, Partition::ATTR_BOOT_MODE},
+    {"Keylock", ValueKind::Text, Partition::ATTR_LPAR_KEYLOCK},
+    {"AutoStart", ValueKind::Flag, Partition::ATTR_AUTO_START},
+    {"DesiredProcCompatMode", ValueKind::Text, Partition::ATTR_DESIRED_LPAR_PROC_COMPAT_MODE},
+    {"CurrentProcCompatMode", ValueKind::Text, Partition::ATTR_CURR_LPAR_PROC_COMPAT_MODE},
+    {"AllowPerfCollection", ValueKind::Flag, Partition::ATTR_ALLOW_PERF_COLLECTION},
+    {"SuspendCapable", ValueKind::Flag, Partition::ATTR_SUSPEND_CAPABLE},
+    {"RemoteRestartCapable", ValueKind::Flag, Partition::ATTR_REMOTE_RESTART_CAPABLE},
+    {"RemoteRestartStatus", ValueKind::Text, Partition::ATTR_REMOTE_RESTART_STATUS},
+    {"MemoryMode", ValueKind::Text, kOfProfile + Profile::ATTR_MEM_MODE},
+    {"MinMemory", ValueKind::Uint32, kOfProfile + Profile::ATTR_MIN_MEM},
+    {"DesiredMemory", ValueKind::Uint32, kOfProfile + Profile::ATTR_DESIRED_MEM},
+    {"MaxMemory", ValueKind::Uint32, kOfProfile + Profile::ATTR_MAX_MEM},
+    {"ProcessorMode", ValueKind::Text, kOfProfile + Profile::ATTR_PROC_MODE},
+    {"SharingMode", ValueKind::Text, kOfProfile + Profile::ATTR_SHARING_MODE},
+    {"UncappedWeight", ValueKind::Uint16, kOfProfile + Profile::ATTR_UNCAP_WEIGHT},
+    {"MinProcessors", ValueKind::Uint32, kOfProfile + Profile::ATTR_MIN_PROCS},
+    {"DesiredProcessors", ValueKind::Uint32, kOfProfile + Profile::ATTR_DESIRED_PROCS},
+    {"MaxProcessors", ValueKind::Uint32, kOfProfile + Profile::ATTR_MAX_PROCS},
+    {"MinProcessingUnits", ValueKind::Hundredths, kOfProfile + Profile::ATTR_MIN_PROC_UNITS},
+    {"DesiredProcessingUnits", ValueKind::Hundredths,
+     kOfProfile + Profile::ATTR_DESIRED_PROC_UNITS},
+    {"MaxProcessingUnits", ValueKind::Hundredths, kOfProfile + Profile::ATTR_MAX_PROC_UNITS},
+    {"MaxVirtualSlots", ValueKind::Uint16, kOfProfile + Profile::ATTR_MAX_VIRTUAL_SLOTS},
+};
 
 /// Profiles by the ID of their partition and their name.
 using Profiles = std::map<std::pair<std::string, std::string>, const zemRecordType*>;
@@ -20,7 +64,9 @@ using Profiles = std::map<std::pair<std::string, std::string>, const zemRecordTy
 struct Needs {
     explicit Needs(const int* attributes) {
         for (; *attributes != Partition::ATTR_END; ++attributes)
-            (*attributes < kOfProfile ? partition : profile).push_back(*attributes % kOfProfile);
+            if (*attributes != kHostOfPartition)
+                (*attributes < kOfProfile ? partition : profile)
+                    .push_back(*attributes % kOfProfile);
         ofProfile = profile;
         if (!profile.empty()) {
             partition.push_back(Partition::ATTR_DEFAULT_PROFILE);
@@ -73,8 +119,8 @@ void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& h
                 partition.insert(kOfProfile + key,
                                  found == profiles.end() ? zemString() : (*found->second)[key]);
         }
-        std::string name = id;
-        sink(name.append("*").append(host), partition);
+        partition.insert(kHostOfPartition, host.c_str());
+        sink(std::string(id).append("*").append(host), partition);
     }
 }
 
@@ -82,22 +128,24 @@ void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& h
 
 PartitionProvider::PartitionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
     : CmpiBaseMI(mb, ctx),
-      ComputerSystemProvider(mb, ctx, name, kPartitionClass, partitionRows(),
-                             {Partition::ATTR_LPAR_ID}) {}
+      ComputerSystemProvider(mb, ctx, name, "ORXC_LPAR_CS", kRows, {Partition::ATTR_LPAR_ID}) {}
 
-void PartitionProvider::find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
-                             const Sink& sink) {
-    PartitionName key;
-    if (!splitPartitionName(name, key)) return;
-    Needs needs(attributes);
-    try {
-        readPartitions(tool, needs, key.host, ("\"lpar_ids=" + key.id + "\"").c_str(), sink);
-    } catch (const zemException& e) {
-        if (!isUnknownObject(e)) throw;
-    }
+bool PartitionProvider::split(const std::string& name, Key& key) {
+    const std::size_t star = std::min(name.find('*'), name.size());
+    key.id = name.substr(0, star);
+    key.host = star < name.size() ? name.substr(star + 1) : "";
+    return zemString(key.id.c_str()).isDigit() && isHostName(key.host);
 }
 
-void PartitionProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
+void PartitionProvider::read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+                             const Sink& sink) {
+    Key key;
+    if (!split(name, key)) return;
+    Needs needs(attributes);
+    readPartitions(tool, needs, key.host, ("\"lpar_ids=" + key.id + "\"").c_str(), sink);
+}
+
+void PartitionProvider::readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
     int hostAttributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_END};
     const zemRecordSetsType hosts = tool.getManagedSystemInformation(hostAttributes, nullptr);
     Needs needs(attributes);
@@ -109,12 +157,6 @@ void PartitionProvider::walk(zemQyplatCmdCaller& tool, int* attributes, const Si
             if (!isUnknownObject(e)) throw;
         }
     }
-}
-
-void PartitionProvider::complete(CmpiInstance& instance, const std::string& name,
-                                 const char** properties) {
-    if (containsProperty(properties, "HostName"))
-        instance.setProperty("HostName", CmpiData(name.c_str() + name.find('*') + 1));
 }
 
 ZEM_PROVIDER(ORXC_LPAR_CSProvider, PartitionProvider)

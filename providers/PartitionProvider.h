@@ -25,11 +25,9 @@ public:
     PartitionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name);
 
 protected:
-    void find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+    void read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
               const Sink& sink) override;
-    void walk(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) override;
-    void complete(CmpiInstance& instance, const std::string& name,
-                  const char** properties) override;
+    void readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) override;
     bool isChangeable(const char* property) const override;
     void change(const Client& client, const std::string& name, const char* property,
                 const std::string& value) override;
@@ -43,6 +41,14 @@ protected:
                                const CmpiObjectPath& path) override;
 
 private:
+    /// The parts of the Name.
+    struct Key {
+        std::string id;
+        std::string host;
+    };
+    /// @return false when @p name has not the form of one
+    static bool split(const std::string& name, Key& key);
+
     /// What the creation tool is told of the new partition.
     void addCreationPairs(const CmpiInstance& instance, zemDynamicArray<tagAttributePair>& pairs);
 };

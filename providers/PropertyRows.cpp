@@ -90,15 +90,16 @@ CmpiArray oneNumber(CMPIUint16 value) {
 /// Sets @p data from the text of an attribute.
 /// @return false when the text is empty or of another form, so that the property stays null
 bool convert(ValueKind kind, const char* text, CmpiData& data) {
+    if (*text == '\0') return false;
     unsigned long value = 0;
     std::tm when = {};
     switch (kind) {
         case ValueKind::Text:
-            if (*text != '\0') data = CmpiData(text);
-            return *text != '\0';
+            data = CmpiData(text);
+            return true;
         case ValueKind::TextList:
-            if (*text != '\0') data = CmpiData(textList(text));
-            return *text != '\0';
+            data = CmpiData(textList(text));
+            return true;
         case ValueKind::Uint16:
             if (!parseNumber(text, 0xFFFF, value)) return false;
             data.setUint16(static_cast<CMPIUint16>(value));
@@ -169,4 +170,25 @@ bool isUnknownObject(const zemException& failure) {
 std::string hostName(const zemRecordType& host) {
     return std::string(host[Host::ATTR_TYPE_MODEL]) + "*" +
            static_cast<const char*>(host[Host::ATTR_SERIAL_NUM]);
+}
+
+void listSystemKeys(CmpiArray& keys) {
+    keys[0] = CmpiData("CreationClassName");
+    keys[1] = CmpiData("Name");
+}
+
+CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
+                          const std::string& name) {
+    CmpiObjectPath path = zemBaseProvider::createObjectPath(near, className);
+    path.setKey("CreationClassName", CmpiData(className));
+    path.setKey("Name", CmpiData(name.c_str()));
+    return path;
+}
+
+CmpiInstance systemInstance(const CmpiObjectPath& near, const char* className,
+                            const std::string& name) {
+    CmpiInstance instance(systemPath(near, className, name));
+    instance.setProperty("CreationClassName", CmpiData(className));
+    instance.setProperty("Name", CmpiData(name.c_str()));
+    return instance;
 }

@@ -1,5 +1,5 @@
 /// What all providers here share: rows that turn attributes of a tool's record into CIM properties,
-/// and the few facts about hosts on which every class depends.
+/// and the few facts about hosts and partitions on which every class depends.
 ///
 /// A provider names its rows once. From them follow the attributes that a query must ask for and
 /// the properties that an instance gets, so that the tool is asked for nothing that nobody wants.
@@ -56,5 +56,13 @@ bool isUnknownObject(const zemException& failure);
 
 /// The key of the host that a qyplat host record describes.
 std::string hostName(const zemRecordType& host);
+
+/// Hosts and partitions have the keys CreationClassName, which is their class, and Name: their
+/// list, and path and instance with both, in the namespace of @p near.
+void listSystemKeys(CmpiArray& keys);
+CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
+                          const std::string& name);
+CmpiInstance systemInstance(const CmpiObjectPath& near, const char* className,
+                            const std::string& name);
 
 #endif

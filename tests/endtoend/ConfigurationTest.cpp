@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
+#include <map>
 #include <random>
 
 #include "Exception.h"
@@ -13,11 +14,11 @@
 namespace {
 
 using New = zemNwplatCmdCaller::PartitionAttribute;
-using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
 using testing_support::TestAppliance;
 
 constexpr char kHost[] = "1111-AAA*0000001";
+constexpr unsigned kFirstId = 20;  // of the partitions that are made
 
 /// @p text as the value of an item between the quotes of a command line.
 std::string itemText(const std::string& text) {
@@ -46,6 +47,7 @@ public:
     Configuration make() {
         const bool dedicated = below(2) == 1;
         const int memory = 1 + below(16), procs = 1 + below(4);
+        add(New::ATTR_LPAR_ID, Profile::ATTR_LPAR_ID, std::to_string(kFirstId + m_seed));
         add(New::ATTR_NAME, Profile::ATTR_LPAR_NAME, name("p"));
         add(New::ATTR_PROFILE_NAME, Profile::ATTR_NAME, name("f"));
         add(New::ATTR_LPAR_ENV, Profile::ATTR_LPAR_ENV, one({"tmxlinux", "xbrgserver", "osq00"}));
@@ -123,57 +125,38 @@ private:
     Configuration m_asked;
 };
 
-const std::string& asked(const Configuration& configuration, int creation) {
-    for (const Asked& item : configuration)
-        if (item.creation == creation) return item.value;
-    static const std::string none;
-    return none;
-}
-
-zemString numberOf(zemQyplatCmdCaller& tool, const std::string& name) {
-    int list[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_NAME, Partition::ATTR_END};
-    const zemRecordSetsType all = tool.getPartitionsInformation(list, kHost, nullptr);
-    for (int i = 0; i < all.size(); ++i)
-        if ((*all[i])[Partition::ATTR_NAME] == name.c_str())
-            return (*all[i])[Partition::ATTR_LPAR_ID];
-    ADD_FAILURE() << "no partition " << name;
-    return "0";
-}
-
 void expectLibraryTells(const Configuration& all, zemHostSystem& host, const zemString& id) {
+    std::map<int, std::string> asked;
+    for (const Asked& item : all) asked[item.creation] = item.value;
     zemVirtualSystem partition = host.getVirtualSystemById(id);
-    EXPECT_EQ(asked(all, New::ATTR_NAME), std::string(partition.getName()));
-    EXPECT_EQ(asked(all, New::ATTR_LPAR_ENV), std::string(partition.getEnv()));
-    EXPECT_EQ(asked(all, New::ATTR_PROFILE_NAME), std::string(partition.getDefaultProfileName()));
     EXPECT_FALSE(partition.isLive());
     zemVirtualSystemProfile profile =
-        partition.getVirtualSystemProfileByName(asked(all, New::ATTR_PROFILE_NAME).c_str());
-    const struct {
-        int attribute;
-        int told;
-    } numbers[] = {
-        {New::ATTR_MIN_MEM, profile.getMinMem()},
-        {New::ATTR_DESIRED_MEM, profile.getDesiredMem()},
-        {New::ATTR_MAX_MEM, profile.getMaxMem()},
-        {New::ATTR_MIN_PROCS, profile.getMinProcs()},
-        {New::ATTR_DESIRED_PROCS, profile.getDesiredProcs()},
-        {New::ATTR_MAX_PROCS, profile.getMaxProcs()},
-        {New::ATTR_AUTO_START, profile.getAutoStart()},
-        {New::ATTR_CONN_MONITORING, profile.getConnMonitoring()},
+        partition.getVirtualSystemProfileByName(asked[New::ATTR_PROFILE_NAME].c_str());
+    const auto text = [](const zemString& value) { return std::string(value); };
+    const auto number = [](int value) { return std::to_string(value); };
+    const auto list = [](const zemString& value) {
+        return value.length() == 0 ? std::string("none") : std::string(value);
     };
-    for (const auto& row : numbers)
-        EXPECT_EQ(asked(all, row.attribute), std::to_string(row.told)) << row.attribute;
-    const std::string units = asked(all, New::ATTR_DESIRED_PROC_UNITS);
-    const long hundredths =
-        units.empty() ? profile.getDesiredProcs() * 100L : std::lround(std::stod(units) * 100);
-    EXPECT_EQ(hundredths, profile.getDesiredProcUnits());
-    const auto list = [](const zemString& text) {
-        return text.length() == 0 ? std::string("none") : std::string(text);
+    const std::pair<int, std::string> told[] = {
+        {New::ATTR_NAME, text(partition.getName())},
+        {New::ATTR_LPAR_ENV, text(partition.getEnv())},
+        {New::ATTR_PROFILE_NAME, text(partition.getDefaultProfileName())},
+        {New::ATTR_MIN_MEM, number(profile.getMinMem())},
+        {New::ATTR_DESIRED_MEM, number(profile.getDesiredMem())},
+        {New::ATTR_MAX_MEM, number(profile.getMaxMem())},
+        {New::ATTR_MIN_PROCS, number(profile.getMinProcs())},
+        {New::ATTR_DESIRED_PROCS, number(profile.getDesiredProcs())},
+        {New::ATTR_MAX_PROCS, number(profile.getMaxProcs())},
+        {New::ATTR_AUTO_START, number(profile.getAutoStart())},
+        {New::ATTR_CONN_MONITORING, number(profile.getConnMonitoring())},
+        {New::ATTR_VIRTUAL_ETH_ADAPTERS, list(profile.getVirtualEthernetAdapterString())},
+        {New::ATTR_VIRTUAL_SCSI_ADAPTERS, list(profile.getVirtualSCSIAdapterString())},
     };
-    EXPECT_EQ(asked(all, New::ATTR_VIRTUAL_ETH_ADAPTERS),
-              list(profile.getVirtualEthernetAdapterString()));
-    EXPECT_EQ(asked(all, New::ATTR_VIRTUAL_SCSI_ADAPTERS),
-              list(profile.getVirtualSCSIAdapterString()));
+    for (const auto& [attribute, value] : told) EXPECT_EQ(asked[attribute], value) << attribute;
+    const std::string units = asked[New::ATTR_DESIRED_PROC_UNITS];
+    EXPECT_EQ(
+        units.empty() ? profile.getDesiredProcs() * 100L : std::lround(std::stod(units) * 100),
+        profile.getDesiredProcUnits());
 }
 
 TEST(ConfigurationTest, BothDoorsTellWhatWasAskedFor) {
@@ -188,8 +171,8 @@ TEST(ConfigurationTest, BothDoorsTellWhatWasAskedFor) {
             pairs.addElement(new tagAttributePair{item.creation, itemText(item.value).c_str()});
         try {
             ASSERT_EQ(0, host.createVirtualSystem(pairs));
-            const zemString id = numberOf(tool, asked(configuration, New::ATTR_NAME));
-            const zemString filter = zemString("\"lpar_ids=") + id + "\"";
+            const zemString id(std::to_string(kFirstId + i).c_str());
+            const zemString filter = "\"lpar_ids=" + id + "\"";
             const zemRecordSetsType profiles =
                 tool.getPartitionsProfileInformation(nullptr, kHost, filter);
             ASSERT_EQ(1, profiles.size());

@@ -56,8 +56,9 @@ constexpr Failure kFailures[] = {
     {"AlreadyExists", [](Base) { throw zemObjectAlreadyExistsException("there is one"); }},
     {"NoSuchProperty", [](Base) { throw zemPropertyNotFoundException("there is none"); }},
     {"OtherKind", [](Base) { throw zemException(99, "of no kind"); }},
-    {"OfAClass", [](Base) { throw zemAccessDeniedException("Tool", "run", "it \"broke\""); }},
-    {"OnBehalf",
+    {"PropertiesAccessException1",
+     [](Base) { throw zemAccessDeniedException("Tool", "run", "it \"broke\""); }},
+    {"PropertiesAccessException2",
      [](Base) { throw zemOperationFailedException("Tool", "run", "readDisks", "E7", "broke"); }},
     {"Status", [](Base) { throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND, "the binding's own"); }},
 };

@@ -2,6 +2,7 @@
 // broker and the frame to a provider and back, with and without a bundle of translated texts.
 #include <gtest/gtest.h>
 
+#include <map>
 #include <nlohmann/json.hpp>
 #include <regex>
 #include <set>
@@ -40,22 +41,18 @@ struct Texts {
     std::string english, german;
 };
 
-constexpr const char* kEither = nullptr;
-constexpr const char* kFull = "full";
-constexpr const char* kLean = "lean";
-
+/// A request and its answer; where a lean broker leaves more to the provider, both answers.
 struct Row {
     std::string arguments;
     Status status;
     Texts text;
-    const char* broker = kEither;  ///< of which the row tells
+    Status leanStatus = {0, ""};
+    Texts leanText = "";
 };
 
-const std::string kPlainDisk = R"(Test_Disk.Name="sda",Slot=1)";
-const std::string kPlainHost =
-    R"(ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name="1111-AAA*0000001")";
-const std::string kDisk = "'" + kPlainDisk + "'";
-const std::string kHost = "'" + kPlainHost + "'";
+const std::string kDisk = R"('Test_Disk.Name="sda",Slot=1')";
+const std::string kHost =
+    R"('ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name="1111-AAA*0000001"')";
 const std::string kNoHost =
     R"(ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name="9999-ZZZ*0000000")";
 const std::string kNoHostInstance =
@@ -64,100 +61,64 @@ const std::string kNoHostInstance =
 
 std::string disk(const std::string& keys) { return "'Test_Disk." + keys + "'"; }
 
-/// A sentence of the library, with numbers in braces where the inserts stand.
+/// A sentence of the library, with numbers in braces where the inserts stand; the bundle has its
+/// German form, with the same numbers, under its name.
 struct Sentence {
     const char* name;  ///< with which the failing provider is told to use it
     Status status;
     const char* inserts;  ///< of the failing provider, a line each
-    std::string english, german = "";
+    std::string english;
+    bool untranslated = false;  ///< stays English, whatever the bundle has
 };
 
-const std::string kUntranslated =
-    "Invalid value of {1} is provided for parameter {0} to method {2} on provider "
-    "Test_DiskProvider.";
+constexpr char kOfAClass[] = "PropertiesAccessException1";
+constexpr char kOnBehalf[] = "PropertiesAccessException2";
 const std::string kConflict =
     "Conflicted property value 18446744073709551615 of \"{0}\" and property value 1 of \"{1}\" "
     "were specified for class Test_Disk for partition lp1 on managed system host. {2} memory "
     "should be {3} memory.";
 const std::string kThrown =
-    "An exception occurred during executing method {0} on provider {1}Provider. The exception "
-    "was thrown from method {2} on class {3} with an exception id of {4} and an exception string "
-    "of \"{5}\".";
-const std::string kGermanThrown =
-    "Bei der Ausführung der Methode {0} des Providers {1}Provider trat eine Ausnahme auf. Sie kam "
-    "aus der Methode {2} der Klasse {3}, mit der Kennung {4} und dem Text \"{5}\"";
+    "An exception occurred during executing method {0} on provider {1}. The exception was thrown "
+    "from method {2} on class {3} with an exception id of {4} and an exception string of \"{5}\".";
 const Sentence kSentences[] = {
-    {"MethodNotSupported", kNotSupported, "getInstance\nTest_Disk",
-     "Method {0} on provider Test_DiskProvider is not supported for class {1}.",
-     "Die Methode {0} des Providers Test_DiskProvider wird für die Klasse {1} nicht unterstützt."},
-    {"MethodNotFound", kNoMethod, "getInstance",
-     "CIM_ERR_METHOD_NOT_FOUND (The invoked method  {0} is not supported for class Test_Disk)",
-     "CIM_ERR_METHOD_NOT_FOUND (Die aufgerufene Methode {0} wird für die Klasse Test_Disk nicht "
-     "unterstützt)"},
-    {"UserAccessDenied", kDenied, "kim\ngetInstance",
-     "User {0} is not authorized to utilize {1} operation of class Test_Disk on provider "
-     "Test_DiskProvider.",
-     "Der Benutzer {0} darf die Operation {1} der Klasse Test_Disk des Providers "
-     "Test_DiskProvider nicht ausführen."},
-    {"KeyNotFound", kInvalid, "k\nTest_Disk\ngetInstance",
-     "Key {0} for class {1} is not provided to method {2} on provider {1}Provider.",
-     "Der Schlüssel {0} der Klasse {1} wurde der Methode {2} des Providers {1}Provider nicht "
-     "übergeben."},
-    {"InvalidKey", kInvalid, "k\ngetInstance",
-     "Invalid key name {0} for class Test_Disk is provided to method {1} on provider "
-     "Test_DiskProvider.",
-     "Ein ungültiger Schlüsselname {0} der Klasse Test_Disk wurde der Methode {1} des Providers "
-     "Test_DiskProvider übergeben."},
-    {"DuplicateKey", kInvalid, "k\ngetInstance",
-     "Duplicate key {0} for class Test_Disk is provided to method {1} on provider "
-     "Test_DiskProvider.",
-     "Der Schlüssel {0} der Klasse Test_Disk wurde der Methode {1} des Providers "
-     "Test_DiskProvider mehrfach übergeben."},
-    {"KeyValueDoesntMatch", kInvalid, "k\n1\n2",
-     "A key provided for class Test_Disk to method getInstance on provider Test_DiskProvider had "
-     "an unexpected value. A value of {1} was provided for key {0} instead of the expected value "
-     "of {2}.",
-     "Ein Schlüssel der Klasse Test_Disk, der der Methode getInstance des Providers "
-     "Test_DiskProvider übergeben wurde, hatte einen unerwarteten Wert. Für den Schlüssel {0} "
-     "wurde der Wert {1} statt des erwarteten Wertes {2} angegeben."},
-    {"PropertyNotFound", kInvalid, "p",
-     "Property {0} is not found on instance provided for class Test_Disk.",
-     "Die Eigenschaft {0} fehlt in der Instanz der Klasse Test_Disk."},
-    {"DuplicateProperty", kInvalid, "p\ngetInstance",
-     "Duplicate property name {0} for class Test_Disk is provided to method {1} on provider "
-     "Test_DiskProvider.",
-     "Der Eigenschaftsname {0} der Klasse Test_Disk wurde der Methode {1} des Providers "
-     "Test_DiskProvider mehrfach übergeben."},
-    {"InvalidProperty", kInvalid, "p\ngetInstance",
-     "Invalid property name {0} for class Test_Disk is provided to method {1} on provider "
-     "Test_DiskProvider.",
-     "Ein ungültiger Eigenschaftsname {0} der Klasse Test_Disk wurde der Methode {1} des "
-     "Providers Test_DiskProvider übergeben."},
-    {"ObjectNotFound", kNotFound, "o\nTest_Disk\nTest_Disk",
+    {"MethodNotSupported", kNotSupported, "getInstance\nTest_DiskProvider\nTest_Disk",
+     "Method {0} on provider {1} is not supported for class {2}."},
+    {"MethodNotFound", kNoMethod, "getInstance\nTest_DiskProvider\nTest_Disk",
+     "CIM_ERR_METHOD_NOT_FOUND (The invoked method  {0} is not supported for class {2})"},
+    {"UserAccessDenied", kDenied, "kim\ngetInstance\nTest_Disk\nTest_DiskProvider",
+     "User {0} is not authorized to utilize {1} operation of class {2} on provider {3}."},
+    {"KeyNotFound", kInvalid, "k\nTest_Disk\ngetInstance\nTest_DiskProvider",
+     "Key {0} for class {1} is not provided to method {2} on provider {3}."},
+    {"InvalidKey", kInvalid, "k\nTest_Disk\ngetInstance\nTest_DiskProvider",
+     "Invalid key name {0} for class {1} is provided to method {2} on provider {3}."},
+    {"DuplicateKey", kInvalid, "k\nTest_Disk\ngetInstance\nTest_DiskProvider",
+     "Duplicate key {0} for class {1} is provided to method {2} on provider {3}."},
+    {"KeyValueDoesntMatch", kInvalid, "Test_Disk\ngetInstance\nTest_DiskProvider\n1\nk\n2",
+     "A key provided for class {0} to method {1} on provider {2} had an unexpected value. A value "
+     "of {3} was provided for key {4} instead of the expected value of {5}."},
+    {"PropertyNotFound", kInvalid, "p\nTest_Disk",
+     "Property {0} is not found on instance provided for class {1}."},
+    {"DuplicateProperty", kInvalid, "p\nTest_Disk\ngetInstance\nTest_DiskProvider",
+     "Duplicate property name {0} for class {1} is provided to method {2} on provider {3}."},
+    {"InvalidProperty", kInvalid, "p\nTest_Disk\ngetInstance\nTest_DiskProvider",
+     "Invalid property name {0} for class {1} is provided to method {2} on provider {3}."},
+    {"ObjectNotFound", kNotFound, "o\nTest_Disk\ngetInstance\nTest_DiskProvider",
      "The requested object {0} of class {1} can not be found. The exception was thrown from "
-     "method getInstance on provider {2}Provider.",
-     "Das angeforderte Objekt {0} der Klasse {1} wurde nicht gefunden. Die Ausnahme kam aus der "
-     "Methode getInstance des Providers {2}Provider."},
-    {"WrongMethodArg", kInvalid, "a\nm",
-     "Wrong method argument {0} when invoking method {1} on provider Test_DiskProvider.",
-     "Falsches Argument {0} beim Aufruf der Methode {1} des Providers Test_DiskProvider."},
-    {"DuplicateMethodArg", kInvalid, "a\nm",
-     "Duplicate method argument {0} when invoking method {1} on provider Test_DiskProvider.",
-     "Mehrfaches Argument {0} beim Aufruf der Methode {1} des Providers Test_DiskProvider."},
-    // the one that no bundle translates
-    {"InvalidMethodArgValue", kInvalid, "a\nv\nm", kUntranslated, kUntranslated},
-    {"ParameterNotFound", kInvalid, "a", "Parameter {0} is not found in provided parameters.",
-     "Der Parameter {0} fehlt unter den angegebenen Parametern."},
-    {"PropertyValueDoesntMatch", kInvalid, "p\n1\n2",
-     "A property provided for class Test_Disk had an unexpected value. An invalid value of {1} "
-     "was specifieded for property \"{0}\" instead of the expected value of {2}",
-     "Eine Eigenschaft der Klasse Test_Disk hatte einen unerwarteten Wert. Der ungültige Wert "
-     "{1} wurde für die Eigenschaft \"{0}\" angegeben, erwartet wurde {2}."},
-    {"OfAClass", kDenied, "getInstance\nTest_Disk\nrun\nTool\nCIM_ERROR\nit \"broke\"", kThrown,
-     kGermanThrown + "."},
-    {"OnBehalf", kFailed, "getInstance\nTest_Disk\nrun\nTool\nE7\nbroke\nreadDisks",
-     kThrown + " The exception was thrown on behalf of access method {6}.",
-     kGermanThrown + ", im Auftrag der Zugriffsmethode {6}."},
+     "method {2} on provider {3}."},
+    {"WrongMethodArg", kInvalid, "a\nm\nTest_DiskProvider",
+     "Wrong method argument {0} when invoking method {1} on provider {2}."},
+    {"DuplicateMethodArg", kInvalid, "a\nm\nTest_DiskProvider",
+     "Duplicate method argument {0} when invoking method {1} on provider {2}."},
+    {"InvalidMethodArgValue", kInvalid, "a\nv\nm\nTest_DiskProvider",
+     "Invalid value of {1} is provided for parameter {0} to method {2} on provider {3}.", true},
+    {"ParameterNotFound", kInvalid, "a", "Parameter {0} is not found in provided parameters."},
+    {"PropertyValueDoesntMatch", kInvalid, "Test_Disk\n1\np\n2",
+     "A property provided for class {0} had an unexpected value. An invalid value of {1} was "
+     "specifieded for property \"{2}\" instead of the expected value of {3}"},
+    {kOfAClass, kDenied, "getInstance\nTest_DiskProvider\nrun\nTool\nCIM_ERROR\nit \"broke\"",
+     kThrown},
+    {kOnBehalf, kFailed, "getInstance\nTest_DiskProvider\nrun\nTool\nE7\nbroke\nreadDisks",
+     kThrown + " The exception was thrown on behalf of access method {6}."},
     {"MultiResource", kInvalid, "",
      "Multiple memory instances were specified for partition lp1 on managed system host. Only "
      "one instance should be specified for such resource."},
@@ -179,7 +140,7 @@ const Sentence kSentences[] = {
     {"AlreadyExists", kExists, "", "there is one"},
     {"NoSuchProperty", kNoProperty, "", "there is none"},
     {"OtherKind", kFailed, "", "of no kind"},
-    {"Status", kNotFound, "", "the binding's own", "the binding's own"},
+    {"Status", kNotFound, "", "the binding's own", true},
 };
 
 std::string filled(std::string text, const std::vector<Texts>& inserts, bool inGerman) {
@@ -194,15 +155,23 @@ std::string filled(std::string text, const std::vector<Texts>& inserts, bool inG
     return text;
 }
 
-/// The sentence of that name, with the failing provider's inserts unless others are given.
-Texts says(const std::string& name, std::vector<Texts> inserts = {}) {
-    for (const Sentence& sentence : kSentences) {
-        if (sentence.name != name) continue;
-        if (inserts.empty())
-            for (const std::string& word : lines(sentence.inserts)) inserts.push_back(word);
-        return {filled(sentence.english, inserts, false), filled(sentence.german, inserts, true)};
-    }
-    throw std::out_of_range(name);
+const nlohmann::json& bundle() {
+    static const auto texts = nlohmann::json::parse(contents(ZEM_MESSAGES "/default_de.json"));
+    return texts;
+}
+
+/// The sentence of that name, with the failing provider's inserts where none are @p given.
+Texts says(const std::string& name, const std::map<std::size_t, Texts>& given = {}) {
+    const auto* const row = std::find_if(std::begin(kSentences), std::end(kSentences),
+                                         [&](const Sentence& each) { return each.name == name; });
+    if (row == std::end(kSentences)) throw std::out_of_range(name);
+    std::vector<Texts> inserts;
+    for (const std::string& word : lines(row->inserts)) inserts.push_back(word);
+    for (const auto& [number, text] : given) inserts.at(number) = text;
+    const std::string english = filled(row->english, inserts, false);
+    if (row->untranslated) return {english, english};
+    const auto german = bundle().find("Error." + name);
+    return german == bundle().end() ? english : Texts(english, filled(*german, inserts, true));
 }
 
 /// What comes of the text of a failure in a method.
@@ -220,7 +189,7 @@ class FailureRoad : public ::testing::TestWithParam<const char*> {
 protected:
     void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
 
-    bool full() const { return std::string(GetParam()) == kFull; }
+    bool full() const { return std::string(GetParam()) == "full"; }
 
     Outcome cimom(const std::string& arguments) {
         return m_appliance.run(m_before + "cimom --broker " + GetParam() + " --registration '" +
@@ -244,15 +213,16 @@ protected:
         expectFailure("--messages '" ZEM_MESSAGES "' --language de " + arguments, status, text);
     }
 
-    /// With a bundle under the broker that reads one, without under the other, unless the row
-    /// tells of one broker alone.
+    /// With a bundle under the broker that reads one, without under the other. Where the two
+    /// answer differently, without.
     void expectFailure(const Row& row) {
-        if (row.broker != kEither && row.broker != std::string(GetParam())) return;
-        if (full() && !row.text.german.empty()) {
+        const bool differ = row.leanStatus.code != 0;
+        if (differ && !full())
+            expectFailure(row.arguments, row.leanStatus, row.leanText.english);
+        else if (full() && !differ && !row.text.german.empty())
             expectGerman(row.arguments, row.status, row.text.german);
-        } else if (!full() || row.broker == kFull) {
+        else if (!full() || differ)
             expectFailure(row.arguments, row.status, row.text.english);
-        }
     }
 
     TestAppliance m_appliance{ZEM_PROGRAMS};
@@ -271,9 +241,8 @@ TEST_P(FailureRoad, ProvidersThrowByName) {
         expectFailure(arguments, sentence.status, text.english);
         if (full() && !text.german.empty()) expectGerman(arguments, sentence.status, text.german);
     }
-    expectFailure({"gp " + disk("Name=\"OnBehalf\",Slot=1") + " Size", kFailed,
-                   says("OnBehalf",
-                        {"getProperty", "Test_Disk", "run", "Tool", "E7", "broke", "readDisks"})});
+    expectFailure({"gp " + disk("Name=\"PropertiesAccessException2\",Slot=1") + " Size", kFailed,
+                   says(kOnBehalf, {{0, "getProperty"}})});
     expectFailure({"gp " + disk("Name=\"Status\",Slot=1") + " Size", kNotFound, says("Status")});
 }
 
@@ -285,8 +254,8 @@ TEST_P(FailureRoad, MethodsThrowByName) {
          {"MethodNotSupported", "MethodNotFound", "UserAccessDenied", "ParameterNotFound",
           "ObjectNotFound", "AlreadyExists", "NoSuchProperty", "OtherKind"})
         expectFailure({fail + name, kFailed, general(says(name))});
-    expectFailure({fail + "OfAClass", kFailed, general("it \"broke\"")});
-    expectFailure({fail + "OnBehalf", kFailed, general("broke")});
+    expectFailure({fail + kOfAClass, kFailed, general("it \"broke\"")});
+    expectFailure({fail + kOnBehalf, kFailed, general("broke")});
     expectFailure({fail + "Status", kNotFound, says("Status")});
 }
 
@@ -302,7 +271,7 @@ TEST_P(FailureRoad, EnumerationsLogWhatTheyDoNotAnswer) {
     } rows[] = {
         {"guest", 0, "",
          logged + "ACCESS_DENIED: " +
-             says("UserAccessDenied", {"guest", "enumerateInstances"}).english + '\n'},
+             says("UserAccessDenied", {{0, "guest"}, {1, "enumerateInstances"}}).english + '\n'},
         {"ObjectNotFound", 0, "", logged + "NOT_FOUND: " + says("ObjectNotFound").english + '\n'},
         {"Status", 0, "", logged + "NOT_FOUND: the binding's own\n"},
         {"ParameterNotFound", 4,
@@ -316,7 +285,7 @@ TEST_P(FailureRoad, EnumerationsLogWhatTheyDoNotAnswer) {
         EXPECT_NE(got.out.find("Test_Disk.Name=\"sda\",Slot=1\n"), std::string::npos) << row.user;
     }
     expectFailure({"ein Test_Disk", kNotSupported,
-                   says("MethodNotSupported", {"enumerateInstanceNames", "Test_Disk"})});
+                   says("MethodNotSupported", {{0, "enumerateInstanceNames"}})});
 }
 
 // The class test of every operation, which names the operation as its clients know it.
@@ -344,10 +313,10 @@ TEST_P(FailureRoad, ClassesMustBeServed) {
         {"rin " + kDisk, "referenceNames", "Test_Disk"},
     };
     for (const auto& [arguments, operation, className] : rows)
-        expectFailure(
-            {arguments, kNotSupported, says("MethodNotSupported", {operation, className})});
+        expectFailure({arguments, kNotSupported,
+                       says("MethodNotSupported", {{0, operation}, {2, className}})});
     expectFailure({"im " + other + " Work", kFailed,
-                   general(says("MethodNotSupported", {"invokeMethod", "Test_Other"}))});
+                   general(says("MethodNotSupported", {{0, "invokeMethod"}, {2, "Test_Other"}}))});
     // what an indication provider says of its failures does not reach the server
     expectFailure({"watch Test_Other", kNotSupported, ""});
     expectFailure({"watch Test_Alarm", kNotSupported, ""});
@@ -356,21 +325,18 @@ TEST_P(FailureRoad, ClassesMustBeServed) {
 // -- wrong requests -------------------------------------------------------------------------------
 
 const std::vector<Row> kWrongKeys = {
-    {"gi " + disk("Name=\"sda\",Slot=1,Third=\"x\""), kInvalid,
-     says("InvalidKey", {"Third", "getInstance"})},
+    {"gi " + disk("Name=\"sda\",Slot=1,Third=\"x\""), kInvalid, says("InvalidKey", {{0, "Third"}})},
     {"gi " + disk("Name=\"moved\",Slot=1"), kInvalid,
-     says("KeyValueDoesntMatch", {"Name", "moved", "sda"})},
-    {"gi " + disk("Name=\"sda\",Slot=2"), kInvalid, says("KeyValueDoesntMatch", {"Slot", "", ""})},
+     says("KeyValueDoesntMatch", {{3, "moved"}, {4, "Name"}, {5, "sda"}})},
+    {"gi " + disk("Name=\"sda\",Slot=2"), kInvalid,
+     says("KeyValueDoesntMatch", {{3, ""}, {4, "Slot"}, {5, ""}})},
     {"gi " + disk("Name=\"sda\",Slot=1,name=\"sda\""), kInvalid,
      "at character 34 of 'Test_Disk.Name=\"sda\",Slot=1,name=\"sda\"': key name stands twice",
-     kFull},
-    {"gi " + disk("Name=\"sda\",Slot=1,name=\"sda\""), kInvalid,
-     says("DuplicateKey", {"Name", "getInstance"}), kLean},
-    {"gi " + disk("Name=\"sda\",Slot=\"one\""), kMismatch, "'one' is no uint32", kFull},
-    {"gi " + disk("Name=\"sda\",Slot=\"one\""), kInvalid,
-     says("KeyValueDoesntMatch", {"Slot", "one", ""}), kLean},
-    {"gi " + disk("Name=5,Slot=1"), kInvalid, "key Name of Test_Disk is of type string", kFull},
-    {"gi " + disk("Name=5,Slot=1"), kMismatch, "", kLean},
+     kInvalid, says("DuplicateKey", {{0, "Name"}})},
+    {"gi " + disk("Name=\"sda\",Slot=\"one\""), kMismatch, "'one' is no uint32", kInvalid,
+     says("KeyValueDoesntMatch", {{3, "one"}, {4, "Slot"}, {5, ""}})},
+    {"gi " + disk("Name=5,Slot=1"), kInvalid, "key Name of Test_Disk is of type string", kMismatch,
+     ""},
 };
 
 TEST_P(FailureRoad, KeysMustBeThoseOfTheObject) {
@@ -384,14 +350,17 @@ TEST_P(FailureRoad, KeysMustBeThoseOfTheObject) {
         {"setProperty", "sp " + half + " Size 5"},
     };
     for (const auto& [method, arguments] : incomplete)
-        expectFailure({arguments, kInvalid, says("KeyNotFound", {"Slot", "Test_Disk", method})});
+        expectFailure({arguments, kInvalid, says("KeyNotFound", {{0, "Slot"}, {2, method}})});
     for (const Row& row : kWrongKeys) expectFailure(row);
+    expectFailure("gi ORXC_Unknown.Name=1", {5, "CIM_ERR_INVALID_CLASS"}, "no class ORXC_Unknown");
 
     ScopedEnvironment none("CIMOM_SCHEMA", "");
     const Row untyped[] = {
         {"gi " + disk("Name=\"sda\",Slot=\"one\""), kInvalid,
-         says("KeyValueDoesntMatch", {"Slot", "one", ""})},
+         says("KeyValueDoesntMatch", {{3, "one"}, {4, "Slot"}, {5, ""}})},
         {"gi " + disk("Name=5,Slot=1"), kMismatch, ""},
+        {"gi ORXC_Unknown.Name=1", kNotSupported,
+         "no provider serves class ORXC_Unknown in root/cimv2 for this"},
     };
     for (const Row& row : untyped) expectFailure(row);
 }
@@ -400,30 +369,35 @@ const std::string kCreate = "ci Test_Disk Name=sdb Slot=1 ";
 const std::string kWrongType =
     " of property \"Size\" is invalid in instance root/cimv2:Test_Disk."
     "Name=\"sdb\",Slot=1, the expected data type is \"uint64\"";
-const std::vector<Row> kWrongProperties = {
+const std::string kNoObject =
+    "refers to an invalid object:root/cimv2:Test_Disk to inovke method Attach";
+const std::string kUnserved = "no provider serves class CIM_ComputerSystem in root/cimv2 for this";
+const std::string kUnservedHost =
+    "An error ocurred, when validate value CIM_ComputerSystem.Name=\"x\" "
+    "of parameter \"Host\". And the error string was \"" +
+    kUnserved + "\"";
+const std::string kReplace = "im " + kDisk + " Replace 'Disk=instance of Test_Disk { ";
+const std::vector<Row> kWrongRequests = {
+    // properties must be those of the class
     {"gi " + kDisk + " --properties Size,Colour", kInvalid,
-     says("InvalidProperty", {"Colour", "getInstance"})},
+     says("InvalidProperty", {{0, "Colour"}})},
     {"ei Test_Disk --properties Size,size", kInvalid,
-     says("DuplicateProperty", {"Size", "enumerateInstances"})},
-    {kCreate + "Caption=x caption=y", kInvalid, "'caption' is given twice", kFull},
-    {kCreate + "Caption=x caption=y", kInvalid,
-     says("DuplicateProperty", {"Caption", "createInstance"}), kLean},
-    {kCreate + "Colour=red", kNoProperty, "there is no 'Colour' to set", kFull},
-    {kCreate + "Colour=red", kInvalid, says("InvalidProperty", {"Colour", "createInstance"}),
-     kLean},
-    {"mi " + kDisk + " Colour=red", kNoProperty, "there is no 'Colour' to set", kFull},
-    {"mi " + kDisk + " Colour=red", kInvalid, says("InvalidProperty", {"Colour", "getInstance"}),
-     kLean},
-    {"sp " + kHost + " Colour red", kNoProperty, "class ORXC_CEC_CS has no property Colour", kFull},
-    {"sp " + kHost + " Colour red", kInvalid,
+     says("DuplicateProperty", {{0, "Size"}, {2, "enumerateInstances"}})},
+    {kCreate + "Caption=x caption=y", kInvalid, "'caption' is given twice", kInvalid,
+     says("DuplicateProperty", {{0, "Caption"}, {2, "createInstance"}})},
+    {kCreate + "Colour=red", kNoProperty, "there is no 'Colour' to set", kInvalid,
+     says("InvalidProperty", {{0, "Colour"}, {2, "createInstance"}})},
+    {"mi " + kDisk + " Colour=red", kNoProperty, "there is no 'Colour' to set", kInvalid,
+     says("InvalidProperty", {{0, "Colour"}})},
+    {"sp " + kHost + " Colour red", kNoProperty, "class ORXC_CEC_CS has no property Colour",
+     kInvalid,
      "Attempt to change unmodifiable property \"Colour\" of class ORXC_CEC_CS from  to "
-     "\"red\".",
-     kLean},
+     "\"red\"."},
     {"gp " + kDisk + " Colour", kNoProperty, "Colour"},
-    {kCreate + "Size=big", kMismatch, "'big' is no uint64", kFull},
-    {kCreate + "Size=big", kInvalid, "The data type(\"string\")" + kWrongType, kLean},
-    {kCreate + "Size=-1", kMismatch, "'-1' is no uint64", kFull},
-    {kCreate + "Size=-1", kInvalid, "The data type(\"sint64\")" + kWrongType, kLean},
+    {kCreate + "Size=big", kMismatch, "'big' is no uint64", kInvalid,
+     "The data type(\"string\")" + kWrongType},
+    {kCreate + "Size=-1", kMismatch, "'-1' is no uint64", kInvalid,
+     "The data type(\"sint64\")" + kWrongType},
     {kCreate + "Size=1", kInvalid,
      "The requested property  \"Caption\" for class Test_Disk was not provided."},
     {kCreate + "Caption=x Firmware=1", kInvalid,
@@ -435,78 +409,53 @@ const std::vector<Row> kWrongProperties = {
      "Attempt to set property \"State\" of class Test_Disk to \"1\". Can not specify this "
      "property \"State\", when execute this operation."},
     {kCreate + "Caption=x Kind=tape", kInvalid,
-     says("PropertyValueDoesntMatch", {"Kind", "tape", "disk"})},
-};
-
-TEST_P(FailureRoad, PropertiesMustBeThoseOfTheClass) {
-    for (const Row& row : kWrongProperties) expectFailure(row);
-}
-
-const std::string kNoObject =
-    "refers to an invalid object:root/cimv2:Test_Disk to inovke method Attach";
-const std::vector<Row> kWrongArguments = {
-    {"im Test_Disk Fail", kFailed, general(says("ParameterNotFound", {"Failure"}))},
-    {"im Test_Disk Fail Wrong=1", kInvalid, "there is no 'Wrong' to set", kFull},
-    {"im Test_Disk Fail Wrong=1", kFailed, general(says("WrongMethodArg", {"Wrong", "Fail"})),
-     kLean},
-    {"im Test_Disk Fail Failure=x failure=y", kInvalid, "'failure' is given twice", kFull},
-    {"im Test_Disk Fail Failure=x failure=y", kFailed,
-     general(says("DuplicateMethodArg", {"Failure", "Fail"})), kLean},
+     says("PropertyValueDoesntMatch", {{1, "tape"}, {2, "Kind"}, {3, "disk"}})},
+    // arguments must be those of the method
+    {"im Test_Disk Fail", kFailed, general(says("ParameterNotFound", {{0, "Failure"}}))},
+    {"im Test_Disk Fail Wrong=1", kInvalid, "there is no 'Wrong' to set", kFailed,
+     general(says("WrongMethodArg", {{0, "Wrong"}, {1, "Fail"}}))},
+    {"im Test_Disk Fail Failure=x failure=y", kInvalid, "'failure' is given twice", kFailed,
+     general(says("DuplicateMethodArg", {{0, "Failure"}, {1, "Fail"}}))},
     {"im " + kHost + " RequestStateChange RequestedState=on", kMismatch, "'on' is no uint16",
-     kFull},
-    {"im " + kHost + " RequestStateChange RequestedState=on", kMismatch, "", kLean},
-    {"im " + kDisk + " Nonsense", kNoMethod, "class Test_Disk has no method Nonsense", kFull},
-    {"im " + kDisk + " Nonsense", kFailed, general(says("MethodNotFound", {"Nonsense"})), kLean},
+     kMismatch, ""},
+    {"im " + kDisk + " Nonsense", kNoMethod, "class Test_Disk has no method Nonsense", kFailed,
+     general(says("MethodNotFound", {{0, "Nonsense"}}))},
     {"im Test_Disk Attach Host=" + kHost, kFailed, general({kNoObject, kNoObject})},
-};
-
-TEST_P(FailureRoad, ArgumentsMustBeThoseOfTheMethod) {
-    for (const Row& row : kWrongArguments) expectFailure(row);
-}
-
-// What an argument or a property refers to must exist; the server is asked for it.
-const std::string kUnserved = "no provider serves class CIM_ComputerSystem in root/cimv2 for this";
-const std::string kUnservedHost =
-    "An error ocurred, when validate value CIM_ComputerSystem.Name=\"x\" "
-    "of parameter \"Host\". And the error string was \"" +
-    kUnserved + "\"";
-const std::string kReplace = "im " + kDisk + " Replace 'Disk=instance of Test_Disk { ";
-const std::vector<Row> kMissingObjects = {
+    // what an argument or a property refers to must exist; the server is asked for it
     {"im " + kDisk + " Attach 'Host=" + kNoHost + "'", kFailed,
-     general(says("InvalidMethodArgValue", {"Host", kNoHost, "Attach"}))},
+     general(says("InvalidMethodArgValue", {{0, "Host"}, {1, kNoHost}, {2, "Attach"}}))},
     {"im " + kDisk + " Attach Host=ORXC_CEC_CS", kFailed,
-     general(says("InvalidMethodArgValue", {"Host", "ORXC_CEC_CS", "Attach"}))},
+     general(says("InvalidMethodArgValue", {{0, "Host"}, {1, "ORXC_CEC_CS"}, {2, "Attach"}}))},
     {"im " + kDisk + " Attach 'Host=CIM_ComputerSystem.Name=\"x\"'", kFailed,
      general(kUnservedHost)},
     {"im " + disk("Name=\"sdb\",Slot=1") + " Attach Host=" + kHost, kFailed,
      general("refers to an invalid object:root/cimv2:Test_Disk.Name=\"sdb\",Slot=1 to inovke "
              "method Attach")},
     {"mi " + kDisk + " " + kNoHostInstance, kInvalid,
-     says("InvalidMethodArgValue", {"Host", kNoHost, "modifyInstance"})},
+     says("InvalidMethodArgValue", {{0, "Host"}, {1, kNoHost}, {2, "modifyInstance"}})},
     {"mi " + kDisk + " 'Host=instance of CIM_ComputerSystem { Name = \"x\"; }'", kFailed,
-     says("OnBehalf", {"modifyInstance", "Test_Disk", "validateEmbeddedObject",
-                       "zemVirtualSystemManagementServiceProvider", "CIM_ERR_NOT_SUPPORTED",
-                       kUnservedHost, "getInstance"})},
+     says(kOnBehalf, {{0, "modifyInstance"},
+                      {2, "validateEmbeddedObject"},
+                      {3, "zemVirtualSystemManagementServiceProvider"},
+                      {4, "CIM_ERR_NOT_SUPPORTED"},
+                      {5, kUnservedHost},
+                      {6, "getInstance"}})},
     {kReplace + "Name = \"sdb\"; Slot = 1; }'", kFailed,
-     general(says("InvalidMethodArgValue", {"Disk", "Test_Disk.Name=\"sdb\",Slot=1", "Replace"}))},
+     general(says("InvalidMethodArgValue",
+                  {{0, "Disk"}, {1, "Test_Disk.Name=\"sdb\",Slot=1"}, {2, "Replace"}}))},
     {kReplace + "Size = 5; }'", kFailed,
-     general(says("InvalidMethodArgValue", {"Disk", "Test_Disk", "Replace"}))},
+     general(says("InvalidMethodArgValue", {{0, "Disk"}, {1, "Test_Disk"}, {2, "Replace"}}))},
     {kReplace + "Colour = \"red\"; }'", kNoProperty, "class Test_Disk has no property Colour",
-     kFull},
-    {kReplace + "Colour = \"red\"; }'", kFailed,
-     general(says("InvalidProperty", {"Colour", "Replace"})), kLean},
-    {kReplace + "Size = \"big\"; }'", kMismatch, "'big' is no uint64", kFull},
-    {kReplace + "Size = \"big\"; }'", kFailed,
+     kFailed, general(says("InvalidProperty", {{0, "Colour"}, {2, "Replace"}}))},
+    {kReplace + "Size = \"big\"; }'", kMismatch, "'big' is no uint64", kFailed,
      general("The data type(\"string\") of property \"Size\" is invalid in instance Test_Disk, "
-             "the expected data type is \"uint64\""),
-     kLean},
+             "the expected data type is \"uint64\"")},
     {"im " + kDisk + " Replace Disk=red", kInvalid, "at character 4 of 'red': Class { is missing",
-     kFull},
-    {"im " + kDisk + " Replace Disk=red", kMismatch, "", kLean},
+     kMismatch, ""},
 };
 
-TEST_P(FailureRoad, EmbeddedObjectsMustExist) {
-    for (const Row& row : kMissingObjects) expectFailure(row);
+TEST_P(FailureRoad, PropertiesArgumentsAndReferencesMustBeRight) {
+    for (const Row& row : kWrongRequests) expectFailure(row);
 }
 
 TEST_P(FailureRoad, UsersMayBeRefused) {
@@ -516,8 +465,8 @@ TEST_P(FailureRoad, UsersMayBeRefused) {
         {"createInstance", "ci Test_Disk Name=sdb Slot=1"},
     };
     for (const auto& [method, arguments] : rows)
-        expectFailure(
-            {"--user guest " + arguments, kDenied, says("UserAccessDenied", {"guest", method})});
+        expectFailure({"--user guest " + arguments, kDenied,
+                       says("UserAccessDenied", {{0, "guest"}, {1, method}})});
     EXPECT_EQ(cimom("--user kim gi " + kDisk).exit, 0);
 }
 
@@ -531,66 +480,20 @@ TEST_P(FailureRoad, DisabledProvidersFindNothing) {
         EXPECT_EQ(got.exit, 0) << arguments << got.err;
         EXPECT_EQ(got.out, "") << arguments;
     }
-    const Texts absent = says(
-        "ObjectNotFound", {"The XBRG is managed by DNX, this provider on the XGRB in dissabled.",
-                           "zemBaseProvider", "Test_Disk"});
+    const Texts absent =
+        says("ObjectNotFound",
+             {{0, "The XBRG is managed by DNX, this provider on the XGRB in dissabled."},
+              {1, "zemBaseProvider"}});
     const Row rows[] = {
         {"gi " + kDisk, kNotFound, absent},
         {"mi " + kDisk + " Size=5", kNotFound, absent},  // its existence test finds none
-        {"di " + kDisk, kNotSupported, says("MethodNotSupported", {"deleteInstance", "Test_Disk"})},
+        {"di " + kDisk, kNotSupported, says("MethodNotSupported", {{0, "deleteInstance"}})},
         {"im Test_Disk Fail Failure=OtherKind", kFailed, general("of no kind")},
     };
     for (const Row& row : rows) expectFailure(row);
 }
 
 // -- associations ---------------------------------------------------------------------------------
-
-std::string reference(const std::string& path) {
-    return std::regex_replace(path, std::regex("\""), "\\\"");
-}
-
-const std::string kFarPartition =
-    R"(ORXC_LPAR_CS.CreationClassName="ORXC_LPAR_CS",Name="1*1111-AAB*0000002")";
-
-/// Command that gets an association by its two references.
-std::string getLink(const std::string& name, const char* role1, const std::string& path1,
-                    const char* role2, const std::string& path2) {
-    return "gi '" + name + "." + role1 + "=\"" + reference(path1) + "\"," + role2 + "=\"" +
-           reference(path2) + "\"'";
-}
-
-const std::vector<Row> kWrongAssociations = {
-    {getLink("ORXC_HostedPartition", "Antecedent", kPlainDisk, "Dependent", kPlainDisk), kInvalid,
-     "Invalid value " + kPlainDisk +
-         " for the property Antecedent of the class ORXC_HostedPartition is provided to method "
-         "getInstance on provider ORXC_HostedPartitionProvider"},
-    {getLink("ORXC_HostedPartition", "Antecedent", kPlainHost, "Dependent", kFarPartition),
-     kInvalid,
-     "There doesn't exist an association ORXC_HostedPartition between the property Antecedent with "
-     "value " +
-         kPlainHost + " and the property Dependent with value " + kFarPartition},
-    {getLink("ORXC_ConnectedHost", "Antecedent", kPlainDisk, "Dependent", kPlainDisk), kInvalid,
-     "Invalid value \"" + kPlainDisk + "\" for the property Antecedent and invalid value \"" +
-         kPlainDisk +
-         "\" for the property Dependent of the class ORXC_ConnectedHost were provided to method "
-         "getInstance on provider ORXC_ConnectedHostProvider"},
-    {getLink("ORXC_HostComponent", "GroupComponent", kPlainDisk, "PartComponent", kFarPartition),
-     kInvalid,
-     "Invalid value \"" + kPlainDisk +
-         "\" for the property GroupComponent of the class ORXC_HostComponent was provided to "
-         "method getInstance on provider ORXC_HostComponentProvider"},
-    {getLink("ORXC_HostComponent", "GroupComponent", kPlainHost, "PartComponent", kFarPartition),
-     kNotFound,
-     says("ObjectNotFound", {"root/cimv2:ORXC_HostComponent.GroupComponent=" + kPlainHost +
-                                 ",PartComponent=" + kFarPartition,
-                             "ORXC_HostComponent", "ORXC_HostComponent"})},
-    {"gi 'ORXC_HostedPartition.Antecedent=\"" + reference(kPlainHost) + "\"'", kInvalid,
-     says("KeyNotFound", {"Dependent", "ORXC_HostedPartition", "getInstance"})},
-};
-
-TEST_P(FailureRoad, AssociationsMustBeWhatTheyAre) {
-    for (const Row& row : kWrongAssociations) expectFailure(row);
-}
 
 // The failure of the provider of the other side, in that of the association's provider; the
 // families differ in what they tell of it.
@@ -606,11 +509,17 @@ TEST_P(FailureRoad, AssociationsOfWhatIsNotThereAreRefused) {
         {"ORXC_ReachedHost", "CIM_ERR", "enumerateInstanceNames"},
     };
     const Texts missing =
-        says("ObjectNotFound", {"root/cimv2:" + kNoHost, "ORXC_CEC_CS", "ORXC_CEC_CS"});
+        says("ObjectNotFound",
+             {{0, "root/cimv2:" + kNoHost}, {1, "ORXC_CEC_CS"}, {3, "ORXC_CEC_CSProvider"}});
     for (const auto& [name, id, access] : rows)
         expectFailure({"ain '" + kNoHost + "' --assoc-class " + name, kInvalid,
-                       says("OnBehalf", {"associatorNames", name, "associatorNames", "ORXC_CEC_CS",
-                                         id, missing, access})});
+                       says(kOnBehalf, {{0, "associatorNames"},
+                                        {1, std::string(name) + "Provider"},
+                                        {2, "associatorNames"},
+                                        {3, "ORXC_CEC_CS"},
+                                        {4, id},
+                                        {5, missing},
+                                        {6, access}})});
 }
 
 // -- languages ------------------------------------------------------------------------------------
@@ -631,22 +540,22 @@ TEST_P(FailureRoad, LanguagesChooseTheTextAndTheToolsLocale) {
         const char* words;
     } rows[] = {
         {"", "", "English"},
-        {"root", "", "English"},
         {"en", "en_US.UTF-8", "English"},
-        {"zh", "en_US.UTF-8", "English"},
-        {"de", "de_DE.UTF-8", "German"},
         {"de-AT", "de_AT.UTF-8", "German"},
         {"fr-ca", "fr_CA.UTF-8", "French"},
         {"fr;q=0", "", "English"},
         {"fr;q=0.5,de", "de_DE.UTF-8", "German"},
-        {"fr;q=0.5,de;q=0.5", "fr_FR.UTF-8", "French"},
         {"pt-br;q=0.7,de;q=0.5", "pt_BR.UTF-8", "German"},
     };
     for (const auto& [accepted, locale, words] : rows) {
         const std::string told = std::string("WRTL0001 ") + locale;
-        const Texts text =
-            says("OnBehalf", {"enumInstanceNames", "ORXC_CEC_CS", "callGenericCommand",
-                              "zemCommandCaller", "WRTL0001", told, call});
+        const Texts text = says(kOnBehalf, {{0, "enumInstanceNames"},
+                                            {1, "ORXC_CEC_CSProvider"},
+                                            {2, "callGenericCommand"},
+                                            {3, "zemCommandCaller"},
+                                            {4, "WRTL0001"},
+                                            {5, told},
+                                            {6, call}});
         expectFailure(
             "--messages '" + messages.string() + "' --language '" + accepted + "' ein ORXC_CEC_CS",
             kFailed,
@@ -655,10 +564,10 @@ TEST_P(FailureRoad, LanguagesChooseTheTextAndTheToolsLocale) {
                                              : "enumInstanceNames : " + call + " : " + told);
     }
     expectFailure("--language de di " + kDisk, kNotSupported,
-                  says("MethodNotSupported", {"deleteInstance", "Test_Disk"}).english);
+                  says("MethodNotSupported", {{0, "deleteInstance"}}).english);
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, FailureRoad, ::testing::Values(kFull, kLean),
+INSTANTIATE_TEST_SUITE_P(Brokers, FailureRoad, ::testing::Values("full", "lean"),
                          [](const auto& broker) { return std::string(broker.param); });
 
 // The bundle has a text for every key that the library can look up, and for nothing else.
@@ -670,8 +579,7 @@ TEST(FailureBundle, HasEveryKeyOfTheLibrary) {
         for (std::sregex_iterator at(source.begin(), source.end(), key), end; at != end; ++at)
             used.insert((*at)[1]);
     }
-    const auto texts = nlohmann::json::parse(contents(ZEM_MESSAGES "/default_de.json"));
-    for (const auto& [name, text] : texts.items()) translated.insert(name);
+    for (const auto& [name, text] : bundle().items()) translated.insert(name);
     EXPECT_GE(used.size(), 15U);
     EXPECT_EQ(translated, used);
 }

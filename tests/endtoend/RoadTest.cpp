@@ -72,7 +72,6 @@ TEST_P(Road, ClientReadsWhatThereIsAndWhatIsWrong) {
          "CIM_ERR_NOT_FOUND (6): The requested object root/cimv2:" + foreign +
              " of class ORXC_CEC_CS can not be found. The exception was thrown from method "
              "getInstance on provider ORXC_CEC_CSProvider.\n"},
-        {"gi ORXC_Unknown.Name=1", 5, "CIM_ERR_INVALID_CLASS (5): no class ORXC_Unknown\n"},
         {"gp " + kPartition + " ElementName", 0, "\"web server\"\n"},
         {"gp " + kPartition + " OtherEnabledState", 12,
          "CIM_ERR_NO_SUCH_PROPERTY (12): OtherEnabledState\n"},
@@ -199,19 +198,6 @@ TEST_P(Road, EveryAssociationAnswersAllOperationsAndFilters) {
         EXPECT_EQ(answers(std::string("ein ") + row.name).size(), row.all) << row.name;
         EXPECT_NE(cimom(std::string("ei ") + row.name).out.find(row.farRole), std::string::npos);
     }
-}
-
-TEST_P(Road, WithoutASchemaTheFrameChecksAlone) {
-    ScopedEnvironment none("CIMOM_SCHEMA", "");
-    expectRows({
-        {"im " + kHost + " RequestStateChange Wrong=1", 1,
-         kGeneral + "Wrong method argument Wrong when invoking method RequestStateChange on "
-                    "provider ORXC_CEC_CSProvider.\"\n"},
-        {"im " + kHost + " Nonsense", 1,
-         kGeneral + "CIM_ERR_METHOD_NOT_FOUND (The invoked method  Nonsense is not supported for "
-                    "class ORXC_CEC_CS)\"\n"},
-    });
-    EXPECT_EQ(cimom("gi ORXC_Unknown.Name=1").exit, 7);
 }
 
 TEST_P(Road, TimingTraceIsWrittenWhenAskedFor) {

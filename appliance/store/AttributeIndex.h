@@ -1,9 +1,9 @@
 /// Finds the row of a table that is about an attribute of a kind of object.
 ///
-///     struct Row { unsigned kinds; const char* names; const char* value; };
-///     constexpr Row kRows[] = {{setOf(Kind::Lpar, Kind::Profile), "mem_mode,sharing_mode",
-///     "cap"}}; static const AttributeIndex<Row> index(kRows); index.find(Kind::Lpar,
-///     "mem_mode")->value;
+///     struct Row { Kinds kinds; const char* names; const char* value; };
+///     constexpr Row kRows[] = {{{Kind::Lpar, Kind::Profile}, "mem_mode,sharing_mode", "cap"}};
+///     static const AttributeIndex<Row> index(kRows);
+///     index.find(Kind::Lpar, "mem_mode")->value;
 #ifndef APPLIANCE_ATTRIBUTEINDEX_H
 #define APPLIANCE_ATTRIBUTEINDEX_H
 

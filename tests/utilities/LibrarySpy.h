@@ -12,13 +12,17 @@
 /// The operations that take no key, and those that take one; getLparProfile takes a name besides.
 // clang-format off
 #define LIBRARY_OPERATIONS(ALL, KEYED) \
-    ALL(getAllCecs) ALL(getAllLpars) ALL(getAllLparProfiles) ALL(getAllLparVirtualSerial) ALL(getAllLparVirtualScsi) ALL(getAllLparVirtualEthernet) ALL(getAllIoSlots) \
-    ALL(getAllCecMemoryCfg) ALL(getAllCecProcessorCfg) ALL(getAllCecMemoryPoolCfgs) ALL(getAllCecProcessorPoolCfg) ALL(getAllLparMemoryCfgs) ALL(getAllLparProcessorCfgs) \
-    KEYED(getCecObj) KEYED(getLparObj) KEYED(getAllLparsFromCec) KEYED(getAllLparProfilesFromLpar) KEYED(getAllLparProfilesFromCec) \
-    KEYED(getLparVirtualSerial) KEYED(getLparVirtualScsi) KEYED(getLparVirtualEthernet) KEYED(getLparIoSlots) \
-    KEYED(getVirtualSerial) KEYED(getVirtualScsi) KEYED(getVirtualEthernet) KEYED(getIoSlots) \
-    KEYED(getCecMemoryCfg) KEYED(getCecProcessorCfg) KEYED(getCecMemoryPoolCfg) KEYED(getCecProcessorPoolCfg) \
-    KEYED(getLparMemoryCfg) KEYED(getLparProcessorCfg) KEYED(getAllLparMemoryCfg) KEYED(getAllLparProcessorCfg)
+    ALL(getAllCecs) ALL(getAllLpars) ALL(getAllLparProfiles) ALL(getAllLparVirtualSerial) \
+    ALL(getAllLparVirtualScsi) ALL(getAllLparVirtualEthernet) ALL(getAllIoSlots) \
+    ALL(getAllCecMemoryCfg) ALL(getAllCecProcessorCfg) ALL(getAllCecMemoryPoolCfgs) \
+    ALL(getAllCecProcessorPoolCfg) ALL(getAllLparMemoryCfgs) ALL(getAllLparProcessorCfgs) \
+    KEYED(getCecObj) KEYED(getLparObj) KEYED(getAllLparsFromCec) \
+    KEYED(getAllLparProfilesFromLpar) KEYED(getAllLparProfilesFromCec) \
+    KEYED(getLparVirtualSerial) KEYED(getLparVirtualScsi) KEYED(getLparVirtualEthernet) \
+    KEYED(getLparIoSlots) KEYED(getVirtualSerial) KEYED(getVirtualScsi) KEYED(getVirtualEthernet) \
+    KEYED(getIoSlots) KEYED(getCecMemoryCfg) KEYED(getCecProcessorCfg) KEYED(getCecMemoryPoolCfg) \
+    KEYED(getCecProcessorPoolCfg) KEYED(getLparMemoryCfg) KEYED(getLparProcessorCfg) \
+    KEYED(getAllLparMemoryCfg) KEYED(getAllLparProcessorCfg)
 // clang-format on
 
 /// The last call, as "getCecObj(user,key,1)", what it gave, and the results not given back yet.

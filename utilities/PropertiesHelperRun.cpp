@@ -435,7 +435,8 @@ private:
         using Clock = std::chrono::steady_clock;
         pollfd watched[] = {{end.descriptor(), POLLIN, 0},
                             {m_pfdStdout.getReadingPipe(), POLLIN, 0},
-                            {m_pfdStderr.getReadingPipe(), POLLIN, 0}};
+                            {m_pfdStderr.getReadingPipe(), POLLIN, 0},
+                            {m_pfdExp.getReadingPipe(), POLLIN, 0}};
         const auto until = Clock::now() + pause;
         for (auto left = until - Clock::now(); left > left.zero(); left = until - Clock::now()) {
             const auto seconds = std::chrono::duration_cast<std::chrono::seconds>(left);

@@ -2,8 +2,7 @@
 #ifndef CIMOM_SERVER_IMPL_H
 #define CIMOM_SERVER_IMPL_H
 
-#include <cxxabi.h>
-
+#include <exception>
 #include <list>
 #include <map>
 #include <unordered_map>
@@ -153,9 +152,8 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
     } catch (const std::exception& e) {
         reply->fail(CMPI_RC_ERR_FAILED,
                     "provider " + target.provider->name() + " threw: " + e.what());
-    } catch (abi::__forced_unwind&) {
-        throw;  // a cancelled thread must end
     } catch (...) {
+        if (!std::current_exception()) throw;  // a cancelled thread must end
         reply->fail(CMPI_RC_ERR_FAILED, "provider " + target.provider->name() + " threw");
     }
     return std::move(*reply);

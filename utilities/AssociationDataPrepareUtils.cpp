@@ -2,6 +2,7 @@
 
 #include "BaseZemMultiNtoNAssociationProvider.h"
 #include "Exception.h"
+#include "LetUnwind.h"
 #include "Log.h"
 
 namespace {
@@ -9,10 +10,8 @@ namespace {
 /// Runs a hook in a destructor, which must not throw.
 template <class Hook>
 void runQuietly(Hook hook) noexcept {
-    try {
-        hook();
-    } catch (...) {
-    }
+    const zemUncancelled uncancelled;
+    zemQuietly(hook);
 }
 
 }  // namespace

@@ -2,6 +2,7 @@
 
 #include "BaseProviderText.h"
 #include "Exception.h"
+#include "LetUnwind.h"
 #include "Log.h"
 #include "TraceTool.h"
 
@@ -221,11 +222,9 @@ void zemOperationFrame::testKeys() {
 
 bool zemOperationFrame::hasKey(const char* key) const {
     if (m_row.keys == kOnInstance) {
-        try {
-            return !zemIsMissing(m_instance->getProperty(key));
-        } catch (...) {
-            return false;  // whatever the server throws over a property it does not know
-        }
+        bool has = false;  // whatever the server throws over a property it does not know
+        zemQuietly([&] { has = !zemIsMissing(m_instance->getProperty(key)); });
+        return has;
     }
     if (!zemIsMissing(zemBaseProvider::getKeyBinding(*m_path, key))) return true;
     if (m_row.keys == kOnPath) return false;

@@ -10,6 +10,7 @@
 #include "CmpiMethodMI.h"
 #include "CmpiPropertyMI.h"
 #include "CmpiStatus.h"
+#include "LetUnwind.h"
 #include "Log.h"
 
 namespace {
@@ -119,15 +120,18 @@ template <class Kind>
 typename Kind::MI* zemBaseProviderManager::getMI(CMPIBroker* mb, CMPIContext* ctx, const char* name,
                                                  CMPIStatus* status, createMI create) {
     if (status != nullptr) *status = kOK;
-    zemBaseProviderManager* manager = getProviderManager();
-    return manager != nullptr ? manager->implGetMI<Kind>(mb, ctx, name, create) : nullptr;
+    // The server, which may be written in C, cannot take an exception.
+    typename Kind::MI* record = nullptr;
+    zemQuietly([&] { record = getProviderManager()->implGetMI<Kind>(mb, ctx, name, create); });
+    return record;
 }
 
 template <class Kind>
 CMPIStatus zemBaseProviderManager::cleanupRecord(typename Kind::MI* mi, const CMPIContext* ctx,
                                                  CMPIBoolean terminating) {
-    zemBaseProviderManager* manager = getProviderManager();
-    return manager != nullptr ? manager->implCleanupMI<Kind>(mi, ctx, terminating) : kOK;
+    CMPIStatus status = {CMPI_RC_ERR_FAILED, nullptr};
+    zemQuietly([&] { status = getProviderManager()->implCleanupMI<Kind>(mi, ctx, terminating); });
+    return status;
 }
 
 template <class Kind>
@@ -210,17 +214,13 @@ zemBaseProviderManager::BaseMIItem* zemBaseProviderManager::getBaseMIItem(CMPIBr
                                                                           createMI create) {
     BaseMIItem* item = getBaseMIItem(name);
     if (item != nullptr) return item;
-    try {
-        std::unique_ptr<CmpiBaseMI> mi(create(CmpiBroker(mb), CmpiContext(ctx), name));
-        if (mi == nullptr) return nullptr;
-        addBaseMI(name, mi.get());
-        item = getBaseMIItem(name);
-        // A creation function that asks for its own name meanwhile has made another, which stays.
-        if (item->m_mi == mi.get()) static_cast<void>(mi.release());
-        return item;
-    } catch (...) {
-        return nullptr;  // the server, which may be written in C, cannot take an exception
-    }
+    std::unique_ptr<CmpiBaseMI> mi(create(CmpiBroker(mb), CmpiContext(ctx), name));
+    if (mi == nullptr) return nullptr;
+    addBaseMI(name, mi.get());
+    item = getBaseMIItem(name);
+    // A creation function that asks for its own name meanwhile has made another, which stays.
+    if (item->m_mi == mi.get()) static_cast<void>(mi.release());
+    return item;
 }
 
 void zemBaseProviderManager::addBaseMI(const char* name, CmpiBaseMI* mi) {
@@ -254,14 +254,14 @@ CMPIStatus zemBaseProviderManager::cleanupMI(const char* name, const CMPIContext
 
     const zemString ownName(name);  // the one in the list is about to go
     CmpiContext context(const_cast<CMPIContext*>(ctx));
-    CMPIrc rc = CMPI_RC_OK;
-    try {
-        rc = item->m_mi->cleanup(context).rc();
-    } catch (const CmpiStatus& status) {
-        rc = status.rc();
-    } catch (...) {
-        rc = CMPI_RC_ERR_FAILED;
-    }
+    CMPIrc rc = CMPI_RC_ERR_FAILED;
+    zemQuietly([&] {
+        try {
+            rc = item->m_mi->cleanup(context).rc();
+        } catch (const CmpiStatus& status) {
+            rc = status.rc();
+        }
+    });
     delete item->m_mi;
     forget(item, ownName);
     return {rc, nullptr};

@@ -9,6 +9,7 @@
 #include "BaseProvider.h"
 #include "BaseProviderText.h"
 #include "Exception.h"
+#include "LetUnwind.h"
 
 namespace {
 
@@ -57,11 +58,7 @@ constexpr const char* kOtherLocale = "en_US";
 zemString contextText(const CmpiContext& ctx, const char* entry) {
     zemString text;
     if (ctx.isNull()) return text;
-    try {
-        zemReadText(ctx.getEntry(entry), text);
-    } catch (...) {
-        return zemString();
-    }
+    zemQuietly([&] { zemReadText(ctx.getEntry(entry), text); });
     return text;
 }
 
@@ -112,9 +109,9 @@ public:
     bool open(const char* bundle, const char* key, const char* dfltString) {
         CMPIStatus status = {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
         if (m_broker->eft->openMessageFile != nullptr) {
-            try {
-                status = m_broker->eft->openMessageFile(m_broker, bundle, &m_handle);
-            } catch (...) {
+            const bool answered = zemQuietly(
+                [&] { status = m_broker->eft->openMessageFile(m_broker, bundle, &m_handle); });
+            if (!answered) {
                 m_handle = nullptr;
                 return false;
             }
@@ -135,29 +132,25 @@ public:
         if (m_broker->eft->getMessage2 == nullptr) return false;
         CMPICount count = 0;
         while (count < kMaxInserts && a[count] != nullptr) ++count;
-        try {
+        bool found = false;
+        zemQuietly([&] {
             CMPIStatus status = {CMPI_RC_OK, nullptr};
             CMPIString* message = m_broker->eft->getMessage2(
                 m_broker, key, m_handle, dfltString, &status, count, CMPI_chars, a[0], CMPI_chars,
                 a[1], CMPI_chars, a[2], CMPI_chars, a[3], CMPI_chars, a[4], CMPI_chars, a[5],
                 CMPI_chars, a[6], CMPI_chars, a[7], CMPI_chars, a[8], CMPI_chars, a[9]);
-            if (status.rc != CMPI_RC_OK || message == nullptr) return false;
+            if (status.rc != CMPI_RC_OK || message == nullptr) return;
             const char* chars = message->ft->getCharPtr(message, nullptr);
             if (chars != nullptr) text = chars;
+            found = chars != nullptr;
             message->ft->release(message);
-            return chars != nullptr;
-        } catch (...) {
-            return false;
-        }
+        });
+        return found;
     }
 
     void close() {
         if (m_handle == nullptr || m_broker->eft->closeMessageFile == nullptr) return;
-        try {
-            m_broker->eft->closeMessageFile(m_broker, m_handle);
-        } catch (...) {
-            // The text is there, or the default will do: a failed close changes nothing.
-        }
+        zemQuietly([&] { m_broker->eft->closeMessageFile(m_broker, m_handle); });
         m_handle = nullptr;
     }
 
@@ -274,12 +267,10 @@ void zemBaseProvider::logMessage(CMPIBroker* brkr, const char* providerName, int
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_STRING(4, "LOG MESSAGE: %s", message.c_str());
     if (brkr->eft == nullptr || brkr->eft->logMessage == nullptr) return;
-    try {
+    zemQuietly([&] {
         brkr->eft->logMessage(brkr, static_cast<CMPISeverity>(severity), providerName,
                               message.c_str(), nullptr);
-    } catch (...) {
-        // A server that cannot log must not change the outcome of the operation.
-    }
+    });
 }
 
 void zemBaseProvider::logICUMessage(const CmpiContext& ctx, int severity, const char* msgId,
@@ -301,16 +292,15 @@ void zemBaseProvider::logICUMessage(CMPIBroker* brkr, CMPIContext* ctx, const ch
     if (brkr == nullptr) return;
     zemString text(dfltString);
     if (ctx != nullptr) {
-        try {
+        const bool answered = zemQuietly([&] {
             CMPIValue yes = {};
             yes.boolean = 1;
             ctx->ft->addEntry(ctx, "UseProcessLocale", &yes, CMPI_boolean);
             text =
                 retrieveLocalizedString(brkr, providerName, msgBundle, msgKey, dfltString, 0, arg0,
                                         arg1, arg2, arg3, arg4, arg5, arg6, arg7, arg8, arg9);
-        } catch (...) {
-            text = dfltString;
-        }
+        });
+        if (!answered) text = dfltString;
     }
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_STRING(4, "LOG ICU MESSAGE %s: %s", zemOrEmpty(msgKey),

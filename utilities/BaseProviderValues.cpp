@@ -12,6 +12,7 @@
 #include "BaseProvider.h"
 #include "BaseProviderText.h"
 #include "Exception.h"
+#include "LetUnwind.h"
 #include "PropertiesHelper.h"
 
 namespace {
@@ -317,30 +318,22 @@ CmpiObjectPath zemBaseProvider::createObjectPath(const zemString& source) {
 }
 
 CmpiData zemBaseProvider::getKeyBinding(const CmpiObjectPath& path, const char* name) {
-    try {
-        return path.getKey(name);
-    } catch (...) {
-        return CmpiData();
-    }
+    CmpiData value;
+    zemQuietly([&] { value = path.getKey(name); });
+    return value;
 }
 
 CmpiData zemBaseProvider::getParmVal(const CmpiArgs& args, const char* name) const {
-    try {
-        const CmpiData value = args.getArg(name);
-        if (!zemIsMissing(value)) return value;
-    } catch (...) {
-        // Missing, in the way of some servers.
-    }
+    CmpiData value;  // missing, as which some servers throw
+    zemQuietly([&] { value = args.getArg(name); });
+    if (!zemIsMissing(value)) return value;
     throwParameterNotFoundExc(name);
 }
 
 CmpiData zemBaseProvider::getPropVal(const CmpiInstance& instance, const char* name) const {
-    try {
-        const CmpiData value = instance.getProperty(name);
-        if (!zemIsMissing(value)) return value;
-    } catch (...) {
-        // Missing, in the way of some servers.
-    }
+    CmpiData value;
+    zemQuietly([&] { value = instance.getProperty(name); });
+    if (!zemIsMissing(value)) return value;
     throwPropertyNotFoundExc(zemClassOf(instance), name);
 }
 

@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "LetUnwind.h"
 #include "Log.h"
 #include "cmpift.h"
 
@@ -84,9 +85,7 @@ void zemProviderTracer::_trace(CMPIBroker* broker, int level, const char* compon
     zemLog::Log(line);
 
     if (broker == nullptr || broker->eft == nullptr || broker->eft->trace == nullptr) return;
-    try {
+    zemQuietly([&] {
         broker->eft->trace(broker, static_cast<CMPILevel>(level), component, message, nullptr);
-    } catch (...) {
-        // Tracing must never change the outcome of the operation being traced.
-    }
+    });
 }

@@ -2,6 +2,7 @@
 #include <string>
 
 #include "DNXApiCaller.h"
+#include "LetUnwind.h"
 #include "NwplatCmdCaller.h"
 #include "QymoveCmdCaller.h"
 #include "QyplatCmdCaller.h"
@@ -208,5 +209,6 @@ bool zemHostSystem::IsUnusedLparId(const zemString& lparId) try {
 } catch (const zemException&) {
     return false;  // the library cannot tell
 } catch (...) {
+    zemLetUnwind();
     return true;  // up to here no partition had the number
 }

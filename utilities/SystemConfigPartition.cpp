@@ -4,6 +4,7 @@
 
 #include "DNXApiCaller.h"
 #include "EdplatCmdCaller.h"
+#include "LetUnwind.h"
 #include "PropertiesHelper.h"
 #include "QymoveCmdCaller.h"
 #include "QyplatCmdCaller.h"
@@ -248,6 +249,7 @@ int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
     constexpr double kSentAll = 90.0;
     return sent + left > 0 ? static_cast<int>(std::lround(sent / (sent + left) * kSentAll)) : 0;
 } catch (...) {
+    zemLetUnwind();
     return -1;
 }
 

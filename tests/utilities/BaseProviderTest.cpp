@@ -1,3 +1,4 @@
+#include <cstring>
 #include <tuple>
 
 #include "ProviderHarness.h"
@@ -338,6 +339,44 @@ TEST_P(BaseProvider, TimesItsOperations) {
     EXPECT_NE("none", number("enumInstances" + key, "end"));
     EXPECT_NE(number("enumInstances" + key, "begin"), number("enumInstances" + key, "end"));
     EXPECT_EQ("none", number("enumInstanceNames" + key, "end"));
+}
+
+// A thread is cancelled inside the worker and inside each function of the server that is called
+// around it, once while a failure is being handled. It ends as cancelled, and the process lives.
+TEST_P(BaseProvider, LetsACancelledThreadEnd) {
+    static const char* where = nullptr;
+    static const auto cancelAt = [](const char* place) {
+        if (std::strstr(place, where) == nullptr) return CMPIStatus{CMPI_RC_OK, nullptr};
+        pthread_cancel(pthread_self());
+        pthread_testcancel();
+        return CMPIStatus{CMPI_RC_OK, nullptr};
+    };
+    static CMPIBrokerEncFT table;  // outlives the test, whose end traces
+    table = *h.server.broker()->eft;
+    table.trace = [](auto, auto, auto, const char* text, auto) { return cancelAt(text); };
+    table.logMessage = [](auto, auto, auto, auto, auto) { return cancelAt("logMessage"); };
+    table.openMessageFile = [](auto, auto, CMPIMsgFileHandle*) { return cancelAt("openMessage"); };
+    h.server.broker()->eft = &table;
+    script.actions["performEnumInstanceNames"] = [] {
+        cancelAt("worker");
+        throw zemObjectNotFoundException("x");
+    };
+    for (const char* place : {"worker", "ENUMERATE INSTANCE NAMES", "CMPI_RC_ERR_NOT_FOUND",
+                              "logMessage", "openMessage"}) {
+        SCOPED_TRACE(where = place);
+        script.instanceClass = std::strcmp(place, "openMessage") != 0;
+        pthread_t thread = {};
+        const auto run = [](void* harness) -> void* {
+            auto& on = *static_cast<Harness*>(harness);
+            on.instance->ft->enumerateInstanceNames(on.instance, on.ctx(), nullptr, on.classPath());
+            pthread_testcancel();
+            return nullptr;
+        };
+        ASSERT_EQ(0, pthread_create(&thread, nullptr, run, &h));
+        void* end = nullptr;
+        pthread_join(thread, &end);
+        EXPECT_EQ(PTHREAD_CANCELED, end);
+    }
 }
 
 ON_BOTH_BROKERS(BaseProvider);

@@ -10,10 +10,16 @@ if(NOT CMAKE_BUILD_TYPE AND NOT CMAKE_CONFIGURATION_TYPES)
   set(CMAKE_BUILD_TYPE Release CACHE STRING "Build type" FORCE)
 endif()
 
-# Programs and libraries of one build lie together, so that tools find each other.
+# Programs and libraries of one build lie together, so that tools find each other. They lie as the
+# installed ones do, and one search path does for both: CMake would pad that of the build with
+# colons, and what is empty between two of them stands for the current folder.
 set(CMAKE_RUNTIME_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
 set(CMAKE_LIBRARY_OUTPUT_DIRECTORY ${CMAKE_BINARY_DIR}/lib)
-set(CMAKE_INSTALL_RPATH "$ORIGIN:$ORIGIN/../${CMAKE_INSTALL_LIBDIR}")
+file(RELATIVE_PATH zem_libdir ${CMAKE_INSTALL_FULL_BINDIR} ${CMAKE_INSTALL_FULL_LIBDIR})
+set(CMAKE_INSTALL_RPATH $ORIGIN $ORIGIN/../lib $ORIGIN/${zem_libdir})
+list(REMOVE_DUPLICATES CMAKE_INSTALL_RPATH)
+set(CMAKE_INSTALL_RPATH_USE_LINK_PATH ON)
+set(CMAKE_BUILD_WITH_INSTALL_RPATH ON)
 
 find_program(ZEM_CCACHE ccache)
 if(ZEM_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
@@ -26,7 +32,13 @@ find_package(Threads REQUIRED)
 if(ZEM_SANITIZE)
   add_compile_options(-fsanitize=${ZEM_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
   add_link_options(-fsanitize=${ZEM_SANITIZE})
+else()
+  # What is shipped is hardened; a debug build stays as its debugger likes it.
+  add_compile_options("$<$<NOT:$<CONFIG:Debug>>:-fstack-protector-strong;-U_FORTIFY_SOURCE;-D_FORTIFY_SOURCE=2>")
+  add_link_options(-Wl,-z,relro,-z,now,-z,noexecstack)
 endif()
+include(CheckPIESupported)
+check_pie_supported()
 
 # zem_target(<target>): the house's warnings on a target of ours.
 function(zem_target target)

@@ -9,26 +9,38 @@ endforeach()
 install(FILES ${zem_headers} ${CMAKE_SOURCE_DIR}/appliance/api/libapi.h
   DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/zemutilities)
 
-# The bundled binding goes along; the system's own is found again by the package.
+# The bundled binding goes along; the system's own is found again where the build found it.
 if(TARGET cmpiCppImpl)
+  set(zem_pc_cmpi_cflags "-I\${includedir}/cmpi")
+  set(zem_pc_cmpi_libs -lcmpiCppImpl)
   get_target_property(zem_cmpi_headers cmpiCppImpl PUBLIC_HEADER)
   list(TRANSFORM zem_cmpi_headers PREPEND ${CMAKE_SOURCE_DIR}/cmpi/)
   install(FILES ${zem_cmpi_headers} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/cmpi)
   set_target_properties(cmpiCppImpl PROPERTIES PUBLIC_HEADER "")
   list(APPEND zem_installed cmpiCppImpl cmpi_headers)
+else()
+  set(zem_system_cmpi ${CMPI_LIBRARY})
+  get_filename_component(zem_cmpi_libdir ${CMPI_LIBRARY} DIRECTORY)
+  set(zem_pc_cmpi_libs "-L${zem_cmpi_libdir} -lcmpiCppImpl")
+  get_target_property(zem_system_cmpi_definitions cmpi::headers INTERFACE_COMPILE_DEFINITIONS)
+  list(TRANSFORM zem_system_cmpi_definitions PREPEND -D OUTPUT_VARIABLE zem_pc_cmpi_cflags)
+  list(JOIN zem_pc_cmpi_cflags " " zem_pc_cmpi_cflags)
+  string(PREPEND zem_pc_cmpi_cflags "-I${CMPI_INCLUDE_DIR} ")
 endif()
 
 install(TARGETS ${zem_installed} EXPORT zemutilities
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
   RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
 install(TARGETS cimom appliance appliance_tools RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
-install(TARGETS zemproviders LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}/zemutilities)
+# A CIM server looks for providers among the libraries, and so does cimom, wherever the registration
+# lies.
+install(TARGETS zemproviders LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
 install(FILES ${CMAKE_SOURCE_DIR}/providers/zemproviders.json
-  DESTINATION ${CMAKE_INSTALL_LIBDIR}/zemutilities)
+  DESTINATION ${CMAKE_INSTALL_DATADIR}/zemutilities)
 install(DIRECTORY ${CMAKE_SOURCE_DIR}/providers/mof ${CMAKE_SOURCE_DIR}/providers/messages
   DESTINATION ${CMAKE_INSTALL_DATADIR}/zemutilities)
-install(FILES README.md docs/architecture.md docs/appliance.md docs/writing-a-provider.md
-  DESTINATION ${CMAKE_INSTALL_DOCDIR})
+install(FILES README.md DESTINATION ${CMAKE_INSTALL_DOCDIR})
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DOCDIR})
 
 set(zem_package ${CMAKE_INSTALL_LIBDIR}/cmake/zemutilities)
 install(EXPORT zemutilities FILE zemutilitiesTargets.cmake NAMESPACE zem:: DESTINATION ${zem_package})

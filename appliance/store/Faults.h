@@ -3,8 +3,9 @@
 ///
 /// The plans stand in the file "faults" in the folder APPLIANCE_HOME, beside the state, so that
 /// they work on a state that is missing or broken too. Safe from any thread and process: each call
-/// locks the file. Where there is no such file, and where the caller may not write to it, nothing
-/// is planned.
+/// locks the file. Nothing is planned where there is no such file, where the caller may not write
+/// to it, and where another holds its lock for over two seconds. Other users may write to it, and
+/// their tools fail as planned, when it was made under an umask that lets them.
 #ifndef APPLIANCE_FAULTS_H
 #define APPLIANCE_FAULTS_H
 
@@ -26,13 +27,14 @@ struct PlannedFault {
 };
 
 /// Puts @p fault in the place of what was planned for that name.
-/// @throws Failure NoHome, StateUnusable; BadValue for a name or text with a line break or a tab
+/// @throws Failure NoHome, StateUnusable, StateBusy; BadValue for a name or text with a line break
+/// or a tab
 void planFault(const PlannedFault& fault);
 
-/// @throws Failure NoHome, StateUnusable
+/// @throws Failure NoHome, StateUnusable, StateBusy
 std::vector<PlannedFault> plannedFaults();
 
-/// @throws Failure NoHome, StateUnusable
+/// @throws Failure NoHome, StateUnusable, StateBusy
 void clearFaults();
 
 /// Counts one call of @p name, and gives what is planned for it. Never throws but std::bad_alloc.

@@ -224,13 +224,15 @@ const char* kindName(Kind kind) { return kKindNames[static_cast<std::size_t>(kin
 
 Object::Object(Kind kind, Place place, std::string attributes)
     : m_kind(kind), m_place(place), m_attributes(std::move(attributes)) {
-    if (m_attributes.empty()) m_attributes = "\n";
+    // What is stored may have been written by others: every line has both its ends from here on.
+    if (m_attributes.empty() || m_attributes.front() != '\n') m_attributes.insert(0, 1, '\n');
+    if (m_attributes.back() != '\n') m_attributes += '\n';
 }
 
 std::size_t Object::find(std::string_view name, std::size_t* size) const {
     for (std::size_t begin = 1; begin < m_attributes.size();) {
         const std::size_t equals = begin + name.size();
-        const std::size_t end = std::min(m_attributes.find('\n', begin), m_attributes.size());
+        const std::size_t end = m_attributes.find('\n', begin);
         if (equals < end && m_attributes[equals] == '=' &&
             m_attributes.compare(begin, name.size(), name) == 0) {
             *size = end - equals - 1;
@@ -282,8 +284,10 @@ std::vector<std::pair<std::string_view, std::string_view>> Object::settings() co
     const std::string_view lines = m_attributes;
     for (std::size_t begin = 1; begin < lines.size();) {
         const std::size_t equals = lines.find('=', begin), end = lines.find('\n', begin);
-        all.emplace_back(lines.substr(begin, equals - begin),
-                         lines.substr(equals + 1, end - equals - 1));
+        if (equals < end) {
+            all.emplace_back(lines.substr(begin, equals - begin),
+                             lines.substr(equals + 1, end - equals - 1));
+        }
         begin = end + 1;
     }
     return all;

@@ -37,6 +37,18 @@ std::filesystem::path home() {
     return folder;
 }
 
+/// Whether there is a state, in a file that can be opened: with a pipe or a device in its place,
+/// opening would wait for ever.
+/// @throws Failure StateUnusable
+bool isThere(const std::filesystem::path& file) {
+    std::error_code error;
+    const auto type = std::filesystem::status(file, error).type();
+    if (type == std::filesystem::file_type::not_found) return false;
+    if (type == std::filesystem::file_type::regular) return true;
+    throw Failure(Fault::StateUnusable,
+                  {file.string(), error ? error.message() : "it is no regular file"});
+}
+
 /// The objects of @p kind for which @p condition holds, whose parameters are @p values.
 template <typename... Values>
 std::vector<Object> select(Database& database, Kind kind, const char* condition,
@@ -64,11 +76,7 @@ std::int64_t Store::version() {
 
 Store Store::open(Database::Access access) {
     const auto file = home() / "appliance.db";
-    std::error_code error;
-    if (!std::filesystem::exists(file, error)) {
-        if (error) throw Failure(Fault::StateUnusable, {file.string(), error.message()});
-        throw Failure(Fault::NoState, {home().string()});
-    }
+    if (!isThere(file)) throw Failure(Fault::NoState, {home().string()});
     Store store(std::make_unique<Database>(file.string(), access));
     const std::int64_t version = store.version();
     if (version == 0) throw Failure(Fault::NoState, {home().string()});
@@ -83,6 +91,7 @@ Store Store::create() {
     std::error_code error;
     std::filesystem::create_directories(home(), error);
     if (error) throw Failure(Fault::StateUnusable, {home().string(), error.message()});
+    isThere(file);
     return Store(std::make_unique<Database>(file.string(), Database::Access::Create));
 }
 

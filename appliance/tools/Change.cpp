@@ -48,7 +48,10 @@ const HostView& Change::view(std::int64_t host) {
     std::unique_ptr<HostView>& view = m_session->views[host];
     if (!view) {
         Store& store = m_session->store;
-        view = std::make_unique<HostView>(store, *store.find(Kind::Host, {host, 0, 0}));
+        std::optional<Object> found = store.find(Kind::Host, {host, 0, 0});
+        refuseIf(!found, Fault::StateUnusable,
+                 {"appliance.db", "host " + std::to_string(host) + " is missing"});
+        view = std::make_unique<HostView>(store, std::move(*found));
     }
     return *view;
 }

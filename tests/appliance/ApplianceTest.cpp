@@ -49,6 +49,40 @@ TEST_F(ApplianceTest, EndsWithTheStatusThatTheHelpNames) {
     }
 }
 
+TEST_F(ApplianceTest, WhatOthersLeaveInItsFolderNeitherStopsNorMisleadsIt) {
+    make("init");
+    const std::string before = shown();
+    const auto damage = [&](const char* sql) {
+        const auto file = m_appliance.folder() / "appliance/appliance.db";
+        Database(file.string(), Database::Access::Write).execute(sql);
+    };
+    damage("UPDATE object SET attributes = 'stray' || rtrim(attributes, char(10))");
+    EXPECT_EQ(before, shown());
+    damage("UPDATE object SET lpar = 1 WHERE kind = 'host'");
+    const struct {
+        const char* command;  ///< in the appliance's folder
+        int exit;
+        const char* answer;  ///< its beginning
+    } rows[] = {
+        {"edplat -r sys -m alpha -i power_off_policy=1", 3, "WRTL2005 "},
+        {"umask 022; appliance fault qyplat --code 1; stat -c %a faults", 0, "600\n"},
+        {"chmod 666 faults; appliance fault; stat -c %a faults", 0,
+         "qyplat: 1 calls, code 1\n666\n"},
+        {"flock faults sleep 20 & sleep .1; timeout 10 qylink -r all -F state; kill $!", 0, "Conn"},
+        {"rm faults; ln -s linked faults; appliance fault qyplat --code 1", 3, "WRTL2005 "},
+        {"! ls linked", 0, ""},
+        {"rm faults; mkfifo faults; timeout 10 appliance fault", 3, "WRTL2005 "},
+        {"timeout 10 qylink -r all -F state", 0, "Connected"},
+        {"rm appliance.db*; mkfifo appliance.db; timeout 10 qyplat -r sys", 3, "WRTL2005 "},
+        {"timeout 10 appliance init --force", 3, "WRTL2005 "},
+    };
+    for (const auto& row : rows) {
+        const auto outcome = run("cd $APPLIANCE_HOME; " + std::string(row.command));
+        EXPECT_EQ(row.exit, outcome.exit) << row.command << outcome.err;
+        EXPECT_EQ(0U, (outcome.out + outcome.err).find(row.answer)) << row.command << outcome.err;
+    }
+}
+
 TEST_F(ApplianceTest, TheSameSeedMakesTheSameAppliance) {
     const auto made = [&](const std::string& options) {
         const std::string generate = "appliance generate --force --hosts 3 --lpars 40 ";

@@ -6,6 +6,7 @@
 
 #include "BaseProviderText.h"
 #include "Exception.h"
+#include "LetUnwind.h"
 #include "ProviderTracer.h"
 #include "TraceTool.h"
 
@@ -70,13 +71,20 @@ constexpr StatusRow kStatusRows[] = {
 
 }  // namespace
 
-zemBrokerTiming::zemBrokerTiming(const char* mark, const char* className)
-    : m_loger(CTimeLogerManager::getInstance()->getLogger("brokerCaller")),
-      m_id(std::string(mark) + className) {
-    m_loger->begin(m_id.c_str());
+zemBrokerTiming::zemBrokerTiming(const char* mark, const char* className) {
+    CTimeLogerManager* const manager = CTimeLogerManager::getInstance();
+    if (!manager->isEnabled()) return;
+    m_id = std::string(mark) + className;
+    CTimeLoger* const loger = manager->getLogger("brokerCaller");
+    loger->begin(m_id.c_str());
+    m_loger = loger;
 }
 
-zemBrokerTiming::~zemBrokerTiming() { m_loger->end(m_id.c_str()); }
+zemBrokerTiming::~zemBrokerTiming() {
+    if (m_loger == nullptr) return;
+    const zemUncancelled uncancelled;
+    zemQuietly([this] { m_loger->end(m_id.c_str()); });
+}
 
 zemAssociationCall::zemAssociationCall(const zemBaseProvider& provider, const char* providerName,
                                        CmpiBroker& broker, int operation, const CmpiContext& ctx,
@@ -99,7 +107,10 @@ zemAssociationCall::zemAssociationCall(const zemBaseProvider& provider, const ch
                                    m_function);
 }
 
-zemAssociationCall::~zemAssociationCall() { traceExit(); }
+zemAssociationCall::~zemAssociationCall() {
+    const zemUncancelled uncancelled;
+    zemQuietly([this] { traceExit(); });
+}
 
 void zemAssociationCall::traceExit() {
     if (m_exited) return;
@@ -143,7 +154,7 @@ std::vector<CmpiObjectPath> zemAssociationCall::paths(const char* nameSpace,
     std::vector<CmpiObjectPath> result;
     CmpiEnumeration names = enumInstanceNames(classPath(nameSpace, className), className);
     while (names.hasNext()) {
-        result.push_back(names.getNext().getObjectPath());
+        result.push_back(zemNextPath(names));
         place(result.back(), nameSpace);
     }
     return result;
@@ -212,10 +223,15 @@ bool zemIsOfClass(const CmpiObjectPath& path, const char* className) {
            zemPathIsA(path, className);
 }
 
+CmpiObjectPath zemNextPath(CmpiEnumeration& paths) { return paths.getNext().getObjectPath(); }
+
+CmpiInstance zemNextInstance(CmpiEnumeration& instances) {
+    return instances.getNext().getInstance();
+}
+
 zemAssociationCandidate zemNextCandidate(CmpiEnumeration& enumeration, bool instances) {
-    const CmpiData next = enumeration.getNext();
-    if (!instances) return {next.getObjectPath(), std::nullopt};
-    const CmpiInstance instance = next.getInstance();
+    if (!instances) return {zemNextPath(enumeration), std::nullopt};
+    const CmpiInstance instance = zemNextInstance(enumeration);
     return {instance.getObjectPath(), instance};
 }
 

@@ -8,6 +8,7 @@
 #ifndef ZEM_ASSOCIATION_SUPPORT_H
 #define ZEM_ASSOCIATION_SUPPORT_H
 
+#include <memory>
 #include <optional>
 #include <string>
 #include <vector>
@@ -15,12 +16,14 @@
 #include "AssociationOperations.h"
 #include "BaseProvider.h"
 #include "BaseProviderText.h"
+#include "DynamicArray.h"
 #include "Synchronizer.h"
 
 class CTimeLoger;
 struct zemAssociationRow;
 
-/// Brackets a call to the broker in the timing trace, under a mark for the call and a class.
+/// Brackets a call to the broker in the timing trace, under a mark for the call and a class. Does
+/// nothing while there is no such trace.
 class zemBrokerTiming {
 public:
     zemBrokerTiming(const char* mark, const char* className);
@@ -29,8 +32,8 @@ public:
     zemBrokerTiming& operator=(const zemBrokerTiming&) = delete;
 
 private:
-    CTimeLoger* const m_loger;
-    const std::string m_id;
+    CTimeLoger* m_loger = nullptr;
+    std::string m_id;
 };
 
 /// The bits of SupportedOpType for code that serves every family.
@@ -151,6 +154,13 @@ private:
     bool m_exited = false;
 };
 
+/// Hands an element over to an array, which owns it unless there is no room.
+template <class T>
+void zemAppend(zemDynamicArray<T>& array, std::unique_ptr<T> element) {
+    array.addElement(element.get());
+    static_cast<void>(element.release());
+}
+
 inline bool zemIsGiven(const char* text) { return text != nullptr && *text != '\0'; }
 
 /// A configured namespace, or that of the request where none is configured.
@@ -167,7 +177,9 @@ bool zemClassIsA(const char* nameSpace, const char* className, const char* ances
 /// derived from it.
 bool zemIsOfClass(const CmpiObjectPath& path, const char* className);
 
-/// The next element of an enumeration of instances or of paths.
+/// The next element of an enumeration of paths, of instances, or of either.
+CmpiObjectPath zemNextPath(CmpiEnumeration& paths);
+CmpiInstance zemNextInstance(CmpiEnumeration& instances);
 zemAssociationCandidate zemNextCandidate(CmpiEnumeration& enumeration, bool instances);
 
 /// Sets the two references of an association on its path or instance.

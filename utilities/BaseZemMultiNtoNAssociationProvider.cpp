@@ -1,6 +1,8 @@
 #include "BaseZemMultiNtoNAssociationProvider.h"
 
 #include <memory>
+#include <optional>
+#include <utility>
 
 #include "AssociationDataPrepareUtils.h"
 #include "AssociationSupport.h"
@@ -13,9 +15,14 @@ using IndexPairs = zemDynamicArray<objectPathIndexPair>;
 using Paths = zemDynamicArray<CmpiObjectPath>;
 using Pair = zemMultiNtoNAssociationPair;
 
-[[noreturn]] void throwNoHandle(const char* text) {
+constexpr const char* kNoHandle = "error occured while retrive the handle of the associated class.";
+constexpr const char* kNoTargetHandle =
+    "Error occured while retrive the handle of the associated class.";
+
+zemBaseZemInstanceProvider& given(zemBaseZemInstanceProvider* handle, const char* complaint) {
+    if (handle != nullptr) return *handle;
     throw zemOperationFailedException("zemBaseZemMultiNtoNAssociationProvider", "getInstance",
-                                      text);
+                                      complaint);
 }
 
 bool sameName(const zemString& a, const char* b) { return zemString::equalsIgnoreCase(a, b); }
@@ -24,13 +31,28 @@ bool fitsFilter(const char* filter, const zemString& name) {
     return !zemIsGiven(filter) || sameName(name, filter);
 }
 
-CmpiObjectPath classPathOf(const CmpiObjectPath& cop, const zemMultiNtoNAssociationData& side) {
-    return zemBaseProvider::createObjectPath(cop, zemNameSpaceOr(side.m_nameSpace, cop),
-                                             side.m_className);
+/// The objects of a side, from its handle; what it leaves empty in the array is no object.
+std::unique_ptr<Paths> fetch(const CmpiContext& ctx, const CmpiObjectPath& cop,
+                             const zemMultiNtoNAssociationData& side, const char* complaint) {
+    zemBaseZemInstanceProvider& handle = given(side.m_providerHandle, complaint);
+    Paths all(25);
+    handle.enumInstanceNames(ctx,
+                             zemBaseProvider::createObjectPath(
+                                 cop, zemNameSpaceOr(side.m_nameSpace, cop), side.m_className),
+                             all, cop);
+    auto objects = std::make_unique<Paths>(all.size(), 25, 1);  // so that adding cannot fail
+    for (int i = 0; i < all.size(); ++i)
+        if (all[i] != nullptr) objects->addElement(all[i]);
+    all.relinquishOwnership();
+    return objects;
 }
 
+}  // namespace
+
+// ---- What both bases do -------------------------------------------------------------------------
+
 /// Makes paths like that of a request, for as many associations as there are, reading it once.
-class PathsLike {
+class zemProviderPairAssociation::PathsLike {
 public:
     explicit PathsLike(const CmpiObjectPath& cop)
         : m_className(zemClassOf(cop)),
@@ -50,42 +72,30 @@ private:
     const zemString m_host;
 };
 
-}  // namespace
-
-// ---- What both bases do -------------------------------------------------------------------------
-
-template <class Provider>
-zemProviderPairAssociation<Provider>::zemProviderPairAssociation(
-    const CmpiBroker& mb, const CmpiContext& ctx, const char* name,
-    SupportedOpType supportedOperations)
+zemProviderPairAssociation::zemProviderPairAssociation(const CmpiBroker& mb, const CmpiContext& ctx,
+                                                       const char* name,
+                                                       SupportedOpType supportedOperations)
     : CmpiBaseMI(mb, ctx),
       zemBaseZemInstanceProvider(mb, ctx, name),
       m_supportedOperations(supportedOperations) {}
 
-template <class Provider>
-CMPIBoolean zemProviderPairAssociation<Provider>::isValidInstanceClass(const char* name) {
+CMPIBoolean zemProviderPairAssociation::isValidInstanceClass(const char* name) {
     return m_associationDataSet.isFoundClassName(name) &&
            (m_supportedOperations & OP_AllInstOps) != 0;
 }
 
-template <class Provider>
-CMPIBoolean zemProviderPairAssociation<Provider>::isValidAssociationClass(const char* name) {
+CMPIBoolean zemProviderPairAssociation::isValidAssociationClass(const char* name) {
     return m_associationDataSet.isFoundClassName(name) &&
            (m_supportedOperations & (OP_OnlyAssocOps | OP_OnlyRefOps)) != 0;
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::populateEssentialKeys(const char*, CmpiArray& keys) {
+void zemProviderPairAssociation::populateEssentialKeys(const char*, CmpiArray& keys) {
     zemListReferences(keys, getLeftRefPropName(), getRightRefPropName());
 }
 
-template <class Provider>
-const char* zemProviderPairAssociation<Provider>::getMessageBundlePath() {
-    return "";
-}
+const char* zemProviderPairAssociation::getMessageBundlePath() { return ""; }
 
-template <class Provider>
-zemBaseZemInstanceProvider* zemProviderPairAssociation<Provider>::getProviderHandleByClassName(
+zemBaseZemInstanceProvider* zemProviderPairAssociation::getProviderHandleByClassName(
     const char* name) const {
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
@@ -95,8 +105,7 @@ zemBaseZemInstanceProvider* zemProviderPairAssociation<Provider>::getProviderHan
     return nullptr;
 }
 
-template <class Provider>
-bool zemProviderPairAssociation<Provider>::findClassBySide(const char* name, bool isLeft) const {
+bool zemProviderPairAssociation::findClassBySide(const char* name, bool isLeft) const {
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
         if (sameName((isLeft ? pair.m_leftAssiData : pair.m_rightAssiData).m_className, name))
@@ -105,9 +114,8 @@ bool zemProviderPairAssociation<Provider>::findClassBySide(const char* name, boo
     return false;
 }
 
-template <class Provider>
-bool zemProviderPairAssociation<Provider>::hasRelationShipBetweenTwoClass(const char* left,
-                                                                          const char* right) const {
+bool zemProviderPairAssociation::hasRelationShipBetweenTwoClass(const char* left,
+                                                                const char* right) const {
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
         if (sameName(pair.m_leftAssiData.m_className, left) &&
@@ -117,34 +125,26 @@ bool zemProviderPairAssociation<Provider>::hasRelationShipBetweenTwoClass(const 
     return false;
 }
 
-template <class Provider>
-zemString zemProviderPairAssociation<Provider>::getLeftRefPropName() const {
+zemString zemProviderPairAssociation::getLeftRefPropName() const {
     const Pair* const first = m_associationDataSet.getAssoPairByID(0);
     return first != nullptr ? first->m_leftAssiData.m_assoPropname : zemString();
 }
 
-template <class Provider>
-zemString zemProviderPairAssociation<Provider>::getRightRefPropName() const {
+zemString zemProviderPairAssociation::getRightRefPropName() const {
     const Pair* const first = m_associationDataSet.getAssoPairByID(0);
     return first != nullptr ? first->m_rightAssiData.m_assoPropname : zemString();
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::getCopsByClassName(const CmpiContext& ctx,
-                                                              const CmpiObjectPath& cop,
-                                                              const Pair& pair, Paths& cops,
-                                                              CachedNames& cache1,
-                                                              CachedPaths& cache2, bool isLeft) {
+void zemProviderPairAssociation::getCopsByClassName(const CmpiContext& ctx,
+                                                    const CmpiObjectPath& cop, const Pair& pair,
+                                                    Paths& cops, CachedNames& cache1,
+                                                    CachedPaths& cache2, bool isLeft) {
     const zemMultiNtoNAssociationData& side = isLeft ? pair.m_leftAssiData : pair.m_rightAssiData;
     int at = 0;
     while (at < cache1.size() && !sameName(*cache1[at], side.m_className)) ++at;
     if (at == cache1.size()) {
-        if (side.m_providerHandle == nullptr)
-            throwNoHandle("error occured while retrive the handle of the associated class.");
-        auto fetched = std::make_unique<Paths>(25);
-        side.m_providerHandle->enumInstanceNames(ctx, classPathOf(cop, side), *fetched, cop);
-        cache2.addElement(fetched.release());
-        cache1.addElement(new zemString(side.m_className));
+        zemAppend(cache2, fetch(ctx, cop, side, kNoHandle));
+        zemAppend(cache1, std::make_unique<zemString>(side.m_className));
     }
     // assigning takes the ownership along: give it back to the cache
     Paths& cached = *cache2[at];
@@ -153,100 +153,67 @@ void zemProviderPairAssociation<Provider>::getCopsByClassName(const CmpiContext&
     cached.reSetOwership();
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::setValidAssociationKeys(const CmpiObjectPath& cop,
-                                                                   const Paths& lefts,
-                                                                   const Paths& rights,
-                                                                   const IndexPairs& pairs,
-                                                                   Paths& out) {
-    const PathsLike request(cop);
-    for (int i = 0; i < pairs.size(); ++i) {
-        auto ncop = std::make_unique<CmpiObjectPath>(request.make());
-        self().addKeys(*ncop, *lefts[pairs[i]->m_copsIndex1], *rights[pairs[i]->m_copsIndex2],
-                       request.className());
-        out.addElement(ncop.release());
-    }
+std::unique_ptr<CmpiObjectPath> zemProviderPairAssociation::associate(const PathsLike& request,
+                                                                      const CmpiObjectPath& left,
+                                                                      const CmpiObjectPath& right) {
+    auto ncop = std::make_unique<CmpiObjectPath>(request.make());
+    nameKeys(*ncop, left, right, request.className());
+    return ncop;
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::setValidAssociationProperties(
-    const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights, const IndexPairs& pairs,
-    const char** properties, void* addInfo, zemDynamicArray<CmpiInstance>& out) {
-    const PathsLike request(cop);
-    for (int i = 0; i < pairs.size(); ++i) {
-        const CmpiObjectPath& left = *lefts[pairs[i]->m_copsIndex1];
-        const CmpiObjectPath& right = *rights[pairs[i]->m_copsIndex2];
-        CmpiObjectPath ncop = request.make();
-        self().addKeys(ncop, left, right, request.className());
-        auto instance = std::make_unique<CmpiInstance>(ncop);
-        self().complete(*instance, left, right, properties, request.className(), addInfo);
-        out.addElement(instance.release());
-    }
+std::unique_ptr<CmpiInstance> zemProviderPairAssociation::associate(const PathsLike& request,
+                                                                    const CmpiObjectPath& left,
+                                                                    const CmpiObjectPath& right,
+                                                                    const char** properties,
+                                                                    void* addInfo) {
+    auto instance = std::make_unique<CmpiInstance>(*associate(request, left, right));
+    complete(*instance, left, right, properties, request.className(), addInfo);
+    return instance;
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::enumerate(zemAssociationCall& call,
-                                                     const CmpiContext& ctx,
-                                                     const CmpiObjectPath& cop,
-                                                     const Visit& visit) {
+void zemProviderPairAssociation::enumerate(zemAssociationCall& call, const Enumeration& e) {
     call.require(m_supportedOperations);
     call.guard([&] {
-        self().prepared(ctx, call.className(), cop, [&](void* addInfo) {
+        prepare(e.ctx, call.className(), e.cop, [&](void* addInfo) {
             CachedNames names(25);
             CachedPaths paths(25);
             for (int i = 0; i < m_associationDataSet.size(); ++i) {
                 const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
                 if (!pair.isOf(call.className())) continue;
                 Paths lefts(25), rights(25);
-                getCopsByClassName(ctx, cop, pair, lefts, names, paths, true);
-                getCopsByClassName(ctx, cop, pair, rights, names, paths, false);
-                IndexPairs found(25);
-                self().join(ctx, lefts, rights, pair, addInfo, found);
-                visit(lefts, rights, found, addInfo);
+                getCopsByClassName(e.ctx, e.cop, pair, lefts, names, paths, true);
+                getCopsByClassName(e.ctx, e.cop, pair, rights, names, paths, false);
+                join(e, lefts, rights, pair, addInfo);
             }
         });
     });
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::enumInstanceNames(const CmpiContext& ctx,
-                                                             const CmpiObjectPath& cop, Paths& out,
-                                                             const CmpiObjectPath&) {
+void zemProviderPairAssociation::enumInstanceNames(const CmpiContext& ctx,
+                                                   const CmpiObjectPath& cop, Paths& out,
+                                                   const CmpiObjectPath&) {
     zemAssociationCall call(*this, m_providerName, *broker, OP_EnumInstNamesOp, ctx, cop);
-    enumerate(call, ctx, cop,
-              [&](const Paths& lefts, const Paths& rights, const IndexPairs& pairs, void*) {
-                  setValidAssociationKeys(cop, lefts, rights, pairs, out);
-              });
+    enumerate(call, {ctx, cop, nullptr, &out, nullptr});
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::enumInstances(const CmpiContext& ctx,
-                                                         const CmpiObjectPath& cop,
-                                                         const char** properties,
-                                                         zemDynamicArray<CmpiInstance>& out,
-                                                         const CmpiObjectPath&) {
+void zemProviderPairAssociation::enumInstances(const CmpiContext& ctx, const CmpiObjectPath& cop,
+                                               const char** properties,
+                                               zemDynamicArray<CmpiInstance>& out,
+                                               const CmpiObjectPath&) {
     zemAssociationCall call(*this, m_providerName, *broker, OP_EnumInstsOp, ctx, cop);
-    enumerate(call, ctx, cop,
-              [&](const Paths& lefts, const Paths& rights, const IndexPairs& pairs, void* addInfo) {
-                  setValidAssociationProperties(cop, lefts, rights, pairs, properties, addInfo,
-                                                out);
-              });
+    enumerate(call, {ctx, cop, properties, nullptr, &out});
 }
 
-template <class Provider>
-bool zemProviderPairAssociation<Provider>::exists(const CmpiContext& ctx, const CmpiObjectPath& cop,
-                                                  const char** properties) {
-    zemBaseZemInstanceProvider* const handle = getProviderHandleByClassName(zemClassOf(cop));
-    if (handle == nullptr)
-        throwNoHandle("error occured while retrive the handle of the associated class.");
+bool zemProviderPairAssociation::exists(const CmpiContext& ctx, const CmpiObjectPath& cop,
+                                        const char** properties) {
+    zemBaseZemInstanceProvider& handle =
+        given(getProviderHandleByClassName(zemClassOf(cop)), kNoHandle);
     CmpiInstance instance(cop);
-    return handle->getInstance(ctx, cop, properties, instance) == 0;
+    return handle.getInstance(ctx, cop, properties, instance) == 0;
 }
 
-template <class Provider>
-int zemProviderPairAssociation<Provider>::getInstance(const CmpiContext& ctx,
-                                                      const CmpiObjectPath& cop,
-                                                      const char** properties, CmpiInstance& out) {
+int zemProviderPairAssociation::getInstance(const CmpiContext& ctx, const CmpiObjectPath& cop,
+                                            const char** properties, CmpiInstance& out) {
     zemAssociationCall call(*this, m_providerName, *broker, OP_GetInstOp, ctx, cop);
     call.require(m_supportedOperations);
     const CmpiObjectPath cop1 = call.reference(getLeftRefPropName());
@@ -260,79 +227,72 @@ int zemProviderPairAssociation<Provider>::getInstance(const CmpiContext& ctx,
                         getLeftRefPropName(),
                         isSecondClass(class2) ? none : static_cast<const char*>(text2),
                         getRightRefPropName(), call.className(), m_providerName);
-    int result = -1;
+    bool found = false;
     call.guard([&] {
         if (!exists(ctx, cop1, nullptr) || !exists(ctx, cop2, nullptr)) return;
-        self().prepared(ctx, call.className(), cop, [&](void* addInfo) {
-            for (int i = 0; i < m_associationDataSet.size() && result != 0; ++i) {
+        prepare(ctx, call.className(), cop, [&](void* addInfo) {
+            const Make make = [&](const CmpiObjectPath& left, const CmpiObjectPath& right) {
+                out = *associate(PathsLike(cop), left, right, properties, addInfo);
+            };
+            for (int i = 0; i < m_associationDataSet.size() && !found; ++i) {
                 const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
-                if (!pair.isOf(call.className()) ||
-                    !sameName(pair.m_leftAssiData.m_className, class1) ||
-                    !sameName(pair.m_rightAssiData.m_className, class2) ||
-                    !self().belongTogether(ctx, cop1, cop2, pair, addInfo))
-                    continue;
-                CmpiObjectPath ncop = createObjectPath(cop);
-                self().addKeys(ncop, cop1, cop2, call.className());
-                out = CmpiInstance(ncop);
-                self().complete(out, cop1, cop2, properties, call.className(), addInfo);
-                result = 0;
+                found = pair.isOf(call.className()) &&
+                        sameName(pair.m_leftAssiData.m_className, class1) &&
+                        sameName(pair.m_rightAssiData.m_className, class2) &&
+                        belongs(ctx, cop1, cop2, pair, addInfo, make);
             }
         });
     });
-    return result;
+    return found ? 0 : -1;
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::performAssociators(
-    const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop, const char* assocClass,
-    const char* resultClass, const char* role, const char* resultRole, const char** properties) {
+void zemProviderPairAssociation::performAssociators(const CmpiContext& ctx, CmpiResult& rslt,
+                                                    const CmpiObjectPath& cop,
+                                                    const char* assocClass, const char* resultClass,
+                                                    const char* role, const char* resultRole,
+                                                    const char** properties) {
     navigate({OP_AssocsOp, ctx, rslt, cop, properties, assocClass, resultClass, role, resultRole});
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::performAssociatorNames(
-    const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop, const char* assocClass,
-    const char* resultClass, const char* role, const char* resultRole) {
+void zemProviderPairAssociation::performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt,
+                                                        const CmpiObjectPath& cop,
+                                                        const char* assocClass,
+                                                        const char* resultClass, const char* role,
+                                                        const char* resultRole) {
     navigate({OP_AssocNamesOp, ctx, rslt, cop, nullptr, assocClass, resultClass, role, resultRole});
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::performReferences(
-    const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop, const char* resultClass,
-    const char* role, const char** properties) {
+void zemProviderPairAssociation::performReferences(const CmpiContext& ctx, CmpiResult& rslt,
+                                                   const CmpiObjectPath& cop,
+                                                   const char* resultClass, const char* role,
+                                                   const char** properties) {
     navigate({OP_RefsOp, ctx, rslt, cop, properties, resultClass, nullptr, role});
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::performReferenceNames(const CmpiContext& ctx,
-                                                                 CmpiResult& rslt,
-                                                                 const CmpiObjectPath& cop,
-                                                                 const char* resultClass,
-                                                                 const char* role) {
+void zemProviderPairAssociation::performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt,
+                                                       const CmpiObjectPath& cop,
+                                                       const char* resultClass, const char* role) {
     navigate({OP_RefNamesOp, ctx, rslt, cop, nullptr, resultClass, nullptr, role});
 }
 
-template <class Provider>
-bool zemProviderPairAssociation<Provider>::ValidateInputObjectPath(const CmpiContext& ctx,
-                                                                   const CmpiObjectPath& cop,
-                                                                   const char*,
-                                                                   const char** properties) {
+bool zemProviderPairAssociation::ValidateInputObjectPath(const CmpiContext& ctx,
+                                                         const CmpiObjectPath& cop, const char*,
+                                                         const char** properties) {
     const zemString className = zemClassOf(cop);
     return (isFirstClass(className) || isSecondClass(className)) && exists(ctx, cop, properties);
 }
 
-template <class Provider>
-bool zemProviderPairAssociation<Provider>::CheckClassNameInAssociationPair(
-    const CmpiContext& ctx, const CmpiObjectPath& cop, const Pair& pair, bool& isFirst) {
+bool zemProviderPairAssociation::CheckClassNameInAssociationPair(const CmpiContext& ctx,
+                                                                 const CmpiObjectPath& cop,
+                                                                 const Pair& pair, bool& isFirst) {
     const zemString className = zemClassOf(cop);
     const bool left = sameName(pair.m_leftAssiData.m_className, className);
     const bool right = sameName(pair.m_rightAssiData.m_className, className);
-    isFirst = left && right ? self().isFirstClassWhen2ClassTheSame(ctx, cop) : left;
+    isFirst = left && right ? standsLeft(ctx, cop) : left;
     return left || right;
 }
 
-template <class Provider>
-bool zemProviderPairAssociation<Provider>::CheckRolesAndResultClass(
+bool zemProviderPairAssociation::CheckRolesAndResultClass(
     const char* resultRole, const char* role, const char* resultClass,
     const zemMultiTargetAssociationData& target) const {
     const zemMultiNtoNAssociationData& side = target.m_AssoData;
@@ -342,10 +302,10 @@ bool zemProviderPairAssociation<Provider>::CheckRolesAndResultClass(
             zemClassIsA(side.m_nameSpace, side.m_className, resultClass));
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::collectTargets(
-    const CmpiContext& ctx, const CmpiObjectPath& cop, const char* assocClass,
-    const char* resultClass, const char* role, const char* resultRole, Targets& targets) {
+void zemProviderPairAssociation::collectTargets(const CmpiContext& ctx, const CmpiObjectPath& cop,
+                                                const char* assocClass, const char* resultClass,
+                                                const char* role, const char* resultRole,
+                                                Targets& targets) {
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
         bool isFirst = false;
@@ -354,79 +314,62 @@ void zemProviderPairAssociation<Provider>::collectTargets(
         auto target = std::make_unique<zemMultiTargetAssociationData>(pair, isFirst);
         target->m_AssoData.m_nameSpace = zemNameSpaceOr(target->m_AssoData.m_nameSpace, cop);
         if (CheckRolesAndResultClass(resultRole, role, resultClass, *target))
-            targets.addElement(target.release());
+            zemAppend(targets, std::move(target));
     }
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::navigate(const zemAssociationRequest& r) {
+void zemProviderPairAssociation::navigate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);
     call.require(m_supportedOperations);
     call.guard([&] {
         if (!ValidateInputObjectPath(r.ctx, r.cop, call.word())) return;
         Targets targets(25);
-        self().CheckAssociationOperationParameters(r.ctx, r.cop, r.assocClass, r.resultClass,
-                                                   r.role, r.resultRole, targets);
+        findTargets(r.ctx, r.cop, r.assocClass, r.resultClass, r.role, r.resultRole, targets);
         if (r.is(OP_RefsOp) && zemIsGiven(r.assocClass))
             validateProerties(createObjectPath(r.cop, r.assocClass), r.properties, call.word());
-        self().prepared(r.ctx, r.assocClass, r.cop, [&](void* addInfo) {
+        prepare(r.ctx, r.assocClass, r.cop, [&](void* addInfo) {
             for (int i = 0; i < targets.size(); ++i) visitTarget(call, r, *targets[i], addInfo);
         });
     });
 }
 
-template <class Provider>
-void zemProviderPairAssociation<Provider>::visitTarget(zemAssociationCall& call,
-                                                       const zemAssociationRequest& r,
-                                                       const zemMultiTargetAssociationData& target,
-                                                       void* addInfo) {
+void zemProviderPairAssociation::visitTarget(zemAssociationCall& call,
+                                             const zemAssociationRequest& r,
+                                             const zemMultiTargetAssociationData& target,
+                                             void* addInfo) {
     const zemMultiNtoNAssociationData& far = target.m_AssoData;
-    if (far.m_providerHandle == nullptr)
-        throwNoHandle("Error occured while retrive the handle of the associated class.");
-    Paths objects(25);
-    far.m_providerHandle->enumInstanceNames(r.ctx, classPathOf(r.cop, far), objects, r.cop);
-
+    const std::unique_ptr<Paths> objects = fetch(r.ctx, r.cop, far, kNoTargetHandle);
     const zemMultiNtoNAssociationData near(getProviderHandleByClassName(call.className()),
                                            call.className(), target.m_OtherSidePropName,
                                            zemTextOf(r.cop.getNameSpace()));
     const Pair pair(target.isFirst() ? near : far, target.isFirst() ? far : near,
                     target.m_AssoClassName, target.m_AssoNameSpace);
-    for (const int i : self().neighbours(r.ctx, r.cop, target.isFirst(), objects, pair, addInfo))
-        returnNeighbour(call, r, target, *objects[i], addInfo);
-}
-
-template <class Provider>
-void zemProviderPairAssociation<Provider>::returnNeighbour(
-    zemAssociationCall& call, const zemAssociationRequest& r,
-    const zemMultiTargetAssociationData& target, const CmpiObjectPath& found, void* addInfo) {
-    if (r.is(OP_AssocNamesOp)) {
-        r.rslt.returnData(found);
-        return;
-    }
-    if (r.is(OP_AssocsOp)) {
-        CmpiInstance instance(found);
-        if (target.m_AssoData.m_providerHandle->getInstance(r.ctx, found, r.properties, instance) ==
-            0)
-            r.rslt.returnData(instance);
-        return;
-    }
-    const CmpiObjectPath& cop1 = target.isFirst() ? r.cop : found;
-    const CmpiObjectPath& cop2 = target.isFirst() ? found : r.cop;
     const zemString className =
         target.m_AssoClassName.isEmpty() ? zemString(r.assocClass) : target.m_AssoClassName;
-    CmpiObjectPath ncop = call.classPath(zemNameSpaceOr(target.m_AssoNameSpace, r.cop), className);
-    self().addKeys(ncop, cop1, cop2, className);
-    if (r.is(OP_RefNamesOp)) {
-        r.rslt.returnData(ncop);
-        return;
-    }
-    CmpiInstance instance(ncop);
-    self().complete(instance, cop1, cop2, r.properties, className, addInfo);
-    r.rslt.returnData(instance);
-}
 
-template class zemProviderPairAssociation<zemBaseZemMultiNtoNAssociationProvider>;
-template class zemProviderPairAssociation<zemEnhanceBaseZemMultiNtoNAssociationProvider>;
+    std::optional<CmpiObjectPath> path;
+    std::optional<CmpiInstance> instance;
+    const Make make = [&](const CmpiObjectPath& left, const CmpiObjectPath& right) {
+        if (!r.is(OP_OnlyRefOps)) return;
+        path = call.classPath(zemNameSpaceOr(target.m_AssoNameSpace, r.cop), className);
+        nameKeys(*path, left, right, className);
+        if (!r.is(OP_RefsOp)) return;
+        instance = CmpiInstance(*path);
+        complete(*instance, left, right, r.properties, className, addInfo);
+    };
+    const auto returnMade = [&](const CmpiObjectPath& found) {
+        if (r.is(OP_AssocsOp)) {
+            instance = CmpiInstance(found);
+            if (far.m_providerHandle->getInstance(r.ctx, found, r.properties, *instance) != 0)
+                return;
+        }
+        if (instance)
+            r.rslt.returnData(*instance);
+        else
+            r.rslt.returnData(path ? *path : found);
+    };
+    neighbours({r.ctx, r.cop, target.isFirst(), pair, addInfo}, *objects, make, returnMade);
+}
 
 // ---- zemBaseZemMultiNtoNAssociationProvider -----------------------------------------------------
 
@@ -479,48 +422,99 @@ bool zemBaseZemMultiNtoNAssociationProvider::BeforeGenerateAssociation(const Cmp
 void zemBaseZemMultiNtoNAssociationProvider::AfterGenerateAssociation(const CmpiContext&,
                                                                       const char*) {}
 
-void zemBaseZemMultiNtoNAssociationProvider::prepared(const CmpiContext& ctx, const char* className,
-                                                      const CmpiObjectPath&,
-                                                      const std::function<void(void*)>& work) {
+/// Runs the two hooks of an operation under the lock, which is free in between.
+class zemBaseZemMultiNtoNAssociationProvider::Preparation {
+public:
+    Preparation(zemBaseZemMultiNtoNAssociationProvider& provider, const CmpiContext& ctx,
+                const char* className)
+        : m_lock(provider.m_operationLock) {
+        const zemSynchronizer hold(m_lock);
+        m_hooks.emplace(&provider, ctx, className);
+    }
+    ~Preparation() {
+        const zemSynchronizer hold(m_lock);
+        m_hooks.reset();
+    }
+    Preparation(const Preparation&) = delete;
+    Preparation& operator=(const Preparation&) = delete;
+
+    bool succeeded() const { return m_hooks->isInitialized(); }
+
+private:
+    zemSynchronizerContext& m_lock;
+    std::optional<zemAssociationDataPrepareUtility> m_hooks;
+};
+
+void zemBaseZemMultiNtoNAssociationProvider::prepare(const CmpiContext& ctx, const char* className,
+                                                     const CmpiObjectPath&, const Work& work) {
+    const Preparation preparation(*this, ctx, className);
+    if (preparation.succeeded()) work(nullptr);
+}
+
+void zemBaseZemMultiNtoNAssociationProvider::join(const Enumeration& e, const Paths& lefts,
+                                                  const Paths& rights, const Pair& pair, void*) {
     const zemSynchronizer hold(m_operationLock);
-    const zemAssociationDataPrepareUtility preparation(this, ctx, className);
-    if (preparation.isInitialized()) work(nullptr);
+    const PathsLike request(e.cop);
+    for (int i = 0; i < lefts.size(); ++i) {
+        for (int j = 0; j < rights.size(); ++j) {
+            const CmpiObjectPath& left = *lefts[i];
+            const CmpiObjectPath& right = *rights[j];
+            if (!isValidateAssociation(e.ctx, left, right, pair)) continue;
+            if (e.paths != nullptr)
+                zemAppend(*e.paths, associate(request, left, right));
+            else
+                zemAppend(*e.instances, associate(request, left, right, e.properties, nullptr));
+        }
+    }
 }
 
-void zemBaseZemMultiNtoNAssociationProvider::join(const CmpiContext& ctx, const Paths& lefts,
-                                                  const Paths& rights, const Pair& pair, void*,
-                                                  IndexPairs& pairs) {
-    for (int i = 0; i < lefts.size(); ++i)
-        for (int j = 0; j < rights.size(); ++j)
-            if (isValidateAssociation(ctx, *lefts[i], *rights[j], pair))
-                pairs.addElement(new objectPathIndexPair{i, j});
+void zemBaseZemMultiNtoNAssociationProvider::neighbours(const Source& source, const Paths& targets,
+                                                        const Make& make, const Found& found) {
+    for (int i = 0; i < targets.size(); ++i) {
+        const CmpiObjectPath& target = *targets[i];
+        if (belongs(source.ctx, source.left(target), source.right(target), source.pair, nullptr,
+                    make))
+            found(target);
+    }
 }
 
-std::set<int> zemBaseZemMultiNtoNAssociationProvider::neighbours(const CmpiContext& ctx,
-                                                                 const CmpiObjectPath& source,
-                                                                 bool isFirst, const Paths& targets,
-                                                                 const Pair& pair, void*) {
-    std::set<int> found;
-    for (int i = 0; i < targets.size(); ++i)
-        if (isValidateAssociation(ctx, isFirst ? source : *targets[i],
-                                  isFirst ? *targets[i] : source, pair))
-            found.insert(found.end(), i);
-    return found;
+bool zemBaseZemMultiNtoNAssociationProvider::belongs(const CmpiContext& ctx,
+                                                     const CmpiObjectPath& left,
+                                                     const CmpiObjectPath& right, const Pair& pair,
+                                                     void*, const Make& make) {
+    const zemSynchronizer hold(m_operationLock);
+    if (!isValidateAssociation(ctx, left, right, pair)) return false;
+    make(left, right);
+    return true;
 }
 
-bool zemBaseZemMultiNtoNAssociationProvider::belongTogether(const CmpiContext& ctx,
-                                                            const CmpiObjectPath& cop1,
-                                                            const CmpiObjectPath& cop2,
-                                                            const Pair& pair, void*) {
-    return isValidateAssociation(ctx, cop1, cop2, pair);
+void zemBaseZemMultiNtoNAssociationProvider::nameKeys(CmpiObjectPath& ncop,
+                                                      const CmpiObjectPath& left,
+                                                      const CmpiObjectPath& right,
+                                                      const char* className) {
+    addKeys(ncop, left, right, className);
 }
 
 void zemBaseZemMultiNtoNAssociationProvider::complete(CmpiInstance& inst,
-                                                      const CmpiObjectPath& cop1,
-                                                      const CmpiObjectPath& cop2,
+                                                      const CmpiObjectPath& left,
+                                                      const CmpiObjectPath& right,
                                                       const char** properties,
                                                       const char* className, void*) {
-    addProperties(inst, cop1, cop2, properties, className);
+    addProperties(inst, left, right, properties, className);
+}
+
+void zemBaseZemMultiNtoNAssociationProvider::findTargets(const CmpiContext& ctx,
+                                                         const CmpiObjectPath& cop,
+                                                         const char* assocClass,
+                                                         const char* resultClass, const char* role,
+                                                         const char* resultRole, Targets& targets) {
+    CheckAssociationOperationParameters(ctx, cop, assocClass, resultClass, role, resultRole,
+                                        targets);
+}
+
+bool zemBaseZemMultiNtoNAssociationProvider::standsLeft(const CmpiContext& ctx,
+                                                        const CmpiObjectPath& cop) {
+    return isFirstClassWhen2ClassTheSame(ctx, cop);
 }
 
 // ---- zemEnhanceBaseZemMultiNtoNAssociationProvider ----------------------------------------------
@@ -627,38 +621,91 @@ std::set<int> zemEnhanceBaseZemMultiNtoNAssociationProvider::getValidIndexSet(
     return found;
 }
 
-void zemEnhanceBaseZemMultiNtoNAssociationProvider::prepared(
-    const CmpiContext& ctx, const char* className, const CmpiObjectPath& cop,
-    const std::function<void(void*)>& work) {
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::setValidAssociationKeys(
+    const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights, const IndexPairs& pairs,
+    Paths& out) {
+    const PathsLike request(cop);
+    for (int i = 0; i < pairs.size(); ++i)
+        zemAppend(out, associate(request, *lefts[pairs[i]->m_copsIndex1],
+                                 *rights[pairs[i]->m_copsIndex2]));
+}
+
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::setValidAssociationProperties(
+    const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights, const IndexPairs& pairs,
+    const char** properties, void* addInfo, zemDynamicArray<CmpiInstance>& out) {
+    const PathsLike request(cop);
+    for (int i = 0; i < pairs.size(); ++i)
+        zemAppend(out, associate(request, *lefts[pairs[i]->m_copsIndex1],
+                                 *rights[pairs[i]->m_copsIndex2], properties, addInfo));
+}
+
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::prepare(const CmpiContext& ctx,
+                                                            const char* className,
+                                                            const CmpiObjectPath& cop,
+                                                            const Work& work) {
     zemAssociationDataPrepareUtilityPlus preparation(this, ctx, className, cop);
     work(preparation.run());
 }
 
-void zemEnhanceBaseZemMultiNtoNAssociationProvider::join(const CmpiContext& ctx, const Paths& lefts,
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::join(const Enumeration& e, const Paths& lefts,
                                                          const Paths& rights, const Pair&,
-                                                         void* addInfo, IndexPairs& pairs) {
-    pairs = findValidAssociationCopMappingPair(ctx, lefts, rights, addInfo);
+                                                         void* addInfo) {
+    const IndexPairs pairs = findValidAssociationCopMappingPair(e.ctx, lefts, rights, addInfo);
+    if (e.paths != nullptr)
+        setValidAssociationKeys(e.cop, lefts, rights, pairs, *e.paths);
+    else
+        setValidAssociationProperties(e.cop, lefts, rights, pairs, e.properties, addInfo,
+                                      *e.instances);
 }
 
-std::set<int> zemEnhanceBaseZemMultiNtoNAssociationProvider::neighbours(
-    const CmpiContext& ctx, const CmpiObjectPath& source, bool isFirst, const Paths& targets,
-    const Pair&, void* addInfo) {
-    return getValidIndexSet(ctx, source, isFirst, targets, addInfo);
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::neighbours(const Source& source,
+                                                               const Paths& targets,
+                                                               const Make& make,
+                                                               const Found& found) {
+    for (const int i :
+         getValidIndexSet(source.ctx, source.cop, source.isFirst, targets, source.addInfo)) {
+        const CmpiObjectPath& target = *targets[i];
+        make(source.left(target), source.right(target));
+        found(target);
+    }
 }
 
-bool zemEnhanceBaseZemMultiNtoNAssociationProvider::belongTogether(const CmpiContext& ctx,
-                                                                   const CmpiObjectPath& cop1,
-                                                                   const CmpiObjectPath& cop2,
-                                                                   const Pair&, void* addInfo) {
-    return getObjectPathHashKeyString(cop1, true) == getObjectPathHashKeyString(cop2, false) &&
-           isValidateAssociationPlus(ctx, cop1, cop2, addInfo) &&
-           isValidateAssociation(ctx, cop1, cop2, addInfo);
+bool zemEnhanceBaseZemMultiNtoNAssociationProvider::belongs(const CmpiContext& ctx,
+                                                            const CmpiObjectPath& left,
+                                                            const CmpiObjectPath& right,
+                                                            const Pair&, void* addInfo,
+                                                            const Make& make) {
+    if (getObjectPathHashKeyString(left, true) != getObjectPathHashKeyString(right, false) ||
+        !isValidateAssociationPlus(ctx, left, right, addInfo) ||
+        !isValidateAssociation(ctx, left, right, addInfo))
+        return false;
+    make(left, right);
+    return true;
+}
+
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::nameKeys(CmpiObjectPath& ncop,
+                                                             const CmpiObjectPath& left,
+                                                             const CmpiObjectPath& right,
+                                                             const char* className) {
+    addKeys(ncop, left, right, className);
 }
 
 void zemEnhanceBaseZemMultiNtoNAssociationProvider::complete(CmpiInstance& inst,
-                                                             const CmpiObjectPath& cop1,
-                                                             const CmpiObjectPath& cop2,
+                                                             const CmpiObjectPath& left,
+                                                             const CmpiObjectPath& right,
                                                              const char** properties,
                                                              const char* className, void* addInfo) {
-    addProperties(inst, cop1, cop2, properties, className, addInfo);
+    addProperties(inst, left, right, properties, className, addInfo);
+}
+
+void zemEnhanceBaseZemMultiNtoNAssociationProvider::findTargets(
+    const CmpiContext& ctx, const CmpiObjectPath& cop, const char* assocClass,
+    const char* resultClass, const char* role, const char* resultRole, Targets& targets) {
+    CheckAssociationOperationParameters(ctx, cop, assocClass, resultClass, role, resultRole,
+                                        targets);
+}
+
+bool zemEnhanceBaseZemMultiNtoNAssociationProvider::standsLeft(const CmpiContext& ctx,
+                                                               const CmpiObjectPath& cop) {
+    return isFirstClassWhen2ClassTheSame(ctx, cop);
 }

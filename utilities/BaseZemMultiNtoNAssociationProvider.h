@@ -32,15 +32,17 @@
 /// Failures of the handles pass through; what a CmpiStatus becomes is that of the other families.
 /// A side without a handle fails the requests that need it.
 ///
-/// Threads. The first base holds m_operationLock, one per provider, from before the Before hook to
-/// after the After hook, so that a subclass may keep in its members what it prepares. The second
-/// has no lock: what it prepares travels in the context. Providers whose handles refer to each
-/// other in a circle must be of the second kind.
+/// Threads. The hooks of the first base run under m_operationLock, one per provider: Before, After,
+/// and those for one pair of objects together. While a handle is asked the lock is free, for what
+/// the handle does may wait, through the server, for another operation of this provider. So
+/// operations interleave, and what the Before hook prepares is kept by thread, not by provider. The
+/// second base has no lock: what it prepares travels in the context.
 #ifndef BASE_ZEM_MULTI_NTON_ASSOCIATION_PROVIDER_H
 #define BASE_ZEM_MULTI_NTON_ASSOCIATION_PROVIDER_H
 
 #include <cstddef>
 #include <functional>
+#include <memory>
 #include <set>
 #include <string_view>
 #include <vector>
@@ -54,9 +56,7 @@
 class zemAssociationCall;
 struct zemAssociationRequest;
 
-/// What the two bases have in common; @p Provider is the one that derives from it. Not for use by
-/// final providers.
-template <class Provider>
+/// What the two bases have in common. Not for use by final providers.
 class ZEM_EXPORT zemProviderPairAssociation : public zemBaseZemInstanceProvider {
 public:
     ZEM_ASSOCIATION_OPERATIONS();
@@ -121,15 +121,6 @@ protected:
                             const zemMultiNtoNAssociationPair& pair, Paths& cops,
                             CachedNames& cache1, CachedPaths& cache2, bool isLeft);
 
-    /// Appends paths, resp. instances, of the associations of pairs of objects.
-    void setValidAssociationKeys(const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights,
-                                 const zemDynamicArray<objectPathIndexPair>& pairs, Paths& out);
-    void setValidAssociationProperties(const CmpiObjectPath& cop, const Paths& lefts,
-                                       const Paths& rights,
-                                       const zemDynamicArray<objectPathIndexPair>& pairs,
-                                       const char** properties, void* addInfo,
-                                       zemDynamicArray<CmpiInstance>& out);
-
     /// Whether the source exists, as the provider of its class says.
     /// @return false also for a class that is on no side
     bool ValidateInputObjectPath(const CmpiContext& ctx, const CmpiObjectPath& cop,
@@ -149,26 +140,76 @@ protected:
     SupportedOpType m_supportedOperations;
     zemMultiNtoNAssociationDataSet m_associationDataSet;
 
-private:
-    using PairOfSides = zemMultiNtoNAssociationPair;
-    using Visit =
-        std::function<void(const Paths& lefts, const Paths& rights,
-                           const zemDynamicArray<objectPathIndexPair>& pairs, void* addInfo)>;
+    /// An enumeration: of paths, or of instances where there is no array for paths.
+    struct Enumeration {
+        const CmpiContext& ctx;
+        const CmpiObjectPath& cop;
+        const char** properties;
+        Paths* paths;
+        zemDynamicArray<CmpiInstance>* instances;
+    };
+    /// The source of a navigation, on its side of a pair.
+    struct Source {
+        const CmpiContext& ctx;
+        const CmpiObjectPath& cop;
+        bool isFirst;
+        const zemMultiNtoNAssociationPair& pair;
+        void* addInfo;
 
-    Provider& self() { return static_cast<Provider&>(*this); }
-    void enumerate(zemAssociationCall& call, const CmpiContext& ctx, const CmpiObjectPath& cop,
-                   const Visit& visit);
+        const CmpiObjectPath& left(const CmpiObjectPath& target) const {
+            return isFirst ? cop : target;
+        }
+        const CmpiObjectPath& right(const CmpiObjectPath& target) const {
+            return isFirst ? target : cop;
+        }
+    };
+    using Work = std::function<void(void* addInfo)>;
+    using Make = std::function<void(const CmpiObjectPath& left, const CmpiObjectPath& right)>;
+    using Found = std::function<void(const CmpiObjectPath& target)>;
+    class PathsLike;
+
+    /// Path, resp. instance, of the association of two objects, by the hooks.
+    std::unique_ptr<CmpiObjectPath> associate(const PathsLike& request, const CmpiObjectPath& left,
+                                              const CmpiObjectPath& right);
+    std::unique_ptr<CmpiInstance> associate(const PathsLike& request, const CmpiObjectPath& left,
+                                            const CmpiObjectPath& right, const char** properties,
+                                            void* addInfo);
+
+private:
+    // What the bases do differently; each adapts its hooks.
+
+    /// Does @p work between the Before and the After hook, with what the first has prepared.
+    virtual void prepare(const CmpiContext& ctx, const char* className, const CmpiObjectPath& cop,
+                         const Work& work) = 0;
+    /// Adds the associations between the objects of a pair of sides.
+    virtual void join(const Enumeration& e, const Paths& lefts, const Paths& rights,
+                      const zemMultiNtoNAssociationPair& pair, void* addInfo) = 0;
+    /// Finds the targets that belong to a source: has the association made by @p make, among the
+    /// hooks for the two objects, and then calls @p found, which may ask handles.
+    virtual void neighbours(const Source& source, const Paths& targets, const Make& make,
+                            const Found& found) = 0;
+    /// Whether two objects that a client names belong together; if so calls @p make.
+    virtual bool belongs(const CmpiContext& ctx, const CmpiObjectPath& left,
+                         const CmpiObjectPath& right, const zemMultiNtoNAssociationPair& pair,
+                         void* addInfo, const Make& make) = 0;
+    virtual void nameKeys(CmpiObjectPath& ncop, const CmpiObjectPath& left,
+                          const CmpiObjectPath& right, const char* className) = 0;
+    virtual void complete(CmpiInstance& inst, const CmpiObjectPath& left,
+                          const CmpiObjectPath& right, const char** properties,
+                          const char* className, void* addInfo) = 0;
+    virtual void findTargets(const CmpiContext& ctx, const CmpiObjectPath& cop,
+                             const char* assocClass, const char* resultClass, const char* role,
+                             const char* resultRole, Targets& targets) = 0;
+    virtual bool standsLeft(const CmpiContext& ctx, const CmpiObjectPath& cop) = 0;
+
+    void enumerate(zemAssociationCall& call, const Enumeration& e);
     bool exists(const CmpiContext& ctx, const CmpiObjectPath& cop, const char** properties);
     void navigate(const zemAssociationRequest& r);
     void visitTarget(zemAssociationCall& call, const zemAssociationRequest& r,
                      const zemMultiTargetAssociationData& target, void* addInfo);
-    void returnNeighbour(zemAssociationCall& call, const zemAssociationRequest& r,
-                         const zemMultiTargetAssociationData& target, const CmpiObjectPath& found,
-                         void* addInfo);
 };
 
-class ZEM_EXPORT zemBaseZemMultiNtoNAssociationProvider
-    : public zemProviderPairAssociation<zemBaseZemMultiNtoNAssociationProvider> {
+class ZEM_EXPORT zemBaseZemMultiNtoNAssociationProvider : public zemProviderPairAssociation {
 public:
     /// @param providerName  "zemBaseZemMultiNtoNAssociationProvider" in the first form
     zemBaseZemMultiNtoNAssociationProvider(const CmpiBroker& mb, const CmpiContext& ctx,
@@ -212,24 +253,26 @@ protected:
     zemSynchronizerContext m_operationLock;
 
 private:
-    friend class zemProviderPairAssociation<zemBaseZemMultiNtoNAssociationProvider>;
-    void prepared(const CmpiContext& ctx, const char* className, const CmpiObjectPath& cop,
-                  const std::function<void(void*)>& work);
-    void join(const CmpiContext& ctx, const Paths& lefts, const Paths& rights,
-              const zemMultiNtoNAssociationPair& pair, void* addInfo,
-              zemDynamicArray<objectPathIndexPair>& pairs);
-    std::set<int> neighbours(const CmpiContext& ctx, const CmpiObjectPath& source, bool isFirst,
-                             const Paths& targets, const zemMultiNtoNAssociationPair& pair,
-                             void* addInfo);
-    bool belongTogether(const CmpiContext& ctx, const CmpiObjectPath& cop1,
-                        const CmpiObjectPath& cop2, const zemMultiNtoNAssociationPair& pair,
-                        void* addInfo);
-    void complete(CmpiInstance& inst, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
-                  const char** properties, const char* className, void* addInfo);
+    class Preparation;
+    void prepare(const CmpiContext& ctx, const char* className, const CmpiObjectPath& cop,
+                 const Work& work) override;
+    void join(const Enumeration& e, const Paths& lefts, const Paths& rights,
+              const zemMultiNtoNAssociationPair& pair, void* addInfo) override;
+    void neighbours(const Source& source, const Paths& targets, const Make& make,
+                    const Found& found) override;
+    bool belongs(const CmpiContext& ctx, const CmpiObjectPath& left, const CmpiObjectPath& right,
+                 const zemMultiNtoNAssociationPair& pair, void* addInfo, const Make& make) override;
+    void nameKeys(CmpiObjectPath& ncop, const CmpiObjectPath& left, const CmpiObjectPath& right,
+                  const char* className) override;
+    void complete(CmpiInstance& inst, const CmpiObjectPath& left, const CmpiObjectPath& right,
+                  const char** properties, const char* className, void* addInfo) override;
+    void findTargets(const CmpiContext& ctx, const CmpiObjectPath& cop, const char* assocClass,
+                     const char* resultClass, const char* role, const char* resultRole,
+                     Targets& targets) override;
+    bool standsLeft(const CmpiContext& ctx, const CmpiObjectPath& cop) override;
 };
 
-class ZEM_EXPORT zemEnhanceBaseZemMultiNtoNAssociationProvider
-    : public zemProviderPairAssociation<zemEnhanceBaseZemMultiNtoNAssociationProvider> {
+class ZEM_EXPORT zemEnhanceBaseZemMultiNtoNAssociationProvider : public zemProviderPairAssociation {
 public:
     /// @param providerName  "zemEnhanceBaseZemMultiNtoNAssociationProvider" in the first form
     zemEnhanceBaseZemMultiNtoNAssociationProvider(const CmpiBroker& mb, const CmpiContext& ctx,
@@ -310,24 +353,32 @@ protected:
     std::set<int> getValidIndexSet(const CmpiContext& ctx, const CmpiObjectPath& source,
                                    bool isFirst, const Paths& targets, void* addInfo);
 
-private:
-    friend class zemProviderPairAssociation<zemEnhanceBaseZemMultiNtoNAssociationProvider>;
-    void prepared(const CmpiContext& ctx, const char* className, const CmpiObjectPath& cop,
-                  const std::function<void(void*)>& work);
-    void join(const CmpiContext& ctx, const Paths& lefts, const Paths& rights,
-              const zemMultiNtoNAssociationPair& pair, void* addInfo,
-              zemDynamicArray<objectPathIndexPair>& pairs);
-    std::set<int> neighbours(const CmpiContext& ctx, const CmpiObjectPath& source, bool isFirst,
-                             const Paths& targets, const zemMultiNtoNAssociationPair& pair,
-                             void* addInfo);
-    bool belongTogether(const CmpiContext& ctx, const CmpiObjectPath& cop1,
-                        const CmpiObjectPath& cop2, const zemMultiNtoNAssociationPair& pair,
-                        void* addInfo);
-    void complete(CmpiInstance& inst, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
-                  const char** properties, const char* className, void* addInfo);
-};
+    /// Appends paths, resp. instances, of the associations of pairs of objects.
+    void setValidAssociationKeys(const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights,
+                                 const zemDynamicArray<objectPathIndexPair>& pairs, Paths& out);
+    void setValidAssociationProperties(const CmpiObjectPath& cop, const Paths& lefts,
+                                       const Paths& rights,
+                                       const zemDynamicArray<objectPathIndexPair>& pairs,
+                                       const char** properties, void* addInfo,
+                                       zemDynamicArray<CmpiInstance>& out);
 
-extern template class zemProviderPairAssociation<zemBaseZemMultiNtoNAssociationProvider>;
-extern template class zemProviderPairAssociation<zemEnhanceBaseZemMultiNtoNAssociationProvider>;
+private:
+    void prepare(const CmpiContext& ctx, const char* className, const CmpiObjectPath& cop,
+                 const Work& work) override;
+    void join(const Enumeration& e, const Paths& lefts, const Paths& rights,
+              const zemMultiNtoNAssociationPair& pair, void* addInfo) override;
+    void neighbours(const Source& source, const Paths& targets, const Make& make,
+                    const Found& found) override;
+    bool belongs(const CmpiContext& ctx, const CmpiObjectPath& left, const CmpiObjectPath& right,
+                 const zemMultiNtoNAssociationPair& pair, void* addInfo, const Make& make) override;
+    void nameKeys(CmpiObjectPath& ncop, const CmpiObjectPath& left, const CmpiObjectPath& right,
+                  const char* className) override;
+    void complete(CmpiInstance& inst, const CmpiObjectPath& left, const CmpiObjectPath& right,
+                  const char** properties, const char* className, void* addInfo) override;
+    void findTargets(const CmpiContext& ctx, const CmpiObjectPath& cop, const char* assocClass,
+                     const char* resultClass, const char* role, const char* resultRole,
+                     Targets& targets) override;
+    bool standsLeft(const CmpiContext& ctx, const CmpiObjectPath& cop) override;
+};
 
 #endif

@@ -1,6 +1,7 @@
 #include "JMPIProviderInterfaceStub.h"
 
 #include <memory>
+#include <utility>
 
 #include "AssociationSupport.h"
 
@@ -40,10 +41,10 @@ void zemJMPIInstanceProviderBrokerInterface::enumInstanceNames(const CmpiContext
     const zemString nameSpace = zemTextOf(cop.getNameSpace());
     const zemString host = zemTextOf(cop.getHostname());
     for (CmpiEnumeration names = m_broker.enumInstanceNames(ctx, cop); names.hasNext();) {
-        auto path = std::make_unique<CmpiObjectPath>(names.getNext().getObjectPath());
+        auto path = std::make_unique<CmpiObjectPath>(zemNextPath(names));
         path->setNameSpace(static_cast<const char*>(nameSpace));
         path->setHostname(static_cast<const char*>(host));
-        out.addElement(path.release());
+        zemAppend(out, std::move(path));
     }
 }
 
@@ -56,5 +57,6 @@ void zemJMPIInstanceProviderBrokerInterface::enumInstances(const CmpiContext& ct
     const zemSynchronizer hold(getSynchronizerContext());
     const zemBrokerTiming timing("<ei>", className);
     CmpiEnumeration instances = m_broker.enumInstances(ctx, cop, properties);
-    while (instances.hasNext()) out.addElement(new CmpiInstance(instances.getNext().getInstance()));
+    while (instances.hasNext())
+        zemAppend(out, std::make_unique<CmpiInstance>(zemNextInstance(instances)));
 }

@@ -10,7 +10,12 @@
 /// What the broker refuses passes through as CmpiStatus.
 ///
 /// Threads. One lock is common to all stubs and held during a call to the broker: at most one
-/// forwarded call runs at a time.
+/// forwarded call runs at a time. The families of AssociationProvider.h, NtoNAssociationProvider.h
+/// and MultiNtoNAssociationProvider.h, too, hold a lock while they ask the server. Two threads that
+/// take the two locks in either order wait for each other for ever; so a class that a stub
+/// forwards must not be an association of such a family, unless no class that this association
+/// joins comes, in the end, out of a stub. Associations of the families that take stubs are no such
+/// danger: they hold no lock while they ask a handle.
 #ifndef JMPI_PROVIDER_INTERFACE_STUB_H
 #define JMPI_PROVIDER_INTERFACE_STUB_H
 

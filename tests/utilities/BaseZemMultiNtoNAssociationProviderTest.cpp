@@ -1,10 +1,12 @@
+#include <tuple>
+
 #include "AssociationDataPrepareUtils.h"
 #include "AssociationHarness.h"
 #include "BaseZemMultiNtoNAssociationProvider.h"
 
 namespace {
 
-/// A side: serves the objects of the world, past the server.
+/// A side: serves the objects of the world, past the server, with a gap before each.
 class Side : public zemBaseZemInstanceProvider {
 public:
     Side(const CmpiBroker& mb, const CmpiContext& ctx)
@@ -21,8 +23,10 @@ public:
     }
     void enumInstanceNames(const CmpiContext&, const CmpiObjectPath& cop,
                            zemDynamicArray<CmpiObjectPath>& out, const CmpiObjectPath&) override {
-        for (const CmpiObjectPath& object : askWorld("names", cop))
+        for (const CmpiObjectPath& object : askWorld("names", cop)) {
+            out.addElement(nullptr);
             out.addElement(new CmpiObjectPath(object));
+        }
     }
 };
 
@@ -36,12 +40,10 @@ void addPairs(zemMultiNtoNAssociationDataSet& set, Side& side) {
             {handle(r[4]), r[2], r[3], ""}, {handle(r[7]), r[5], r[6], ""}, r[0], r[1]));
 }
 
-class Plain : public zemBaseZemMultiNtoNAssociationProvider {
+class Plain : public Scripted<zemBaseZemMultiNtoNAssociationProvider> {
 public:
     Plain(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx),
-          zemBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
-          m_side(mb, ctx) {
+        : CmpiBaseMI(mb, ctx), Scripted(mb, ctx, name, OP_ALLOps), m_side(mb, ctx) {
         addPairs(m_associationDataSet, m_side);
     }
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& cop1,
@@ -52,7 +54,13 @@ public:
             std::is_invocable_v<decltype(&Plain::CheckRolesAndResultClass), Plain&, const char*,
                                 const char*, const char*, const zemMultiTargetAssociationData&>);
         EXPECT_STREQ("Left", pair.m_leftAssiData.m_assoPropname);
+        world->note("pair");
         return world->valid(nameOf(cop1), nameOf(cop2));
+    }
+    void addProperties(CmpiInstance& inst, const CmpiObjectPath& cop1, const CmpiObjectPath& cop2,
+                       const char** properties, const char* className) override {
+        world->note("addProperties");
+        Scripted::addProperties(inst, cop1, cop2, properties, className);
     }
     bool BeforeGenerateAssociation(const CmpiContext&, const char*) override {
         return world->hook("before");
@@ -66,13 +74,15 @@ private:
 };
 
 /// Objects belong together by the digits of their names.
-class Joined : public zemEnhanceBaseZemMultiNtoNAssociationProvider {
+class Joined : public Scripted<zemEnhanceBaseZemMultiNtoNAssociationProvider> {
 public:
     Joined(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx),
-          zemEnhanceBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
-          m_side(mb, ctx) {
+        : CmpiBaseMI(mb, ctx), Scripted(mb, ctx, name, OP_ALLOps), m_side(mb, ctx) {
         addPairs(m_associationDataSet, m_side);
+    }
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath&, const CmpiObjectPath&,
+                               void*) override {
+        return world->hook("named pair");
     }
     bool isValidateAssociationPlus(const CmpiContext&, const CmpiObjectPath& cop1,
                                    const CmpiObjectPath& cop2, void* addInfo) override {
@@ -158,6 +168,27 @@ TYPED_TEST(ProviderPairs, NameTheMissingHandle) {
     EXPECT_NE(std::string::npos, w.run("ein", "").message.find(std::string("\"e") + text));
 }
 
+// All hooks for a pair of objects come before those for the next.
+TEST(ProviderPairsOneByOne, OrderOfCalls) {
+    const std::tuple<const char*, const char*, std::string> cases[] = {
+        {"ein", "", "before names:Test_Disk names:Test_Port pair addKeys pair addKeys after "},
+        {"ei", "",
+         "before names:Test_Disk names:Test_Port pair addKeys addProperties pair addKeys "
+         "addProperties after "},
+        {"r", "p1",
+         "before names:Test_Disk pair addKeys addProperties pair addKeys addProperties after "},
+        {"an", "p1", "before names:Test_Disk pair pair after "},
+    };
+    for (const auto& [operation, object, calls] : cases) {
+        World<Plain> w;
+        world->rows = {{"Test_Link", "", "Test_Disk", "Left", "", "Test_Port", "Right", ""}};
+        w.run(operation, object);
+        std::string made;
+        for (const std::string& call : world->calls) made += call + " ";
+        EXPECT_EQ(calls, made) << operation;
+    }
+}
+
 // The hooks come in pairs, and what the After hook throws does not matter.
 TYPED_TEST(ProviderPairs, HooksThatThrow) {
     constexpr bool plain = std::is_same_v<TypeParam, Plain>;
@@ -191,6 +222,9 @@ TEST(ProviderPairsByKey, OnlyObjectsWithOneKeyAreCompared) {
     EXPECT_EQ("s2-d2", show(w.run("rn", "d2")));
     EXPECT_EQ(3, world->count("pair"));
     EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, w.run("gi", "s1-d2").rc);
+    EXPECT_EQ("s1-d1", show(w.run("gi", "s1-d1")));
+    world->onHook = [](const std::string& hook) { return hook != "named pair"; };
+    EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, w.run("gi", "s1-d1").rc);
 }
 
 // Many of the keys have the same sum of bytes, and each stands twice on the right.

@@ -22,7 +22,9 @@
 ///
 /// Failures are zemExceptions for the frame of zemBaseProvider. What the server refuses becomes
 /// one by its code; a navigation ends quietly, with what it has returned so far, for codes that
-/// have none. An association class that is in no row gives zemInvalidParameterException.
+/// have none. An association class that is in no row gives zemInvalidParameterException, and so
+/// does a navigation that names none: which class a provider answers with then, or for a base
+/// class, it says itself, by overriding isValidAssociationClass() and the navigations.
 ///
 /// Threads. The rows are added in the constructor and do not change afterwards. One lock, common
 /// to all providers of this family, is held while a row is worked on: while the server is asked

@@ -170,6 +170,17 @@ TEST_P(ProvidersTest, NoKeyReachesACommandLineUnlessItHasItsForm) {
     EXPECT_FALSE(std::filesystem::exists(seen));
 }
 
+// Refused by the rule of the association, before its objects are looked for.
+TEST_P(ProvidersTest, ObjectsWithoutAHostHaveNoneInCommon) {
+    const ObjectPath link("root/cimv2", "ORXC_HostComponent",
+                          {{"GroupComponent", system(kHostClass, "")},
+                           {"PartComponent", system(kPartitionClass, "12")}});
+    const Reply reply = m_server->getInstance(m_request, link);
+    EXPECT_EQ(reply.rc, CMPI_RC_ERR_NOT_FOUND);
+    EXPECT_NE(reply.message.find("of class ORXC_HostComponent can not"), std::string::npos)
+        << reply.message;
+}
+
 INSTANTIATE_TEST_SUITE_P(Brokers, ProvidersTest,
                          ::testing::Values(Character::Full, Character::Lean),
                          [](const auto& broker) {

@@ -2,6 +2,7 @@
 #include <set>
 
 #include "AssociationHarness.h"
+#include "FailingAllocation.h"
 #include "OnThreads.h"
 
 namespace {
@@ -99,6 +100,26 @@ TYPED_TEST(AssociationFamily, StatusBecomesException) {
                 EXPECT_EQ(0, world->count("after"));
             }
         }
+    }
+}
+
+// Whichever allocation fails, the operation fails with it, and the next one is sound.
+TYPED_TEST(AssociationFamily, MemoryThatRunsOut) {
+    for (const Operation& op : kOperations) {
+        World<TypeParam> w;
+        const std::string whole = show(AssociationFamily<TypeParam>::call(w, op));
+        bool failed = true;
+        for (long n = 0; failed; ++n) {
+            const FailingAllocation failing(n);
+            try {
+                AssociationFamily<TypeParam>::call(w, op);
+            } catch (const std::bad_alloc&) {
+            } catch (const CmpiStatus&) {
+            } catch (const zemException&) {
+            }
+            failed = failing.happened();
+        }
+        EXPECT_EQ(whole, show(AssociationFamily<TypeParam>::call(w, op))) << op.letters;
     }
 }
 

@@ -15,13 +15,14 @@ for file in "$prefix"/bin/* "$libdir"/*.so; do
     esac
 done
 
-cmake -S "$consumer" -B package -DCMAKE_CXX_COMPILER="$cxx" -DCMAKE_PREFIX_PATH="$prefix"
+cmake -S "$consumer" -B package -DCMAKE_CXX_COMPILER="$cxx" -Dzemutilities_DIR="$libdir/cmake/zemutilities"
 cmake --build package
 package/consumer
 
 export PKG_CONFIG_PATH="$libdir/pkgconfig"
-"$cxx" -std=c++17 "$consumer/consumer.cpp" -o by-pkg-config -Wl,-rpath,"$libdir" \
-    $(pkg-config --cflags --libs zemutilities)
+"$cxx" -std=c++17 "$consumer/consumer.cpp" -o by-pkg-config \
+    $(pkg-config --cflags --libs zemutilities) \
+    $(pkg-config --libs-only-L zemutilities | sed 's/-L/-Wl,-rpath,/g')
 ./by-pkg-config
 
 export PATH="$prefix/bin:$PATH" APPLIANCE_HOME="$work/appliance"

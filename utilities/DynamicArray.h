@@ -8,7 +8,7 @@
 /// Thread-safety: none; callers lock.
 ///
 ///     zemDynamicArray<zemString> names;
-///     names.addElement(new zemString("a"));
+///     names.addElement(std::make_unique<zemString>("a"));
 ///     for (int i = 0; i < names.size(); ++i) puts(*names.getElementAt(i));
 #ifndef DYNAMIC_ARRAY_H
 #define DYNAMIC_ARRAY_H
@@ -16,6 +16,7 @@
 #include <algorithm>
 #include <climits>
 #include <cstddef>
+#include <memory>
 #include <new>
 
 #include "ZemExport.h"
@@ -49,12 +50,20 @@ public:
     ~zemDynamicArray() { clear(); }
 
     /// Appends @p element, which belongs to the array from here on if that owns. Returns 0.
+    /// @throws std::bad_alloc no room; the element is still the caller's
     int addElement(T* element) {
         if (m_count >= m_max) {
             reserve(m_max, growStep());
         }
         m_array[m_count++] = element;
         return 0;
+    }
+
+    /// The same for an array that owns; without room for it, the element is deleted.
+    int addElement(std::unique_ptr<T> element) {
+        const int result = addElement(element.get());
+        static_cast<void>(element.release());
+        return result;
     }
 
     /// Stores @p element at @p index; an element already there is deleted if owned. An index

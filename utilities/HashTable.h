@@ -24,6 +24,7 @@
 #include <memory>
 #include <new>
 #include <utility>
+#include <vector>
 
 #include "StringUtils.h"
 #include "ZemExport.h"
@@ -300,25 +301,81 @@ public:
 
     /// Adds an entry. Returns 0; 2 if the key is there already, which changes nothing; 1 if the
     /// table has no chains.
-    int insert(const K& key, const V& value) { return this->add(key, value, true); }
-    int insert(const K& key, V&& value) { return this->add(key, std::move(value), true); }
+    int insert(const K& key, const V& value) { return insertNew(key, value); }
+    int insert(const K& key, V&& value) { return insertNew(key, std::move(value)); }
+
+    /// Gives each of @p keys that the table lacks an entry with a default value. It takes no room
+    /// until it is written to, because many tables share the keys and most entries stay as they
+    /// are. A second call replaces the first one's keys.
+    void insertBlanks(std::shared_ptr<const std::vector<K>> keys) { m_blanks = std::move(keys); }
+
+    int lookup(const K& key, V& value) const {
+        const int result = Base::lookup(key, value);
+        if (result == Base::absent && isBlank(key)) {
+            value = V();
+            return Base::done;
+        }
+        return result;
+    }
+
+    int remove(const K& key) {
+        const bool wasBlank = isBlank(key);
+        if (wasBlank) {
+            auto others = std::make_shared<std::vector<K>>(*m_blanks);
+            others->erase(std::remove(others->begin(), others->end(), key), others->end());
+            m_blanks = std::move(others);
+        }
+        const int result = Base::remove(key);
+        return wasBlank ? Base::done : result;
+    }
+
+    void clear() {
+        m_blanks.reset();
+        Base::clear();
+    }
 
     /// The value of @p key, owned by the table.
     /// @throws int 3 if the key is absent
-    V& operator[](const K& key) { return found(key).m_value; }
-    const V& operator[](const K& key) const { return found(key).m_value; }
+    V& operator[](const K& key) {
+        typename Base::Bucket* bucket = this->find(key);
+        if (bucket == nullptr) {
+            expectBlank(key);
+            this->add(key, V(), true);
+            bucket = this->find(key);
+        }
+        return bucket->m_element.m_value;
+    }
+    const V& operator[](const K& key) const {
+        const typename Base::Bucket* const bucket = this->find(key);
+        if (bucket == nullptr) {
+            static const V blank{};
+            expectBlank(key);
+            return blank;
+        }
+        return bucket->m_element.m_value;
+    }
 
     /// The same, copied.
-    V getElement(const K& key) const { return found(key).m_value; }
+    V getElement(const K& key) const { return (*this)[key]; }
 
 private:
-    DnxBucketElement<K, V>& found(const K& key) const {
-        typename Base::Bucket* const bucket = this->find(key);
-        if (bucket == nullptr) {
+    template <class Value>
+    int insertNew(const K& key, Value&& value) {
+        return isBlank(key) ? Base::duplicate : this->add(key, std::forward<Value>(value), true);
+    }
+
+    bool isBlank(const K& key) const {
+        return m_blanks != nullptr &&
+               std::find(m_blanks->begin(), m_blanks->end(), key) != m_blanks->end();
+    }
+
+    void expectBlank(const K& key) const {
+        if (!isBlank(key)) {
             throw int{Base::absent};
         }
-        return bucket->m_element;
     }
+
+    std::shared_ptr<const std::vector<K>> m_blanks;
 };
 
 #endif

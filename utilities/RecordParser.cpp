@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <memory>
 #include <string>
+#include <vector>
 
 namespace {
 
@@ -58,26 +59,63 @@ private:
     std::string& m_pieces;
 };
 
+/// What the records of one query have in common.
+class RecordMaker {
+public:
+    RecordMaker(const int* keys, unsigned count) : m_values(count), m_used(count) {
+        auto all = std::make_shared<std::vector<int>>(count);
+        for (unsigned i = 0; i < count; ++i) {
+            (*all)[i] = keys != nullptr ? keys[i] : static_cast<int>(i);
+            // Of a field that is asked for twice, the first value stands.
+            m_used[i] = std::find(all->begin(), all->begin() + i, (*all)[i]) == all->begin() + i;
+        }
+        m_keys = std::move(all);
+    }
+
+    /// The record of @p fields; null when it ends inside a quoted run. Only fields with a text take
+    /// room: tools print lines of a hundred fields of which few have one.
+    std::unique_ptr<zemRecordType> make(FieldReader fields) {
+        unsigned texts = 0;
+        for (zemString& value : m_values) {
+            std::string_view field;
+            if (!fields.next(field)) {
+                return nullptr;
+            }
+            value = zemString();
+            if (!field.empty()) {
+                value = zemString(field.data(), static_cast<unsigned>(field.size()));
+                ++texts;
+            }
+        }
+        auto record = std::make_unique<zemRecordType>(texts);
+        for (size_t i = 0; i < m_values.size(); ++i) {
+            if (!m_values[i].isEmpty() && m_used[i]) {
+                record->insert((*m_keys)[i], std::move(m_values[i]));
+            }
+        }
+        record->insertBlanks(m_keys);
+        return record;
+    }
+
+private:
+    std::shared_ptr<const std::vector<int>> m_keys;
+    std::vector<zemString> m_values;
+    std::vector<bool> m_used;
+};
+
 }  // namespace
 
 bool zemParseRecords(std::string_view output, const int* keys, unsigned count,
                      zemRecordSetsType& results) {
     std::string pieces;
+    RecordMaker maker(keys, count);
     for (size_t begin = 0; begin < output.size();) {
         const size_t end = std::min(output.find('\n', begin), output.size());
-        FieldReader fields(output.substr(begin, end - begin), pieces);
-        auto record = std::make_unique<zemRecordType>(count);
-        for (unsigned i = 0; i < count; ++i) {
-            std::string_view field;
-            if (!fields.next(field)) {
-                return false;
-            }
-            const auto size = static_cast<unsigned>(field.size());
-            record->insert(keys != nullptr ? keys[i] : static_cast<int>(i),
-                           size != 0 ? zemString(field.data(), size) : zemString());
+        auto record = maker.make(FieldReader(output.substr(begin, end - begin), pieces));
+        if (record == nullptr) {
+            return false;
         }
-        results.addElement(record.get());
-        static_cast<void>(record.release());
+        results.addElement(std::move(record));
         begin = end + 1;
     }
     return true;

@@ -101,6 +101,17 @@ TEST(HashTableTest, ReturnCodesAndTheThrownThree) {
     EXPECT_STREQ(value, "9");
     EXPECT_EQ(table.remove(9), 0);
     EXPECT_STREQ(table[-7], "-7") << "of a chain that lost an entry";
+    table.insertBlanks(std::make_shared<std::vector<int>>(std::vector<int>{1, 40, 41, 42}));
+    const zemHashTable<int, zemString, hashFunc> copy(table);
+    EXPECT_STREQ(copy[1], "1") << "what is there stays";
+    EXPECT_STREQ(copy[40], "");
+    EXPECT_EQ(table.lookup(41, value), 0);
+    EXPECT_STREQ(value, "");
+    EXPECT_EQ(table.insert(41, "other"), 2);
+    table[41] = "written";
+    EXPECT_EQ(table.remove(42), 0);
+    EXPECT_EQ(table.remove(42), 3);
+    EXPECT_STREQ((table.getElement(40) + table[41] + copy[42]), "written");
     try {
         static_cast<void>(table[9]);
         FAIL();

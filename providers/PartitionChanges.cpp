@@ -43,13 +43,12 @@ constexpr PropertyRow kCreation[] = {
 struct ChangeRow {
     const char* property;
     int (zemVirtualSystem::*set)(const zemString& value);
-    bool isItem;  ///< the value goes into an attribute list, not into an option of its own
 };
 
 const ChangeRow kChanges[] = {
-    {"ElementName", &zemVirtualSystem::setName, true},
-    {"DefaultProfile", &zemVirtualSystem::setDefaultProfile, true},
-    {"Keylock", &zemVirtualSystem::setKeylock, false},
+    {"ElementName", &zemVirtualSystem::setName},
+    {"DefaultProfile", &zemVirtualSystem::setDefaultProfile},
+    {"Keylock", &zemVirtualSystem::setKeylock},
 };
 
 template <typename Rows>
@@ -83,31 +82,11 @@ constexpr Transition kTransitions[] = {
 
 constexpr CMPIUint32 kCompleted = 0, kNotSupported = 1, kInvalidTransition = 4097;
 
-/// @p text as it must stand between the double quotes of a command line, so that the splitter gives
-/// it to the tool unchanged, whatever a client wrote.
-std::string escaped(const std::string& text) {
-    std::string result;
-    for (char c : text) {
-        if (c == '"' || c == '\\') result += '\\';
-        result += c;
-    }
-    return result;
-}
-
-/// Likewise for the value of an item in an attribute list, which the tool reads as a quoted field.
-std::string itemText(const std::string& text) {
-    std::string doubled;
-    for (char c : text) {
-        if (c == '"') doubled += c;
-        doubled += c;
-    }
-    return escaped(doubled);
-}
-
 /// The text that the tool has for the value of a property.
 std::string toolText(ValueKind kind, const CmpiData& value) {
     if (kind == ValueKind::Flag) return value.getBoolean() ? "1" : "0";
-    if (kind == ValueKind::Text) return itemText(value.getString().charPtr());
+    if (kind == ValueKind::Text)
+        return std::string(zemCommandCaller::itemValue(value.getString().charPtr()));
     if (kind == ValueKind::Uint16) return std::to_string(value.getUint16());
     const CMPIUint32 number = value.getUint32();
     if (kind == ValueKind::Uint32) return std::to_string(number);
@@ -199,7 +178,7 @@ void PartitionProvider::change(const Client& client, const std::string& name, co
     zemVirtualSystem partition(key.id.c_str(),
                                zemHostSystem(key.host.c_str(), client.user, client.locale),
                                client.user, client.locale);
-    (partition.*row.set)((row.isItem ? itemText(value) : escaped(value)).c_str());
+    (partition.*row.set)(value.c_str());
 }
 
 CMPIUint32 PartitionProvider::requestState(const Client& client, const std::string& name,
@@ -234,7 +213,7 @@ CMPIUint32 PartitionProvider::requestState(const Client& client, const std::stri
         power.setResource(1);
         power.setManagedSystem(key.host.c_str());
         power.setLparId(std::stoi(key.id));
-        power.setLparProfileName(("\"" + escaped(profile) + "\"").c_str());
+        power.setLparProfileName(zemCommandCaller::quoted(profile.c_str()));
         power.setOperation(row->operation);
         power.setImmed(row->immediately);
         power.setRestart(row->restart);

@@ -4,6 +4,7 @@
 #include <string>
 #include <string_view>
 
+#include "CommandLine.h"
 #include "Exception.h"
 #include "Log.h"
 #include "PropertiesHelper.h"
@@ -24,9 +25,15 @@ constexpr int kListEnd = -1;
 constexpr size_t kQueryRoom = 2048;
 constexpr size_t kChangeRoom = 512;
 
-/// The fixed front of a line; what does not fit into @p room is cut.
-std::string frontOf(const char* cmd, size_t room) {
-    return cmd != nullptr ? std::string(cmd, strnlen(cmd, room)) : std::string();
+/// The fixed front of a line; what does not fit into @p room is cut. Not within quotes, where the
+/// next quote of the line would end what it begins.
+std::string frontOf(const char* cmd, size_t room, const char* method) {
+    std::string front = cmd != nullptr ? std::string(cmd, strnlen(cmd, room)) : std::string();
+    if (front.size() == room && !zemSplitCommandLine(front.c_str()).valid()) {
+        throw zemInvalidParameterException(kClass, method, front.c_str(), "INVALID_LENGTH",
+                                           zemString(static_cast<int>(room)));
+    }
+    return front;
 }
 
 bool saysNoResults(const zemString& text) { return text.startsWith(kNoResults); }
@@ -69,12 +76,47 @@ void removeTrailingCommas(std::string& line) { line.erase(line.find_last_not_of(
 
 bool isGiven(const char* text) { return text != nullptr && *text != '\0'; }
 
+/// The inside of a quoted field in a tool's lists.
+std::string withQuotesDoubled(const char* text) {
+    std::string result;
+    for (; isGiven(text); ++text) {
+        result.append(*text == '"' ? 2 : 1, *text);
+    }
+    return result;
+}
+
+/// Whether a tool's filter cannot see the begin of a quoted value, or of another item, in @p text.
+bool isOneValue(std::string_view text) {
+    for (size_t begin = 0;; ++begin) {
+        const std::string_view field = text.substr(begin);
+        const size_t word = field.find_first_not_of("abcdefghijklmnopqrstuvwxyz_");
+        const char after = word != field.npos ? field[word] : '\0';
+        if ((word == 0 && after == '"') || (begin > 0 && word > 0 && after == '=')) return false;
+        begin = text.find(',', begin);
+        if (begin == text.npos) return true;
+    }
+}
+
 }  // namespace
 
 zemCommandCaller::zemCommandCaller(const char* auth, const char* locale)
     : m_auth(auth), m_locale(locale) {}
 
 zemCommandCaller::~zemCommandCaller() = default;
+
+zemString zemCommandCaller::quoted(const char* text) { return zemQuoted(text).c_str(); }
+
+zemString zemCommandCaller::itemValue(const char* text) {
+    return zemEscaped(withQuotesDoubled(text).c_str()).c_str();
+}
+
+zemString zemCommandCaller::filterItem(const char* name, const char* value) {
+    std::string item = name + std::string("=");
+    if (isGiven(value)) {
+        item += isOneValue(value) ? value : '"' + withQuotesDoubled(value) + '"';
+    }
+    return item.c_str();
+}
 
 int zemCommandCaller::callGenericCommand(const char* command, zemString* pCmdOutput,
                                          bool forceTimeOut) {
@@ -106,7 +148,7 @@ int zemCommandCaller::callGenericCommand(const char* command, zemString* pCmdOut
     std::string code = "UNKNOWN";
     const char* const found = std::strstr(strError, kErrorCode);
     if (found != nullptr) {
-        code.assign(found, std::strcspn(found, " "));
+        code.assign(found, std::strcspn(found, " \t\r\n\v\f"));
     }
     throw zemOperationFailedException(kClass, "callGenericCommand", quotedCommand.c_str(),
                                       code.c_str(), strError.stripTrailing('\n'));
@@ -120,7 +162,7 @@ void zemCommandCaller::callLsCommand(const char* cmd, int* paramAttr, int paramA
                                      const char* const* allAttrNames, unsigned int allAttrNumber,
                                      zemRecordSetsType& results) {
     const zemAttributeNames table(allAttrNames, allAttrNumber);
-    std::string line = frontOf(cmd, kQueryRoom) + " -F ";
+    std::string line = frontOf(cmd, kQueryRoom, "callLsCommand") + " -F ";
     unsigned attrNumber = 0;
     while (paramAttr != nullptr ? paramAttr[attrNumber] != paramAttrEndFlag
                                 : attrNumber < allAttrNumber) {
@@ -155,7 +197,8 @@ void zemCommandCaller::BuildChCmdString(zemString& strCmd,
     line += attrOpt != nullptr ? attrOpt : "";
     line += " \"";
     appendItems(line, singleValAttrPairs, "=", table, "BuildChCmdString");
-    appendItems(line, multiValAttrPairs, kOperators[op], table, "BuildChCmdString");
+    appendItems(line, multiValAttrPairs, nameAt(op, kOperators, line, "BuildChCmdString"), table,
+                "BuildChCmdString");
     removeTrailingCommas(line);
     line += '"';
     strCmd = line.c_str();
@@ -166,7 +209,7 @@ int zemCommandCaller::callChCommand(const char* cmd,
                                     const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
                                     const char* const* allAttrNames, unsigned int allAttrNumber,
                                     CH_OP_TYPE op, const char* attrOpt) {
-    zemString strCmd(frontOf(cmd, kChangeRoom).c_str());
+    zemString strCmd(frontOf(cmd, kChangeRoom, "callChCommand").c_str());
     BuildChCmdString(strCmd, singleValAttrPairs, multiValAttrPairs, allAttrNames, allAttrNumber, op,
                      attrOpt);
     zemLog::LogSysOut(strCmd);
@@ -177,7 +220,7 @@ int zemCommandCaller::callMkCommand(const char* cmd,
                                     const zemDynamicArray<tagAttributePair>& attrPairs,
                                     const char* const* allAttrNames, unsigned int allAttrNumber) {
     const zemAttributeNames table(allAttrNames, allAttrNumber);
-    std::string line = frontOf(cmd, kChangeRoom) + " -i \"";
+    std::string line = frontOf(cmd, kChangeRoom, "callMkCommand") + " -i \"";
     appendItems(line, attrPairs, "=", table, "callMkCommand");
     removeTrailingCommas(line);
     line += '"';
@@ -204,7 +247,7 @@ zemRecordSetsType zemCommandCaller::query(const zemQuery& query, int* paramAttr,
 }
 
 std::string zemCommandCaller::systemOption(const char* managedSystem) {
-    return managedSystem != nullptr ? std::string(" -m \"") + managedSystem + '"' : std::string();
+    return managedSystem != nullptr ? " -m " + zemQuoted(managedSystem) : std::string();
 }
 
 void zemCommandCaller::callStateChange(const char* what, const std::string& line) {

@@ -11,6 +11,15 @@
 /// An object holds two strings and is made on the stack for one operation; objects are not shared
 /// between threads. The tool's own words reach the client unchanged. What running a tool can throw
 /// (PropertiesHelper.h) comes out of every operation here.
+///
+/// A line is cut into arguments at blanks, quotes and backslashes. What the callers themselves put
+/// between quotes, such as names of systems, partitions and profiles, reaches the tool as it is.
+/// What a header says to stand in the line unquoted (whole lines and filters, values of
+/// tagAttributePair, some names) is quoted by whoever hands it over, with quoted(), itemValue() and
+/// filterItem(). A text from outside must never go into a line without:
+///
+///     zemString filter = zemCommandCaller::quoted(zemCommandCaller::filterItem("lpar_names",
+///     name));
 #ifndef COMMAND_CALLER_H
 #define COMMAND_CALLER_H
 
@@ -24,8 +33,12 @@
 
 /// One attribute for a change tool.
 struct tagAttributePair {
-    int m_attributeIndex;        ///< position in the tool's table of names
-    zemString m_attributeValue;  ///< written to the command line as it is
+    tagAttributePair() = default;
+    tagAttributePair(int index, const zemString& value)
+        : m_attributeIndex(index), m_attributeValue(value) {}
+
+    int m_attributeIndex = 0;    ///< position in the tool's table of names
+    zemString m_attributeValue;  ///< written to the command line as it is, see itemValue()
 };
 
 /// One query of a tool: what its lines begin with, which fields there are, and when the line names
@@ -41,7 +54,7 @@ struct zemQuery {
 class ZEM_EXPORT zemCommandCaller {
 public:
     /// What a change does to a multi-valued attribute: "+=", "=" or "-=".
-    enum CH_OP_TYPE { CH_OP_ADD = 0, CH_OP_MODIFY = 1, CH_OP_REMOVE = 2 };
+    enum CH_OP_TYPE : int { CH_OP_ADD = 0, CH_OP_MODIFY = 1, CH_OP_REMOVE = 2 };
     typedef CH_OP_TYPE ChOperateType;
 
     /// @param auth  user to run tools as; null or empty: the process's own
@@ -58,11 +71,25 @@ public:
     ///         in its text, else "UNKNOWN". Of both the access method is the quoted line.
     int callGenericCommand(const char* command, zemString* pCmdOutput, bool forceTimeOut);
 
-    /// The same for @p command as arguments of "xbrgcli".
+    /// The same for @p command as arguments of "xbrgcli", in which the caller has quoted names.
     int callXBRGCommand(const char* command, zemString* pCmdOutput);
 
+    /// @p text in double quotes, escaped so that the tool receives exactly this one argument. Null
+    /// is as empty, here and below.
+    static zemString quoted(const char* text);
+
+    /// @p text as the value of a tagAttributePair, of which the tool takes this very text.
+    static zemString itemValue(const char* text);
+
+    /// "<name>=<value>" as an item of a tool's filter: a list that still needs quoted() around it.
+    /// A value with commas stays as it is, because the tools know names with commas; one that they
+    /// would take for more than a value is quoted in their manner.
+    static zemString filterItem(const char* name, const char* value);
+
 protected:
-    /// Runs the query @p cmd, of which at most 2048 bytes count, for named fields.
+    /// Runs the query @p cmd, of which at most 2048 bytes count, for named fields. Here and in the
+    /// next two, a @p cmd that would end within quotes there is refused
+    /// (zemInvalidParameterException, id "INVALID_LENGTH").
     /// @param paramAttr  positions of the wanted fields in @p allAttrNames, ending in
     ///        @p paramAttrEndFlag and used as keys of the records; null: all, in table order
     /// @param results  receives the records
@@ -94,7 +121,8 @@ protected:
     ///
     /// The splitter makes this one argument that keeps the inner quotes, so a value may hold
     /// commas.
-    /// @throws zemInvalidParameterException id "INVALID_INDEX": a position outside the table
+    /// @throws zemInvalidParameterException id "INVALID_INDEX": a position outside the table, or no
+    ///         such @p op
     void BuildChCmdString(zemString& strCmd,
                           const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
                           const zemDynamicArray<tagAttributePair>& multiValAttrPairs,

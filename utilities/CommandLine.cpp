@@ -39,6 +39,17 @@ bool collectArgument(const std::string& text, size_t& pos, std::string& argument
 
 }  // namespace
 
+std::string zemEscaped(const char* text) {
+    std::string result;
+    for (; text != nullptr && *text != '\0'; ++text) {
+        if (*text == '"' || *text == '\\') result += '\\';
+        result += *text;
+    }
+    return result;
+}
+
+std::string zemQuoted(const char* text) { return '"' + zemEscaped(text) + '"'; }
+
 zemCommandLine zemSplitCommandLine(const char* command) {
     const std::string text = command != nullptr ? command : "";
     zemCommandLine line;

@@ -1,4 +1,5 @@
-/// Takes the flat text of a command line apart, as a shell would do with the words of a line.
+/// Takes the flat text of a command line apart, as a shell would do with the words of a line, and
+/// makes texts that come out of it as they were.
 ///
 /// There are no expansions, no redirections and no comments: blanks part the arguments, quotes and
 /// backslashes keep them together. Plain functions of their arguments; any thread may call them.
@@ -25,5 +26,10 @@ struct zemCommandLine {
 /// does so before a double quote and a backslash only; between single quotes it is a character
 /// like any other. A pair of quotes alone is an empty argument.
 zemCommandLine zemSplitCommandLine(const char* command);
+
+/// @p text, which may be null, as it has to stand between double quotes for zemSplitCommandLine()
+/// to give it back; and the same with these quotes.
+std::string zemEscaped(const char* text);
+std::string zemQuoted(const char* text);
 
 #endif

@@ -1,5 +1,6 @@
 #include "EdallocCmdCaller.h"
 
+#include "CommandLine.h"
 #include "Exception.h"
 #include "Log.h"
 #include "PropertiesHelper.h"
@@ -102,7 +103,7 @@ int zemEdallocCmdCaller::modifyProcessing(const char* managedSystem, const zemSt
     const zemRASDCommData& data = *rasd->getData();
     std::string settings;
     if (!data.m_SharingMode.isEmpty()) {
-        settings = "sharing_mode=" + textOf(data.m_SharingMode);
+        settings = "sharing_mode=" + zemEscaped(data.m_SharingMode);
     }
     if (data.m_Weight != -1) {
         settings += (settings.empty() ? "" : ",");

@@ -8,6 +8,9 @@
 ///     zemEdallocCmdCaller caller(userName, locale);
 ///     caller.addProcessing(mtms, "3", 200, 0, nullptr, nullptr);  // two processors more
 ///
+/// The host, the partition and the slot stand in the line as they are: callers quote what may hold
+/// a blank, a quote or a backslash (zemCommandCaller::quoted()).
+///
 /// An object is made for one operation and is not shared between threads.
 #ifndef EDALLOC_CMD_CALLER_H
 #define EDALLOC_CMD_CALLER_H

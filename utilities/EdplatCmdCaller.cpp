@@ -1,5 +1,6 @@
 #include "EdplatCmdCaller.h"
 
+#include <memory>
 #include <string>
 
 namespace {
@@ -26,7 +27,8 @@ int zemEdplatCmdCaller::changeManagedSystemInformation(const Pairs& attrPairs,
 int zemEdplatCmdCaller::changePartitionsInformation(const zemString& lparId, const Pairs& attrPairs,
                                                     const char* managedSystem, CH_OP_TYPE op) {
     Pairs identity;
-    identity.addElement(new tagAttributePair{PartitionAttribute::ATTR_LPAR_ID, lparId});
+    identity.addElement(
+        std::make_unique<tagAttributePair>(PartitionAttribute::ATTR_LPAR_ID, itemValue(lparId)));
     return change("lpar", identity, attrPairs, managedSystem, PartitionAttribute::m_attributeName,
                   op);
 }
@@ -38,8 +40,10 @@ int zemEdplatCmdCaller::changePartitionsProfileInformation(const zemString& prof
                                                            CH_OP_TYPE op) {
     using Profile = PartitionProfileAttribute;
     Pairs identity;
-    identity.addElement(new tagAttributePair{Profile::ATTR_NAME, profName});
-    identity.addElement(new tagAttributePair{Profile::ATTR_LPAR_ID, lparId});
+    identity.addElement(
+        std::make_unique<tagAttributePair>(Profile::ATTR_NAME, itemValue(profName)));
+    identity.addElement(
+        std::make_unique<tagAttributePair>(Profile::ATTR_LPAR_ID, itemValue(lparId)));
     return change("prof", identity, attrPairs, managedSystem, Profile::m_attributeName, op);
 }
 

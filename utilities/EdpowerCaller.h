@@ -35,7 +35,9 @@ public:
     void setManagedSystem(const zemString& managedSystem) { m_mtms = managedSystem; }
 
     /// The partition, and the profile and boot mode with which it is activated. Modes are 0 none,
-    /// 1 "norm", 2 "dd", 3 "ds", 4 "of", 5 "sms".
+    /// 1 "norm", 2 "dd", 3 "ds", 4 "of", 5 "sms". The profile stands in the line as it is, and so
+    /// does a system profile: callers quote what may hold a blank, a quote or a backslash
+    /// (zemCommandCaller::quoted()).
     void setLparId(int lparId) { m_LparId = lparId; }
     void setLparProfileName(const zemString& name) { m_lparProfileName = name; }
     void setBootMode(int bootMode) { m_BootMode = bootMode; }

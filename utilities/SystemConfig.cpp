@@ -2,6 +2,7 @@
 
 #include <fstream>
 #include <functional>
+#include <memory>
 
 #include "DNXApiCaller.h"
 #include "Exception.h"
@@ -75,7 +76,7 @@ zemDynamicArray<zemHostSystem> zemManagerSystem::getAllHostSystem(const char* re
     const zemApiReader reader = {kClass, "getAllHostSystem", "getAllCecs", "UNKNOWN"};
     zemDynamicArray<zemHostSystem> hosts;
     for (apiProp& host : zemApiObjects(reader, zemApiCaller().getAllCecs(requestUserContext, 1))) {
-        hosts.addElement(new zemHostSystem(host, requestUserContext, locale));
+        hosts.addElement(std::make_unique<zemHostSystem>(host, requestUserContext, locale));
     }
     return hosts;
 }
@@ -95,7 +96,8 @@ zemDynamicArray<zemVirtualSystem> zemManagerSystem::getAllVirtualSystemByHostNam
     zemDynamicArray<zemVirtualSystem> partitions;
     for (apiProp& partition :
          zemApiObjects(reader, zemApiCaller().getAllLparsFromCec(requestUserContext, mtms, 2))) {
-        partitions.addElement(new zemVirtualSystem(partition, requestUserContext, nullptr));
+        partitions.addElement(
+            std::make_unique<zemVirtualSystem>(partition, requestUserContext, nullptr));
     }
     return partitions;
 }

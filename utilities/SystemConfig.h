@@ -205,7 +205,11 @@ public:
     zemString getCurrentProfileName();
 
     zemString getProcCompatMode();
+
+    /// The position of the keylock, 0 "norm", 1 "manual" or -1 unknown, and the word for such a
+    /// number, "" for unknown ones.
     int getKeyLock();
+    static zemString getKeyLockByID(int position);
 
     /// Whether errors are reported on two paths.
     bool getRedundantPath();
@@ -220,7 +224,9 @@ public:
 
     /// Tries a move to @p targetHost.
     /// @param isCrossManager  the host belongs to the appliance @p targetManager
-    /// @param userName  user on that appliance; null: not told to the tool
+    /// @param userName  user on that appliance; null: not told to the tool. Both stand in the line
+    ///        as they are: the caller quotes what may hold a blank, a quote or a backslash
+    ///        (zemCommandCaller::quoted()).
     /// @return true
     /// @throws zemOperationFailedException it cannot be done: the id is the first word of the
     ///         tool's text
@@ -258,12 +264,16 @@ public:
     /// The user under whom this object asks.
     zemString getAuthorizedUser() const { return m_requestUserContext; }
 
-    /// One attribute of zemQyplatCmdCaller::PartitionAttribute, asked of the tool.
-    /// @throws zemObjectNotFoundException there is no such partition
-    zemString getAttributeValue(int attributeIndex);
-
 private:
     friend class zemHostSystem;
+
+    /// One attribute of zemQyplatCmdCaller::PartitionAttribute, asked of the tool.
+    /// @throws zemObjectNotFoundException there is no such partition
+    /// @throws zemInvalidParameterException id "INVALID_INDEX": there is no such attribute
+    zemString getAttributeValue(int attributeIndex);
+
+    /// The filter of the tools for this partition.
+    zemString ownFilter() const;
 
     void updateData(OP_LEVEL level);
     void parseApiProp(apiProp& prop);
@@ -356,6 +366,7 @@ public:
     /// Attributes of zemQyplatCmdCaller::PartitionProfileAttribute, asked of the tool: a record for
     /// a list that ends in -1, and a single value.
     /// @throws zemObjectNotFoundException there is no such profile
+    /// @throws zemInvalidParameterException id "INVALID_INDEX": there is no such attribute
     zemRecordSetsType getAttributeValues(int* attributeIndex);
     zemString getAttributeValue(int attributeIndex);
 

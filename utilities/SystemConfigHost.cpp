@@ -1,6 +1,8 @@
 #include <cstdlib>
+#include <memory>
 #include <string>
 
+#include "CommandLine.h"
 #include "DNXApiCaller.h"
 #include "LetUnwind.h"
 #include "NwplatCmdCaller.h"
@@ -115,8 +117,8 @@ zemDynamicArray<zemVirtualSystem> zemHostSystem::readPartitions(const char* meth
     for (apiProp& partition : objects) {
         if (environment == nullptr ||
             zemApiProp(&partition).getProperty("Lpar_env") == environment) {
-            partitions.addElement(
-                new zemVirtualSystem(partition, *this, m_requestUserContext, m_locale));
+            partitions.addElement(std::make_unique<zemVirtualSystem>(
+                partition, *this, m_requestUserContext, m_locale));
         }
     }
     return partitions;
@@ -135,19 +137,26 @@ zemVirtualSystem zemHostSystem::getVirtualSystemByName(const zemString& lparName
     const char* const method = "getVirtualSystemByName";
     const zemString mtms = getMTMS();
     const zemRecordSetsType records = zemWithNotFound(kUnknownToChanges, kClass, method, [&] {
-        zemString filter;
-        filter.format("\"lpar_names=%s\"", static_cast<const char*>(lparName));
+        const zemString filter =
+            zemCommandCaller::quoted(zemCommandCaller::filterItem("lpar_names", lparName));
         return zemQyplatCmdCaller(m_requestUserContext, m_locale)
             .getPartitionsInformation(zemVirtualSystem::m_virtualSystemInfoAttr, mtms, filter);
     });
-    if (records.size() == 0) {
+    // Several answer a name with commas when that is not one partition's, but the names of several.
+    int found = records.size() == 1 ? 0 : -1;
+    for (int i = 0; i < records.size(); ++i) {
+        if ((*records.getElementAt(i))[Partition::ATTR_NAME] == lparName) {
+            found = i;
+        }
+    }
+    if (found < 0) {
         zemString text;
         text.format("The requested patition(name:%s) was not found on managed system %s",
                     static_cast<const char*>(lparName), static_cast<const char*>(mtms));
         throw zemObjectNotFoundException(kClass, method, text);
     }
     // State and boot mode stand in the record as words; the object reads their numbers.
-    return zemVirtualSystem((*records.getElementAt(0))[Partition::ATTR_LPAR_ID], *this,
+    return zemVirtualSystem((*records.getElementAt(found))[Partition::ATTR_LPAR_ID], *this,
                             m_requestUserContext, m_locale);
 }
 
@@ -183,9 +192,8 @@ ZEM_MIGRATION_NUMBER(getMaxActiveMigrationNum, NUM_ACTIVE_MIGRATIONS_SUPPORTED)
 ZEM_MIGRATION_NUMBER(getCurrentActiveMigrationNum, NUM_ACTIVE_MIGRATIONS_IN_PROGRESS)
 
 int zemHostSystem::destoryVirtualSystem(const char* lparId) {
-    const std::string line = std::string("dlplat -r lpar -m \"") +
-                             static_cast<const char*>(getMTMS()) + "\" --id \"" +
-                             (lparId != nullptr ? lparId : "") + '"';
+    const std::string line =
+        "dlplat -r lpar -m " + zemQuoted(getMTMS()) + " --id " + zemQuoted(lparId);
     return zemCommandCaller(m_requestUserContext, nullptr)
         .callGenericCommand(line.c_str(), nullptr, false);
 }

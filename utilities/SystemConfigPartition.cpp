@@ -1,7 +1,9 @@
 #include <cmath>
 #include <cstdlib>
+#include <memory>
 #include <string>
 
+#include "CommandLine.h"
 #include "DNXApiCaller.h"
 #include "EdplatCmdCaller.h"
 #include "LetUnwind.h"
@@ -22,8 +24,6 @@ constexpr int kBase = 10;
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using PartitionChange = zemEdplatCmdCaller::PartitionAttribute;
 
-const char* textOf(const zemString& text) { return text; }
-
 /// The name behind the number in "<number>,<profile name>"; empty when there is no profile.
 zemString profileNameOf(const zemString& text) {
     const int comma = text.find(',');
@@ -32,22 +32,6 @@ zemString profileNameOf(const zemString& text) {
         return zemString();
     }
     return text.extractSubstring(static_cast<unsigned>(comma) + 1);
-}
-
-zemString environmentOf(const zemString& definitionState) {
-    switch (zemNumberOf(definitionState)) {
-        case 1:
-        case 2:
-            return "tmxlinux";
-        case 3:
-        case 4:
-            return "xbrgserver";
-        case 129:
-        case 130:
-            return "osq00";
-        default:
-            return definitionState;
-    }
 }
 
 /// What a tool of moves says of its failure: an id up to the first blank, and the words behind it.
@@ -113,7 +97,11 @@ void zemVirtualSystem::parseApiProp(apiProp& prop) {
     const zemString key = partition.getProperty("Name");
     m_lparId = key.extractSubstring(0, static_cast<unsigned>(key.find('*')));
     m_lparName = partition.getProperty("UserDefinedName");
-    m_lparEnv = environmentOf(partition.getProperty("DefinitionState"));
+    const zemString definition = partition.getProperty("DefinitionState");
+    m_lparEnv = zemEnvironmentText(zemNumberOf(definition));
+    if (m_lparEnv.isEmpty()) {
+        m_lparEnv = definition;
+    }
     m_lparState = zemNumberOf(partition.getProperty("PartitionState"));
     m_bootMode = zemNumberOf(partition.getProperty("BootMode"));
     m_migrationState = zemNumberOf(partition.getProperty("MigrationState"));
@@ -140,6 +128,10 @@ void zemVirtualSystem::needLevel2() {
     }
 }
 
+zemString zemVirtualSystem::ownFilter() const {
+    return zemCommandCaller::quoted(zemCommandCaller::filterItem("lpar_ids", m_lparId));
+}
+
 zemString zemVirtualSystem::getLparIDAndMTMS() { return m_lparId + "*" + getMTMS(); }
 
 /// A getter of what a level tells.
@@ -162,10 +154,12 @@ ZEM_PARTITION_GETTER(zemString, getMigrationStateString, 1,
 ZEM_PARTITION_GETTER(zemString, getDefaultProfileName, 2, m_defaultProfile)
 ZEM_PARTITION_GETTER(zemString, getCurrentProfileName, 2, m_currProfile)
 ZEM_PARTITION_GETTER(zemString, getProcCompatMode, 2, m_procCompatMode)
-ZEM_PARTITION_GETTER(int, getKeyLock, 2, m_lparKeylock)
+ZEM_PARTITION_GETTER(int, getKeyLock, 2, zemKeylockOf(m_lparKeylock))
 ZEM_PARTITION_GETTER(bool, getRedundantPath, 2, m_redundantPath)
 
 zemString zemVirtualSystem::getStateByID(int state) { return zemPartitionStateText(state); }
+
+zemString zemVirtualSystem::getKeyLockByID(int position) { return zemKeylockText(position); }
 
 zemString zemVirtualSystem::getBootModeByID(int bootMode) { return zemBootModeText(bootMode); }
 
@@ -180,13 +174,13 @@ std::string zemVirtualSystem::moveLine(char operation, const zemString& targetHo
                                        const char* userName) {
     std::string manager;
     if (isCrossManager) {
-        manager = std::string("--ip ") + textOf(targetManager);
+        manager = std::string("--ip ") + static_cast<const char*>(targetManager);
         if (userName != nullptr) {
             manager += std::string("-u ") + userName;  // no blank before it: the tool gets it so
         }
     }
-    return std::string("domove -o ") + operation + " -m \"" + textOf(getMTMS()) + "\" -t \"" +
-           textOf(targetHost) + "\" " + manager + " --id \"" + textOf(m_lparId) + '"';
+    return std::string("domove -o ") + operation + " -m " + zemQuoted(getMTMS()) + " -t " +
+           zemQuoted(targetHost) + ' ' + manager + " --id " + zemQuoted(m_lparId);
 }
 
 bool zemVirtualSystem::validateMigratebility(const zemString& targetHost, bool isCrossManager,
@@ -219,8 +213,8 @@ int zemVirtualSystem::migrateTo(const zemString& targetHost, bool isCrossManager
 int zemVirtualSystem::stopMigration(const zemString& /*targetHost*/, bool /*isCrossManager*/,
                                     const zemString& /*targetManager*/, const char* /*userName*/,
                                     int timeOut) {
-    const std::string line = std::string("domove -o s -m \"") + textOf(getMTMS()) + "\" --id \"" +
-                             textOf(m_lparId) + '"';
+    const std::string line =
+        "domove -o s -m " + zemQuoted(getMTMS()) + " --id " + zemQuoted(m_lparId);
     zemString output;
     zemString errors;
     int exitCode = -1;
@@ -236,10 +230,9 @@ int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
     using Migration = zemQymoveCmdCaller::PartitionAttribute;
     int wanted[] = {Migration::ATTR_BYTES_TRANSMITTED, Migration::ATTR_BYTES_REMAINING,
                     Migration::ATTR_END};
-    const std::string filter = std::string("\"lpar_ids=") + textOf(m_lparId) + '"';
     const zemRecordSetsType records =
         zemQymoveCmdCaller(userName, nullptr)
-            .getPartitionsMigrationState(wanted, getMTMS(), filter.c_str());
+            .getPartitionsMigrationState(wanted, getMTMS(), ownFilter());
     if (records.size() == 0) {
         return -1;
     }
@@ -256,7 +249,8 @@ int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
 int zemVirtualSystem::change(int attributeIndex, const zemString& value, const char* method) {
     return zemWithNotFound(kUnknownToChanges, kClass, method, [&] {
         zemDynamicArray<tagAttributePair> pairs;
-        pairs.addElement(new tagAttributePair{attributeIndex, value});
+        pairs.addElement(
+            std::make_unique<tagAttributePair>(attributeIndex, zemCommandCaller::itemValue(value)));
         return zemEdplatCmdCaller(m_requestUserContext, m_locale)
             .modifyPartitionsInformation(m_lparId, pairs, getMTMS());
     });
@@ -272,9 +266,8 @@ int zemVirtualSystem::setName(const zemString& systemName) {
 
 int zemVirtualSystem::setKeylock(const zemString& keylockPos) {
     return zemWithNotFound(kUnknownToChanges, kClass, "setKeylock", [&] {
-        const std::string line = std::string("edpower -r lpar -o chkey -k \"") +
-                                 textOf(keylockPos) + "\" --id \"" + textOf(m_lparId) + "\" -m \"" +
-                                 textOf(getMTMS()) + '"';
+        const std::string line = "edpower -r lpar -o chkey -k " + zemQuoted(keylockPos) + " --id " +
+                                 zemQuoted(m_lparId) + " -m " + zemQuoted(getMTMS());
         return zemCommandCaller(m_requestUserContext, m_locale)
             .callGenericCommand(line.c_str(), nullptr, false);
     });
@@ -295,8 +288,8 @@ zemDynamicArray<zemVirtualSystemProfile> zemVirtualSystem::getAllVirtualSystemPr
                                             m_requestUserContext, getLparIDAndMTMS(), 1));
     zemDynamicArray<zemVirtualSystemProfile> profiles;
     for (apiProp& profile : objects) {
-        profiles.addElement(
-            new zemVirtualSystemProfile(profile, *this, m_requestUserContext, m_locale));
+        profiles.addElement(std::make_unique<zemVirtualSystemProfile>(
+            profile, *this, m_requestUserContext, m_locale));
     }
     return profiles;
 }
@@ -313,12 +306,12 @@ zemVirtualSystemProfile zemVirtualSystem::getVirtualSystemProfileByName(
 
 zemString zemVirtualSystem::getAttributeValue(int attributeIndex) {
     const char* const method = "getAttributeValue";
+    zemExpectAttribute(attributeIndex, kClass, method);
     int wanted[] = {attributeIndex, Partition::ATTR_END};
     const zemString key = getLparIDAndMTMS();
     const zemRecordSetsType records = zemWithNotFound(kUnknownToQueries, kClass, method, [&] {
-        const std::string filter = std::string("\"lpar_ids=") + textOf(m_lparId) + '"';
         return zemQyplatCmdCaller(m_requestUserContext, m_locale)
-            .getPartitionsInformation(wanted, getMTMS(), filter.c_str());
+            .getPartitionsInformation(wanted, getMTMS(), ownFilter());
     });
     if (records.size() == 0) {
         throw zemObjectNotFoundException(kClass, method, key);

@@ -1,5 +1,6 @@
 #include <algorithm>
 #include <iterator>
+#include <memory>
 #include <string>
 #include <string_view>
 
@@ -158,23 +159,24 @@ zemDynamicArray<zemString> zemVirtualSystemProfile::getVirtualIOResources(IOReso
         throw zemOperationFailedException(kClass, "getVirtualIOResources", "INVALID_RECORD", list);
     }
     for (int i = 0; i <= parts; ++i) {
-        elements.addElement(new zemString((*records.getElementAt(0))[i]));
+        elements.addElement(std::make_unique<zemString>((*records.getElementAt(0))[i]));
     }
     return elements;
 }
 
 zemRecordSetsType zemVirtualSystemProfile::getAttributeValues(int* attributeIndex) {
     return zemWithNotFound(kUnknownToQueries, kClass, "getAttributeValues", [&] {
-        zemString filter;
-        filter.format("\"lpar_ids=%s,profile_names=%s\"",
-                      static_cast<const char*>(m_virtualSystem.getLparID()),
-                      static_cast<const char*>(m_profileName));
+        const zemString items =
+            zemCommandCaller::filterItem("lpar_ids", m_virtualSystem.getLparID()) + "," +
+            zemCommandCaller::filterItem("profile_names", m_profileName);
         return zemQyplatCmdCaller(m_requestUserContext, m_locale)
-            .getPartitionsProfileInformation(attributeIndex, m_virtualSystem.getMTMS(), filter);
+            .getPartitionsProfileInformation(attributeIndex, m_virtualSystem.getMTMS(),
+                                             zemCommandCaller::quoted(items));
     });
 }
 
 zemString zemVirtualSystemProfile::getAttributeValue(int attributeIndex) {
+    zemExpectAttribute(attributeIndex, kClass, "getAttributeValue");
     int wanted[] = {attributeIndex, Profile::ATTR_END};
     const zemRecordSetsType records = getAttributeValues(wanted);
     if (records.size() == 0) {
@@ -196,8 +198,9 @@ int zemVirtualSystemProfile::change(const zemDynamicArray<tagAttributePair>& att
 
 int zemVirtualSystemProfile::setName(const zemString& newName) {
     zemDynamicArray<tagAttributePair> pairs;
-    pairs.addElement(new tagAttributePair{
-        zemEdplatCmdCaller::PartitionProfileAttribute::ATTR_NEW_NAME, newName});
+    pairs.addElement(std::make_unique<tagAttributePair>(
+        zemEdplatCmdCaller::PartitionProfileAttribute::ATTR_NEW_NAME,
+        zemCommandCaller::itemValue(newName)));
     const int rc = change(pairs, zemCommandCaller::CH_OP_MODIFY);
     m_profileName = newName;
     return rc;

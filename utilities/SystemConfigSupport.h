@@ -18,6 +18,14 @@ inline int zemNumberOf(const zemString& text) {
     return static_cast<int>(std::strtol(text, nullptr, kBase));
 }
 
+/// @throws zemInvalidParameterException @p index is the mark that ends a list, and no attribute
+inline void zemExpectAttribute(int index, const char* throwClass, const char* throwMethod) {
+    if (index == -1) {
+        throw zemInvalidParameterException(throwClass, throwMethod, "INVALID_INDEX",
+                                           zemString(index));
+    }
+}
+
 /// Ids by which the query tool and the change tools say that there is no such object.
 constexpr const char* kUnknownToQueries[] = {"WRTL8018", "WRTL8011"};
 constexpr const char* kUnknownToChanges[] = {"WRTL8018", "WRTL8011", "WRTL8010"};

@@ -42,6 +42,19 @@ constexpr Word kPartitionStates[] = {
 
 constexpr Word kBootModes[] = {{1, "norm"}, {2, "ds"}, {3, "sms"}, {4, "of"}, {5, "dd"}};
 
+constexpr Word kEnvironments[] = {{1, "tmxlinux"},   {2, "tmxlinux"}, {3, "xbrgserver"},
+                                  {4, "xbrgserver"}, {129, "osq00"},  {130, "osq00"}};
+
+/// The tools' word, the number of the management library, and that of this library's objects.
+constexpr struct {
+    const char* text;
+    int number;
+    zemKeylock position;
+} kKeylocks[] = {
+    {"norm", 4, KEYLOCK_NORM},
+    {"manual", 2, KEYLOCK_MANUAL},
+};
+
 /// A state that has several numbers stands in several rows; its text is that of the first.
 constexpr struct {
     int number;
@@ -73,6 +86,24 @@ const char* zemHostStateText(int state) { return textOf(kHostStates, state, "");
 const char* zemPartitionStateText(int state) { return textOf(kPartitionStates, state, ""); }
 
 const char* zemBootModeText(int bootMode) { return textOf(kBootModes, bootMode, "unknown"); }
+
+const char* zemEnvironmentText(int definitionState) {
+    return textOf(kEnvironments, definitionState, "");
+}
+
+zemKeylock zemKeylockOf(int number) {
+    for (const auto& row : kKeylocks) {
+        if (row.number == number) return row.position;
+    }
+    return KEYLOCK_UNKNOWN;
+}
+
+const char* zemKeylockText(int position) {
+    for (const auto& row : kKeylocks) {
+        if (row.position == position) return row.text;
+    }
+    return "";
+}
 
 zemMigrationState zemMigrationStateOf(int number) {
     for (const auto& row : kMigrationStates) {

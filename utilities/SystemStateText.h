@@ -11,6 +11,18 @@ const char* zemPartitionStateText(int state);
 /// Boot mode, as "norm"; "unknown" for an unknown number.
 const char* zemBootModeText(int bootMode);
 
+/// What runs in a partition that is defined so, as "osq00"; "" for an unknown number.
+const char* zemEnvironmentText(int definitionState);
+
+/// Positions of a partition's keylock as this library numbers them.
+enum zemKeylock { KEYLOCK_UNKNOWN = -1, KEYLOCK_NORM = 0, KEYLOCK_MANUAL = 1 };
+
+/// The position for the management library's number.
+zemKeylock zemKeylockOf(int number);
+
+/// The tools' word for a position; "" if it is unknown.
+const char* zemKeylockText(int position);
+
 /// States of a partition's migration as this library numbers them.
 enum zemMigrationState {
     MIGRATION_UNKNOWN = 0,

@@ -20,17 +20,6 @@ using testing_support::TestAppliance;
 constexpr char kHost[] = "1111-AAA*0000001";
 constexpr unsigned kFirstId = 20;  // of the partitions that are made
 
-/// @p text as the value of an item between the quotes of a command line.
-std::string itemText(const std::string& text) {
-    std::string result;
-    for (char c : text) {
-        if (c == '"') result += "\\\"";
-        if (c == '"' || c == '\\') result += '\\';
-        result += c;
-    }
-    return result;
-}
-
 struct Asked {
     int creation;  ///< position in the creation tool's table
     int profile;   ///< in that of the profile's query
@@ -168,7 +157,8 @@ TEST(ConfigurationTest, BothDoorsTellWhatWasAskedFor) {
         const Configuration configuration = Generator(i).make();
         zemDynamicArray<tagAttributePair> pairs;
         for (const Asked& item : configuration)
-            pairs.addElement(new tagAttributePair{item.creation, itemText(item.value).c_str()});
+            pairs.addElement(new tagAttributePair{item.creation,
+                                                  zemCommandCaller::itemValue(item.value.c_str())});
         try {
             ASSERT_EQ(0, host.createVirtualSystem(pairs));
             const zemString id(std::to_string(kFirstId + i).c_str());

@@ -19,12 +19,15 @@ std::string escaped(const std::vector<std::string>& arguments) {
     for (std::size_t i = 1; i < arguments.size(); ++i) {
         const std::string& argument = arguments[i];
         const bool quoted = i % 2 == 0 || argument.empty() || argument.back() == ' ';
-        line += quoted ? " \"" : " ";
+        line += ' ';
+        if (quoted) {
+            line += zemQuoted(argument.c_str());
+            continue;
+        }
         for (const char c : argument) {
-            line += !quoted || c == '"' || c == '\\' ? "\\" : "";
+            line += '\\';
             line += c;
         }
-        line += quoted ? "\"" : "";
     }
     return line;
 }

@@ -53,7 +53,7 @@ using Row = std::tuple<const char*, const char*, std::function<void()>>;
 
 TEST(ChangeCallersTest, Edalloc) {
     zemEdallocCmdCaller c("", "");
-    RASD both("uncap", 128), weight("", 0), none("", -1);
+    RASD both("uncap", 128), weight("", 0), odd("a\" -o \"r", 0), none("", -1);
     pid_t pid = 0;
     pid_t* const p = nullptr;
     FILE* stream = nullptr;
@@ -65,6 +65,7 @@ TEST(ChangeCallersTest, Edalloc) {
         {"removeProcessing:procs:200;procUnits:5;", "proc -m h*1 -o r --id 3 --procs 2 --procunits 0.05", [&] { c.removeProcessing("h*1", "3", 200, 5, p, &stream); }},
         {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "sharing_mode=uncap,uncap_weight=128")", [&] { c.modifyProcessing("h*1", "3", &both, p, f); }},
         {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "uncap_weight=0")", [&] { c.modifyProcessing("h*1", "3", &weight, p, f); }},
+        {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "sharing_mode=a\" -o \"r,uncap_weight=0")", [&] { c.modifyProcessing("h*1", "3", &odd, p, f); }},
         {"modifyProcessing: ", R"(proc -m h*1 -o s --id 3 -a "")", [&] { c.modifyProcessing("h*1", "3", &none, p, f); }},
         {"addMemory:", "mem -m h*1 -o a --id 3", [&] { c.addMemory("h*1", "3", 0, 0, p, f); }},
         {"removeMemory:", "mem -m h*1 -o r --id 3 --entitled 7 -q 8589934592", [&] { c.removeMemory("h*1", "3", 7, 8589934592, p, f); }},

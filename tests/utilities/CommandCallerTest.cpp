@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
+#include <malloc.h>
 
+#include <new>
 #include <tuple>
 
 #include "RecordParser.h"
@@ -18,6 +20,12 @@ public:
 };
 
 const TimingTrace timing("zemcommandtrace");
+
+/// What this thread has allocated, and how often it still may; -1: for ever.
+thread_local struct {
+    long held = 0;
+    long left = -1;
+} heap;
 
 constexpr const char* kNames[] = {"lpar_id", "name", "state", "mode"};
 
@@ -60,6 +68,44 @@ TEST(RecordParserTest, RecordsAndQuotes) {
     }
 }
 
+TEST(RecordParserTest, AsksTwiceForOneField) {
+    const int keys[] = {7, 7, 5};
+    zemRecordSetsType records(0, 25, 1);
+    EXPECT_TRUE(zemParseRecords(",b,c\n", keys, 3, records));
+    zemRecordType& record = *records[0];
+    EXPECT_EQ("|c;", text(records, {7, 5}));
+    EXPECT_EQ(2, record.insert(7, "late"));
+}
+
+// Short records are cheap however many fields were asked for, and a failure at any allocation
+// leaves nothing behind.
+TEST(RecordParserTest, RecordsTakeWhatTheirFieldsTake) {
+    constexpr unsigned kFields = 62;
+    std::string full = "\"a\"\"\"";
+    for (unsigned i = 1; i < kFields; ++i) full += ",ab";
+    const std::pair<std::string, long> rows[] = {
+        {"", 0}, {std::string(kFields, ','), 0}, {"x", 1}, {full, kFields}};
+    for (const auto& [line, texts] : rows) {
+        const std::string output = line + '\n' + line + '\n' + line + '\n';
+        bool parsed = false;
+        for (long allocations = 0; !parsed; ++allocations) {
+            const long before = heap.held;
+            try {
+                zemRecordSetsType records(0, 25, 1);
+                heap.left = allocations;
+                parsed = zemParseRecords(output, nullptr, kFields, records);
+                heap.left = -1;
+                EXPECT_GE(3 * (300 + texts * 96), heap.held - before) << line;
+                zemString last;
+                EXPECT_EQ(0, records.getElementAt(2)->lookup(kFields - 1, last));
+            } catch (const std::bad_alloc&) {
+                heap.left = -1;
+            }
+            ASSERT_EQ(before, heap.held) << "without the allocation " << allocations;
+        }
+    }
+}
+
 TEST(CommandCallerTest, JudgesTheToolsResult) {
     ToolFolder tools;
     const std::pair<const char*, const char*> rows[] = {
@@ -71,7 +117,8 @@ TEST(CommandCallerTest, JudgesTheToolsResult) {
         {"echo 'No results were found.'; exit 3", "5//\"tool\"/No results were found.\n"},
         {"echo 'No results were found.' >&2", ""},
         {"echo 'WRTL1234 something'; exit 1", "6/WRTL1234/\"tool\"/WRTL1234 something"},
-        {"echo 'WRT WRTL9\nx y\n' >&2; echo out; exit 1", "6/WRTL9\nx/\"tool\"/WRT WRTL9\nx y"},
+        {"echo 'WRT WRTL9\nx y\n' >&2; echo out; exit 1", "6/WRTL9/\"tool\"/WRT WRTL9\nx y"},
+        {"printf 'WRTL8\\tx' >&2; exit 1", "6/WRTL8/\"tool\"/WRTL8\tx"},
         {"printf 'see WRTL7' >&2; exit 1", "6/WRTL7/\"tool\"/see WRTL7"},
         {"echo other >&2; exit 255", "6/UNKNOWN/\"tool\"/other"},
         {"exit 1", "6/UNKNOWN/\"tool\"/"},
@@ -155,6 +202,7 @@ TEST(CommandCallerTest, BuildsChangesAndCreations) {
         {single, high, 0,
          R"(3/BuildChCmdString/INVALID_INDEX/tool -r x -i "\"name=P\",\"lpar_id=3\",/4)"},
         {low, none, 0, R"(3/BuildChCmdString/INVALID_INDEX/tool -r x -i "/-1)"},
+        {none, multi, 3, R"(3/BuildChCmdString/INVALID_INDEX/tool -r x -i "/3)"},
         {single, none, -1, R"(-r|x|-i|"name=P","lpar_id=3")"},
         {none, none, -1, "-r|x|-i|"},
         {high, none, -1, R"(3/callMkCommand/INVALID_INDEX/tool -r x -i "/4)"},
@@ -182,6 +230,23 @@ TEST(CommandCallerTest, CutsTheFrontOfALine) {
     zemRecordSetsType records(0, 25, 1);
     Caller().callLsCommand(front.c_str(), nullptr, -1, kNames, 1, records);
     EXPECT_EQ(std::string(2043, 'x') + "|-F|lpar_id", tools.arguments());
+    const std::string open = "tool \"" + std::string(3000, 'x') + '"';
+    EXPECT_EQ("3/INVALID_LENGTH/512",
+              failureText([&open] { Caller().callMkCommand(open.c_str(), pairs({}), kNames, 4); },
+                          "kit"));
 }
 
 }  // namespace
+
+void* operator new(size_t size) {
+    void* const memory = heap.left == 0 ? nullptr : std::malloc(size);
+    if (memory == nullptr) throw std::bad_alloc();
+    heap.left -= heap.left > 0;
+    heap.held += static_cast<long>(malloc_usable_size(memory));
+    return memory;
+}
+void operator delete(void* memory) noexcept {
+    heap.held -= static_cast<long>(malloc_usable_size(memory));
+    std::free(memory);
+}
+void operator delete(void* memory, size_t) noexcept { operator delete(memory); }

@@ -6,7 +6,10 @@
 #include <tuple>
 
 #include "DNXApiCaller.h"
+#include "EdallocCmdCaller.h"
 #include "EdplatCmdCaller.h"
+#include "EdpowerCaller.h"
+#include "EdsuspCaller.h"
 #include "LibraryFaults.h"
 #include "LibrarySpy.h"
 #include "NwplatCmdCaller.h"
@@ -208,13 +211,13 @@ TEST_F(SystemConfigTest, ParsesProperties) {
     }
     // properties, and key, name, environment, state, mode, profiles, processors, keylock, path, migration
     const std::pair<const char*, const char*> partitions[] = {
-        {"UserDefinedName=n;DefinitionState=1;PartitionState=2;BootMode=4;Default_prof=1,d,e;Curr_prof=2,c;ProcCompatMode=1;Keylock=2;RedundantPath=1;MigrationState=14", "12*T*S|n|tmxlinux|2|4|d,e|c|1|2|0|4|"},
-        {"DefinitionState=2;Default_prof=NULL,a;Curr_prof=,c", "12*T*S||tmxlinux|0|0||||0|1|0|"},
-        {"DefinitionState=3;Default_prof=normal;Curr_prof=null,b", "12*T*S||xbrgserver|0|0||||0|1|0|"},
-        {"DefinitionState=4;Default_prof=", "12*T*S||xbrgserver|0|0||||0|1|0|"},
-        {"DefinitionState=129;Default_prof=", "12*T*S||osq00|0|0||||0|1|0|"},
-        {"DefinitionState=130;Default_prof=", "12*T*S||osq00|0|0||||0|1|0|"},
-        {"DefinitionState=77;Default_prof=", "12*T*S||77|0|0||||0|1|0|"},
+        {"UserDefinedName=n;DefinitionState=1;PartitionState=2;BootMode=4;Default_prof=1,d,e;Curr_prof=2,c;ProcCompatMode=1;Keylock=2;RedundantPath=1;MigrationState=14", "12*T*S|n|tmxlinux|2|4|d,e|c|1|1|0|4|"},
+        {"DefinitionState=2;Default_prof=NULL,a;Curr_prof=,c;Keylock=4", "12*T*S||tmxlinux|0|0||||0|1|0|"},
+        {"DefinitionState=3;Default_prof=normal;Curr_prof=null,b", "12*T*S||xbrgserver|0|0||||-1|1|0|"},
+        {"DefinitionState=4;Default_prof=", "12*T*S||xbrgserver|0|0||||-1|1|0|"},
+        {"DefinitionState=129;Default_prof=", "12*T*S||osq00|0|0||||-1|1|0|"},
+        {"DefinitionState=130;Default_prof=", "12*T*S||osq00|0|0||||-1|1|0|"},
+        {"DefinitionState=77;Default_prof=", "12*T*S||77|0|0||||-1|1|0|"},
     };
     for (const auto& [properties, shown] : partitions) {
         Partition l(*object(std::string("Name=12*T*S;") + properties), "", "");
@@ -273,6 +276,7 @@ TEST_F(SystemConfigTest, NumbersHaveWords) {
     EXPECT_EQ("0 Standby;1 Operating;3 Power Off;6 Initializing;12 Error;13 Error - Dump in progress;14 Error - Terminated;15 QCAP Click to Accept;17 Standby;32 Power Off In Progress;33 Service Processor Failover In Progress;240 Failed Authentication;241 Failed Authentication;242 Pending Authentication - Password Updates Required;243 Pending Authentication - Password Updates Required;250 Version Mismatch;251 Recovery;253 Incomplete;254 No Connection;", all(zemHostSystem::getStateByID, ""));
     EXPECT_EQ("0 Not Activated;1 Starting;2 Running;3 Shutting Down;4 Error;8 Open Firmware;9 Suspended;252 Not Available;255 unknown;", all(Partition::getStateByID, ""));
     EXPECT_EQ("1 norm;2 ds;3 sms;4 of;5 dd;", all(Partition::getBootModeByID, "unknown"));
+    EXPECT_EQ("0 norm;1 manual;", all(Partition::getKeyLockByID, ""));
     EXPECT_EQ("9 1;10 2;12 3;13 4;14 4;15 4;16 6;255 5;", all(migration, "0"));
     const std::pair<const char*, int> texts[] = {
         {"not migrating", 1}, {"Migration Starting", 2}, {"MIGRATION STOPPED", 3}, {"Migration In Progress", 4},
@@ -312,7 +316,6 @@ TEST_F(SystemConfigTest, LinesOfTheTools) {
         {"domove", "-o|s|" + m + "|--id|3", "0", "", [&] { return m_partition.stopMigration("T", true, "x", "u", 0); }},
         {"domove", "-o|m|" + m + "|-t|T|--ip|x|--id|3", "0", "", [&] { const int rc = m_partition.migrateTo("T", true, "x", nullptr, &pid, &stream); return rc + (pid == waitpid(pid, nullptr, 0) ? fclose(stream) : 1); }},
         {"qyplat", lpar + "|--filter|lpar_names=x,y|-F|lpar_id,state,name,curr_profile,default_profile,lpar_env,boot_mode", "2", "5/zemHostSystem/getVirtualSystemByName//The requested patition(name:x,y) was not found on managed system 1111-AAA*0000001", [&] { return m_host.getVirtualSystemByName("x,y").getLparID(); }},
-        {"qyplat", lpar + "|--filter|lpar_ids=3|-F|os_version", "2", "5/zemVirtualSystem/getAttributeValue//3*1111-AAA*0000001", [&] { return m_partition.getAttributeValue(zemQyplatCmdCaller::PartitionAttribute::ATTR_OS_VERSION); }},
         {"qyplat", prof + "|--filter|lpar_ids=3,profile_names=normal|-F|name", "2", "5/zemVirtualSystemProfile/getAttributeValue//normal", [&] { return m_profile.getAttributeValue(2); }},
         {"qymove", "-r|manager|-F|remote_lpar_mobility_capable", "0", "6/zemManagerSystem/isEnableRemoteRelocation//0", [] { return zemManagerSystem::isEnableRemoteRelocation(""); }},
         {"qymove", sys + "inactive_lpar_mobility_capable", "0", "6/zemHostSystem/isEnableInactiveMigration//0", [&] { return m_host.isEnableInactiveMigration(); }},
@@ -326,7 +329,7 @@ TEST_F(SystemConfigTest, LinesOfTheTools) {
     };
     // clang-format on
     for (const auto& [tool, arguments, result, missing, operation] : rows) {
-        m_tools.recorder(tool, "2\n6\n");
+        m_tools.recorder(tool, "2,,\"x,y\"\n6,,x\n");
         EXPECT_STREQ(result, operation()) << arguments;
         EXPECT_EQ(arguments, m_tools.arguments());
         m_tools.recorder(tool);
@@ -335,6 +338,94 @@ TEST_F(SystemConfigTest, LinesOfTheTools) {
     EXPECT_STREQ("n", m_profile.getName());
     m_tools.recorder("qymove", "1\n");
     EXPECT_TRUE(zemManagerSystem::isEnableRemoteRelocation("") && m_host.isEnableActiveMigration());
+}
+
+/// @p text with each "@" replaced by @p name, and each "#" by the name with its quotes doubled.
+std::string with(const std::string& name, const std::string& text) {
+    std::string result;
+    for (const char c : text) {
+        if (c != '@' && c != '#') result += c;
+        for (const char n : c == '@' || c == '#' ? name : "") {
+            result.append(c == '#' && n == '"' ? 2 : 1, n);
+        }
+    }
+    return result;
+}
+
+// Names are texts to every tool, whatever they hold, and no options, items or other names.
+TEST_F(SystemConfigTest, NamesStayWholeInEveryLine) {
+    const char* name = nullptr;
+    using Row = std::tuple<const char*, std::string, std::function<void()>>;
+    pid_t* const p = nullptr;
+    FILE** const f = nullptr;
+    const auto none = pairs({});
+    const auto raw = [&name] { return zemCommandCaller::quoted(name); };
+    // clang-format off
+    const Row rows[] = {
+        {"dlplat", "-r|lpar|-m|@*1|--id|@", [&] { m_host.destoryVirtualSystem(name); }},
+        {"nwplat", "-r|lpar|-m|@*1|-i|\"name=#\"", [&] { m_host.createVirtualSystem(pairs({{1, zemCommandCaller::itemValue(name)}})); }},
+        {"edpower", "-r|lpar|-o|chkey|-k|@|--id|@|-m|@*1", [&] { m_partition.setKeylock(name); }},
+        {"edpower", "-r|lpar|--id|3|-o|on|-f|@|-m|@", [&] { EdpowerCaller c("", ""); c.setManagedSystem(name); c.setResource(1); c.setOperation(1); c.setLparId(3); c.setLparProfileName(raw()); c.run(); }},
+        {"edsusp", "-o|suspend|-m|@|--id|3", [&] { EdsuspCaller c("", ""); c.setManagedSystem(name); c.setLparId(3); c.setOperation(1); c.run(); }},
+        {"edalloc", "-r|mem|-m|@|-o|a|--id|@", [&] { zemEdallocCmdCaller("", "").addMemory(raw(), raw(), 0, 0, p, f); }},
+        {"edalloc", "-r|io|--rsubtype|slot|-o|a|-m|1|--id|@|-l|@", [&] { zemEdallocCmdCaller("", "").addIOSlot("1", raw(), raw(), none, p, f); }},
+        {"edplat", "-r|sys|-m|@|-i|\"new_name=#\"", [&] { zemEdplatCmdCaller("", "").modifyManagedSystemInformation(pairs({{0, zemCommandCaller::itemValue(name)}}), name); }},
+        {"edplat", "-r|lpar|-m|@*1|-i|\"lpar_id=#\",\"new_name=#\"", [&] { m_partition.setName(name); }},
+        {"edplat", "-r|lpar|-m|@*1|-i|\"lpar_id=#\",\"default_profile=#\"", [&] { m_partition.setDefaultProfile(name); }},
+        {"edplat", "-r|prof|-m|@*1|-i|\"name=#\",\"lpar_id=#\",\"new_name=#\"", [&] { m_profile.setName(name); }},
+        {"domove", "-o|v|-m|@*1|-t|@|--ip|@-u|@|--id|@", [&] { m_partition.validateMigratebility(name, true, raw(), raw()); }},
+        {"domove", "-o|s|-m|@*1|--id|@", [&] { m_partition.stopMigration("", false, "", "", 0); }},
+        {"qymove", "-r|lpar|-m|@*1|--filter|lpar_ids=@|-F|bytes_transmitted,bytes_remaining", [&] { m_partition.getMigrationPercentComplete(""); }},
+        {"qyplat", "-r|lpar|-m|@*1|--filter|lpar_names=@|-F|lpar_id,state,name,curr_profile,default_profile,lpar_env,boot_mode", [&] { m_host.getVirtualSystemByName(name); }},
+        {"qyplat", "-r|prof|-m|@*1|--filter|lpar_ids=@,profile_names=@|-F|name", [&] { m_profile.getAttributeValue(2); }},
+    };
+    // clang-format on
+    for (const char* each :
+         {"a\" --id \"9", "back\\", "\\\"", "x\"", "东京, \"本番\"", "'$(id)' `id`"}) {
+        name = each;
+        for (const auto& [tool, arguments, operation] : rows) {
+            m_tools.recorder(tool, "5\n");
+            m_host = zemHostSystem(zemString(name) + "*1", "", "");
+            m_partition = Partition(name, m_host, "", "");
+            m_profile = Profile(name, m_partition, "", "");
+            EXPECT_EQ("", failureText(operation));
+            EXPECT_EQ(with(name, arguments), m_tools.arguments());
+        }
+    }
+}
+
+TEST_F(SystemConfigTest, FindsAnyName) {
+    makeAppliance();
+    const testing_support::ScopedEnvironment path("PATH", ZEM_PROGRAMS ":/usr/bin:/bin");
+    const char* const names[] = {"東京, \"本番\"", "small, \"safe\"",
+                                 "\"all\"",        "\"a\", b",
+                                 "a\" -m \"b",     "back\\",
+                                 "\\\"",           "\"",
+                                 "a,lpar_ids=1",   "web server,traveller",
+                                 "'$(id)' `id`"};
+    zemHostSystem beta("1111-AAB*0000002", "", "");
+    EXPECT_STREQ("3", beta.getVirtualSystemByName(names[0]).getLparID());
+    Profile safe = Partition("4", m_host, "", "").getVirtualSystemProfileByName(names[1]);
+    EXPECT_STREQ(
+        "4", safe.getAttributeValue(zemQyplatCmdCaller::PartitionProfileAttribute::ATTR_LPAR_ID));
+    EXPECT_THROW(m_host.getVirtualSystemByName(names[9]), zemObjectNotFoundException);
+    for (const char* name : names) {
+        m_partition.setName(name);
+        EXPECT_STREQ("3", m_host.getVirtualSystemByName(name).getLparID()) << name;
+        EXPECT_STREQ(name, m_host.getVirtualSystemById("3").getName());
+        safe.setName(name);
+        EXPECT_STREQ(
+            name, safe.getAttributeValue(zemQyplatCmdCaller::PartitionProfileAttribute::ATTR_NAME));
+    }
+}
+
+TEST_F(SystemConfigTest, NoAttributeIsAskedForByTheEndOfAList) {
+    m_tools.recorder("qyplat", "1\n");
+    EXPECT_EQ("3/zemVirtualSystemProfile/getAttributeValue/INVALID_INDEX/-1",
+              failureText([&] { m_profile.getAttributeValue(-1); }));
+    EXPECT_EQ("3/zemCommandCaller/callLsCommand/INVALID_INDEX/44",
+              failureText([&] { m_profile.getAttributeValue(44); }));
+    EXPECT_EQ("", m_tools.arguments());
 }
 
 TEST_F(SystemConfigTest, PartsOfAMove) {
@@ -363,7 +454,6 @@ TEST_F(SystemConfigTest, FailuresOfTheTools) {
         {"zemVirtualSystem/setVirtualSystemName", change, [&] { m_profile.setName("n"); }},
         {"zemVirtualSystem/setVirtualSystemName", change, [&] { m_profile.addVirtualIOResources(none); }},
         {"zemHostSystem/getVirtualSystemByName", change, [&] { m_host.getVirtualSystemByName("n"); }},
-        {"zemVirtualSystem/getAttributeValue", query, [&] { m_partition.getAttributeValue(1); }},
         {"zemVirtualSystemProfile/getAttributeValues", query, [&] { m_profile.getAttributeValue(2); }},
         {"", "", [&] { m_host.createVirtualSystem(none); }},
         {"", "", [&] { m_host.getMaxActiveMigrationNum(); }},

@@ -187,7 +187,7 @@ zemAssociationProvider::zemAssociationProvider(const CmpiBroker& mb, const CmpiC
                                                const char* providerName,
                                                SupportedOpType supportedOperations)
     : CmpiBaseMI(mb, ctx),
-      zemBaseProvider(mb, ctx, providerName),
+      zemServerAssociation(mb, ctx, providerName),
       m_supportedOperations(supportedOperations),
       m_assoData(25),
       m_aFirstClassName(16),
@@ -236,8 +236,6 @@ void zemAssociationProvider::populateEssentialKeys(const char* name, CmpiArray& 
     const zemAssociationData& row = requireAssoData(name);
     zemListReferences(keys, row.m_refPropName1, row.m_refPropName2);
 }
-
-const char* zemAssociationProvider::getMessageBundlePath() { return kZemAssociationBundle; }
 
 // ---- Hooks --------------------------------------------------------------------------------------
 
@@ -343,17 +341,6 @@ CmpiInstance zemAssociationProvider::makeInstance(zemAssociationCall& call, cons
     return instance;
 }
 
-void zemAssociationProvider::performEnumInstances(const CmpiContext& ctx, CmpiResult& rslt,
-                                                  const CmpiObjectPath& cop,
-                                                  const char** properties) {
-    enumerate({OP_EnumInstsOp, ctx, rslt, cop, properties});
-}
-
-void zemAssociationProvider::performEnumInstanceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                      const CmpiObjectPath& cop) {
-    enumerate({OP_EnumInstNamesOp, ctx, rslt, cop, nullptr});
-}
-
 void zemAssociationProvider::enumerate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);
     report(r, " <-");
@@ -407,32 +394,6 @@ void zemAssociationProvider::enumerateRow(zemAssociationCall& call, const zemAss
 }
 
 // ---- Navigation ---------------------------------------------------------------------------------
-
-void zemAssociationProvider::performAssociators(const CmpiContext& ctx, CmpiResult& rslt,
-                                                const CmpiObjectPath& cop, const char* assocClass,
-                                                const char* resultClass, const char* role,
-                                                const char* resultRole, const char** properties) {
-    navigate({OP_AssocsOp, ctx, rslt, cop, properties, assocClass, resultClass, role, resultRole});
-}
-
-void zemAssociationProvider::performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                    const CmpiObjectPath& cop,
-                                                    const char* assocClass, const char* resultClass,
-                                                    const char* role, const char* resultRole) {
-    navigate({OP_AssocNamesOp, ctx, rslt, cop, nullptr, assocClass, resultClass, role, resultRole});
-}
-
-void zemAssociationProvider::performReferences(const CmpiContext& ctx, CmpiResult& rslt,
-                                               const CmpiObjectPath& cop, const char* resultClass,
-                                               const char* role, const char** properties) {
-    navigate({OP_RefsOp, ctx, rslt, cop, properties, resultClass, nullptr, role});
-}
-
-void zemAssociationProvider::performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                   const CmpiObjectPath& cop,
-                                                   const char* resultClass, const char* role) {
-    navigate({OP_RefNamesOp, ctx, rslt, cop, nullptr, resultClass, nullptr, role});
-}
 
 void zemAssociationProvider::navigate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);

@@ -35,14 +35,12 @@
 
 #include "Array.h"
 #include "AssociationOperations.h"
-#include "BaseProvider.h"
 #include "DynamicArray.h"
 #include "StringUtils.h"
 #include "Synchronizer.h"
 #include "ZemExport.h"
 
 class zemAssociationCall;
-struct zemAssociationRequest;
 
 /// One row: two classes and the reference properties ("roles") by which an association class
 /// points at them. A class name that begins with "_" stands for every class with that suffix.
@@ -100,7 +98,7 @@ private:
     const zemString* matchClass(const CmpiObjectPath& cop, const char* className) const;
 };
 
-class ZEM_EXPORT zemAssociationProvider : public zemBaseProvider {
+class ZEM_EXPORT zemAssociationProvider : public zemServerAssociation {
 public:
     ZEM_ASSOCIATION_OPERATIONS();
 
@@ -122,26 +120,9 @@ public:
 
     CmpiInstance performGetInstance(const CmpiContext& ctx, const CmpiObjectPath& cop,
                                     const char** properties) override;
-    void performEnumInstances(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                              const char** properties) override;
-    void performEnumInstanceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                  const CmpiObjectPath& cop) override;
-    void performAssociators(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                            const char* assocClass, const char* resultClass, const char* role,
-                            const char* resultRole, const char** properties) override;
-    void performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                                const char* assocClass, const char* resultClass, const char* role,
-                                const char* resultRole) override;
-    void performReferences(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                           const char* resultClass, const char* role,
-                           const char** properties) override;
-    void performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                               const char* resultClass, const char* role) override;
-
     CMPIBoolean isValidInstanceClass(const char* name) override;
     CMPIBoolean isValidAssociationClass(const char* name) override;
     void populateEssentialKeys(const char* name, CmpiArray& keys) override;
-    const char* getMessageBundlePath() override;
 
     // ---- Hooks ----------------------------------------------------------------------------------
 
@@ -193,10 +174,10 @@ private:
                               const CmpiObjectPath& cop, const char** properties,
                               const zemAssociationData& row, const CmpiObjectPath& cop1,
                               const CmpiObjectPath& cop2);
-    void enumerate(const zemAssociationRequest& r);
+    void enumerate(const zemAssociationRequest& r) override;
     void enumerateRow(zemAssociationCall& call, const zemAssociationRequest& r,
                       const zemAssociationData& row);
-    void navigate(const zemAssociationRequest& r);
+    void navigate(const zemAssociationRequest& r) override;
     bool navigateRow(zemAssociationCall& call, const zemAssociationRequest& r,
                      const zemAssociationData& row);
 };

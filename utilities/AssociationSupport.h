@@ -199,10 +199,6 @@ bool zemServesClass(const char* name, const char* assocClass, int supported, int
 void zemRefuseReferences(const char* text1, const char* property1, const char* text2,
                          const char* property2, const char* className, const char* providerName);
 
-/// Message bundle of the association providers.
-inline constexpr const char* kZemAssociationBundle =
-    "/KOpenFs/KORX/ProdData/QZE/Pegasus/msg/provider/osbase";
-
 /// Completes an association's path and makes its instance by the hooks of the provider.
 template <class Provider>
 CmpiInstance zemReferenceInstance(Provider& provider, CmpiObjectPath& ncop,

@@ -76,7 +76,7 @@ zemProviderPairAssociation::zemProviderPairAssociation(const CmpiBroker& mb, con
                                                        const char* name,
                                                        SupportedOpType supportedOperations)
     : CmpiBaseMI(mb, ctx),
-      zemBaseZemInstanceProvider(mb, ctx, name),
+      zemAssociationNavigation(mb, ctx, name),
       m_supportedOperations(supportedOperations) {}
 
 CMPIBoolean zemProviderPairAssociation::isValidInstanceClass(const char* name) {
@@ -246,35 +246,6 @@ int zemProviderPairAssociation::getInstance(const CmpiContext& ctx, const CmpiOb
     return found ? 0 : -1;
 }
 
-void zemProviderPairAssociation::performAssociators(const CmpiContext& ctx, CmpiResult& rslt,
-                                                    const CmpiObjectPath& cop,
-                                                    const char* assocClass, const char* resultClass,
-                                                    const char* role, const char* resultRole,
-                                                    const char** properties) {
-    navigate({OP_AssocsOp, ctx, rslt, cop, properties, assocClass, resultClass, role, resultRole});
-}
-
-void zemProviderPairAssociation::performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                        const CmpiObjectPath& cop,
-                                                        const char* assocClass,
-                                                        const char* resultClass, const char* role,
-                                                        const char* resultRole) {
-    navigate({OP_AssocNamesOp, ctx, rslt, cop, nullptr, assocClass, resultClass, role, resultRole});
-}
-
-void zemProviderPairAssociation::performReferences(const CmpiContext& ctx, CmpiResult& rslt,
-                                                   const CmpiObjectPath& cop,
-                                                   const char* resultClass, const char* role,
-                                                   const char** properties) {
-    navigate({OP_RefsOp, ctx, rslt, cop, properties, resultClass, nullptr, role});
-}
-
-void zemProviderPairAssociation::performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                       const CmpiObjectPath& cop,
-                                                       const char* resultClass, const char* role) {
-    navigate({OP_RefNamesOp, ctx, rslt, cop, nullptr, resultClass, nullptr, role});
-}
-
 bool zemProviderPairAssociation::ValidateInputObjectPath(const CmpiContext& ctx,
                                                          const CmpiObjectPath& cop, const char*,
                                                          const char** properties) {
@@ -347,6 +318,7 @@ void zemProviderPairAssociation::visitTarget(zemAssociationCall& call,
     const zemString className =
         target.m_AssoClassName.isEmpty() ? zemString(r.assocClass) : target.m_AssoClassName;
 
+    // What the hooks make of the pair at hand, where the client wants the association.
     std::optional<CmpiObjectPath> path;
     std::optional<CmpiInstance> instance;
     const Make make = [&](const CmpiObjectPath& left, const CmpiObjectPath& right) {
@@ -594,7 +566,7 @@ zemEnhanceBaseZemMultiNtoNAssociationProvider::findValidAssociationCopMappingPai
 
 zemEnhanceBaseZemMultiNtoNAssociationProvider::PathsByKey
 zemEnhanceBaseZemMultiNtoNAssociationProvider::getObjectPathHashRes(const Paths& rightCops) {
-    PathsByKey hash(rightCops.size());
+    PathsByKey hash;
     for (int j = 0; j < rightCops.size(); ++j)
         hash.insert(getObjectPathHashKeyString(*rightCops[j], false), j);
     return hash;

@@ -35,29 +35,28 @@
 /// Threads. The hooks of the first base run under m_operationLock, one per provider: Before, After,
 /// and those for one pair of objects together. While a handle is asked the lock is free, for what
 /// the handle does may wait, through the server, for another operation of this provider. So
-/// operations interleave, and what the Before hook prepares is kept by thread, not by provider. The
-/// second base has no lock: what it prepares travels in the context.
+/// operations interleave, and what the Before hook prepares is kept by thread, not by provider. A
+/// hook that asks the server does so with the lock held. The second base has no lock: what it
+/// prepares travels in the context.
 #ifndef BASE_ZEM_MULTI_NTON_ASSOCIATION_PROVIDER_H
 #define BASE_ZEM_MULTI_NTON_ASSOCIATION_PROVIDER_H
 
-#include <cstddef>
 #include <functional>
 #include <memory>
 #include <set>
-#include <string_view>
-#include <vector>
+#include <string>
+#include <unordered_map>
 
 #include "AssociationOperations.h"
 #include "BaseZemInstanceProvider.h"
 #include "BaseZemMultiNtoNAssociationData.h"
-#include "MultiHashTable.h"
 #include "Synchronizer.h"
 
 class zemAssociationCall;
-struct zemAssociationRequest;
 
 /// What the two bases have in common. Not for use by final providers.
-class ZEM_EXPORT zemProviderPairAssociation : public zemBaseZemInstanceProvider {
+class ZEM_EXPORT zemProviderPairAssociation
+    : public zemAssociationNavigation<zemBaseZemInstanceProvider> {
 public:
     ZEM_ASSOCIATION_OPERATIONS();
     using Paths = zemDynamicArray<CmpiObjectPath>;
@@ -76,18 +75,6 @@ public:
                            const CmpiObjectPath& origCop) override;
     void enumInstances(const CmpiContext& ctx, const CmpiObjectPath& cop, const char** properties,
                        zemDynamicArray<CmpiInstance>& out, const CmpiObjectPath& origCop) override;
-
-    void performAssociators(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                            const char* assocClass, const char* resultClass, const char* role,
-                            const char* resultRole, const char** properties) override;
-    void performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                                const char* assocClass, const char* resultClass, const char* role,
-                                const char* resultRole) override;
-    void performReferences(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                           const char* resultClass, const char* role,
-                           const char** properties) override;
-    void performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                               const char* resultClass, const char* role) override;
 
     CMPIBoolean isValidInstanceClass(const char* name) override;
     CMPIBoolean isValidAssociationClass(const char* name) override;
@@ -204,7 +191,7 @@ private:
 
     void enumerate(zemAssociationCall& call, const Enumeration& e);
     bool exists(const CmpiContext& ctx, const CmpiObjectPath& cop, const char** properties);
-    void navigate(const zemAssociationRequest& r);
+    void navigate(const zemAssociationRequest& r) override;
     void visitTarget(zemAssociationCall& call, const zemAssociationRequest& r,
                      const zemMultiTargetAssociationData& target, void* addInfo);
 };
@@ -314,24 +301,20 @@ public:
     virtual zemString getObjectPathHashKeyString(const CmpiObjectPath& cop, bool isLeft);
 
 protected:
-    /// Positions of objects by key. The hash of the tables, a sum of bytes, tells few keys apart;
-    /// so there are many tables, each for few keys, as a hash of another kind sends them.
+    /// Positions of objects by key.
     class ZEM_EXPORT PathsByKey {
     public:
-        explicit PathsByKey(int objects) : m_tables(static_cast<std::size_t>(objects) / 8 + 1) {}
         void insert(const zemString& key, int position) {
-            m_tables[tableOf(key)].insert(key, position);
+            m_positions[static_cast<const char*>(key)].insert(position);
         }
         /// The positions under a key, in order.
         std::set<int> getElement(const zemString& key) const {
-            return m_tables[tableOf(key)].getElement(key);
+            const auto found = m_positions.find(static_cast<const char*>(key));
+            return found != m_positions.end() ? found->second : std::set<int>();
         }
 
     private:
-        std::size_t tableOf(const zemString& key) const {
-            return std::hash<std::string_view>()(static_cast<const char*>(key)) % m_tables.size();
-        }
-        std::vector<zemMultiHashTable<zemString, int, assoHashFunc>> m_tables;
+        std::unordered_map<std::string, std::set<int>> m_positions;
     };
 
     /// Positions of associated objects, in the order of the left ones.

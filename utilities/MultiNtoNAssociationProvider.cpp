@@ -1,6 +1,8 @@
 #include "MultiNtoNAssociationProvider.h"
 
 #include <cstring>
+#include <memory>
+#include <vector>
 
 #include "AssociationSupport.h"
 #include "BaseProviderText.h"
@@ -53,37 +55,28 @@ zemArray<zemString> aggregate(const zemDynamicArray<zemString>& names, const cha
     return kept;
 }
 
+using Paths = std::vector<CmpiObjectPath>;
+
 /// The objects that one enumeration of associations has asked for, by class and namespace.
 class ObjectCache {
 public:
     ObjectCache(zemAssociationCall& call, zemSynchronizerContext& lock, int classes)
-        : m_call(call), m_lock(lock), m_arrays(static_cast<unsigned>(classes)) {}
+        : m_call(call), m_lock(lock), m_objects(static_cast<unsigned>(classes)) {}
 
-    std::vector<CmpiObjectPath> paths(const zemString& className, const zemString& nameSpace) {
+    std::shared_ptr<const Paths> paths(const zemString& className, const zemString& nameSpace) {
         const zemString key = className + nameSpace;
-        CmpiArray array;
-        if (m_arrays.lookup(key, array) != 0) {
-            array = fetch(className, nameSpace);
-            m_arrays.insert(key, array);
-        }
-        std::vector<CmpiObjectPath> result;
-        for (CMPICount i = 0; i < array.size(); ++i) result.push_back(array[i].getObjectPath());
-        return result;
+        std::shared_ptr<const Paths> objects;
+        if (m_objects.lookup(key, objects) == 0) return objects;
+        const zemSynchronizer hold(m_lock);
+        objects = std::make_shared<const Paths>(m_call.paths(nameSpace, className));
+        m_objects.insert(key, objects);
+        return objects;
     }
 
 private:
-    CmpiArray fetch(const char* className, const char* nameSpace) {
-        const zemSynchronizer hold(m_lock);
-        const std::vector<CmpiObjectPath> objects = m_call.paths(nameSpace, className);
-        if (objects.empty()) return CmpiArray();
-        CmpiArray array(static_cast<CMPICount>(objects.size()), CMPI_ref);
-        for (CMPICount i = 0; i < objects.size(); ++i) array[i] = CmpiData(objects[i]);
-        return array;
-    }
-
     zemAssociationCall& m_call;
     zemSynchronizerContext& m_lock;
-    zemHashTable<zemString, CmpiArray, objectCacheHashFunc> m_arrays;
+    zemHashTable<zemString, std::shared_ptr<const Paths>, objectCacheHashFunc> m_objects;
 };
 
 }  // namespace
@@ -104,7 +97,7 @@ zemMultiNtoNAssociationProvider::zemMultiNtoNAssociationProvider(
     const char* aRefPropName2, SupportedOpType aSupportedOperations, const char* aNameSpace1,
     const char* aNameSpace2, const char* aAssoNameSpace)
     : CmpiBaseMI(mbp, ctx),
-      zemBaseProvider(mbp, ctx, providerName),
+      zemServerAssociation(mbp, ctx, providerName),
       m_assocClassName(anAssocClassName),
       m_refClassNamePairs(readPairs(aRefClassNamePairs)),
       m_refPropName1(aRefPropName1),
@@ -130,10 +123,6 @@ CMPIBoolean zemMultiNtoNAssociationProvider::isValidAssociationClass(const char*
 
 void zemMultiNtoNAssociationProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
     zemListReferences(keys, m_refPropName1, m_refPropName2);
-}
-
-const char* zemMultiNtoNAssociationProvider::getMessageBundlePath() {
-    return kZemAssociationBundle;
 }
 
 zemString zemMultiNtoNAssociationProvider::getNameSpace1() const {
@@ -267,20 +256,11 @@ CmpiInstance zemMultiNtoNAssociationProvider::performGetInstance(const CmpiConte
     return zemReferenceInstance(*this, ncop, path1, path2, properties, call.className());
 }
 
-void zemMultiNtoNAssociationProvider::performEnumInstances(const CmpiContext& ctx, CmpiResult& rslt,
-                                                           const CmpiObjectPath& cop,
-                                                           const char** properties) {
-    zemAssociationCall call(*this, m_providerName, *broker, OP_EnumInstsOp, ctx, cop);
+void zemMultiNtoNAssociationProvider::enumerate(const zemAssociationRequest& r) {
+    zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);
     call.require(m_supportedOperations);
-    implementEnumeration(ctx, rslt, cop, properties, OP_EnumInstsOp, call.word());
-}
-
-void zemMultiNtoNAssociationProvider::performEnumInstanceNames(const CmpiContext& ctx,
-                                                               CmpiResult& rslt,
-                                                               const CmpiObjectPath& cop) {
-    zemAssociationCall call(*this, m_providerName, *broker, OP_EnumInstNamesOp, ctx, cop);
-    call.require(m_supportedOperations);
-    implementEnumeration(ctx, rslt, cop, nullptr, OP_EnumInstNamesOp, call.word());
+    implementEnumeration(r.ctx, r.rslt, r.cop, r.properties,
+                         static_cast<SupportedOpType>(r.operation), call.word());
 }
 
 void zemMultiNtoNAssociationProvider::implementEnumeration(const CmpiContext& ctx, CmpiResult& rslt,
@@ -301,8 +281,8 @@ void zemMultiNtoNAssociationProvider::implementEnumeration(const CmpiContext& ct
                 if (!hasAssociationBetweenClasses(firsts[i], seconds[j])) continue;
                 const auto cops1 = cache.paths(firsts[i], getNameSpace1(cop));
                 const auto cops2 = cache.paths(seconds[j], getNameSpace2(cop));
-                for (const CmpiObjectPath& cop1 : cops1)
-                    for (const CmpiObjectPath& cop2 : cops2)
+                for (const CmpiObjectPath& cop1 : *cops1)
+                    for (const CmpiObjectPath& cop2 : *cops2)
                         if (isValidateAssociation(ctx, cop1, cop2))
                             zemReturnReference(*this, rslt, createObjectPath(cop), cop1, cop2,
                                                properties, call.className(),
@@ -313,33 +293,6 @@ void zemMultiNtoNAssociationProvider::implementEnumeration(const CmpiContext& ct
 }
 
 // ---- Navigation ---------------------------------------------------------------------------------
-
-void zemMultiNtoNAssociationProvider::performAssociators(
-    const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop, const char* assocClass,
-    const char* resultClass, const char* role, const char* resultRole, const char** properties) {
-    navigate({OP_AssocsOp, ctx, rslt, cop, properties, assocClass, resultClass, role, resultRole});
-}
-
-void zemMultiNtoNAssociationProvider::performAssociatorNames(
-    const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop, const char* assocClass,
-    const char* resultClass, const char* role, const char* resultRole) {
-    navigate({OP_AssocNamesOp, ctx, rslt, cop, nullptr, assocClass, resultClass, role, resultRole});
-}
-
-void zemMultiNtoNAssociationProvider::performReferences(const CmpiContext& ctx, CmpiResult& rslt,
-                                                        const CmpiObjectPath& cop,
-                                                        const char* resultClass, const char* role,
-                                                        const char** properties) {
-    navigate({OP_RefsOp, ctx, rslt, cop, properties, resultClass, nullptr, role});
-}
-
-void zemMultiNtoNAssociationProvider::performReferenceNames(const CmpiContext& ctx,
-                                                            CmpiResult& rslt,
-                                                            const CmpiObjectPath& cop,
-                                                            const char* resultClass,
-                                                            const char* role) {
-    navigate({OP_RefNamesOp, ctx, rslt, cop, nullptr, resultClass, nullptr, role});
-}
 
 void zemMultiNtoNAssociationProvider::navigate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);

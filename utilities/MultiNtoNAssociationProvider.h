@@ -32,15 +32,13 @@
 
 #include "Array.h"
 #include "AssociationOperations.h"
-#include "BaseProvider.h"
 #include "StringUtils.h"
 #include "Synchronizer.h"
 #include "ZemExport.h"
 
 class zemAssociationCall;
-struct zemAssociationRequest;
 
-class ZEM_EXPORT zemMultiNtoNAssociationProvider : public zemBaseProvider {
+class ZEM_EXPORT zemMultiNtoNAssociationProvider : public zemServerAssociation {
 public:
     ZEM_ASSOCIATION_OPERATIONS();
 
@@ -63,26 +61,9 @@ public:
 
     CmpiInstance performGetInstance(const CmpiContext& ctx, const CmpiObjectPath& cop,
                                     const char** properties) override;
-    void performEnumInstances(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                              const char** properties) override;
-    void performEnumInstanceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                  const CmpiObjectPath& cop) override;
-    void performAssociators(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                            const char* assocClass, const char* resultClass, const char* role,
-                            const char* resultRole, const char** properties) override;
-    void performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                                const char* assocClass, const char* resultClass, const char* role,
-                                const char* resultRole) override;
-    void performReferences(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                           const char* resultClass, const char* role,
-                           const char** properties) override;
-    void performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                               const char* resultClass, const char* role) override;
-
     CMPIBoolean isValidInstanceClass(const char* name) override;
     CMPIBoolean isValidAssociationClass(const char* name) override;
     void populateEssentialKeys(const char* name, CmpiArray& keys) override;
-    const char* getMessageBundlePath() override;
 
     // ---- Hooks ----------------------------------------------------------------------------------
 
@@ -160,7 +141,8 @@ protected:
     bool m_isAggregated;
 
 private:
-    void navigate(const zemAssociationRequest& r);
+    void enumerate(const zemAssociationRequest& r) override;
+    void navigate(const zemAssociationRequest& r) override;
     void returnNeighbours(zemAssociationCall& call, const zemAssociationRequest& r,
                           const char* targetName, const char* nameSpace, bool isFirst);
     bool isWanted(const char* targetName, const char* nameSpace, const char* resultClass) const;

@@ -21,7 +21,7 @@ zemNtoNAssociationProvider::zemNtoNAssociationProvider(
     const char* aRefPropName1, const char* aRefPropName2, SupportedOpType aSupportedOperations,
     const char* aNameSpace1, const char* aNameSpace2, const char* aAssoNameSpace)
     : CmpiBaseMI(mbp, ctx),
-      zemBaseProvider(mbp, ctx, providerName),
+      zemServerAssociation(mbp, ctx, providerName),
       m_assocClassName(anAssocClassName),
       m_refClassName1(aRefClassName1),
       m_refClassName2(aRefClassName2),
@@ -46,8 +46,6 @@ CMPIBoolean zemNtoNAssociationProvider::isValidAssociationClass(const char* name
 void zemNtoNAssociationProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
     zemListReferences(keys, m_refPropName1, m_refPropName2);
 }
-
-const char* zemNtoNAssociationProvider::getMessageBundlePath() { return kZemAssociationBundle; }
 
 zemString zemNtoNAssociationProvider::getAssoNameSpace(const CmpiObjectPath& cop) const {
     return zemNameSpaceOr(m_assoNameSpace, cop);
@@ -158,17 +156,6 @@ zemString zemNtoNAssociationProvider::refuseReferences(const CmpiContext& ctx,
            " with value " + text2;
 }
 
-void zemNtoNAssociationProvider::performEnumInstances(const CmpiContext& ctx, CmpiResult& rslt,
-                                                      const CmpiObjectPath& cop,
-                                                      const char** properties) {
-    enumerate({OP_EnumInstsOp, ctx, rslt, cop, properties});
-}
-
-void zemNtoNAssociationProvider::performEnumInstanceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                          const CmpiObjectPath& cop) {
-    enumerate({OP_EnumInstNamesOp, ctx, rslt, cop, nullptr});
-}
-
 void zemNtoNAssociationProvider::enumerate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);
     call.require(m_supportedOperations);
@@ -187,35 +174,6 @@ void zemNtoNAssociationProvider::enumerate(const zemAssociationRequest& r) {
 }
 
 // ---- Navigation ---------------------------------------------------------------------------------
-
-void zemNtoNAssociationProvider::performAssociators(const CmpiContext& ctx, CmpiResult& rslt,
-                                                    const CmpiObjectPath& cop,
-                                                    const char* assocClass, const char* resultClass,
-                                                    const char* role, const char* resultRole,
-                                                    const char** properties) {
-    navigate({OP_AssocsOp, ctx, rslt, cop, properties, assocClass, resultClass, role, resultRole});
-}
-
-void zemNtoNAssociationProvider::performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                        const CmpiObjectPath& cop,
-                                                        const char* assocClass,
-                                                        const char* resultClass, const char* role,
-                                                        const char* resultRole) {
-    navigate({OP_AssocNamesOp, ctx, rslt, cop, nullptr, assocClass, resultClass, role, resultRole});
-}
-
-void zemNtoNAssociationProvider::performReferences(const CmpiContext& ctx, CmpiResult& rslt,
-                                                   const CmpiObjectPath& cop,
-                                                   const char* resultClass, const char* role,
-                                                   const char** properties) {
-    navigate({OP_RefsOp, ctx, rslt, cop, properties, resultClass, nullptr, role});
-}
-
-void zemNtoNAssociationProvider::performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                                       const CmpiObjectPath& cop,
-                                                       const char* resultClass, const char* role) {
-    navigate({OP_RefNamesOp, ctx, rslt, cop, nullptr, resultClass, nullptr, role});
-}
 
 void zemNtoNAssociationProvider::navigate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);

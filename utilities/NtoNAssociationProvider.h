@@ -31,15 +31,13 @@
 #define NTON_ASSOCIATION_PROVIDER_H
 
 #include "AssociationOperations.h"
-#include "BaseProvider.h"
 #include "StringUtils.h"
 #include "Synchronizer.h"
 #include "ZemExport.h"
 
 class zemAssociationCall;
-struct zemAssociationRequest;
 
-class ZEM_EXPORT zemNtoNAssociationProvider : public zemBaseProvider {
+class ZEM_EXPORT zemNtoNAssociationProvider : public zemServerAssociation {
 public:
     ZEM_ASSOCIATION_OPERATIONS();
 
@@ -61,26 +59,9 @@ public:
 
     CmpiInstance performGetInstance(const CmpiContext& ctx, const CmpiObjectPath& cop,
                                     const char** properties) override;
-    void performEnumInstances(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                              const char** properties) override;
-    void performEnumInstanceNames(const CmpiContext& ctx, CmpiResult& rslt,
-                                  const CmpiObjectPath& cop) override;
-    void performAssociators(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                            const char* assocClass, const char* resultClass, const char* role,
-                            const char* resultRole, const char** properties) override;
-    void performAssociatorNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                                const char* assocClass, const char* resultClass, const char* role,
-                                const char* resultRole) override;
-    void performReferences(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                           const char* resultClass, const char* role,
-                           const char** properties) override;
-    void performReferenceNames(const CmpiContext& ctx, CmpiResult& rslt, const CmpiObjectPath& cop,
-                               const char* resultClass, const char* role) override;
-
     CMPIBoolean isValidInstanceClass(const char* name) override;
     CMPIBoolean isValidAssociationClass(const char* name) override;
     void populateEssentialKeys(const char* name, CmpiArray& keys) override;
-    const char* getMessageBundlePath() override;
 
     /// The namespaces of the association and of its sides for a request on @p cop.
     zemString getAssoNameSpace(const CmpiObjectPath& cop) const;
@@ -132,8 +113,8 @@ protected:
 private:
     zemString refuseReferences(const CmpiContext& ctx, const CmpiObjectPath& cop1,
                                const CmpiObjectPath& cop2);
-    void enumerate(const zemAssociationRequest& r);
-    void navigate(const zemAssociationRequest& r);
+    void enumerate(const zemAssociationRequest& r) override;
+    void navigate(const zemAssociationRequest& r) override;
     bool passesFilters(const zemAssociationRequest& r, bool first) const;
     bool narrowTarget(const zemAssociationRequest& r, const char* nameSpace,
                       zemString& target) const;

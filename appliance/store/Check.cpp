@@ -101,8 +101,7 @@ void rises(const Object& object, const std::string& prefix, const std::string& d
 void quantitiesAreWithinLimits(const HostView& view, Findings& findings) {
     for (const Object& lpar : view.all(Kind::Lpar)) {
         rises(lpar, "pend_", "pend_", findings);
-        const std::int64_t region = number(view.host().get("mem_region_size"));
-        findings.require(region > 0 && number(lpar.get("pend_mem")) % region == 0, lpar,
+        findings.require(number(lpar.get("pend_mem")) % view.memRegion() == 0, lpar,
                          "has memory that is no multiple of the region size");
         const std::string pool = lpar.get("pend_shared_proc_pool_id");
         const bool known = (pool == "null" && lpar.get("pend_proc_mode") == "ded") ||

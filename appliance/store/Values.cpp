@@ -162,7 +162,7 @@ std::string availablePoolMem(const Row& row, const char* key) {
 /// Least memory of a partition that may grow to row.maxMem; @p key is the least of its environment.
 std::string requiredMem(const Row& row, const char* key) {
     // The table by which a partition's memory is found takes 1/64 of the most it may have.
-    const std::int64_t region = std::max<std::int64_t>(1, hostNumber(row, "mem_region_size"));
+    const std::int64_t region = row.view->memRegion();
     const std::int64_t regions = (row.maxMem / 64 + region - 1) / region;
     return std::to_string(number(key) + regions * region);
 }

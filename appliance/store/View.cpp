@@ -11,6 +11,10 @@ std::string HostView::mtms() const {
     return m_host.get("type_model") + '*' + m_host.get("serial_num");
 }
 
+std::int64_t HostView::memRegion() const {
+    return std::max<std::int64_t>(1, number(m_host.get("mem_region_size")));
+}
+
 const std::vector<Object>& HostView::all(Kind kind) const {
     const auto found = m_objects.find(kind);
     if (found != m_objects.end()) return found->second;

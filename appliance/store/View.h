@@ -38,6 +38,8 @@ public:
     const Object& host() const { return m_host; }
     /// The host's key: "<type_model>*<serial_num>".
     std::string mtms() const;
+    /// What memory comes in multiples of, in megabytes; at least 1, whatever is stored.
+    std::int64_t memRegion() const;
     /// By partition and number; valid as long as the view.
     const std::vector<Object>& all(Kind kind) const;
     /// Those of one partition.

@@ -102,7 +102,7 @@ std::int64_t Activation::room(const std::string& resource, const Object& lpar) c
 }
 
 void Activation::setMemory(const Object& before, const Object& profile, Object& lpar) const {
-    const std::int64_t region = number(m_host.host().get("mem_region_size"));
+    const std::int64_t region = m_host.memRegion();
     const std::int64_t wanted = number(profile.get("desired_mem"));
     if (lpar.get("mem_mode") != "shared") {
         const std::int64_t free = room(kMemory, before);

@@ -86,8 +86,7 @@ void changeMemory(Change& change, const Operation& operation) {
     const std::int64_t size = request.number("-q", 1, kMost, 0);
     const std::int64_t entitled = request.number("--entitled", 1, kMost, 0);
     refuseIf(size == 0 && entitled == 0, Fault::MissingOption, {"-q"});
-    refuseIf(size % number(host.host().get("mem_region_size")) != 0, Fault::BadOptionValue,
-             {"-q", request.value("-q")});
+    refuseIf(size % host.memRegion() != 0, Fault::BadOptionValue, {"-q", request.value("-q")});
     const int sign = signOf(operation);
     const bool isShared = lpar.get("mem_mode") == "shared";
     if (size != 0) add(lpar, "mem", sign * size * 100);

@@ -38,8 +38,9 @@ Value numberIn(const HostView&, const std::string& value, const char* argument) 
 Value memory(const HostView& host, const std::string& value, const char*) {
     constexpr std::int64_t kMost = 1LL << 40;
     std::int64_t found = 0;
-    const std::int64_t region = number(host.host().get("mem_region_size"));
-    if (!wholeNumber(value, &found) || found > kMost || found % region != 0) return std::nullopt;
+    if (!wholeNumber(value, &found) || found > kMost || found % host.memRegion() != 0) {
+        return std::nullopt;
+    }
     return std::to_string(found);
 }
 

@@ -24,7 +24,8 @@ public:
     int closeReadingPipe();
     int closeWritingPipe();
 
-    /// One read(2) or write(2): the number of bytes, 0 at the end of file, -1 with errno set.
+    /// One read(2) or write(2): the number of bytes, 0 at the end of file, -1 with errno set: EBADF
+    /// for an end that is none, EPIPE, without a signal, when there is nobody left to read.
     int read(void* data, std::size_t size);
     int write(const void* data, std::size_t size);
 

@@ -7,8 +7,9 @@
 #include <cerrno>
 #include <csignal>
 #include <ctime>
-#include <exception>
 #include <memory>
+
+#include "LetUnwind.h"
 
 namespace {
 
@@ -72,7 +73,10 @@ void zemCondition::signal() {
 
 zemThread::zemThread() : m_thread(0), m_started(0) {}
 
-zemThread::~zemThread() { waitThreadExit(); }
+zemThread::~zemThread() {
+    const zemUncancelled uncancelled;
+    waitThreadExit();
+}
 
 int zemThread::start(StartMethod method, StartInfo parm) {
     if (isStarted()) {
@@ -80,40 +84,56 @@ int zemThread::start(StartMethod method, StartInfo parm) {
     }
     waitThreadExit();
     auto data = std::make_unique<_StartData>(_StartData{method, parm, this});
-    // Set before the thread exists: a short method may have cleared it before we run again.
-    setStarted(1);
-    const int result = pthread_create(&m_thread, nullptr, internalStart, data.get());
-    if (result == 0) {
-        static_cast<void>(data.release());
-    } else {
-        m_thread = 0;
-        setStarted(0);
+    int result = 0;
+    {
+        // The new thread waits for the lock: nobody sees it started before its handle is known, and
+        // a short method does not clear the flag before it is set.
+        zemSynchronizer hold(m_synchContext);
+        result = pthread_create(&m_thread, nullptr, internalStart, data.get());
+        if (result == 0) {
+            static_cast<void>(data.release());
+            m_started = 1;
+        } else {
+            m_thread = 0;
+        }
     }
     sched_yield();
     return result;
 }
 
+/// The flag of the thread that runs, from the moment when start() is done with it to the end,
+/// whichever way the thread ends.
+class zemThread::Started {
+public:
+    explicit Started(zemThread& thread) : m_owner(thread) { m_owner.handle(); }
+    ~Started() {
+        zemSynchronizer hold(m_owner.m_synchContext);
+        m_owner.m_started = 0;
+    }
+    Started(const Started&) = delete;
+    Started& operator=(const Started&) = delete;
+
+private:
+    zemThread& m_owner;
+};
+
 void* zemThread::internalStart(void* data) {
     const _StartData start = *std::unique_ptr<_StartData>(static_cast<_StartData*>(data));
+    const Started started(*start.m_pthread);
     try {
         start.m_method(start.m_parm);
     } catch (...) {
-        // No exception of the language: the thread was cancelled or ended itself in the method,
-        // and the C library insists on unwinding to the end.
-        if (std::current_exception() == nullptr) {
-            start.m_pthread->setStarted(0);
-            throw;
-        }
+        zemLetUnwind();
     }
-    start.m_pthread->setStarted(0);
     Exit();
 }
 
 int zemThread::cancel() {
-    if (!isStarted()) {
+    zemSynchronizer hold(m_synchContext);
+    if (m_started == 0) {
         return 0;
     }
-    setStarted(0);
+    m_started = 0;
     return pthread_cancel(m_thread);
 }
 
@@ -122,6 +142,7 @@ int zemThread::suspend() { return kill(SIGSTOP); }
 int zemThread::resume() { return kill(SIGCONT); }
 
 int zemThread::kill(int signalNumber) {
+    zemSynchronizer hold(m_synchContext);
     return m_thread == 0 ? ESRCH : pthread_kill(m_thread, signalNumber);
 }
 
@@ -132,20 +153,27 @@ void zemThread::Exit() {
 
 int zemThread::getCurrentThreadId() { return static_cast<int>(pthread_self()); }
 
-int zemThread::getThreadId() const { return static_cast<int>(m_thread); }
+int zemThread::getThreadId() const { return static_cast<int>(handle()); }
 
-// The flag is read by other threads than the one that runs.
-bool zemThread::isStarted() const { return __atomic_load_n(&m_started, __ATOMIC_ACQUIRE) != 0; }
+bool zemThread::isStarted() const {
+    zemSynchronizer hold(m_synchContext);
+    return m_started != 0;
+}
 
-void zemThread::setStarted(int started) { __atomic_store_n(&m_started, started, __ATOMIC_RELEASE); }
+pthread_t zemThread::handle() const {
+    zemSynchronizer hold(m_synchContext);
+    return m_thread;
+}
 
 void zemThread::waitThreadExit() {
     // Joined by its handle, not by the flag: a thread that ended by itself or was cancelled has
     // cleared the flag, but still holds its stack, and may still be on its way out.
-    if (m_thread != 0) {
-        pthread_join(m_thread, nullptr);
+    const pthread_t thread = handle();
+    if (thread != 0) {
+        pthread_join(thread, nullptr);
+        zemSynchronizer hold(m_synchContext);
         m_thread = 0;
-        setStarted(0);
+        m_started = 0;
     }
 }
 

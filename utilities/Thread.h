@@ -83,13 +83,16 @@ private:
         zemThread* m_pthread;
     };
 
+    class Started;
+
     static void* internalStart(void* data);
     int kill(int signalNumber);
-    void setStarted(int started);
+    pthread_t handle() const;
 
     pthread_t m_thread;
     zemCondition m_condition;
     int m_started;
+    mutable zemSynchronizerContext m_synchContext;  // guards m_thread and m_started
 };
 
 struct ZEM_EXPORT _CntrlDataEntry {

@@ -1,6 +1,8 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
 
+#include <cerrno>
+
 #include "Pipe.h"
 
 namespace {
@@ -18,6 +20,19 @@ TEST(PipeTest, CarriesBytesUntilTheWriterCloses) {
     EXPECT_EQ(pipe.closeWritingPipe() + pipe.closeWritingPipe() + pipe.getWritingPipe(), 0);
     EXPECT_FALSE(isOpen(writer));
     EXPECT_EQ(pipe.read(data, sizeof data), 0);
+}
+
+TEST(PipeTest, MissingEndsAreAnErrorAndNoMore) {
+    zemPipe pipe;
+    char data[8] = {};
+    EXPECT_EQ(pipe.read(data, sizeof data), -1) << "not from standard input";
+    EXPECT_EQ(errno, EBADF);
+    EXPECT_EQ(pipe.write(data, sizeof data), -1);
+    EXPECT_EQ(errno, EBADF);
+    ASSERT_EQ(pipe.openPipe(), 0);
+    pipe.closeReadingPipe();
+    EXPECT_EQ(pipe.write(data, sizeof data), -1) << "without SIGPIPE";
+    EXPECT_EQ(errno, EPIPE);
 }
 
 TEST(PipeTest, DestructorClosesWhatItStillHolds) {

@@ -6,6 +6,7 @@
 
 #include "AtomicType.h"
 #include "OnThreads.h"
+#include "Pipe.h"
 #include "Thread.h"
 
 namespace {
@@ -87,6 +88,25 @@ TEST(ThreadTest, RunsAndCanRunAgain) {
         gate.open = true;
         EXPECT_TRUE(eventually([&] { return !thread.isStarted(); }));
     }
+    thread.waitThreadExit();
+    EXPECT_EQ(thread.getThreadId(), 0) << "not to be joined again";
+}
+
+TEST(ThreadTest, IsNeverStartedWithoutItsHandle) {
+    zemThread thread;
+    std::atomic<bool> done{false};
+    const auto ask = [&](int) {
+        while (!done) {
+            EXPECT_TRUE(!thread.isStarted() || thread.getThreadId() != 0);
+        }
+    };
+    onThreads(1, ask, [&] {
+        for (int i = 0; i < 500; ++i) {
+            thread.start([](void*) {}, nullptr);
+            thread.waitThreadExit();
+        }
+        done = true;
+    });
 }
 
 // Sets its flag when the stack is unwound.
@@ -104,6 +124,15 @@ TEST(ThreadTest, EndsQuietlyHoweverTheMethodEnds) {
         [](void* flag) { throw Witness(flag); },
         [](void* flag) { Witness(flag).run(zemThread::Exit); },
         [](void* flag) { Witness(flag).run([] { neverSignalled.wait(); }); },  // to be cancelled
+        [](void* flag) {  // cancelled before destructors that wait and close
+            pthread_cancel(pthread_self());
+            {
+                zemPipe pipe;
+                zemThread inner;
+                EXPECT_EQ(pipe.openPipe() + inner.start([](void*) { usleep(1000); }, nullptr), 0);
+            }
+            Witness(flag).run(pthread_testcancel);
+        },
     };
     for (const auto method : methods) {
         std::atomic<bool> unwound{false};

@@ -12,6 +12,9 @@
 /// Without a limit a run is looked at every 2 milliseconds for about twenty minutes, then after
 /// 1, 2, 4 ... 32768 milliseconds, then once a minute for ever. With a limit the passes lie a tenth
 /// of a second apart.
+///
+/// The long waits are for a system that cannot wake the runner at its child's end. Where it can, by
+/// a descriptor of the child (Linux from 5.3 on), a run without a limit never asks for a pause.
 class zemPollPlan {
 public:
     /// @param waitTime  limit in microseconds; zero or less means none. Only whole tenths of a

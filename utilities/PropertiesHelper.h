@@ -8,6 +8,10 @@
 ///     zemPropertiesHelper::executeCommand("qyplat -r sys -F name", out, err, &exitCode, "", 0, "",
 ///                                         true);
 ///
+/// A tool inherits the environment, the standard input, the folder and the supplementary groups of
+/// this process. Everything else of a server is kept from it: its other descriptors, what it does
+/// with signals and, from a tool that runs as another user, its capabilities.
+///
 /// All operations are static and may be called by any number of threads at a time. Every failure of
 /// the two runners is an exception with throwing class "zemPropertiesHelper" and throwing method
 /// "executeCommand"; an exit status other than 0 is none: it is the caller's to judge.
@@ -35,6 +39,10 @@ public:
     ///        running and is not waited for.
     /// @param locale  value of LC_ALL for the tool; null or empty leaves it alone
     /// @param forceTimeOut  has no effect
+    ///
+    /// A thread that is cancelled leaves while it waits for the child, which it leaves running; a
+    /// later run of any tool reaps it when it has ended. Output that finds no memory is dropped and
+    /// its pipe closed; std::bad_alloc is thrown when the child has ended.
     /// @return 0
     /// @throws zemAccessDeniedException id "13": the program may not be run
     /// @throws zemOperationFailedException id the error number of what failed, "-1" for a command
@@ -49,13 +57,16 @@ public:
     /// @param fpOutput  receives a non-blocking stream of output and errors together, which the
     ///        caller closes. What keeps the child from reaching the program is written there too,
     ///        and its number is the exit status.
+    ///
+    /// A thread that is cancelled meanwhile goes on up to the return.
     /// @return 0
     /// @throws zemOperationFailedException when no pipe, stream or process can be made
     static int asynExecuteCommand(const char* command, pid_t* pid, FILE** fpOutput,
                                   const char* requestUserContext, const char* locale);
 
     /// Gives the process the group and user of @p userName; supplementary groups stay.
-    /// @return 0 (also when it is that user already), an error number, or -1 for no such user
+    /// @return 0 (also when it is that user already), an error number, or -1 for no such user, which
+    ///         a name longer than any that the system allows is not looked up for
     static int changeProcessUserContext(const char* userName);
 
     /// Short name of this host, kept from the first success on; empty while there is none.

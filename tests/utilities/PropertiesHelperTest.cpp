@@ -1,6 +1,11 @@
 #include <fcntl.h>
 #include <gtest/gtest.h>
+#include <linux/capability.h>
+#include <linux/filter.h>
+#include <linux/seccomp.h>
+#include <sys/prctl.h>
 #include <sys/ptrace.h>
+#include <sys/syscall.h>
 
 #include <chrono>
 #include <csignal>
@@ -9,6 +14,7 @@
 #include <tuple>
 
 #include "CommandLine.h"
+#include "FailingAllocation.h"
 #include "OnThreads.h"
 #include "PollPlan.h"
 #include "PropertiesHelper.h"
@@ -162,6 +168,7 @@ TEST(ExecuteCommandTest, FailuresNameTheirCause) {
     tools.script("killed", "kill -9 $$");
     tools.script("marker", "touch $here/started");
     const std::string open = "marker " + std::string(200000, 'x') + " \"";
+    const std::string endless(10000000, 'u');
     const std::tuple<std::string, const char*, std::string, int> rows[] = {
         {"nosuchtool -x", "", "6/2/nosuchtool/No such file or directory", 255},
         {"", "", "6/2//No such file or directory", 255},
@@ -174,6 +181,8 @@ TEST(ExecuteCommandTest, FailuresNameTheirCause) {
          255},
         {"marker \"a", "nobodyelse", "6/0/marker/The given user name \"nobodyelse\" was not found.",
          255},
+        {"marker", endless.c_str(),
+         "6/0/marker/The given user name \"" + endless + "\" was not found.", 255},
         {"nosuchtool \\", "", "6/-1/nosuchtool/Invalid command parameter:\\", 255},
     };
     for (const auto& [command, user, failure, exitCode] : rows) {
@@ -229,26 +238,103 @@ TEST(ExecuteCommandTest, TakesMuchOutputOnBothStreams) {
     EXPECT_EQ(std::string(10000000, 'e'), std::string(run.err));
 }
 
-TEST(ExecuteCommandTest, KeepsWhatTheCallerDoesWithSignals) {
-    const auto blockedAndIgnored = [] {
-        std::ifstream status("/proc/thread-self/status");
-        std::string text;
-        for (std::string line; std::getline(status, line);) {
-            if (line.find("SigBlk") == 0 || line.find("SigIgn") == 0) text += line + '\n';
-        }
-        return text;
-    };
+/// Makes the kernel, for this thread and its children, one that lacks a call.
+void removeCall(unsigned int number) {
+    sock_filter rules[] = {BPF_STMT(BPF_LD | BPF_W | BPF_ABS, offsetof(seccomp_data, nr)),
+                           BPF_JUMP(BPF_JMP | BPF_JEQ | BPF_K, number, 0, 1),
+                           BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ERRNO | ENOSYS),
+                           BPF_STMT(BPF_RET | BPF_K, SECCOMP_RET_ALLOW)};
+    const sock_fprog filter = {std::size(rules), rules};
+    prctl(PR_SET_NO_NEW_PRIVS, 1, 0, 0, 0);
+    EXPECT_EQ(0, prctl(PR_SET_SECCOMP, SECCOMP_MODE_FILTER, &filter));
+}
+
+TEST(ExecuteCommandTest, KeepsTheServersDescriptorsAndSignalsFromTools) {
+    const int inherited = fcntl(STDERR_FILENO, F_DUPFD, 100);
     sigset_t blocked;
     sigset_t before;
     sigemptyset(&blocked);
     sigaddset(&blocked, SIGUSR1);
     pthread_sigmask(SIG_BLOCK, &blocked, &before);
-    const auto handler = std::signal(SIGUSR2, SIG_IGN);
-    const std::string own = blockedAndIgnored();
-    EXPECT_EQ(own, std::string(ToolRun("grep -E SigBlk|SigIgn /proc/self/status").out));
-    EXPECT_EQ(own, blockedAndIgnored());
-    std::signal(SIGUSR2, handler);
-    pthread_sigmask(SIG_SETMASK, &before, nullptr);
+    const auto handler = std::signal(SIGTERM, SIG_IGN);
+    // The last descriptor is that of the folder.
+    EXPECT_STREQ("0\n1\n2\n3\n", ToolRun("ls /proc/self/fd").out);
+    onThreads(1, [](int) {
+        removeCall(SYS_close_range);
+        EXPECT_STREQ("0\n1\n2\n3\n", ToolRun("ls /proc/self/fd").out) << "by another way";
+    });
+    EXPECT_STREQ("SigBlk:\t0000000000000000\nSigIgn:\t0000000000000000\n",
+                 ToolRun("grep -E SigBlk|SigIgn /proc/self/status").out);
+    pthread_sigmask(SIG_SETMASK, &before, &blocked);
+    EXPECT_EQ(1, sigismember(&blocked, SIGUSR1));
+    EXPECT_EQ(SIG_IGN, std::signal(SIGTERM, handler));
+    close(inherited);
+}
+
+TEST(ExecuteCommandTest, CancelledThreadLeavesOnlyTheTool) {
+    ToolFolder tools;
+    tools.script("hang", "echo $$ >$here/pid; exec sleep 60");
+    const long before = openDescriptors();
+    for (const bool early : {true, false}) {
+        std::filesystem::remove(tools.file("pid"));
+        const auto work = [](void* cancelled) -> void* {
+            if (cancelled != nullptr) pthread_cancel(pthread_self());
+            ToolRun("hang");
+            return nullptr;
+        };
+        pthread_t thread;
+        ASSERT_EQ(0, pthread_create(&thread, nullptr, work, early ? &thread : nullptr));
+        const pid_t pid = waitForPid(tools);
+        pthread_cancel(thread);
+        void* result = nullptr;
+        pthread_join(thread, &result);
+        EXPECT_EQ(PTHREAD_CANCELED, result);
+        EXPECT_EQ(before, openDescriptors());
+        EXPECT_EQ(0, kill(pid, SIGKILL)) << "it goes on";
+        siginfo_t ended;
+        EXPECT_EQ(0, waitid(P_PID, static_cast<id_t>(pid), &ended, WEXITED | WNOWAIT));
+    }
+    EXPECT_EQ("", ToolRun("true").failure);
+    EXPECT_FALSE(hasChildren()) << "reaped by the next run";
+}
+
+TEST(ExecuteCommandTest, EachAllocationMayFail) {
+    ToolFolder tools;
+    tools.script("talk", "head -c 200000 /dev/zero | tr '\\0' o; echo e >&2");
+    const long before = openDescriptors();
+    const auto run = [](const char* user) {
+        zemString out;
+        zemString err;
+        Helper::executeCommand("talk a 'b c'", out, err, nullptr, user, 0, "C", true);
+        EXPECT_EQ(200000U, out.length());
+    };
+    const std::function<void()> operations[] = {
+        [&] { run(nullptr); },
+        [&] { EXPECT_NE("", failureText([&] { run("nosuchuser"); })); },
+        [] {
+            const Running running("talk \\");
+            fclose(running.stream);
+            running.end();
+        },
+    };
+    for (const auto& operation : operations) {
+        bool happened = true;
+        for (long n = 0; happened; ++n) {
+            bool failed = false;
+            {
+                const FailingAllocation nth(n);
+                try {
+                    operation();
+                } catch (const std::bad_alloc&) {
+                    failed = true;
+                }
+                happened = nth.happened();
+            }
+            ASSERT_EQ(happened, failed) << n;
+            ASSERT_EQ(before, openDescriptors()) << n;
+            ASSERT_FALSE(hasChildren()) << n;
+        }
+    }
 }
 
 TEST(ExecuteCommandTest, ManyRunsLeaveNothingBehind) {
@@ -310,11 +396,22 @@ TEST(UserContextTest, SwitchesGroupAndUser) {
         },
         testing::ExitedWithCode(0), "");
     ToolFolder tools;
-    tools.script("who", "id -u; id -g");
-    EXPECT_STREQ("65534\n65534\n", ToolRun("who", "nobody").out);
-    EXPECT_STREQ("0\n0\n", ToolRun("who", "root").out);
+    tools.script("who", "id -u; id -g; grep CapInh /proc/self/status");
+    onThreads(4, [](int) {
+        __user_cap_header_struct self = {_LINUX_CAPABILITY_VERSION_3, 0};
+        __user_cap_data_struct kept[_LINUX_CAPABILITY_U32S_3] = {};
+        syscall(SYS_capget, &self, kept);
+        kept[0].inheritable |= 1U << CAP_KILL;
+        EXPECT_EQ(0, syscall(SYS_capset, &self, kept));
+        const std::string none = "CapInh:\t0000000000000000\n";
+        EXPECT_EQ("65534\n65534\n" + none, std::string(ToolRun("who", "nobody").out));
+        EXPECT_NE("0\n0\n" + none, std::string(ToolRun("who", "root").out));
+        EXPECT_EQ(0U, geteuid());
+    });
+    EXPECT_EQ(1, prctl(PR_GET_DUMPABLE)) << "of this process, whose memory the children had";
     EXPECT_EQ(0, Helper::changeProcessUserContext("root"));
     EXPECT_EQ(-1, Helper::changeProcessUserContext("no such user"));
+    EXPECT_EQ(-1, Helper::changeProcessUserContext(std::string(10000000, 'x').c_str()));
 }
 
 TEST(AsynExecuteCommandTest, HandsOverStreamAndChild) {

@@ -6,13 +6,26 @@
 #include "BaseProviderText.h"
 #include "Exception.h"
 
+namespace {
+
+// Some servers count the keys of the class on a path that has none of them.
+bool hasKeys(const CmpiObjectPath& path) {
+    try {
+        return path.getKeyCount() != 0 && !zemIsMissing(path.getKey(0));
+    } catch (const CmpiStatus&) {
+        return false;
+    }
+}
+
+}  // namespace
+
 CmpiStatus zemBaseProvider::invokeMethod(const CmpiContext& ctx, CmpiResult& result,
                                          const CmpiObjectPath& path, const char* method,
                                          const CmpiArgs& in, CmpiArgs& out) {
     zemOperationFrame frame(*this, zemOperation::InvokeMethod, ctx, &path, &result);
     frame.setMethod(method);
     return frame.run([&] {
-        const bool onClass = isStaticMethod(frame.className(), method) && path.getKeyCount() == 0;
+        const bool onClass = isStaticMethod(frame.className(), method) && !hasKeys(path);
         if (!onClass) requireTarget(frame, ctx, path, method);
         validateMethodArgs(method, in, frame.className());
         performInvokeMethod(ctx, result, path, method, in, out);

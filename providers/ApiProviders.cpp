@@ -173,7 +173,8 @@ private:
             const zemString value = object.getProperty(field.key);
             record.insert(row.attribute, field.words(static_cast<const char*>(value)).c_str());
         }
-        CmpiInstance instance = systemInstance(near, m_system.name, nameOf(system));
+        CmpiInstance instance =
+            newInstance(systemPath(near, m_system.name, nameOf(system)), properties);
         setProperties(instance, m_rows, properties, record);
         return instance;
     }

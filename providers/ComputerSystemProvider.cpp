@@ -9,10 +9,6 @@ namespace {
 
 constexpr const char kStateChange[] = "RequestStateChange";
 
-/// States that a client may ask for, and answers to it.
-constexpr CMPIUint16 kRequestableStates[] = {2, 3, 4, 6, 7, 8, 9, 10, 11};
-constexpr CMPIUint32 kNotSupported = 1, kTimeoutNotSupported = 4098;
-
 /// Whether the client limits the time that a change may take.
 bool hasTimeout(const CmpiArgs& in) {
     CmpiData limit;
@@ -42,8 +38,8 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
     const CmpiString name = getKeyBinding(path, "Name").getString();
     std::unique_ptr<CmpiInstance> found;
     if (strcasecmp(creationClass.charPtr(), m_className) == 0) {
-        zemQyplatCmdCaller tool = toolFor(clientOf(context));
-        find(tool, name.charPtr(), attributesFor(m_rows, m_identity, properties).data(),
+        find(clientOf(context), name.charPtr(),
+             attributesFor(m_rows, m_identity, properties).data(),
              [&](const std::string& foundName, const zemRecordType& record) {
                  found = std::make_unique<CmpiInstance>(
                      makeInstance(path, properties, foundName, record));
@@ -56,8 +52,7 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
 void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, CmpiResult& result,
                                                   const CmpiObjectPath& path,
                                                   const char** properties) {
-    zemQyplatCmdCaller tool = toolFor(clientOf(context));
-    readAll(tool, attributesFor(m_rows, m_identity, properties).data(),
+    readAll(clientOf(context), attributesFor(m_rows, m_identity, properties).data(),
             [&](const std::string& name, const zemRecordType& record) {
                 result.returnData(makeInstance(path, properties, name, record));
             });
@@ -66,8 +61,7 @@ void ComputerSystemProvider::performEnumInstances(const CmpiContext& context, Cm
 void ComputerSystemProvider::performEnumInstanceNames(const CmpiContext& context,
                                                       CmpiResult& result,
                                                       const CmpiObjectPath& path) {
-    zemQyplatCmdCaller tool = toolFor(clientOf(context));
-    readAll(tool, attributesFor({}, m_identity, nullptr).data(),
+    readAll(clientOf(context), attributesFor({}, m_identity, nullptr).data(),
             [&](const std::string& name, const zemRecordType&) {
                 result.returnData(systemPath(path, m_className, name));
             });
@@ -77,21 +71,22 @@ void ComputerSystemProvider::performSetInstance(const CmpiContext& context, Cmpi
                                                 const CmpiObjectPath& path,
                                                 const CmpiInstance& instance,
                                                 const char** properties) {
-    const CmpiInstance present = performGetInstance(context, path, nullptr);
-    std::vector<std::pair<std::string, std::string>> changes;
-    for (unsigned i = 0; i < instance.getPropertyCount(); ++i) {
-        CmpiString name;
-        const CmpiData value = instance.getProperty(static_cast<int>(i), &name);
-        if (!containsProperty(properties, name.charPtr())) continue;
-        if (!isChangeable(name.charPtr()))
-            validateUnmodifiableProperty(present, instance, name.charPtr());
-        else if (!value.isNullValue() &&
-                 !(cmpidata2String(value) == cmpidata2String(present.getProperty(name.charPtr()))))
-            changes.emplace_back(name.charPtr(), value.getString().charPtr());
+    const auto asked = askedFor(instance, path, m_className, properties);
+    std::vector<const char*> toCompare = {"Name"};
+    for (const auto& [property, value] : asked) toCompare.push_back(property.c_str());
+    toCompare.push_back(nullptr);
+    const CmpiInstance present = performGetInstance(context, path, toCompare.data());
+    std::vector<std::pair<const char*, std::string>> changes;
+    for (const auto& [property, value] : asked) {
+        const char* const name = property.c_str();
+        if (!isChangeable(name))
+            validateUnmodifiableProperty(present, instance, name);
+        else if (!(cmpidata2String(value) == cmpidata2String(present.getProperty(name))))
+            changes.emplace_back(name, value.getString().charPtr());
     }
     const CmpiString name = getKeyBinding(path, "Name").getString();
     for (const auto& [property, value] : changes)
-        change(clientOf(context), name.charPtr(), property.c_str(), value);
+        change(clientOf(context), name.charPtr(), property, value);
 }
 
 void ComputerSystemProvider::performInvokeMethod(const CmpiContext& context, CmpiResult& result,
@@ -100,15 +95,17 @@ void ComputerSystemProvider::performInvokeMethod(const CmpiContext& context, Cmp
     if (strcasecmp(method, kStateChange) != 0) throwMethodNotFoundExc(method, m_className);
     const CmpiData asked = getParmVal(in, "RequestedState");
     const CMPIUint16 state = asked.getUint16();
-    const auto* end = std::end(kRequestableStates);
-    if (std::find(std::begin(kRequestableStates), end, state) == end)
+    constexpr RequestedState kStates[] = {Enabled, Disabled, ShutDown, Offline, Test,
+                                          Defer,   Quiesce,  Reboot,   Reset};
+    const auto* const found = std::find(std::begin(kStates), std::end(kStates), state);
+    if (found == std::end(kStates))
         throwInvalidMethodArgValueExc("RequestedState", cmpidata2String(asked), method);
     if (hasTimeout(in)) {
-        result.returnData(methodResult(kTimeoutNotSupported));
+        result.returnData(methodResult(TimeoutNotSupported));
         return;
     }
     const CmpiString name = getKeyBinding(path, "Name").getString();
-    result.returnData(methodResult(requestState(clientOf(context), name.charPtr(), state)));
+    result.returnData(methodResult(requestState(clientOf(context), name.charPtr(), *found)));
 }
 
 CMPIBoolean ComputerSystemProvider::isValidInstanceClass(const char* className) {
@@ -135,14 +132,16 @@ bool ComputerSystemProvider::isChangeable(const char*) const { return false; }
 void ComputerSystemProvider::change(const Client&, const std::string&, const char*,
                                     const std::string&) {}
 
-CMPIUint32 ComputerSystemProvider::requestState(const Client&, const std::string&, CMPIUint16) {
-    return kNotSupported;
+ComputerSystemProvider::StateChangeAnswer ComputerSystemProvider::requestState(const Client&,
+                                                                               const std::string&,
+                                                                               RequestedState) {
+    return NotSupported;
 }
 
-void ComputerSystemProvider::find(zemQyplatCmdCaller& tool, const std::string& name,
-                                  int* attributes, const Sink& sink) {
+void ComputerSystemProvider::find(const Client& client, const std::string& name, int* attributes,
+                                  const Sink& sink) {
     try {
-        read(tool, name, attributes, sink);
+        read(client, name, attributes, sink);
     } catch (const zemException& e) {
         if (!isUnknownObject(e)) throw;
     }
@@ -165,7 +164,7 @@ CmpiData ComputerSystemProvider::methodResult(CMPIUint32 value) {
 CmpiInstance ComputerSystemProvider::makeInstance(const CmpiObjectPath& near,
                                                   const char** properties, const std::string& name,
                                                   const zemRecordType& record) {
-    CmpiInstance instance = systemInstance(near, m_className, name);
+    CmpiInstance instance = newInstance(systemPath(near, m_className, name), properties);
     setProperties(instance, m_rows, properties, record);
     return instance;
 }

@@ -22,6 +22,27 @@
 #include "QyplatCmdCaller.h"
 
 class ComputerSystemProvider : public zemBaseZemProvider {
+public:
+    /// States that clients may ask for by RequestStateChange, and its answers; the schema's
+    /// numbers.
+    enum RequestedState : CMPIUint16 {
+        Enabled = 2,
+        Disabled = 3,
+        ShutDown = 4,
+        Offline = 6,
+        Test = 7,
+        Defer = 8,
+        Quiesce = 9,
+        Reboot = 10,
+        Reset = 11
+    };
+    enum StateChangeAnswer : CMPIUint32 {
+        Completed = 0,
+        NotSupported = 1,
+        InvalidTransition = 4097,
+        TimeoutNotSupported = 4098
+    };
+
 protected:
     /// On whose behalf tools run, and in which language they speak.
     struct Client {
@@ -39,21 +60,20 @@ protected:
     /// Hands the system with this Name to @p sink; a Name that no system can have leaves the sink
     /// uncalled. What the tool says of a Name that none has is find()'s business.
     /// @param attributes  those to ask the tool for, closed by ATTR_END
-    virtual void read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+    virtual void read(const Client& client, const std::string& name, int* attributes,
                       const Sink& sink) = 0;
     /// Hands every system to @p sink.
-    virtual void readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) = 0;
+    virtual void readAll(const Client& client, int* attributes, const Sink& sink) = 0;
     /// As read(); a Name that no system has leaves the sink uncalled, too.
-    void find(zemQyplatCmdCaller& tool, const std::string& name, int* attributes, const Sink& sink);
+    void find(const Client& client, const std::string& name, int* attributes, const Sink& sink);
 
     /// Whether change() can change the property.
     virtual bool isChangeable(const char* property) const;
     virtual void change(const Client& client, const std::string& name, const char* property,
                         const std::string& value);
     /// Brings the system into a state that clients may ask for.
-    /// @return an answer of RequestStateChange
-    virtual CMPIUint32 requestState(const Client& client, const std::string& name,
-                                    CMPIUint16 state);
+    virtual StateChangeAnswer requestState(const Client& client, const std::string& name,
+                                           RequestedState state);
 
     static Client clientOf(const CmpiContext& context);
     static zemQyplatCmdCaller toolFor(const Client& client);

@@ -1,7 +1,5 @@
 #include "ConnectionProvider.h"
 
-#include <memory>
-
 #include "PropertyRows.h"
 #include "ProviderFactories.h"
 #include "QylinkCmdCaller.h"
@@ -43,6 +41,13 @@ CmpiObjectPath connectionPath(const CmpiObjectPath& near, const std::string& id)
     return path;
 }
 
+CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
+                          const zemRecordType& link) {
+    CmpiInstance instance = newInstance(connectionPath(near, idOf(link)), properties);
+    setProperties(instance, kRows, properties, link);
+    return instance;
+}
+
 }  // namespace
 
 ConnectionProvider::ConnectionProvider(const CmpiBroker& mb, const CmpiContext& ctx,
@@ -66,8 +71,7 @@ int ConnectionProvider::getInstance(const CmpiContext& context, const CmpiObject
         const zemRecordSetsType links = readLinks(context, properties, host.c_str());
         for (int i = 0; i < links.size(); ++i) {
             if (idOf(*links[i]) != id) continue;
-            out.setProperty("InstanceID", CmpiData(id.c_str()));
-            setProperties(out, kRows, properties, *links[i]);
+            out = makeInstance(path, properties, *links[i]);
             return 0;
         }
     } catch (const zemException& e) {
@@ -89,13 +93,8 @@ void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObj
                                        const char** properties, zemDynamicArray<CmpiInstance>& out,
                                        const CmpiObjectPath&) {
     const zemRecordSetsType links = readLinks(context, properties, nullptr);
-    for (int i = 0; i < links.size(); ++i) {
-        const std::string id = idOf(*links[i]);
-        auto instance = std::make_unique<CmpiInstance>(connectionPath(path, id));
-        instance->setProperty("InstanceID", CmpiData(id.c_str()));
-        setProperties(*instance, kRows, properties, *links[i]);
-        out.addElement(instance.release());
-    }
+    for (int i = 0; i < links.size(); ++i)
+        out.addElement(new CmpiInstance(makeInstance(path, properties, *links[i])));
 }
 
 CMPIBoolean ConnectionProvider::isValidInstanceClass(const char* className) {

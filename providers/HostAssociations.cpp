@@ -12,6 +12,7 @@
 #include "JMPIProviderInterfaceStub.h"
 #include "MultiNtoNAssociationProvider.h"
 #include "NtoNAssociationProvider.h"
+#include "OneAssociation.h"
 #include "ProviderFactories.h"
 
 namespace {
@@ -19,6 +20,12 @@ namespace {
 constexpr const char kHost[] = "ORXC_CEC_CS";
 constexpr const char kPartition[] = "ORXC_LPAR_CS";
 constexpr const char kConnection[] = "ORXC_HostConnection";
+
+constexpr const char kHostedPartition[] = "ORXC_HostedPartition";
+constexpr const char kConnectedHost[] = "ORXC_ConnectedHost";
+constexpr const char kHostComponent[] = "ORXC_HostComponent";
+constexpr const char kReachedHost[] = "ORXC_ReachedHost";
+constexpr const char kPartitionConnection[] = "ORXC_PartitionConnection";
 
 bool isOfClass(const CmpiObjectPath& path, const char* className) {
     return path.getClassName().equals(className) != 0;
@@ -36,12 +43,12 @@ bool onOneHost(const CmpiObjectPath& a, const CmpiObjectPath& b) {
 }
 
 /// Which host a partition runs on: one class on each side, both asked of the server.
-class HostedPartition : public zemNtoNAssociationProvider {
+class HostedPartition : public OneAssociation<zemNtoNAssociationProvider> {
 public:
     HostedPartition(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx),
-          zemNtoNAssociationProvider(mb, ctx, name, "ORXC_HostedPartition", kHost, kPartition,
-                                     "Antecedent", "Dependent", OP_ALLOps, "", "", "") {}
+          OneAssociation(kHostedPartition, mb, ctx, name, kHostedPartition, kHost, kPartition,
+                         "Antecedent", "Dependent", OP_ALLOps, "", "", "") {}
 
 protected:
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
@@ -50,12 +57,13 @@ protected:
     }
 };
 
-/// Which connections lead to a host: a row, to which further association classes can be added.
-class ConnectedHost : public zemAssociationProvider {
+/// Which connections lead to a host: a row, to which further pairs of classes can be added. Paths
+/// of references are made in the row's namespace as it stands there, so it has to name one.
+class ConnectedHost : public OneAssociation<zemAssociationProvider> {
 public:
     ConnectedHost(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), zemAssociationProvider(mb, ctx, name, OP_ALLOps) {
-        addAssoData(new zemAssociationData("ORXC_ConnectedHost", "", kHost, "Antecedent", "",
+        : CmpiBaseMI(mb, ctx), OneAssociation(kConnectedHost, mb, ctx, name, OP_ALLOps) {
+        addAssoData(new zemAssociationData(kConnectedHost, kNameSpace, kHost, "Antecedent", "",
                                            kConnection, "Dependent", ""));
     }
 
@@ -68,16 +76,15 @@ protected:
 };
 
 /// All that a host is made of: a list of pairs, the base class standing for its subclasses.
-class HostComponent : public zemMultiNtoNAssociationProvider {
+class HostComponent : public OneAssociation<zemMultiNtoNAssociationProvider> {
 public:
     HostComponent(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx),
-          zemMultiNtoNAssociationProvider(mb, ctx, name, "ORXC_HostComponent",
-                                          "ORXC_CEC_CS\0ORXC_LPAR_CS\0"
-                                          "ORXC_CEC_CS\0ORXC_HostConnection\0"
-                                          "ORXC_CEC_CS\0CIM_EnabledLogicalElement\0",
-                                          "GroupComponent", "PartComponent", OP_ALLOps, "", "",
-                                          "") {}
+          OneAssociation(kHostComponent, mb, ctx, name, kHostComponent,
+                         "ORXC_CEC_CS\0ORXC_LPAR_CS\0"
+                         "ORXC_CEC_CS\0ORXC_HostConnection\0"
+                         "ORXC_CEC_CS\0CIM_EnabledLogicalElement\0",
+                         "GroupComponent", "PartComponent", OP_ALLOps, "", "", "") {}
 
 protected:
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
@@ -88,16 +95,16 @@ protected:
 
 /// Hosts are served by another provider, which the stub asks through the server; connections by
 /// an object of this library.
-class ReachedHost : public zemBaseZemMultiNtoNAssociationProvider {
+class ReachedHost : public OneAssociation<zemBaseZemMultiNtoNAssociationProvider> {
 public:
     ReachedHost(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx),
-          zemBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
+          OneAssociation(kReachedHost, mb, ctx, name, OP_ALLOps),
           m_hosts(mb, ctx),
           m_connections(mb, ctx, "ORXC_HostConnectionProvider") {
         m_associationDataSet.addNewAssoPair(new zemMultiNtoNAssociationPair(
             {&m_hosts, kHost, "Antecedent", ""}, {&m_connections, kConnection, "Dependent", ""},
-            "ORXC_ReachedHost", ""));
+            kReachedHost, ""));
     }
 
 protected:
@@ -113,16 +120,16 @@ private:
 };
 
 /// Both sides can be long, so only objects with one key, their host, are compared.
-class PartitionConnection : public zemEnhanceBaseZemMultiNtoNAssociationProvider {
+class PartitionConnection : public OneAssociation<zemEnhanceBaseZemMultiNtoNAssociationProvider> {
 public:
     PartitionConnection(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx),
-          zemEnhanceBaseZemMultiNtoNAssociationProvider(mb, ctx, name, OP_ALLOps),
+          OneAssociation(kPartitionConnection, mb, ctx, name, OP_ALLOps),
           m_partitions(mb, ctx),
           m_connections(mb, ctx, "ORXC_HostConnectionProvider") {
         m_associationDataSet.addNewAssoPair(new zemMultiNtoNAssociationPair(
             {&m_connections, kConnection, "Antecedent", ""},
-            {&m_partitions, kPartition, "Dependent", ""}, "ORXC_PartitionConnection", ""));
+            {&m_partitions, kPartition, "Dependent", ""}, kPartitionConnection, ""));
     }
 
 protected:

@@ -44,13 +44,13 @@ public:
                                  {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM}) {}
 
 protected:
-    void read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+    void read(const Client& client, const std::string& name, int* attributes,
               const Sink& sink) override {
-        if (isHostName(name)) readHosts(tool, name.c_str(), attributes, sink);
+        if (isHostName(name)) readHosts(client, name.c_str(), attributes, sink);
     }
 
-    void readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) override {
-        readHosts(tool, nullptr, attributes, sink);
+    void readAll(const Client& client, int* attributes, const Sink& sink) override {
+        readHosts(client, nullptr, attributes, sink);
     }
 
     void performInvokeMethod(const CmpiContext& context, CmpiResult& result,
@@ -63,11 +63,11 @@ protected:
         const CmpiString wanted = getParmVal(in, "ElementName").getString();
         int attributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_NAME,
                             Host::ATTR_END};
-        zemQyplatCmdCaller tool = toolFor(clientOf(context));
         std::string found;
-        readAll(tool, attributes, [&](const std::string& name, const zemRecordType& host) {
-            if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;
-        });
+        readAll(clientOf(context), attributes,
+                [&](const std::string& name, const zemRecordType& host) {
+                    if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;
+                });
         if (found.empty()) throwObjectNotFoundExc(kFindHost, m_className, wanted.charPtr());
         out.setArg("Host", CmpiData(systemPath(path, m_className, found)));
         result.returnData(methodResult(0));
@@ -84,9 +84,10 @@ protected:
     }
 
 private:
-    static void readHosts(zemQyplatCmdCaller& tool, const char* host, int* attributes,
+    static void readHosts(const Client& client, const char* host, int* attributes,
                           const Sink& sink) {
-        const zemRecordSetsType hosts = tool.getManagedSystemInformation(attributes, host);
+        const zemRecordSetsType hosts =
+            toolFor(client).getManagedSystemInformation(attributes, host);
         for (int i = 0; i < hosts.size(); ++i) sink(hostName(*hosts[i]), *hosts[i]);
     }
 };

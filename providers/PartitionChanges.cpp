@@ -14,6 +14,7 @@ namespace {
 
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using New = zemNwplatCmdCaller::PartitionAttribute;
+using State = ComputerSystemProvider;
 
 /// What a client may say of a partition that is to be made.
 constexpr PropertyRow kCreation[] = {
@@ -57,30 +58,34 @@ auto rowOf(const Rows& rows, const char* property) {
                         [&](const auto& row) { return strcasecmp(row.property, property) == 0; });
 }
 
+constexpr int kPartitionResource = 1;  ///< of EdpowerCaller
+
 /// How a partition comes from one state to another.
 struct Transition {
-    CMPIUint16 requested;
+    State::RequestedState requested;
     const char* from;
     enum Tool { Power, Suspend } tool;
     int operation;  ///< of the tool's caller
     bool immediately = false;
     bool restart = false;
+
+    // operations of EdpowerCaller, and of EdsuspCaller
+    enum { Activate = 1, SwitchOff = 2, ShutDownSystem = 3 };
+    enum { SuspendIt = 1, Resume = 2, DropSuspended = 6 };
 };
 
 constexpr Transition kTransitions[] = {
-    {2, "Not Activated", Transition::Power, 1},
-    {2, "Suspended", Transition::Suspend, 2},
-    {3, "Running", Transition::Power, 2, true},
-    {3, "Open Firmware", Transition::Power, 2, true},
-    {3, "Suspended", Transition::Suspend, 6},
-    {4, "Running", Transition::Power, 3},
-    {6, "Running", Transition::Suspend, 1},
-    {10, "Running", Transition::Power, 3, false, true},
-    {11, "Running", Transition::Power, 2, true, true},
-    {11, "Open Firmware", Transition::Power, 2, true, true},
+    {State::Enabled, "Not Activated", Transition::Power, Transition::Activate},
+    {State::Enabled, "Suspended", Transition::Suspend, Transition::Resume},
+    {State::Disabled, "Running", Transition::Power, Transition::SwitchOff, true},
+    {State::Disabled, "Open Firmware", Transition::Power, Transition::SwitchOff, true},
+    {State::Disabled, "Suspended", Transition::Suspend, Transition::DropSuspended},
+    {State::ShutDown, "Running", Transition::Power, Transition::ShutDownSystem},
+    {State::Offline, "Running", Transition::Suspend, Transition::SuspendIt},
+    {State::Reboot, "Running", Transition::Power, Transition::ShutDownSystem, false, true},
+    {State::Reset, "Running", Transition::Power, Transition::SwitchOff, true, true},
+    {State::Reset, "Open Firmware", Transition::Power, Transition::SwitchOff, true, true},
 };
-
-constexpr CMPIUint32 kCompleted = 0, kNotSupported = 1, kInvalidTransition = 4097;
 
 /// The text that the tool has for the value of a property.
 std::string toolText(ValueKind kind, const CmpiData& value) {
@@ -89,9 +94,7 @@ std::string toolText(ValueKind kind, const CmpiData& value) {
         return std::string(zemCommandCaller::itemValue(value.getString().charPtr()));
     if (kind == ValueKind::Uint16) return std::to_string(value.getUint16());
     const CMPIUint32 number = value.getUint32();
-    if (kind == ValueKind::Uint32) return std::to_string(number);
-    const std::string places = std::to_string(100 + number % 100).substr(1);
-    return std::to_string(number / 100) + "." + places;
+    return kind == ValueKind::Hundredths ? hundredthsText(number) : std::to_string(number);
 }
 
 /// The number of the host's partition with this name; empty when there is none.
@@ -106,15 +109,11 @@ std::string idOfName(zemQyplatCmdCaller& tool, const std::string& host, const st
 
 }  // namespace
 
-void PartitionProvider::addCreationPairs(const CmpiInstance& instance,
+void PartitionProvider::addCreationPairs(const CmpiInstance& instance, const CmpiObjectPath& path,
                                          zemDynamicArray<tagAttributePair>& pairs) {
-    for (unsigned i = 0; i < instance.getPropertyCount(); ++i) {
-        CmpiString property;
-        const CmpiData value = instance.getProperty(static_cast<int>(i), &property);
-        const char* said = property.charPtr();
-        if (value.isNullValue() || strcasecmp(said, "Name") == 0 ||
-            strcasecmp(said, "CreationClassName") == 0)
-            continue;
+    for (const auto& [property, value] : askedFor(instance, path, m_className, nullptr)) {
+        const char* const said = property.c_str();
+        if (strcasecmp(said, "Name") == 0 || strcasecmp(said, "CreationClassName") == 0) continue;
         const auto row = rowOf(kCreation, said);
         if (row == std::end(kCreation)) {
             validateCannotSpecifiedProperty(instance, said);
@@ -135,21 +134,21 @@ void PartitionProvider::performCreateInstance(const CmpiContext& context, CmpiRe
         throwInvalidKeyExc("createInstance", m_className, "Name");
 
     const Client client = clientOf(context);
-    zemQyplatCmdCaller tool = toolFor(client);
     zemDynamicArray<tagAttributePair> pairs;
     if (!anyNumber) {
         int justTheNumber[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_END};
-        find(tool, name, justTheNumber, [&](const std::string&, const zemRecordType&) {
+        find(client, name, justTheNumber, [&](const std::string&, const zemRecordType&) {
             throw zemObjectAlreadyExistsException(
                 "PartitionProvider", "performCreateInstance",
                 ("There is a partition " + name + " already.").c_str());
         });
         pairs.addElement(new tagAttributePair{New::ATTR_LPAR_ID, key.id.c_str()});
     }
-    addCreationPairs(instance, pairs);
+    addCreationPairs(instance, path, pairs);
     zemHostSystem(key.host.c_str(), client.user, client.locale).createVirtualSystem(pairs);
     if (anyNumber) {
         const CmpiString elementName = getPropVal(instance, "ElementName").getString();
+        zemQyplatCmdCaller tool = toolFor(client);
         key.id = idOfName(tool, key.host, elementName.charPtr());
     }
     result.returnData(systemPath(path, m_className, key.id + "*" + key.host));
@@ -181,24 +180,24 @@ void PartitionProvider::change(const Client& client, const std::string& name, co
     (partition.*row.set)(value.c_str());
 }
 
-CMPIUint32 PartitionProvider::requestState(const Client& client, const std::string& name,
-                                           CMPIUint16 state) {
+PartitionProvider::StateChangeAnswer PartitionProvider::requestState(const Client& client,
+                                                                     const std::string& name,
+                                                                     RequestedState state) {
     const auto requested = [&](const Transition& row) { return row.requested == state; };
     if (std::none_of(std::begin(kTransitions), std::end(kTransitions), requested))
-        return kNotSupported;
+        return NotSupported;
 
     int attributes[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_STATE,
                         Partition::ATTR_DEFAULT_PROFILE, Partition::ATTR_END};
-    zemQyplatCmdCaller tool = toolFor(client);
     std::string present, profile;
-    find(tool, name, attributes, [&](const std::string&, const zemRecordType& record) {
+    find(client, name, attributes, [&](const std::string&, const zemRecordType& record) {
         present = static_cast<const char*>(record[Partition::ATTR_STATE]);
         profile = static_cast<const char*>(record[Partition::ATTR_DEFAULT_PROFILE]);
     });
     const auto row = std::find_if(
         std::begin(kTransitions), std::end(kTransitions),
         [&](const Transition& t) { return t.requested == state && present == t.from; });
-    if (row == std::end(kTransitions)) return kInvalidTransition;
+    if (row == std::end(kTransitions)) return InvalidTransition;
 
     Key key;
     split(name, key);
@@ -210,7 +209,7 @@ CMPIUint32 PartitionProvider::requestState(const Client& client, const std::stri
         suspend.run();
     } else {
         EdpowerCaller power(client.user, client.locale);
-        power.setResource(1);
+        power.setResource(kPartitionResource);
         power.setManagedSystem(key.host.c_str());
         power.setLparId(std::stoi(key.id));
         power.setLparProfileName(zemCommandCaller::quoted(profile.c_str()));
@@ -219,5 +218,5 @@ CMPIUint32 PartitionProvider::requestState(const Client& client, const std::stri
         power.setRestart(row->restart);
         power.run();
     }
-    return kCompleted;
+    return Completed;
 }

@@ -2,8 +2,11 @@
 #include "PartitionProvider.h"
 
 #include <algorithm>
+#include <cstdlib>
+#include <iterator>
 #include <map>
 
+#include "DNXApiCaller.h"
 #include "ProviderFactories.h"
 
 namespace {
@@ -12,10 +15,10 @@ using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
 
-/// Added to attributes of a profile, to tell them from those of a partition.
-constexpr int kOfProfile = 1000;
-/// No attribute of a tool, but known from the query.
-constexpr int kHostOfPartition = 2000;
+// Rows name attributes of three sources: behind those of a partition are numbered its host, which
+// is known from the query, and those of its default profile.
+constexpr int kHostOfPartition = static_cast<int>(std::size(Partition::m_attributeName));
+constexpr int kOfProfile = kHostOfPartition + 1;
 
 const std::vector<PropertyRow> kRows = {
     {"ElementName", ValueKind::Text, Partition::ATTR_NAME},
@@ -63,10 +66,10 @@ using Profiles = std::map<std::pair<std::string, std::string>, const zemRecordTy
 /// The attributes of partitions that a query needs, and those of their default profiles.
 struct Needs {
     explicit Needs(const int* attributes) {
-        for (; *attributes != Partition::ATTR_END; ++attributes)
-            if (*attributes != kHostOfPartition)
-                (*attributes < kOfProfile ? partition : profile)
-                    .push_back(*attributes % kOfProfile);
+        for (; *attributes != Partition::ATTR_END; ++attributes) {
+            if (*attributes >= kOfProfile) profile.push_back(*attributes - kOfProfile);
+            if (*attributes < kHostOfPartition) partition.push_back(*attributes);
+        }
         ofProfile = profile;
         if (!profile.empty()) {
             partition.push_back(Partition::ATTR_DEFAULT_PROFILE);
@@ -83,12 +86,94 @@ struct Needs {
     Attributes ofProfile;           ///< wanted ones alone
 };
 
-/// The profiles of these partitions; none when no attribute of a profile is wanted.
-zemRecordSetsType readProfiles(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host,
-                               const char* filter) {
+using Sink = std::function<void(const std::string& name, const zemRecordType& record)>;
+
+/// Hands a partition to @p sink, with its host and what is wanted of its default profile.
+/// @param profileValue  gives the value of an attribute of that profile
+template <class ProfileValue>
+void hand(zemRecordType& partition, const std::string& host, const Needs& needs,
+          ProfileValue profileValue, const Sink& sink) {
+    for (int attribute : needs.ofProfile)
+        partition.insert(kOfProfile + attribute, profileValue(attribute));
+    partition.insert(kHostOfPartition, host.c_str());
+    sink(std::string(partition[Partition::ATTR_LPAR_ID]) + "*" + host, partition);
+}
+
+// One profile is read from the management library, which takes no process.
+
+std::string same(const zemApiProp& profile, const char* key) {
+    return std::string(profile.getProperty(key));
+}
+
+bool isDedicated(const std::string& mode) { return mode == "255"; }
+
+std::string modeWord(const zemApiProp& profile, const char* key) {
+    return isDedicated(same(profile, key)) ? "ded" : "shared";
+}
+
+/// The library's sharing and donor modes are one word of the tool's.
+std::string sharingWord(const zemApiProp& profile, const char* key) {
+    const bool isGreedy = same(profile, key) == "1", isDonor = same(profile, "DonorMode") == "1";
+    if (!isDedicated(same(profile, "ProcMode"))) return isGreedy ? "uncap" : "cap";
+    if (isDonor) return isGreedy ? "share_idle_procs_active" : "share_idle_procs_always";
+    return isGreedy ? "keep_idle_procs" : "share_idle_procs";
+}
+
+std::string unitsWord(const zemApiProp& profile, const char* key) {
+    const std::string units = same(profile, key);
+    return units.empty() ? "" : hundredthsText(std::strtoul(units.c_str(), nullptr, 10));
+}
+
+/// One attribute of the tool's profile record: its value is words(profile, key).
+struct LibraryRow {
+    int attribute;
+    const char* key;
+    std::string (*words)(const zemApiProp& profile, const char* key);
+};
+
+constexpr LibraryRow kLibraryRows[] = {
+    {Profile::ATTR_MEM_MODE, "MemMode", modeWord},
+    {Profile::ATTR_MIN_MEM, "MinimumMemory", same},
+    {Profile::ATTR_DESIRED_MEM, "DesiredMemory", same},
+    {Profile::ATTR_MAX_MEM, "MaximumMemory", same},
+    {Profile::ATTR_PROC_MODE, "ProcMode", modeWord},
+    {Profile::ATTR_SHARING_MODE, "SharingMode", sharingWord},
+    {Profile::ATTR_UNCAP_WEIGHT, "UncappedWeight", same},
+    {Profile::ATTR_MIN_PROCS, "MinimumCPUCount", same},
+    {Profile::ATTR_DESIRED_PROCS, "DesiredCPUCount", same},
+    {Profile::ATTR_MAX_PROCS, "MaximumCPUCount", same},
+    {Profile::ATTR_MIN_PROC_UNITS, "MinProcUnit", unitsWord},
+    {Profile::ATTR_DESIRED_PROC_UNITS, "DesiredProcUnit", unitsWord},
+    {Profile::ATTR_MAX_PROC_UNITS, "MaxProcUnit", unitsWord},
+    {Profile::ATTR_MAX_VIRTUAL_SLOTS, "MaxVirtualSlots", same},
+};
+constexpr zemApiReader kProfileReader = {"PartitionProvider", "getInstance", "getLparProfile", "-1",
+                                         true};
+constexpr int kFullLevel = 2;  ///< of detail
+
+/// Hands one partition to @p sink, its default profile read from the library.
+void handWithLibraryProfile(zemRecordType& partition, const std::string& host, const Needs& needs,
+                            const char* user, const Sink& sink) {
+    std::map<int, std::string> values;
+    const std::string key = std::string(partition[Partition::ATTR_LPAR_ID]) + "*" + host;
+    if (!needs.ofProfile.empty()) {
+        const zemString& name = partition[Partition::ATTR_DEFAULT_PROFILE];
+        for (apiProp& found :
+             zemApiObjects(kProfileReader,
+                           zemApiCaller().getLparProfile(user, key.c_str(), name, kFullLevel))) {
+            for (const LibraryRow& row : kLibraryRows)
+                values[row.attribute] = row.words(zemApiProp(&found), row.key);
+        }
+    }
+    hand(
+        partition, host, needs, [&](int attribute) { return values[attribute].c_str(); }, sink);
+}
+
+/// The profiles of a host; none when no attribute of a profile is wanted.
+zemRecordSetsType readProfiles(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host) {
     if (needs.ofProfile.empty()) return zemRecordSetsType();
     try {
-        return tool.getPartitionsProfileInformation(needs.profile.data(), host.c_str(), filter);
+        return tool.getPartitionsProfileInformation(needs.profile.data(), host.c_str(), nullptr);
     } catch (const zemException& e) {
         // partitions without a profile are partitions still
         if (!isUnknownObject(e)) throw;
@@ -96,13 +181,12 @@ zemRecordSetsType readProfiles(zemQyplatCmdCaller& tool, Needs& needs, const std
     }
 }
 
-/// Hands partitions of one host to @p sink, each with what is wanted of its default profile.
+/// Hands the partitions of a host to @p sink, each with what is wanted of its default profile.
 void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host,
-                    const char* filter,
-                    const std::function<void(const std::string&, const zemRecordType&)>& sink) {
+                    const Sink& sink) {
     const zemRecordSetsType partitions =
-        tool.getPartitionsInformation(needs.partition.data(), host.c_str(), filter);
-    const zemRecordSetsType records = readProfiles(tool, needs, host, filter);
+        tool.getPartitionsInformation(needs.partition.data(), host.c_str(), nullptr);
+    const zemRecordSetsType records = readProfiles(tool, needs, host);
     Profiles profiles;
     for (int i = 0; i < records.size(); ++i) {
         const zemRecordType& profile = *records[i];
@@ -111,16 +195,17 @@ void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& h
     }
     for (int i = 0; i < partitions.size(); ++i) {
         zemRecordType& partition = *partitions[i];
-        const std::string id(partition[Partition::ATTR_LPAR_ID]);
-        if (!needs.ofProfile.empty()) {
-            const auto found = profiles.find(
-                {id, static_cast<const char*>(partition[Partition::ATTR_DEFAULT_PROFILE])});
-            for (int key : needs.ofProfile)
-                partition.insert(kOfProfile + key,
-                                 found == profiles.end() ? zemString() : (*found->second)[key]);
-        }
-        partition.insert(kHostOfPartition, host.c_str());
-        sink(std::string(id).append("*").append(host), partition);
+        auto found = profiles.end();
+        if (!needs.ofProfile.empty())
+            found = profiles.find(
+                {static_cast<const char*>(partition[Partition::ATTR_LPAR_ID]),
+                 static_cast<const char*>(partition[Partition::ATTR_DEFAULT_PROFILE])});
+        hand(
+            partition, host, needs,
+            [&](int attribute) {
+                return found == profiles.end() ? zemString() : (*found->second)[attribute];
+            },
+            sink);
     }
 }
 
@@ -137,21 +222,25 @@ bool PartitionProvider::split(const std::string& name, Key& key) {
     return zemString(key.id.c_str()).isDigit() && isHostName(key.host);
 }
 
-void PartitionProvider::read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+void PartitionProvider::read(const Client& client, const std::string& name, int* attributes,
                              const Sink& sink) {
     Key key;
     if (!split(name, key)) return;
     Needs needs(attributes);
-    readPartitions(tool, needs, key.host, ("\"lpar_ids=" + key.id + "\"").c_str(), sink);
+    const zemRecordSetsType found = toolFor(client).getPartitionsInformation(
+        needs.partition.data(), key.host.c_str(), ("\"lpar_ids=" + key.id + "\"").c_str());
+    for (int i = 0; i < found.size(); ++i)
+        handWithLibraryProfile(*found[i], key.host, needs, client.user, sink);
 }
 
-void PartitionProvider::readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) {
+void PartitionProvider::readAll(const Client& client, int* attributes, const Sink& sink) {
+    zemQyplatCmdCaller tool = toolFor(client);
     int hostAttributes[] = {Host::ATTR_TYPE_MODEL, Host::ATTR_SERIAL_NUM, Host::ATTR_END};
     const zemRecordSetsType hosts = tool.getManagedSystemInformation(hostAttributes, nullptr);
     Needs needs(attributes);
     for (int i = 0; i < hosts.size(); ++i) {
         try {
-            readPartitions(tool, needs, hostName(*hosts[i]), nullptr, sink);
+            readPartitions(tool, needs, hostName(*hosts[i]), sink);
         } catch (const zemException& e) {
             // a host without partitions answers so; one removed meanwhile has none either
             if (!isUnknownObject(e)) throw;

@@ -25,14 +25,14 @@ public:
     PartitionProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name);
 
 protected:
-    void read(zemQyplatCmdCaller& tool, const std::string& name, int* attributes,
+    void read(const Client& client, const std::string& name, int* attributes,
               const Sink& sink) override;
-    void readAll(zemQyplatCmdCaller& tool, int* attributes, const Sink& sink) override;
+    void readAll(const Client& client, int* attributes, const Sink& sink) override;
     bool isChangeable(const char* property) const override;
     void change(const Client& client, const std::string& name, const char* property,
                 const std::string& value) override;
-    CMPIUint32 requestState(const Client& client, const std::string& name,
-                            CMPIUint16 state) override;
+    StateChangeAnswer requestState(const Client& client, const std::string& name,
+                                   RequestedState state) override;
 
     // the frame's hooks
     void performCreateInstance(const CmpiContext& context, CmpiResult& result,
@@ -50,7 +50,8 @@ private:
     static bool split(const std::string& name, Key& key);
 
     /// What the creation tool is told of the new partition.
-    void addCreationPairs(const CmpiInstance& instance, zemDynamicArray<tagAttributePair>& pairs);
+    void addCreationPairs(const CmpiInstance& instance, const CmpiObjectPath& path,
+                          zemDynamicArray<tagAttributePair>& pairs);
 };
 
 #endif

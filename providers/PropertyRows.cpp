@@ -6,6 +6,7 @@
 #include <cctype>
 #include <cstdlib>
 #include <ctime>
+#include <map>
 
 #include "BaseProvider.h"
 #include "QyplatCmdCaller.h"
@@ -14,31 +15,56 @@ namespace {
 
 using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
 
-/// What clients are told of the state words of hosts and partitions.
+// The tools' codes for what they do not know.
+constexpr const char kNoSuchHost[] = "WRTL8018";
+constexpr const char kNoSuchPartition[] = "WRTL8011";
+
+// Values of the schema.
+enum EnabledState : CMPIUint16 {
+    Unknown = 0,
+    Other = 1,
+    Enabled = 2,
+    Disabled = 3,
+    ShuttingDown = 4,
+    EnabledButOffline = 6,
+    Quiesce = 9,
+    Starting = 10
+};
+enum class Operational : CMPIUint16 {
+    Unknown = 0,
+    Ok = 2,
+    Error = 6,
+    Starting = 8,
+    Stopping = 9,
+    Stopped = 10,
+    LostCommunication = 13,
+    Dormant = 15
+};
+
+/// What clients are told of the state words of hosts, partitions and connections.
 struct StateRow {
     const char* word;
-    CMPIUint16 enabledState;
-    CMPIUint16 operationalStatus;
+    EnabledState enabled;
+    Operational status;
 };
 
 constexpr StateRow kStates[] = {
-    {"Operating", 2, 2},
-    {"Running", 2, 2},
-    {"Standby", 6, 2},
-    {"Starting", 10, 8},
-    {"Initializing", 10, 8},
-    {"Shutting Down", 4, 9},
-    {"Open Firmware", 10, 8},
-    {"Suspended", 9, 15},
-    {"Not Activated", 3, 10},
-    {"Power Off", 3, 10},
-    {"Power Off In Progress", 4, 9},
-    {"Error", 1, 6},
-    {"Connected", 2, 2},
-    {"No Connection", 0, 13},
-    {"Not Available", 0, 0},
+    {"Operating", Enabled, Operational::Ok},
+    {"Running", Enabled, Operational::Ok},
+    {"Connected", Enabled, Operational::Ok},
+    {"Standby", EnabledButOffline, Operational::Ok},
+    {"Starting", Starting, Operational::Starting},
+    {"Initializing", Starting, Operational::Starting},
+    {"Open Firmware", Starting, Operational::Starting},
+    {"Shutting Down", ShuttingDown, Operational::Stopping},
+    {"Power Off In Progress", ShuttingDown, Operational::Stopping},
+    {"Suspended", Quiesce, Operational::Dormant},
+    {"Not Activated", Disabled, Operational::Stopped},
+    {"Power Off", Disabled, Operational::Stopped},
+    {"Error", Other, Operational::Error},
+    {"No Connection", Unknown, Operational::LostCommunication},
 };
-constexpr StateRow kUnknownState = {"", 0, 0};
+constexpr StateRow kUnknownState = {"", Unknown, Operational::Unknown};
 
 const StateRow& stateRow(const char* word) {
     const auto* row = std::find_if(std::begin(kStates), std::end(kStates), [&](const StateRow& r) {
@@ -79,10 +105,10 @@ CmpiArray textList(const std::string& text) {
     return list;
 }
 
-CmpiArray oneNumber(CMPIUint16 value) {
+CmpiArray listOf(Operational status) {
     CmpiArray list(1, CMPI_uint16);
     CmpiData element;
-    element.setUint16(value);
+    element.setUint16(static_cast<CMPIUint16>(status));
     list[0] = element;
     return list;
 }
@@ -118,17 +144,32 @@ bool convert(ValueKind kind, const char* text, CmpiData& data) {
             return true;
         case ValueKind::Timestamp:
             if (strptime(text, "%m/%d/%Y %H:%M:%S", &when) == nullptr) return false;
-            when.tm_isdst = -1;
-            data.setDateTime(zemBaseProvider::convertDateTime(static_cast<long>(mktime(&when))));
+            data.setDateTime(zemBaseProvider::convertDateTime(static_cast<long>(timegm(&when))));
             return true;
         case ValueKind::EnabledState:
-            data.setUint16(stateRow(text).enabledState);
+            data.setUint16(stateRow(text).enabled);
             return true;
         case ValueKind::Status:
-            data = CmpiData(oneNumber(stateRow(text).operationalStatus));
+            data = CmpiData(listOf(stateRow(text).status));
             return true;
     }
     return false;
+}
+
+/// The properties that have a value.
+std::vector<std::pair<std::string, CmpiData>> valuesOf(const CmpiInstance& instance) {
+    std::vector<std::pair<std::string, CmpiData>> values;
+    const unsigned count = instance.getPropertyCount();
+    for (unsigned i = 0; i < count; ++i) {
+        CmpiString name;
+        const CmpiData value = instance.getProperty(static_cast<int>(i), &name);
+        if (!value.isNullValue()) values.emplace_back(name.charPtr(), value);
+    }
+    return values;
+}
+
+std::string textOf(const CmpiData& value) {
+    return std::string(zemBaseProvider::cmpidata2String(value));
 }
 
 }  // namespace
@@ -154,6 +195,11 @@ void setProperties(CmpiInstance& instance, const std::vector<PropertyRow>& rows,
     }
 }
 
+std::string hundredthsText(unsigned long hundredths) {
+    const std::string places = std::to_string(100 + hundredths % 100).substr(1);
+    return std::to_string(hundredths / 100) + "." + places;
+}
+
 bool isHostName(const std::string& text) {
     const std::size_t star = text.find('*');
     return star != std::string::npos && star > 0 && star + 1 < text.size() &&
@@ -164,7 +210,8 @@ bool isHostName(const std::string& text) {
 
 bool isUnknownObject(const zemException& failure) {
     const zemString id(failure.getExceptionId());
-    return failure.getExceptionType() == 5 || id == "WRTL8011" || id == "WRTL8018";
+    return failure.getExceptionType() == zemObjectNotFoundException::kind || id == kNoSuchHost ||
+           id == kNoSuchPartition;
 }
 
 std::string hostName(const zemRecordType& host) {
@@ -185,10 +232,46 @@ CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
     return path;
 }
 
-CmpiInstance systemInstance(const CmpiObjectPath& near, const char* className,
-                            const std::string& name) {
-    CmpiInstance instance(systemPath(near, className, name));
-    instance.setProperty("CreationClassName", CmpiData(className));
-    instance.setProperty("Name", CmpiData(name.c_str()));
+CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties) {
+    CmpiInstance instance(path);
+    const unsigned count = path.getKeyCount();
+    std::vector<CmpiString> names(count);
+    std::vector<CmpiData> values;
+    std::vector<const char*> keys;
+    for (unsigned i = 0; i < count; ++i) {
+        values.push_back(path.getKey(static_cast<int>(i), &names[i]));
+        keys.push_back(names[i].charPtr());
+    }
+    keys.push_back(nullptr);
+    if (properties != nullptr && *properties != nullptr) {
+        try {
+            instance.setPropertyFilter(properties, keys.data());
+        } catch (const CmpiStatus& status) {
+            // a server without filters leaves the choice to its clients
+            if (status.rc() != CMPI_RC_ERR_NOT_SUPPORTED) throw;
+        }
+    }
+    for (unsigned i = 0; i < count; ++i) instance.setProperty(keys[i], values[i]);
     return instance;
+}
+
+std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& instance,
+                                                       const CmpiObjectPath& near,
+                                                       const char* className,
+                                                       const char** properties) {
+    // what the server puts into an instance that nobody has filled yet
+    const std::map<std::string, std::string> defaults = [&] {
+        std::map<std::string, std::string> texts;
+        const CmpiInstance fresh(zemBaseProvider::createObjectPath(near, className));
+        for (const auto& [name, value] : valuesOf(fresh)) texts.emplace(name, textOf(value));
+        return texts;
+    }();
+    std::vector<std::pair<std::string, CmpiData>> asked;
+    for (const auto& [name, value] : valuesOf(instance)) {
+        const auto standard = defaults.find(name);
+        if (zemBaseProvider::containsProperty(properties, name.c_str()) &&
+            (standard == defaults.end() || standard->second != textOf(value)))
+            asked.emplace_back(name, value);
+    }
+    return asked;
 }

@@ -9,6 +9,7 @@
 #define PROPERTY_ROWS_H
 
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "CmpiInstance.h"
@@ -47,6 +48,9 @@ Attributes attributesFor(const std::vector<PropertyRow>& rows, const Attributes&
 void setProperties(CmpiInstance& instance, const std::vector<PropertyRow>& rows,
                    const char** properties, const zemRecordType& record);
 
+/// The tools' text for a number of hundredths, 125 as "1.25".
+std::string hundredthsText(unsigned long hundredths);
+
 /// Whether a text has the form of a host's key, <type_model>*<serial_num>. Keys come from clients
 /// and go into command lines, so nothing else may pass.
 bool isHostName(const std::string& text);
@@ -58,11 +62,24 @@ bool isUnknownObject(const zemException& failure);
 std::string hostName(const zemRecordType& host);
 
 /// Hosts and partitions have the keys CreationClassName, which is their class, and Name: their
-/// list, and path and instance with both, in the namespace of @p near.
+/// list, and a path with both, in the namespace of @p near.
 void listSystemKeys(CmpiArray& keys);
 CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
                           const std::string& name);
-CmpiInstance systemInstance(const CmpiObjectPath& near, const char* className,
-                            const std::string& name);
+
+/// A new instance that has the keys of @p path as properties. Servers make instances with the
+/// defaults of their class; one for a list of properties takes no others, so that no default is
+/// told of a property that nobody read.
+/// @param properties  as for attributesFor()
+CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties);
+
+/// What a client asks for with an instance that it sends: the wanted properties that have a value,
+/// but for those at the default of @p className. Servers fill defaults in for what a client leaves
+/// out, so a default asks for nothing.
+/// @param near  in the namespace of the class
+std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& instance,
+                                                       const CmpiObjectPath& near,
+                                                       const char* className,
+                                                       const char** properties);
 
 #endif

@@ -2,6 +2,8 @@
 // and back, under a broker of each character.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+
 #include "TestAppliance.h"
 
 namespace {
@@ -151,6 +153,7 @@ TEST_P(Road, PartitionsAreMadeChangedStartedStoppedAndDeleted) {
 
 struct Association {
     const char* name;
+    const char* base;
     const char* nearRole;  ///< of the source
     const char* farRole;
     std::string source;
@@ -163,12 +166,16 @@ struct Association {
 TEST_P(Road, EveryAssociationAnswersAllOperationsAndFilters) {
     const std::string link = R"('ORXC_HostConnection.InstanceID="ORX:1111-AAA*0000001:primary"')";
     const Association rows[] = {
-        {"ORXC_HostedPartition", "Antecedent", "Dependent", kHost, "ORXC_LPAR_CS", 7, 14},
-        {"ORXC_ConnectedHost", "Antecedent", "Dependent", kHost, "ORXC_HostConnection", 2, 8},
-        {"ORXC_HostComponent", "GroupComponent", "PartComponent", kHost,
+        {"ORXC_HostedPartition", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
+         "ORXC_LPAR_CS", 7, 14},
+        {"ORXC_ConnectedHost", "CIM_Dependency", "Antecedent", "Dependent", kHost,
+         "ORXC_HostConnection", 2, 8},
+        {"ORXC_HostComponent", "CIM_Component", "GroupComponent", "PartComponent", kHost,
          "CIM_EnabledLogicalElement", 9, 22},
-        {"ORXC_ReachedHost", "Antecedent", "Dependent", kHost, "ORXC_HostConnection", 2, 8},
-        {"ORXC_PartitionConnection", "Antecedent", "Dependent", link, "ORXC_LPAR_CS", 7, 28},
+        {"ORXC_ReachedHost", "CIM_Dependency", "Antecedent", "Dependent", kHost,
+         "ORXC_HostConnection", 2, 8},
+        {"ORXC_PartitionConnection", "CIM_Dependency", "Antecedent", "Dependent", link,
+         "ORXC_LPAR_CS", 7, 28},
     };
     for (const Association& row : rows) {
         const std::string of = row.source + " --assoc-class " + row.name;
@@ -183,6 +190,13 @@ TEST_P(Road, EveryAssociationAnswersAllOperationsAndFilters) {
         EXPECT_TRUE(answers("ain " + of + " --result-class CIM_ConcreteJob").empty()) << row.name;
         EXPECT_TRUE(answers("ain " + of + " --role Neither").empty()) << row.name;
         EXPECT_TRUE(answers("ain " + of + " --result-role Neither").empty()) << row.name;
+        for (const std::string& wider :
+             {std::string(), std::string(" --assoc-class ") + row.base}) {
+            const std::vector<std::string> all = answers("ain " + row.source + wider);
+            for (const std::string& target : targets)
+                EXPECT_NE(std::find(all.begin(), all.end(), target), all.end())
+                    << row.name << wider << ": " << target;
+        }
 
         std::vector<std::string> found;
         for (const std::string& line : answers("ai " + of))

@@ -12,6 +12,7 @@ namespace {
 
 using namespace cimom;
 using testing_support::lines;
+using testing_support::ScopedEnvironment;
 using testing_support::TestAppliance;
 
 constexpr const char* kHostClass = "ORXC_CEC_CS";
@@ -88,8 +89,8 @@ TEST_P(ProvidersTest, InstancesAreTheRecordsOfTheTool) {
     }
 }
 
-// The tools and the management library are two doors to one appliance.
-TEST_P(ProvidersTest, ClassesOfBothDoorsAgree) {
+// The tools and the management library tell of one appliance.
+TEST_P(ProvidersTest, ClassesReadByToolsAndByLibraryAgree) {
     const struct {
         const char* tools;
         const char* library;
@@ -136,14 +137,41 @@ TEST_P(ProvidersTest, OnlyWantedPropertiesAreAskedOfTheToolAndAnswered) {
     const std::string seen = (m_appliance.folder() / "seen").string();
     m_appliance.replaceTool("qyplat", "echo \"$@\" >'" + seen +
                                           "'\n"
-                                          "echo 1111-AAA,0000001,Operating");
-    m_request.properties = {{"State", "EnabledState"}};
+                                          "echo '1111-AAA,0000001,Operating,07/01/2024 12:00:00'");
+    const ScopedEnvironment abroad("TZ", "America/New_York");
+    m_request.properties = {{"State", "SystemTime"}};
     const Reply hosts = m_server->enumInstances(m_request, {"root/cimv2", kHostClass});
     ASSERT_EQ(hosts.instances.size(), 1u) << hosts.message;
     EXPECT_EQ(textOf(hosts.instances[0], "State"), "Operating");
-    EXPECT_EQ(textOf(hosts.instances[0], "EnabledState"), "2");
-    EXPECT_EQ(textOf(hosts.instances[0], "TypeModel"), "");
-    EXPECT_EQ(testing_support::contents(seen), "-r sys -F type_model,serial_num,state\n");
+    const Value* time = hosts.instances[0].properties.find("SystemTime");
+    ASSERT_NE(time, nullptr);
+    EXPECT_EQ(time->dateTime().text(), "20240701120000.000000+000");
+    for (const char* other : {"TypeModel", "EnabledState"})
+        EXPECT_EQ(textOf(hosts.instances[0], other), "") << other;
+    EXPECT_EQ(testing_support::contents(seen), "-r sys -F type_model,serial_num,state,sys_time\n");
+}
+
+TEST_P(ProvidersTest, GetOfOneObjectStartsNoSecondTool) {
+    const std::string seen = (m_appliance.folder() / "seen").string();
+    for (const std::string tool : {"qyplat", "qylink"})
+        m_appliance.replaceTool(
+            tool, "echo " + tool + " >>'" + seen + "'\nexec " ZEM_PROGRAMS "/" + tool + " \"$@\"");
+    const struct {
+        ObjectPath path;
+        const char* tools;
+    } rows[] = {
+        {system(kHostClass, "1111-AAA*0000001"), "qyplat\n"},
+        {system(kPartitionClass, "6*1111-AAA*0000001"), "qyplat\n"},
+        {system("ORXC_ApiHost", "1111-AAA*0000001"), ""},
+        {system("ORXC_ApiPartition", "6*1111-AAA*0000001"), ""},
+        {{"root/cimv2", "ORXC_HostConnection", {{"InstanceID", "ORX:1111-AAA*0000001:primary"}}},
+         "qylink\n"},
+    };
+    for (const auto& row : rows) {
+        EXPECT_EQ(m_server->getInstance(m_request, row.path).rc, CMPI_RC_OK) << row.path.className;
+        EXPECT_EQ(testing_support::contents(seen), row.tools) << row.path.className;
+        std::filesystem::remove(seen);
+    }
 }
 
 TEST_P(ProvidersTest, ToolRunsAsTheClientAndInItsLanguage) {

@@ -74,12 +74,10 @@ void appendItems(std::string& line, const zemDynamicArray<tagAttributePair>& pai
 
 void removeTrailingCommas(std::string& line) { line.erase(line.find_last_not_of(',') + 1); }
 
-bool isGiven(const char* text) { return text != nullptr && *text != '\0'; }
-
 /// The inside of a quoted field in a tool's lists.
 std::string withQuotesDoubled(const char* text) {
     std::string result;
-    for (; isGiven(text); ++text) {
+    for (; zemIsGiven(text); ++text) {
         result.append(*text == '"' ? 2 : 1, *text);
     }
     return result;
@@ -112,7 +110,7 @@ zemString zemCommandCaller::itemValue(const char* text) {
 
 zemString zemCommandCaller::filterItem(const char* name, const char* value) {
     std::string item = name + std::string("=");
-    if (isGiven(value)) {
+    if (zemIsGiven(value)) {
         item += isOneValue(value) ? value : '"' + withQuotesDoubled(value) + '"';
     }
     return item.c_str();
@@ -129,7 +127,7 @@ int zemCommandCaller::callGenericCommand(const char* command, zemString* pCmdOut
                                         m_locale, forceTimeOut);
     logger->end(command);
 
-    const std::string quotedCommand = '"' + std::string(command != nullptr ? command : "") + '"';
+    const std::string quotedCommand = '"' + zemTextOf(command) + '"';
     if (exitCode == 0) {
         if (saysNoResults(strCmdOutput)) {
             throwNotFound(quotedCommand, strCmdOutput.stripTrailing('\n'));
@@ -183,24 +181,30 @@ void zemCommandCaller::callLsCommand(const char* cmd, int* paramAttr, int paramA
     }
 }
 
+void zemCommandCaller::appendAttributes(std::string& line,
+                                        const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
+                                        const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
+                                        zemAttributeNames table, CH_OP_TYPE op,
+                                        const char* attrOpt) {
+    const char* const method = "BuildChCmdString";
+    if (singleValAttrPairs.size() == 0 && multiValAttrPairs.size() == 0) {
+        return;
+    }
+    line += ' ' + zemTextOf(attrOpt) + " \"";
+    appendItems(line, singleValAttrPairs, "=", table, method);
+    appendItems(line, multiValAttrPairs, nameAt(op, kOperators, line, method), table, method);
+    removeTrailingCommas(line);
+    line += '"';
+}
+
 void zemCommandCaller::BuildChCmdString(zemString& strCmd,
                                         const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
                                         const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
                                         const char* const* allAttrNames, unsigned int allAttrNumber,
                                         CH_OP_TYPE op, const char* attrOpt) {
-    if (singleValAttrPairs.size() == 0 && multiValAttrPairs.size() == 0) {
-        return;
-    }
-    const zemAttributeNames table(allAttrNames, allAttrNumber);
     std::string line(strCmd);
-    line += ' ';
-    line += attrOpt != nullptr ? attrOpt : "";
-    line += " \"";
-    appendItems(line, singleValAttrPairs, "=", table, "BuildChCmdString");
-    appendItems(line, multiValAttrPairs, nameAt(op, kOperators, line, "BuildChCmdString"), table,
-                "BuildChCmdString");
-    removeTrailingCommas(line);
-    line += '"';
+    appendAttributes(line, singleValAttrPairs, multiValAttrPairs, {allAttrNames, allAttrNumber}, op,
+                     attrOpt);
     strCmd = line.c_str();
 }
 
@@ -209,11 +213,11 @@ int zemCommandCaller::callChCommand(const char* cmd,
                                     const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
                                     const char* const* allAttrNames, unsigned int allAttrNumber,
                                     CH_OP_TYPE op, const char* attrOpt) {
-    zemString strCmd(frontOf(cmd, kChangeRoom, "callChCommand").c_str());
-    BuildChCmdString(strCmd, singleValAttrPairs, multiValAttrPairs, allAttrNames, allAttrNumber, op,
+    std::string line = frontOf(cmd, kChangeRoom, "callChCommand");
+    appendAttributes(line, singleValAttrPairs, multiValAttrPairs, {allAttrNames, allAttrNumber}, op,
                      attrOpt);
-    zemLog::LogSysOut(strCmd);
-    return callGenericCommand(strCmd, nullptr, false);
+    zemLog::LogSysOut(line.c_str());
+    return callGenericCommand(line.c_str(), nullptr, false);
 }
 
 int zemCommandCaller::callMkCommand(const char* cmd,
@@ -232,10 +236,10 @@ zemRecordSetsType zemCommandCaller::query(const zemQuery& query, int* paramAttr,
                                           const char* managedSystem, const char* filter,
                                           const char* firstOptions, const char* lastOptions) {
     std::string line = std::string(query.command) + firstOptions;
-    if (query.systemTest == zemQuery::WHEN_NOT_NULL || isGiven(managedSystem)) {
+    if (query.systemTest == zemQuery::WHEN_NOT_NULL || zemIsGiven(managedSystem)) {
         line += systemOption(managedSystem);
     }
-    if (isGiven(filter)) {
+    if (zemIsGiven(filter)) {
         line += std::string(" --filter ") + filter;
     }
     line += lastOptions;

@@ -129,6 +129,12 @@ protected:
                           const char* const* allAttrNames, unsigned int allAttrNumber,
                           CH_OP_TYPE op, const char* attrOpt);
 
+    /// The same for a line in the making.
+    static void appendAttributes(std::string& line,
+                                 const zemDynamicArray<tagAttributePair>& singleValAttrPairs,
+                                 const zemDynamicArray<tagAttributePair>& multiValAttrPairs,
+                                 zemAttributeNames table, CH_OP_TYPE op, const char* attrOpt);
+
     /// Runs one query of a tool. The line is the query's command, @p firstOptions, the managed
     /// system, the filter, @p lastOptions and the wanted fields.
     /// @param paramAttr  as in callLsCommand(), ending in -1

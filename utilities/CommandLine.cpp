@@ -41,7 +41,7 @@ bool collectArgument(const std::string& text, size_t& pos, std::string& argument
 
 std::string zemEscaped(const char* text) {
     std::string result;
-    for (; text != nullptr && *text != '\0'; ++text) {
+    for (; zemIsGiven(text); ++text) {
         if (*text == '"' || *text == '\\') result += '\\';
         result += *text;
     }
@@ -51,7 +51,7 @@ std::string zemEscaped(const char* text) {
 std::string zemQuoted(const char* text) { return '"' + zemEscaped(text) + '"'; }
 
 zemCommandLine zemSplitCommandLine(const char* command) {
-    const std::string text = command != nullptr ? command : "";
+    const std::string text = zemTextOf(command);
     zemCommandLine line;
     const size_t blank = text.find(' ');
     line.program = text.substr(0, blank);

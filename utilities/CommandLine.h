@@ -27,6 +27,10 @@ struct zemCommandLine {
 /// like any other. A pair of quotes alone is an empty argument.
 zemCommandLine zemSplitCommandLine(const char* command);
 
+/// Of arguments that may be null, which is as empty: whether there is a text, and the text.
+inline bool zemIsGiven(const char* text) { return text != nullptr && *text != '\0'; }
+inline std::string zemTextOf(const char* text) { return text != nullptr ? text : ""; }
+
 /// @p text, which may be null, as it has to stand between double quotes for zemSplitCommandLine()
 /// to give it back; and the same with these quotes.
 std::string zemEscaped(const char* text);

@@ -17,6 +17,7 @@
 #define DNX_API_CALLER_H
 
 #include <cstddef>
+#include <functional>
 
 #include "AutoRelease.h"
 #include "StringUtils.h"
@@ -165,7 +166,8 @@ private:
     std::size_t m_size = 0;
 };
 
-/// One row of a reader's table: the value of a key, and the setter that takes it.
+/// One row of a reader's table: the value of a key, and the setter that takes it, an operation of
+/// the record or a function of the record and the value.
 template <class Setter>
 struct zemApiField {
     const char* key;
@@ -177,7 +179,7 @@ struct zemApiField {
 template <class Record, class Setter, std::size_t N>
 void zemReadApiFields(apiProp* object, Record& record, const zemApiField<Setter> (&fields)[N]) {
     for (const zemApiField<Setter>& field : fields) {
-        (record.*field.set)(zemApiProp(object).getProperty(field.key));
+        std::invoke(field.set, record, zemApiProp(object).getProperty(field.key));
     }
 }
 

@@ -18,22 +18,20 @@ constexpr char kNotWhole[] =
     "\"VirtualQuantity/100\" for shared mode or \"Reservation/100\" for dedicated mode should be "
     "an integer for the command \"edalloc -r proc -m %s -o r --id lpar_id --procs\"";
 
-std::string textOf(const char* text) { return text != nullptr ? text : ""; }
-
 // Unlike in the lines of all other tools, the system stands without quotes.
 
 /// The front of most lines.
 std::string front(const char* resource, const char* managedSystem, char operation,
                   const zemString& lparID) {
-    return std::string("edalloc -r ") + resource + " -m " + textOf(managedSystem) + " -o " +
-           operation + " --id " + textOf(lparID);
+    return std::string("edalloc -r ") + resource + " -m " + zemTextOf(managedSystem) + " -o " +
+           operation + " --id " + zemTextOf(lparID);
 }
 
 /// The front of lines that add a slot or an adapter, in which the operation comes first.
 std::string additionFront(const char* resource, const char* managedSystem,
                           const zemString& lparID) {
-    return std::string("edalloc -r ") + resource + " -o a -m " + textOf(managedSystem) + " --id " +
-           textOf(lparID);
+    return std::string("edalloc -r ") + resource + " -o a -m " + zemTextOf(managedSystem) +
+           " --id " + zemTextOf(lparID);
 }
 
 /// An option with its number, which only positive ones bring into the line.
@@ -142,7 +140,7 @@ int zemEdallocCmdCaller::addIOSlot(const char* managedSystem, const zemString& l
                                    const zemDynamicArray<tagAttributePair>& attrPairs, pid_t* pid,
                                    FILE** fpOutput) {
     const std::string line =
-        additionFront("io --rsubtype slot", managedSystem, lparID) + " -l " + textOf(drc_index);
+        additionFront("io --rsubtype slot", managedSystem, lparID) + " -l " + zemTextOf(drc_index);
     return run("addIOSlot",
                "addIOSlot:", withPairs(line, AddIOSlotAttribute::m_attributeName, attrPairs), pid,
                fpOutput);
@@ -152,8 +150,8 @@ int zemEdallocCmdCaller::removeIOSlot(const char* managedSystem, const zemString
                                       const zemString& drc_index, pid_t* pid, FILE** fpOutput) {
     return run(
         "removeIOSlot", "removeIOSlot:",
-        front("io  --rsubtype slot", managedSystem, 'r', lparID) + " -l " + textOf(drc_index), pid,
-        fpOutput);
+        front("io  --rsubtype slot", managedSystem, 'r', lparID) + " -l " + zemTextOf(drc_index),
+        pid, fpOutput);
 }
 
 /// The pair of operations of one kind of adapter.
@@ -176,12 +174,11 @@ ZEM_ADAPTER_OPERATIONS(VETH, "virtualio --rsubtype eth")
 ZEM_ADAPTER_OPERATIONS(VSCSI, "virtualio --rsubtype scsi")
 ZEM_ADAPTER_OPERATIONS(VSERIAL, "virtualio --rsubtype serial")
 
-std::string zemEdallocCmdCaller::withPairs(const std::string& line, zemAttributeNames table,
+std::string zemEdallocCmdCaller::withPairs(std::string line, zemAttributeNames table,
                                            const zemDynamicArray<tagAttributePair>& attrPairs) {
-    zemString strCmd(line.c_str());
-    BuildChCmdString(strCmd, attrPairs, zemDynamicArray<tagAttributePair>(), table.names,
-                     table.count, CH_OP_ADD, " -a ");
-    return textOf(strCmd);
+    appendAttributes(line, attrPairs, zemDynamicArray<tagAttributePair>(), table, CH_OP_ADD,
+                     " -a ");
+    return line;
 }
 
 int zemEdallocCmdCaller::run(const char* throwMethod, const std::string& logFront,

@@ -25,18 +25,13 @@
 
 class zemRASD;
 
-#define ZEM_EDALLOC_VSERIAL(X)              \
-    X(ADAPTER_TYPE, "adapter_type")         \
-    X(REMOTE_LPAR_ID, "remote_lpar_id")     \
-    X(REMOTE_LPAR_NAME, "remote_lpar_name") \
-    X(REMOTE_SLOT_NUM, "remote_slot_num")   \
-    X(SUPPORTS_DNX, "supports_dnx")
-
 #define ZEM_EDALLOC_VSCSI(X)                \
     X(ADAPTER_TYPE, "adapter_type")         \
     X(REMOTE_LPAR_ID, "remote_lpar_id")     \
     X(REMOTE_LPAR_NAME, "remote_lpar_name") \
     X(REMOTE_SLOT_NUM, "remote_slot_num")
+
+#define ZEM_EDALLOC_VSERIAL(X) ZEM_EDALLOC_VSCSI(X) X(SUPPORTS_DNX, "supports_dnx")
 
 #define ZEM_EDALLOC_VETH(X)                 \
     X(IEEE_VIRTUAL_ETH, "ieee_virtual_eth") \
@@ -112,8 +107,8 @@ public:
 
 private:
     /// The line with @p attrPairs behind it.
-    std::string withPairs(const std::string& line, zemAttributeNames table,
-                          const zemDynamicArray<tagAttributePair>& attrPairs);
+    static std::string withPairs(std::string line, zemAttributeNames table,
+                                 const zemDynamicArray<tagAttributePair>& attrPairs);
 
     /// Logs the line behind @p logFront and runs it, to its end or in the background.
     int run(const char* throwMethod, const std::string& logFront, const std::string& line,

@@ -1,6 +1,9 @@
 #include "QyusageCmdCaller.h"
 
 #include <string>
+#include <utility>
+
+#include "CommandLine.h"
 
 namespace {
 
@@ -17,19 +20,22 @@ constexpr zemQuery kSystems = {"qyusage -r sys",
 constexpr char kSamples[] = " --filter \"event_types=sample\"";
 constexpr int kNoLimit = -1;
 
-std::string additional(const char* option) {
-    return std::string(" ") + (option != nullptr ? option : "");
-}
+std::string additional(const char* option) { return ' ' + zemTextOf(option); }
 
 /// One end of a range of time, to the hour: the tool takes nothing finer.
-std::string hourOptions(const char* end, const tm* when) {
+std::string hourOptions(const std::string& end, const tm* when) {
     if (when == nullptr) {
         return "";
     }
-    zemString text;
-    text.format(" --%syear %d --%smonth %d --%sday %d --%shour %d ", end, when->tm_year + 1900, end,
-                when->tm_mon + 1, end, when->tm_mday, end, when->tm_hour);
-    return std::string(text);
+    const std::pair<const char*, int> parts[] = {{"year ", when->tm_year + 1900},
+                                                 {"month ", when->tm_mon + 1},
+                                                 {"day ", when->tm_mday},
+                                                 {"hour ", when->tm_hour}};
+    std::string text;
+    for (const auto& [name, value] : parts) {
+        text += " --" + end + name + std::to_string(value);
+    }
+    return text + ' ';
 }
 
 /// Seconds since the epoch as a calendar date in UTC, or none.
@@ -51,8 +57,8 @@ private:
 zemQyusageCmdCaller::zemQyusageCmdCaller(const char* auth, const char* locale)
     : zemCommandCaller(auth, locale) {}
 
-zemString zemQyusageCmdCaller::formatDataTimeFilter(const tm* pStart, const tm* pEnd) {
-    return zemString((hourOptions("start", pStart) + hourOptions("end", pEnd)).c_str());
+std::string zemQyusageCmdCaller::formatDataTimeFilter(const tm* pStart, const tm* pEnd) {
+    return hourOptions("start", pStart) + hourOptions("end", pEnd);
 }
 
 zemRecordSetsType zemQyusageCmdCaller::getConfigurationSettings(int* paramAttr,
@@ -68,8 +74,8 @@ zemRecordSetsType zemQyusageCmdCaller::getPartitionsMetrics(int* paramAttr,
                                                             tm* pEndDateTime,
                                                             const char* additionalOption) {
     std::string options = additional(additionalOption) + kSamples;
-    if (filter != nullptr && *filter != '\0') {
-        options += std::string(",") + filter;
+    if (zemIsGiven(filter)) {
+        options += ',' + zemTextOf(filter);
     }
     options += formatDataTimeFilter(pStartDateTime, pEndDateTime);
     return query(kPartitions, paramAttr, managedSystem, nullptr, "", options.c_str());
@@ -80,7 +86,7 @@ zemRecordSetsType zemQyusageCmdCaller::getManagedSystemMetrics(int* paramAttr,
                                                                tm* pStartDateTime, tm* pEndDateTime,
                                                                const char* additionalOption) {
     const std::string options = additional(additionalOption) + kSamples +
-                                std::string(formatDataTimeFilter(pStartDateTime, pEndDateTime));
+                                formatDataTimeFilter(pStartDateTime, pEndDateTime);
     return query(kSystems, paramAttr, managedSystem, nullptr, "", options.c_str());
 }
 

@@ -82,7 +82,7 @@ public:
                                               const char* additionalOption);
 
 private:
-    zemString formatDataTimeFilter(const tm* pStart, const tm* pEnd);
+    static std::string formatDataTimeFilter(const tm* pStart, const tm* pEnd);
 };
 
 #undef ZEM_QYUSAGE_SYS

@@ -30,9 +30,13 @@ public:
             quoted = readQuoted();
             field = m_pieces;
         }
-        m_next = m_next != m_end ? m_next + 1 : m_end;
+        m_hasMore = m_next != m_end;
+        m_next += m_hasMore ? 1 : 0;
         return !quoted;
     }
+
+    /// Whether the last field ended before the end of the record, so that one follows it.
+    bool hasMore() const { return m_hasMore; }
 
 private:
     /// Reads on up to the end of the field, from its first quote.
@@ -56,8 +60,14 @@ private:
 
     const char* m_next;
     const char* m_end;
+    bool m_hasMore = true;
     std::string& m_pieces;
 };
+
+zemString valueOf(std::string_view field) {
+    return field.empty() ? zemString()
+                         : zemString(field.data(), static_cast<unsigned>(field.size()));
+}
 
 /// What the records of one query have in common.
 class RecordMaker {
@@ -81,11 +91,8 @@ public:
             if (!fields.next(field)) {
                 return nullptr;
             }
-            value = zemString();
-            if (!field.empty()) {
-                value = zemString(field.data(), static_cast<unsigned>(field.size()));
-                ++texts;
-            }
+            value = valueOf(field);
+            texts += field.empty() ? 0 : 1;
         }
         auto record = std::make_unique<zemRecordType>(texts);
         for (size_t i = 0; i < m_values.size(); ++i) {
@@ -117,6 +124,19 @@ bool zemParseRecords(std::string_view output, const int* keys, unsigned count,
         }
         results.addElement(std::move(record));
         begin = end + 1;
+    }
+    return true;
+}
+
+bool zemParseFields(std::string_view record, zemDynamicArray<zemString>& fields) {
+    std::string pieces;
+    FieldReader reader(record, pieces);
+    while (reader.hasMore()) {
+        std::string_view field;
+        if (!reader.next(field)) {
+            return false;
+        }
+        fields.addElement(std::make_unique<zemString>(valueOf(field)));
     }
     return true;
 }

@@ -22,4 +22,8 @@
 bool zemParseRecords(std::string_view output, const int* keys, unsigned count,
                      zemRecordSetsType& results);
 
+/// Appends all fields of @p record, which is one whatever it holds, to @p fields: at least one.
+/// @return false when it ends inside a quoted run; the fields before that are in @p fields
+bool zemParseFields(std::string_view record, zemDynamicArray<zemString>& fields);
+
 #endif

@@ -59,6 +59,17 @@ zemString readUUID() {
 
 }  // namespace
 
+zemConfigObject::zemConfigObject(const char* requestUserContext, const char* locale)
+    : m_requestUserContext(requestUserContext), m_locale(locale) {}
+
+zemConfigObject::~zemConfigObject() = default;
+
+void zemConfigObject::need(OP_LEVEL level) {
+    if (!(level == OP_LEVEL_1 ? m_gotLevel1 : m_gotLevel2)) {
+        updateData(level);
+    }
+}
+
 bool zemManagerSystem::isEnableRemoteRelocation(const char* requestUserContext) {
     using Manager = zemQymoveCmdCaller::ManagerSystemAttribute;
     int wanted[] = {Manager::ATTR_REMOTE_LPAR_MOBILITY_CAPABLE, Manager::ATTR_END};

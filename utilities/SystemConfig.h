@@ -31,6 +31,40 @@ class zemHostSystem;
 class zemVirtualSystem;
 class zemVirtualSystemProfile;
 
+/// An object that reads what it lacks from the management library.
+class ZEM_EXPORT zemConfigObject {
+public:
+    enum OP_LEVEL { OP_LEVEL_1 = 1, OP_LEVEL_2 = 2, OP_LEVEL_ALL = 3 };
+
+    virtual ~zemConfigObject();
+
+    void setLocale(const char* locale) { m_locale = locale; }
+
+    /// The user under whom this object asks.
+    zemString getAuthorizedUser() const { return m_requestUserContext; }
+
+protected:
+    zemConfigObject() = default;
+    zemConfigObject(const char* requestUserContext, const char* locale);
+    zemConfigObject(const zemConfigObject&) = default;
+    zemConfigObject& operator=(const zemConfigObject&) = default;
+
+    /// Reads @p level, 1 or 2, unless that has been read.
+    void need(OP_LEVEL level);
+
+    /// The detail that the library is asked for: level 2 comprises level 1, so it is all.
+    static int detailOf(OP_LEVEL level) { return level == OP_LEVEL_ALL ? OP_LEVEL_2 : level; }
+
+    bool m_gotLevel1 = false;
+    bool m_gotLevel2 = false;
+    zemString m_requestUserContext;
+    zemString m_locale;
+
+private:
+    /// Reads this object.
+    virtual void updateData(OP_LEVEL level) = 0;
+};
+
 /// What is known of the appliance itself.
 class ZEM_EXPORT zemManagerSystem {
 public:
@@ -63,10 +97,8 @@ public:
 };
 
 /// One managed host.
-class ZEM_EXPORT zemHostSystem {
+class ZEM_EXPORT zemHostSystem : public zemConfigObject {
 public:
-    enum OP_LEVEL { OP_LEVEL_1 = 1, OP_LEVEL_2 = 2, OP_LEVEL_ALL = 3 };
-
     zemHostSystem() = default;
 
     /// @param prop  the host as the management library gives it
@@ -76,9 +108,7 @@ public:
     zemHostSystem(const zemString& mtms, const char* requestUserContext, const char* locale);
     zemHostSystem(const zemHostSystem&) = default;
     zemHostSystem& operator=(const zemHostSystem&) = default;
-    virtual ~zemHostSystem();
-
-    void setLocale(const char* locale) { m_locale = locale; }
+    ~zemHostSystem() override;
 
     /// The partitions of the host, and those among them that serve I/O to others.
     zemDynamicArray<zemVirtualSystem> getAllVirtualSystem();
@@ -106,9 +136,6 @@ public:
     /// Whether the appliance has a connection to the host.
     bool isConnected();
 
-    /// The user under whom this object asks.
-    zemString getAuthorizedUser() const { return m_requestUserContext; }
-
     /// What the host allows of migrations, active and inactive.
     /// @throws zemOperationFailedException the tool tells nothing
     bool isEnableInactiveMigration();
@@ -129,10 +156,9 @@ public:
     bool IsUnusedLparId(const zemString& lparId);
 
 private:
-    void updateData(OP_LEVEL level);
+    void updateData(OP_LEVEL level) override;
     void parseApiProp(apiProp& prop);
     void setMTMS(const zemString& mtms);
-    void needLevel1();
     zemString migrationCapability(int row, const char* method);
 
     /// The partitions of one environment, or all for null.
@@ -140,8 +166,6 @@ private:
 
     static int m_managedSystemInfoAttr[];
 
-    bool m_gotLevel1 = false;
-    bool m_gotLevel2 = false;
     zemString m_name;
     int m_state = 0;
     zemString m_primaryFspIP;
@@ -151,15 +175,11 @@ private:
     bool m_osq00Capable = false;
     zemString m_lparProcCompatModes;
     zemString m_ipmiPassThroughCapable;
-    zemString m_requestUserContext;
-    zemString m_locale;
 };
 
 /// One partition.
-class ZEM_EXPORT zemVirtualSystem {
+class ZEM_EXPORT zemVirtualSystem : public zemConfigObject {
 public:
-    enum OP_LEVEL { OP_LEVEL_1 = 1, OP_LEVEL_2 = 2, OP_LEVEL_ALL = 3 };
-
     zemVirtualSystem() = default;
 
     /// @param prop  the partition as the management library gives it; without @p host, the host is
@@ -173,9 +193,7 @@ public:
                      const char* requestUserContext, const char* locale);
     zemVirtualSystem(const zemVirtualSystem&) = default;
     zemVirtualSystem& operator=(const zemVirtualSystem&) = default;
-    virtual ~zemVirtualSystem();
-
-    void setLocale(const char* locale) { m_locale = locale; }
+    ~zemVirtualSystem() override;
 
     zemString getName();
     zemString getLparID() const { return m_lparId; }
@@ -261,9 +279,6 @@ public:
     zemDynamicArray<zemVirtualSystemProfile> getAllVirtualSystemProfiles();
     zemVirtualSystemProfile getVirtualSystemProfileByName(const zemString& profileName);
 
-    /// The user under whom this object asks.
-    zemString getAuthorizedUser() const { return m_requestUserContext; }
-
 private:
     friend class zemHostSystem;
 
@@ -275,18 +290,14 @@ private:
     /// The filter of the tools for this partition.
     zemString ownFilter() const;
 
-    void updateData(OP_LEVEL level);
+    void updateData(OP_LEVEL level) override;
     void parseApiProp(apiProp& prop);
-    void needLevel1();
-    void needLevel2();
     int change(int attributeIndex, const zemString& value, const char* method);
     std::string moveLine(char operation, const zemString& targetHost, bool isCrossManager,
                          const zemString& targetManager, const char* userName);
 
     static int m_virtualSystemInfoAttr[];
 
-    bool m_gotLevel1 = false;
-    bool m_gotLevel2 = false;
     zemString m_lparId;
     zemString m_lparName;
     zemString m_lparEnv;
@@ -299,15 +310,11 @@ private:
     int m_lparKeylock = 0;
     int m_migrationState = 0;
     zemHostSystem m_hostSystem;
-    zemString m_requestUserContext;
-    zemString m_locale;
 };
 
 /// One stored profile of a partition.
-class ZEM_EXPORT zemVirtualSystemProfile {
+class ZEM_EXPORT zemVirtualSystemProfile : public zemConfigObject {
 public:
-    enum OP_LEVEL { OP_LEVEL_1 = 1, OP_LEVEL_2 = 2, OP_LEVEL_ALL = 3 };
-
     enum IOResourceType {
         IORSC_TYPE_SCSIADAPTER = 0,
         IORSC_TYPE_SERIALADAPTER = 1,
@@ -326,13 +333,10 @@ public:
                             const char* requestUserContext, const char* locale);
     zemVirtualSystemProfile(const zemVirtualSystemProfile&) = default;
     zemVirtualSystemProfile& operator=(const zemVirtualSystemProfile&) = default;
-    virtual ~zemVirtualSystemProfile();
-
-    void setLocale(const char* locale) { m_locale = locale; }
+    ~zemVirtualSystemProfile() override;
 
     zemString getName() const { return m_profileName; }
     zemVirtualSystem getVirtualSystem() const { return m_virtualSystem; }
-    zemString getAuthorizedUser() const { return m_requestUserContext; }
 
     bool getConnMonitoring();
     bool getAutoStart();
@@ -379,22 +383,12 @@ public:
     int removeVirtualIOResources(const zemDynamicArray<tagAttributePair>& attrPairs);
 
 private:
-    void updateData(OP_LEVEL level);
+    void updateData(OP_LEVEL level) override;
     void parseApiProp(apiProp& prop);
-    void needLevel1();
-    void needLevel2();
     int change(const zemDynamicArray<tagAttributePair>& attrPairs,
                zemCommandCaller::CH_OP_TYPE operation);
 
-    template <class T>
-    T level2(T zemVirtualSystemProfile::*field) {
-        needLevel2();
-        return this->*field;
-    }
-
     zemString m_profileName;
-    bool m_gotLevel1 = false;
-    bool m_gotLevel2 = false;
     bool m_connMonitoring = false;
     int m_bootMode = 0;
     bool m_redundantPath = false;  ///< stays unset: the library has no such datum of profiles
@@ -416,8 +410,6 @@ private:
     int m_uncapWeight = -1;
     bool m_autoStart = false;
     zemVirtualSystem m_virtualSystem;
-    zemString m_requestUserContext;
-    zemString m_locale;
 };
 
 #endif

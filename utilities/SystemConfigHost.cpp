@@ -33,13 +33,13 @@ int zemHostSystem::m_managedSystemInfoAttr[] = {Host::ATTR_NAME,          Host::
                                                 Host::ATTR_OSQ00_CAPABLE, Host::ATTR_END};
 
 zemHostSystem::zemHostSystem(apiProp& prop, const char* requestUserContext, const char* locale)
-    : m_requestUserContext(requestUserContext), m_locale(locale) {
+    : zemConfigObject(requestUserContext, locale) {
     parseApiProp(prop);
 }
 
 zemHostSystem::zemHostSystem(const zemString& mtms, const char* requestUserContext,
                              const char* locale)
-    : m_requestUserContext(requestUserContext), m_locale(locale) {
+    : zemConfigObject(requestUserContext, locale) {
     setMTMS(mtms);
 }
 
@@ -52,59 +52,55 @@ void zemHostSystem::setMTMS(const zemString& mtms) {
 }
 
 void zemHostSystem::updateData(OP_LEVEL level) {
-    const int depth = level == OP_LEVEL_ALL ? OP_LEVEL_2 : level;
     // Not getMTMS(), which comes here for a host without a key.
     const zemString mtms = m_typeModel + "*" + m_serialNum;
     const zemApiReader reader = {kClass, "updateData", "getCecObj"};
-    const zemApiObjects hosts(reader, zemApiCaller().getCecObj(m_requestUserContext, mtms, depth));
+    const zemApiObjects hosts(
+        reader, zemApiCaller().getCecObj(m_requestUserContext, mtms, detailOf(level)));
     parseApiProp(hosts.only(mtms));
 }
 
 void zemHostSystem::parseApiProp(apiProp& prop) {
-    const zemApiProp host(&prop);
+    using Self = zemHostSystem;
+    static constexpr zemConfigField<Self> kLevel1[] = {
+        {"UserDefinedName", zemSetText<&Self::m_name>},
+        {"State", zemSetNumber<&Self::m_state>},
+        {"PrimaryFSP_IP", zemSetText<&Self::m_primaryFspIP>},
+        {"BackupFSP_IP", zemSetText<&Self::m_backupFspIP>},
+        {"Name", [](Self& host, const zemString& value) { host.setMTMS(value); }},
+        {"RuntimeCapability",
+         [](Self& host, const zemString& value) {
+             const auto bits = std::strtoull(value, nullptr, kBase);
+             host.m_osq00Capable = (bits >> kOsq00Bit & 1U) != 0;
+         }},
+    };
+    static constexpr zemConfigField<Self> kLevel2[] = {
+        {"ProcCompatModesSupported", zemSetText<&Self::m_lparProcCompatModes>},
+        {"Capability", zemSetText<&Self::m_ipmiPassThroughCapable>},
+    };
     m_gotLevel1 = true;
-    m_name = host.getProperty("UserDefinedName");
-    m_state = zemNumberOf(host.getProperty("State"));
-    m_primaryFspIP = host.getProperty("PrimaryFSP_IP");
-    m_backupFspIP = host.getProperty("BackupFSP_IP");
-    setMTMS(host.getProperty("Name"));
-    const zemString runtime = host.getProperty("RuntimeCapability");
-    m_osq00Capable = (std::strtoull(runtime, nullptr, kBase) >> kOsq00Bit & 1U) != 0;
+    zemReadApiFields(&prop, *this, kLevel1);
     if (zemApiProp::getProperty(&prop, "ProcCompatModesSupported") != nullptr) {
         m_gotLevel2 = true;
-        m_lparProcCompatModes = host.getProperty("ProcCompatModesSupported");
-        m_ipmiPassThroughCapable = host.getProperty("Capability");
-    }
-}
-
-void zemHostSystem::needLevel1() {
-    if (!m_gotLevel1) {
-        updateData(OP_LEVEL_1);
+        zemReadApiFields(&prop, *this, kLevel2);
     }
 }
 
 zemString zemHostSystem::getMTMS() {
-    if (!m_gotLevel1 && !m_gotLevel2 && m_typeModel.isEmpty()) {
-        updateData(OP_LEVEL_1);
+    if (m_typeModel.isEmpty()) {
+        need(OP_LEVEL_1);
     }
     return m_typeModel + "*" + m_serialNum;
 }
 
-/// A getter of what identity and state tell.
-#define ZEM_HOST_GETTER(TYPE, NAME, FIELD) \
-    TYPE zemHostSystem::NAME() {           \
-        needLevel1();                      \
-        return FIELD;                      \
-    }
-
-ZEM_HOST_GETTER(zemString, getSystemName, m_name)
-ZEM_HOST_GETTER(zemString, getTypeModel, m_typeModel)
-ZEM_HOST_GETTER(zemString, getSerialNumber, m_serialNum)
-ZEM_HOST_GETTER(zemString, getPrimaryFSPIP, m_primaryFspIP)
-ZEM_HOST_GETTER(zemString, getBackupFSPIP, m_backupFspIP)
-ZEM_HOST_GETTER(int, getState, m_state)
-ZEM_HOST_GETTER(bool, getOsq00Capable, m_osq00Capable)
-ZEM_HOST_GETTER(bool, isConnected, m_state != kNoConnection)
+ZEM_CONFIG_GETTER(zemHostSystem, zemString, getSystemName, 1, m_name)
+ZEM_CONFIG_GETTER(zemHostSystem, zemString, getTypeModel, 1, m_typeModel)
+ZEM_CONFIG_GETTER(zemHostSystem, zemString, getSerialNumber, 1, m_serialNum)
+ZEM_CONFIG_GETTER(zemHostSystem, zemString, getPrimaryFSPIP, 1, m_primaryFspIP)
+ZEM_CONFIG_GETTER(zemHostSystem, zemString, getBackupFSPIP, 1, m_backupFspIP)
+ZEM_CONFIG_GETTER(zemHostSystem, int, getState, 1, m_state)
+ZEM_CONFIG_GETTER(zemHostSystem, bool, getOsq00Capable, 1, m_osq00Capable)
+ZEM_CONFIG_GETTER(zemHostSystem, bool, isConnected, 1, m_state != kNoConnection)
 
 zemString zemHostSystem::getStateByID(int state) { return zemHostStateText(state); }
 

@@ -61,13 +61,13 @@ int zemVirtualSystem::m_virtualSystemInfoAttr[] = {Partition::ATTR_LPAR_ID,
 
 zemVirtualSystem::zemVirtualSystem(apiProp& prop, const zemHostSystem& host,
                                    const char* requestUserContext, const char* locale)
-    : m_hostSystem(host), m_requestUserContext(requestUserContext), m_locale(locale) {
+    : zemConfigObject(requestUserContext, locale), m_hostSystem(host) {
     parseApiProp(prop);
 }
 
 zemVirtualSystem::zemVirtualSystem(apiProp& prop, const char* requestUserContext,
                                    const char* locale)
-    : m_requestUserContext(requestUserContext), m_locale(locale) {
+    : zemConfigObject(requestUserContext, locale) {
     const zemString key = zemApiProp(&prop).getProperty("Name");
     m_hostSystem = zemHostSystem(key.extractSubstring(static_cast<unsigned>(key.find('*') + 1)),
                                  requestUserContext, locale);
@@ -76,55 +76,56 @@ zemVirtualSystem::zemVirtualSystem(apiProp& prop, const char* requestUserContext
 
 zemVirtualSystem::zemVirtualSystem(const zemString& lparId, const zemHostSystem& host,
                                    const char* requestUserContext, const char* locale)
-    : m_lparId(lparId),
-      m_hostSystem(host),
-      m_requestUserContext(requestUserContext),
-      m_locale(locale) {}
+    : zemConfigObject(requestUserContext, locale), m_lparId(lparId), m_hostSystem(host) {}
 
 zemVirtualSystem::~zemVirtualSystem() = default;
 
 void zemVirtualSystem::updateData(OP_LEVEL level) {
-    const int depth = level == OP_LEVEL_ALL ? OP_LEVEL_2 : level;
     const zemString key = getLparIDAndMTMS();
     const zemApiReader reader = {kClass, "updateData", "getLparObj"};
-    const zemApiObjects partitions(reader,
-                                   zemApiCaller().getLparObj(m_requestUserContext, key, depth));
+    const zemApiObjects partitions(
+        reader, zemApiCaller().getLparObj(m_requestUserContext, key, detailOf(level)));
     parseApiProp(partitions.only(key));
 }
 
 void zemVirtualSystem::parseApiProp(apiProp& prop) {
-    const zemApiProp partition(&prop);
-    const zemString key = partition.getProperty("Name");
-    m_lparId = key.extractSubstring(0, static_cast<unsigned>(key.find('*')));
-    m_lparName = partition.getProperty("UserDefinedName");
-    const zemString definition = partition.getProperty("DefinitionState");
-    m_lparEnv = zemEnvironmentText(zemNumberOf(definition));
-    if (m_lparEnv.isEmpty()) {
-        m_lparEnv = definition;
-    }
-    m_lparState = zemNumberOf(partition.getProperty("PartitionState"));
-    m_bootMode = zemNumberOf(partition.getProperty("BootMode"));
-    m_migrationState = zemNumberOf(partition.getProperty("MigrationState"));
+    using Self = zemVirtualSystem;
+    static constexpr zemConfigField<Self> kFields[] = {
+        {"Name",
+         [](Self& partition, const zemString& key) {
+             partition.m_lparId = key.extractSubstring(0, static_cast<unsigned>(key.find('*')));
+         }},
+        {"UserDefinedName", zemSetText<&Self::m_lparName>},
+        {"DefinitionState",
+         [](Self& partition, const zemString& state) {
+             const zemString environment(zemEnvironmentText(zemNumberOf(state)));
+             partition.m_lparEnv = environment.isEmpty() ? state : environment;
+         }},
+        {"PartitionState", zemSetNumber<&Self::m_lparState>},
+        {"BootMode", zemSetNumber<&Self::m_bootMode>},
+        {"MigrationState", zemSetNumber<&Self::m_migrationState>},
+        {"RedundantPath",
+         [](Self& partition, const zemString& state) {
+             partition.m_redundantPath = zemNumberOf(state) == 0;  // 0 is on
+         }},
+        {"Keylock", zemSetNumber<&Self::m_lparKeylock>},
+        {"ProcCompatMode", zemSetText<&Self::m_procCompatMode>},
+    };
+    static constexpr zemConfigField<Self> kLevel2[] = {
+        {"Default_prof",
+         [](Self& partition, const zemString& profile) {
+             partition.m_defaultProfile = profileNameOf(profile);
+         }},
+        {"Curr_prof",
+         [](Self& partition, const zemString& profile) {
+             partition.m_currProfile = profileNameOf(profile);
+         }},
+    };
     m_gotLevel1 = true;
+    zemReadApiFields(&prop, *this, kFields);
     if (zemApiProp::getProperty(&prop, "Default_prof") != nullptr) {
         m_gotLevel2 = true;
-        m_defaultProfile = profileNameOf(partition.getProperty("Default_prof"));
-        m_currProfile = profileNameOf(partition.getProperty("Curr_prof"));
-    }
-    m_redundantPath = zemNumberOf(partition.getProperty("RedundantPath")) == 0;  // 0 is on
-    m_lparKeylock = zemNumberOf(partition.getProperty("Keylock"));
-    m_procCompatMode = partition.getProperty("ProcCompatMode");
-}
-
-void zemVirtualSystem::needLevel1() {
-    if (!m_gotLevel1) {
-        updateData(OP_LEVEL_1);
-    }
-}
-
-void zemVirtualSystem::needLevel2() {
-    if (!m_gotLevel2) {
-        updateData(OP_LEVEL_2);
+        zemReadApiFields(&prop, *this, kLevel2);
     }
 }
 
@@ -134,28 +135,22 @@ zemString zemVirtualSystem::ownFilter() const {
 
 zemString zemVirtualSystem::getLparIDAndMTMS() { return m_lparId + "*" + getMTMS(); }
 
-/// A getter of what a level tells.
-#define ZEM_PARTITION_GETTER(TYPE, NAME, LEVEL, VALUE) \
-    TYPE zemVirtualSystem::NAME() {                    \
-        needLevel##LEVEL();                            \
-        return VALUE;                                  \
-    }
-
-ZEM_PARTITION_GETTER(zemString, getName, 1, m_lparName)
-ZEM_PARTITION_GETTER(zemString, getEnv, 1, m_lparEnv)
-ZEM_PARTITION_GETTER(bool, isXBRG, 1, m_lparEnv == "xbrgserver")
-ZEM_PARTITION_GETTER(bool, isOSQ00, 1, m_lparEnv == "osq00")
-ZEM_PARTITION_GETTER(int, getState, 1, m_lparState)
-ZEM_PARTITION_GETTER(bool, isLive, 1, m_lparState != kNotActivated)
-ZEM_PARTITION_GETTER(int, getBootMode, 1, m_bootMode)
-ZEM_PARTITION_GETTER(int, getMigrationState, 1, zemMigrationStateOf(m_migrationState))
-ZEM_PARTITION_GETTER(zemString, getMigrationStateString, 1,
-                     zemMigrationStateText(zemMigrationStateOf(m_migrationState)))
-ZEM_PARTITION_GETTER(zemString, getDefaultProfileName, 2, m_defaultProfile)
-ZEM_PARTITION_GETTER(zemString, getCurrentProfileName, 2, m_currProfile)
-ZEM_PARTITION_GETTER(zemString, getProcCompatMode, 2, m_procCompatMode)
-ZEM_PARTITION_GETTER(int, getKeyLock, 2, zemKeylockOf(m_lparKeylock))
-ZEM_PARTITION_GETTER(bool, getRedundantPath, 2, m_redundantPath)
+ZEM_CONFIG_GETTER(zemVirtualSystem, zemString, getName, 1, m_lparName)
+ZEM_CONFIG_GETTER(zemVirtualSystem, zemString, getEnv, 1, m_lparEnv)
+ZEM_CONFIG_GETTER(zemVirtualSystem, bool, isXBRG, 1, m_lparEnv == "xbrgserver")
+ZEM_CONFIG_GETTER(zemVirtualSystem, bool, isOSQ00, 1, m_lparEnv == "osq00")
+ZEM_CONFIG_GETTER(zemVirtualSystem, int, getState, 1, m_lparState)
+ZEM_CONFIG_GETTER(zemVirtualSystem, bool, isLive, 1, m_lparState != kNotActivated)
+ZEM_CONFIG_GETTER(zemVirtualSystem, int, getBootMode, 1, m_bootMode)
+ZEM_CONFIG_GETTER(zemVirtualSystem, int, getMigrationState, 1,
+                  zemMigrationStateOf(m_migrationState))
+ZEM_CONFIG_GETTER(zemVirtualSystem, zemString, getMigrationStateString, 1,
+                  zemMigrationStateText(zemMigrationStateOf(m_migrationState)))
+ZEM_CONFIG_GETTER(zemVirtualSystem, zemString, getDefaultProfileName, 2, m_defaultProfile)
+ZEM_CONFIG_GETTER(zemVirtualSystem, zemString, getCurrentProfileName, 2, m_currProfile)
+ZEM_CONFIG_GETTER(zemVirtualSystem, zemString, getProcCompatMode, 2, m_procCompatMode)
+ZEM_CONFIG_GETTER(zemVirtualSystem, int, getKeyLock, 2, zemKeylockOf(m_lparKeylock))
+ZEM_CONFIG_GETTER(zemVirtualSystem, bool, getRedundantPath, 2, m_redundantPath)
 
 zemString zemVirtualSystem::getStateByID(int state) { return zemPartitionStateText(state); }
 

@@ -1,10 +1,8 @@
-#include <algorithm>
 #include <iterator>
 #include <memory>
 #include <string>
 #include <string_view>
 
-#include "DNXApiCaller.h"
 #include "EdplatCmdCaller.h"
 #include "QyplatCmdCaller.h"
 #include "RecordParser.h"
@@ -19,9 +17,17 @@ using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
 
 bool isNone(const zemString& text) { return zemString::equalsIgnoreCase(text, "none"); }
 
+/// A list, of which the library's "none" is the empty one.
+template <auto field>
+void setList(zemVirtualSystemProfile& profile, const zemString& value) {
+    profile.*field = isNone(value) ? zemString() : value;
+}
+
 /// A number, of which -1 says that there is none.
-int quantityOf(const zemString& text) {
-    return text.isEmpty() || zemString::equalsIgnoreCase(text, "null") ? -1 : zemNumberOf(text);
+template <auto field>
+void setQuantity(zemVirtualSystemProfile& profile, const zemString& value) {
+    const bool isGiven = !value.isEmpty() && !zemString::equalsIgnoreCase(value, "null");
+    profile.*field = isGiven ? zemNumberOf(value) : -1;
 }
 
 }  // namespace
@@ -29,137 +35,99 @@ int quantityOf(const zemString& text) {
 zemVirtualSystemProfile::zemVirtualSystemProfile(apiProp& prop,
                                                  const zemVirtualSystem& virtualSystem,
                                                  const char* requestUserContext, const char* locale)
-    : m_virtualSystem(virtualSystem), m_requestUserContext(requestUserContext), m_locale(locale) {
+    : zemConfigObject(requestUserContext, locale), m_virtualSystem(virtualSystem) {
     parseApiProp(prop);
 }
 
 zemVirtualSystemProfile::zemVirtualSystemProfile(const zemString& profileName,
                                                  const zemVirtualSystem& virtualSystem,
                                                  const char* requestUserContext, const char* locale)
-    : m_profileName(profileName),
-      m_virtualSystem(virtualSystem),
-      m_requestUserContext(requestUserContext),
-      m_locale(locale) {}
+    : zemConfigObject(requestUserContext, locale),
+      m_profileName(profileName),
+      m_virtualSystem(virtualSystem) {}
 
 zemVirtualSystemProfile::~zemVirtualSystemProfile() = default;
 
 void zemVirtualSystemProfile::updateData(OP_LEVEL level) {
-    const int depth = level == OP_LEVEL_ALL ? OP_LEVEL_2 : level;
     const zemApiReader reader = {kClass, "updateData", "getLparProfile"};
     const zemApiObjects profiles(
         reader,
         zemApiCaller().getLparProfile(m_requestUserContext, m_virtualSystem.getLparIDAndMTMS(),
-                                      m_profileName, depth));
+                                      m_profileName, detailOf(level)));
     parseApiProp(profiles.only(m_profileName));
 }
 
 void zemVirtualSystemProfile::parseApiProp(apiProp& prop) {
     using Self = zemVirtualSystemProfile;
-    static constexpr struct {
-        const char* key;
-        zemString Self::*field;
-        bool isList;
-    } kTexts[] = {
-        {"virtual_serial_adapters", &Self::m_virtualSerialAdapters, true},
-        {"virtual_scsi_adapters", &Self::m_virtualScsiAdapters, true},
-        {"virtual_eth_adapters", &Self::m_virtualEthAdapters, true},
-        {"io_slots", &Self::m_ioSlots, true},
-        {"ProcMode", &Self::m_procMode, false},
-        {"SharingMode", &Self::m_sharingMode, false},
+    static constexpr zemConfigField<Self> kLevel1[] = {
+        {"UserDefinedName", zemSetText<&Self::m_profileName>},
+        {"SFPSurveillance", zemSetFlag<&Self::m_connMonitoring>},
     };
-    static constexpr struct {
-        const char* key;
-        int Self::*field;
-    } kQuantities[] = {
-        {"MinProcUnit", &Self::m_minProcUnits},     {"DesiredProcUnit", &Self::m_desiredProcUnits},
-        {"MaxProcUnit", &Self::m_maxProcUnits},     {"MinimumCPUCount", &Self::m_minProcs},
-        {"DesiredCPUCount", &Self::m_desiredProcs}, {"MaximumCPUCount", &Self::m_maxProcs},
-        {"MinimumMemory", &Self::m_minMem},         {"DesiredMemory", &Self::m_desiredMem},
-        {"MaximumMemory", &Self::m_maxMem},         {"UncappedWeight", &Self::m_uncapWeight},
+    static constexpr zemConfigField<Self> kLevel2[] = {
+        {"BootMode", zemSetNumber<&Self::m_bootMode>},
+        {"virtual_serial_adapters", setList<&Self::m_virtualSerialAdapters>},
+        {"virtual_scsi_adapters", setList<&Self::m_virtualScsiAdapters>},
+        {"virtual_eth_adapters", setList<&Self::m_virtualEthAdapters>},
+        {"io_slots", setList<&Self::m_ioSlots>},
+        {"ProcMode", zemSetText<&Self::m_procMode>},
+        {"SharingMode", zemSetText<&Self::m_sharingMode>},
+        {"MinProcUnit", setQuantity<&Self::m_minProcUnits>},
+        {"DesiredProcUnit", setQuantity<&Self::m_desiredProcUnits>},
+        {"MaxProcUnit", setQuantity<&Self::m_maxProcUnits>},
+        {"MinimumCPUCount", setQuantity<&Self::m_minProcs>},
+        {"DesiredCPUCount", setQuantity<&Self::m_desiredProcs>},
+        {"MaximumCPUCount", setQuantity<&Self::m_maxProcs>},
+        {"MinimumMemory", setQuantity<&Self::m_minMem>},
+        {"DesiredMemory", setQuantity<&Self::m_desiredMem>},
+        {"MaximumMemory", setQuantity<&Self::m_maxMem>},
+        {"UncappedWeight", setQuantity<&Self::m_uncapWeight>},
+        {"AutoIPLEnabled", zemSetFlag<&Self::m_autoStart>},
     };
-    const zemApiProp profile(&prop);
-    m_profileName = profile.getProperty("UserDefinedName");
-    m_connMonitoring = zemNumberOf(profile.getProperty("SFPSurveillance")) == 1;
     m_gotLevel1 = true;
-    if (zemApiProp::getProperty(&prop, "BootMode") == nullptr) {
-        return;
-    }
-    m_gotLevel2 = true;
-    m_bootMode = zemNumberOf(profile.getProperty("BootMode"));
-    for (const auto& row : kTexts) {
-        const zemString text = profile.getProperty(row.key);
-        this->*row.field = row.isList && isNone(text) ? zemString() : text;
-    }
-    for (const auto& row : kQuantities) {
-        this->*row.field = quantityOf(profile.getProperty(row.key));
-    }
-    m_autoStart = zemNumberOf(profile.getProperty("AutoIPLEnabled")) == 1;
-}
-
-void zemVirtualSystemProfile::needLevel1() {
-    if (!m_gotLevel1) {
-        updateData(OP_LEVEL_1);
+    zemReadApiFields(&prop, *this, kLevel1);
+    if (zemApiProp::getProperty(&prop, "BootMode") != nullptr) {
+        m_gotLevel2 = true;
+        zemReadApiFields(&prop, *this, kLevel2);
     }
 }
 
-void zemVirtualSystemProfile::needLevel2() {
-    if (!m_gotLevel2) {
-        updateData(OP_LEVEL_2);
-    }
-}
-
-bool zemVirtualSystemProfile::getConnMonitoring() {
-    needLevel1();
-    return m_connMonitoring;
-}
-
-/// A getter of what level 2 tells.
-#define ZEM_PROFILE_GETTER(TYPE, NAME, FIELD) \
-    TYPE zemVirtualSystemProfile::NAME() { return level2(&zemVirtualSystemProfile::FIELD); }
-
-ZEM_PROFILE_GETTER(bool, getAutoStart, m_autoStart)
-ZEM_PROFILE_GETTER(int, getBootMode, m_bootMode)
-ZEM_PROFILE_GETTER(zemString, getProcMode, m_procMode)
-ZEM_PROFILE_GETTER(zemString, getSharingMode, m_sharingMode)
-ZEM_PROFILE_GETTER(int, getMinProcUnits, m_minProcUnits)
-ZEM_PROFILE_GETTER(int, getDesiredProcUnits, m_desiredProcUnits)
-ZEM_PROFILE_GETTER(int, getMaxProcUnits, m_maxProcUnits)
-ZEM_PROFILE_GETTER(int, getMinProcs, m_minProcs)
-ZEM_PROFILE_GETTER(int, getDesiredProcs, m_desiredProcs)
-ZEM_PROFILE_GETTER(int, getMaxProcs, m_maxProcs)
-ZEM_PROFILE_GETTER(int, getMinMem, m_minMem)
-ZEM_PROFILE_GETTER(int, getDesiredMem, m_desiredMem)
-ZEM_PROFILE_GETTER(int, getMaxMem, m_maxMem)
-ZEM_PROFILE_GETTER(int, getUncapWeight, m_uncapWeight)
-ZEM_PROFILE_GETTER(zemString, getVirtualSerialAdapterString, m_virtualSerialAdapters)
-ZEM_PROFILE_GETTER(zemString, getVirtualSCSIAdapterString, m_virtualScsiAdapters)
-ZEM_PROFILE_GETTER(zemString, getVirtualEthernetAdapterString, m_virtualEthAdapters)
-ZEM_PROFILE_GETTER(zemString, getIOSlotAdapterString, m_ioSlots)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, bool, getConnMonitoring, 1, m_connMonitoring)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, bool, getAutoStart, 2, m_autoStart)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getBootMode, 2, m_bootMode)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getProcMode, 2, m_procMode)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getSharingMode, 2, m_sharingMode)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMinProcUnits, 2, m_minProcUnits)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getDesiredProcUnits, 2, m_desiredProcUnits)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMaxProcUnits, 2, m_maxProcUnits)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMinProcs, 2, m_minProcs)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getDesiredProcs, 2, m_desiredProcs)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMaxProcs, 2, m_maxProcs)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMinMem, 2, m_minMem)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getDesiredMem, 2, m_desiredMem)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMaxMem, 2, m_maxMem)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getUncapWeight, 2, m_uncapWeight)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getVirtualSerialAdapterString, 2,
+                  m_virtualSerialAdapters)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getVirtualSCSIAdapterString, 2,
+                  m_virtualScsiAdapters)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getVirtualEthernetAdapterString, 2,
+                  m_virtualEthAdapters)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getIOSlotAdapterString, 2, m_ioSlots)
 
 zemDynamicArray<zemString> zemVirtualSystemProfile::getVirtualIOResources(IOResourceType rscType) {
-    static constexpr zemString zemVirtualSystemProfile::*kLists[] = {
-        &zemVirtualSystemProfile::m_virtualScsiAdapters,
-        &zemVirtualSystemProfile::m_virtualSerialAdapters,
-        &zemVirtualSystemProfile::m_virtualEthAdapters, &zemVirtualSystemProfile::m_ioSlots};
-    const auto row = static_cast<std::size_t>(rscType);
-    const zemString list = row < std::size(kLists) ? level2(kLists[row]) : zemString();
+    using Self = zemVirtualSystemProfile;
+    static constexpr zemString Self::*kLists[] = {&Self::m_virtualScsiAdapters,
+                                                  &Self::m_virtualSerialAdapters,
+                                                  &Self::m_virtualEthAdapters, &Self::m_ioSlots};
     zemDynamicArray<zemString> elements;
-    if (list.isEmpty() || isNone(list)) {
+    const auto row = static_cast<std::size_t>(rscType);
+    if (row >= std::size(kLists)) {
         return elements;
     }
-    // A doubled quote opens and closes as two: what matters here is being inside or not.
-    const std::string_view text(list);
-    bool quoted = false;
-    const auto parts = std::count_if(text.begin(), text.end(), [&quoted](char c) {
-        quoted ^= c == '"';
-        return c == ',' && !quoted;
-    });
-    zemRecordSetsType records(0, 1, 1);
-    if (!zemParseRecords(text, nullptr, static_cast<unsigned>(parts) + 1, records)) {
+    need(OP_LEVEL_2);
+    const zemString& list = this->*kLists[row];
+    if (!list.isEmpty() && !zemParseFields(std::string_view(list), elements)) {
         throw zemOperationFailedException(kClass, "getVirtualIOResources", "INVALID_RECORD", list);
-    }
-    for (int i = 0; i <= parts; ++i) {
-        elements.addElement(std::make_unique<zemString>((*records.getElementAt(0))[i]));
     }
     return elements;
 }

@@ -1,5 +1,5 @@
-/// What the sources of the configuration objects share: numbers in texts, and how the failures of
-/// tools become failures of these objects.
+/// What the sources of the configuration objects share: how data of the management library become
+/// fields, and failures of tools become failures of these objects.
 ///
 /// Functions without state; any thread may call them.
 #ifndef SYSTEM_CONFIG_SUPPORT_H
@@ -9,6 +9,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "DNXApiCaller.h"
 #include "Exception.h"
 #include "StringUtils.h"
 
@@ -25,6 +26,31 @@ inline void zemExpectAttribute(int index, const char* throwClass, const char* th
                                            zemString(index));
     }
 }
+
+/// One datum of the management library, and what an object makes of it.
+template <class Object>
+using zemConfigField = zemApiField<void (*)(Object&, const zemString&)>;
+
+/// What most objects make of a datum: a text, a number, or whether it is the number 1.
+template <auto field, class Object>
+void zemSetText(Object& object, const zemString& value) {
+    object.*field = value;
+}
+template <auto field, class Object>
+void zemSetNumber(Object& object, const zemString& value) {
+    object.*field = zemNumberOf(value);
+}
+template <auto field, class Object>
+void zemSetFlag(Object& object, const zemString& value) {
+    object.*field = zemNumberOf(value) == 1;
+}
+
+/// A getter of CLASS that tells VALUE, which takes the level LEVEL.
+#define ZEM_CONFIG_GETTER(CLASS, TYPE, NAME, LEVEL, VALUE) \
+    TYPE CLASS::NAME() {                                   \
+        need(OP_LEVEL_##LEVEL);                            \
+        return VALUE;                                      \
+    }
 
 /// Ids by which the query tool and the change tools say that there is no such object.
 constexpr const char* kUnknownToQueries[] = {"WRTL8018", "WRTL8011"};

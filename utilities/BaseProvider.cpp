@@ -2,6 +2,15 @@
 
 #include "AtomicType.h"
 #include "BaseProviderText.h"
+#include "LetUnwind.h"
+#include "ServerCall.h"
+
+namespace {
+
+/// Texts of clients and tools may be of any length, what a client is told is not.
+constexpr size_t kMaxMessage = 16384;
+
+}  // namespace
 
 int getID() {
     static zemAtomicType<int> counter(0);
@@ -28,7 +37,10 @@ zemBaseProvider::zemBaseProvider(const CmpiBroker& mb, const CmpiContext& ctx,
                       static_cast<const void*>(PROV_TRACE_BROKER->xft));
 }
 
-zemBaseProvider::~zemBaseProvider() { traceDefault("~zemBaseProvider"); }
+zemBaseProvider::~zemBaseProvider() {
+    const zemUncancelled uncancelled;
+    traceDefault("~zemBaseProvider");
+}
 
 CmpiStatus zemBaseProvider::initialize(const CmpiContext&) {
     traceDefault(__func__);
@@ -80,17 +92,19 @@ CmpiStatus zemBaseProvider::returnOK() const { return CmpiStatus(CMPI_RC_OK); }
 
 CmpiStatus zemBaseProvider::returnStatus(CMPIrc rc, const char* text) const {
     CMPIBroker* raw = rawBroker();
-    if (raw == nullptr || raw->eft == nullptr || raw->eft->newString == nullptr) {
-        return CmpiStatus(rc);
-    }
-    const CMPIStatus status = {rc, raw->eft->newString(raw, text, nullptr)};
+    if (raw == nullptr) return CmpiStatus(rc);
+    const zemString message = zemShortened(text, kMaxMessage);
+    CMPIString* const none = nullptr;
+    const CMPIStatus status = {rc, zemCallServer(raw->eft, &CMPIBrokerEncFT::newString, none, raw,
+                                                 static_cast<const char*>(message), nullptr)};
     return CmpiStatus(status);
 }
 
 void zemBaseProvider::trace(const char* text) const {
     CMPIBroker* raw = rawBroker();
-    if (raw == nullptr || raw->eft == nullptr || raw->eft->trace == nullptr) return;
-    raw->eft->trace(raw, static_cast<CMPILevel>(0), "ProviderAgent", text, nullptr);
+    if (raw == nullptr) return;
+    zemCallServer(raw->eft, &CMPIBrokerEncFT::trace, kZemNotServed, raw, static_cast<CMPILevel>(0),
+                  "ProviderAgent", text, nullptr);
 }
 
 CMPIBroker* zemBaseProvider::rawBroker() const {

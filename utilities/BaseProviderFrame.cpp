@@ -19,6 +19,9 @@ enum KeyTest { kNoKeys, kOnPath, kOnPathOrInstance, kOnInstance };
 
 enum ResultEnd { kNotDone, kDone };
 
+/// How a success is told of: the exit line and the end of the timing, or the other way round.
+enum Leaving { kTimedThenTraced, kTracedThenTimed };
+
 /// What becomes of a failure. A switch is ordinary, but traces no exit, whatever its outcome.
 enum Rule { kOrdinary, kEnumeration, kWrapped, kSwitch };
 
@@ -39,6 +42,7 @@ struct zemOperationRow {
     KeyTest keys;
     ResultEnd resultEnd;
     Rule rule;
+    Leaving leaving = kTimedThenTraced;
 };
 
 namespace {
@@ -46,9 +50,9 @@ namespace {
 // The outer getInstance has a key mark of its own, which tells the two layers apart in the log.
 // clang-format off
 constexpr zemOperationRow kRows[] = {
-    // method              key mark   disabled   banner                          class test      error name            essential keys     result end  failures
+    // method              key mark   disabled   banner                          class test      error name            essential keys     result end  failures      success
     {"getInstance",        "-4-",     kNotFound, nullptr,                        kAny,           "getInstance",        kNoKeys,           kDone,      kOrdinary},
-    {"getInstance",        "-",       kNotFound, "GET INSTANCE: %s",             kInstance,      "getInstance",        kOnPath,           kNotDone,   kOrdinary},
+    {"getInstance",        "-",       kNotFound, "GET INSTANCE: %s",             kInstance,      "getInstance",        kOnPath,           kNotDone,   kOrdinary,    kTracedThenTimed},
     {"enumInstances",      "-",       kNothing,  "ENUMERATE INSTANCES: %s",      kInstance,      "enumerateInstances", kNoKeys,           kDone,      kEnumeration},
     {"enumInstanceNames",  "-",       kNothing,  "ENUMERATE INSTANCE NAMES: %s", kInstance,      "enumInstanceNames",  kNoKeys,           kDone,      kEnumeration},
     {"setInstance",        kUntimed,  kNotAsked, "SET INSTANCE: %s",             kNoAssociation, "modifyInstance",     kOnPathOrInstance, kNotDone,   kOrdinary},
@@ -58,7 +62,7 @@ constexpr zemOperationRow kRows[] = {
     {"associatorNames",    "-",       kNothing,  "ASSOCIATOR NAMES: %s",         kFilterClass,   "associatorNames",    kNoKeys,           kDone,      kOrdinary},
     {"references",         "-",       kNothing,  "REFERENCES: %s",               kFilterClass,   "references",         kNoKeys,           kDone,      kOrdinary},
     {"referenceNames",     "-",       kNothing,  "REFERENCE NAMES: %s",          kFilterClass,   "referenceNames",     kNoKeys,           kDone,      kOrdinary},
-    {"invokeMethod",       kBareName, kNotAsked, "INVOKE METHOD %s: %s",         kMethod,        "invokeMethod",       kNoKeys,           kDone,      kWrapped},
+    {"invokeMethod",       kBareName, kNotAsked, "INVOKE METHOD %s: %s",         kMethod,        "invokeMethod",       kNoKeys,           kDone,      kWrapped,     kTracedThenTimed},
     {"getProperty",        kUntimed,  kNotAsked, nullptr,                        kInstance,      "getProperty",        kOnPath,           kDone,      kOrdinary},
     {"setProperty",        kUntimed,  kNotAsked, nullptr,                        kNoAssociation, "setProperty",        kOnPath,           kDone,      kOrdinary},
     {"mustPoll",           kUntimed,  kNotAsked, nullptr,                        kIndication,    "mustPoll",           kNoKeys,           kNotDone,   kOrdinary},
@@ -69,6 +73,9 @@ constexpr zemOperationRow kRows[] = {
     {"disableIndications", kUntimed,  kNotAsked, nullptr,                        kAny,           "disableIndications", kNoKeys,           kNotDone,   kSwitch},
 };
 // clang-format on
+
+/// How much of a key that is too long a client is shown.
+constexpr size_t kShownKey = 64;
 
 constexpr const char* kDisabledText =
     "The XBRG is managed by DNX, this provider on the XGRB in dissabled.";
@@ -127,7 +134,10 @@ bool zemOperationFrame::admit() {
         endTiming(m_timingKey);
         m_provider.throwObjectNotFoundExc("getInstance", "zemBaseProvider", kDisabledText);
     }
-    if (m_row.banner != nullptr) traceBanner();
+    const zemString path =
+        m_path != nullptr ? zemBaseProvider::objectPathToString(*m_path) : zemString();
+    if (path.length() > kZemPrintable) refuseKeys();
+    if (m_row.banner != nullptr) traceBanner(path);
     if (m_filterLabel != nullptr) logFilter();
     testClass();
     if (m_row.keys != kNoKeys) testKeys();
@@ -135,8 +145,9 @@ bool zemOperationFrame::admit() {
 }
 
 void zemOperationFrame::leave() {
+    if (m_row.leaving == kTracedThenTimed) traceExit();
     endTiming(m_timingKey);
-    traceExit();
+    if (m_row.leaving == kTimedThenTraced) traceExit();
 }
 
 std::string zemOperationFrame::timingKey() const {
@@ -163,9 +174,30 @@ void zemOperationFrame::traceStatus(const CmpiStatus& status) const {
                       zemOrEmpty(status.msg()));
 }
 
-void zemOperationFrame::traceBanner() const {
+// The status itself is thrown: a method must not wrap it.
+void zemOperationFrame::refuseKeys() const {
+    zemString key, value;
+    const unsigned count = m_path->getKeyCount();
+    for (unsigned i = 0; i < count; ++i) {
+        CmpiString name;
+        const CmpiData data = m_path->getKey(static_cast<int>(i), &name);
+        zemString text;
+        if (!zemReadText(data, text)) text = zemBaseProvider::cmpidata2String(data);
+        if (text.length() < value.length()) continue;
+        key = zemTextOf(name);
+        value = text;
+    }
+    try {
+        m_provider.throwInvalidMethodArgValueExc(zemShortened(key, kShownKey),
+                                                 zemShortened(value, kShownKey), m_row.errName);
+    } catch (const zemInvalidParameterException& failure) {
+        throw m_provider.handleException(m_row.errName, failure);
+    }
+}
+
+void zemOperationFrame::traceBanner(zemString path) const {
     PROV_TRACE_LOCALS_OF(m_provider);
-    const zemString path = zemPathText(*m_path);
+    zemPrint(*m_path, path);
     if (m_method != nullptr) {
         PROV_TRACE_STRING(4, m_row.banner, m_method, static_cast<const char*>(path));
     } else {

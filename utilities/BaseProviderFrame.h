@@ -77,7 +77,8 @@ public:
 private:
     std::string timingKey() const;
     void endTiming(const std::string& key) const;
-    void traceBanner() const;
+    [[noreturn]] void refuseKeys() const;
+    void traceBanner(zemString path) const;
     void logFilter() const;
     void testClass();
     void testKeys();

@@ -276,14 +276,16 @@ void zemBaseProviderManager::forget(BaseMIItem* item, const zemString& name) {
         }
     }
 
-    const std::string prefix = "zemBaseProviderManager::cleanupMI:";
-    zemLog::LogPlain((prefix + std::to_string(m_baseMIList.size())).c_str());
-    for (int i = 0; i < m_baseMIList.size(); ++i) {
-        const BaseMIItem* left = m_baseMIList[i];
-        const std::string line =
-            prefix + left->m_miName + ";count=" + std::to_string(left->m_miCount);
-        zemLog::LogPlain(line.c_str());
-    }
+    zemQuietly([this] {
+        const std::string prefix = "zemBaseProviderManager::cleanupMI:";
+        zemLog::LogPlain((prefix + std::to_string(m_baseMIList.size())).c_str());
+        for (int i = 0; i < m_baseMIList.size(); ++i) {
+            const BaseMIItem* left = m_baseMIList[i];
+            const std::string line =
+                prefix + left->m_miName + ";count=" + std::to_string(left->m_miCount);
+            zemLog::LogPlain(line.c_str());
+        }
+    });
 }
 
 CMPIInstanceMI* zemBaseProviderManager::getInstanceMI(CMPIBroker* mb, CMPIContext* ctx,

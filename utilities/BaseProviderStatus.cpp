@@ -10,8 +10,11 @@
 #include "BaseProviderText.h"
 #include "Exception.h"
 #include "LetUnwind.h"
+#include "ServerCall.h"
 
 namespace {
+
+using Text = const char*;
 
 struct KindRow {
     int kind;
@@ -105,19 +108,16 @@ public:
     BundleLookup& operator=(const BundleLookup&) = delete;
     ~BundleLookup() { close(); }
 
-    // Small servers have no message functions at all; that is like having no bundle.
-    bool open(const char* bundle, const char* key, const char* dfltString) {
-        CMPIStatus status = {CMPI_RC_ERR_NOT_SUPPORTED, nullptr};
-        if (m_broker->eft->openMessageFile != nullptr) {
-            const bool answered = zemQuietly(
-                [&] { status = m_broker->eft->openMessageFile(m_broker, bundle, &m_handle); });
-            if (!answered) {
-                m_handle = nullptr;
-                return false;
-            }
-        }
-        if (status.rc == CMPI_RC_OK) return true;
+    // A server without message functions is like one without the bundle.
+    bool open(Text bundle, Text key, Text dfltString) {
+        CMPIStatus status = kZemNotServed;
+        const bool answered = zemQuietly([&] {
+            status = zemCallServer(m_broker->eft, &CMPIBrokerEncFT::openMessageFile, kZemNotServed,
+                                   m_broker, bundle, &m_handle);
+        });
+        if (answered && status.rc == CMPI_RC_OK) return true;
         m_handle = nullptr;
+        if (!answered) return false;
         PROV_TRACE_OF(m_broker, m_component);
         PROV_TRACE_STRING(2, "OPEN MESSAGE BUNDLE FILE(%s) FAILED,RETURN DEFAULT STRING %s:%s",
                           zemOrEmpty(bundle), zemOrEmpty(key), zemOrEmpty(dfltString));
@@ -129,28 +129,34 @@ public:
         if (m_handle == nullptr) return false;
         PROV_TRACE_OF(m_broker, m_component);
         PROV_TRACE_STRING(4, "READ ICU MESSAGE %s FROM %s", zemOrEmpty(key), zemOrEmpty(bundle));
-        if (m_broker->eft->getMessage2 == nullptr) return false;
         CMPICount count = 0;
         while (count < kMaxInserts && a[count] != nullptr) ++count;
         bool found = false;
         zemQuietly([&] {
-            CMPIStatus status = {CMPI_RC_OK, nullptr};
-            CMPIString* message = m_broker->eft->getMessage2(
-                m_broker, key, m_handle, dfltString, &status, count, CMPI_chars, a[0], CMPI_chars,
-                a[1], CMPI_chars, a[2], CMPI_chars, a[3], CMPI_chars, a[4], CMPI_chars, a[5],
-                CMPI_chars, a[6], CMPI_chars, a[7], CMPI_chars, a[8], CMPI_chars, a[9]);
+            CMPIStatus status = kZemServed;
+            CMPIString* const none = nullptr;
+            CMPIString* const message = zemCallServer(
+                m_broker->eft, &CMPIBrokerEncFT::getMessage2, none, m_broker, key, m_handle,
+                dfltString, &status, count, CMPI_chars, a[0], CMPI_chars, a[1], CMPI_chars, a[2],
+                CMPI_chars, a[3], CMPI_chars, a[4], CMPI_chars, a[5], CMPI_chars, a[6], CMPI_chars,
+                a[7], CMPI_chars, a[8], CMPI_chars, a[9]);
             if (status.rc != CMPI_RC_OK || message == nullptr) return;
-            const char* chars = message->ft->getCharPtr(message, nullptr);
+            Text const unread = nullptr;
+            Text const chars =
+                zemCallServer(message->ft, &CMPIStringFT::getCharPtr, unread, message, &status);
             if (chars != nullptr) text = chars;
             found = chars != nullptr;
-            message->ft->release(message);
+            zemCallServer(message->ft, &CMPIStringFT::release, kZemNotServed, message);
         });
         return found;
     }
 
     void close() {
-        if (m_handle == nullptr || m_broker->eft->closeMessageFile == nullptr) return;
-        zemQuietly([&] { m_broker->eft->closeMessageFile(m_broker, m_handle); });
+        if (m_handle == nullptr) return;
+        zemQuietly([&] {
+            zemCallServer(m_broker->eft, &CMPIBrokerEncFT::closeMessageFile, kZemNotServed,
+                          m_broker, m_handle);
+        });
         m_handle = nullptr;
     }
 
@@ -266,10 +272,9 @@ void zemBaseProvider::logMessage(CMPIBroker* brkr, const char* providerName, int
 
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_STRING(4, "LOG MESSAGE: %s", message.c_str());
-    if (brkr->eft == nullptr || brkr->eft->logMessage == nullptr) return;
     zemQuietly([&] {
-        brkr->eft->logMessage(brkr, static_cast<CMPISeverity>(severity), providerName,
-                              message.c_str(), nullptr);
+        zemCallServer(brkr->eft, &CMPIBrokerEncFT::logMessage, kZemNotServed, brkr,
+                      static_cast<CMPISeverity>(severity), providerName, message.c_str(), nullptr);
     });
 }
 
@@ -295,7 +300,8 @@ void zemBaseProvider::logICUMessage(CMPIBroker* brkr, CMPIContext* ctx, const ch
         const bool answered = zemQuietly([&] {
             CMPIValue yes = {};
             yes.boolean = 1;
-            ctx->ft->addEntry(ctx, "UseProcessLocale", &yes, CMPI_boolean);
+            zemCallServer(ctx->ft, &CMPIContextFT::addEntry, kZemNotServed, ctx, "UseProcessLocale",
+                          &yes, CMPIType{CMPI_boolean});
             text =
                 retrieveLocalizedString(brkr, providerName, msgBundle, msgKey, dfltString, 0, arg0,
                                         arg1, arg2, arg3, arg4, arg5, arg6, arg7, arg8, arg9);

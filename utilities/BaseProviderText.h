@@ -5,6 +5,8 @@
 #ifndef ZEM_BASE_PROVIDER_TEXT_H
 #define ZEM_BASE_PROVIDER_TEXT_H
 
+#include <cstring>
+
 #include "BaseProvider.h"
 #include "CmpiArray.h"
 #include "CmpiData.h"
@@ -34,23 +36,36 @@ inline bool zemReadText(const CmpiData& data, zemString& text) {
     return string.charPtr() != nullptr;
 }
 
-/// The server's text of an object. False from a server that cannot print it: an operation must not
-/// fail over a text that is only traced.
+/// The server's text of an object. False, and @p text as it was, from a server that cannot print
+/// it: an operation must not fail over a text that is only traced.
 inline bool zemPrint(CmpiObject object, zemString& text) {
     try {
         const CmpiString printed = object.toString();
+        if (printed.charPtr() == nullptr) return false;
         text = printed.charPtr();
-        return printed.charPtr() != nullptr;
+        return true;
     } catch (const CmpiStatus&) {
         return false;
     }
 }
 
+/// What a server can be asked to print: some do it in 4096 bytes on the stack, whatever comes.
+constexpr size_t kZemPrintable = 4095;
+
 /// The server's text of a path, or the library's own.
 inline zemString zemPathText(const CmpiObjectPath& path) {
-    zemString text;
-    if (!zemPrint(path, text)) text = zemBaseProvider::objectPathToString(path);
+    zemString text = zemBaseProvider::objectPathToString(path);
+    if (text.length() <= kZemPrintable) zemPrint(path, text);
     return text;
+}
+
+/// A text from outside for a message: what goes beyond @p limit becomes "...", between characters
+/// of UTF-8.
+inline zemString zemShortened(const char* text, size_t limit) {
+    if (strnlen(zemOrEmpty(text), limit + 1) <= limit) return zemString(text);
+    size_t length = limit;
+    while (length > 0 && (text[length] & 0xC0) == 0x80) --length;
+    return zemString(text, static_cast<unsigned>(length)) + "...";
 }
 
 inline zemString zemTextOf(const CmpiString& string) { return zemString(string.charPtr()); }

@@ -10,8 +10,11 @@
 
 #include "BaseProvider.h"
 #include "BaseProviderText.h"
+#include "ServerCall.h"
 
 namespace {
+
+using Text = const char*;
 
 struct Key {
     zemString name;
@@ -173,8 +176,8 @@ void zemBaseProvider::validateKeys(const CmpiObjectPath& copt, const CmpiObjectP
     }
     const CMPIObjectPath* raw = cop.getEnc();
     for (const Key& key : given) {
-        CMPIStatus status = {CMPI_RC_OK, nullptr};
-        raw->ft->getKey(raw, key.name, &status);
+        CMPIStatus status = kZemServed;
+        zemCallServer(raw->ft, &CMPIObjectPathFT::getKey, CMPIData(), raw, Text(key.name), &status);
         if (status.rc == CMPI_RC_ERR_NOT_FOUND) {
             PROV_TRACE_EXIT();
             throwInvalidKeyExc(callingMethod, className, key.name);
@@ -211,12 +214,15 @@ void zemBaseProvider::validateProerties(const CmpiObjectPath& cop, const char** 
     for (const char** next = properties; *next != nullptr; ++next) names.push_back(*next);
 
     // A server that does not know the class cannot tell what belongs to it.
-    CMPIStatus made = {CMPI_RC_OK, nullptr};
-    const CMPIInstance* blank = raw->eft->newInstance(raw, cop.getEnc(), &made);
+    CMPIStatus made = kZemServed;
+    CMPIInstance* const none = nullptr;
+    const CMPIInstance* const blank =
+        zemCallServer(raw->eft, &CMPIBrokerEncFT::newInstance, none, raw, cop.getEnc(), &made);
     if (made.rc == CMPI_RC_OK && blank != nullptr) {
-        for (const char* name : names) {
-            CMPIStatus status = {CMPI_RC_OK, nullptr};
-            blank->ft->getProperty(blank, name, &status);
+        for (Text name : names) {
+            CMPIStatus status = kZemServed;
+            zemCallServer(blank->ft, &CMPIInstanceFT::getProperty, CMPIData(), blank, name,
+                          &status);
             if (status.rc == CMPI_RC_ERR_NOT_FOUND || status.rc == CMPI_RC_ERR_NO_SUCH_PROPERTY) {
                 PROV_TRACE_EXIT();
                 throwInvalidPropertyExc(callingMethod, className, name);

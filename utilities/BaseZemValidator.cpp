@@ -247,10 +247,8 @@ void zemBaseZemValidator::refuseValue(const CmpiInstance& instance, Text name, T
 
 void zemBaseZemValidator::traceInvalid(const CmpiInstance& instance, Text name) const {
     PROV_TRACE_LOCALS();
-    zemString text;
-    if (!zemPrint(instance, text)) {
-        CmpiInstance readable(instance);
-        text = instanceToString(readable);
-    }
+    CmpiInstance readable(instance);
+    zemString text = instanceToString(readable);
+    if (text.length() <= kZemPrintable) zemPrint(instance, text);
     PROV_TRACE_STRING(4, "Invalid \"%s\":%s", name, Text(text));
 }

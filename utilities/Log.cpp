@@ -1,20 +1,37 @@
 #include "Log.h"
 
 #include <cstdio>
-#include <string>
+#include <cstring>
+
+#include "LogText.h"
+#include "SigpipeHeld.h"
 
 namespace {
 
-// One fwrite takes the stream's lock once, so a line is never torn by another thread's line.
-void writeLine(const char* prefix, const char* text) {
-    std::string line(prefix);
-    if (text != nullptr) line += text;
-    line += '\n';
-    std::fwrite(line.data(), 1, line.size(), stdout);
-    std::fflush(stdout);
-}
-
 constexpr const char* kPrefix = "<zem350Log-prefix>";
+
+/// Holds the stream from the first byte of a line until it is out, so that no other thread's line
+/// gets between, and no other thread is left to write this one to a reader that is gone.
+class OutputHold {
+public:
+    OutputHold() { flockfile(stdout); }
+    ~OutputHold() { funlockfile(stdout); }
+    OutputHold(const OutputHold&) = delete;
+    OutputHold& operator=(const OutputHold&) = delete;
+};
+
+// Takes no memory: lines are written in destructors, and when there is none.
+void writeLine(const char* prefix, const char* text) {
+    const OutputHold hold;
+    const zemSigpipeHeld held;
+    const auto put = [](const char* piece, size_t size) {
+        fwrite_unlocked(piece, 1, size, stdout);
+    };
+    put(prefix, strlen(prefix));
+    zemPutLogText(text != nullptr ? text : "", put);
+    put("\n", 1);
+    fflush_unlocked(stdout);
+}
 
 }  // namespace
 

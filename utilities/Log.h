@@ -1,7 +1,10 @@
 /// Lines on standard output, where the CIM server's redirection picks them up.
 ///
-/// A line is handed over in one write and flushed, so that lines of concurrent threads come out
-/// whole. Nothing is held between calls; any thread may call at any time.
+/// A line is written and flushed under the stream's lock, so that lines of concurrent threads come
+/// out whole. Control characters inside a text are written as "\n", "\r" or "\x1B", so that a text
+/// from outside cannot look like a line of its own; only a line end before a blank, a tab or "}"
+/// stays. Writing takes no memory and throws nothing, and a reader that is gone raises no signal.
+/// Nothing is held between calls; any thread may call at any time.
 #ifndef ZEM_LOG_H
 #define ZEM_LOG_H
 

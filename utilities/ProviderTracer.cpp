@@ -1,11 +1,13 @@
 #include "ProviderTracer.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstring>
 
 #include "LetUnwind.h"
 #include "Log.h"
-#include "cmpift.h"
+#include "LogText.h"
+#include "ServerCall.h"
 
 namespace {
 
@@ -77,15 +79,23 @@ void zemProviderTracer::_traceString(CMPIBroker* broker, const char* file, unsig
 
 void zemProviderTracer::_trace(CMPIBroker* broker, int level, const char* component,
                                const char* fmt, va_list args) {
+    char text[kMessageSize] = {};
+    vsnprintf(text, sizeof text, fmt, args);
     char message[kMessageSize] = {};
-    vsnprintf(message, sizeof message, fmt, args);
+    size_t length = 0;
+    zemPutLogText(text, [&](const char* piece, size_t size) {
+        size = std::min(size, sizeof message - 1 - length);
+        memcpy(message + length, piece, size);
+        length += size;
+    });
 
     char line[kLineSize] = {};
     snprintf(line, sizeof line, "Component:%s, Log message: %s", orEmpty(component), message);
     zemLog::Log(line);
 
-    if (broker == nullptr || broker->eft == nullptr || broker->eft->trace == nullptr) return;
+    if (broker == nullptr) return;
     zemQuietly([&] {
-        broker->eft->trace(broker, static_cast<CMPILevel>(level), component, message, nullptr);
+        zemCallServer(broker->eft, &CMPIBrokerEncFT::trace, kZemNotServed, broker,
+                      static_cast<CMPILevel>(level), component, message, nullptr);
     });
 }

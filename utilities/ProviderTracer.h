@@ -2,7 +2,9 @@
 /// trace. There is no switch here; what the server keeps depends on its trace level.
 ///
 /// Levels: 1 entry and exit, 2 problems in localisation, 3 failures, 4 detail. A line is cut at
-/// 1023 bytes. All state is on the stack; any thread may call at any time.
+/// 1023 bytes, and control characters in it are escaped as Log.h says, in both places. All state is
+/// on the stack; tracing takes no memory, throws nothing, and may be done on any thread. A thread
+/// can be cancelled in it, so a destructor that traces disables that meanwhile.
 ///
 /// Code writes its lines through the macros below, which use two locals that name the broker and
 /// the provider:

@@ -17,17 +17,16 @@ public:
     zemSigpipeHeld() {
         sigemptyset(&m_sigpipe);
         sigaddset(&m_sigpipe, SIGPIPE);
-        sigset_t pending;
-        sigpending(&pending);
-        m_wasPending = sigismember(&pending, SIGPIPE) == 1;
         pthread_sigmask(SIG_BLOCK, &m_sigpipe, &m_before);
+        // Only where the thread held the signal back itself can one have been waiting before.
+        sigset_t pending;
+        m_wasPending = sigismember(&m_before, SIGPIPE) == 1 && sigpending(&pending) == 0 &&
+                       sigismember(&pending, SIGPIPE) == 1;
+        errno = 0;
     }
     ~zemSigpipeHeld() {
-        const zemUncancelled uncancelled;
         const int error = errno;  // of the write
-        constexpr timespec now = {0, 0};
-        while (!m_wasPending && sigtimedwait(&m_sigpipe, nullptr, &now) < 0 && errno == EINTR) {
-        }
+        if (error == EPIPE && !m_wasPending) take();
         pthread_sigmask(SIG_SETMASK, &m_before, nullptr);
         errno = error;
     }
@@ -35,6 +34,13 @@ public:
     zemSigpipeHeld& operator=(const zemSigpipeHeld&) = delete;
 
 private:
+    void take() const {
+        const zemUncancelled uncancelled;
+        constexpr timespec now = {0, 0};
+        while (sigtimedwait(&m_sigpipe, nullptr, &now) < 0 && errno == EINTR) {
+        }
+    }
+
     sigset_t m_sigpipe;
     sigset_t m_before;
     bool m_wasPending = false;

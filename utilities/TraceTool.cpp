@@ -1,46 +1,57 @@
 #include "TraceTool.h"
 
+#include <fcntl.h>
 #include <sched.h>
 #include <sys/time.h>
+#include <sys/uio.h>
+#include <unistd.h>
 
 #include <cstdlib>
-#include <iostream>
+#include <cstring>
 #include <memory>
-#include <typeinfo>
+#include <string>
+
+#include "LetUnwind.h"
+#include "Log.h"
+#include "SigpipeHeld.h"
 
 namespace {
 
-constexpr char switchVariable[] = "VM_CIMPROVIDER_TRACE";
-constexpr char pathVariable[] = "VM_CIMPROVIDER_TRACE_PATH";
-constexpr char defaultPath[] = "/tmp/CIMTestPerfData.txt";
+constexpr char kSwitchVariable[] = "VM_CIMPROVIDER_TRACE";
+constexpr char kPathVariable[] = "VM_CIMPROVIDER_TRACE_PATH";
+constexpr char kDefaultPath[] = "/tmp/CIMTestPerfData.txt";
 
-constexpr int queueStep = 25;
-constexpr int fullQueue = 50;
-constexpr int oldQueueMilliseconds = 60000;
-constexpr int pollMilliseconds = 500;
+constexpr int kQueueStep = 25;
+constexpr int kFullQueue = 50;
+constexpr int kOldQueueMilliseconds = 60000;
+constexpr int kPollMilliseconds = 500;
 
 const char* variable(const char* name) {
     const char* const value = std::getenv(name);
     if (value == nullptr) {
-        std::cout << "env not set for " << name << std::endl;
+        zemLog::LogPlain((std::string("env not set for ") + name).c_str());
     }
     return value;
+}
+
+zemString fileOfThread() {
+    zemString path;
+    path.format("/tmp/CIMTest-%d", zemThread::getCurrentThreadId());
+    return path;
 }
 
 }  // namespace
 
 CTimer::CTimer() : _beginTick(0), _currentTick(0), _previousTick(0) { timer(1); }
 
-// Loggers are shared by all threads, so the ticks are read and written atomically.
 std::uint64_t CTimer::timer(int setBegin) {
     timeval now{};
     gettimeofday(&now, nullptr);
     const std::uint64_t tick =
         static_cast<std::uint64_t>(now.tv_sec) * 1000000U + static_cast<std::uint64_t>(now.tv_usec);
-    const std::uint64_t previous = __atomic_exchange_n(&_currentTick, tick, __ATOMIC_RELAXED);
-    __atomic_store_n(&_previousTick, previous, __ATOMIC_RELAXED);
+    _previousTick = _currentTick.exchange(tick);
     if (setBegin != 0) {
-        __atomic_store_n(&_beginTick, tick, __ATOMIC_RELAXED);
+        _beginTick = tick;
     }
     return tick;
 }
@@ -49,33 +60,35 @@ int CTimer::getElapsedTime(tagTimeIntervalType interval, tagTimerPrecisionType p
     if (interval != fromprevious && interval != frombegin) {
         return 0;
     }
-    const std::uint64_t* const from = interval == fromprevious ? &_previousTick : &_beginTick;
+    const std::uint64_t from = interval == fromprevious ? _previousTick : _beginTick;
     // Signed: the clock may have been set back in between.
-    const auto elapsed = static_cast<std::int64_t>(
-        __atomic_load_n(&_currentTick, __ATOMIC_RELAXED) - __atomic_load_n(from, __ATOMIC_RELAXED));
+    const auto elapsed = static_cast<std::int64_t>(_currentTick - from);
     return static_cast<int>(precision == micro ? elapsed : elapsed / 1000);
 }
 
-CTimeLoger::CTimeLoger(const zemString& id) : _id(id) {}
+CTimeLoger::CTimeLoger(const zemString& id) : CTimeLoger(id, false) {}
+
+CTimeLoger::CTimeLoger(const zemString& id, bool isSwitched) : _id(id), _isSwitched(isSwitched) {}
 
 CTimeLoger::~CTimeLoger() = default;
 
-// With tracing off the lines of a thread logger would be thrown away, so they are not even built.
 bool CTimeLoger::isDropped() const {
-    return typeid(*this) == typeid(CTimeThreadLoger) &&
-           !CTimeLogerManager::getInstance()->isEnabled();
+    return _isSwitched && !CTimeLogerManager::getInstance()->isEnabled();
 }
 
+// A line that cannot be built or written is lost: marks are set in destructors, too.
 void CTimeLoger::mark(int setBegin, const char* word, const char* text) {
     if (isDropped()) {
         return;
     }
     const unsigned long long tick = _timer.timer(setBegin);
     const char* const id = _id;
-    zemString line;
-    line.format("+++%s:%d %s-%s %s at %llu.", id, zemThread::getCurrentThreadId(), id, text, word,
-                tick);
-    log(line);
+    zemQuietly([&] {
+        zemString line;
+        line.format("+++%s:%d %s-%s %s at %llu.", id, zemThread::getCurrentThreadId(), id, text,
+                    word, tick);
+        log(line);
+    });
 }
 
 void CTimeLoger::begin(const char* text) { mark(1, "begin", text); }
@@ -88,67 +101,85 @@ void CTimeLoger::log(const char* a, const char* b, const char* c) {
     }
     const unsigned long long tick = _timer.timer(0);
     const char* const id = _id;
-    zemString line;
-    line.format("+++%s:%d,%llu, %s,%s-%s,%s", id, zemThread::getCurrentThreadId(), tick, id, a, b,
-                c);
-    log(line);
+    zemQuietly([&] {
+        zemString line;
+        line.format("+++%s:%d,%llu, %s,%s-%s,%s", id, zemThread::getCurrentThreadId(), tick, id, a,
+                    b, c);
+        log(line);
+    });
 }
 
-CTimeThreadLoger::CTimeThreadLoger(const zemString& id) : CTimeLoger(id) {}
+CTimeThreadLoger::CTimeThreadLoger(const zemString& id) : CTimeLoger(id, true) {}
 
 void CTimeThreadLoger::log(const char* text) { CTimeLogerManager::getInstance()->log(text); }
 
-CTimeFileLoger::CTimeFileLoger(const zemString& id) : CTimeLoger(id) {
-    m_filepath.format("/tmp/CIMTest-%d", zemThread::getCurrentThreadId());
-    m_logger.open(m_filepath, std::ios::app);
-}
+CTimeFileLoger::CTimeFileLoger(const zemString& id) : CTimeLoger(id), m_logger(fileOfThread()) {}
 
 void CTimeFileLoger::log(const char* text) {
-    zemSynchronizer hold(_context);
-    m_logger << "++" << getId() << ": " << text << std::endl;
+    zemString line;
+    line.format("++%s: %s", static_cast<const char*>(getId()), text);
+    m_logger.log(line);
 }
 
+// The name may lie where anyone can put something else in its place.
 CFileLoger::CFileLoger(const zemString& path)
-    : m_filepath(path), m_logger(m_filepath, std::ios::app) {}
+    : m_file(open(path, O_WRONLY | O_APPEND | O_CREAT | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK,
+                  S_IRUSR | S_IWUSR)) {}
 
-void CFileLoger::log(const char* text) { m_logger << text << std::endl; }
+CFileLoger::~CFileLoger() {
+    if (m_file >= 0) {
+        close(m_file);
+    }
+}
 
+void CFileLoger::log(const char* text) {
+    const zemSigpipeHeld held;
+    char newline = '\n';
+    const iovec line[] = {{const_cast<char*>(text), std::strlen(text)}, {&newline, 1}};
+    static_cast<void>(writev(m_file, line, 2));
+}
+
+// Never destroyed: other threads may still be timing while the process ends. Only its own thread
+// must have ended before what it stands on goes.
 CTimeLogerManager* CTimeLogerManager::getInstance() {
-    static CTimeLogerManager manager;
-    return &manager;
+    static CTimeLogerManager* const manager = new CTimeLogerManager;
+    static const struct End {
+        ~End() { manager->shutDown(); }
+    } end;
+    return manager;
 }
 
 CTimeLogerManager::CTimeLogerManager()
-    : _logger(nullptr), m_stopThread(false), _messageQueue(nullptr), _enableLogger(false) {
-    if (variable(switchVariable) == nullptr) {
+    : m_stopThread(false), _messageQueue(nullptr), _enableLogger(false), m_process(getpid()) {
+    if (variable(kSwitchVariable) == nullptr) {
         return;
     }
-    _messageQueue = new LogListData(queueStep);
-    const char* const named = variable(pathVariable);
-    const zemString path(named == nullptr ? defaultPath : named);
-    std::cout << "path:" << path << std::endl;
-    _logger = new CFileLoger(path);
+    _messageQueue = std::make_unique<LogListData>(kQueueStep);
+    const char* const named = variable(kPathVariable);
+    const zemString path(named == nullptr ? kDefaultPath : named);
+    zemLog::LogPlain("path:" + path);
+    _logger = std::make_unique<CFileLoger>(path);
     _timer.timer(1);
     // Without a drain the queue would grow without bound.
     _enableLogger = m_monitorThread.start(monitorThread, this) == 0;
 }
 
-CTimeLogerManager::~CTimeLogerManager() {
-    if (_enableLogger) {
-        __atomic_store_n(&m_stopThread, true, __ATOMIC_RELEASE);
-        // A signal between the thread's look at the flag and its wait is lost: give it again.
-        do {
-            m_threadCond.signal();
-            sched_yield();
-        } while (m_monitorThread.isStarted());
-        m_monitorThread.waitThreadExit();
+// In a child of a fork there is no such thread to wait for.
+void CTimeLogerManager::shutDown() {
+    if (!_enableLogger || m_process != getpid()) {
+        return;
     }
-    delete _logger;
-    delete _messageQueue;
-}
-
-bool CTimeLogerManager::isStopped() const {
-    return __atomic_load_n(&m_stopThread, __ATOMIC_ACQUIRE);
+    m_stopThread = true;
+    m_threadCond.signal();
+    sched_yield();
+    // A signal between the thread's look at the flag and its wait is lost: it is given again, for
+    // as long as that wait can last.
+    for (int i = 0; i < kPollMilliseconds && m_monitorThread.isStarted(); ++i) {
+        m_threadCond.signal();
+        usleep(1000);
+    }
+    m_monitorThread.waitThreadExit();
+    _logger.reset();
 }
 
 CTimeLoger* CTimeLogerManager::getLogger(const zemString& name) {
@@ -173,7 +204,7 @@ CTimeLoger* CTimeLogerManager::findOrAdd(const zemString& name) {
 }
 
 void CTimeLogerManager::log(const char* text) {
-    if (!_enableLogger) {
+    if (!_enableLogger || m_stopThread) {
         return;
     }
     auto line = std::make_unique<zemString>(text);
@@ -188,22 +219,22 @@ CTimeLogerManager::LogListData* CTimeLogerManager::getLogQueue() {
     if (_messageQueue == nullptr || _messageQueue->size() == 0) {
         return nullptr;
     }
-    if (_messageQueue->size() < fullQueue &&
-        _timer.getElapsedTime(CTimer::frombegin, CTimer::milli) < oldQueueMilliseconds) {
+    if (_messageQueue->size() < kFullQueue &&
+        _timer.getElapsedTime(CTimer::frombegin, CTimer::milli) < kOldQueueMilliseconds) {
         return nullptr;
     }
-    LogListData* const full = _messageQueue;
-    _messageQueue = new LogListData(queueStep);
+    auto next = std::make_unique<LogListData>(kQueueStep);
+    _messageQueue.swap(next);
     _timer.timer(1);
-    return full;
+    return next.release();
 }
 
 void CTimeLogerManager::monitorThread(void* manager) {
     auto* const self = static_cast<CTimeLogerManager*>(manager);
-    while (!self->isStopped()) {
+    while (!self->m_stopThread) {
         self->drain();
-        if (!self->isStopped()) {
-            self->m_threadCond.timedWait(pollMilliseconds);
+        if (!self->m_stopThread) {
+            self->m_threadCond.timedWait(kPollMilliseconds);
         }
     }
 }

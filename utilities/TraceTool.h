@@ -16,8 +16,11 @@
 #ifndef TRACE_TOOL_H
 #define TRACE_TOOL_H
 
+#include <sys/types.h>
+
+#include <atomic>
 #include <cstdint>
-#include <fstream>
+#include <memory>
 
 #include "DynamicArray.h"
 #include "StringUtils.h"
@@ -43,12 +46,14 @@ public:
     int getElapsedTime(tagTimeIntervalType interval, tagTimerPrecisionType precision) const;
 
 private:
-    std::uint64_t _beginTick;
-    std::uint64_t _currentTick;
-    std::uint64_t _previousTick;
+    // Timers are shared by all threads.
+    std::atomic<std::uint64_t> _beginTick;
+    std::atomic<std::uint64_t> _currentTick;
+    std::atomic<std::uint64_t> _previousTick;
 };
 
-/// Builds the lines of one named logger and leaves to its subclasses where they go.
+/// Builds the lines of one named logger and leaves to its subclasses where they go. What fails on
+/// the way loses the line, and nothing else.
 class ZEM_EXPORT CTimeLoger {
 public:
     explicit CTimeLoger(const zemString& id);
@@ -64,6 +69,10 @@ public:
     const zemString& getId() const { return _id; }
 
 protected:
+    /// @param isSwitched  lines go to the manager's queue, and are not even built while tracing is
+    ///                    off
+    CTimeLoger(const zemString& id, bool isSwitched);
+
     /// Takes one line, without its newline.
     virtual void log(const char* text) = 0;
 
@@ -73,6 +82,7 @@ private:
 
     zemString _id;
     CTimer _timer;
+    bool _isSwitched;
 };
 
 /// Sends its lines to the manager's queue; the manager makes them.
@@ -84,6 +94,23 @@ protected:
     void log(const char* text) override;
 };
 
+/// A file that is opened for append and closed with the object. It belongs to its user alone, no
+/// child keeps it, no link is followed, and nothing waits for the reader of a FIFO. Lines that the
+/// file does not take are lost. Any thread may call.
+class ZEM_EXPORT CFileLoger {
+public:
+    explicit CFileLoger(const zemString& path);
+    ~CFileLoger();
+    CFileLoger(const CFileLoger&) = delete;
+    CFileLoger& operator=(const CFileLoger&) = delete;
+
+    /// Writes the line and a newline, at once.
+    void log(const char* text);
+
+private:
+    int m_file;
+};
+
 /// Writes its lines to a file of its own, "/tmp/CIMTest-" and the id of the thread that makes it.
 class ZEM_EXPORT CTimeFileLoger : public CTimeLoger {
 public:
@@ -93,22 +120,7 @@ protected:
     void log(const char* text) override;
 
 private:
-    std::ofstream m_logger;
-    zemString m_filepath;
-    zemSynchronizerContext _context;
-};
-
-/// A file that is opened for append and closed with the object. For one thread.
-class ZEM_EXPORT CFileLoger {
-public:
-    explicit CFileLoger(const zemString& path);
-
-    /// Writes the line and a newline, and flushes.
-    void log(const char* text);
-
-private:
-    zemString m_filepath;
-    std::ofstream m_logger;
+    CFileLoger m_logger;
 };
 
 /// The one owner of the loggers, the queue, the file and the thread that drains one into the
@@ -118,7 +130,8 @@ public:
     using LogListData = zemDynamicArray<zemString>;
 
     /// The only manager; the first call reads the environment, starts the trace if that asks for
-    /// it, and says on standard output what it found.
+    /// it, and says on standard output what it found. It outlives the exit of the process: the
+    /// lines of threads that still run then are dropped.
     static CTimeLogerManager* getInstance();
 
     /// The logger of that name, made at the first call, owned by the manager. When tracing is off
@@ -136,25 +149,26 @@ public:
 
 private:
     CTimeLogerManager();
-    ~CTimeLogerManager();
+    ~CTimeLogerManager() = delete;
     CTimeLogerManager(const CTimeLogerManager&) = delete;
     CTimeLogerManager& operator=(const CTimeLogerManager&) = delete;
 
     static void monitorThread(void* manager);
     void drain();
-    bool isStopped() const;
+    void shutDown();
     CTimeLoger* findOrAdd(const zemString& name);
 
-    CFileLoger* _logger;
+    std::unique_ptr<CFileLoger> _logger;
     zemThread m_monitorThread;
-    bool m_stopThread;
+    std::atomic<bool> m_stopThread;
     CTimer _timer;
     zemCondition m_threadCond;
-    LogListData* _messageQueue;
+    std::unique_ptr<LogListData> _messageQueue;
     zemSynchronizerContext _queuecontext;
     zemSynchronizerContext _loggercontext;
     zemDynamicArray<CTimeLoger> _loggers;
     bool _enableLogger;
+    pid_t m_process;
 };
 
 #endif

@@ -2,6 +2,7 @@
 #include <atomic>
 #include <random>
 
+#include "FailingAllocation.h"
 #include "OnThreads.h"
 #include "ProviderHarness.h"
 
@@ -159,6 +160,132 @@ TEST_F(BaseProviderManager, CountsExactlyInAnyOrderAndFromManyThreads) {
     });
     EXPECT_EQ(1000, made);
     EXPECT_EQ(1000, cleaned);
+}
+
+/// Does something of its own in each operation, and refuses those of associations and deletion.
+class WorkingProvider : public PlainProvider {
+public:
+    WorkingProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), PlainProvider(mb, ctx, name) {}
+    CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
+                                    const char**) override {
+        CmpiInstance found(path);
+        found.setProperty("Name", getKeyBinding(path, "Name"));
+        return found;
+    }
+    void performEnumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
+                              const char**) override {
+        result.returnData(CmpiInstance(path));
+        throwObjectNotFoundExc("enumInstances", "Test_Disk", "second");
+    }
+    void performCreateInstance(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
+                               const CmpiInstance&) override {
+        result.returnData(path);
+    }
+    void performSetInstance(const CmpiContext& ctx, CmpiResult&, const CmpiObjectPath&,
+                            const CmpiInstance&, const char**) override {
+        logICUMessage(ctx, 1, "Id", "bundle", "Key", "text");
+    }
+    void performInvokeMethod(const CmpiContext&, CmpiResult&, const CmpiObjectPath&, const char*,
+                             const CmpiArgs& in, CmpiArgs& out) override {
+        out.setArg("Reason", getParmVal(in, "Reason"));
+    }
+};
+
+// Each allocation in turn fails: of each operation, then of the factory and of the last cleanup.
+// The server gets an answer and goes on, and nothing is left behind.
+TEST(OutOfMemory, EachAllocationMayFail) {
+    struct Parts {
+        CMPIContext* ctx;
+        CMPIResult* result;
+        CMPIObjectPath *path, *all;
+        CMPIInstance* disk;
+        CMPIArgs* args;
+        CMPIData caption;
+    };
+    using H = const Harness&;
+    using P = const Parts&;
+    CMPIStatus (*const operations[])(H, P) = {
+        [](H h, P p) {
+            return h.instance->ft->enumerateInstanceNames(h.instance, p.ctx, p.result, p.all);
+        },
+        [](H h, P p) {
+            return h.instance->ft->enumerateInstances(h.instance, p.ctx, p.result, p.all, nullptr);
+        },
+        [](H h, P p) {
+            return h.instance->ft->getInstance(h.instance, p.ctx, p.result, p.path, nullptr);
+        },
+        [](H h, P p) {
+            return h.instance->ft->createInstance(h.instance, p.ctx, p.result, p.all, p.disk);
+        },
+        [](H h, P p) {
+            return h.instance->ft->modifyInstance(h.instance, p.ctx, p.result, p.path, p.disk,
+                                                  nullptr);
+        },
+        [](H h, P p) {
+            return h.instance->ft->deleteInstance(h.instance, p.ctx, p.result, p.path);
+        },
+        [](H h, P p) {
+            return h.association->ft->associators(h.association, p.ctx, p.result, p.path, nullptr,
+                                                  nullptr, nullptr, nullptr, nullptr);
+        },
+        [](H h, P p) {
+            return h.method->ft->invokeMethod(h.method, p.ctx, p.result, p.path, "Force", p.args,
+                                              p.args);
+        },
+        [](H h, P p) {
+            return h.property->ft->getProperty(h.property, p.ctx, p.result, p.path, "Name");
+        },
+        [](H h, P p) {
+            return h.property->ft->setProperty(h.property, p.ctx, p.result, p.path, "Caption",
+                                               p.caption);
+        },
+    };
+    // Whether there were so many allocations that the one after n failed; none does for -1.
+    const auto during = [](long n, const std::function<void()>& work) {
+        const FailingAllocation failing(n >= 0 ? n : 1L << 30);
+        work();
+        return failing.happened();
+    };
+    testing::internal::CaptureStdout();
+    int failures = 0;
+    for (const auto& operation : operations) {
+        long before = 0;
+        bool failed = true;
+        for (long n = -1; failed; ++n) {  // the first run, in which none fails, makes what stays
+            {
+                const Harness h(cimom::Character::Full, FactoriesOf<WorkingProvider>::create);
+                cimom::Reply reply;
+                CMPIData caption = {CMPI_chars, CMPI_goodValue, {}};
+                caption.value.chars = const_cast<char*>("c");
+                const Parts parts = {h.ctx(),  h.scope.result(reply),     h.path(), h.classPath(),
+                                     h.disk(), h.args({{"Reason", "r"}}), caption};
+                CMPIStatus status = {CMPI_RC_OK, nullptr};
+                failed = during(n, [&] { status = operation(h, parts); }) || n < 0;
+                failures += n >= 0 && status.rc == CMPI_RC_ERR_FAILED ? 1 : 0;
+            }
+            EXPECT_TRUE(n < 0 || before == FailingAllocation::live()) << n;
+            before = FailingAllocation::live();
+        }
+    }
+
+    cimom::Server server;
+    cimom::RequestScope scope(server);
+    CMPIInstanceMI* mi = nullptr;
+    const auto get = [&] {
+        mi = zemBaseProviderManager::getInstanceMI(server.broker(), scope.context(), "Rare",
+                                                   nullptr, FactoriesOf<PlainProvider>::create);
+    };
+    const auto drop = [&] { mi->ft->cleanup(mi, scope.context(), false); };
+    get();
+    drop();
+    const long before = FailingAllocation::live();
+    for (long n = 0; during(n, get); ++n)
+        if (mi != nullptr) drop();
+    for (long n = 0; during(n, drop); ++n) get();
+    EXPECT_EQ(before, FailingAllocation::live());
+    testing::internal::GetCapturedStdout();
+    EXPECT_LT(100, failures);
 }
 
 }  // namespace

@@ -1,8 +1,10 @@
+#include <algorithm>
 #include <cstring>
 #include <tuple>
 
 #include "ProviderHarness.h"
 #include "TimingTrace.h"
+#include "TraceTool.h"
 
 namespace {
 
@@ -291,6 +293,40 @@ TEST_P(BaseProvider, VerifiesTheTargetOfAMethod) {
     EXPECT_EQ("Test_Disk.Force", script.argsOf);
 }
 
+// Some servers print a path in 4096 bytes on the stack: one that takes more is never handed back.
+TEST_P(BaseProvider, RefusesKeysThatNoServerPrints) {
+    static std::size_t longest;
+    longest = 0;
+    static CMPIBrokerEncFT table;
+    static const CMPIBrokerEncFT* real;
+    table = *(real = h.server.broker()->eft);
+    table.toString = [](const CMPIBroker* mb, const void* object, CMPIStatus* rc) {
+        CMPIString* const text = real->toString(mb, object, rc);
+        longest = std::max(longest, strlen(text->ft->getCharPtr(text, nullptr)));
+        return text;
+    };
+    h.server.broker()->eft = &table;
+    const std::string front = "root/cimv2:Test_Disk.Name=\"\"";
+    for (const std::size_t size : {4095U, 4096U, 1000000U}) {
+        const std::string name(size - front.size(), 'x');
+        const bool fits = size < 4096;
+        const Answer answers[] = {
+            h.call(h.instance, &I::getInstance, h.path(name.c_str()), no),
+            h.call(h.method, &M::invokeMethod, h.path(name.c_str()), "Force", h.args(), h.args()),
+            h.call(h.association, &A::associatorNames, h.path(name.c_str()), no, no, no, no)};
+        const char* const methods[] = {"getInstance", "invokeMethod", "associatorNames"};
+        for (int i = 0; i < 3; ++i) {
+            EXPECT_EQ(fits ? CMPI_RC_OK : CMPI_RC_ERR_INVALID_PARAMETER, answers[i].rc);
+            EXPECT_EQ(fits ? ""
+                           : "Invalid value of " + name.substr(0, 64) +
+                                 "... is provided for parameter Name to method " + methods[i] +
+                                 " on provider TestProvider.",
+                      answers[i].text);
+        }
+    }
+    EXPECT_EQ(4095U, longest);
+}
+
 TEST_P(BaseProvider, StaysSilentWhenDisabled) {
     enabled = false;
     for (const char* name : {"enumInstances", "enumInstanceNames", "associators", "associatorNames",
@@ -312,11 +348,27 @@ TEST_P(BaseProvider, StaysSilentWhenDisabled) {
 }
 
 // begin and end have one key; the outer getInstance has a mark of its own; an enumeration that
-// failed ends under another number, one that was only logged does not end.
+// failed ends under another number, one that was only logged does not end. What ends well is timed
+// before its exit line, but for the inner getInstance and invokeMethod.
 TEST_P(BaseProvider, TimesItsOperations) {
+    static std::vector<std::uint64_t> exits;  // two of getInstance, one of invokeMethod
+    exits.clear();
+    static CMPIBrokerEncFT table;
+    table = *h.server.broker()->eft;
+    table.trace = [](auto, auto, auto, const char* text, auto) {
+        if (exits.size() < 3 && std::strstr(text, "Frame.cpp") && std::strstr(text, "Exiting")) {
+            usleep(1000);
+            exits.push_back(CTimer().timer(0));
+            usleep(1000);
+        }
+        return CMPIStatus{CMPI_RC_OK, nullptr};
+    };
+    h.server.broker()->eft = &table;
+    call(h, "getInstance");
+    script.staticMethod = true;
+    invokeOnClass(h);
     h.className = GetParam() == Character::Full ? "TimedFull" : "TimedLean";
     call(h, "getInstance");
-    call(h, "invokeMethod");
     script.actions["performEnumInstances"] = [] { throw zemOperationFailedException("x"); };
     call(h, "enumInstances");
     script.actions["performEnumInstanceNames"] = [] { throw zemObjectNotFoundException("x"); };
@@ -339,6 +391,12 @@ TEST_P(BaseProvider, TimesItsOperations) {
     EXPECT_NE("none", number("enumInstances" + key, "end"));
     EXPECT_NE(number("enumInstances" + key, "begin"), number("enumInstances" + key, "end"));
     EXPECT_EQ("none", number("enumInstanceNames" + key, "end"));
+    const auto end = [&](const std::string& start) {
+        return std::stoull(lines.substr(lines.find(" end at ", lines.rfind(start)) + 8));
+    };
+    EXPECT_LT(exits.at(0), end("getInstance-TestProvider-Test_Disk "));
+    EXPECT_GT(exits.at(1), end("getInstance-TestProvider-4-Test_Disk "));
+    EXPECT_LT(exits.at(2), end("invokeMethod-TestProvider "));
 }
 
 // A thread is cancelled inside the worker and inside each function of the server that is called

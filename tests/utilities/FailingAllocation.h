@@ -2,6 +2,7 @@
 /// allocation functions for all of it, the libraries too.
 #pragma once
 
+#include <atomic>
 #include <cstdlib>
 #include <new>
 
@@ -13,21 +14,30 @@ public:
 
     bool happened() const { return s_left < 0; }
 
+    /// How many allocations of the program have not been given back.
+    static long live() { return s_live; }
+
     static void* allocate(std::size_t size) {
         if (s_left != kNone && s_left-- == 0) throw std::bad_alloc();
         void* const memory = std::malloc(size != 0 ? size : 1);
         if (memory == nullptr) throw std::bad_alloc();
+        ++s_live;
         return memory;
+    }
+    static void release(void* memory) {
+        if (memory != nullptr) --s_live;
+        std::free(memory);
     }
 
 private:
     static constexpr long kNone = 1L << 40;
     inline static thread_local long s_left = kNone;
+    inline static std::atomic<long> s_live{0};
 };
 
 void* operator new(std::size_t size) { return FailingAllocation::allocate(size); }
 void* operator new[](std::size_t size) { return FailingAllocation::allocate(size); }
-void operator delete(void* memory) noexcept { std::free(memory); }
-void operator delete[](void* memory) noexcept { std::free(memory); }
-void operator delete(void* memory, std::size_t) noexcept { std::free(memory); }
-void operator delete[](void* memory, std::size_t) noexcept { std::free(memory); }
+void operator delete(void* memory) noexcept { FailingAllocation::release(memory); }
+void operator delete[](void* memory) noexcept { FailingAllocation::release(memory); }
+void operator delete(void* memory, std::size_t) noexcept { FailingAllocation::release(memory); }
+void operator delete[](void* memory, std::size_t) noexcept { FailingAllocation::release(memory); }

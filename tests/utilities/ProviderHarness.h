@@ -45,7 +45,7 @@ public:
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {
         script.argsOf = std::string(className) + "." + method;
-        args.addElement(new zemString("Reason"));
+        args.addElement(std::make_unique<zemString>("Reason"));
     }
     const char* getMessageBundlePath() override { return script.bundle.c_str(); }
 };

@@ -1,4 +1,8 @@
 #include <gtest/gtest.h>
+#include <signal.h>
+#include <unistd.h>
+
+#include <vector>
 
 #include "Log.h"
 #include "ProviderTracer.h"
@@ -72,6 +76,60 @@ TEST_F(ProviderTracer, SurvivesEveryBroker) {
     zemProviderTracer::_traceEnter(&broker, nullptr, 1, "P", nullptr);
     EXPECT_EQ(line("<f:1> Entering method thrown") + line("<:1> Entering method "),
               testing::internal::GetCapturedStdout());
+}
+
+// A client's text cannot begin a line of its own, and what comes of it fits the buffer; the
+// library's own texts of several lines are indented, and stay.
+TEST_F(ProviderTracer, EscapesControlCharacters) {
+    const std::pair<std::string, std::string> rows[] = {
+        {"k\n<zem350Log-prefix>forged", "k\\n<zem350Log-prefix>forged"},
+        {"\r\x1b[2J\x7f\tk\\n\xc3\xa4", "\\r\\x1B[2J\\x7F\tk\\n\xc3\xa4"},
+        {"{\n    a = 1}\n\tid\n", "{\n    a = 1}\n\tid\n"},
+    };
+    std::string lines;
+    for (const auto& [text, escaped] : rows) {
+        zemProviderTracer::_traceString(&broker, "f", 1, 4, "P", "%s", text.c_str());
+        EXPECT_EQ("4P<f:1> " + escaped, traced);
+        lines += line("<f:1> " + escaped);
+    }
+    zemLog::LogPlain("a\nb");
+    EXPECT_EQ(lines + "a\\nb\n", testing::internal::GetCapturedStdout());
+    zemProviderTracer::_traceString(&broker, "f", 1, 4, "P", "%s",
+                                    std::string(999, '\x01').c_str());
+    EXPECT_EQ(2U + 1023U, traced.size());
+    EXPECT_EQ(0U, traced.find("4P<f:1> \\x01\\x01"));
+}
+
+// Standard output without a reader, and closed: nobody gets a signal, now or later, and one that
+// waits for this thread stays.
+TEST(Log, AReaderThatIsGoneHarmsNobody) {
+    std::fflush(stdout);
+    const int saved = dup(STDOUT_FILENO);
+    int ends[2];
+    ASSERT_EQ(0, pipe(ends));
+    dup2(ends[1], STDOUT_FILENO);
+    for (const int end : ends) close(end);
+    sigset_t none, pipeSignal, seen, waiting;
+    sigemptyset(&none);
+    sigemptyset(&pipeSignal);
+    sigaddset(&pipeSignal, SIGPIPE);
+    const auto waits = [&](const sigset_t& mask) {
+        pthread_sigmask(SIG_SETMASK, &mask, nullptr);
+        zemLog::Log("nobody reads this");
+        pthread_sigmask(SIG_SETMASK, nullptr, &seen);
+        sigpending(&waiting);
+        return sigismember(&waiting, SIGPIPE) + 10 * sigismember(&seen, SIGPIPE);
+    };
+    const int open = waits(none), held = waits(pipeSignal);
+    raise(SIGPIPE);
+    const int raised = waits(pipeSignal);
+    const timespec now = {};
+    sigtimedwait(&pipeSignal, nullptr, &now);
+    close(STDOUT_FILENO);
+    const int closed = waits(none);
+    dup2(saved, STDOUT_FILENO);
+    close(saved);
+    EXPECT_EQ((std::vector<int>{0, 10, 11, 0}), (std::vector<int>{open, held, raised, closed}));
 }
 
 }  // namespace

@@ -1,4 +1,6 @@
+#include <fcntl.h>
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -135,6 +137,51 @@ TEST_F(TraceToolTest, ThreadsLinesArriveWholeAndInOrder) {
         }
     }
     EXPECT_EQ(std::count(next, next + threadCount, lineCount), threadCount);
+}
+
+// What lies at the file's name cannot keep an operation waiting or lead it elsewhere.
+TEST_F(TraceToolTest, OpensNothingButAFileOfItsOwn) {
+    const auto fill = [this] {
+        alarm(20);
+        for (int i = 0; i < 50; ++i) CTimeLogerManager::getInstance()->log("fill");
+        usleep(700000);  // more than a poll of the drain
+        for (const auto& entry : fs::directory_iterator("/proc/self/fd")) {
+            std::error_code gone;
+            if (fs::read_symlink(entry, gone) != m_trace) continue;
+            const int fd = std::stoi(entry.path().filename());
+            EXPECT_EQ(FD_CLOEXEC, fcntl(fd, F_GETFD));
+        }
+    };
+    ASSERT_EQ(0, mkfifo(m_trace.c_str(), 0600));
+    run("", m_trace.c_str(), fill);
+    fs::remove(m_trace);
+    fs::create_symlink(m_output + ".linked", m_trace);
+    run("", m_trace.c_str(), fill);
+    EXPECT_FALSE(fs::exists(m_output + ".linked"));
+    fs::remove(m_trace);
+    run("", m_trace.c_str(), fill);
+    EXPECT_EQ(fs::perms::owner_read | fs::perms::owner_write, fs::status(m_trace).permissions());
+    EXPECT_EQ(50U, lines(contents(m_trace)).size());
+}
+
+// Threads may still be timing when the process has begun to end; a child of a fork has no thread
+// that it could wait for.
+TEST_F(TraceToolTest, LateLinesAreDropped) {
+    run("", m_trace.c_str(), [] {
+        static CTimeLoger* logger = nullptr;
+        const auto late = [] {
+            for (int i = 0; i < 100; ++i) logger->end("late");
+            CTimeLogerManager::getInstance()->getLogger("later")->begin("late");
+        };
+        std::atexit(late);  // runs behind the end of all that is made from here on
+        logger = CTimeLogerManager::getInstance()->getLogger("op");
+        const pid_t child = fork();
+        if (child == 0) std::exit(0);
+        int status = -1;
+        EXPECT_EQ(child, waitpid(child, &status, 0));
+        EXPECT_EQ(0, status);
+    });
+    EXPECT_TRUE(lines(contents(m_trace)).empty());
 }
 
 TEST_F(TraceToolTest, FileLoggerWritesAtOnce) {

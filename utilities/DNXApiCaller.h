@@ -5,8 +5,9 @@
 /// result, a return code) into the failure that callers expect; zemApiProp reads one object:
 ///
 ///     const zemApiReader reader = {"zemHostSystem", "getAllHostSystem", "getAllCecs"};
-///     for (apiProp& host : zemApiObjects(reader, zemApiCaller().getAllCecs(user, 1))) {
-///         names.add(new zemString(zemApiProp(&host).getProperty("UserDefinedName")));
+///     const zemApiObjects hosts(reader, zemApiCaller().getAllCecs(user, 1));
+///     for (apiProp& host : hosts) {
+///         puts(zemApiProp(&host).getProperty("UserDefinedName"));
 ///     }
 ///
 /// Results are large: hold them for as long as they are read, and never copy a record.

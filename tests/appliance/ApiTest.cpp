@@ -1,13 +1,15 @@
-// The management library: its levels, how it refuses and fails, threads and size. That it and the
-// tools tell one story is in AgreementTest.cpp.
+// The management library: its keys and the forms of its values, its levels, how it refuses and
+// fails, threads and size.
 
 #include <atomic>
 #include <chrono>
+#include <cstring>
 #include <functional>
 #include <thread>
 
 #include "ApiAnswer.h"
 #include "Store.h"
+#include "Text.h"
 
 namespace {
 
@@ -28,6 +30,111 @@ TEST_F(ApiTest, ShortReadsLeaveTheRestAway) {
     const Answer idle(getLparObj("", "2*1111-AAC*0000003", 2));
     EXPECT_EQ("2", idle.value(0, "DefinitionState"));
     EXPECT_EQ("null,", idle.value(0, "Curr_prof"));
+}
+
+/// All that the object at @p index tells, as "key=value" with semicolons behind them.
+std::string told(const Answer& answer, int index) {
+    std::string text;
+    const apiProp& record = *answer.record(index);
+    for (int i = 0; i < record.propertyCount; ++i) {
+        text += std::string(record.name[i]) + '=' + record.value[i] + ';';
+    }
+    return text;
+}
+
+/// Lets current, pending and running amounts of a partition differ.
+void spreadAmounts(const std::string& partition) {
+    appliance::Store store = appliance::Store::open(appliance::Database::Access::Write);
+    appliance::Transaction change = store.write();
+    for (appliance::Object& lpar : store.all(appliance::Kind::Lpar)) {
+        if (lpar.get("name") != partition) continue;
+        int number = 1;
+        for (const std::string& name : appliance::split(
+                 "curr_min_mem,curr_mem,curr_max_mem,pend_min_mem,pend_mem,pend_max_mem,"
+                 "run_min_mem,run_mem,run_mem_weight,run_io_entitled_mem,curr_min_procs,curr_procs,"
+                 "curr_max_procs,pend_min_procs,pend_procs,pend_max_procs,run_procs,"
+                 "curr_min_proc_units,curr_proc_units,curr_max_proc_units,pend_min_proc_units,"
+                 "pend_proc_units,pend_max_proc_units,run_proc_units,curr_uncap_weight,"
+                 "pend_uncap_weight,run_uncap_weight")) {
+            lpar.set(name, std::to_string(number++) + lpar.get(name));
+        }
+        store.put(lpar);
+    }
+    change.commit();
+}
+
+// What each family has in its records, in the library's words and units.
+TEST_F(ApiTest, EveryKeyHasItsValue) {
+    make("init");
+    spreadAmounts("osq dev");
+    const char* const db = "4*1111-AAA*0000001";
+    const char* const idle = "4*1111-AAB*0000002";
+    // clang-format off
+    const struct {
+        apiProp* result;
+        int index;
+        const char* told;
+    } rows[] = {
+        {getCecObj("", kHost, 2), 0, "Name=1111-AAA*0000001;UserDefinedName=alpha;State=1;PrimaryFSP_IP=10.0.0.1;BackupFSP_IP=172.0.0.1;RuntimeCapability=1073741824;ProcCompatModesSupported=[63,2,3,4];Capability=0;GlvExCaps=[104,97,16,0,0,16,0,0];ConfigurableProcUnits=27.00;PendAvailProcUnits=21.50;"},
+        {getLparObj("", db, 2), 0, "Name=4*1111-AAA*0000001;UserDefinedName=db,main;DefinitionState=1;PartitionState=2;BootMode=3;MigrationState=9;Lpar_env=tmxlinux;Default_prof=0,normal;Curr_prof=0,normal;Keylock=2;RedundantPath=0;ProcCompatMode=3;ActualProcCompatMode=3;PowerOnWithHypervisor=0;"},
+        {getLparProfile("", kLpar, "normal", 2), 0, "Name=0*3*1111-AAA*0000001;PartitionName=3*1111-AAA*0000001;UserDefinedName=normal;DefinitionState=1;SFPSurveillance=1;lpar_env=tmxlinux;lpar_name=web server;AutoIPLEnabled=0;MaxVirtualSlots=10;BootMode=1;RedundantPath=0;ProcMode=1;ProcessorMode=63;SharingMode=1;DonorMode=0;UncappedWeight=128;MinProcUnit=75;DesiredProcUnit=150;MaxProcUnit=300;MinimumCPUCount=1;DesiredCPUCount=2;MaximumCPUCount=4;SharedProcPoolId=1;MinimumMemory=4096;DesiredMemory=8192;MaximumMemory=16384;MemMode=0;VRMWeight=128;EntitledMode=1;EntMem=0;AltConsoleDRCIndex=none;AltLoadSourceDRCIndex=none;ConsoleDRCIndex=none;LoadSourceDRCIndex=none;ECSDRCIndex=none;virtual_serial_adapters=0/server/1/any//any/1,1/server/1/any//any/1;virtual_scsi_adapters=3/client/1/xbrg1/13/1;virtual_eth_adapters=2/0/4//0/0/default;io_slots=none;"},
+        {getLparProfile("", "6*1111-AAA*0000001", "normal", 2), 0, "Name=0*6*1111-AAA*0000001;PartitionName=6*1111-AAA*0000001;UserDefinedName=normal;DefinitionState=129;SFPSurveillance=0;lpar_env=osq00;lpar_name=Büro-Prüfstand;AutoIPLEnabled=0;MaxVirtualSlots=10;BootMode=1;RedundantPath=0;ProcMode=255;ProcessorMode=63;SharingMode=0;DonorMode=0;UncappedWeight=0;MinProcUnit=100;DesiredProcUnit=300;MaxProcUnit=600;MinimumCPUCount=1;DesiredCPUCount=3;MaximumCPUCount=6;SharedProcPoolId=null;MinimumMemory=4096;DesiredMemory=8192;MaximumMemory=16384;MemMode=255;VRMWeight=0;EntitledMode=0;EntMem=null;AltConsoleDRCIndex=none;AltLoadSourceDRCIndex=30000005;ConsoleDRCIndex=dnx;LoadSourceDRCIndex=30000005;ECSDRCIndex=none;virtual_serial_adapters=0/server/1/any//any/1,1/server/1/any//any/1;virtual_scsi_adapters=none;virtual_eth_adapters=2/0/3//0/0/default;io_slots=30000005/none/1;"},
+        {getCecMemoryCfg("", kHost, 2), 0, "Name=1111-AAA*0000001;ConfigurableMem=131072;InstalledMemory=131072;MaxMemPools=1;PendAvailMem=83968;LMBSize=256;"},
+        {getCecMemoryPoolCfg("", kHost, 2), 0, "SystemName=1111-AAA*0000001;curr_pool_mem=8192;pend_pool_mem=8192;pend_avail_pool_mem=7680;"},
+        {getCecProcessorCfg("", kHost, 2), 0, "Name=1111-AAA*0000001;ConfigurableProcUnits=32.00;CurAvailProcUnits=21.50;InstalledProcessors=32;MaxProcPools=64;MinProcUnit=0.05;PendAvailProcUnits=21.50;"},
+        {getCecProcessorPoolCfg("", kHost, 2), 1, "SystemName=1111-AAA*0000001;SharedProcPoolId=1;MaxPoolCapacity=8.00;PendReservedPoolCapacity=0.0;lpar_ids=3,4;"},
+        {getLparMemoryCfg("", idle, 2), 0, "Name=4*1111-AAB*0000002;UserDefinedName=osq dev;CurAllocMem=24096;CurMaxMem=38192;CurMinMem=12048;PendAllocMem=54096;PendMaxMem=68192;PendMinMem=42048;RuntimeEntMem=100;RuntimeMem=80;RuntimeVRMWeight=90;RuntimeMinMem=70;EntUsage=0;CurrMemMode=255;"},
+        {getLparProcessorCfg("", idle, 2), 0, "Name=4*1111-AAB*0000002;UserDefinedName=osq dev;CurMaxProcs=132;CurMaxProcUnits=20200;CurMinProcs=111;CurMinProcUnits=18100;CurProcMode=255;CurAllocProcs=121;CurAllocProcUnits=19100;CurDonorMode=1;CurSharingMode=0;CurUncappedWeight=250;PendMaxProcs=162;PendMaxProcUnits=23200;PendMinProcs=141;PendMinProcUnits=21100;PendProcMode=255;PendAllocProcs=151;PendAllocProcUnits=22100;PendDonorMode=1;PendSharingMode=0;PendUncappedWeight=260;RuntimeProcs=170;RuntimeProcUnits=24000;RuntimeUncappedWeight=270;"},
+        {getLparVirtualEthernet("", db, 2), 1, "Name=4*1111-AAA*0000001;lpar_id=4;lpar_name=db,main;slot_num=5;state=1;mac_addr=A20001000405;ieee_virtual_eth=1;port_vlan_id=7;addl_vlan_ids=20,30;is_required=false;is_trunk=0;trunk_priority=0;vswitch=storage;"},
+        {getLparVirtualScsi("", kLpar, 2), 0, "Name=3*1111-AAA*0000001;lpar_name=web server;slot_num=3;state=1;adapter_type=0;backing_devices=none;remote_lpar_id=1;remote_lpar_name=xbrg1;remote_slot_num=13;is_required=true;"},
+        {getLparVirtualSerial("", "2*1111-AAA*0000001", 2), 2, "Name=2*1111-AAA*0000001;lpar_name=xbrg2;slot_num=7;state=1;adapter_type=1;connect_status=1;is_required=false;remote_lpar_id=4;remote_lpar_name=db,main;remote_slot_num=6;supports_dnx=0;"},
+        {getIoSlots("", kHost, 2), 2, "SystemName=1111-AAA*0000001;lpar_id=1;lpar_name=xbrg1;drc_index=30000001;drc_name=U2222.001.0000001-P1-C1;bus_grouping=0;bus_id=1;description=Storage controller;feature_codes=[2201,2202];iop=false;parent_slot_drc_index=null;pci_class=260;pci_device_id=257;pci_revision_id=1;pci_subs_device_id=258;pci_subs_vendor_id=4660;pci_vendor_id=4660;slot_io_pool_id=65535;unit_phys_loc=U2222.001.0000001;"},
+    };
+    // clang-format on
+    for (const auto& row : rows) {
+        const Answer answer(row.result);
+        ASSERT_LT(row.index, answer.size());
+        EXPECT_EQ(row.told, told(answer, row.index));
+    }
+}
+
+TEST_F(ApiTest, NarrowerOperationsGiveTheSameRecords) {
+    make("init");
+    const Answer hosts(getAllCecs("", 1)), lpars(getAllLpars("", 1));
+    const struct {
+        OfAll all;
+        OfKey ofHost, ofLpar;  // null where there is none
+    } rows[] = {
+        {getAllCecs, getCecObj, nullptr},
+        {getAllLpars, getAllLparsFromCec, getLparObj},
+        {getAllLparProfiles, getAllLparProfilesFromCec, getAllLparProfilesFromLpar},
+        {getAllCecMemoryCfg, getCecMemoryCfg, nullptr},
+        {getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, nullptr},
+        {getAllCecProcessorCfg, getCecProcessorCfg, nullptr},
+        {getAllCecProcessorPoolCfg, getCecProcessorPoolCfg, nullptr},
+        {getAllLparMemoryCfgs, getAllLparMemoryCfg, getLparMemoryCfg},
+        {getAllLparProcessorCfgs, getAllLparProcessorCfg, getLparProcessorCfg},
+        {getAllLparVirtualEthernet, getVirtualEthernet, getLparVirtualEthernet},
+        {getAllLparVirtualScsi, getVirtualScsi, getLparVirtualScsi},
+        {getAllLparVirtualSerial, getVirtualSerial, getLparVirtualSerial},
+        {getAllIoSlots, getIoSlots, nullptr},  // free ones belong to no partition
+    };
+    for (const auto& row : rows) {
+        const Answer all(row.all("", 2));
+        for (const auto& [of, keys] :
+             {std::pair(row.ofHost, &hosts), std::pair(row.ofLpar, &lpars)}) {
+            int next = 0;
+            for (int key = 0; of != nullptr && key < keys->size(); ++key) {
+                const Answer some(of("", keys->value(key, "Name").c_str(), 2));
+                ASSERT_EQ(API_SUCCESS, some.code());
+                for (int i = 0; i < some.size(); ++i, ++next) {
+                    EXPECT_EQ(0, std::memcmp(all.record(next), some.record(i), sizeof(apiProp)));
+                }
+            }
+            EXPECT_EQ(of == nullptr ? 0 : all.size(), next);
+        }
+    }
+    EXPECT_EQ(2, Answer(getLparIoSlots("", "1*1111-AAA*0000001", 1)).size());
 }
 
 // Refusals.

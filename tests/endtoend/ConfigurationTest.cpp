@@ -148,7 +148,7 @@ void expectLibraryTells(const Configuration& all, zemHostSystem& host, const zem
         profile.getDesiredProcUnits());
 }
 
-TEST(ConfigurationTest, BothDoorsTellWhatWasAskedFor) {
+TEST(ConfigurationTest, ToolsAndLibraryTellWhatWasAskedFor) {
     TestAppliance appliance{ZEM_PROGRAMS};
     ASSERT_EQ(0, appliance.run("appliance init").exit);
     zemHostSystem host(kHost, "", "");

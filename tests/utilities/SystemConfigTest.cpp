@@ -14,6 +14,7 @@
 #include "LibrarySpy.h"
 #include "NwplatCmdCaller.h"
 #include "QyplatCmdCaller.h"
+#include "Store.h"
 #include "SystemConfig.h"
 #include "ToolFolder.h"
 
@@ -285,6 +286,53 @@ TEST_F(SystemConfigTest, NumbersHaveWords) {
     // clang-format on
     for (const auto& [text, state] : texts)
         EXPECT_EQ(state, Partition::getMigrationStateFromString(text)) << text;
+}
+
+// What the appliance has as a word reaches objects as a number that stands for the same word.
+TEST_F(SystemConfigTest, WordsSurviveTheLibrary) {
+    using appliance::Kind;
+    makeAppliance();
+    Partition partition;
+    const struct {
+        Kind kind;
+        const char* attribute;
+        std::function<zemString(int)> word;
+        std::function<zemString()> read;
+    } rows[] = {
+        {Kind::Host, "state", zemHostSystem::getStateByID,
+         [&] { return zemHostSystem::getStateByID(m_host.getState()); }},
+        {Kind::Lpar, "state", Partition::getStateByID,
+         [&] { return Partition::getStateByID(partition.getState()); }},
+        {Kind::Lpar, "boot_mode", Partition::getBootModeByID,
+         [&] { return Partition::getBootModeByID(partition.getBootMode()); }},
+        {Kind::Lpar, "lpar_keylock", Partition::getKeyLockByID,
+         [&] { return Partition::getKeyLockByID(partition.getKeyLock()); }},
+        {Kind::Lpar, "migration_state",
+         [](int n) {
+             const char* const words[] = {"Not Migrating",     "Migration Starting",
+                                          "Migration Stopped", "Migration In Progress",
+                                          "Lost Connection",   "Migration Complete"};
+             return zemString(n < 6 ? words[n] : "");
+         },
+         [&] { return partition.getMigrationStateString(); }},
+    };
+    for (const auto& row : rows) {
+        for (int number = 0; number < 256; ++number) {
+            const zemString word = row.word(number);
+            if (word.isEmpty() || word == "unknown") continue;
+            {
+                auto store = appliance::Store::open(appliance::Database::Access::Write);
+                appliance::Transaction change = store.write();
+                appliance::Object object = store.all(row.kind).at(row.kind == Kind::Host ? 0 : 2);
+                object.set(row.attribute, static_cast<const char*>(word));
+                store.put(object);
+                change.commit();
+            }
+            makeObjects("", "");
+            partition = m_partition;
+            EXPECT_STREQ(word, row.read()) << row.attribute;
+        }
+    }
 }
 
 TEST_F(SystemConfigTest, LinesOfTheTools) {

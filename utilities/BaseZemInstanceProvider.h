@@ -2,6 +2,8 @@
 /// server.
 ///
 ///     class DiskProvider : public zemBaseZemInstanceProvider {
+///         using zemBaseZemInstanceProvider::enumInstances;  // those of the frame stay visible
+///         using zemBaseZemInstanceProvider::getInstance;
 ///         int getInstance(const CmpiContext&, const CmpiObjectPath& cop, const char**,
 ///                         CmpiInstance& out) override;
 ///         void enumInstances(const CmpiContext&, const CmpiObjectPath& cop, const char**,

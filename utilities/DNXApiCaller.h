@@ -5,8 +5,7 @@
 /// result, a return code) into the failure that callers expect; zemApiProp reads one object:
 ///
 ///     const zemApiReader reader = {"zemHostSystem", "getAllHostSystem", "getAllCecs"};
-///     const zemApiObjects hosts(reader, zemApiCaller().getAllCecs(user, 1));
-///     for (apiProp& host : hosts) {
+///     for (apiProp& host : zemApiObjects(reader, zemApiCaller().getAllCecs(user, 1))) {
 ///         puts(zemApiProp(&host).getProperty("UserDefinedName"));
 ///     }
 ///

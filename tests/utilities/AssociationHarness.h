@@ -20,7 +20,7 @@
 #include "FailureText.h"
 #include "MultiNtoNAssociationProvider.h"
 #include "NtoNAssociationProvider.h"
-#include "ProviderFactories.h"
+#include "InProcessFactories.h"
 
 inline constexpr const char* kNameSpace = "root/cimv2";
 inline const cimom::AssociationFilter kNone = {"Test_Link", "", "", ""};

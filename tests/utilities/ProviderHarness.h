@@ -12,7 +12,7 @@
 #include "BaseProvider.h"
 #include "ClassRepository.h"
 #include "FailureText.h"
-#include "ProviderFactories.h"
+#include "InProcessFactories.h"
 
 /// What the provider answers, and what it was asked.
 struct Script {

@@ -1,7 +1,6 @@
 #include <algorithm>
 #include <string>
 #include <unordered_map>
-#include <unordered_set>
 #include <utility>
 
 #include "ClassRepository.h"
@@ -16,7 +15,6 @@ constexpr std::size_t kMaxLineage = 64;
 // Each class lists what it inherits, so a small text can stand for lists of any size.
 constexpr std::size_t kMaxListed = 2000000;
 
-using NameSet = std::unordered_set<std::string_view, NameHash, NameEqual>;
 template <class T>
 using NameMap = std::unordered_map<std::string_view, T, NameHash, NameEqual>;
 

@@ -4,10 +4,13 @@
 
 #include <CLI/CLI.hpp>
 #include <algorithm>
+#include <cerrno>
 #include <chrono>
 #include <condition_variable>
 #include <csignal>
 #include <cstdio>
+#include <cstring>
+#include <iostream>
 #include <map>
 #include <mutex>
 #include <thread>
@@ -20,6 +23,7 @@ namespace {
 using cimom::Arguments;
 
 constexpr int kUsageError = 64;
+constexpr int kOutputError = 74;
 constexpr int kSetupError = 78;
 
 struct Settings {
@@ -47,8 +51,8 @@ const char* const kFooter =
     "among the results.\n"
     "\n"
     "A failure prints the name, number and message of its CIM status on standard error; the exit\n"
-    "code is that number. Exit code 64 is a wrong command line, 78 a registration or schema that\n"
-    "cannot be used.";
+    "code is that number. Exit code 64 is a wrong command line, 74 an output that cannot be\n"
+    "written, 78 a registration or schema that cannot be used.";
 
 void addGlobals(CLI::App& app, Settings& settings) {
     const std::map<std::string, cimom::Character> characters = {{"full", cimom::Character::Full},
@@ -149,6 +153,11 @@ CLI::App* addVerb(CLI::App& app, const cimom::Verb& row, Settings& settings, Arg
     return verb;
 }
 
+int reportOutput(int error) {
+    std::fprintf(stderr, "cimom: standard output: %s\n", std::strerror(error));
+    return kOutputError;
+}
+
 int reportFailure(CMPIrc rc, const std::string& message) {
     std::fprintf(stderr, "%s (%d): %s\n", cimom::statusName(rc), static_cast<int>(rc),
                  message.c_str());
@@ -224,7 +233,8 @@ int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments)
     try {
         const cimom::Reply reply = verb.run(session, arguments);
         waiting.end();
-        return reply.ok() ? 0 : reportFailure(reply.rc, reply.message);
+        if (!reply.ok()) return reportFailure(reply.rc, reply.message);
+        return out.failure() == 0 ? 0 : reportOutput(out.failure());
     } catch (const cimom::Failure& failure) {
         waiting.end();
         return reportFailure(failure.rc(), failure.what());
@@ -245,7 +255,8 @@ int runCommandLine(int argc, char** argv) {
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
-        return app.exit(error) == 0 ? 0 : kUsageError;
+        if (app.exit(error) != 0) return kUsageError;
+        return std::cout.flush() ? 0 : reportOutput(errno);
     }
     return run(*chosen, settings, arguments);
 }

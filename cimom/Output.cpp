@@ -38,7 +38,10 @@ bool ResultStream::write(const std::string& text) {
     if (m_hook) std::exchange(m_hook, nullptr)();
     for (std::size_t done = 0; done < text.size();) {
         const ssize_t count = ::write(m_descriptor, text.data() + done, text.size() - done);
-        if (count < 0 && errno != EINTR) return false;
+        if (count < 0 && errno != EINTR) {
+            if (errno != EPIPE) m_failure = errno;
+            return false;
+        }
         if (count > 0) done += static_cast<std::size_t>(count);
     }
     return true;
@@ -65,9 +68,11 @@ Json toJson(const Value& value) {
     return value.type() == CMPI_instance ? toJson(value.instance()) : Json(plainText(value));
 }
 
+// The names are known to differ, and so are put behind one another, not looked for.
 Json toJson(const NamedValues& values) {
-    Json object = Json::object();
-    for (const auto& [name, value] : values) object[name] = toJson(value);
+    Json::object_t object;
+    for (const auto& [name, value] : values)
+        object.Json::object_t::Container::emplace_back(name, toJson(value));
     return object;
 }
 

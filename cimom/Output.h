@@ -28,11 +28,14 @@ public:
     /// Has @p hook called once, before anything is written.
     void beforeFirstWrite(std::function<void()> hook) { m_hook = std::move(hook); }
 
-    /// @return false when the reader has gone
+    /// @return false when the reader has gone, or what was written cannot be kept
     bool write(const std::string& text);
+    /// Why a write failed, as errno; 0 when none did, or the reader has gone, who knows it.
+    int failure() const { return m_failure; }
 
 private:
     int m_descriptor;
+    int m_failure = 0;
     std::function<void()> m_hook;
 };
 

@@ -10,6 +10,8 @@
 #include <limits>
 #include <new>
 
+#include "Failure.h"
+
 namespace cimom {
 
 namespace {
@@ -17,6 +19,7 @@ namespace {
 constexpr std::size_t kDateTimeLength = 25;
 constexpr std::size_t kPointAt = 14;
 constexpr std::size_t kSignAt = 21;
+constexpr std::size_t kLookedThrough = 64;  // entries
 constexpr std::uint64_t kMicrosPerSecond = 1000000;
 constexpr std::uint64_t kSecondsPerDay = 86400;
 
@@ -62,6 +65,15 @@ bool validFields(const std::string& text, const Field (&fields)[N]) {
         if (value < field.low || value > field.high) return false;
     }
     return true;
+}
+
+template <class T>
+std::shared_ptr<const T> nested(const T& object, unsigned nesting) {
+    if (nesting >= Value::kMostNested)
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER,
+                      "paths and instances lie in one another more than " +
+                          std::to_string(Value::kMostNested) + " deep");
+    return std::make_shared<const T>(object);
 }
 
 // Range check and conversion between the integer representations.
@@ -214,9 +226,22 @@ Value::Value(const char* text) : m_type(CMPI_string) {
 Value::Value(std::string text) : m_data(std::move(text)), m_type(CMPI_string) {}
 Value::Value(DateTime when) : m_data(std::move(when)), m_type(CMPI_dateTime) {}
 Value::Value(const ObjectPath& path)
-    : m_data(std::make_shared<const ObjectPath>(path)), m_type(CMPI_ref) {}
+    : m_data(nested(path, path.keys.nesting())), m_type(CMPI_ref) {}
 Value::Value(const Instance& embedded)
-    : m_data(std::make_shared<const Instance>(embedded)), m_type(CMPI_instance) {}
+    : m_data(
+          nested(embedded, std::max(embedded.path.keys.nesting(), embedded.properties.nesting()))),
+      m_type(CMPI_instance) {}
+
+unsigned Value::nesting() const {
+    if (isNull()) return 0;
+    if (m_type == CMPI_ref) return 1 + reference().keys.nesting();
+    if (m_type == CMPI_instance)
+        return 1 + std::max(instance().path.keys.nesting(), instance().properties.nesting());
+    unsigned most = 0;
+    if (m_type == CMPI_refA || m_type == CMPI_instanceA)
+        for (const Value& element : elements()) most = std::max(most, element.nesting());
+    return most;
+}
 
 void Value::retypeNull(CMPIType type) {
     if (isNull()) m_type = type;
@@ -294,6 +319,7 @@ NamedValues::NamedValues(const NamedValues& other) : m_block(other.m_block) {
 NamedValues::~NamedValues() {
     if (!m_block || m_block->users.fetch_sub(1, std::memory_order_acq_rel) != 1) return;
     std::destroy_n(m_block->entries(), m_block->size);
+    m_block->~Block();
     ::operator delete(m_block);
 }
 
@@ -311,6 +337,11 @@ void NamedValues::makeOwn(std::size_t room) {
     else
         std::uninitialized_copy_n(begin(), size(), entries);
     other.m_block->size = static_cast<std::uint32_t>(size());
+    other.m_block->nesting = nesting();
+    if (room > kLookedThrough) {
+        other.m_block->index = std::make_unique<Index>(room);
+        for (std::size_t i = 0; i < size(); ++i) other.m_block->index->emplace(entries[i].name, i);
+    }
     std::swap(m_block, other.m_block);
 }
 
@@ -318,13 +349,17 @@ void NamedValues::set(const std::string& name, Value value) {
     const std::size_t at = indexOf(name);
     if (at == size()) return add(name, std::move(value));
     makeOwn(size());
+    m_block->nesting = std::max(m_block->nesting, value.nesting());
     m_block->entries()[at].value = std::move(value);
 }
 
 void NamedValues::add(const std::string& name, Value value) {
     makeOwn(size() + 1);
-    new (m_block->entries() + m_block->size) Entry{name, std::move(value)};
+    const unsigned nesting = value.nesting();
+    Entry* const entry = new (m_block->entries() + m_block->size) Entry{name, std::move(value)};
     ++m_block->size;
+    m_block->nesting = std::max(m_block->nesting, nesting);
+    if (m_block->index) m_block->index->emplace(entry->name, m_block->size - 1);
 }
 
 const Value* NamedValues::find(const std::string& name) const {
@@ -334,6 +369,10 @@ const Value* NamedValues::find(const std::string& name) const {
 
 // The number of entries when there is none of that name.
 std::size_t NamedValues::indexOf(const std::string& name) const {
+    if (m_block && m_block->index) {
+        const auto found = m_block->index->find(name);
+        return found == m_block->index->end() ? size() : found->second;
+    }
     return static_cast<std::size_t>(
         std::find_if(begin(), end(),
                      [&](const Entry& entry) { return sameName(entry.name, name); }) -

@@ -14,6 +14,8 @@
 #include <string>
 #include <string_view>
 #include <type_traits>
+#include <unordered_map>
+#include <unordered_set>
 #include <utility>
 #include <variant>
 #include <vector>
@@ -36,6 +38,7 @@ struct NameEqual {
 struct NameHash {
     std::size_t operator()(std::string_view name) const;
 };
+using NameSet = std::unordered_set<std::string, NameHash, NameEqual>;
 
 bool isInteger(CMPIType type);
 bool isReal(CMPIType type);
@@ -94,17 +97,22 @@ public:
         else
             m_data = static_cast<std::uint64_t>(v);
     }
-    Value(const char* text);          // NOLINT
-    Value(std::string text);          // NOLINT
-    Value(DateTime when);             // NOLINT
+    Value(const char* text);  // NOLINT
+    Value(std::string text);  // NOLINT
+    Value(DateTime when);     // NOLINT
+    /// @throws Failure CMPI_RC_ERR_INVALID_PARAMETER when it holds others more than kMostNested
+    ///         deep: whatever walks through values calls itself once a level
     Value(const ObjectPath& path);    // NOLINT
     Value(const Instance& embedded);  // NOLINT
+    static constexpr unsigned kMostNested = 50;
 
     CMPIType type() const { return m_type; }
     bool isNull() const { return m_data.index() == 0; }
     bool isArray() const { return (m_type & CMPI_ARRAY) != 0; }
     /// Whether it is an integer with a sign.
     bool isSigned() const { return (m_type & CMPI_SINT) == CMPI_SINT; }
+    /// How deep paths and instances lie in one another here; 0 for a value without one.
+    unsigned nesting() const;
     /// Gives a null its type; a value keeps its own.
     void retypeNull(CMPIType type);
 
@@ -180,6 +188,8 @@ public:
     const Value* find(const std::string& name) const;
 
     std::size_t size() const { return m_block ? m_block->size : 0; }
+    /// The most that a value here has, or had before it was replaced.
+    unsigned nesting() const { return m_block ? m_block->nesting : 0; }
     bool empty() const { return size() == 0; }
     const Entry* begin() const { return m_block ? m_block->entries() : nullptr; }
     const Entry* end() const { return begin() + size(); }
@@ -189,13 +199,17 @@ public:
 
 private:
     // Copies share a block until one of them changes, for what a provider made and what the
-    // client is answered are mostly the same. The entries lie behind the head of the block.
+    // client is answered are mostly the same. The entries lie behind the head of the block. Few
+    // are looked through; many have an index, of the first of each name.
+    using Index = std::unordered_map<std::string_view, std::size_t, NameHash, NameEqual>;
     struct alignas(Entry) Block {
         Entry* entries() { return reinterpret_cast<Entry*>(this + 1); }
 
         std::atomic<std::uint32_t> users{1};
         std::uint32_t size = 0;
         std::uint32_t room = 0;
+        std::uint32_t nesting = 0;
+        std::unique_ptr<Index> index;
     };
     void makeOwn(std::size_t room);
     std::size_t indexOf(const std::string& name) const;

@@ -32,14 +32,14 @@ protected:
         m_folder.write("fixture.json", json.dump());
     }
 
-    pid_t start(std::vector<std::string> arguments) {
+    pid_t start(std::vector<std::string> arguments, const char* out = "out") {
         arguments.insert(arguments.begin(), CIMOM_PROGRAM);
         std::vector<char*> argv;
         for (std::string& each : arguments) argv.push_back(each.data());
         argv.push_back(nullptr);
         const pid_t child = fork();
         if (child == 0) {
-            if (chdir((m_folder / "").c_str()) != 0 || !freopen("out", "w", stdout) ||
+            if (chdir((m_folder / "").c_str()) != 0 || !freopen(out, "w", stdout) ||
                 !freopen("err", "w", stderr))
                 _exit(99);
             setenv("CIMOM_REGISTRATION", "fixture.json", 1);
@@ -114,6 +114,18 @@ TEST_F(CommandLine, FailuresAreTold) {
     const Run help = run({"gi", "--help"});
     EXPECT_EQ(help.exit, 0);
     EXPECT_NE(help.out.find("--properties"), std::string::npos);
+}
+
+TEST_F(CommandLine, OutputThatIsLostIsAFailure) {
+    const std::vector<std::string> rows[] = {
+        {"ein", "Fix_Thing"},
+        {"--format", "json", "gp", "Fix_Thing.Name=\"one\"", "Size"},
+        {"--help"}};
+    for (const auto& row : rows) {
+        const Run result = finish(start(row, "/dev/full"));
+        EXPECT_EQ(result.exit, 74);
+        EXPECT_EQ(result.err, "cimom: standard output: No space left on device\n");
+    }
 }
 
 TEST_F(CommandLine, ProvidersDoNotPrintAmongResults) {

@@ -18,6 +18,7 @@ ObjectTables makeTables(bool lean) {
     std::apply([lean](auto&... table) { ((table.ftVersion = lean ? 1 : CMPIVersion200), ...); },
                tables);
     if (lean) {
+        endTableAfter(std::get<CMPIContextFT>(tables), &CMPIContextFT::getEntryCount);
         endTableAfter(std::get<CMPIInstanceFT>(tables), &CMPIInstanceFT::setObjectPath);
         endTableAfter(std::get<CMPIObjectPathFT>(tables), &CMPIObjectPathFT::getParameterQualifier);
         endTableAfter(std::get<CMPIResultFT>(tables), &CMPIResultFT::returnDone);
@@ -36,6 +37,12 @@ Pool& currentPool(Broker& broker) {
     return activation ? activation->pool() : broker.strays();
 }
 ObjectTables& objectTables(Broker& broker) { return broker.tables(); }
+CMPIData noData(const Broker* broker) {
+    CMPIData data{};
+    data.type = CMPI_null;
+    data.state = broker && broker->lean() ? CMPI_notFound : CMPI_nullValue | CMPI_notFound;
+    return data;
+}
 void countLive(Broker& broker, std::ptrdiff_t by) { broker.live() += by; }
 
 // -- Broker -----------------------------------------------------------------------------------

@@ -152,8 +152,8 @@ void fillErrorTable(ObjectTables& tables);      // ErrorEntries.cpp
 // -- instances by the rules of their class, InstanceEntries.cpp
 // ------------------------------------
 
-/// A new instance of the class of @p path with its keys, and for lean brokers with all other
-/// properties null.
+/// A new instance of the class of @p path with its keys and the defaults of other properties, for
+/// lean brokers with all that have none null.
 /// @throws Failure CMPI_RC_ERR_NOT_FOUND for a class that is not known
 InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path);
 /// Sets a property as a provider does: checked against the class when it is known.

@@ -21,12 +21,15 @@ CMPIObjectPath* newObjectPath(Broker& broker, const char* nameSpace, const char*
     return make<CMPIObjectPath>(broker, ObjectPath(textOf(nameSpace), textOf(className)));
 }
 CMPIArgs* newArgs(Broker& broker) { return make<CMPIArgs>(broker, {}); }
-CMPIString* newString(Broker& broker, const char* text) { return makeString(broker, textOf(text)); }
+CMPIString* newString(Broker& broker, const char* text) {
+    return make<CMPIString>(broker, {textOf(text), !text && broker.lean()});
+}
 CMPIArray* newArray(Broker& broker, CMPICount size, CMPIType type) {
     const Value null = readValue(nullptr, type);
     if (null.isArray() || null.type() == CMPI_null || !isValueType(null.type()))
         throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE, "type " + std::to_string(type));
-    return make<CMPIArray>(broker, {null.type(), Value::Array(size, null)});
+    const CMPIType seen = broker.lean() || type != CMPI_chars ? null.type() : type;
+    return make<CMPIArray>(broker, {seen, Value::Array(size, null)});
 }
 CMPIDateTime* newDateTime(Broker& broker) { return make<CMPIDateTime>(broker, DateTime::now()); }
 CMPIDateTime* newDateTimeFromBinary(Broker& broker, CMPIUint64 micros, CMPIBoolean interval) {
@@ -75,12 +78,13 @@ constexpr const char* kObjectTypes[] = {
     "CMPISelectCond", "CMPISubCond",  "CMPIPredicate",   "CMPIError"};
 static_assert(std::size(kObjectTypes) == kKindCount, "one name for each kind");
 
-// Every CMPI object begins with its hdl.
 Node& anyNode(const void* object) {
-    Node* node = object ? static_cast<Node*>(*static_cast<void* const*>(object)) : nullptr;
-    if (object && !node) countStaleUse();
-    if (!node) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "no object");
-    return *node;
+    if (!object) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "no object");
+    Node& node = nodeAt(object);
+    withKind(node.chunk->kind, [object](auto kind) {
+        nodeOf(static_cast<const typename decltype(kind)::Face*>(object));
+    });
+    return node;
 }
 
 std::string describe(Node& node) {
@@ -96,7 +100,7 @@ std::string describe(Node& node) {
         else if constexpr (std::is_same_v<B, DateTime>)
             return body.text();
         else if constexpr (std::is_same_v<B, ArrayBody>)
-            return printValue(Value::array(body.elementType, body.elements));
+            return printValue(Value::array(stringFor(body.elementType), body.elements));
         else if constexpr (std::is_same_v<B, std::shared_ptr<const Query>>)
             return body->text();
         else if constexpr (std::is_same_v<B, NamedValues>) {
@@ -109,8 +113,13 @@ std::string describe(Node& node) {
     });
 }
 
+// Small brokers have a text for paths and instances alone.
 CMPIString* objectText(Broker& broker, const void* object) {
-    return makeString(broker, describe(anyNode(object)));
+    Node& node = anyNode(object);
+    const std::size_t kind = node.chunk->kind;
+    if (broker.lean() && kind != kindOf<CMPIObjectPath>() && kind != kindOf<CMPIInstance>())
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    return makeString(broker, describe(node));
 }
 const char* typeOfObject(const void* object) { return kObjectTypes[anyNode(object).chunk->kind]; }
 CMPIBoolean isOfType(Broker&, const void* object, const char* type) {
@@ -209,6 +218,14 @@ CMPIString* getMessage2(const CMPIBroker* mb, const char* id, const CMPIMsgFileH
     va_end(list);
     return result;
 }
+// Small brokers have no texts, and give back the one at hand as it is.
+CMPIString* giveMessageBack(const CMPIBroker* mb, const char*, const char* text, CMPIStatus* rc,
+                            CMPICount, ...) {
+    CMPIString* back =
+        brokerEntry(mb, rc, [text](Broker& broker) { return newString(broker, text); });
+    if (back) setStatus(rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    return back;
+}
 // Without a bundle of its own, a text is looked up in the default one.
 CMPIString* getMessage(const CMPIBroker* mb, const char* id, const char* text, CMPIStatus* rc,
                        CMPICount count, ...) {
@@ -252,9 +269,9 @@ CMPIBrokerEncFT encapsulationTable(bool lean) {
                        entryOf<newObjectPath>, entryOf<newArgs>, entryOf<newString>,
                        entryOf<newArray>, entryOf<newDateTime>, entryOf<newDateTimeFromBinary>,
                        entryOf<newDateTimeFromChars>, entryOf<newSelectExp>, entryOf<classPathIsA>,
-                       entryOf<objectText>, entryOf<isOfType>, entryOf<getType>, getMessage,
-                       logMessage, trace, entryOf<newError>, entryOf<openMessageFile>,
-                       entryOf<closeMessageFile>, getMessage2);
+                       entryOf<objectText>, entryOf<isOfType>, entryOf<getType>,
+                       lean ? giveMessageBack : getMessage, logMessage, trace, entryOf<newError>,
+                       entryOf<openMessageFile>, entryOf<closeMessageFile>, getMessage2);
 }
 
 }  // namespace cimom

@@ -45,6 +45,18 @@ std::vector<const CimClass*> CimClass::allSubclasses() const {
     return all;
 }
 
+const CimClass::InitialValues& CimClass::initialValues() const {
+    std::call_once(m_initialValues.made, [this] {
+        for (const auto& property : properties) {
+            Value value = property->defaultValue;
+            value.retypeNull(typeOf(*property));
+            if (!value.isNull()) m_initialValues.ofDefaults.set(property->name, value);
+            m_initialValues.all.set(property->name, std::move(value));
+        }
+    });
+    return m_initialValues;
+}
+
 bool ClassRepository::isA(std::string_view name, std::string_view base) const {
     const CimClass* cls = findClass(name);
     const CimClass* ancestor = findClass(base);

@@ -16,6 +16,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -121,6 +122,21 @@ struct CimClass : CimQualified {
     bool isA(const CimClass& base) const;
     /// All classes below this one, parents before children; without this class.
     std::vector<const CimClass*> allSubclasses() const;
+    /// The properties that have a default, with it.
+    const NamedValues& defaults() const { return initialValues().ofDefaults; }
+    /// All properties, with their defaults or null.
+    const NamedValues& blank() const { return initialValues().all; }
+
+private:
+    struct InitialValues {
+        std::once_flag made;
+        NamedValues ofDefaults;
+        NamedValues all;
+    };
+    const InitialValues& initialValues() const;
+
+    mutable InitialValues
+        m_initialValues;  // made when first asked for: most classes have no instance
 };
 
 class ClassRepository {

@@ -12,7 +12,7 @@ const CimProperty* declared(const InstanceBody& body, const std::string& name) {
 }
 
 bool passesFilter(const InstanceBody& body, const std::string& name) {
-    return !body.filter || containsName(*body.filter, name);
+    return !body.filter || body.filter->count(name) != 0;
 }
 
 // An embedded instance may also come as a text that shows it.
@@ -31,9 +31,7 @@ Value checked(bool lean, const InstanceBody& body, const CimProperty* element,
                       "class " + body.cls->name + " has no property " + name);
     }
     value.retypeNull(typeOf(*element));
-    if (typeAgrees(*element, value)) return value;
-    Value converted;
-    if (lean) return value.convertTo(typeOf(*element), converted) ? converted : value;
+    if (lean || typeAgrees(*element, value)) return value;
     throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, "property " + body.cls->name + "." + name + " is " +
                                                  typeName(typeOf(*element)) + ", not " +
                                                  typeName(value.type()));
@@ -64,9 +62,10 @@ CMPIData getProperty(InstanceBody& body, Broker& broker, const char* name) {
     const std::string wanted = textOf(name);
     if (const Value* value = body.value.properties.find(wanted))
         return namedData<CMPIInstance>(broker, body, wanted, *value);
-    // A property of the class that has not been set is there, and null.
-    const CimProperty* element = passesFilter(body, wanted) ? declared(body, wanted) : nullptr;
-    if (!element) throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "no property " + wanted);
+    // A property of the class that has not been set is there, and null, except in small brokers.
+    const bool may = !broker.lean() && passesFilter(body, wanted);
+    const CimProperty* element = may ? declared(body, wanted) : nullptr;
+    if (!element) throw Failure(missing<CMPIInstance>(broker), "no property " + wanted);
     return namedData<CMPIInstance>(broker, body, wanted, Value::null(typeOf(*element)));
 }
 
@@ -89,15 +88,29 @@ void setObjectPath(InstanceBody& body, Broker& broker, const CMPIObjectPath* pat
     takeKeys(body);
 }
 
-// The key list of the call is ignored, as the standard has come to say: keys stay by the class.
-void setPropertyFilter(InstanceBody& body, Broker&, const char** properties, const char**) {
-    body.filter.reset();
-    if (!properties) return;
-    body.filter = std::make_shared<const std::vector<std::string>>(namesIn(properties));
-    NamedValues kept;
-    for (const auto& [name, value] : body.value.properties)
-        if (passesFilter(body, name) || isKey(body, name)) kept.set(name, value);
-    body.value.properties = std::move(kept);
+// Keys stay by the class, as the standard has come to say, and the key list means nothing. In small
+// brokers they stay by that list, and what it lacks is missing in the path too.
+bool stays(const InstanceBody& body, const Broker& broker, const std::string& name) {
+    return passesFilter(body, name) || (!broker.lean() && isKey(body, name));
+}
+void setPropertyFilter(InstanceBody& body, Broker& broker, const char** properties,
+                       const char** keys) {
+    if (!properties) {
+        if (!broker.lean()) body.filter.reset();
+        return;
+    }
+    std::vector<std::string> names = namesIn(properties);
+    if (broker.lean() && keys)
+        for (std::string& key : namesIn(keys)) names.push_back(std::move(key));
+    body.filter = std::make_shared<const NameSet>(names.begin(), names.end());
+    const auto keep = [&](NamedValues& values) {
+        NamedValues kept;
+        for (const auto& [name, value] : values)
+            if (stays(body, broker, name)) kept.set(name, value);
+        values = std::move(kept);
+    };
+    keep(body.value.properties);
+    if (broker.lean()) keep(body.value.path.keys);
 }
 
 }  // namespace
@@ -118,9 +131,7 @@ InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path) {
     InstanceBody body = instanceBody(broker, Instance(path));
     if (!body.cls && broker.classes() && !broker.lean())
         throw Failure(CMPI_RC_ERR_NOT_FOUND, "no class " + path.className);
-    if (body.cls && broker.lean())
-        for (const auto& element : body.cls->properties)
-            body.value.properties.set(element->name, Value::null(typeOf(*element)));
+    if (body.cls) body.value.properties = broker.lean() ? body.cls->blank() : body.cls->defaults();
     takeKeys(body);
     return body;
 }
@@ -129,9 +140,9 @@ void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& 
     const CimProperty* element = declared(body, name);
     if (body.cls) value = checked(broker.lean(), body, element, name, std::move(value));
     // The path of an instance is made of its key properties.
-    const bool key = isKey(body, name);
-    if (key && !value.isNull()) setKey(body, name, value);
-    if (key || passesFilter(body, name)) body.value.properties.set(name, std::move(value));
+    if (!stays(body, broker, name)) return;
+    if (!value.isNull() && isKey(body, name)) setKey(body, name, value);
+    body.value.properties.set(name, std::move(value));
 }
 
 void fillInstanceTables(ObjectTables& tables) {

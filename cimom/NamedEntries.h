@@ -30,17 +30,28 @@ CMPIData namedData(Broker& broker, const BodyOf<C>& body, const std::string& nam
     return data;
 }
 
-template <class C, CMPIrc Missing>
+/// What is answered to a name, or a position, that is not there. Brokers do not agree.
+template <class C>
+CMPIrc missing(const Broker& broker) {
+    const bool lean = broker.lean() && !std::is_same_v<C, CMPIContext>;
+    return lean ? CMPI_RC_ERR_NOT_FOUND : CMPI_RC_ERR_NO_SUCH_PROPERTY;
+}
+template <class C>
+CMPIrc missingName(const Broker& broker) {
+    return std::is_same_v<C, CMPIObjectPath> ? CMPI_RC_ERR_NOT_FOUND : missing<C>(broker);
+}
+
+template <class C>
 CMPIData getNamed(BodyOf<C>& body, Broker& broker, const char* name) {
     const std::string wanted = textOf(name);
     const Value* value = namedIn(body).find(wanted);
-    if (!value) throw Failure(Missing, "no " + wanted);
+    if (!value) throw Failure(missingName<C>(broker), "no " + wanted);
     return namedData<C>(broker, body, wanted, *value);
 }
 
 template <class C>
 CMPIData getNamedAt(BodyOf<C>& body, Broker& broker, CMPICount index, CMPIString** name) {
-    const NamedValues::Entry& entry = elementAt(namedIn(body), index);
+    const NamedValues::Entry& entry = elementAt(namedIn(body), index, missing<C>(broker));
     if (name) *name = makeString(broker, entry.name);
     return namedData<C>(broker, body, entry.name, entry.value);
 }

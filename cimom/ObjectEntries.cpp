@@ -23,22 +23,48 @@ CMPICount arraySize(ArrayBody& body, Broker&) {
     return static_cast<CMPICount>(body.elements.size());
 }
 CMPIType arrayType(ArrayBody& body, Broker&) { return body.elementType; }
-CMPIData getElement(ArrayBody& body, Broker& broker, CMPICount index) {
-    return makeData(broker, elementAt(body.elements, index));
+CMPIData badData(CMPIType type) {
+    CMPIData data{};
+    data.type = type;
+    data.state = CMPI_badValue;
+    return data;
 }
-void setElement(ArrayBody& body, Broker&, CMPICount index, const CMPIValue* value, CMPIType type) {
-    Value& element = elementAt(body.elements, index);
+// Small brokers find no fault with a position behind the end.
+CMPIData getElement(ArrayBody& body, Broker& broker, CMPICount index) {
+    if (broker.lean() && index >= body.elements.size()) return badData(body.elementType);
+    const Value& element = elementAt(body.elements, index);
+    CMPIData data = makeData(broker, element);
+    data.type = body.elementType;
+    if (data.type == CMPI_chars && !element.isNull())
+        data.value.chars = const_cast<char*>(element.text().c_str());
+    return data;
+}
+// Small brokers have arrays of strings alone and turn texts of C into these; others have arrays of
+// either, and do not mix them.
+void setElement(ArrayBody& body, Broker& broker, CMPICount index, const CMPIValue* value,
+                CMPIType type) {
+    const bool lean = broker.lean();
+    Value& element =
+        elementAt(body.elements, index, lean ? CMPI_RC_ERR_FAILED : CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    if (!lean && !value) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no value");
     Value given = readValue(value, type);
-    if (given.isNull()) given = Value::null(body.elementType);
-    if (given.type() != body.elementType)
-        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH,
-                      typeName(given.type()) + " in an array of " + typeName(body.elementType));
+    const CMPIType givenType = lean ? given.type() : type;
+    if (givenType != body.elementType && givenType != CMPI_null)
+        throw Failure(lean ? CMPI_RC_ERR_FAILED : CMPI_RC_ERR_TYPE_MISMATCH,
+                      typeName(givenType) + " in an array of " + typeName(body.elementType));
+    given.retypeNull(stringFor(body.elementType));
     element = std::move(given);
 }
 
+// The elements of an enumeration are there, whatever their state says; small brokers find no fault
+// with going on behind the last.
 CMPIData nextItem(EnumerationBody& body, Broker& broker) {
-    if (body.next == body.items.size()) throw Failure(CMPI_RC_NO_MORE_ELEMENTS);
-    return makeData(broker, body.items[body.next++]);
+    const bool over = body.next == body.items.size();
+    if (over && broker.lean()) return badData(CMPI_null);
+    if (over) throw Failure(CMPI_RC_NO_MORE_ELEMENTS);
+    CMPIData data = makeData(broker, body.items[body.next++]);
+    if (!broker.lean()) data.state = CMPI_nullValue;
+    return data;
 }
 CMPIBoolean hasNext(EnumerationBody& body, Broker&) { return body.next < body.items.size(); }
 CMPIArray* toArray(EnumerationBody& body, Broker& broker) {
@@ -99,9 +125,19 @@ CMPIData parameterQualifier(ObjectPath& path, Broker& broker, const char* method
     });
 }
 
+// -- contexts ---------------------------------------------------------------------------------
+
+CMPIContext* cloneContext(NamedValues& body, Broker& broker) {
+    if (broker.lean()) throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    return cloneBody<CMPIContext>(body, broker);
+}
+
 // -- results ----------------------------------------------------------------------------------
 
-void returnData(ResultBody& body, Broker&, const CMPIValue* value, CMPIType type) {
+void returnData(ResultBody& body, Broker& broker, const CMPIValue* value, CMPIType type) {
+    if (!broker.lean() && !value) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no value");
+    if (broker.lean() && type == CMPI_ref)
+        throw Failure(CMPI_RC_ERR_FAILED, "a path is returned by returnObjectPath alone");
     const Value given = readValue(value, type);
     if (!given.isNull() && given.type() == CMPI_instance)
         body.reply->instances.push_back(given.instance());
@@ -124,7 +160,6 @@ void returnError(ResultBody& body, Broker&, const CMPIError* error) {
 }  // namespace
 
 void fillObjectTables(ObjectTables& tables) {
-    constexpr CMPIrc kNotFound = CMPI_RC_ERR_NOT_FOUND;
     std::get<CMPIStringFT>(tables) = tableOf<CMPIString>(entryOf<charPtr>);
     std::get<CMPIDateTimeFT>(tables) =
         tableOf<CMPIDateTime>(entryOf<binaryFormat>, entryOf<stringFormat>, entryOf<isInterval>);
@@ -133,17 +168,17 @@ void fillObjectTables(ObjectTables& tables) {
     std::get<CMPIEnumerationFT>(tables) =
         tableOf<CMPIEnumeration>(entryOf<nextItem>, entryOf<hasNext>, entryOf<toArray>);
     std::get<CMPIArgsFT>(tables) =
-        tableOf<CMPIArgs>(entryOf<setNamed<CMPIArgs>>, entryOf<getNamed<CMPIArgs, kNotFound>>,
+        tableOf<CMPIArgs>(entryOf<setNamed<CMPIArgs>>, entryOf<getNamed<CMPIArgs>>,
                           entryOf<getNamedAt<CMPIArgs>>, entryOf<countNamed<CMPIArgs>>);
     std::get<CMPIContextFT>(tables) =
-        tableOf<CMPIContext>(entryOf<getNamed<CMPIContext, CMPI_RC_ERR_NO_SUCH_PROPERTY>>,
-                             entryOf<getNamedAt<CMPIContext>>, entryOf<countNamed<CMPIContext>>,
-                             entryOf<setNamed<CMPIContext>>);
+        tableOf<CMPIContext>(entryOf<getNamed<CMPIContext>>, entryOf<getNamedAt<CMPIContext>>,
+                             entryOf<countNamed<CMPIContext>>, entryOf<setNamed<CMPIContext>>);
+    std::get<CMPIContextFT>(tables).clone = entryOf<cloneContext>;
     std::get<CMPIObjectPathFT>(tables) = tableOf<CMPIObjectPath>(
         entryOf<setPart<&ObjectPath::nameSpace>>, entryOf<getPart<&ObjectPath::nameSpace>>,
         entryOf<setPart<&ObjectPath::host>>, entryOf<getPart<&ObjectPath::host>>,
         entryOf<setPart<&ObjectPath::className>>, entryOf<getPart<&ObjectPath::className>>,
-        entryOf<setNamed<CMPIObjectPath>>, entryOf<getNamed<CMPIObjectPath, kNotFound>>,
+        entryOf<setNamed<CMPIObjectPath>>, entryOf<getNamed<CMPIObjectPath>>,
         entryOf<getNamedAt<CMPIObjectPath>>, entryOf<countNamed<CMPIObjectPath>>,
         entryOf<setPlaceFrom<false>>, entryOf<setPlaceFrom<true>>, entryOf<classQualifier>,
         entryOf<propertyQualifier>, entryOf<methodQualifier>, entryOf<parameterQualifier>,

@@ -154,13 +154,6 @@ CMPIString* makeString(Broker& broker, const std::string& text) {
     return make<CMPIString>(broker, {text, false});
 }
 
-CMPIData noData() {
-    CMPIData data{};
-    data.type = CMPI_null;
-    data.state = CMPI_nullValue | CMPI_notFound;
-    return data;
-}
-
 void setStatus(CMPIStatus* out, CMPIrc rc, Broker* broker, const char* text) {
     if (!out) return;
     out->rc = rc;
@@ -202,7 +195,7 @@ bool withNumber(CMPIType type, F f) {
 Value readArray(const CMPIArray* array, CMPIType type) {
     if (!array) return Value::null(type);
     const ArrayBody& body = bodyOf(array);
-    return Value::array(body.elementType, body.elements);
+    return Value::array(stringFor(body.elementType), body.elements);
 }
 
 Value readObject(const CMPIValue& value, CMPIType type) {
@@ -227,13 +220,13 @@ Value readObject(const CMPIValue& value, CMPIType type) {
     }
 }
 
+}  // namespace
+
 CMPIType stringFor(CMPIType type) {
     const auto element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
     if (element != CMPI_chars && element != CMPI_charsptr) return type;
     return static_cast<CMPIType>(CMPI_string | (type & CMPI_ARRAY));
 }
-
-}  // namespace
 
 Value readValue(const CMPIValue* value, CMPIType type) {
     if (!value) return Value::null(stringFor(type));

@@ -1,9 +1,11 @@
 /// The C objects of CMPI, and who owns them.
 ///
-/// Each object that a provider sees is the face of a node: the C struct of its kind, whose hdl
-/// points back to the node, and a body that holds the content in the value model. Nodes made
-/// during a request are owned by the request's pool and freed with it; clones, and objects made
-/// on threads without a request, are owned by the broker's stray pool until they are released.
+/// Each object that a provider sees is the face of a node: the C struct of its kind, by whose
+/// address the node is found, and a body that holds the content in the value model. The hdl of a
+/// string is its text, as in all brokers of the field, for there are bindings that read it there.
+/// Nodes made during a request are owned by the request's pool and freed with it; clones, and
+/// objects made on threads without a request, are owned by the broker's stray pool until they are
+/// released.
 ///
 /// The memory of nodes is reused for nodes of their kind and never given back. A released object's
 /// face stays readable with a null hdl, so that its use is answered with CMPI_RC_ERR_INVALID_HANDLE
@@ -47,11 +49,11 @@ struct StringBody {
 };
 struct InstanceBody {
     Instance value;
-    std::shared_ptr<const std::vector<std::string>> filter;  ///< set by setPropertyFilter, or null
-    const CimClass* cls = nullptr;                           ///< null when the class is not known
+    std::shared_ptr<const NameSet> filter;  ///< what setPropertyFilter lets through; null for all
+    const CimClass* cls = nullptr;          ///< null when the class is not known
 };
 struct ArrayBody {
-    CMPIType elementType = CMPI_null;
+    CMPIType elementType = CMPI_null;  ///< CMPI_chars for elements that a provider sees as such
     Value::Array elements;
 };
 struct EnumerationBody {
@@ -129,9 +131,16 @@ struct Node {
 
 template <class C>
 struct NodeOf : Node {
+    static_assert(alignof(C) == alignof(Node), "a face lies right behind its Node");
+
     C face{};
     std::optional<BodyOf<C>> body;  ///< none when released
 };
+/// The node of a face of any kind.
+inline Node& nodeAt(const void* face) {
+    auto* address = static_cast<char*>(const_cast<void*>(face));
+    return *reinterpret_cast<Node*>(address - sizeof(Node));
+}
 
 template <class C>
 struct ChunkOf : Chunk {
@@ -206,7 +215,10 @@ template <class C>
 C* makeIn(Pool& pool, BodyOf<C> body) {
     NodeOf<C>& node = pool.take<C>();
     node.body.emplace(std::move(body));
-    node.face.hdl = &node;
+    if constexpr (std::is_same_v<C, CMPIString>)
+        node.face.hdl = node.body->null ? nullptr : node.body->text.data();
+    else
+        node.face.hdl = &node;
     node.face.ft = &std::get<TableOf<C>>(objectTables(pool.broker()));
     countLive(pool.broker(), 1);
     return &node.face;
@@ -218,18 +230,20 @@ C* make(Broker& broker, BodyOf<C> body) {
     return makeIn<C>(currentPool(broker), std::move(body));
 }
 
-/// The node of an object. @throws Failure CMPI_RC_ERR_INVALID_HANDLE for null, released or alien
+/// The node of an object.
+/// @throws Failure CMPI_RC_ERR_INVALID_HANDLE for null, released, or of another kind
 template <class C>
 NodeOf<C>& nodeOf(const C* object) {
     if (!object) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "null object");
-    if (!object->hdl) {
+    Node& node = nodeAt(object);
+    if (node.chunk->kind != kindOf<C>())
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "object of another kind");
+    auto& own = static_cast<NodeOf<C>&>(node);
+    if (!own.body) {
         countStaleUse();
         throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "released object");
     }
-    Node& node = *static_cast<Node*>(object->hdl);
-    if (node.chunk->kind != kindOf<C>())
-        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "object of another kind");
-    return static_cast<NodeOf<C>&>(node);
+    return own;
 }
 template <class C>
 BodyOf<C>& bodyOf(const C* object) {
@@ -241,11 +255,10 @@ BodyOf<C>& bodyOf(const C* object) {
 /// A text made into an object of the request.
 CMPIString* makeString(Broker& broker, const std::string& text);
 /// The element of a list that a caller asks for by its position.
-/// @throws Failure CMPI_RC_ERR_NO_SUCH_PROPERTY when there is none
+/// @throws Failure with @p missing when there is none
 template <class List>
-auto& elementAt(List& list, CMPICount index) {
-    if (index >= list.size())
-        throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "index " + std::to_string(index));
+auto& elementAt(List& list, CMPICount index, CMPIrc missing = CMPI_RC_ERR_NO_SUCH_PROPERTY) {
+    if (index >= list.size()) throw Failure(missing, "index " + std::to_string(index));
     return list.begin()[index];
 }
 /// Reads a C value. A null @p value gives a null of the type; CMPI_chars values are the text
@@ -257,8 +270,11 @@ Value readData(const CMPIData& data);
 CMPIData makeData(Broker& broker, const Value& value);
 /// The body of a C instance, with its class looked up.
 InstanceBody instanceBody(Broker& broker, Instance value);
-/// Answer of the getters when there is nothing.
-CMPIData noData();
+/// Answer of the getters when there is nothing; small brokers do not call that a null.
+/// @param broker  may be null
+CMPIData noData(const Broker* broker);
+/// The type of values that come in: texts of C are strings.
+CMPIType stringFor(CMPIType type);
 
 inline std::string textOf(const char* text) { return text ? text : ""; }
 
@@ -278,7 +294,7 @@ auto entry(CMPIStatus* rc, Broker* broker, F body) -> decltype(body()) {
         setStatus(rc, CMPI_RC_ERROR_SYSTEM, broker, e.what());
     }
     if constexpr (std::is_same_v<decltype(body()), CMPIData>)
-        return noData();
+        return noData(broker);
     else if constexpr (!std::is_void_v<decltype(body())>)
         return {};
 }
@@ -286,8 +302,9 @@ auto entry(CMPIStatus* rc, Broker* broker, F body) -> decltype(body()) {
 /// Runs @p body with the content of an object and its broker.
 template <class C, class F>
 auto objectEntry(const C* object, CMPIStatus* rc, F body) {
-    Broker* broker =
-        object && object->hdl ? &static_cast<Node*>(object->hdl)->chunk->pool->broker() : nullptr;
+    const bool alive = object && nodeAt(object).chunk->kind == kindOf<C>() &&
+                       static_cast<NodeOf<C>&>(nodeAt(object)).body;
+    Broker* broker = alive ? &nodeAt(object).chunk->pool->broker() : nullptr;
     return entry(rc, broker, [&] {
         auto& content = bodyOf(object);
         return body(content, *broker);

@@ -63,7 +63,7 @@ Reply enumerate(Server::Impl& impl, const Request& request, const ObjectPath& cl
     return answerAt(impl, request, classPath, [&](const ObjectPath& path) {
         Reply reply = impl.callAll<CMPIInstanceMI>(request, impl.targetsBelow(path, kInstance),
                                                    path, true, body);
-        Server::Impl::finish(request, path, reply);
+        impl.select(request, reply);
         return reply;
     });
 }
@@ -101,7 +101,7 @@ Reply Server::execQuery(const Request& request, const std::string& query,
             found.erase(std::remove_if(found.begin(), found.end(), fails), found.end());
         }
         if (!parsed->projection().empty()) all.properties = parsed->projection();
-        Impl::finish(all, path, reply);
+        Impl::keepProperties(all.properties, reply);
         return reply;
     });
 }
@@ -115,33 +115,38 @@ Reply Server::getInstance(const Request& request, const ObjectPath& path) {
             reply.fail(CMPI_RC_ERR_NOT_FOUND,
                        "the provider returned no instance of " + printPath(full));
         }
-        Impl::finish(request, full, reply);
+        m_impl->select(request, reply);
         return reply;
     });
 }
 
 Reply Server::createInstance(const Request& request, const Instance& instance) {
     return answerAt(*m_impl, request, instance.path, [&](const ObjectPath& path) {
-        Reply reply = m_impl->callFor<CMPIInstanceMI>(
+        const Instance whole = m_impl->filled(Instance(path, instance.properties));
+        return m_impl->callFor<CMPIInstanceMI>(
             request, path, [&](CMPIInstanceMI* mi, const Call& call) {
-                return calling(&CMPIInstanceMIFT::createInstance,
-                               wrapInstance(m_impl->broker, Instance(path, instance.properties)))(
-                    mi, call);
+                const CMPIStatus status = calling(&CMPIInstanceMIFT::createInstance,
+                                                  wrapInstance(m_impl->broker, whole))(mi, call);
+                if (status.rc == CMPI_RC_OK && call.reply.paths.empty())
+                    throw ProviderFault("no path of the instance that it was to create");
+                return status;
             });
-        if (reply.ok() && reply.paths.empty()) reply.paths.push_back(path);
-        Impl::finish(request, path, reply);
-        return reply;
     });
 }
 
 Reply Server::modifyInstance(const Request& request, const Instance& instance) {
     return answerAt(*m_impl, request, instance.path, [&](const ObjectPath& path) {
-        NameList names(request.properties);
+        std::optional<std::vector<std::string>> list = request.properties;
+        if (!list && !m_impl->broker.lean()) {  // what the client gave, for more is in the instance
+            list.emplace();
+            for (const auto& each : instance.properties) list->push_back(each.name);
+        }
+        NameList names(list);
+        const Instance whole = m_impl->filled(Instance(path, instance.properties));
         return m_impl->callFor<CMPIInstanceMI>(
             request, path, [&](CMPIInstanceMI* mi, const Call& call) {
                 return calling(&CMPIInstanceMIFT::modifyInstance,
-                               wrapInstance(m_impl->broker, Instance(path, instance.properties)),
-                               names.get())(mi, call);
+                               wrapInstance(m_impl->broker, whole), names.get())(mi, call);
             });
     });
 }
@@ -162,16 +167,12 @@ template <class Entry, class... A>
 Reply navigate(Server::Impl& impl, const Request& request, const ObjectPath& path,
                const std::string& association, Entry entry, A... more) {
     return answerAt(impl, request, path, [&](const ObjectPath& full) {
-        const std::vector<Target> targets =
-            association.empty()
-                ? impl.associationTargets(full)
-                : impl.targetsBelow(impl.complete(request, {full.nameSpace, association}),
-                                    kAssociation);
         Reply reply = impl.callAll<CMPIAssociationMI>(
-            request, targets, full, false, [&](CMPIAssociationMI* mi, const Call& call) {
+            request, impl.associationTargets(request, full, association), full, false,
+            [&](CMPIAssociationMI* mi, const Call& call) {
                 return calling(entry, call.className, more...)(mi, call);
             });
-        Server::Impl::finish(request, full, reply);
+        impl.select(request, reply);
         return reply;
     });
 }

@@ -34,16 +34,37 @@
 
 namespace cimom {
 
-/// How the broker behaves where brokers in the field differ.
+/// How the broker behaves where brokers in the field differ, which is where providers fail that
+/// have met only one of them.
+///
+/// In both, new instances have their class's defaults (in lean ones null in all other properties),
+/// and instances that a client gives to create or modify have all properties, with their defaults
+/// or null. Neither mends what a provider returns: a path without a namespace, anywhere in it, is
+/// told to the client as the provider's fault.
 enum class Character {
-    /// By the standard: complete function tables of version 2.0; property names and types are
-    /// checked when the class is known.
+    /// As OpenPegasus where that is unkind, else by the standard: complete function tables of
+    /// version 2.0; property names and types are checked when the class is known. The elements of
+    /// an enumeration have the state of a null. Arrays of CMPI_chars stay what they are, and take
+    /// no strings. Where a client names no association, each provider hears of its own classes.
+    /// A modify without a property list gets the list of what the client gave.
     Full,
-    /// Like small servers in the field: function tables report version 1 or 0 and end early (the
-    /// remaining entries are null), there are no message files and no CMPIError, logMessage and
-    /// trace answer CMPI_RC_ERR_NOT_SUPPORTED, unknown property names, keys of another type and
-    /// names that stand twice are taken, new instances are filled with null properties when the
-    /// class is known, and without a user the principal is a string whose text is null.
+    /// As sfcb, and other small servers in the field.
+    /// - Function tables report version 1 or 0 and end early (the remaining entries are null, also
+    ///   that by which a context takes further entries); there are no message files and no
+    ///   CMPIError; logMessage, trace, getMessage, the clone of a context and the text of anything
+    ///   but a path or an instance answer CMPI_RC_ERR_NOT_SUPPORTED.
+    /// - Unknown property names, keys and properties of another type and names that stand twice
+    ///   are taken.
+    /// - What is not there has the state CMPI_notFound and not that of a null; for a property that
+    ///   is CMPI_RC_ERR_NOT_FOUND; a position behind the end of an array or enumeration is no
+    ///   failure, but a bad value.
+    /// - Arrays of CMPI_chars are arrays of strings. A string of no text has none.
+    /// - setPropertyFilter drops the keys that its list of keys lacks, also from the path. A client
+    ///   gets what the provider returned, properties not asked for among it.
+    /// - A path cannot be returned by returnData.
+    /// - Associations: providers of all are asked, also of those that cannot hold the object, and
+    ///   hear of the class that the client named, be it a base of theirs, or of none.
+    /// - Without a user the principal is a string whose text is null.
     Lean,
 };
 

@@ -9,14 +9,6 @@
 
 namespace cimom {
 
-namespace {
-
-bool servesNameSpace(const std::vector<std::string>& nameSpaces, const std::string& wanted) {
-    return nameSpaces.empty() || containsName(nameSpaces, wanted);
-}
-
-}  // namespace
-
 void Server::loadRegistration(const std::string& file) {
     const std::size_t slash = file.rfind('/');
     std::vector<std::string> folders{slash == std::string::npos ? "." : file.substr(0, slash)};
@@ -29,7 +21,7 @@ void Server::loadRegistration(const std::string& file) {
         });
         if (known == providers.end())
             known = providers.emplace(known, row.provider, row.library, folders);
-        m_impl->routes[row.className].push_back({row.nameSpaces, row.interfaces, &*known});
+        m_impl->addRoute({row.className, row.nameSpaces, row.interfaces, &*known});
     }
 }
 
@@ -40,26 +32,43 @@ void Server::registerProvider(const std::string& name, const std::vector<std::st
         interfacesThat([&](const auto& kind) { return factories.*kind.factory != nullptr; });
     Provider& provider = m_impl->providers.emplace_back(name, factories);
     for (const std::string& className : classes)
-        m_impl->routes[className].push_back({nameSpaces, interfaces, &provider});
+        m_impl->addRoute({className, nameSpaces, interfaces, &provider});
 }
 
+void Server::Impl::addRoute(Route route) {
+    const Route& added = routes.emplace_back(std::move(route));
+    routesOf[added.className].push_back(&added);
+}
+
+namespace {
+
+/// A path with those in its keys in a namespace.
+ObjectPath placed(ObjectPath path, const std::string& nameSpace) {
+    if (path.nameSpace.empty()) path.nameSpace = nameSpace;
+    const NamedValues keys = path.keys;
+    for (const auto& [name, value] : keys)
+        if (value.type() == CMPI_ref && !value.isNull())
+            path.keys.set(name, placed(value.reference(), nameSpace));
+    return path;
+}
+
+}  // namespace
+
 ObjectPath Server::Impl::complete(const Request& request, const ObjectPath& path) const {
-    ObjectPath full = path;
-    if (full.nameSpace.empty()) full.nameSpace = request.nameSpace;
     const ClassRepository* classes = broker.classes();
-    if (!classes) return full;
-    if (!broker.classOf(full) && !(broker.lean() && routes.count(full.className)))
-        throw Failure(CMPI_RC_ERR_INVALID_CLASS, "no class " + full.className);
-    return typedKeys(full, *classes, broker.lean() ? Unfit::Kept : Unfit::Refused);
+    if (!classes) return placed(path, request.nameSpace);
+    if (!broker.classOf(path) && !(broker.lean() && routesOf.count(path.className)))
+        throw Failure(CMPI_RC_ERR_INVALID_CLASS, "no class " + path.className);
+    return placed(typedKeys(path, *classes, broker.lean() ? Unfit::Kept : Unfit::Refused),
+                  request.nameSpace);
 }
 
 Provider* Server::Impl::routeOf(const std::string& className, const std::string& nameSpace,
                                 Interface bit) const {
-    const auto at = routes.find(className);
-    if (at == routes.end()) return nullptr;
-    for (const Route& route : at->second)
-        if ((route.interfaces & bit) && servesNameSpace(route.nameSpaces, nameSpace))
-            return route.provider;
+    const auto at = routesOf.find(className);
+    if (at == routesOf.end()) return nullptr;
+    for (const Route* route : at->second)
+        if (route->serves(nameSpace, bit)) return route->provider;
     return nullptr;
 }
 
@@ -89,38 +98,79 @@ std::vector<Target> Server::Impl::targetsBelow(const ObjectPath& classPath, Inte
     return targets;
 }
 
-std::vector<Target> Server::Impl::associationTargets(const ObjectPath& path) {
-    const ClassRepository* classes = broker.classes();
-    const auto mayHold = [&](const std::string& association) {
-        const CimClass* cls = classes ? classes->findClass(association) : nullptr;
-        if (!cls) return true;
-        return std::any_of(cls->properties.begin(), cls->properties.end(), [&](const auto& end) {
-            return end->type == CMPI_ref && (classes->isA(path.className, end->referenceClass) ||
-                                             classes->isA(end->referenceClass, path.className));
-        });
-    };
-    std::set<const Provider*> asked;
-    for (const auto& [className, rows] : routes)
-        for (const Route& row : rows)
-            if ((row.interfaces & kAssociation) != 0 &&
-                servesNameSpace(row.nameSpaces, path.nameSpace) && mayHold(className))
-                asked.insert(row.provider);
-    std::vector<Target> targets;  // in the order of registration
-    for (Provider& each : providers)
-        if (asked.count(&each) != 0) targets.push_back({&each, ""});
-    return targets;
+std::vector<Target> Server::Impl::associationTargets(const Request& request, const ObjectPath& path,
+                                                     const std::string& association) {
+    std::vector<Target> targets;
+    if (!association.empty()) {
+        targets = targetsBelow(complete(request, {path.nameSpace, association}), kAssociation);
+    } else {
+        for (const Route& route : routes)
+            if (route.serves(path.nameSpace, kAssociation) &&
+                (broker.lean() || mayHold(route.className, path.className)))
+                targets.push_back({route.provider, route.className});
+    }
+    if (!broker.lean()) return targets;
+    std::vector<Target> once;
+    std::set<const Provider*> known;
+    for (const Target& target : targets)
+        if (known.insert(target.provider).second) once.push_back({target.provider, association});
+    return once;
 }
 
-void Server::Impl::finish(const Request& request, const ObjectPath& path, Reply& reply) {
-    for (ObjectPath& each : reply.paths)
-        if (each.nameSpace.empty()) each.nameSpace = path.nameSpace;
+bool Server::Impl::mayHold(const std::string& association, const std::string& className) const {
+    const ClassRepository* classes = broker.classes();
+    const CimClass* cls = classes ? classes->findClass(association) : nullptr;
+    if (!cls) return true;
+    return std::any_of(cls->properties.begin(), cls->properties.end(), [&](const auto& end) {
+        return end->type == CMPI_ref && (classes->isA(className, end->referenceClass) ||
+                                         classes->isA(end->referenceClass, className));
+    });
+}
+
+Instance Server::Impl::filled(Instance instance) const {
+    const CimClass* cls = broker.classOf(instance.path);
+    if (!cls) return instance;
+    NamedValues all = cls->blank();
+    for (const auto& [name, value] : instance.path.keys) all.set(name, value);
+    for (const auto& [name, value] : instance.properties) all.set(name, value);
+    instance.properties = std::move(all);
+    return instance;
+}
+
+void Server::Impl::keepProperties(const std::optional<std::vector<std::string>>& names,
+                                  Reply& reply) {
+    if (!names) return;
+    const NameSet wanted(names->begin(), names->end());
     for (Instance& instance : reply.instances) {
-        if (instance.path.nameSpace.empty()) instance.path.nameSpace = path.nameSpace;
-        if (!request.properties) continue;
-        NamedValues wanted;
+        NamedValues kept;
         for (const auto& [name, value] : instance.properties)
-            if (containsName(*request.properties, name)) wanted.set(name, value);
-        instance.properties = std::move(wanted);
+            if (wanted.count(name) != 0) kept.set(name, value);
+        instance.properties = std::move(kept);
+    }
+}
+
+namespace {
+
+void refuseUnplaced(const ObjectPath& path);
+
+void refuseUnplaced(const NamedValues& values) {
+    for (const auto& each : values)
+        if (each.value.type() == CMPI_ref && !each.value.isNull())
+            refuseUnplaced(each.value.reference());
+}
+void refuseUnplaced(const ObjectPath& path) {
+    if (path.nameSpace.empty())
+        throw ProviderFault("the path " + printPath(path) + ", which has no namespace");
+    refuseUnplaced(path.keys);
+}
+
+}  // namespace
+
+void refuseUnplaced(const Reply& reply) {
+    for (const ObjectPath& path : reply.paths) refuseUnplaced(path);
+    for (const Instance& instance : reply.instances) {
+        refuseUnplaced(instance.path);
+        refuseUnplaced(instance.properties);
     }
 }
 

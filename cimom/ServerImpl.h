@@ -2,6 +2,7 @@
 #ifndef CIMOM_SERVER_IMPL_H
 #define CIMOM_SERVER_IMPL_H
 
+#include <deque>
 #include <exception>
 #include <list>
 #include <map>
@@ -17,7 +18,7 @@ namespace cimom {
 /// A provider to be called, and the class to call it for.
 struct Target {
     Provider* provider;
-    std::string className;
+    std::string className;  ///< none where a client names no association to a lean broker
 };
 
 /// What a provider is called with.
@@ -45,7 +46,8 @@ class Server::Impl {
 public:
     Impl(Server& server, const Options& options) : broker(server, options) {}
 
-    /// The path in the request's namespace where it has none, its keys typed by the class.
+    /// The path in the request's namespace where it has none, and so the paths in its keys; its
+    /// keys typed by the class.
     /// @throws Failure CMPI_RC_ERR_INVALID_CLASS, CMPI_RC_ERR_INVALID_PARAMETER
     ObjectPath complete(const Request& request, const ObjectPath& path) const;
 
@@ -56,9 +58,11 @@ public:
     /// The providers of a class and of those below it.
     /// @throws Failure CMPI_RC_ERR_NOT_SUPPORTED when there is none
     std::vector<Target> targetsBelow(const ObjectPath& classPath, Interface bit) const;
-    /// The providers of all associations in which the class of the path may stand, one by one
-    /// and with an empty class name.
-    std::vector<Target> associationTargets(const ObjectPath& path);
+    /// The providers to ask about the associations of an object, through those of a class, or
+    /// through all where none is named. Each is called for an association of its own that the
+    /// object may stand in. From a lean broker each hears once, whatever it is of, what was named.
+    std::vector<Target> associationTargets(const Request& request, const ObjectPath& path,
+                                           const std::string& association);
 
     /// Calls one provider in a request of its own; nothing that goes wrong is thrown.
     /// @param body  takes the interface and a Call, and returns the provider's status
@@ -75,8 +79,14 @@ public:
     Reply callAll(const Request& request, const std::vector<Target>& targets,
                   const ObjectPath& path, bool perClass, Body body);
 
-    /// Fills in what providers leave out and drops the properties not asked for.
-    static void finish(const Request& request, const ObjectPath& path, Reply& reply);
+    /// A client's instance as a provider gets it: with all properties of its class, those that the
+    /// client leaves out with their defaults.
+    Instance filled(Instance instance) const;
+    /// Drops the properties not asked for, where the broker does that for its providers.
+    void select(const Request& request, Reply& reply) const {
+        if (!broker.lean()) keepProperties(request.properties, reply);
+    }
+    static void keepProperties(const std::optional<std::vector<std::string>>& names, Reply& reply);
 
     // Indications, Indications.cpp.
     void filterStep(const Request& request, const Target& target, FilterStep step,
@@ -87,14 +97,22 @@ public:
     bool countFilter(const Target& target, int by, bool ofProvider);
 
     struct Route {
+        std::string className;
         std::vector<std::string> nameSpaces;  // empty: all
         unsigned interfaces;
         Provider* provider;
+
+        bool serves(const std::string& nameSpace, unsigned anyOf) const {
+            return (interfaces & anyOf) != 0 &&
+                   (nameSpaces.empty() || containsName(nameSpaces, nameSpace));
+        }
     };
+    void addRoute(Route route);
 
     Broker broker;
     std::list<Provider> providers;
-    std::unordered_map<std::string, std::vector<Route>, NameHash, NameEqual> routes;
+    std::deque<Route> routes;  // in the order of registration
+    std::unordered_map<std::string, std::vector<const Route*>, NameHash, NameEqual> routesOf;
 
     std::mutex subscriptionMutex;
     SubscriptionId nextSubscription = 1;
@@ -102,6 +120,7 @@ public:
     std::map<std::pair<Provider*, std::string>, int> activeFilters;  // empty class: all of them
 
 private:
+    bool mayHold(const std::string& association, const std::string& className) const;
     Provider* routeOf(const std::string& className, const std::string& nameSpace,
                       Interface bit) const;
 };
@@ -133,6 +152,15 @@ Reply answerAt(const Server::Impl& impl, const Request& request, const ObjectPat
     return answer([&] { return operation(impl.complete(request, path)); });
 }
 
+/// What a provider must not return, in words that go on "provider P returned".
+class ProviderFault : public Failure {
+public:
+    explicit ProviderFault(std::string what) : Failure(CMPI_RC_ERR_FAILED, std::move(what)) {}
+};
+/// No server finds out where an object is that its provider does not place in a namespace.
+/// @throws ProviderFault
+void refuseUnplaced(const Reply& reply);
+
 template <class MI, class Body>
 Reply Server::Impl::call(const Request& request, const Target& target, const ObjectPath& path,
                          Body body) {
@@ -147,6 +175,12 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
         const CMPIStatus status = body(&mi, parts);
         reply->rc = status.rc;
         if (status.msg) reply->message = bodyOf(status.msg).text;
+        if (reply->ok()) refuseUnplaced(*reply);
+    } catch (const ProviderFault& fault) {
+        reply->instances.clear();
+        reply->paths.clear();
+        reply->fail(CMPI_RC_ERR_FAILED,
+                    "provider " + target.provider->name() + " returned " + fault.what());
     } catch (const Failure& failure) {
         reply->fail(failure.rc(), failure.what());
     } catch (const std::exception& e) {

@@ -28,6 +28,7 @@ class Fix_Base {
 };
 class Fix_Thing : Fix_Base {
     [Units("Bytes")] uint32 Size;
+    uint16 State = 5;
     datetime Since;
     string Tags[];
     [EmbeddedInstance("Fix_Base")] string Part;
@@ -40,6 +41,8 @@ class Fix_Thing : Fix_Base {
 [Association] class Fix_Link {
     [Key] Fix_Base REF Antecedent;
     [Key] Fix_Base REF Dependent;
+};
+[Association] class Fix_Tie : Fix_Link {
 };
 [Association] class Fix_Foreign {
     [Key] Fix_Event REF One;

@@ -66,8 +66,9 @@ static CMPIObjectPath* thingPath(Path like, const Thing* thing) {
 static CMPIInstance* thingInstance(Path like, const Thing* thing, Text* properties) {
     CMPIInstance* inst = broker->eft->newInstance(broker, thingPath(like, thing), NULL);
     CMPIValue value;
+    Text keys[] = {"Name", NULL};
     if (!inst) return NULL;
-    if (properties) inst->ft->setPropertyFilter(inst, properties, NULL);
+    if (properties) inst->ft->setPropertyFilter(inst, properties, keys);
     value.uint32 = thing->size;
     inst->ft->setProperty(inst, "Size", &value, CMPI_uint32);
     value.array = broker->eft->newArray(broker, 2, CMPI_chars, NULL);

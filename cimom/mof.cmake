@@ -24,6 +24,6 @@ add_library(cimom_mof STATIC
   ${BISON_MofGrammar_OUTPUTS}
   ${FLEX_MofLexer_OUTPUTS})
 target_include_directories(cimom_mof PUBLIC ${CMAKE_CURRENT_LIST_DIR})
-target_link_libraries(cimom_mof PUBLIC cmpi::headers)
+target_link_libraries(cimom_mof PRIVATE cmpi_headers INTERFACE cmpi::headers)
 target_include_directories(cimom_mof SYSTEM PRIVATE ${mof_generated})
 zem_target(cimom_mof)

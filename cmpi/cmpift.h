@@ -528,6 +528,10 @@ struct _CMPIPropertyMIFT {
                               const CMPIObjectPath* op, const char* name, const CMPIData data);
     CMPIStatus (*getProperty)(CMPIPropertyMI* mi, const CMPIContext* ctx, const CMPIResult* rslt,
                               const CMPIObjectPath* op, const char* name);
+    /* Level 2.0, though not in all headers of that level. */
+    CMPIStatus (*setPropertyWithOrigin)(CMPIPropertyMI* mi, const CMPIContext* ctx,
+                                        const CMPIResult* rslt, CMPIObjectPath* op,
+                                        const char* name, const CMPIData data, const char* origin);
 };
 
 typedef struct _CMPIIndicationMIFT CMPIIndicationMIFT;

@@ -256,10 +256,15 @@
         return &mi;                                                                                \
     }
 
+/* What a level changed in the lists of entries, or added to them; providers that fill a table by
+ * hand use these, too. A list of additions ends with its comma. */
+#define CMInstanceMIStubChange(pfx) pfx##ModifyInstance
+#define CMIndicationMIStubExtensions(pfx) pfx##EnableIndications, pfx##DisableIndications,
+
 #define CMInstanceMIStub(pfx, pn, broker, hook)                                                    \
     CM_MI_STUB_(Instance, inst, "instance", pn, broker, hook, pfx##Cleanup,                        \
                 pfx##EnumInstanceNames, pfx##EnumInstances, pfx##GetInstance, pfx##CreateInstance, \
-                pfx##ModifyInstance, pfx##DeleteInstance, pfx##ExecQuery)
+                CMInstanceMIStubChange(pfx), pfx##DeleteInstance, pfx##ExecQuery)
 #define CMAssociationMIStub(pfx, pn, broker, hook)                                            \
     CM_MI_STUB_(Association, assoc, "association", pn, broker, hook, pfx##AssociationCleanup, \
                 pfx##Associators, pfx##AssociatorNames, pfx##References, pfx##ReferenceNames)
@@ -267,11 +272,11 @@
     CM_MI_STUB_(Method, meth, "method", pn, broker, hook, pfx##MethodCleanup, pfx##InvokeMethod)
 #define CMPropertyMIStub(pfx, pn, broker, hook)                                     \
     CM_MI_STUB_(Property, prop, "property", pn, broker, hook, pfx##PropertyCleanup, \
-                pfx##SetProperty, pfx##GetProperty)
+                pfx##SetProperty, pfx##GetProperty, NULL)
 #define CMIndicationMIStub(pfx, pn, broker, hook)                                                \
     CM_MI_STUB_(Indication, ind, "indication", pn, broker, hook, pfx##IndicationCleanup,         \
                 pfx##AuthorizeFilter, pfx##MustPoll, pfx##ActivateFilter, pfx##DeActivateFilter, \
-                pfx##EnableIndications, pfx##DisableIndications)
+                CMIndicationMIStubExtensions(pfx))
 
 #ifdef __cplusplus
 /* Entry points of a C++ provider class cn under the name pn. One object serves all kinds; it is
@@ -310,13 +315,13 @@
     CM_MI_FACTORY_(Method, "method", cn, pn, CmpiMethodMI::driveInvokeMethod)
 #define CMPropertyMIFactory(cn, pn)                                                \
     CM_MI_FACTORY_(Property, "property", cn, pn, CmpiPropertyMI::driveSetProperty, \
-                   CmpiPropertyMI::driveGetProperty)
+                   CmpiPropertyMI::driveGetProperty, NULL)
+#define CMIndicationMIFactoryExtensions \
+    CmpiIndicationMI::driveEnableIndications, CmpiIndicationMI::driveDisableIndications,
 #define CMIndicationMIFactory(cn, pn)                                                        \
     CM_MI_FACTORY_(Indication, "indication", cn, pn, CmpiIndicationMI::driveAuthorizeFilter, \
                    CmpiIndicationMI::driveMustPoll, CmpiIndicationMI::driveActivateFilter,   \
-                   CmpiIndicationMI::driveDeActivateFilter,                                  \
-                   CmpiIndicationMI::driveEnableIndications,                                 \
-                   CmpiIndicationMI::driveDisableIndications)
+                   CmpiIndicationMI::driveDeActivateFilter, CMIndicationMIFactoryExtensions)
 #endif
 
 #endif

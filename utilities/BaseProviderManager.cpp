@@ -18,9 +18,15 @@ namespace {
 constexpr int kVersion = 200;
 constexpr CMPIStatus kOK = {CMPI_RC_OK, nullptr};
 
+// Entries that newer levels of the CMPI headers add at the end of a table stay null, and so does
+// what a server built on such headers finds behind the table of older ones.
+template <class FT>
+struct Table : FT {
+    void (*spare[4])();
+};
+
 }  // namespace
 
-// Entries that newer levels of the CMPI headers add at the end of a table stay null.
 #pragma GCC diagnostic ignored "-Wmissing-field-initializers"
 
 // One kind of interface: record, table, list, and the table's entries, in the table's order.
@@ -143,7 +149,7 @@ typename Kind::MI* zemBaseProviderManager::implGetMI(CMPIBroker* mb, CMPIContext
 
     BaseMIItem* item = getBaseMIItem(mb, ctx, name, create);
     if (item == nullptr) return nullptr;
-    auto table = std::make_unique<typename Kind::FT>(Kind::table);
+    std::unique_ptr<Table<typename Kind::FT>> table(new Table<typename Kind::FT>{Kind::table, {}});
     table->miName = item->m_miName;
     auto record = std::make_unique<typename Kind::MI>();
     record->hdl = item->m_mi;
@@ -192,7 +198,7 @@ int zemBaseProviderManager::indexOf(const typename Kind::MI* mi) {
 
 template <class Kind>
 void zemBaseProviderManager::dropRecord(int index) {
-    delete (this->*Kind::list)[index]->ft;
+    delete static_cast<const Table<typename Kind::FT>*>((this->*Kind::list)[index]->ft);
     (this->*Kind::list).removeElementAt(index);
 }
 

@@ -69,6 +69,12 @@ CMPIStatus zemCmpiIndicationMI::driveMustPoll(CMPIIndicationMI* mi, const CMPICo
     });
 }
 
+CMPIStatus zemCmpiIndicationMI::driveMustPoll(CMPIIndicationMI* mi, const CMPIContext* ctx,
+                                              const CMPIResult*, const CMPISelectExp* filter,
+                                              const char* eventType, const CMPIObjectPath* path) {
+    return driveMustPoll(mi, ctx, filter, eventType, path);
+}
+
 CMPIStatus zemCmpiIndicationMI::driveActivateFilter(CMPIIndicationMI* mi, const CMPIContext* ctx,
                                                     const CMPISelectExp* filter,
                                                     const char* eventType,

@@ -46,6 +46,10 @@ public:
     static CMPIStatus driveMustPoll(CMPIIndicationMI* mi, const CMPIContext* ctx,
                                     const CMPISelectExp* filter, const char* eventType,
                                     const CMPIObjectPath* path);
+    /// The entry of CMPI 2.1, whose result is not used.
+    static CMPIStatus driveMustPoll(CMPIIndicationMI* mi, const CMPIContext* ctx,
+                                    const CMPIResult* result, const CMPISelectExp* filter,
+                                    const char* eventType, const CMPIObjectPath* path);
     static CMPIStatus driveActivateFilter(CMPIIndicationMI* mi, const CMPIContext* ctx,
                                           const CMPISelectExp* filter, const char* eventType,
                                           const CMPIObjectPath* path, CMPIBoolean firstActivation);

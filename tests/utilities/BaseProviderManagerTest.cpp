@@ -84,6 +84,8 @@ TEST_F(BaseProviderManager, SharesOneObjectAmongTheKinds) {
     EXPECT_EQ(200, mi->ft->ftVersion);
     EXPECT_EQ(200, mi->ft->miVersion);
     EXPECT_STREQ("P", mi->ft->miName);
+    // What a server of a newer level looks for behind the entries of the headers at hand.
+    EXPECT_EQ(nullptr, *reinterpret_cast<void* const*>(mi->ft + 1));
     for (const Record& record : records) {
         EXPECT_EQ(0, cleaned);
         EXPECT_EQ(CMPI_RC_OK, record.cleanup(false));

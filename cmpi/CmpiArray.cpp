@@ -32,11 +32,16 @@ CmpiArrayIdx& CmpiArrayIdx::operator=(const CmpiData& v) {
     const CMPIType type = v._data.type;
     const bool sameCType = (wanted == CMPI_boolean && type == CMPI_uint8) ||
                            (wanted == CMPI_char16 && type == CMPI_uint16);
-    // Servers keep texts in one form, whichever of the two the array was made for.
-    const bool text = (wanted == CMPI_string || wanted == CMPI_chars) &&
-                      (type == CMPI_string || type == CMPI_chars);
-    if (type != wanted && !sameCType && !text) throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
-    tell(ar.getEnc(), &CMPIArrayFT::setElementAt, idx, valueOf(v._data), text ? type : wanted);
+    // Some servers make arrays of strings where arrays of characters were asked for, and some take
+    // a text only in the form that the array has.
+    if (wanted == CMPI_string && type == CMPI_chars) {
+        return *this = CmpiData(CmpiString(v.getCString()));
+    }
+    if (wanted == CMPI_chars && type == CMPI_string) {
+        return *this = CmpiData(v.getString().charPtr());
+    }
+    if (type != wanted && !sameCType) throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
+    tell(ar.getEnc(), &CMPIArrayFT::setElementAt, idx, valueOf(v._data), wanted);
     return *this;
 }
 

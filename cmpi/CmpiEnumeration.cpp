@@ -14,7 +14,12 @@ CMPIEnumeration* CmpiEnumeration::getEnc() const { return static_cast<CMPIEnumer
 
 CmpiBoolean CmpiEnumeration::hasNext() { return ask(getEnc(), &CMPIEnumerationFT::hasNext); }
 
-CmpiData CmpiEnumeration::getNext() { return CmpiData(ask(getEnc(), &CMPIEnumerationFT::getNext)); }
+CmpiData CmpiEnumeration::getNext() {
+    CMPIData element = ask(getEnc(), &CMPIEnumerationFT::getNext);
+    // An element is an object, never null. Servers leave the mark of an empty value on it.
+    if (element.value.inst) element.state = CMPI_goodValue;
+    return CmpiData(element);
+}
 
 CmpiData CmpiEnumeration::toArray() {
     return CmpiData(CmpiArray(need(ask(getEnc(), &CMPIEnumerationFT::toArray))));

@@ -78,6 +78,10 @@ struct OpenArgs : CmpiArgs {
     using CmpiArgs::getEnc;
 };
 
+struct OpenEnumeration : CmpiEnumeration {
+    explicit OpenEnumeration(CMPIEnumeration* handle) : CmpiEnumeration(handle) {}
+};
+
 /// The tables belong to the server of the test alone, and may be thinned out.
 struct BindingTest : testing::Test {
     cimom::Server m_server;
@@ -171,6 +175,40 @@ TEST_F(BindingTest, ArraysHoldOneType) {
     flags[0] = CmpiData(CMPIUint8(1));
     EXPECT_EQ(flags[0].getBoolean(), 1);
     EXPECT_EQ(CmpiArray().size(), 0u);
+}
+
+// Whatever a server makes of an array that was asked for, and however strict it is.
+TEST_F(BindingTest, TextsGoIntoArraysInTheArraysOwnForm) {
+    CmpiArray array(2, CMPI_chars);
+    CMPIArrayFT& table = *m_mb.eft->newArray(&m_mb, 1, CMPI_chars, nullptr)->ft;
+    static CMPIType form;
+    static const CMPIArrayFT given = table;
+    table.getSimpleType = [](const CMPIArray*, CMPIStatus*) { return form; };
+    table.setElementAt = [](CMPIArray* a, CMPICount i, const CMPIValue* value, CMPIType type) {
+        if (type != form) return CMPIStatus{CMPI_RC_ERR_TYPE_MISMATCH, nullptr};
+        return given.setElementAt(a, i, value, type);
+    };
+    for (const CMPIType type : {CMPIType(CMPI_chars), CMPIType(CMPI_string)}) {
+        form = type;
+        array[0] = CmpiData("text");
+        array[1] = CmpiData(CmpiString("string"));
+        EXPECT_STREQ(array[0].getString().charPtr(), "text");
+        EXPECT_STREQ(array[1].getString().charPtr(), "string");
+    }
+}
+
+TEST_F(BindingTest, ElementsOfEnumerationsAreNeverNull) {
+    const CmpiObjectPath path("root", "C");
+    CMPIEnumerationFT table = {};
+    table.getNext = [](const CMPIEnumeration* self, CMPIStatus*) {
+        CMPIData marked = {CMPI_ref, CMPI_nullValue, {}};
+        marked.value.ref = static_cast<CMPIObjectPath*>(self->hdl);
+        return marked;
+    };
+    CMPIEnumeration handle = {path.getEnc(), &table};
+    const CmpiData element = OpenEnumeration(&handle).getNext();
+    EXPECT_EQ(element.getObjectPath().getEnc(), path.getEnc());
+    EXPECT_FALSE(element.isNullValue());
 }
 
 TEST_F(BindingTest, MissingValuesAreNullAndNotFound) {

@@ -17,7 +17,8 @@ bool hasTimeout(const CmpiArgs& in) {
     } catch (const CmpiStatus&) {
         return false;  // it was not given, in the way of some servers
     }
-    return !limit.isNullValue() && limit.getDateTime().getDateTime() != 0;
+    if (limit.isNotFound() || limit.isNullValue()) return false;
+    return limit.getDateTime().getDateTime() != 0;
 }
 
 }  // namespace

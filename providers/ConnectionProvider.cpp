@@ -102,7 +102,7 @@ CMPIBoolean ConnectionProvider::isValidInstanceClass(const char* className) {
 }
 
 void ConnectionProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
-    keys[0] = CmpiData("InstanceID");
+    setText(keys, 0, "InstanceID");
 }
 
 ZEM_PROVIDER(ORXC_HostConnectionProvider, ConnectionProvider)

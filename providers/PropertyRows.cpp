@@ -99,7 +99,7 @@ CmpiArray textList(const std::string& text) {
     std::size_t from = 0;
     for (CMPICount i = 0; i < count; ++i) {
         const std::size_t to = std::min(text.find(',', from), text.size());
-        list[i] = CmpiData(text.substr(from, to - from).c_str());
+        zemBaseProvider::setText(list, i, text.substr(from, to - from).c_str());
         from = to + 1;
     }
     return list;
@@ -220,8 +220,8 @@ std::string hostName(const zemRecordType& host) {
 }
 
 void listSystemKeys(CmpiArray& keys) {
-    keys[0] = CmpiData("CreationClassName");
-    keys[1] = CmpiData("Name");
+    zemBaseProvider::setText(keys, 0, "CreationClassName");
+    zemBaseProvider::setText(keys, 1, "Name");
 }
 
 CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,

@@ -248,8 +248,8 @@ void zemSetReferences(CmpiInstance& instance, const char* property1, const CmpiO
 }
 
 void zemListReferences(CmpiArray& keys, const char* property1, const char* property2) {
-    keys[0] = CmpiData(property1);
-    keys[1] = CmpiData(property2);
+    zemBaseProvider::setText(keys, 0, property1);
+    zemBaseProvider::setText(keys, 1, property2);
 }
 
 bool zemServesClass(const char* name, const char* assocClass, int supported, int mask) {

@@ -205,7 +205,7 @@ public:
     virtual CMPIBoolean isValidIndicationClass(const char* className);
 
     /// Lists the keys without which an operation on one object is refused.
-    /// @param keys  room for ten texts; the first entry left null ends the list
+    /// @param keys  room for ten texts, set by setText; the first entry left null ends the list
     virtual void populateEssentialKeys(const char* className, CmpiArray& keys);
 
     /// Lists the arguments that a method knows; every argument not listed is refused.
@@ -357,6 +357,12 @@ public:
     /// @throws zemInvalidParameterException  when it is missing, null or unreadable
     CmpiData getParmVal(const CmpiArgs& args, const char* name) const;
     CmpiData getPropVal(const CmpiInstance& instance, const char* name) const;
+
+    /// Sets an element of an array that was made for CMPI_chars to a text, which is copied; a null
+    /// text leaves it as it is. Some servers make such an array one of strings, and some bindings
+    /// take a text only in the form that the array has: this gives it in that form.
+    /// @throws CmpiStatus  CMPI_RC_ERR_NO_SUCH_PROPERTY for an index beyond the end
+    static void setText(CmpiArray& array, CMPICount index, const char* text);
 
     /// An array of CMPI_chars with these texts; a null pointer leaves its element null.
     static CmpiArray convertStringArray(const zemDynamicArray<zemString>& strings);

@@ -318,7 +318,11 @@ CmpiObjectPath zemBaseProvider::createObjectPath(const zemString& source) {
 }
 
 CmpiData zemBaseProvider::getKeyBinding(const CmpiObjectPath& path, const char* name) {
-    CmpiData value;
+    // Not every binding's empty value tests as not found.
+    struct NotFound : CmpiData {
+        NotFound() { _data.state = CMPI_nullValue | CMPI_notFound; }
+    };
+    CmpiData value = NotFound();
     zemQuietly([&] { value = path.getKey(name); });
     return value;
 }
@@ -337,13 +341,17 @@ CmpiData zemBaseProvider::getPropVal(const CmpiInstance& instance, const char* n
     throwPropertyNotFoundExc(zemClassOf(instance), name);
 }
 
+void zemBaseProvider::setText(CmpiArray& array, CMPICount index, const char* text) {
+    if (text == nullptr) return;
+    const bool ofStrings = CmpiData(array).getType() == CMPI_stringA;
+    array[index] = ofStrings ? CmpiData(CmpiString(text)) : CmpiData(text);
+}
+
 CmpiArray zemBaseProvider::convertStringArray(const zemDynamicArray<zemString>& strings) {
     CmpiArray array(static_cast<CMPICount>(strings.size()), CMPI_chars);
     for (int i = 0; i < strings.size(); ++i) {
         const zemString* text = strings.getElementAt(i);
-        if (text != nullptr) {
-            array[static_cast<CMPICount>(i)] = CmpiData(static_cast<const char*>(*text));
-        }
+        if (text != nullptr) setText(array, static_cast<CMPICount>(i), *text);
     }
     return array;
 }
@@ -351,7 +359,7 @@ CmpiArray zemBaseProvider::convertStringArray(const zemDynamicArray<zemString>& 
 CmpiArray zemBaseProvider::convertStringArray(const zemArray<const char*>& strings) {
     CmpiArray array(static_cast<CMPICount>(strings.size()), CMPI_chars);
     for (int i = 0; i < strings.size(); ++i) {
-        if (strings[i] != nullptr) array[static_cast<CMPICount>(i)] = CmpiData(strings[i]);
+        setText(array, static_cast<CMPICount>(i), strings[i]);
     }
     return array;
 }

@@ -88,8 +88,8 @@ protected:
         return strcmp(method, "Fail") == 0;
     }
     void populateEssentialKeys(const char*, CmpiArray& keys) override {
-        keys[0] = CmpiData("Name");
-        keys[1] = CmpiData("Slot");
+        setText(keys, 0, "Name");
+        setText(keys, 1, "Slot");
     }
     void populateMethodArgs(const char*, zemDynamicArray<zemString>& args,
                             const char* method) override {

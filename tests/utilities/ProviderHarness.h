@@ -40,7 +40,7 @@ public:
     CMPIBoolean isValidIndicationClass(const char*) override { return script.indicationClass; }
     void populateEssentialKeys(const char*, CmpiArray& keys) override {
         CMPICount i = 0;
-        for (const std::string& key : script.keys) keys[i++] = CmpiData(key.c_str());
+        for (const std::string& key : script.keys) setText(keys, i++, key.c_str());
     }
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {

@@ -18,8 +18,8 @@
 /// tagAttributePair, some names) is quoted by whoever hands it over, with quoted(), itemValue() and
 /// filterItem(). A text from outside must never go into a line without:
 ///
-///     zemString filter = zemCommandCaller::quoted(zemCommandCaller::filterItem("lpar_names",
-///     name));
+///     using Caller = zemCommandCaller;
+///     zemString filter = Caller::quoted(Caller::filterItem("lpar_names", name));
 #ifndef COMMAND_CALLER_H
 #define COMMAND_CALLER_H
 

@@ -23,6 +23,7 @@
 #include <functional>
 #include <memory>
 #include <new>
+#include <type_traits>
 #include <utility>
 #include <vector>
 
@@ -310,12 +311,12 @@ public:
     void insertBlanks(std::shared_ptr<const std::vector<K>> keys) { m_blanks = std::move(keys); }
 
     int lookup(const K& key, V& value) const {
-        const int result = Base::lookup(key, value);
-        if (result == Base::absent && isBlank(key)) {
-            value = V();
-            return Base::done;
+        const V* const found = valueOf(key);
+        if (found == nullptr) {
+            return Base::absent;
         }
-        return result;
+        value = *found;
+        return Base::done;
     }
 
     int remove(const K& key) {
@@ -337,22 +338,22 @@ public:
     /// The value of @p key, owned by the table.
     /// @throws int 3 if the key is absent
     V& operator[](const K& key) {
-        typename Base::Bucket* bucket = this->find(key);
+        auto* bucket = this->find(key);
         if (bucket == nullptr) {
-            expectBlank(key);
-            this->add(key, V(), true);
+            static_cast<void>(std::as_const(*this)[key]);  // throws unless there is a blank
+            if constexpr (std::is_default_constructible_v<V>) {
+                this->add(key, V(), true);
+            }
             bucket = this->find(key);
         }
         return bucket->m_element.m_value;
     }
     const V& operator[](const K& key) const {
-        const typename Base::Bucket* const bucket = this->find(key);
-        if (bucket == nullptr) {
-            static const V blank{};
-            expectBlank(key);
-            return blank;
+        const V* const found = valueOf(key);
+        if (found == nullptr) {
+            throw int{Base::absent};
         }
-        return bucket->m_element.m_value;
+        return *found;
     }
 
     /// The same, copied.
@@ -369,10 +370,16 @@ private:
                std::find(m_blanks->begin(), m_blanks->end(), key) != m_blanks->end();
     }
 
-    void expectBlank(const K& key) const {
-        if (!isBlank(key)) {
-            throw int{Base::absent};
+    /// The value of @p key, or null.
+    const V* valueOf(const K& key) const {
+        if (const auto* const bucket = this->find(key)) {
+            return &bucket->m_element.m_value;
         }
+        if constexpr (std::is_default_constructible_v<V>) {
+            static const V blank{};
+            return isBlank(key) ? &blank : nullptr;
+        }
+        return nullptr;
     }
 
     std::shared_ptr<const std::vector<K>> m_blanks;

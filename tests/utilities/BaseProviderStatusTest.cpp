@@ -72,6 +72,69 @@ TEST_P(BaseProviderStatus, TurnsExceptionsIntoStatus) {
                   "run on class Tool with an exception id of E7 and an exception string of "
                   "\"\". The exception was thrown on behalf of access method getLPAR.",
               handled(zemOperationFailedException("Tool", "run", "getLPAR", "E7", "")).text);
+    // Texts from outside may be of any length; what is told ends between two characters.
+    std::string text = "x";
+    for (int i = 0; i < 10000; ++i) text += "\xC3\xA4";
+    EXPECT_EQ(text.substr(0, 16383) + "...",
+              handled(zemOperationFailedException(text.c_str())).text);
+}
+
+// A server need not have all functions: none of them is called where it is missing.
+TEST_P(BaseProviderStatus, TakesServersThatLackFunctions) {
+    static CMPIBrokerEncFT table;
+    table = *h.server.broker()->eft;
+    table.newString = nullptr;
+    table.trace = nullptr;
+    table.logMessage = nullptr;
+    table.openMessageFile = nullptr;
+    table.newInstance = nullptr;
+    h.server.broker()->eft = &table;
+    EXPECT_STREQ("as is", p.retrieveLocalizedString("none", "E.X", "as is", 0));
+    EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, p.handleException("M", zemObjectNotFoundException("x")).rc());
+    p.trace("x");
+    CMPIContextFT contextTable = *h.ctx()->ft;
+    contextTable.addEntry = nullptr;
+    CMPIContext context = *h.ctx();
+    context.ft = &contextTable;
+    p.logICUMessage(CmpiContext(&context), 1, "Id", "none", "E.X", "x");
+    const char* names[] = {"Colour",
+                           nullptr};  // of which a server without new instances says nothing
+    p.validateProerties(CmpiObjectPath(h.path()), names, "M");
+    CMPIObjectPathFT pathTable = *h.path()->ft;
+    pathTable.getKey = nullptr;
+    CMPIObjectPath path = *h.path();
+    path.ft = &pathTable;
+    p.validateKeys(CmpiObjectPath(h.path()), CmpiObjectPath(&path), "M", true);
+}
+
+CMPIString* readMessage(const CMPIBroker*, const char* key, const CMPIMsgFileHandle, const char*,
+                        CMPIStatus*, CMPICount, ...) {
+    if (*key == 'T') throw std::bad_alloc();
+    return nullptr;
+}
+
+// However the reading of a message ends, what was opened for it is closed.
+TEST_P(BaseProviderStatus, ClosesWhatItOpens) {
+    static int opened, closed;
+    opened = closed = 0;
+    static CMPIBrokerEncFT table;
+    table = *h.server.broker()->eft;
+    table.openMessageFile = [](auto, auto, CMPIMsgFileHandle* handle) {
+        *handle = &opened;
+        return CMPIStatus{++opened % 2 == 0 ? CMPI_RC_ERR_FAILED : CMPI_RC_OK, nullptr};
+    };
+    table.closeMessageFile = [](auto, const CMPIMsgFileHandle handle) {
+        closed += handle == &opened ? 1 : 0;
+        return CMPIStatus{CMPI_RC_OK, nullptr};
+    };
+    h.server.broker()->eft = &table;
+    for (const auto message : {readMessage, decltype(&readMessage){nullptr}})
+        for (const char* key : {"Throws", "Unopened", "None", "Unopened"}) {
+            table.getMessage2 = message;
+            EXPECT_STREQ("as is", p.retrieveLocalizedString("b", key, "as is", 0));
+        }
+    EXPECT_EQ(8, opened);
+    EXPECT_EQ(4, closed);
 }
 
 TEST_P(BaseProviderStatus, FallsBackToTheDefaultText) {

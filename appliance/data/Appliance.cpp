@@ -1,10 +1,6 @@
 // The program "appliance": makes an appliance's state, shows it and checks it, and lets tools fail.
 
-#include <unistd.h>
-
 #include <CLI/CLI.hpp>
-#include <chrono>
-#include <cstdio>
 #include <iostream>
 
 #include "Appliances.h"
@@ -27,35 +23,6 @@ constexpr const char* kFooter =
 constexpr std::int64_t kMostHosts = 65535;  ///< MAC addresses number hosts and partitions
 constexpr std::int64_t kMostLpars = 65000;
 
-/// Tells a watching person how far a long work is; says nothing before two seconds are over.
-class Progress {
-public:
-    explicit Progress(std::int64_t total) : m_total(total) {}
-    ~Progress() {
-        if (m_shown) std::fputc('\n', stderr);
-    }
-    Progress(const Progress&) = delete;
-    Progress& operator=(const Progress&) = delete;
-
-    void operator()(std::int64_t done) {
-        const auto now = std::chrono::steady_clock::now();
-        if (!m_watched || now - m_last < (m_shown ? std::chrono::milliseconds(200)
-                                                  : std::chrono::milliseconds(2000))) {
-            return;
-        }
-        m_last = now;
-        m_shown = true;
-        std::fprintf(stderr, "\r%lld of %lld hosts", static_cast<long long>(done),
-                     static_cast<long long>(m_total));
-    }
-
-private:
-    const bool m_watched = isatty(STDERR_FILENO) != 0;
-    const std::int64_t m_total;
-    bool m_shown = false;
-    std::chrono::steady_clock::time_point m_last = std::chrono::steady_clock::now();
-};
-
 /// Fills the state anew, in one transaction: whoever reads meanwhile sees what was there before.
 template <typename Fill>
 void fill(bool force, Fill fillStore) {
@@ -72,13 +39,15 @@ void showState(const std::string& format) {
     std::cout << (format == "json" ? showJson(store) : showText(store));
 }
 
-void showJournal(std::int64_t after) {
+void showJournal(std::int64_t after, bool asJson) {
     constexpr std::int64_t kAtOnce = 1000;
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
     for (auto lines = store.journal(after, kAtOnce); !lines.empty();
          lines = store.journal(after, kAtOnce)) {
-        for (const auto& [number, line] : lines) std::cout << number << ' ' << line << '\n';
+        for (const auto& [number, line] : lines) {
+            std::cout << (asJson ? journalJson(number, line) : journalText(number, line));
+        }
         after = lines.back().first;
     }
 }
@@ -94,8 +63,9 @@ int checkState() {
 int run(int argc, char** argv) {
     CLI::App app{"Makes and shows the state of an appliance that manages partitioned hosts."};
     app.footer(kFooter);
-    app.require_subcommand(1);
-    bool force = false;
+    app.require_subcommand(0, 1);  // with one at least, a mistyped one would not be named
+    app.set_version_flag("--version", "appliance " APPLIANCE_VERSION);
+    bool force = false, asJson = false;
     Size size{3, 10, 1};
     std::string format = "text";
     std::int64_t after = 0;
@@ -106,15 +76,12 @@ int run(int argc, char** argv) {
     init->callback([&] { fill(force, fillDemo); });
     CLI::App* generate = app.add_subcommand(
         "generate", "Make an appliance of any size; the same options always make the same one.");
-    generate->callback([&] {
-        Progress progress(size.hosts);
-        fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
-    });
+    generate->callback([&] { fill(force, [&](Store& store) { fillGenerated(store, size); }); });
     CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
     show->callback([&] { showState(format); });
     CLI::App* journal = app.add_subcommand(
         "journal", "Show the journal of changes, each with its number: oldest first.");
-    journal->callback([&] { showJournal(after); });
+    journal->callback([&] { showJournal(after, asJson); });
     app.add_subcommand("check",
                        "Check that the state obeys the rules of hosts, and print those that it "
                        "breaks.")
@@ -137,10 +104,12 @@ int run(int argc, char** argv) {
     journal->add_option("--after", after, "Only changes behind the one with this number")
         ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
+    journal->add_flag("--json", asJson, "A JSON object in a line for each change");
     for (CLI::App* verb : app.get_subcommands({})) verb->footer(kFooter);
 
     try {
         app.parse(argc, argv);
+        if (app.get_subcommands().empty()) throw CLI::RequiredError::Subcommand(1);
     } catch (const CLI::ParseError& error) {
         return app.exit(error) == 0 ? 0 : kExitUsage;
     }

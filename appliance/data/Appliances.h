@@ -3,7 +3,6 @@
 #define APPLIANCE_APPLIANCES_H
 
 #include <cstdint>
-#include <functional>
 
 #include "Store.h"
 
@@ -20,9 +19,7 @@ struct Size {
 };
 
 /// Any number of hosts and partitions; the same for the same Size on every machine.
-/// @param progress  called from time to time with how many hosts are done
-void fillGenerated(Store& store, const Size& size,
-                   const std::function<void(std::int64_t)>& progress);
+void fillGenerated(Store& store, const Size& size);
 
 }  // namespace appliance
 

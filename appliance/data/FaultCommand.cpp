@@ -26,6 +26,21 @@ std::vector<std::string> names() {
     return all;
 }
 
+/// Empty for the name of a tool or an operation; otherwise what is wrong, with all names in
+/// columns.
+std::string judge(const std::string& name) {
+    constexpr std::size_t kColumns = 3, kWidth = 30;
+    const std::vector<std::string> all = names();
+    if (std::binary_search(all.begin(), all.end(), name)) return {};
+    std::string text = "there is no tool or operation " + name + "; there are";
+    for (std::size_t i = 0; i < all.size(); ++i) {
+        if (i % kColumns == 0) text += "\n  ";
+        text += all[i];
+        if (i % kColumns + 1 < kColumns) text.append(kWidth - std::min(kWidth, all[i].size()), ' ');
+    }
+    return text;
+}
+
 std::string describe(const PlannedFault& fault) {
     std::string text = fault.name + ": " + std::to_string(fault.calls) + " calls";
     if (fault.delay != 0) text += ", delay " + std::to_string(fault.delay) + " ms";
@@ -72,7 +87,7 @@ void addFaultCommand(CLI::App& app) {
         "(getCecObj ...) go wrong. Without a name: show what is planned.");
     command->callback([options] { carryOut(*options); });
     command->add_option("name", options->plan.name, "Tool or operation")
-        ->check(CLI::IsMember(names()).description(""));
+        ->check(CLI::Validator([](const std::string& name) { return judge(name); }, ""));
     command->add_option("--calls", options->plan.calls, "How many calls")
         ->check(CLI::Range(std::int64_t{1}, kMost))
         ->capture_default_str();

@@ -80,12 +80,10 @@ void addHost(Store& store, Dice& dice, const Size& size, std::int64_t number) {
 
 }  // namespace
 
-void fillGenerated(Store& store, const Size& size,
-                   const std::function<void(std::int64_t)>& progress) {
+void fillGenerated(Store& store, const Size& size) {
     Dice dice(size.seed);
     for (std::int64_t number = 1; number <= size.hosts; ++number) {
         addHost(store, dice, size, number);
-        progress(number);
     }
 }
 

@@ -61,7 +61,55 @@ Json attributes(const Object& object) {
     return json;
 }
 
+std::string dumped(const Json& json) {
+    return json.dump(-1, ' ', false, Json::error_handler_t::replace);
+}
+
+/// Of what was changed all that differs, of what was added or deleted its name.
+std::string changes(const Json& object) {
+    const Json none = Json::object(), old = object.value("old", none),
+               now = object.value("new", none);
+    const bool isBoth = object.at("event") == "modify";
+    std::string text;
+    for (const auto& [name, value] : (old.empty() ? now : old).items()) {
+        if (!isBoth && name != "name") continue;
+        text += (text.empty() ? ": " : ", ") + name + ' ' + dumped(value);
+        if (isBoth) text += " -> " + dumped(now.at(name));
+    }
+    return text;
+}
+
+std::string entry(const Json& change) {
+    std::string text = timeText(change.at("time")) + "  " + change.at("tool").get<std::string>();
+    if (change.contains("move")) text += ": " + change["move"].at("state").get<std::string>();
+    for (const Json& object : change.at("objects")) {
+        const std::string kind = object.at("kind"), event = object.at("event");
+        const std::int64_t lpar = object.at("lpar"), number = object.at("number");
+        text.append("\n    ").append(event).append(1, ' ').append(kind);
+        if (lpar != 0) text += ' ' + std::to_string(lpar);
+        if (kind != "lpar" && kind != "host") {
+            text += (lpar != 0 ? '/' : ' ') + std::to_string(number);
+        }
+        text += " of " + object.at("host").get<std::string>() + changes(object);
+    }
+    return text;
+}
+
 }  // namespace
+
+std::string journalJson(std::int64_t number, const std::string& line) {
+    return "{\"number\":" + std::to_string(number) + ',' + line.substr(1) + '\n';
+}
+
+std::string journalText(std::int64_t number, const std::string& line) {
+    std::string text = line;
+    try {
+        text = entry(Json::parse(line));
+    } catch (const Json::exception&) {
+        // Not written by a tool.
+    }
+    return std::to_string(number) + "  " + text + '\n';
+}
 
 std::string showText(Store& store) {
     std::string text;

@@ -4,12 +4,11 @@
 
 #include <string>
 
-#include "Failure.h"
 #include "Tools.h"
 
 namespace appliance {
 
-std::string help(const ToolName& tool, Language language);
+std::string help(const ToolName& tool);
 
 }  // namespace appliance
 

@@ -50,13 +50,15 @@ bool failsAsPlanned(const std::string& name, int* status) {
     return fault->code || !fault->text.empty();
 }
 
-int run(const std::string& name, const char* const* arguments, Language language) {
+int run(const std::string& name, const char* const* arguments) {
     const ToolName& tool = toolNamed(name);
     int status = 0;
     if (failsAsPlanned(name, &status)) return status;
     const Request request(tool, arguments);
     if (request.has("--help")) {
-        writeAll(help(tool, language));
+        writeAll(help(tool));
+    } else if (request.has("--version")) {
+        writeAll(name + " " APPLIANCE_VERSION "\n");
     } else if (operationsOf(tool.tool).empty()) {
         writeAll(answer(request));
     } else {
@@ -78,7 +80,7 @@ int main(int, char** argv) {
     const Language language = languageOfEnvironment();
     try {
         const std::string program = argv[0] == nullptr ? "" : argv[0];
-        return run(program.substr(program.rfind('/') + 1), argv + 1, language);
+        return run(program.substr(program.rfind('/') + 1), argv + 1);
     } catch (const Failure& failure) {
         return report(failure, language);
     } catch (const std::exception& damage) {

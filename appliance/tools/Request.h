@@ -12,10 +12,9 @@ namespace appliance {
 
 struct Option {
     const char* name;
-    unsigned tools;       ///< bits of Tool
-    const char* value;    ///< what stands for the value in the help; null: the option has none
-    const char* english;  ///< what the help says of it
-    const char* german;
+    unsigned tools;     ///< bits of Tool
+    const char* value;  ///< what stands for the value in the help; null: the option has none
+    const char* meaning;
 };
 
 std::vector<Option> optionsOf(Tool tool);

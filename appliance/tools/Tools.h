@@ -27,39 +27,26 @@ enum Tool : unsigned {
 struct ToolName {
     Tool tool;
     const char* name;
-    const char* english;  ///< what the tool is for
-    const char* german;
+    const char* purpose;
 };
 
 inline constexpr ToolName kToolNames[] = {
-    {kQyplat, "qyplat", "lists managed systems, partitions and profiles",
-     "listet verwaltete Systeme, Partitionen und Profile auf"},
-    {kQyalloc, "qyalloc", "lists the resources of managed systems and who has them",
-     "listet die Ressourcen verwalteter Systeme auf, und wer sie hat"},
-    {kQymove, "qymove", "lists what can move between managed systems, and what moves",
-     "listet auf, was zwischen verwalteten Systemen umziehen kann und was umzieht"},
-    {kQyusage, "qyusage", "lists utilisation samples", "listet Messungen der Auslastung auf"},
-    {kQyfault, "qyfault", "lists reference codes", "listet Referenzcodes auf"},
-    {kQylink, "qylink", "lists the connections to managed systems",
-     "listet die Verbindungen zu verwalteten Systemen auf"},
-    {kQylwh, "qylwh", "names the host that this appliance alone manages, and its partition",
-     "nennt den Host, den allein diese Appliance verwaltet, und ihre Partition darauf"},
-    {kQydyn, "qydyn", "lists what partitions can change while they run",
-     "listet auf, was Partitionen im laufenden Betrieb ändern können"},
-    {kXbrgcli, "xbrgcli", "has a running I/O server carry out a command",
-     "lässt einen laufenden I/O-Server einen Befehl ausführen"},
-    {kEdalloc, "edalloc", "changes the resources that a partition has now",
-     "ändert die Ressourcen, die eine Partition jetzt hat"},
-    {kEdplat, "edplat", "changes managed systems, partitions and profiles",
-     "ändert verwaltete Systeme, Partitionen und Profile"},
-    {kNwplat, "nwplat", "makes a partition", "legt eine Partition an"},
-    {kDlplat, "dlplat", "deletes a partition", "löscht eine Partition"},
-    {kEdpower, "edpower", "starts and stops managed systems and partitions",
-     "startet und beendet verwaltete Systeme und Partitionen"},
-    {kEdsusp, "edsusp", "suspends and resumes partitions",
-     "hält Partitionen an und setzt sie fort"},
-    {kDomove, "domove", "moves a partition to another managed system",
-     "zieht eine Partition auf ein anderes verwaltetes System um"},
+    {kQyplat, "qyplat", "lists managed systems, partitions and profiles"},
+    {kQyalloc, "qyalloc", "lists the resources of managed systems and who has them"},
+    {kQymove, "qymove", "lists what can move between managed systems, and what moves"},
+    {kQyusage, "qyusage", "lists utilisation samples"},
+    {kQyfault, "qyfault", "lists reference codes"},
+    {kQylink, "qylink", "lists the connections to managed systems"},
+    {kQylwh, "qylwh", "names the host that this appliance alone manages, and its partition"},
+    {kQydyn, "qydyn", "lists what partitions can change while they run"},
+    {kXbrgcli, "xbrgcli", "has a running I/O server carry out a command"},
+    {kEdalloc, "edalloc", "changes the resources that a partition has now"},
+    {kEdplat, "edplat", "changes managed systems, partitions and profiles"},
+    {kNwplat, "nwplat", "makes a partition"},
+    {kDlplat, "dlplat", "deletes a partition"},
+    {kEdpower, "edpower", "starts and stops managed systems and partitions"},
+    {kEdsusp, "edsusp", "suspends and resumes partitions"},
+    {kDomove, "domove", "moves a partition to another managed system"},
 };
 
 }  // namespace appliance

@@ -37,6 +37,11 @@ TEST_F(ApplianceTest, EndsWithTheStatusThatTheHelpNames) {
         {"appliance generate --force --hosts 0", 0, "", ""},
         {"qyplat -r sys", 0, "No results were found.", ""},
         {"appliance", 2, "", "subcommand"},
+        {"appliance shwo --after 2", 2, "", "shwo"},
+        {"appliance --version", 0, "appliance ", ""},
+        {"APPLIANCE_HOME=$APPLIANCE_HOME/two; export APPLIANCE_HOME; appliance init; "
+         "edplat -r lpar -m alpha -i lpar_id=3,new_name=w; appliance journal",
+         0, "  edplat\n    modify lpar 3 of 1111-AAA*0000001: name \"web server\" -> \"w\"\n", ""},
         {"appliance --help", 0, "Exit status: 0 done", ""},
         {"appliance generate --help", 0, "--seed", ""},
     };

@@ -1,5 +1,5 @@
-// edalloc, edplat, nwplat and dlplat: what they change shows through both doors, what they refuse
-// changes nothing.
+// edalloc, edplat, nwplat and dlplat: tools and management library show what they change; what they
+// refuse changes nothing.
 
 #include <nlohmann/json.hpp>
 
@@ -58,7 +58,7 @@ TEST_F(ChangeToolsTest, ResourcesMove) {
         {"edalloc -r virtualio --rsubtype serial -m alpha -o r --id 4 -s 7"},
         {"qyalloc -r virtualio --rsubtype slot -m alpha --level slot --filter slots=4,7,8,9 -F lpar_id,slot_num,config", "2,7,serial\n3,4,ethernet\n"},
         {"appliance check"},
-        {"appliance journal | wc -l", "21\n"},
+        {"appliance journal --json | wc -l", "21\n"},
     });
     const Answer memory(getLparMemoryCfg("", "4*1111-AAA*0000001", 2)), adapters(getLparVirtualEthernet("", "3*1111-AAA*0000001", 2));
     EXPECT_EQ("17408", memory.value(0, "CurAllocMem"));
@@ -241,16 +241,16 @@ TEST_F(ChangeToolsTest, TheJournalTellsWhatChanged) {
     const auto since = std::time(nullptr);
     out("edplat -r lpar -m alpha -i '\"lpar_id=3\",\"new_name=\xff\"'");
     out("edalloc -r io --rsubtype slot -m alpha -o a --id 4 -l 30000006");
-    const auto lines = testing_support::lines(out("appliance journal"));
+    const auto lines = testing_support::lines(out("appliance journal --json"));
     ASSERT_EQ(2U, lines.size());
-    EXPECT_EQ("1 ", lines[0].substr(0, 2));
-    const auto rename = nlohmann::json::parse(lines[0].substr(2));
+    const auto rename = nlohmann::json::parse(lines[0]);
+    EXPECT_EQ(1, rename["number"]);
     EXPECT_EQ("edplat", rename["tool"]);
     EXPECT_LE(since, rename["time"].get<std::time_t>());
     EXPECT_EQ(nlohmann::json::parse(R"([{"event": "modify", "kind": "lpar", "lpar": 3, "number": 0,
         "host": "1111-AAA*0000001", "old": {"name": "web server"}, "new": {"name": "�"}}])"),
               rename["objects"]);
-    const auto slot = nlohmann::json::parse(lines[1].substr(2))["objects"];
+    const auto slot = nlohmann::json::parse(lines[1])["objects"];
     ASSERT_EQ(2U, slot.size());
     EXPECT_EQ("delete", slot[0]["event"]);
     EXPECT_EQ("add", slot[1]["event"]);
@@ -296,7 +296,7 @@ TEST_F(ChangeToolsTest, TheLibrarysCallersAreUnderstood) {
         {"qyplat -r prof -m alpha --filter lpar_ids=4,profile_names=normal -F virtual_eth_adapters",
          "\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/storage\"\",\"\"7/1/1/5,7/0/0/default\"\"\"\n"},
         {"qyplat -r lpar -m alpha --filter lpar_ids=8 -F name", "\"a, b\"\n"},
-        {"appliance journal | wc -l", "7\n"},
+        {"appliance journal --json | wc -l", "7\n"},
     });
 }
 

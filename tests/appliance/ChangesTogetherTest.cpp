@@ -1,5 +1,5 @@
-// Changes by several processes at once, changes that are killed, and changes for which there is no
-// room. ZEM_CHANGES is the number of rounds, for a long run.
+// Changes by several processes at once, changes that are killed, and changes for which the disk has
+// no space. ZEM_CHANGES is the number of rounds, for a long run.
 
 #include <gtest/gtest.h>
 #include <signal.h>
@@ -27,7 +27,7 @@ protected:
     std::int64_t lineCount(const std::string& command) {
         return static_cast<std::int64_t>(lines(out(command)).size());
     }
-    std::int64_t journalLines() { return lineCount("appliance journal"); }
+    std::int64_t journalLines() { return lineCount("appliance journal --json"); }
 };
 
 TEST_F(ChangesTogetherTest, WhatSucceedsAddsUp) {
@@ -53,7 +53,7 @@ TEST_F(ChangesTogetherTest, WhatSucceedsAddsUp) {
     EXPECT_EQ(7 + done['n'] - done['d'], lineCount("qyplat -r lpar -m alpha"));
     EXPECT_EQ(done['\n'], journalLines());
     EXPECT_EQ(std::to_string(done['\n']) + '\n',
-              out("appliance journal | tail -1 | cut -d' ' -f1"));
+              out("appliance journal --json | tail -1 | tr , : | cut -d: -f2"));
     EXPECT_EQ("", out("appliance check"));
     // Nothing was refused but for want of memory, of a free name, or of the partition to delete.
     EXPECT_EQ("", m_appliance.run("cat $APPLIANCE_HOME/err.* | grep -v 'WRTL8036\\|WRTL8032'").out);

@@ -36,7 +36,7 @@ TEST_F(MoveTest, RunsInTheBackground) {
     EXPECT_TRUE(partition.validateMigratebility("beta lab", false, "", nullptr));
     pid_t pid = 0;
     FILE* stream = nullptr;
-    const std::size_t before = testing_support::lines(out("appliance journal")).size();
+    const std::size_t before = testing_support::lines(out("appliance journal --json")).size();
     ASSERT_EQ(0, partition.migrateTo("beta lab", false, "", nullptr, &pid, &stream));
     int status = -1, seen = 0;
     testing::internal::CaptureStdout();  // the log of the queries
@@ -72,11 +72,11 @@ TEST_F(MoveTest, RunsInTheBackground) {
     EXPECT_EQ("0,day, night", there.value(0, "Curr_prof"));
 
     // One line for the start, for each step, and for the end; whoever follows them needs no more.
-    const auto journal = testing_support::lines(out("appliance journal"));
+    const auto journal = testing_support::lines(out("appliance journal --json"));
     ASSERT_EQ(before + 12, journal.size());
     std::int64_t sent = -1;
     for (std::size_t i = before; i < journal.size(); ++i) {
-        const auto line = nlohmann::json::parse(journal[i].substr(journal[i].find(' ')));
+        const auto line = nlohmann::json::parse(journal[i]);
         const auto& move = line["move"];
         const auto bytes = [&](const char* which) {
             return std::stoll(move[which].get<std::string>());
@@ -106,6 +106,8 @@ TEST_F(MoveTest, ThatIsStoppedOrKilledLeavesNothing) {
     EXPECT_EQ("WRTL8074 The move of the partition with the ID 7 was stopped.\n", stopped.err);
     EXPECT_EQ(before, shown());
     EXPECT_EQ("", out("appliance check"));
+    const auto last = nlohmann::json::parse(out("appliance journal --json | tail -1"));
+    EXPECT_EQ("Migration Stopped", last["move"]["state"]);
 
     m_appliance.run(std::string(kUnderWay) + "kill -9 $p; wait $p");
     EXPECT_NE(before, shown());
@@ -186,7 +188,7 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
             change.commit();
         };
         if (usual) put(*usual, row.value);
-        const std::string before = shown(), journal = out("appliance journal");
+        const std::string before = shown(), journal = out("appliance journal --json");
         for (const std::string operation : {"v", "m"}) {
             const auto outcome =
                 m_appliance.run("domove -o " + operation + " -m alpha " + row.options);
@@ -195,7 +197,7 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
             EXPECT_NE(0, outcome.exit);
         }
         EXPECT_EQ(before, shown()) << row.options << row.code;
-        EXPECT_EQ(journal, out("appliance journal"));
+        EXPECT_EQ(journal, out("appliance journal --json"));
         if (usual) put(*usual, nullptr);
     }
     EXPECT_EQ("WRTL8073", m_appliance.run("domove -o s -m alpha --id 7").err.substr(0, 8));

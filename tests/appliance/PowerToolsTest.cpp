@@ -1,4 +1,5 @@
-// edpower and edsusp: what they change shows through both doors, what they refuse changes nothing.
+// edpower and edsusp: tools and management library show what they change; what they refuse changes
+// nothing.
 
 #include "ApiAnswer.h"
 #include "EdpowerCaller.h"
@@ -26,7 +27,7 @@ TEST_F(PowerToolsTest, PartitionsStartAndStop) {
         {"qyplat -r lpar --filter lpar_ids=1,3 -F state,os_version,curr_profile,boot_mode,curr_lpar_proc_compat_mode" BETA, "Running,XBRG 2.1,normal,norm,CORAL7\nRunning,Linux 5.14,normal,sms,CORAL7\n"},
         {"qyalloc -r mem --level lpar --filter lpar_ids=3 -F pend_mem,curr_mem,run_mem,run_min_mem" BETA, "4096,4096,4096,2048\n"},
         {"qyalloc -r virtualio --rsubtype eth --level lpar --filter lpar_ids=1,3 -F state,mac_addr" BETA, "1,A20002000102\n1,A20002000302\n"},
-        {"appliance journal | wc -l", "2\n"},
+        {"appliance journal --json | wc -l", "2\n"},
         {"edpower -r lpar --id 3 -o shutdown --immed  --restart " BETA},
         {"edpower -r lpar --id 3 -o dumprestart" BETA},
         {"qyplat -r lpar --filter lpar_ids=3 -F state,boot_mode" BETA, "Running,sms\n"},
@@ -64,6 +65,11 @@ TEST_F(PowerToolsTest, AProfileGetsWhatIsLeft) {
         {"qyalloc -r proc --level lpar -m gamma --filter lpar_ids=2 -F curr_proc_mode,curr_shared_proc_pool_id,curr_procs,curr_min_proc_units,curr_proc_units,curr_max_proc_units", "ded,null,4,2.00,4.00,80.00\n"},
         {"qyalloc -r io --rsubtype slot -m gamma --filter drc_indexes=30000003 -F lpar_id", "2\n"},
         {STATES ",curr_profile", "1,Not Activated,normal\n2,Open Firmware,normal\n7,Running,my-prof\n"},
+        // Nothing runs that could end itself or write a dump.
+        {LPAR "--id 2 -o osshutdown", "WRTL8049 The partition with the ID 2 cannot do this in the state \"Open Firmware\".\n"},
+        {LPAR "--id 2 -o dumprestart", "WRTL8049 The partition with the ID 2 cannot do this in the state \"Open Firmware\".\n"},
+        {LPAR "--id 2 -o shutdown --immed --restart"},
+        {STATES " --filter lpar_ids=2", "2,Running\n"},
         {LPAR "--id 2 -o shutdown --immed"},
         {PROF "\"io_slots=none\"'"},
         {LPAR "--id 2 -o on -f normal"},
@@ -77,6 +83,17 @@ TEST_F(PowerToolsTest, AProfileGetsWhatIsLeft) {
     });
 }
 
+TEST_F(PowerToolsTest, WhatStartsTogetherSharesWhatIsLeft) {
+    expectRows({
+        {"edpower -r sys -o on -m gamma"},
+        {PROF "\"max_mem=65536\",\"desired_mem=20480\",\"max_proc_units=8.00\",\"desired_proc_units=5.00\",\"max_procs=8\",\"desired_procs=5\"'"},
+        {"edplat -r prof -m gamma -i '\"name=my-prof\",\"lpar_id=7\",\"max_mem=65536\",\"desired_mem=20480\",\"max_proc_units=8.00\",\"desired_proc_units=5.00\",\"max_procs=8\",\"desired_procs=5\"'"},
+        {"edpower -r sysprof -n all -o on -m gamma"},
+        {"qyalloc -r mem --level lpar -m gamma -F lpar_id,curr_mem", "1,2048\n2,20480\n7,8192\n"},
+        {"qyalloc -r proc --level lpar -m gamma -F lpar_id,curr_proc_units", "1,1.00\n2,5.00\n7,2.00\n"},
+    });
+}
+
 TEST_F(PowerToolsTest, AdaptersAreThoseOfTheProfile) {
     expectRows({
         {"edpower -r lpar --id 2 -o shutdown -m alpha"},
@@ -87,6 +104,10 @@ TEST_F(PowerToolsTest, AdaptersAreThoseOfTheProfile) {
         {"edpower -r lpar --id 4 -o on -f normal -m alpha", "WRTL8062 No server adapter is free for the client adapter in the virtual slot 8.\n"},
         {"edpower -r lpar --id 2 -o on -f normal -m alpha"},
         {"edpower -r lpar --id 4 -o on -f normal -m alpha"},
+        // A server for anyone serves one.
+        {"edpower -r lpar --id 3 -o shutdown -m alpha"},
+        {"edplat -r prof -m alpha -i '\"name=normal\",\"lpar_id=3\",\"virtual_scsi_adapters+=8/client/2//9/0\"'"},
+        {"edpower -r lpar --id 3 -o on -f normal -m alpha", "WRTL8062 No server adapter is free for the client adapter in the virtual slot 8.\n"},
         {"qyalloc -r virtualio --rsubtype scsi --level lpar -m alpha --filter lpar_ids=2,4 -F lpar_id,slot_num,adapter_type,remote_lpar_id,remote_slot_num,backing_devices", "2,9,server,any,any,none\n2,14,server,4,3,disk4\n2,17,server,7,3,disk7\n4,3,client,2,14,none\n4,8,client,2,9,none\n"},
         {"qyalloc -r virtualio --rsubtype slot --level slot -m alpha --filter lpar_ids=4,slots=5,6 -F lpar_id,slot_num,config", "4,5,ethernet\n"},
         {"qyalloc -r virtualio --rsubtype eth --level lpar -m alpha --filter lpar_ids=2,slots=2,6 -F mac_addr,addl_vlan_ids", "A20001000202,\"10,20,30\"\nA20001000206,none\n"},
@@ -105,7 +126,7 @@ TEST_F(PowerToolsTest, HostsAndSystemProfiles) {
         {STATES, "1,Running\n2,Running\n7,Running\n"},
         {"edpower -r sys -o off --immed -m gamma"},
         {STATES, "1,Not Activated\n2,Not Activated\n7,Not Activated\n"},
-        {"appliance journal | wc -l", "3\n"},
+        {"appliance journal --json | wc -l", "3\n"},
         // Partitions that start by themselves, as far as they can; what was pending takes effect.
         {PROF "\"auto_start=1\"'"},
         {"edplat -r prof -m gamma -i '\"name=my-prof\",\"lpar_id=7\",\"auto_start=1\"'"},
@@ -139,7 +160,7 @@ TEST_F(PowerToolsTest, SuspensionKeepsWhatAPartitionHolds) {
         {mine, "2048,0\nSuspended\n"},
         {"edsusp  -o shutdown -t suspend  -m alpha --id 5"},
         {mine, "2048,0\nNot Activated\n"},
-        {"appliance check; appliance journal | wc -l", "3\n"},
+        {"appliance check; appliance journal --json | wc -l", "3\n"},
     });
 }
 

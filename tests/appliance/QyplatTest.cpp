@@ -103,16 +103,13 @@ TEST_F(QyplatTest, AnswersAndFailures) {
     });
 }
 
-TEST_F(QyplatTest, HelpIsCompleteInBothLanguages) {
-    const std::string english = run("APPLIANCE_HOME= qyplat --help").out;
-    const std::string german = run("LC_ALL=de_DE.UTF-8 qyplat --help").out;
-    for (const char* word :
-         {"-r prof", "--filter", "profile_names", "redundant_err_path_reporting"}) {
-        EXPECT_NE(std::string::npos, english.find(word)) << word;
-        EXPECT_NE(std::string::npos, german.find(word)) << word;
+TEST_F(QyplatTest, HelpNamesAllThatCanBeAsked) {
+    const std::string help = run("APPLIANCE_HOME= qyplat --help").out;
+    for (const char* word : {"Usage: qyplat", "-r prof", "--filter", "profile_names",
+                             "redundant_err_path_reporting"}) {
+        EXPECT_NE(std::string::npos, help.find(word)) << word;
     }
-    EXPECT_EQ(0U, english.find("Usage: qyplat"));
-    EXPECT_EQ(0U, german.find("Aufruf: qyplat"));
+    EXPECT_EQ("qyplat ", run("APPLIANCE_HOME= qyplat --version").out.substr(0, 7));
 }
 
 TEST_F(QyplatTest, AReaderThatLeavesIsAFailureAndNoSignal) {

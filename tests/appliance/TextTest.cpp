@@ -53,6 +53,11 @@ TEST(TextTest, Numbers) {
     }
     EXPECT_TRUE(wholeNumber("0042", &value));
     EXPECT_EQ(42, value);
+    for (const char* wrong : {"", "0.125", "-1", "1,5", "1x", ".5", "1000000001"}) {
+        EXPECT_FALSE(wholeUnits(wrong, &value)) << wrong;
+    }
+    EXPECT_TRUE(wholeUnits("1.25", &value));
+    EXPECT_EQ(125, value);
     EXPECT_EQ("000A", hex(10, 4));
     EXPECT_EQ("01/02/2013 03:04:05", timeText(1357095845));
 }

@@ -77,13 +77,13 @@ protected:
 
     /// Of answers these rows give the beginning.
     void expectRefused(const std::vector<ToolRow>& rows) {
-        const std::string before = shown() + out("appliance journal");
+        const std::string before = shown() + out("appliance journal --json");
         for (const ToolRow& row : rows) {
             const auto outcome = run(row.command);
             EXPECT_EQ(row.exit(), outcome.exit) << row.command;
             EXPECT_EQ("", outcome.out) << row.command;
             EXPECT_EQ(0U, outcome.err.find(row.answer)) << row.command << '\n' << outcome.err;
-            ASSERT_EQ(before, shown() + out("appliance journal")) << row.command;
+            ASSERT_EQ(before, shown() + out("appliance journal --json")) << row.command;
         }
     }
 

@@ -153,6 +153,13 @@ TEST_F(ApplianceTest, CheckFindsWhatAHostWouldRefuse) {
         EXPECT_NE(std::string::npos, outcome.out.find(row.finding))
             << row.attribute << ' ' << outcome.out << outcome.err;
     }
+    make("init --force");
+    Database((m_appliance.folder() / "appliance/appliance.db").string(), Database::Access::Write)
+        .execute(
+            "UPDATE object SET attributes = replace(replace(attributes, "
+            "'remote_lpar_id=3', 'remote_lpar_id=any'), 'slot_num=15', 'slot_num=13') "
+            "WHERE kind = 'scsi' AND host = 1");
+    EXPECT_NE(std::string::npos, run("appliance check").out.find("that serves another client"));
 }
 
 TEST_F(ApplianceTest, AToolSeesTheOldApplianceOrTheNewOne) {

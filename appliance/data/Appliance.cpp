@@ -1,6 +1,10 @@
 // The program "appliance": makes an appliance's state, shows it and checks it, and lets tools fail.
 
+#include <unistd.h>
+
 #include <CLI/CLI.hpp>
+#include <chrono>
+#include <cstdio>
 #include <iostream>
 
 #include "Appliances.h"
@@ -22,6 +26,35 @@ constexpr const char* kFooter =
 
 constexpr std::int64_t kMostHosts = 65535;  ///< MAC addresses number hosts and partitions
 constexpr std::int64_t kMostLpars = 65000;
+
+/// Tells a watching person how far a long work is; says nothing before two seconds are over.
+class Progress {
+public:
+    explicit Progress(std::int64_t total) : m_total(total) {}
+    ~Progress() {
+        if (m_shown) std::fputc('\n', stderr);
+    }
+    Progress(const Progress&) = delete;
+    Progress& operator=(const Progress&) = delete;
+
+    void operator()(std::int64_t done) {
+        const auto now = std::chrono::steady_clock::now();
+        if (!m_watched || now - m_last < (m_shown ? std::chrono::milliseconds(200)
+                                                  : std::chrono::milliseconds(2000))) {
+            return;
+        }
+        m_last = now;
+        m_shown = true;
+        std::fprintf(stderr, "\r%lld of %lld hosts", static_cast<long long>(done),
+                     static_cast<long long>(m_total));
+    }
+
+private:
+    const bool m_watched = isatty(STDERR_FILENO) != 0;
+    const std::int64_t m_total;
+    bool m_shown = false;
+    std::chrono::steady_clock::time_point m_last = std::chrono::steady_clock::now();
+};
 
 /// Fills the state anew, in one transaction: whoever reads meanwhile sees what was there before.
 template <typename Fill>
@@ -76,7 +109,10 @@ int run(int argc, char** argv) {
     init->callback([&] { fill(force, fillDemo); });
     CLI::App* generate = app.add_subcommand(
         "generate", "Make an appliance of any size; the same options always make the same one.");
-    generate->callback([&] { fill(force, [&](Store& store) { fillGenerated(store, size); }); });
+    generate->callback([&] {
+        Progress progress(size.hosts);
+        fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
+    });
     CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
     show->callback([&] { showState(format); });
     CLI::App* journal = app.add_subcommand(

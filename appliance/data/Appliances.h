@@ -3,6 +3,7 @@
 #define APPLIANCE_APPLIANCES_H
 
 #include <cstdint>
+#include <functional>
 
 #include "Store.h"
 
@@ -19,7 +20,9 @@ struct Size {
 };
 
 /// Any number of hosts and partitions; the same for the same Size on every machine.
-void fillGenerated(Store& store, const Size& size);
+/// @param progress  called from time to time with how many hosts are done
+void fillGenerated(Store& store, const Size& size,
+                   const std::function<void(std::int64_t)>& progress);
 
 }  // namespace appliance
 

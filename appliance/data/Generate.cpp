@@ -80,10 +80,12 @@ void addHost(Store& store, Dice& dice, const Size& size, std::int64_t number) {
 
 }  // namespace
 
-void fillGenerated(Store& store, const Size& size) {
+void fillGenerated(Store& store, const Size& size,
+                   const std::function<void(std::int64_t)>& progress) {
     Dice dice(size.seed);
     for (std::int64_t number = 1; number <= size.hosts; ++number) {
         addHost(store, dice, size, number);
+        progress(number);
     }
 }
 

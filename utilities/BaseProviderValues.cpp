@@ -14,6 +14,7 @@
 #include "Exception.h"
 #include "LetUnwind.h"
 #include "PropertiesHelper.h"
+#include "ServerCall.h"
 
 namespace {
 
@@ -97,6 +98,21 @@ std::string arrayText(const CmpiArray& array) {
     return text + "}";
 }
 
+// Not every server prints date-times as it does other objects.
+std::string dateTimeText(const CmpiDateTime& time) {
+    CMPIDateTime* const raw = time.getEnc();
+    CMPIStatus status = kZemServed;
+    CMPIString* text = nullptr;
+    if (raw != nullptr) {
+        text = zemCallServer(raw->ft, &CMPIDateTimeFT::getStringFormat, text, raw, &status);
+    }
+    const char* chars = nullptr;
+    if (text != nullptr) {
+        chars = zemCallServer(text->ft, &CMPIStringFT::getCharPtr, chars, text, &status);
+    }
+    return zemOrEmpty(chars);
+}
+
 std::string valueText(const CmpiData& data) {
     if ((data.getType() & CMPI_ARRAY) != 0) return arrayText(data.getArray());
     switch (data.getType()) {
@@ -129,7 +145,7 @@ std::string valueText(const CmpiData& data) {
             return std::string("\"") + static_cast<const char*>(text) + "\"";
         }
         case CMPI_dateTime:
-            return zemOrEmpty(data.getDateTime().toString().charPtr());
+            return dateTimeText(data.getDateTime());
         case CMPI_instance: {
             CmpiInstance instance = data.getInstance();
             return static_cast<const char*>(zemBaseProvider::instanceToString(instance));

@@ -167,8 +167,8 @@ TEST_F(BindingTest, ValuesArriveAsTheTablesWantThem) {
 TEST_F(BindingTest, ArraysHoldOneType) {
     CmpiArray names(3, CMPI_chars);
     names[0] = CmpiData("first");
-    EXPECT_STREQ(names[0].getString().charPtr(), "first");
-    EXPECT_EQ(names[1].getString().charPtr(), nullptr);
+    EXPECT_STREQ(names[0].getCString(), "first");
+    EXPECT_TRUE(CmpiData(names[1].getData()).isNullValue());
     EXPECT_EQ(codeOf([&] { names[1] = CmpiData(CMPISint32(1)); }), CMPI_RC_ERR_TYPE_MISMATCH);
     EXPECT_EQ(codeOf([&] { names[3]; }), CMPI_RC_ERR_NO_SUCH_PROPERTY);
     CmpiArray flags(1, CMPI_boolean);
@@ -177,23 +177,17 @@ TEST_F(BindingTest, ArraysHoldOneType) {
     EXPECT_EQ(CmpiArray().size(), 0u);
 }
 
-// Whatever a server makes of an array that was asked for, and however strict it is.
+// Strict servers take a text only in the form that the array has.
 TEST_F(BindingTest, TextsGoIntoArraysInTheArraysOwnForm) {
-    CmpiArray array(2, CMPI_chars);
-    CMPIArrayFT& table = *m_mb.eft->newArray(&m_mb, 1, CMPI_chars, nullptr)->ft;
-    static CMPIType form;
-    static const CMPIArrayFT given = table;
-    table.getSimpleType = [](const CMPIArray*, CMPIStatus*) { return form; };
-    table.setElementAt = [](CMPIArray* a, CMPICount i, const CMPIValue* value, CMPIType type) {
-        if (type != form) return CMPIStatus{CMPI_RC_ERR_TYPE_MISMATCH, nullptr};
-        return given.setElementAt(a, i, value, type);
-    };
-    for (const CMPIType type : {CMPIType(CMPI_chars), CMPIType(CMPI_string)}) {
-        form = type;
+    for (const CMPIType form : {CMPIType(CMPI_chars), CMPIType(CMPI_string)}) {
+        CmpiArray array(2, form);
         array[0] = CmpiData("text");
         array[1] = CmpiData(CmpiString("string"));
-        EXPECT_STREQ(array[0].getString().charPtr(), "text");
-        EXPECT_STREQ(array[1].getString().charPtr(), "string");
+        const auto text = [&](CMPICount i) {
+            return form == CMPI_chars ? array[i].getCString() : array[i].getString().charPtr();
+        };
+        EXPECT_STREQ(text(0), "text");
+        EXPECT_STREQ(text(1), "string");
     }
 }
 

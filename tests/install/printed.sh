@@ -41,7 +41,7 @@ done <"$work/blocks"
 # example <header>: the indented lines of its opening comment
 example() { sed -n '/^#/q;s|^///     ||p' "$PREFIX/include/zemutilities/$1"; }
 {
-    echo 'void read(const char* user, zemDynamicArray<zemString>& names) {'
+    echo 'void read(const char* user) {'
     example DNXApiCaller.h
     echo '}'
     example BaseZemInstanceProvider.h

@@ -18,9 +18,9 @@
 #include "AssociationProvider.h"
 #include "CmpiInstanceMI.h"
 #include "FailureText.h"
+#include "InProcessFactories.h"
 #include "MultiNtoNAssociationProvider.h"
 #include "NtoNAssociationProvider.h"
-#include "InProcessFactories.h"
 
 inline constexpr const char* kNameSpace = "root/cimv2";
 inline const cimom::AssociationFilter kNone = {"Test_Link", "", "", ""};
@@ -174,8 +174,10 @@ class Rows : public Scripted<zemAssociationProvider> {
 public:
     Rows(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx), Scripted(mb, ctx, name, supported()) {
+        // A row puts its namespace on the paths of its associations as it stands.
         for (const Row& r : world->rows)
-            addAssoData(new zemAssociationData(r[0], r[1], r[2], r[3], r[4], r[5], r[6], r[7]));
+            addAssoData(new zemAssociationData(r[0], *r[1] != '\0' ? r[1] : "root/cimv2", r[2],
+                                               r[3], r[4], r[5], r[6], r[7]));
     }
     bool isValidateAssociation(const CmpiContext&, const zemAssociationData&,
                                const CmpiObjectPath& cop1, const CmpiObjectPath& cop2) override {

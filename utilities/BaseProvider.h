@@ -33,8 +33,6 @@
 
 #include <sys/time.h>
 
-#include <initializer_list>
-
 #include "Array.h"
 #include "CmpiArgs.h"
 #include "CmpiArray.h"
@@ -58,8 +56,6 @@
 
 class zemException;
 class zemOperationFrame;
-struct zemFailure;
-struct zemInsert;
 
 /// The locals that the macros of ProviderTracer.h use, inside a member of a provider and inside a
 /// friend of one.
@@ -413,21 +409,11 @@ protected:
     /// The server's broker, null only in a provider built without one.
     CMPIBroker* rawBroker() const;
 
-    /// Throws one failure of the family, with the texts in @p inserts put into its sentence.
-    [[noreturn]] void raise(const zemFailure& failure,
-                            std::initializer_list<zemInsert> inserts) const;
-
-    /// validateProerties() with the names of all properties of @p instance.
-    void validatePropertyNames(const CmpiObjectPath& cop, const CmpiInstance& instance,
-                               const char* callingMethod) const;
-
     zemString m_providerName;
 
 private:
     friend class zemOperationFrame;
 
-    void requireTarget(zemOperationFrame& frame, const CmpiContext& ctx, const CmpiObjectPath& path,
-                       const char* method);
     void traceDefault(const char* function) const;
     [[noreturn]] void refuse(const char* function, const char* operation,
                              const char* className) const;

@@ -124,25 +124,25 @@ std::string zemFillSentence(Text sentence, Text provider,
     return text;
 }
 
-void zemBaseProvider::raise(const zemFailure& failure,
-                            std::initializer_list<zemInsert> inserts) const {
-    PROV_TRACE_LOCALS();
+void zemRaise(CMPIBroker* broker, Text provider, const zemFailure& failure,
+              std::initializer_list<zemInsert> inserts) {
+    PROV_TRACE_OF(broker, provider);
     zemProviderTracer::_traceEnter(PROV_TRACE_BROKER, PROV_TRACE_FILE, __LINE__,
                                    PROV_TRACE_COMPONENT, failure.function);
     if (failure.printedAs != nullptr) {
         zemLog::LogPlain((std::string(failure.function) + " <-").c_str());
     }
 
-    const std::string sentence = zemFillSentence(failure.sentence, m_providerName, inserts);
+    const std::string sentence = zemFillSentence(failure.sentence, provider, inserts);
     zemString text(sentence.c_str());
     if (failure.localised) {
         Text a[10] = {};
         for (size_t i = 0; i < 10 && failure.arguments[i] != '\0'; ++i) {
-            a[i] = insertFor(failure.arguments[i], m_providerName, inserts);
+            a[i] = insertFor(failure.arguments[i], provider, inserts);
         }
-        text = retrieveLocalizedString(rawBroker(), m_providerName, "", failure.messageKey,
-                                       sentence.c_str(), 0, a[0], a[1], a[2], a[3], a[4], a[5],
-                                       a[6], a[7], a[8], a[9]);
+        text = zemBaseProvider::retrieveLocalizedString(broker, provider, "", failure.messageKey,
+                                                        sentence.c_str(), 0, a[0], a[1], a[2], a[3],
+                                                        a[4], a[5], a[6], a[7], a[8], a[9]);
     }
 
     PROV_TRACE_STRING(3, "Exception: %s", static_cast<Text>(text));
@@ -156,62 +156,65 @@ void zemBaseProvider::raise(const zemFailure& failure,
 }
 
 void zemBaseProvider::throwMethodNotSupportedExc(Text M, Text K) const {
-    raise(kMethodNotSupported, {{'M', M}, {'K', K}});
+    zemRaise(rawBroker(), m_providerName, kMethodNotSupported, {{'M', M}, {'K', K}});
 }
 
 void zemBaseProvider::throwMethodNotFoundExc(Text M, Text K) const {
-    raise(kMethodNotFound, {{'M', M}, {'K', K}});
+    zemRaise(rawBroker(), m_providerName, kMethodNotFound, {{'M', M}, {'K', K}});
 }
 
 void zemBaseProvider::throwUserAccessDeniedExc(Text M, Text K, Text user) const {
-    raise(kUserAccessDenied, {{'M', M}, {'K', K}, {'u', user}});
+    zemRaise(rawBroker(), m_providerName, kUserAccessDenied, {{'M', M}, {'K', K}, {'u', user}});
 }
 
 void zemBaseProvider::throwKeyNotFoundExc(Text M, Text K, Text key) const {
-    raise(kKeyNotFound, {{'M', M}, {'K', K}, {'k', key}});
+    zemRaise(rawBroker(), m_providerName, kKeyNotFound, {{'M', M}, {'K', K}, {'k', key}});
 }
 
 void zemBaseProvider::throwInvalidKeyExc(Text M, Text K, Text key) const {
-    raise(kInvalidKey, {{'M', M}, {'K', K}, {'k', key}});
+    zemRaise(rawBroker(), m_providerName, kInvalidKey, {{'M', M}, {'K', K}, {'k', key}});
 }
 
 void zemBaseProvider::throwDuplicateKeyExc(Text M, Text K, Text key) const {
-    raise(kDuplicateKey, {{'M', M}, {'K', K}, {'k', key}});
+    zemRaise(rawBroker(), m_providerName, kDuplicateKey, {{'M', M}, {'K', K}, {'k', key}});
 }
 
 void zemBaseProvider::throwKeyValueDoesntMatchExc(Text M, Text K, Text key, Text value1,
                                                   Text value2) const {
-    raise(kKeyValueDoesntMatch, {{'M', M}, {'K', K}, {'k', key}, {'v', value1}, {'w', value2}});
+    zemRaise(rawBroker(), m_providerName, kKeyValueDoesntMatch,
+             {{'M', M}, {'K', K}, {'k', key}, {'v', value1}, {'w', value2}});
 }
 
 void zemBaseProvider::throwPropertyNotFoundExc(Text K, Text property) const {
-    raise(kPropertyNotFound, {{'K', K}, {'p', property}});
+    zemRaise(rawBroker(), m_providerName, kPropertyNotFound, {{'K', K}, {'p', property}});
 }
 
 void zemBaseProvider::throwDuplicatePropertyExc(Text M, Text K, Text property) const {
-    raise(kDuplicateProperty, {{'M', M}, {'K', K}, {'p', property}});
+    zemRaise(rawBroker(), m_providerName, kDuplicateProperty,
+             {{'M', M}, {'K', K}, {'p', property}});
 }
 
 void zemBaseProvider::throwInvalidPropertyExc(Text M, Text K, Text property) const {
-    raise(kInvalidProperty, {{'M', M}, {'K', K}, {'p', property}});
+    zemRaise(rawBroker(), m_providerName, kInvalidProperty, {{'M', M}, {'K', K}, {'p', property}});
 }
 
 void zemBaseProvider::throwObjectNotFoundExc(Text M, Text K, Text object) const {
-    raise(kObjectNotFound, {{'M', M}, {'K', K}, {'o', object}});
+    zemRaise(rawBroker(), m_providerName, kObjectNotFound, {{'M', M}, {'K', K}, {'o', object}});
 }
 
 void zemBaseProvider::throwWrongMethodArgExc(Text parameter, Text method) const {
-    raise(kWrongMethodArg, {{'p', parameter}, {'M', method}});
+    zemRaise(rawBroker(), m_providerName, kWrongMethodArg, {{'p', parameter}, {'M', method}});
 }
 
 void zemBaseProvider::throwDuplicateMethodArgExc(Text parameter, Text method) const {
-    raise(kDuplicateMethodArg, {{'p', parameter}, {'M', method}});
+    zemRaise(rawBroker(), m_providerName, kDuplicateMethodArg, {{'p', parameter}, {'M', method}});
 }
 
 void zemBaseProvider::throwInvalidMethodArgValueExc(Text parameter, Text value, Text method) const {
-    raise(kInvalidMethodArgValue, {{'p', parameter}, {'v', value}, {'M', method}});
+    zemRaise(rawBroker(), m_providerName, kInvalidMethodArgValue,
+             {{'p', parameter}, {'v', value}, {'M', method}});
 }
 
 void zemBaseProvider::throwParameterNotFoundExc(Text parameter) const {
-    raise(kParameterNotFound, {{'p', parameter}});
+    zemRaise(rawBroker(), m_providerName, kParameterNotFound, {{'p', parameter}});
 }

@@ -6,6 +6,8 @@
 #include <initializer_list>
 #include <string>
 
+#include "cmpidt.h"
+
 /// A text for one mark of a sentence.
 struct zemInsert {
     char mark;
@@ -29,6 +31,10 @@ struct zemFailure {
 /// The sentence with its inserts; a mark without a text stands for nothing.
 std::string zemFillSentence(const char* sentence, const char* provider,
                             std::initializer_list<zemInsert> inserts);
+
+/// Throws one failure on behalf of a provider, with the texts in @p inserts put into its sentence.
+[[noreturn]] void zemRaise(CMPIBroker* broker, const char* provider, const zemFailure& failure,
+                           std::initializer_list<zemInsert> inserts);
 
 template <class Exception>
 [[noreturn]] void zemThrow(const char* text) {

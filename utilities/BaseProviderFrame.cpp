@@ -168,6 +168,11 @@ void zemOperationFrame::traceExit() const {
                                   m_provider.m_providerName, m_row.method);
 }
 
+void zemOperationFrame::traceDetail(const char* text) const {
+    PROV_TRACE_LOCALS_OF(m_provider);
+    PROV_TRACE_STRING(4, "%s", text);
+}
+
 void zemOperationFrame::traceStatus(const CmpiStatus& status) const {
     PROV_TRACE_LOCALS_OF(m_provider);
     PROV_TRACE_STRING(4, "CMPI STATUS:%s  %s", zemBaseProvider::cmpiRcToString(status.rc()),

@@ -70,6 +70,7 @@ public:
 
     void traceExit() const;
     void traceStatus(const CmpiStatus& status) const;
+    void traceDetail(const char* text) const;
 
     /// Class of the path.
     const char* className() const { return m_className; }

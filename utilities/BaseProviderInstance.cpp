@@ -74,7 +74,7 @@ CmpiStatus zemBaseProvider::createInstance(const CmpiContext& ctx, CmpiResult& r
     zemOperationFrame frame(*this, zemOperation::CreateInstance, ctx, &path, &result);
     frame.setInstance(instance);
     return frame.run([&] {
-        validatePropertyNames(path, instance, "createInstance");
+        validateProerties(path, zemPropertyNames(instance), "createInstance");
         performCreateInstance(ctx, result, path, instance);
     });
 }

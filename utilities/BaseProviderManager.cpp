@@ -34,68 +34,68 @@ struct Table : FT {
 struct zemBaseProviderManager::InstanceKind {
     using MI = CMPIInstanceMI;
     using FT = CMPIInstanceMIFT;
-    static constexpr auto list = &zemBaseProviderManager::m_instanceMIList;
-    static constexpr FT table = {kVersion,
-                                 kVersion,
-                                 nullptr,
-                                 cleanupInstanceMI,
-                                 CmpiInstanceMI::driveEnumInstanceNames,
-                                 CmpiInstanceMI::driveEnumInstances,
-                                 CmpiInstanceMI::driveGetInstance,
-                                 CmpiInstanceMI::driveCreateInstance,
-                                 CmpiInstanceMI::driveSetInstance,
-                                 CmpiInstanceMI::driveDeleteInstance,
-                                 CmpiInstanceMI::driveExecQuery};
+    static constexpr auto kList = &zemBaseProviderManager::m_instanceMIList;
+    static constexpr FT kTable = {kVersion,
+                                  kVersion,
+                                  nullptr,
+                                  cleanupInstanceMI,
+                                  CmpiInstanceMI::driveEnumInstanceNames,
+                                  CmpiInstanceMI::driveEnumInstances,
+                                  CmpiInstanceMI::driveGetInstance,
+                                  CmpiInstanceMI::driveCreateInstance,
+                                  CmpiInstanceMI::driveSetInstance,
+                                  CmpiInstanceMI::driveDeleteInstance,
+                                  CmpiInstanceMI::driveExecQuery};
 };
 
 struct zemBaseProviderManager::AssociationKind {
     using MI = CMPIAssociationMI;
     using FT = CMPIAssociationMIFT;
-    static constexpr auto list = &zemBaseProviderManager::m_associationMIList;
-    static constexpr FT table = {kVersion,
-                                 kVersion,
-                                 nullptr,
-                                 cleanupAssociationMI,
-                                 CmpiAssociationMI::driveAssociators,
-                                 CmpiAssociationMI::driveAssociatorNames,
-                                 CmpiAssociationMI::driveReferences,
-                                 CmpiAssociationMI::driveReferenceNames};
+    static constexpr auto kList = &zemBaseProviderManager::m_associationMIList;
+    static constexpr FT kTable = {kVersion,
+                                  kVersion,
+                                  nullptr,
+                                  cleanupAssociationMI,
+                                  CmpiAssociationMI::driveAssociators,
+                                  CmpiAssociationMI::driveAssociatorNames,
+                                  CmpiAssociationMI::driveReferences,
+                                  CmpiAssociationMI::driveReferenceNames};
 };
 
 struct zemBaseProviderManager::MethodKind {
     using MI = CMPIMethodMI;
     using FT = CMPIMethodMIFT;
-    static constexpr auto list = &zemBaseProviderManager::m_methodMIList;
-    static constexpr FT table = {kVersion, kVersion, nullptr, cleanupMethodMI,
-                                 CmpiMethodMI::driveInvokeMethod};
+    static constexpr auto kList = &zemBaseProviderManager::m_methodMIList;
+    static constexpr FT kTable = {kVersion, kVersion, nullptr, cleanupMethodMI,
+                                  CmpiMethodMI::driveInvokeMethod};
 };
 
 struct zemBaseProviderManager::IndicationKind {
     using MI = CMPIIndicationMI;
     using FT = CMPIIndicationMIFT;
-    static constexpr auto list = &zemBaseProviderManager::m_indicationMIList;
-    static constexpr FT table = {kVersion,
-                                 kVersion,
-                                 nullptr,
-                                 cleanupIndicationMI,
-                                 zemCmpiIndicationMI::driveAuthorizeFilter,
-                                 zemCmpiIndicationMI::driveMustPoll,
-                                 zemCmpiIndicationMI::driveActivateFilter,
-                                 zemCmpiIndicationMI::driveDeActivateFilter,
-                                 zemCmpiIndicationMI::driveEnableIndications,
-                                 zemCmpiIndicationMI::driveDisableIndications};
+    static constexpr auto kList = &zemBaseProviderManager::m_indicationMIList;
+    static constexpr FT kTable = {kVersion,
+                                  kVersion,
+                                  nullptr,
+                                  cleanupIndicationMI,
+                                  zemCmpiIndicationMI::driveAuthorizeFilter,
+                                  zemCmpiIndicationMI::driveMustPoll,
+                                  zemCmpiIndicationMI::driveActivateFilter,
+                                  zemCmpiIndicationMI::driveDeActivateFilter,
+                                  zemCmpiIndicationMI::driveEnableIndications,
+                                  zemCmpiIndicationMI::driveDisableIndications};
 };
 
 struct zemBaseProviderManager::PropertyKind {
     using MI = CMPIPropertyMI;
     using FT = CMPIPropertyMIFT;
-    static constexpr auto list = &zemBaseProviderManager::m_propertyMIList;
-    static constexpr FT table = {kVersion,
-                                 kVersion,
-                                 nullptr,
-                                 cleanupPropertyMI,
-                                 CmpiPropertyMI::driveSetProperty,
-                                 CmpiPropertyMI::driveGetProperty};
+    static constexpr auto kList = &zemBaseProviderManager::m_propertyMIList;
+    static constexpr FT kTable = {kVersion,
+                                  kVersion,
+                                  nullptr,
+                                  cleanupPropertyMI,
+                                  CmpiPropertyMI::driveSetProperty,
+                                  CmpiPropertyMI::driveGetProperty};
 };
 
 zemBaseProviderManager::zemBaseProviderManager()
@@ -145,16 +145,16 @@ typename Kind::MI* zemBaseProviderManager::implGetMI(CMPIBroker* mb, CMPIContext
                                                      const char* name, createMI create) {
     zemSynchronizer hold(m_synchContext);
     const int index = findRecord<Kind>(name);
-    if (index >= 0) return (this->*Kind::list)[index];
+    if (index >= 0) return (this->*Kind::kList)[index];
 
     BaseMIItem* item = getBaseMIItem(mb, ctx, name, create);
     if (item == nullptr) return nullptr;
-    std::unique_ptr<Table<typename Kind::FT>> table(new Table<typename Kind::FT>{Kind::table, {}});
+    std::unique_ptr<Table<typename Kind::FT>> table(new Table<typename Kind::FT>{Kind::kTable, {}});
     table->miName = item->m_miName;
     auto record = std::make_unique<typename Kind::MI>();
     record->hdl = item->m_mi;
     record->ft = table.get();
-    (this->*Kind::list).addElement(record.get());
+    (this->*Kind::kList).addElement(record.get());
     static_cast<void>(table.release());
     ++item->m_miCount;
     return record.release();
@@ -180,7 +180,7 @@ CMPIStatus zemBaseProviderManager::implCleanupMI(typename Kind::MI* mi, const CM
 
 template <class Kind>
 int zemBaseProviderManager::findRecord(const char* name) {
-    const auto& records = this->*Kind::list;
+    const auto& records = this->*Kind::kList;
     for (int i = 0; i < records.size(); ++i) {
         if (strcmp(records[i]->ft->miName, name) == 0) return i;
     }
@@ -189,7 +189,7 @@ int zemBaseProviderManager::findRecord(const char* name) {
 
 template <class Kind>
 int zemBaseProviderManager::indexOf(const typename Kind::MI* mi) {
-    const auto& records = this->*Kind::list;
+    const auto& records = this->*Kind::kList;
     for (int i = 0; i < records.size(); ++i) {
         if (records[i] == mi) return i;
     }
@@ -198,13 +198,13 @@ int zemBaseProviderManager::indexOf(const typename Kind::MI* mi) {
 
 template <class Kind>
 void zemBaseProviderManager::dropRecord(int index) {
-    delete static_cast<const Table<typename Kind::FT>*>((this->*Kind::list)[index]->ft);
-    (this->*Kind::list).removeElementAt(index);
+    delete static_cast<const Table<typename Kind::FT>*>((this->*Kind::kList)[index]->ft);
+    (this->*Kind::kList).removeElementAt(index);
 }
 
 template <class Kind>
 void zemBaseProviderManager::dropRecords() {
-    while ((this->*Kind::list).size() > 0) dropRecord<Kind>((this->*Kind::list).size() - 1);
+    while ((this->*Kind::kList).size() > 0) dropRecord<Kind>((this->*Kind::kList).size() - 1);
 }
 
 zemBaseProviderManager::BaseMIItem* zemBaseProviderManager::getBaseMIItem(const char* name) {

@@ -1,6 +1,4 @@
 // Method operation of zemBaseProvider.
-#include <string>
-
 #include "BaseProvider.h"
 #include "BaseProviderFrame.h"
 #include "BaseProviderText.h"
@@ -17,6 +15,35 @@ bool hasKeys(const CmpiObjectPath& path) {
     }
 }
 
+// The object that @p find looks for must exist.
+template <class Find>
+void requireTarget(const zemOperationFrame& frame, const CmpiObjectPath& path, const char* method,
+                   Find find) {
+    const char* className = frame.className();
+    try {
+        find();
+    } catch (const zemException& failure) {
+        frame.traceDetail(failure.toString());
+        frame.traceExit();
+        const zemString text =
+            "refers to an invalid object:" + zemBaseProvider::objectPathToString(path) +
+            " to inovke method " + method;
+        throw zemInvalidParameterException(className, "invokeMethod", method,
+                                           failure.getExceptionId(), text);
+    } catch (const CmpiStatus& status) {
+        frame.traceStatus(status);
+        const char* code = zemBaseProvider::cmpiRcToString(status.rc());
+        if (status.rc() != CMPI_RC_ERR_NOT_FOUND && status.rc() != CMPI_RC_ERR_INVALID_PARAMETER) {
+            throw zemOperationFailedException(className, "invokeMethod", code, status.msg());
+        }
+        frame.traceExit();
+        const zemString text =
+            "reference an invalid object:" + zemBaseProvider::objectPathToString(path) +
+            " to invoke method " + method;
+        throw zemInvalidParameterException(className, "invokeMethod", method, code, text);
+    }
+}
+
 }  // namespace
 
 CmpiStatus zemBaseProvider::invokeMethod(const CmpiContext& ctx, CmpiResult& result,
@@ -26,42 +53,20 @@ CmpiStatus zemBaseProvider::invokeMethod(const CmpiContext& ctx, CmpiResult& res
     frame.setMethod(method);
     return frame.run([&] {
         const bool onClass = isStaticMethod(frame.className(), method) && !hasKeys(path);
-        if (!onClass) requireTarget(frame, ctx, path, method);
+        if (!onClass) {
+            requireTarget(frame, path, method, [&] {
+                // The provider of the method alone asks the server, which asks that of the
+                // instances.
+                if (isValidInstanceClass(frame.className())) {
+                    getInstance(ctx, path, nullptr);
+                } else {
+                    broker->getInstance(ctx, path, nullptr);
+                }
+            });
+        }
         validateMethodArgs(method, in, frame.className());
         performInvokeMethod(ctx, result, path, method, in, out);
     });
-}
-
-// The object must exist. A provider of the method alone asks the server for it, which asks the
-// provider of the instances.
-void zemBaseProvider::requireTarget(zemOperationFrame& frame, const CmpiContext& ctx,
-                                    const CmpiObjectPath& path, const char* method) {
-    PROV_TRACE_LOCALS();
-    const char* className = frame.className();
-    try {
-        if (isValidInstanceClass(className)) {
-            getInstance(ctx, path, nullptr);
-        } else {
-            broker->getInstance(ctx, path, nullptr);
-        }
-    } catch (const zemException& failure) {
-        PROV_TRACE_STRING(4, "%s", static_cast<const char*>(failure.toString()));
-        frame.traceExit();
-        const zemString text = "refers to an invalid object:" + objectPathToString(path) +
-                               " to inovke method " + method;
-        throw zemInvalidParameterException(className, "invokeMethod", method,
-                                           failure.getExceptionId(), text);
-    } catch (const CmpiStatus& status) {
-        frame.traceStatus(status);
-        const char* code = cmpiRcToString(status.rc());
-        if (status.rc() != CMPI_RC_ERR_NOT_FOUND && status.rc() != CMPI_RC_ERR_INVALID_PARAMETER) {
-            throw zemOperationFailedException(className, "invokeMethod", code, status.msg());
-        }
-        frame.traceExit();
-        const zemString text = "reference an invalid object:" + objectPathToString(path) +
-                               " to invoke method " + method;
-        throw zemInvalidParameterException(className, "invokeMethod", method, code, text);
-    }
 }
 
 void zemBaseProvider::performInvokeMethod(const CmpiContext&, CmpiResult&,

@@ -6,6 +6,7 @@
 #define ZEM_BASE_PROVIDER_TEXT_H
 
 #include <cstring>
+#include <vector>
 
 #include "BaseProvider.h"
 #include "CmpiArray.h"
@@ -86,5 +87,25 @@ inline zemString zemClassOf(const CmpiInstance& instance) {
         return zemString();
     }
 }
+
+/// The names of all properties of an instance, as a list that a null ends.
+class zemPropertyNames {
+public:
+    explicit zemPropertyNames(const CmpiInstance& instance) {
+        const unsigned count = instance.getPropertyCount();
+        for (unsigned i = 0; i < count; ++i) {
+            CmpiString name;
+            instance.getProperty(static_cast<int>(i), &name);
+            m_names.push_back(zemTextOf(name));
+        }
+        m_list.assign(m_names.begin(), m_names.end());
+        m_list.push_back(nullptr);
+    }
+    operator const char**() { return m_list.data(); }
+
+private:
+    std::vector<zemString> m_names;
+    std::vector<const char*> m_list;
+};
 
 #endif

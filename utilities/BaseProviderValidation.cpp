@@ -236,20 +236,6 @@ void zemBaseProvider::validateProerties(const CmpiObjectPath& cop, const char** 
     PROV_TRACE_EXIT();
 }
 
-void zemBaseProvider::validatePropertyNames(const CmpiObjectPath& cop, const CmpiInstance& instance,
-                                            const char* callingMethod) const {
-    std::vector<zemString> names;
-    const unsigned count = instance.getPropertyCount();
-    for (unsigned i = 0; i < count; ++i) {
-        CmpiString name;
-        instance.getProperty(static_cast<int>(i), &name);
-        names.push_back(zemTextOf(name));
-    }
-    std::vector<const char*> list(names.begin(), names.end());
-    list.push_back(nullptr);
-    validateProerties(cop, list.data(), callingMethod);
-}
-
 CMPIBoolean zemBaseProvider::containsProperty(const char** properties, const char* name) {
     if (properties == nullptr || properties[0] == nullptr) return true;
     if (name == nullptr) return false;

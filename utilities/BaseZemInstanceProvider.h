@@ -21,7 +21,7 @@
 class ZEM_EXPORT zemBaseZemInstanceProvider : public zemBaseZemValidator {
 public:
     /// Namespace of the classes of this schema.
-    static constexpr char defaultNameSpace[] = "root/orxsd";
+    static constexpr char kDefaultNameSpace[] = "root/orxsd";
 
     zemBaseZemInstanceProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name);
 

@@ -162,7 +162,7 @@ void zemBaseZemValidator::validateFixedValueProperty(const CmpiInstance& instanc
 
 void zemBaseZemValidator::validateEmbededInstanceProerties(const CmpiInstance& instance,
                                                            Text callingMethod) {
-    validatePropertyNames(instance.getObjectPath(), instance, callingMethod);
+    validateProerties(instance.getObjectPath(), zemPropertyNames(instance), callingMethod);
 }
 
 CmpiInstance zemBaseZemValidator::validateEmbeddedObject(const CmpiContext& ctx,
@@ -230,8 +230,8 @@ void zemBaseZemValidator::throwDesiredGtMaxValueExc(CMPIUint64 first, CMPIUint64
 
 void zemBaseZemValidator::throwPropertyValueDoesntMatchExc(Text className, Text property,
                                                            Text found, Text expected) const {
-    raise(kPropertyValueDoesntMatch,
-          {{'K', className}, {'v', found}, {'p', property}, {'w', expected}});
+    zemRaise(rawBroker(), m_providerName, kPropertyValueDoesntMatch,
+             {{'K', className}, {'v', found}, {'p', property}, {'w', expected}});
 }
 
 CmpiData zemBaseZemValidator::anyProperty(const CmpiInstance& instance, Text name) {

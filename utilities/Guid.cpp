@@ -9,7 +9,7 @@
 
 namespace {
 
-constexpr std::size_t textLength = 36;
+constexpr std::size_t kTextLength = 36;
 
 // The parts of each half, lowest bits first, as they lie in memory on the little-endian target.
 std::uint64_t highHalf(std::uint32_t word, std::uint16_t a, std::uint16_t b) {
@@ -25,7 +25,7 @@ std::uint64_t lowHalf(std::uint16_t a, std::uint16_t b, std::uint32_t word) {
 zemGuid::zemGuid() : m_u64High(0), m_u64Low(0) {}
 
 zemGuid::zemGuid(const char* text) : zemGuid() {
-    if (text == nullptr || ::strnlen(text, textLength + 1) != textLength) {
+    if (text == nullptr || ::strnlen(text, kTextLength + 1) != kTextLength) {
         return;
     }
     for (const int dash : {8, 13, 18, 23}) {

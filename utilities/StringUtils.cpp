@@ -4,16 +4,14 @@
 #include <cctype>
 #include <climits>
 #include <cstdarg>
-#include <cstdint>
 #include <cstdio>
-#include <cstdlib>
 #include <cstring>
 #include <memory>
 #include <utility>
 
 namespace {
 
-constexpr char emptyText[] = "";
+constexpr char kEmptyText[] = "";
 
 unsigned char byte(char c) { return static_cast<unsigned char>(c); }
 
@@ -49,138 +47,6 @@ bool sameText(const char* a, const char* b, unsigned lengthA, unsigned lengthB, 
     }
     return true;
 }
-
-// Walks over a printf format and its arguments, and counts how many bytes a buffer for the
-// expansion should have, terminator not included. An estimate: mostly generous, sometimes short.
-class FormatSizer {
-public:
-    FormatSizer(const char* fmt, va_list args) : m_next(fmt) { va_copy(m_args, args); }
-    ~FormatSizer() { va_end(m_args); }
-    FormatSizer(const FormatSizer&) = delete;
-    FormatSizer& operator=(const FormatSizer&) = delete;
-
-    std::size_t count() {
-        std::size_t total = 0;
-        while (*m_next != '\0') {
-            if (*m_next++ != '%') {
-                ++total;
-            } else if (*m_next == '%') {
-                ++m_next;
-                ++total;
-            } else {
-                total += conversion();
-            }
-        }
-        return total;
-    }
-
-private:
-    // How wide an argument is passed, as the length modifiers before the conversion say.
-    enum class Width { plain, word, longWord, longDouble };
-
-    std::size_t conversion() {
-        std::size_t extra = 0;
-        for (; *m_next != '\0' && std::strchr("-+0 #", *m_next) != nullptr; ++m_next) {
-            extra += *m_next == '#' ? 2 : 0;
-        }
-        const std::size_t width = number();
-        std::size_t precision = 0;
-        std::size_t textLimit = SIZE_MAX;
-        if (*m_next == '.') {
-            ++m_next;
-            textLimit = precision = number();
-        }
-        extra += modifiers(std::max<std::size_t>(width + precision, 40));
-        return extra + argument(width, precision, textLimit);
-    }
-
-    // A width or precision: from the arguments for "*", else the digits; 0 if there is neither.
-    std::size_t number() {
-        long value = 0;
-        if (*m_next == '*') {
-            ++m_next;
-            value = va_arg(m_args, int);
-        } else if (std::isdigit(byte(*m_next)) != 0) {
-            char* end = nullptr;
-            value = std::strtol(m_next, &end, 10);
-            m_next = end;
-        }
-        return static_cast<std::size_t>(std::min(std::labs(value), static_cast<long>(INT_MAX)));
-    }
-
-    // Returns what a second "l" adds.
-    std::size_t modifiers(std::size_t forLongLong) {
-        std::size_t extra = 0;
-        m_width = Width::plain;
-        for (; *m_next != '\0' && std::strchr("hlLqjzt", *m_next) != nullptr; ++m_next) {
-            if (*m_next == 'l' && m_width == Width::word) {
-                m_width = Width::longWord;
-                extra = forLongLong;
-            } else if (*m_next == 'l' || *m_next == 'j' || *m_next == 'z' || *m_next == 't') {
-                m_width = Width::word;
-            } else if (*m_next == 'L' || *m_next == 'q') {
-                m_width = Width::longDouble;
-            }
-        }
-        return extra;
-    }
-
-    std::size_t argument(std::size_t width, std::size_t precision, std::size_t textLimit) {
-        const std::size_t field = width + precision;
-        const char kind = *m_next;
-        if (kind == '\0') {
-            return 0;
-        }
-        ++m_next;
-        const auto isOneOf = [kind](const char* kinds) {
-            return std::strchr(kinds, kind) != nullptr;
-        };
-        if (isOneOf("cC")) {
-            va_arg(m_args, int);
-            return 1;
-        }
-        if (isOneOf("sS")) {
-            // A precision bounds the text, which then need not be terminated.
-            const char* const text = va_arg(m_args, const char*);
-            const std::size_t length = text == nullptr ? 6 : boundedLength(text, textLimit);
-            return std::max({field, length, std::size_t{1}});
-        }
-        if (isOneOf("diouxX")) {
-            skipInteger();
-            return m_width == Width::longWord ? 1 : std::max<std::size_t>(field, 32);
-        }
-        if (isOneOf("eEfFgGaA")) {
-            skipReal();
-            return std::max(precision + 318, field);
-        }
-        if (isOneOf("pn")) {
-            va_arg(m_args, void*);
-            return kind == 'n' ? 0 : std::max<std::size_t>(field, 32);
-        }
-        return 0;
-    }
-
-    void skipInteger() {
-        static_assert(sizeof(long) == sizeof(long long), "one width serves all wide integers");
-        if (m_width != Width::plain) {
-            va_arg(m_args, long long);
-            return;
-        }
-        va_arg(m_args, int);
-    }
-
-    void skipReal() {
-        if (m_width == Width::longDouble || m_width == Width::longWord) {
-            va_arg(m_args, long double);
-            return;
-        }
-        va_arg(m_args, double);
-    }
-
-    const char* m_next;
-    va_list m_args;
-    Width m_width = Width::plain;
-};
 
 }  // namespace
 
@@ -330,29 +196,24 @@ void zemString::clear() {
 int zemString::format(const char* fmt, ...) {
     va_list args;
     va_start(args, fmt);
-    const std::size_t estimate = FormatSizer(fmt, args).count();
-    std::size_t size = std::max(estimate + 1, m_buffer == nullptr ? 0 : m_size);
-    // A fresh buffer even if the old one would do: the arguments may point into that.
-    std::unique_ptr<char[]> buffer(new char[size]);
-    va_list again;
-    va_copy(again, args);
-    const int result = std::vsnprintf(buffer.get(), size, fmt, args);
-    if (result > 0 && static_cast<std::size_t>(result) >= size) {
-        size = static_cast<std::size_t>(result) + 1;
-        buffer.reset(new char[size]);
-        std::vsnprintf(buffer.get(), size, fmt, again);
-    }
-    va_end(again);
+    const int result = std::vsnprintf(nullptr, 0, fmt, args);
     va_end(args);
+    const std::size_t length = result < 1 ? 0 : static_cast<std::size_t>(result);
+    // A fresh buffer even if the old one would do: the arguments may point into that.
+    std::unique_ptr<char[]> buffer(new char[length + 1]());
+    if (length > 0) {
+        va_start(args, fmt);
+        std::vsnprintf(buffer.get(), length + 1, fmt, args);
+        va_end(args);
+    }
     delete[] m_buffer;
     m_buffer = buffer.release();
-    m_size = size;
-    m_len = result < 1 ? 0 : static_cast<std::size_t>(result);
-    m_buffer[m_len] = '\0';
+    m_size = length + 1;
+    m_len = length;
     return result;
 }
 
-zemString::operator const char*() const { return isEmpty() ? emptyText : m_buffer; }
+zemString::operator const char*() const { return isEmpty() ? kEmptyText : m_buffer; }
 
 bool zemString::isDigit() const {
     return !isEmpty() &&

@@ -106,7 +106,10 @@ public:
         : m_broker(broker), m_component(providerName) {}
     BundleLookup(const BundleLookup&) = delete;
     BundleLookup& operator=(const BundleLookup&) = delete;
-    ~BundleLookup() { close(); }
+    ~BundleLookup() {
+        const zemUncancelled uncancelled;
+        close();
+    }
 
     // A server without message functions is like one without the bundle.
     bool open(Text bundle, Text key, Text dfltString) {

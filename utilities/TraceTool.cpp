@@ -127,6 +127,7 @@ CFileLoger::CFileLoger(const zemString& path)
                   S_IRUSR | S_IWUSR)) {}
 
 CFileLoger::~CFileLoger() {
+    const zemUncancelled uncancelled;
     if (m_file >= 0) {
         close(m_file);
     }

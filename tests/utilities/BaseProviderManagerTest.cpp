@@ -205,44 +205,23 @@ TEST(OutOfMemory, EachAllocationMayFail) {
         CMPIArgs* args;
         CMPIData caption;
     };
-    using H = const Harness&;
-    using P = const Parts&;
-    CMPIStatus (*const operations[])(H, P) = {
-        [](H h, P p) {
-            return h.instance->ft->enumerateInstanceNames(h.instance, p.ctx, p.result, p.all);
-        },
-        [](H h, P p) {
-            return h.instance->ft->enumerateInstances(h.instance, p.ctx, p.result, p.all, nullptr);
-        },
-        [](H h, P p) {
-            return h.instance->ft->getInstance(h.instance, p.ctx, p.result, p.path, nullptr);
-        },
-        [](H h, P p) {
-            return h.instance->ft->createInstance(h.instance, p.ctx, p.result, p.all, p.disk);
-        },
-        [](H h, P p) {
-            return h.instance->ft->modifyInstance(h.instance, p.ctx, p.result, p.path, p.disk,
-                                                  nullptr);
-        },
-        [](H h, P p) {
-            return h.instance->ft->deleteInstance(h.instance, p.ctx, p.result, p.path);
-        },
-        [](H h, P p) {
-            return h.association->ft->associators(h.association, p.ctx, p.result, p.path, nullptr,
-                                                  nullptr, nullptr, nullptr, nullptr);
-        },
-        [](H h, P p) {
-            return h.method->ft->invokeMethod(h.method, p.ctx, p.result, p.path, "Force", p.args,
-                                              p.args);
-        },
-        [](H h, P p) {
-            return h.property->ft->getProperty(h.property, p.ctx, p.result, p.path, "Name");
-        },
-        [](H h, P p) {
-            return h.property->ft->setProperty(h.property, p.ctx, p.result, p.path, "Caption",
-                                               p.caption);
-        },
-    };
+#define CALL(mi, entry, ...)                                        \
+    [](const Harness& h, const Parts& p) {                          \
+        return h.mi->ft->entry(h.mi, p.ctx, p.result, __VA_ARGS__); \
+    }
+    constexpr auto no = nullptr;
+    CMPIStatus (*const operations[])(const Harness&, const Parts&) = {
+        CALL(instance, enumerateInstanceNames, p.all),
+        CALL(instance, enumerateInstances, p.all, no),
+        CALL(instance, getInstance, p.path, no),
+        CALL(instance, createInstance, p.all, p.disk),
+        CALL(instance, modifyInstance, p.path, p.disk, no),
+        CALL(instance, deleteInstance, p.path),
+        CALL(association, associators, p.path, no, no, no, no, no),
+        CALL(method, invokeMethod, p.path, "Force", p.args, p.args),
+        CALL(property, getProperty, p.path, "Name"),
+        CALL(property, setProperty, p.path, "Caption", p.caption)};
+#undef CALL
     // Whether there were so many allocations that the one after n failed; none does for -1.
     const auto during = [](long n, const std::function<void()>& work) {
         const FailingAllocation failing(n >= 0 ? n : 1L << 30);

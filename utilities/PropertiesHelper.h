@@ -65,8 +65,8 @@ public:
                                   const char* requestUserContext, const char* locale);
 
     /// Gives the process the group and user of @p userName; supplementary groups stay.
-    /// @return 0 (also when it is that user already), an error number, or -1 for no such user, which
-    ///         a name longer than any that the system allows is not looked up for
+    /// A name longer than any that the system allows is not looked up.
+    /// @return 0 (also when it is that user already), an error number, or -1 for no such user
     static int changeProcessUserContext(const char* userName);
 
     /// Short name of this host, kept from the first success on; empty while there is none.

@@ -20,6 +20,28 @@
 
 namespace {
 
+const std::string& textOf(const std::vector<std::string>& texts, int error) {
+    return texts[std::min<size_t>(static_cast<size_t>(error), texts.size() - 1)];
+}
+
+/// What follows the number of "<number>:<text>".
+const char* wordsOf(const std::string& text) { return text.c_str() + text.find(':') + 1; }
+
+int errnoOr(int fallback) { return errno != 0 ? errno : fallback; }
+
+/// The body of a switch, with the calls that make it. The group goes first: the user may have lost
+/// the right to change it.
+int becomeUser(const zemUserSwitch& user, int (*setGroup)(gid_t), int (*setUser)(uid_t)) {
+    if (!user.needed) {
+        return user.failure;
+    }
+    errno = 0;
+    if (setGroup(user.gid) != 0 || setUser(user.uid) != 0) {
+        return errnoOr(zemUserSwitch::kNoSuchUser);
+    }
+    return 0;
+}
+
 // --- in the child, by the rule at the top of the header ------------------------------------------
 
 void writeAll(int fd, const char* bytes, size_t size) {
@@ -93,21 +115,61 @@ int dropCapabilities() {
     return static_cast<int>(syscall(SYS_capset, &self, none));
 }
 
+}  // namespace
+
+void zemChildProcess::run(const zemChildWiring& wiring) const {
+    resetSignals();
+    closeOthersAtExec();
+    if (wiring.readingEnd != 0) {
+        close(wiring.readingEnd);
+    }
+    if (dup2(wiring.out, STDOUT_FILENO) < 0 || dup2(wiring.err, STDERR_FILENO) < 0) {
+        endEarly(wiring, errno);
+    }
+    if (m_user.needed) {
+        const bool switched = becomeUser(m_user, setOwnGroup, setOwnUser) == 0;
+        if (!switched || dropCapabilities() != 0) {
+            endEarly(wiring, errno);
+        }
+    }
+    const bool complains = !m_complaint.empty();
+    if (complains && wiring.channel == 0) {
+        report(STDOUT_FILENO, m_streamed);
+    }
+    if (m_user.failure != 0 || m_line.unbalancedQuote) {
+        _exit(wiring.channel == 0 && m_user.failure > 0 ? m_user.failure : kEarlyEnd);
+    }
+    exec();
+    if (complains && wiring.channel != 0) {
+        _exit(kEarlyEnd);
+    }
+    endEarly(wiring, errno, " : ", m_line.program.c_str());
+}
+
+/// Says why and ends; without a channel @p separator and @p subject follow the words.
+void zemChildProcess::endEarly(const zemChildWiring& wiring, int error, const char* separator,
+                               const char* subject) const {
+    const std::string& text = textOf(m_texts, error);
+    if (wiring.channel != 0) {
+        report(wiring.channel, text.c_str());
+        _exit(kEarlyEnd);
+    }
+    report(STDOUT_FILENO, wordsOf(text), separator, subject);
+    _exit(error > 0 ? error : kEarlyEnd);
+}
+
+/// Replaces the process by the program; returns only on failure.
+void zemChildProcess::exec() const {
+    if (m_environment.empty()) {
+        execvp(m_argv[0], m_argv.data());
+    } else {
+        execvpe(m_argv[0], m_argv.data(), m_environment.data());
+    }
+}
+
 // --- in the parent ------------------------------------------------------------------------------
 
-int errnoOr(int fallback) { return errno != 0 ? errno : fallback; }
-
-/// The body of a switch, with the calls that make it.
-int becomeUser(const zemUserSwitch& user, int (*setGroup)(gid_t), int (*setUser)(uid_t)) {
-    if (!user.needed) {
-        return user.failure;
-    }
-    errno = 0;
-    if (setGroup(user.gid) != 0 || setUser(user.uid) != 0) {
-        return errnoOr(zemUserSwitch::kNoSuchUser);
-    }
-    return 0;
-}
+namespace {
 
 /// strerror takes locks that another thread may hold at the start, so the child only looks up.
 const std::vector<std::string>& errorTexts() {
@@ -122,13 +184,6 @@ const std::vector<std::string>& errorTexts() {
     }();
     return texts;
 }
-
-const std::string& textOf(const std::vector<std::string>& texts, int error) {
-    return texts[std::min<size_t>(static_cast<size_t>(error), texts.size() - 1)];
-}
-
-/// What follows the number of "<number>:<text>".
-const char* wordsOf(const std::string& text) { return text.c_str() + text.find(':') + 1; }
 
 bool isGiven(const char* text) { return text != nullptr && *text != '\0'; }
 
@@ -193,7 +248,7 @@ private:
 }  // namespace
 
 zemUserSwitch zemFindUser(const char* userName) {
-    const zemUncancelled lookUp;
+    const zemUncancelled uncancelled;
     zemUserSwitch found;
     // The C library takes a name of any length to pieces on the stack.
     if (strnlen(userName, LOGIN_NAME_MAX) == LOGIN_NAME_MAX) {
@@ -281,56 +336,4 @@ pid_t zemChildProcess::start(const zemChildWiring& wiring) const {
         run(wiring);
     }
     return pid;
-}
-
-// --- in the child again -------------------------------------------------------------------------
-
-void zemChildProcess::run(const zemChildWiring& wiring) const {
-    resetSignals();
-    closeOthersAtExec();
-    if (wiring.readingEnd != 0) {
-        close(wiring.readingEnd);
-    }
-    if (dup2(wiring.out, STDOUT_FILENO) < 0 || dup2(wiring.err, STDERR_FILENO) < 0) {
-        endEarly(wiring, errno);
-    }
-    if (m_user.needed) {
-        const bool switched = becomeUser(m_user, setOwnGroup, setOwnUser) == 0;
-        if (!switched || dropCapabilities() != 0) {
-            endEarly(wiring, errno);
-        }
-    }
-    const bool complains = !m_complaint.empty();
-    if (complains && wiring.channel == 0) {
-        report(STDOUT_FILENO, m_streamed);
-    }
-    if (m_user.failure != 0 || m_line.unbalancedQuote) {
-        _exit(wiring.channel == 0 && m_user.failure > 0 ? m_user.failure : kEarlyEnd);
-    }
-    exec();
-    if (complains && wiring.channel != 0) {
-        _exit(kEarlyEnd);
-    }
-    endEarly(wiring, errno, " : ", m_line.program.c_str());
-}
-
-/// Says why and ends; without a channel @p separator and @p subject follow the words.
-void zemChildProcess::endEarly(const zemChildWiring& wiring, int error, const char* separator,
-                               const char* subject) const {
-    const std::string& text = textOf(m_texts, error);
-    if (wiring.channel != 0) {
-        report(wiring.channel, text.c_str());
-        _exit(kEarlyEnd);
-    }
-    report(STDOUT_FILENO, wordsOf(text), separator, subject);
-    _exit(error > 0 ? error : kEarlyEnd);
-}
-
-/// Replaces the process by the program; returns only on failure.
-void zemChildProcess::exec() const {
-    if (m_environment.empty()) {
-        execvp(m_argv[0], m_argv.data());
-    } else {
-        execvpe(m_argv[0], m_argv.data(), m_environment.data());
-    }
 }

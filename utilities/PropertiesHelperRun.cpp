@@ -102,7 +102,7 @@ private:
 /// knows of them: so the runs that come later reap those that have ended.
 class AbandonedChildren {
 public:
-    using Entry = std::list<pid_t>;  // of one, made beforehand
+    using Place = std::list<pid_t>;  // for one child; made beforehand, as memory may be wanting
 
     static AbandonedChildren& instance() {
         // Never destroyed: threads may still be cancelled while the process ends.
@@ -110,9 +110,10 @@ public:
         return all;
     }
 
-    void add(Entry& entry) {
+    void add(pid_t child, Place& place) {
+        place.front() = child;
         const zemSynchronizer guard(m_lock);
-        m_children.splice(m_children.end(), entry);
+        m_children.splice(m_children.end(), place);
     }
 
     void reapEnded() {
@@ -123,7 +124,7 @@ public:
 
 private:
     zemSynchronizerContext m_lock;
-    Entry m_children;
+    Place m_children;
 };
 
 /// One run from its pipes on: empties them until the child has ended.
@@ -142,17 +143,17 @@ public:
         }
     }
     ~Supervision() {
-        if (m_child.front() > 0) {
-            AbandonedChildren::instance().add(m_child);
+        if (m_pid > 0) {
+            AbandonedChildren::instance().add(m_pid, m_place);
         }
     }
     Supervision(const Supervision&) = delete;
     Supervision& operator=(const Supervision&) = delete;
 
     void start(const zemChildProcess& child) {
-        m_child.front() = child.start({m_pfdStdout.getWritingPipe(), m_pfdStderr.getWritingPipe(),
-                                       m_pfdExp.getWritingPipe(), 0});
-        if (m_child.front() < 0) {
+        m_pid = child.start({m_pfdStdout.getWritingPipe(), m_pfdStderr.getWritingPipe(),
+                             m_pfdExp.getWritingPipe(), 0});
+        if (m_pid < 0) {
             throwSystemError("fork", errno);
         }
         for (zemPipe* pipe : {&m_pfdStdout, &m_pfdStderr, &m_pfdExp}) {
@@ -166,15 +167,15 @@ public:
     /// @throws std::bad_alloc at the end of a child whose output found no room
     bool awaitEnd(int waitTime, int& error) {
         zemPollPlan plan(waitTime);
-        const ChildEnd end(m_child.front());
+        const ChildEnd end(m_pid);
         error = 0;
         for (;;) {
             if (plan.expired()) {
-                m_child.front() = 0;  // the caller's
+                m_pid = 0;
                 return error != 0;
             }
             if (hasEnded(error)) {
-                m_child.front() = 0;
+                m_pid = 0;
                 if (m_outOfMemory) {
                     throw std::bad_alloc();
                 }
@@ -195,7 +196,7 @@ private:
     /// Looks at the child, and takes what it has written.
     bool hasEnded(int& error) {
         const zemUncancelled uncancelled;
-        const pid_t ended = waitpid(m_child.front(), &m_status, WNOHANG);
+        const pid_t ended = waitpid(m_pid, &m_status, WNOHANG);
         error = ended < 0 ? errno : 0;
         if (ended >= 0) {
             drainAll();
@@ -276,7 +277,8 @@ private:
     zemPipe m_pfdExp;
     std::string m_exp;
     bool m_outOfMemory = false;
-    AbandonedChildren::Entry m_child{0};
+    pid_t m_pid = 0;  // 0: not started, ended, or the caller's to reap
+    AbandonedChildren::Place m_place{0};
     std::vector<char> m_buffer = std::vector<char>(kPiece * 64);
 };
 

@@ -147,7 +147,7 @@ public:
     /// declarations are parsed and dropped: instances come from providers alone.
     /// @throws MofError with the first fault of form, or every fault of meaning (up to a limit)
     static std::shared_ptr<const ClassRepository> load(const std::string& path,
-                                                       const MofReader& reader = readMofFile);
+                                                       const MofReader& reader = readRegularFile);
 
     /// The class, or null.
     const CimClass* findClass(std::string_view name) const { return m_classes.find(name); }

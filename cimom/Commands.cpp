@@ -246,8 +246,8 @@ const std::vector<Verb>& verbs() {
         {"im", "Invoke a method", kPath | kMethodName | kInputValues, invokeMethod},
         {"gp", "Get a property of an instance", kPath | kPropertyName, getProperty},
         {"sp", "Set a property of an instance", kPath | kPropertyName | kValue, setProperty},
-        {"gc", "Print the declaration of a class", kClass, getClass},
-        {"ec", "List all classes, or those below one", kOptionalClass, enumClasses},
+        {"gc", "Print the declaration of a class", kClass | kNoProvider, getClass},
+        {"ec", "List all classes, or those below one", kOptionalClass | kNoProvider, enumClasses},
         {"watch", "Print indications until interrupted", kFilter, watch},
     };
     return rows;

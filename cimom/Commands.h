@@ -48,6 +48,7 @@ enum Takes : unsigned {
     kAssociationEnds = 512,  ///< --assoc-class and --result-role
     kNavigation = 1024,      ///< --result-class and --role
     kFilter = 2048,
+    kNoProvider = 4096,  ///< nothing of a registration
 };
 
 struct Verb {

@@ -47,6 +47,10 @@ const char* const kFooter =
     "'instance of Class { name = value; }'. Without it they are guessed. What the class does not\n"
     "have, or not so, is refused here, and left to the provider with --broker lean.\n"
     "\n"
+    "Environment: CIMOM_REGISTRATION and CIMOM_SCHEMA stand for --registration and --schema where\n"
+    "these are not given. Texts of messages follow LC_ALL, LC_MESSAGES or LANG where a provider\n"
+    "asks for the language of its process.\n"
+    "\n"
     "What providers write to their standard output goes where --provider-output says, and never\n"
     "among the results.\n"
     "\n"
@@ -212,6 +216,9 @@ private:
 };
 
 int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments) {
+    if (settings.registrations.empty() && !(verb.takes & cimom::kNoProvider))
+        throw std::runtime_error(
+            "no providers: name a registration, by --registration or CIMOM_REGISTRATION");
     cimom::ResultStream out(settings.providerOutput);
     if (!settings.schema.empty())
         settings.options.classes = cimom::ClassRepository::load(settings.schema);
@@ -246,6 +253,7 @@ int runCommandLine(int argc, char** argv) {
                  "cimom");
     app.footer(kFooter);
     app.require_subcommand(1);
+    app.set_version_flag("--version", "cimom " CIMOM_VERSION);
     Settings settings;
     Arguments arguments;
     addGlobals(app, settings);
@@ -255,6 +263,11 @@ int runCommandLine(int argc, char** argv) {
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
+        const std::vector<std::string> rest = app.remaining();
+        if (app.get_subcommands().empty() && !rest.empty()) {
+            std::fprintf(stderr, "cimom: no verb '%s'; cimom --help lists them\n", rest[0].c_str());
+            return kUsageError;
+        }
         if (app.exit(error) != 0) return kUsageError;
         return std::cout.flush() ? 0 : reportOutput(errno);
     }

@@ -90,7 +90,7 @@ unsigned readHex(const std::string& text, std::size_t& at) {
 MofError::MofError(std::vector<MofFault> faults)
     : std::runtime_error(describe(faults)), m_faults(std::move(faults)) {}
 
-std::string readMofFile(const std::string& path) {
+std::string readRegularFile(const std::string& path) {
     struct stat status = {};
     if (stat(path.c_str(), &status) != 0)
         throw std::runtime_error(std::generic_category().message(errno));

@@ -62,8 +62,8 @@ private:
 /// Yields the text of a file by its path; throws std::runtime_error, whose text tells the reason.
 using MofReader = std::function<std::string(const std::string& path)>;
 
-/// The MofReader that reads regular files of up to 16 MiB.
-std::string readMofFile(const std::string& path);
+/// The MofReader of files on disk: regular ones of up to 16 MiB.
+std::string readRegularFile(const std::string& path);
 
 /// An integer as written: any that fits 64 bits with either sign.
 struct MofInteger {

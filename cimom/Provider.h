@@ -71,6 +71,9 @@ unsigned interfacesThat(Predicate has) {
         kInterfaceKinds);
 }
 
+/// The names of the interfaces that bits stand for, separated by commas.
+std::string interfaceNames(unsigned bits);
+
 /// One provider with the interfaces that have been asked for so far. Thread-safe.
 class Provider {
 public:

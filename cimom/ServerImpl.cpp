@@ -81,8 +81,10 @@ Provider* Server::Impl::providerOf(const ObjectPath& path, Interface bit) const 
 
 Target Server::Impl::targetOf(const ObjectPath& path, Interface bit) const {
     if (Provider* provider = providerOf(path, bit)) return {provider, path.className};
-    throw Failure(CMPI_RC_ERR_NOT_SUPPORTED, "no provider serves class " + path.className + " in " +
-                                                 path.nameSpace + " for this");
+    throw Failure(CMPI_RC_ERR_NOT_SUPPORTED,
+                  "no provider serves class " + path.className + " in " + path.nameSpace +
+                      ": no registration lists it, or a class above it, with the interface " +
+                      interfaceNames(bit));
 }
 
 std::vector<Target> Server::Impl::targetsBelow(const ObjectPath& classPath, Interface bit) const {

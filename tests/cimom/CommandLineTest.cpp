@@ -42,7 +42,7 @@ protected:
             if (chdir((m_folder / "").c_str()) != 0 || !freopen(out, "w", stdout) ||
                 !freopen("err", "w", stderr))
                 _exit(99);
-            setenv("CIMOM_REGISTRATION", "fixture.json", 1);
+            setenv("CIMOM_REGISTRATION", m_registration, 1);
             execv(CIMOM_PROGRAM, argv.data());
             _exit(98);
         }
@@ -66,6 +66,7 @@ protected:
     }
 
     const fixture::Folder m_folder;
+    const char* m_registration = "fixture.json";
 };
 
 TEST_F(CommandLine, PathsThatArePrintedCanBeGivenBack) {
@@ -92,14 +93,19 @@ TEST_F(CommandLine, FailuresAreTold) {
         std::string err;
     } rows[] = {
         {{"gi", "Fix_Thing.Name=\"none\""}, 6, "CIM_ERR_NOT_FOUND (6): no such thing\n"},
-        {{"ei", "Other"}, 7, "CIM_ERR_NOT_SUPPORTED (7): no provider serves class Other"},
+        {{"ei", "Other"},
+         7,
+         "CIM_ERR_NOT_SUPPORTED (7): no provider serves class Other in root/cimv2: no registration "
+         "lists it, or a class above it, with the interface instance\n"},
         {{"gi", "Fix_Thing.Name"}, 4, "CIM_ERR_INVALID_PARAMETER (4): at character 15 of "},
         {{"gc", "Fix_Thing"}, 7, "CIM_ERR_NOT_SUPPORTED (7): no classes are known without"},
         {{"ei"}, 64, "class is required"},
-        {{"dance"}, 64, ""},
+        {{"dance", "C"}, 64, "cimom: no verb 'dance'; cimom --help lists them\n"},
         {{}, 64, ""},
         {{"--broker", "fat", "ei", "C"}, 64, "--broker"},
-        {{"--registration", "none.json", "ei", "C"}, 78, "cimom: none.json: cannot be read"},
+        {{"--registration", "none.json", "ei", "C"},
+         78,
+         "cimom: none.json: cannot be read: No such file or directory\n"},
         {{"--schema", "fixture.json", "ei", "C"}, 78, "cimom: fixture.json:1:1"},
         {{"--provider-output", "no/such", "ei", "C"}, 78, "cimom: no/such: "},
     };
@@ -111,9 +117,22 @@ TEST_F(CommandLine, FailuresAreTold) {
     }
     const Run unknown = runTyped({"mi", "Fix_Thing.Name=\"one\"", "Colour=red"});
     EXPECT_EQ(unknown.exit, 12) << unknown.err;
-    const Run help = run({"gi", "--help"});
-    EXPECT_EQ(help.exit, 0);
-    EXPECT_NE(help.out.find("--properties"), std::string::npos);
+    for (const auto& [arguments, words] :
+         std::vector<std::pair<std::vector<std::string>, const char*>>{
+             {{"gi", "--help"}, "--properties"},
+             {{"--help"}, "CIMOM_SCHEMA"},
+             {{"--version"}, "cimom 0."}}) {
+        const Run told = run(arguments);
+        EXPECT_EQ(told.exit, 0);
+        EXPECT_NE(told.out.find(words), std::string::npos);
+    }
+    m_registration = "";
+    const Run none = run({"ei", "C"});
+    EXPECT_EQ(none.exit, 78);
+    EXPECT_EQ(
+        none.err,
+        "cimom: no providers: name a registration, by --registration or CIMOM_REGISTRATION\n");
+    EXPECT_EQ(runTyped({"ec", "Fix_Base"}).exit, 0);
 }
 
 TEST_F(CommandLine, OutputThatIsLostIsAFailure) {

@@ -431,6 +431,8 @@ TEST_F(FullObjects, QueriesSelect) {
         {"WHERE Severity", -1},
         {"WHERE Severity = 5 5", -1},
         {"WHERE Text = 'open", -1},
+        {"WHERE Text = 'a\\bc'", 1},
+        {"WHERE Text = 'abc\\'", -1},
         {"WHERE (Severity = 5", -1},
         {"WHERE Severity = 1x", -1},
     };

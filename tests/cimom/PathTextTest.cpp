@@ -105,8 +105,12 @@ TEST(PathText, InstancesReadBackAsTheirClassSays) {
     for (const char* bad : {"Fix_Thing{Size=-1;}", "Fix_Thing{Sise=1;}", "Fix_Thing{Size=1;", "{}",
                             "Fix_Thing{Size=1;}x", "Fix_Thing{Size 1;}"})
         EXPECT_THROW(parseValue(bad, CMPI_instance, &classes), Failure) << bad;
-    std::string deep;
-    for (int i = 0; i < 100; ++i) deep += "A{p=instance of ";
+    std::string deep, wide = "A{";
+    for (int i = 0; i < 100; ++i) {
+        deep += "A{p=instance of ";
+        wide += "a" + std::to_string(i) + "={1}; b" + std::to_string(i) + "=instance of B {}; ";
+    }
+    EXPECT_EQ(parseValue(wide + "}", CMPI_instance).instance().properties.size(), 200U);
     EXPECT_THROW(parseValue(deep, CMPI_instance, &classes), Failure);
 }
 

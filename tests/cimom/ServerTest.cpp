@@ -143,6 +143,11 @@ TEST_P(Operations, QueriesAreAnsweredByEnumeration) {
     ASSERT_EQ(reply.instances.size(), 1U) << reply.message;
     EXPECT_EQ(reply.instances[0].properties.size(), 1U);
     EXPECT_EQ(m_server.execQuery(m_request, "SELECT").rc, CMPI_RC_ERR_INVALID_QUERY);
+    Request named = m_request;  // the query alone says what is wanted
+    named.properties = {{"Name"}};
+    const Reply whole = m_server.execQuery(named, "SELECT * FROM Fix_Thing WHERE Size > 1");
+    ASSERT_EQ(whole.instances.size(), 1U);
+    EXPECT_EQ(*whole.instances[0].properties.find("Size"), Value(std::uint32_t{2}));
 }
 
 TEST_P(Operations, IndicationsReachWhoAskedForThem) {
@@ -280,6 +285,7 @@ struct Probe {
     bool returns = true;  ///< the link
     const char* nameSpace = "root/cimv2";       ///< of the link
     const char* thingNameSpace = "root/cimv2";  ///< of the thing
+    std::function<void()> meanwhile = [] {};    ///< done in a modify
 };
 Probe probe;
 const CMPIStatus kDone{CMPI_RC_OK, nullptr};
@@ -307,6 +313,7 @@ CMPIInstanceMI* probeInstances(const CMPIBroker* mb, const CMPIContext*, CMPISta
         probe.given = RequestScope::read(inst).properties;
         if (!names) probe.heard += "all";
         for (; names && *names; ++names) probe.heard += *names;
+        probe.meanwhile();
         return kDone;
     };
     static CMPIInstanceMI mi = {nullptr, &table};
@@ -384,6 +391,14 @@ TEST_P(Probed, IsToldOnWhereItReturnsLessThanItShould) {
     probe.returns = false;
     expect(m_server.createInstance({}, Instance(thing("one"))),
            "provider Probe returned no path of the instance that it was to create");
+}
+
+TEST_P(Probed, StaysWhileItWorks) {
+    std::vector<std::string> stayed;
+    probe.meanwhile = [&] { stayed = m_server.unloadProviders(false); };
+    EXPECT_EQ(m_server.modifyInstance({}, Instance(thing("one"))).rc, CMPI_RC_OK);
+    EXPECT_EQ(stayed, std::vector<std::string>{"Probe"});
+    EXPECT_TRUE(m_server.unloadProviders(false).empty());
 }
 
 ON_BOTH_BROKERS(Probed);
@@ -465,12 +480,29 @@ TEST_F(Loader, FailuresHaveWords) {
         EXPECT_EQ(reply.rc, CMPI_RC_ERR_FAILED);
         EXPECT_NE(reply.message.find(words), std::string::npos) << reply.message;
     }
-    const std::string known = R"("classes": {"C": {"provider": "P", "interfaces": )";
-    for (const std::string& text :
-         {std::string(), std::string("[]"), "{" + known + R"(["instance"]}}})",
-          R"({"namespace": "n", "library": "l", )" + known + R"(["x"]}}})"})
-        EXPECT_THROW(Server().loadRegistration(m_folder.write("r.json", text)), std::runtime_error)
-            << text;
+    const std::string c = R"("classes": {"C": )", l = R"({"library": "l", )" + c;
+    const std::pair<std::string, const char*> files[] = {
+        {"", ": ends before its JSON does"},
+        {"{\n  \"classes\": x}", ":2:14: not JSON from here on"},
+        {"[]", ": \"classes\" is missing"},
+        {R"({"classes": 5})", ": \"classes\": not an object of classes"},
+        {"{" + c + "5}}", ": \"classes\": class C: \"provider\" is missing"},
+        {"{" + c + R"([{"provider": "P"}]}})", ": \"classes\": class C: \"library\" is missing"},
+        {l + R"({"provider": "P", "namespace": ["n", 5]}}})",
+         ": \"classes\": class C: \"namespace\": not a name"},
+        {l + R"({"provider": "P", "namespace": "n", "interfaces": "x"}}})",
+         ": \"classes\": class C: \"interfaces\": there is no interface 'x', but instance, "
+         "association, method, indication, property"},
+    };
+    for (const auto& [text, words] : files) {
+        const std::string file = m_folder.write("r.json", text);
+        try {
+            Server().loadRegistration(file);
+            ADD_FAILURE() << text;
+        } catch (const std::runtime_error& e) {
+            EXPECT_EQ(e.what(), file + words);
+        }
+    }
     EXPECT_THROW(Server().loadRegistration("/nowhere/r.json"), std::runtime_error);
 }
 

@@ -360,7 +360,9 @@ TEST_P(FailureRoad, KeysMustBeThoseOfTheObject) {
          says("KeyValueDoesntMatch", {{3, "one"}, {4, "Slot"}, {5, ""}})},
         {"gi " + disk("Name=5,Slot=1"), kMismatch, ""},
         {"gi ORXC_Unknown.Name=1", kNotSupported,
-         "no provider serves class ORXC_Unknown in root/cimv2 for this"},
+         "no provider serves class ORXC_Unknown in root/cimv2: no registration lists it, or a "
+         "class "
+         "above it, with the interface instance"},
     };
     for (const Row& row : untyped) expectFailure(row);
 }
@@ -371,7 +373,10 @@ const std::string kWrongType =
     "Name=\"sdb\",Slot=1, the expected data type is \"uint64\"";
 const std::string kNoObject =
     "refers to an invalid object:root/cimv2:Test_Disk to inovke method Attach";
-const std::string kUnserved = "no provider serves class CIM_ComputerSystem in root/cimv2 for this";
+const std::string kUnserved =
+    "no provider serves class CIM_ComputerSystem in root/cimv2: no registration lists it, or a "
+    "class "
+    "above it, with the interface instance";
 const std::string kUnservedHost =
     "An error ocurred, when validate value CIM_ComputerSystem.Name=\"x\" "
     "of parameter \"Host\". And the error string was \"" +

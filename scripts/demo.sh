@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# Installs what is missing, builds, and shows a CIM request's whole road: an appliance, its tool
-# asked by hand, the same asked through CIM, a partition made, started, renamed, moved to another
+# Installs what is missing, builds, and shows a CIM request from end to end: an appliance, its
+# tool asked by hand, the same asked through CIM, a partition made, started, renamed, moved to another
 # host, stopped and deleted, and what a client reads when a thing is not there.
 #
 #   scripts/demo.sh
@@ -19,10 +19,6 @@ build release -DZEM_BUILD_TESTS=OFF -DZEM_BUILD_BENCH=OFF
 
 folder=$(mktemp -d)
 trap 'rm -rf "$folder"' EXIT
-export PATH="$top/build/release/bin:$PATH" APPLIANCE_HOME="$folder/appliance"
-export CIMOM_REGISTRATION="$top/build/release/lib/zemproviders.json"
-export CIMOM_SCHEMA="$top/providers/mof/zem.mof"
-
 # quoted <word>...: the words as one would type them.
 quoted() {
     local line= word
@@ -36,14 +32,28 @@ quoted() {
 }
 
 # show <expected exit status> <command>...: prints the command, runs it, holds it to its status.
+# What it prints on standard output is in $said, too, until the next.
+said=$folder/said
 show() {
     local expected=$1 status=0
     shift
     printf '\n$ %s\n' "$(quoted "$@")"
-    "$@" || status=$?
+    "$@" | tee "$said" || status=$?
     [ "$status" -eq 0 ] || printf '(exit status %d)\n' "$status"
     [ "$status" -eq "$expected" ] || die "expected exit status $expected"
 }
+
+# set_up <variable> <value>: exports it, and prints how.
+set_up() {
+    printf '$ export %s=%s\n' "$1" "$(quoted "$2")"
+    export "$1=$2"
+}
+
+say "where things are"
+set_up PATH "$top/build/release/bin:$PATH"
+set_up APPLIANCE_HOME "$folder/appliance"
+set_up CIMOM_REGISTRATION "$top/build/release/lib/zemproviders.json"
+set_up CIMOM_SCHEMA "$top/providers/mof/zem.mof"
 
 host='ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name='
 
@@ -52,13 +62,15 @@ show 0 appliance init
 show 0 appliance show
 
 say "its tool, asked by hand"
-show 0 qyplat -r sys -F name,type_model,serial_num,state
-mtms=$(qyplat -r sys -F type_model,serial_num | head -1 | tr ',' '*')
+show 0 qyplat -r sys -F type_model,serial_num,name,state
+mtms=$(head -1 "$said" | cut -d, -f1,2 | tr ',' '*')
 show 0 qyplat -r lpar -m "$mtms" -F lpar_id,name,lpar_env,state
 
 say "the same through CIM: broker, provider, frame, tool"
 show 0 cimom ein ORXC_CEC_CS
+hosts=$(wc -l <"$said")
 show 0 cimom ein ORXC_LPAR_CS
+partitions=$(wc -l <"$said")
 show 0 cimom ei ORXC_CEC_CS
 show 0 cimom ei ORXC_LPAR_CS --properties ElementName,State,LparEnvironment
 
@@ -69,11 +81,11 @@ say "its partitions, by way of an association"
 show 0 cimom ain "$host\"$mtms\"" --assoc-class ORXC_HostedPartition
 
 say "a partition made through CIM, with the first number that is free"
-made=$(cimom ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS "Name=*$mtms" \
+show 0 cimom ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS "Name=*$mtms" \
     'ElementName=made "by hand", 1' LparEnvironment=tmxlinux ProcessorMode=shared SharingMode=cap \
     MinProcessors=1 DesiredProcessors=1 MaxProcessors=2 MinProcessingUnits=10 \
-    DesiredProcessingUnits=50 MaxProcessingUnits=100 MinMemory=256 DesiredMemory=512 MaxMemory=1024)
-printf '\n%s\n' "$made"
+    DesiredProcessingUnits=50 MaxProcessingUnits=100 MinMemory=256 DesiredMemory=512 MaxMemory=1024
+made=$(cat "$said")
 show 0 cimom im "$made" RequestStateChange RequestedState=2
 show 0 cimom mi "$made" 'ElementName=renamed while it runs'
 show 1 cimom di "$made"
@@ -81,16 +93,17 @@ show 1 cimom di "$made"
 say "moved to another host, and seen half way"
 id=${made##*=\"} id=${id%%\**}
 show 0 edpower -r lpar --id 1 -o on -f normal -m "beta lab"     # serves its disks there
-printf '\n$ domove -o m -m %s -t "beta lab" --id %s &\n' "$(quoted "$mtms")" "$id"
+printf '\n$ APPLIANCE_MOVE_SECONDS=2 %s &\n' "$(quoted domove -o m -m "$mtms" -t "beta lab" --id "$id")"
 APPLIANCE_MOVE_SECONDS=2 domove -o m -m "$mtms" -t "beta lab" --id "$id" &
-sleep 1
+show 0 sleep 1
 show 0 qymove -r lpar -m "$mtms" --filter "lpar_ids=$id" \
     -F name,migration_state,dest_sys_name,bytes_transmitted,bytes_remaining
+printf '\n$ wait\n'
 wait $!
 show 0 qyplat -r lpar -m "beta lab" -F lpar_id,name,state
+id=$(sed -n 's/,renamed.*//p' "$said")
 
 say "stopped and deleted there"
-id=$(qyplat -r lpar -m "beta lab" -F lpar_id,name | sed -n 's/,renamed.*//p')
 there="ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"$id*1111-AAB*0000002\""
 show 0 cimom im "$there" RequestStateChange RequestedState=3
 show 0 cimom di "$there"
@@ -102,4 +115,4 @@ show 6 cimom gi "$host\"9999-ZZZ*0000000\""
 show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
 printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions by\nassociation, the life of a partition, a move between hosts, two failures by name, one of them\nin German too.\n' \
-    "$(cimom ein ORXC_CEC_CS | wc -l)" "$(cimom ein ORXC_LPAR_CS | wc -l)"
+    "$hosts" "$partitions"

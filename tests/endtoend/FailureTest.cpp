@@ -185,7 +185,7 @@ Texts general(const Texts& text) {
     return {wrapped(text.english), wrapped(text.german)};
 }
 
-class FailureRoad : public ::testing::TestWithParam<const char*> {
+class FailureTest : public ::testing::TestWithParam<const char*> {
 protected:
     void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
 
@@ -233,7 +233,7 @@ protected:
 
 // -- the failures that providers throw by name ----------------------------------------------------
 
-TEST_P(FailureRoad, ProvidersThrowByName) {
+TEST_P(FailureTest, ProvidersThrowByName) {
     for (const Sentence& sentence : kSentences) {
         const std::string name = sentence.name;
         const std::string arguments = "gi " + disk("Name=\"" + name + "\",Slot=1");
@@ -248,7 +248,7 @@ TEST_P(FailureRoad, ProvidersThrowByName) {
 
 // A method's failure has one status, and quotes the text, which gets no sentence around it; what
 // the binding throws is answered as it stands.
-TEST_P(FailureRoad, MethodsThrowByName) {
+TEST_P(FailureTest, MethodsThrowByName) {
     const std::string fail = "im Test_Disk Fail Failure=";
     for (const char* name :
          {"MethodNotSupported", "MethodNotFound", "UserAccessDenied", "ParameterNotFound",
@@ -261,7 +261,7 @@ TEST_P(FailureRoad, MethodsThrowByName) {
 
 // Some failures of an enumeration are the client's business, the others the log's. What was found
 // before stays.
-TEST_P(FailureRoad, EnumerationsLogWhatTheyDoNotAnswer) {
+TEST_P(FailureTest, EnumerationsLogWhatTheyDoNotAnswer) {
     const std::string logged = "log 3 Test_DiskProvider: CIM_ERR_";
     const struct {
         const char* user;  ///< says how the provider fails
@@ -289,7 +289,7 @@ TEST_P(FailureRoad, EnumerationsLogWhatTheyDoNotAnswer) {
 }
 
 // The class test of every operation, which names the operation as its clients know it.
-TEST_P(FailureRoad, ClassesMustBeServed) {
+TEST_P(FailureTest, ClassesMustBeServed) {
     const std::string other = "'Test_Other.Name=\"x\"'";
     const struct {
         std::string arguments;
@@ -339,7 +339,7 @@ const std::vector<Row> kWrongKeys = {
      ""},
 };
 
-TEST_P(FailureRoad, KeysMustBeThoseOfTheObject) {
+TEST_P(FailureTest, KeysMustBeThoseOfTheObject) {
     const std::string half = disk("Name=\"sda\"");
     const std::pair<const char*, std::string> incomplete[] = {
         {"getInstance", "gi " + half},
@@ -459,11 +459,11 @@ const std::vector<Row> kWrongRequests = {
      kMismatch, ""},
 };
 
-TEST_P(FailureRoad, PropertiesArgumentsAndReferencesMustBeRight) {
+TEST_P(FailureTest, PropertiesArgumentsAndReferencesMustBeRight) {
     for (const Row& row : kWrongRequests) expectFailure(row);
 }
 
-TEST_P(FailureRoad, UsersMayBeRefused) {
+TEST_P(FailureTest, UsersMayBeRefused) {
     const std::pair<const char*, std::string> rows[] = {
         {"getInstance", "gi " + kDisk},
         {"getInstance", "gp " + kDisk + " Size"},
@@ -475,7 +475,7 @@ TEST_P(FailureRoad, UsersMayBeRefused) {
     EXPECT_EQ(cimom("--user kim gi " + kDisk).exit, 0);
 }
 
-TEST_P(FailureRoad, DisabledProvidersFindNothing) {
+TEST_P(FailureTest, DisabledProvidersFindNothing) {
     m_before = "ASAN_OPTIONS=verify_asan_link_order=0:detect_leaks=0 LD_PRELOAD=" ZEM_DISABLED " ";
     for (const std::string& arguments : std::vector<std::string>{
              "ei Test_Disk", "ein Test_Disk", "ei ORXC_CEC_CS", "ein ORXC_HostedPartition",
@@ -502,7 +502,7 @@ TEST_P(FailureRoad, DisabledProvidersFindNothing) {
 
 // The failure of the provider of the other side, in that of the association's provider; the
 // families differ in what they tell of it.
-TEST_P(FailureRoad, AssociationsOfWhatIsNotThereAreRefused) {
+TEST_P(FailureTest, AssociationsOfWhatIsNotThereAreRefused) {
     const struct {
         const char* name;
         const char* id;
@@ -531,7 +531,7 @@ TEST_P(FailureRoad, AssociationsOfWhatIsNotThereAreRefused) {
 
 // The client's languages choose the locale of the tools, whose first is taken, and the bundle, of
 // which the first that there is.
-TEST_P(FailureRoad, LanguagesChooseTheTextAndTheToolsLocale) {
+TEST_P(FailureTest, LanguagesChooseTheTextAndTheToolsLocale) {
     const fs::path messages = m_appliance.folder() / "messages";
     fs::create_directory(messages);
     fs::copy(ZEM_MESSAGES "/default_de.json", messages);
@@ -572,7 +572,7 @@ TEST_P(FailureRoad, LanguagesChooseTheTextAndTheToolsLocale) {
                   says("MethodNotSupported", {{0, "deleteInstance"}}).english);
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, FailureRoad, ::testing::Values("full", "lean"),
+INSTANTIATE_TEST_SUITE_P(Brokers, FailureTest, ::testing::Values("full", "lean"),
                          [](const auto& broker) { return std::string(broker.param); });
 
 // The bundle has a text for every key that the library can look up, and for nothing else.

@@ -1,4 +1,4 @@
-// The whole road as a client walks it: the programs as built, from a command line to the tool
+// What a client does, with the programs as built: from a command line to the tool
 // and back, under a broker of each character.
 #include <gtest/gtest.h>
 
@@ -27,7 +27,7 @@ struct Row {
     std::string answer;  ///< on standard output, or with an exit status on standard error
 };
 
-class Road : public ::testing::TestWithParam<const char*> {
+class RequestTest : public ::testing::TestWithParam<const char*> {
 protected:
     void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
 
@@ -48,7 +48,7 @@ protected:
     ScopedEnvironment m_schema{"CIMOM_SCHEMA", ZEM_SCHEMA};
 };
 
-TEST_P(Road, WhatIsPrintedCanBeGivenBack) {
+TEST_P(RequestTest, WhatIsPrintedCanBeGivenBack) {
     // the host's clock goes on between two requests
     const std::string still = " --properties ElementName,State,EnabledState";
     for (const char* cls : {"ORXC_CEC_CS", "ORXC_LPAR_CS", "ORXC_HostConnection"}) {
@@ -64,7 +64,7 @@ TEST_P(Road, WhatIsPrintedCanBeGivenBack) {
     }
 }
 
-TEST_P(Road, ClientReadsWhatThereIsAndWhatIsWrong) {
+TEST_P(RequestTest, ClientReadsWhatThereIsAndWhatIsWrong) {
     const std::string unmodifiable =
         "CIM_ERR_INVALID_PARAMETER (4): Attempt to change unmodifiable property \"Caption\" "
         "of class ORXC_LPAR_CS from \"web server\" to \"x\".\n";
@@ -92,7 +92,7 @@ TEST_P(Road, ClientReadsWhatThereIsAndWhatIsWrong) {
 }
 
 // The life of a partition, in the order of the rows.
-TEST_P(Road, PartitionsAreMadeChangedStartedStoppedAndDeleted) {
+TEST_P(RequestTest, PartitionsAreMadeChangedStartedStoppedAndDeleted) {
     const std::string path =
         R"(root/cimv2:ORXC_LPAR_CS.CreationClassName="ORXC_LPAR_CS",Name="8*1111-AAA*0000001")";
     const std::string made = "'" + path + "'";
@@ -163,7 +163,7 @@ struct Association {
 };
 
 // One provider for each way in which the library can find the two sides.
-TEST_P(Road, EveryAssociationAnswersAllOperationsAndFilters) {
+TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
     const std::string link = R"('ORXC_HostConnection.InstanceID="ORX:1111-AAA*0000001:primary"')";
     const Association rows[] = {
         {"ORXC_HostedPartition", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
@@ -214,7 +214,7 @@ TEST_P(Road, EveryAssociationAnswersAllOperationsAndFilters) {
     }
 }
 
-TEST_P(Road, TimingTraceIsWrittenWhenAskedFor) {
+TEST_P(RequestTest, TimingTraceIsWrittenWhenAskedFor) {
     const std::string file = (m_appliance.folder() / "timing").string();
     ScopedEnvironment on("VM_CIMPROVIDER_TRACE", "1"), path("VM_CIMPROVIDER_TRACE_PATH", file);
     EXPECT_EQ(cimom("ei ORXC_CEC_CS").exit, 0);
@@ -222,7 +222,7 @@ TEST_P(Road, TimingTraceIsWrittenWhenAskedFor) {
     EXPECT_FALSE(std::filesystem::exists(m_appliance.folder() / "CIMTestPerfData.txt"));
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, Road, ::testing::Values("full", "lean"),
+INSTANTIATE_TEST_SUITE_P(Brokers, RequestTest, ::testing::Values("full", "lean"),
                          [](const auto& broker) { return std::string(broker.param); });
 
 }  // namespace

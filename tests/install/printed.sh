@@ -19,9 +19,10 @@ awk '/^```/ && !within { within = 1; n = sprintf("%03d", ++count); block = n "."
      within { print > block }
      NF { last = $0 }' "$page"
 
+echo '#include <cstdio>' >others.cpp
 printf '#include <%s.h>\n' AssociationProvider BaseZemInstanceProvider DNXApiCaller \
     BaseZemMultiNtoNAssociationProvider DataTypeConvertUtils JMPIProviderInterfaceStub \
-    MultiNtoNAssociationProvider NtoNAssociationProvider ProviderFactories >others.cpp
+    MultiNtoNAssociationProvider NtoNAssociationProvider ProviderFactories >>others.cpp
 for block in [0-9]*.cpp [0-9]*.sh [0-9]*.text; do echo "$block"; done | grep -v '\*' | sort >blocks
 mkdir home && cd home
 while read -r block; do

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <map>
 
 #include "TestAppliance.h"
 
@@ -177,13 +178,18 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
         {"ORXC_PartitionConnection", "CIM_Dependency", "Antecedent", "Dependent", link,
          "ORXC_LPAR_CS", 7, 28},
     };
-    for (const Association& row : rows) {
-        const std::string of = row.source + " --assoc-class " + row.name;
-        const auto answers = [&](const std::string& arguments) {
+    std::map<std::string, std::vector<std::string>> known;
+    const auto answers = [&](const std::string& arguments) {
+        const auto [answer, isNew] = known.try_emplace(arguments);
+        if (isNew) {
             const Outcome got = cimom(arguments);
             EXPECT_EQ(got.exit, 0) << arguments << got.err;
-            return lines(got.out);
-        };
+            answer->second = lines(got.out);
+        }
+        return answer->second;
+    };
+    for (const Association& row : rows) {
+        const std::string of = row.source + " --assoc-class " + row.name;
         const std::vector<std::string> targets = answers("ain " + of);
         EXPECT_EQ(targets.size(), row.targets) << row.name;
         EXPECT_EQ(answers("ain " + of + " --result-class " + row.farClass), targets) << row.name;

@@ -1,6 +1,6 @@
 # Does what a page prints, in the order of the page: writes the files that it names, runs its
 # commands, holds their output to the answer that follows them, and compiles its other C++. So for
-# the examples of two headers.
+# the examples of two headers. No link of an installed page may be dead.
 #
 #   printed.sh PAGE PREFIX LIBDIR CXX
 set -eu
@@ -34,7 +34,11 @@ while read -r block; do
     fi
     case $block in
         *.sh) . "$block" >"$work/said" ;;
-        *.text) diff "$work/said" "$block" ;;
+        *.text)
+            [ -f "$work/said" ] || continue
+            diff "$work/said" "$block"
+            rm "$work/said"
+            ;;
         *.cpp) grep -q '^ *\.\.\.$' "$block" || cat "$block" >>"$work/others.cpp" ;;
     esac
 done <"$work/blocks"
@@ -49,3 +53,10 @@ example() { sed -n '/^#/q;s|^///     ||p' "$PREFIX/include/zemutilities/$1"; }
 } >>"$work/others.cpp"
 "$CXX" -std=c++17 -fsyntax-only -Wall -Wextra -Woverloaded-virtual -Werror \
     $(pkg-config --cflags zemutilities) "$work/others.cpp"
+
+cd "$PREFIX"/share/doc/zemutilities
+for page in README.md docs/*.md; do
+    sed -n 's/.*](\([^):#]*\)[)#].*/\1/p' "$page" | while read -r link; do
+        [ -e "$(dirname "$page")/$link" ] || { echo "$page: nothing at $link"; exit 1; }
+    done
+done

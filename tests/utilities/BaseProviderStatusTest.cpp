@@ -92,19 +92,20 @@ TEST_P(BaseProviderStatus, TakesServersThatLackFunctions) {
     EXPECT_STREQ("as is", p.retrieveLocalizedString("none", "E.X", "as is", 0));
     EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, p.handleException("M", zemObjectNotFoundException("x")).rc());
     p.trace("x");
-    CMPIContextFT contextTable = *h.ctx()->ft;
+    static CMPIContextFT contextTable;
+    contextTable = *h.ctx()->ft;
     contextTable.addEntry = nullptr;
-    CMPIContext context = *h.ctx();
-    context.ft = &contextTable;
-    p.logICUMessage(CmpiContext(&context), 1, "Id", "none", "E.X", "x");
+    h.ctx()->ft = &contextTable;
+    p.logICUMessage(CmpiContext(h.ctx()), 1, "Id", "none", "E.X", "x");
     const char* names[] = {"Colour",
                            nullptr};  // of which a server without new instances says nothing
     p.validateProerties(CmpiObjectPath(h.path()), names, "M");
-    CMPIObjectPathFT pathTable = *h.path()->ft;
+    CMPIObjectPath* const found = h.path();
+    static CMPIObjectPathFT pathTable;
+    pathTable = *found->ft;
     pathTable.getKey = nullptr;
-    CMPIObjectPath path = *h.path();
-    path.ft = &pathTable;
-    p.validateKeys(CmpiObjectPath(h.path()), CmpiObjectPath(&path), "M", true);
+    found->ft = &pathTable;
+    p.validateKeys(CmpiObjectPath(h.path()), CmpiObjectPath(found), "M", true);
 }
 
 CMPIString* readMessage(const CMPIBroker*, const char* key, const CMPIMsgFileHandle, const char*,

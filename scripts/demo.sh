@@ -50,7 +50,8 @@ set_up() {
 }
 
 say "where things are"
-set_up PATH "$top/build/release/bin:$PATH"
+printf '$ export PATH=%s:$PATH\n' "$(quoted "$top/build/release/bin")"
+export PATH="$top/build/release/bin:$PATH"
 set_up APPLIANCE_HOME "$folder/appliance"
 set_up CIMOM_REGISTRATION "$top/build/release/lib/zemproviders.json"
 set_up CIMOM_SCHEMA "$top/providers/mof/zem.mof"

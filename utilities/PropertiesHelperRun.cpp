@@ -129,7 +129,7 @@ private:
 
 /// One run from its pipes on: empties them until the child has ended.
 ///
-/// A cancelled thread leaves while it waits, in rest(), and nowhere else.
+/// A cancelled thread leaves between two looks at the child and nowhere else.
 class Supervision {
 public:
     std::string m_stdout;
@@ -170,6 +170,7 @@ public:
         const ChildEnd end(m_pid);
         error = 0;
         for (;;) {
+            pthread_testcancel();
             if (plan.expired()) {
                 m_pid = 0;
                 return error != 0;
@@ -207,6 +208,7 @@ private:
     /// Spends a pause between two passes. A pipe that fills meanwhile is emptied, so that the child
     /// need not wait for the next pass, and the end of the child ends the pause.
     void rest(std::chrono::microseconds pause, const ChildEnd& end) {
+        const zemUncancelled uncancelled;
         using Clock = std::chrono::steady_clock;
         pollfd watched[] = {
             {end.descriptor(), POLLIN, 0}, watch(m_pfdStdout), watch(m_pfdStderr), watch(m_pfdExp)};
@@ -243,7 +245,6 @@ private:
     /// The exception channel is emptied along with the others, for nothing else reads it; its
     /// pieces are counted at the end, when it is whole.
     void drainAll() {
-        const zemUncancelled uncancelled;
         try {
             drain(m_pfdStdout,
                   [this](const char* bytes, size_t size) { appendPieces(m_stdout, bytes, size); });

@@ -157,8 +157,10 @@ TEST_P(BaseProviderStatus, LogsThroughTheServer) {
         p.logICUMessage(CmpiContext(h.ctx()), 4, "Id", "none", "E.X", "default");
         p.trace("as it comes");
         CMPIStatus status = {CMPI_RC_OK, nullptr};
-        EXPECT_TRUE(h.ctx()->ft->getEntry(h.ctx(), "UseProcessLocale", &status).value.boolean);
-        return status;
+        // The lean server's contexts take no entries.
+        EXPECT_EQ(GetParam() == Character::Full,
+                  h.ctx()->ft->getEntry(h.ctx(), "UseProcessLocale", &status).value.boolean != 0);
+        return CMPIStatus{CMPI_RC_OK, nullptr};
     });
     EXPECT_EQ(1, answer.traced("LOG MESSAGE: Id: text"));
     EXPECT_EQ(3, answer.traced("LOG MESSAGE: .*"));

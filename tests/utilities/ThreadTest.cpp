@@ -94,19 +94,15 @@ TEST(ThreadTest, RunsAndCanRunAgain) {
 
 TEST(ThreadTest, IsNeverStartedWithoutItsHandle) {
     zemThread thread;
-    std::atomic<bool> done{false};
-    const auto ask = [&](int) {
-        while (!done) {
-            EXPECT_TRUE(!thread.isStarted() || thread.getThreadId() != 0);
-        }
-    };
-    onThreads(1, ask, [&] {
-        for (int i = 0; i < 500; ++i) {
-            thread.start([](void*) {}, nullptr);
-            thread.waitThreadExit();
-        }
-        done = true;
-    });
+    for (int i = 0; i < 500; ++i) {
+        const auto look = [](void* own) {
+            const auto& self = *static_cast<zemThread*>(own);
+            EXPECT_TRUE(self.isStarted());
+            EXPECT_EQ(self.getThreadId(), zemThread::getCurrentThreadId());
+        };
+        ASSERT_EQ(thread.start(look, &thread), 0);
+        thread.waitThreadExit();
+    }
 }
 
 // Sets its flag when the stack is unwound.

@@ -59,6 +59,12 @@ bool Server::Impl::countFilter(const Target& target, int by, bool ofProvider) {
 
 void Server::Impl::activate(const Request& request, Subscription& subscription,
                             const Target& target) {
+    if (broker.lean()) {
+        try {
+            filterStep(request, target, FilterStep::MustPoll, subscription.query, false);
+        } catch (const Failure&) {  // nobody polls, whatever it answers
+        }
+    }
     const bool first = countFilter(target, 1, false);
     const bool enable = countFilter(target, 1, true);
     try {
@@ -134,17 +140,6 @@ Reply Server::unsubscribe(const Request& request, SubscriptionId id) {
         m_impl->deactivate(request, *subscription);
         std::lock_guard<std::recursive_mutex> lock(subscription->mutex);
         subscription->ended = true;
-        return Reply();
-    });
-}
-
-Reply Server::filterStep(const Request& request, FilterStep step, const std::string& query,
-                         const std::string& language, bool firstOrLast) {
-    return answer([&] {
-        const auto parsed = Query::parse(query, language);
-        const ObjectPath path = m_impl->complete(request, {"", parsed->className()});
-        for (const Target& target : m_impl->targetsBelow(path, kIndication))
-            m_impl->filterStep(request, target, step, parsed, firstOrLast);
         return Reply();
     });
 }

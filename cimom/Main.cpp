@@ -64,8 +64,8 @@ void addGlobals(CLI::App& app, Settings& settings) {
     const std::map<std::string, cimom::Format> formats = {{"text", cimom::Format::Text},
                                                           {"json", cimom::Format::Json}};
     app.add_option("--broker", settings.options.character,
-                   "Character of the broker: full, as the standard has it, or lean, like small "
-                   "servers in the field")
+                   "Character of the broker: full, by the standard and as unkind as OpenPegasus, "
+                   "or lean, like sfcb and other small servers")
         ->transform(CLI::CheckedTransformer(characters, CLI::ignore_case))
         ->option_text("full|lean");
     app.add_option("--registration", settings.registrations,

@@ -63,7 +63,9 @@ enum class Character {
     ///   gets what the provider returned, properties not asked for among it.
     /// - A path cannot be returned by returnData.
     /// - Associations: providers of all are asked, also of those that cannot hold the object, and
-    ///   hear of the class that the client named, be it a base of theirs, or of none.
+    ///   hear of the class that the client named, be it a base of theirs, or of none. What one of
+    ///   several providers refuses fails for all.
+    /// - Indication providers are asked whether to poll, and nobody cares for the answer.
     /// - Without a user the principal is a string whose text is null.
     Lean,
 };
@@ -161,9 +163,6 @@ struct Indication {
     Instance instance;
 };
 
-/// What an indication provider is asked about a filter, one call each.
-enum class FilterStep { Authorize, MustPoll, Activate, Deactivate };
-
 class Server {
 public:
     explicit Server(const Options& options = {});
@@ -235,9 +234,6 @@ public:
     /// Deactivates the filter and, with the last one of a provider, disables its indications.
     /// No handler runs any more when it returns, except one that called it.
     Reply unsubscribe(const Request& request, SubscriptionId id);
-    /// Asks the providers of the filter's class directly, without subscribing.
-    Reply filterStep(const Request& request, FilterStep step, const std::string& query,
-                     const std::string& language = "WQL", bool firstOrLast = true);
     /// Hands an indication to the subscribers, as a provider does through the broker.
     Reply deliver(const Request& request, const Instance& indication);
 

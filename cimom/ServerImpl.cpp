@@ -134,7 +134,9 @@ Instance Server::Impl::filled(Instance instance) const {
     if (!cls) return instance;
     NamedValues all = cls->blank();
     for (const auto& [name, value] : instance.path.keys) all.set(name, value);
-    for (const auto& [name, value] : instance.properties) all.set(name, value);
+    NameSet known;  // a name that stands twice stays for the provider to judge
+    for (const auto& [name, value] : instance.properties)
+        known.insert(name).second ? all.set(name, value) : all.add(name, value);
     instance.properties = std::move(all);
     return instance;
 }

@@ -30,6 +30,9 @@ struct Call {
     Reply& reply;
 };
 
+/// What an indication provider is asked about a filter, one call each.
+enum class FilterStep { Authorize, MustPoll, Activate, Deactivate };
+
 /// One filter that a client has active.
 struct Subscription {
     std::string nameSpace;
@@ -216,8 +219,10 @@ Reply Server::Impl::callAll(const Request& request, const std::vector<Target>& t
         append(all.values, one.values);
         append(all.errors, one.errors);
         all.done = all.done && one.done;
-        // Of several providers, one that does not know the operation does not spoil it.
-        const bool refuses = one.rc == CMPI_RC_ERR_NOT_SUPPORTED && ++refused < targets.size();
+        // Of several providers, one that does not know the operation does not spoil it, except in
+        // a lean broker.
+        const bool refuses =
+            !broker.lean() && one.rc == CMPI_RC_ERR_NOT_SUPPORTED && ++refused < targets.size();
         if (all.ok() && !one.ok() && !refuses) all.fail(one.rc, one.message);
     }
     return all;

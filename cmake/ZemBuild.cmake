@@ -24,7 +24,10 @@ set(CMAKE_BUILD_WITH_INSTALL_RPATH ON)
 find_program(ZEM_CCACHE ccache)
 if(ZEM_CCACHE AND NOT CMAKE_CXX_COMPILER_LAUNCHER)
   set(CMAKE_C_COMPILER_LAUNCHER ${ZEM_CCACHE})
-  set(CMAKE_CXX_COMPILER_LAUNCHER ${ZEM_CCACHE})
+  # Without these it passes by whatever uses a precompiled header. Nothing here reads the time
+  # macros.
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CMAKE_COMMAND} -E env
+    CCACHE_SLOPPINESS=pch_defines,time_macros,include_file_mtime,include_file_ctime ${ZEM_CCACHE})
 endif()
 
 find_package(Threads REQUIRED)

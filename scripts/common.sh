@@ -36,18 +36,18 @@ install_missing() {
         apt-get install -y -qq --no-install-recommends "${missing[@]}" >&2
 }
 
-# build <preset> [<cmake option>...]: configures and builds into build/<preset>; only the targets
-# in build_targets where that names any.
+# build <preset> [<cmake option>...]: configures and builds into build_folder, or build/<preset>
+# where that is not set; only the targets in build_targets where that names any.
 build_targets=()
+build_folder=
 build() {
-    local preset=$1
+    local preset=$1 folder=${build_folder:-$top/build/$1} said
     shift
     say "building ($preset)"
-    cmake -S "$top" --preset "$preset" "$@" >"$top/build-$preset.log" 2>&1 || {
-        cat "$top/build-$preset.log" >&2
+    said=$(cmake -S "$top" -B "$folder" --preset "$preset" "$@" 2>&1) || {
+        printf '%s\n' "$said" >&2
         die "configuring failed"
     }
-    rm -f "$top/build-$preset.log"
-    cmake --build "$top/build/$preset" -j "$jobs" \
+    cmake --build "$folder" -j "$jobs" \
         ${build_targets[@]+--target "${build_targets[@]}"} >&2
 }

@@ -34,7 +34,7 @@ protected:
 
     std::size_t m_kept = 0;
     Server m_server{{GetParam(), "", {}, fixture::classes()}};
-    const Request m_request;
+    const Request m_request{};
 };
 
 TEST_P(Operations, InstancesLiveAndDie) {

@@ -123,13 +123,14 @@ void CTimeFileLoger::log(const char* text) {
 
 // The name may lie where anyone can put something else in its place.
 CFileLoger::CFileLoger(const zemString& path)
-    : m_file(open(path, O_WRONLY | O_APPEND | O_CREAT | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK,
-                  S_IRUSR | S_IWUSR)) {}
+    : m_filepath(path),
+      m_logger(open(m_filepath, O_WRONLY | O_APPEND | O_CREAT | O_NOFOLLOW | O_CLOEXEC | O_NONBLOCK,
+                    S_IRUSR | S_IWUSR)) {}
 
 CFileLoger::~CFileLoger() {
     const zemUncancelled uncancelled;
-    if (m_file >= 0) {
-        close(m_file);
+    if (m_logger >= 0) {
+        close(m_logger);
     }
 }
 
@@ -137,7 +138,7 @@ void CFileLoger::log(const char* text) {
     const zemSigpipeHeld held;
     char newline = '\n';
     const iovec line[] = {{const_cast<char*>(text), std::strlen(text)}, {&newline, 1}};
-    if (writev(m_file, line, 2) < 0) return;  // a trace that is lost is no failure
+    if (writev(m_logger, line, 2) < 0) return;  // a trace that is lost is no failure
 }
 
 // Never destroyed: other threads may still be timing while the process ends. Only its own thread

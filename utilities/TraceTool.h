@@ -108,7 +108,8 @@ public:
     void log(const char* text);
 
 private:
-    int m_file;
+    zemString m_filepath;
+    int m_logger;  ///< a descriptor, as no stream refuses links and FIFOs
 };
 
 /// Writes its lines to a file of its own, "/tmp/CIMTest-" and the id of the thread that makes it.

@@ -22,6 +22,7 @@ else()
   set(zem_system_cmpi ${CMPI_LIBRARY})
   get_filename_component(zem_cmpi_libdir ${CMPI_LIBRARY} DIRECTORY)
   set(zem_pc_cmpi_libs "-L${zem_cmpi_libdir} -lcmpiCppImpl")
+  set(zem_cmpi_run_path ":${zem_cmpi_libdir}")
   get_target_property(zem_system_cmpi_definitions cmpi::headers INTERFACE_COMPILE_DEFINITIONS)
   list(TRANSFORM zem_system_cmpi_definitions PREPEND -D OUTPUT_VARIABLE zem_pc_cmpi_cflags)
   list(JOIN zem_pc_cmpi_cflags " " zem_pc_cmpi_cflags)
@@ -35,6 +36,12 @@ install(TARGETS cimom appliance appliance_tools RUNTIME DESTINATION ${CMAKE_INST
 # A CIM server looks for providers among the libraries, and so does cimom, wherever the registration
 # lies.
 install(TARGETS zemproviders LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})
+list(JOIN CMAKE_INSTALL_RPATH ":" zem_runpath)
+string(APPEND zem_runpath "${zem_cmpi_run_path}")
+install(CODE "get_filename_component(libdir \"${CMAKE_INSTALL_LIBDIR}\" ABSOLUTE
+    BASE_DIR \"\${CMAKE_INSTALL_PREFIX}\")
+  file(RPATH_SET FILE \"\$ENV{DESTDIR}\${libdir}/libzemproviders.so\"
+    NEW_RPATH [[${zem_runpath}]])")
 install(FILES ${CMAKE_SOURCE_DIR}/providers/zemproviders.json
   DESTINATION ${CMAKE_INSTALL_DATADIR}/zemutilities)
 install(DIRECTORY ${CMAKE_SOURCE_DIR}/providers/mof ${CMAKE_SOURCE_DIR}/providers/messages

@@ -108,7 +108,7 @@ std::vector<Target> Server::Impl::associationTargets(const Request& request, con
     } else {
         for (const Route& route : routes)
             if (route.serves(path.nameSpace, kAssociation) &&
-                (broker.lean() || mayHold(route.className, path.className)))
+                mayHold(route.className, path.className))
                 targets.push_back({route.provider, route.className});
     }
     if (!broker.lean()) return targets;
@@ -123,6 +123,7 @@ bool Server::Impl::mayHold(const std::string& association, const std::string& cl
     const ClassRepository* classes = broker.classes();
     const CimClass* cls = classes ? classes->findClass(association) : nullptr;
     if (!cls) return true;
+    if (broker.lean()) return cls->isAssociation;
     return std::any_of(cls->properties.begin(), cls->properties.end(), [&](const auto& end) {
         return end->type == CMPI_ref && (classes->isA(className, end->referenceClass) ||
                                          classes->isA(end->referenceClass, className));

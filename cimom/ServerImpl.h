@@ -123,6 +123,7 @@ public:
     std::map<std::pair<Provider*, std::string>, int> activeFilters;  // empty class: all of them
 
 private:
+    /// Whether an association may hold a class, for all that the broker looks at.
     bool mayHold(const std::string& association, const std::string& className) const;
     Provider* routeOf(const std::string& className, const std::string& nameSpace,
                       Interface bit) const;

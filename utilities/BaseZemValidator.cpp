@@ -93,7 +93,9 @@ CmpiData zemBaseZemValidator::getInstanceProperty(const CmpiInstance& instance, 
     try {
         value = instance.getProperty(name);
     } catch (const CmpiStatus& status) {
-        if (status.rc() == CMPI_RC_ERR_NO_SUCH_PROPERTY) return CmpiData();
+        // Small servers call it not found, which not every binding takes for an answer.
+        if (status.rc() == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc() == CMPI_RC_ERR_NOT_FOUND)
+            return CmpiData();
         const zemString className = zemClassOf(instance);
         PROV_TRACE_STRING(4, "Internal error.Get property:\"%s\" of %s failed. CMPI STATUS:%s  %s",
                           name, Text(className), cmpiRcToString(status.rc()),

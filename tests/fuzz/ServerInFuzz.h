@@ -9,7 +9,9 @@ class FuzzProvider : public zemBaseProvider {
 public:
     FuzzProvider(CMPIBroker* mb, CMPIContext* ctx)
         : CmpiBaseMI(CmpiBroker(mb), CmpiContext(ctx)),
-          zemBaseProvider(CmpiBroker(mb), CmpiContext(ctx), "Fuzz") {}
+          zemBaseProvider(CmpiBroker(mb), CmpiContext(ctx), "Fuzz") {
+        setProviderBase(nullptr);  // some bindings know no broker before
+    }
     const char* getMessageBundlePath() override { return ""; }
 };
 

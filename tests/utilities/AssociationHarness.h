@@ -261,9 +261,10 @@ class World {
 public:
     explicit World(cimom::Character character = cimom::Character::Full)
         : server({character, "", {}, classes()}), scope(reset(server)) {
+        makeKnown(server.broker());
         server.registerProvider("Objects",
                                 {"Test_System", "Test_BigSystem", "Test_Disk", "Test_Port"},
-                                FactoriesOf<Objects>::all());
+                                {FactoriesOf<Objects>::all().instance});
         server.registerProvider("UnderTest", {"Test_Link"}, FactoriesOf<Provider>::all());
     }
     ~World() { EXPECT_EQ(0U, server.staleUses()); }

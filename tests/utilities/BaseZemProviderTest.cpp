@@ -68,7 +68,10 @@ TEST_P(BaseZemProvider, ReadsPropertiesByType) {
         rc->rc = CMPI_RC_ERR_ACCESS_DENIED;
         return CMPIData{};
     };
-    table.getObjectPath = nullptr;
+    table.getObjectPath = [](const CMPIInstance*, CMPIStatus* rc) -> CMPIObjectPath* {
+        rc->rc = CMPI_RC_ERR_NOT_SUPPORTED;
+        return nullptr;
+    };
     locked->ft = &table;
     EXPECT_EQ(
         "6/Get Property:\"Name\" of  failed. Name",

@@ -4,6 +4,7 @@
 #include <typeinfo>
 
 #include "BaseProviderManager.h"
+#include "CmpiMethodMI.h"
 #include "Server.h"
 
 /// A handle class of the binding over a handle of the server, which else the binding alone makes.
@@ -12,6 +13,13 @@ struct FromServer : Wrapper {
     template <class Handle>
     explicit FromServer(Handle* handle) : Wrapper(handle) {}
 };
+
+/// Tells a binding that knows one broker in a process, from the first provider of a library, which
+/// one is meant: tests have one server after the other.
+inline void makeKnown(CMPIBroker* broker) {
+    CmpiMethodMI(CmpiBroker(broker), CmpiContext(static_cast<CMPIContext*>(nullptr)))
+        .setProviderBase(nullptr);
+}
 
 /// One object for all kinds, made when the first is asked for.
 template <class Provider>

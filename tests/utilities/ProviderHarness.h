@@ -132,6 +132,7 @@ public:
         : server({character, messageFolder, {}, classes()}), scope(server, request) {
         script = Script();
         CMPIBroker* mb = server.broker();
+        makeKnown(mb);
         instance = M::getInstanceMI(mb, ctx(), "TestProvider", nullptr, create);
         association = M::getAssociationMI(mb, ctx(), "TestProvider", nullptr, create);
         method = M::getMethodMI(mb, ctx(), "TestProvider", nullptr, create);

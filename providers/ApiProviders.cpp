@@ -7,6 +7,7 @@
 #include <strings.h>
 
 #include <cstdlib>
+#include <memory>
 #include <string>
 
 #include "BaseZemInstanceProvider.h"
@@ -138,14 +139,15 @@ protected:
     void enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
                            zemDynamicArray<CmpiObjectPath>& out, const CmpiObjectPath&) override {
         for (apiProp& system : all(context))
-            out.addElement(new CmpiObjectPath(systemPath(path, m_system.name, nameOf(system))));
+            out.addElement(
+                std::make_unique<CmpiObjectPath>(systemPath(path, m_system.name, nameOf(system))));
     }
 
     void enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                        const char** properties, zemDynamicArray<CmpiInstance>& out,
                        const CmpiObjectPath&) override {
         for (apiProp& system : all(context))
-            out.addElement(new CmpiInstance(makeInstance(path, properties, system)));
+            out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, system)));
     }
 
     CMPIBoolean isValidInstanceClass(const char* className) override {

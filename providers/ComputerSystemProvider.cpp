@@ -124,8 +124,8 @@ void ComputerSystemProvider::populateEssentialKeys(const char*, CmpiArray& keys)
 void ComputerSystemProvider::populateMethodArgs(const char*, zemDynamicArray<zemString>& args,
                                                 const char* method) {
     if (strcasecmp(method, kStateChange) != 0) return;
-    args.addElement(new zemString("RequestedState"));
-    args.addElement(new zemString("TimeoutPeriod"));
+    args.addElement(std::make_unique<zemString>("RequestedState"));
+    args.addElement(std::make_unique<zemString>("TimeoutPeriod"));
 }
 
 bool ComputerSystemProvider::isChangeable(const char*) const { return false; }

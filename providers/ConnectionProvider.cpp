@@ -1,5 +1,7 @@
 #include "ConnectionProvider.h"
 
+#include <memory>
+
 #include "PropertyRows.h"
 #include "ProviderFactories.h"
 #include "QylinkCmdCaller.h"
@@ -86,7 +88,7 @@ void ConnectionProvider::enumInstanceNames(const CmpiContext& context, const Cmp
     static const char* justTheKey[] = {"InstanceID", nullptr};
     const zemRecordSetsType links = readLinks(context, justTheKey, nullptr);
     for (int i = 0; i < links.size(); ++i)
-        out.addElement(new CmpiObjectPath(connectionPath(path, idOf(*links[i]))));
+        out.addElement(std::make_unique<CmpiObjectPath>(connectionPath(path, idOf(*links[i]))));
 }
 
 void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
@@ -94,7 +96,7 @@ void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObj
                                        const CmpiObjectPath&) {
     const zemRecordSetsType links = readLinks(context, properties, nullptr);
     for (int i = 0; i < links.size(); ++i)
-        out.addElement(new CmpiInstance(makeInstance(path, properties, *links[i])));
+        out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, *links[i])));
 }
 
 CMPIBoolean ConnectionProvider::isValidInstanceClass(const char* className) {

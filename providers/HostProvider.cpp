@@ -3,6 +3,8 @@
 /// The static method FindHost answers the path of the host that users know by a name.
 #include <strings.h>
 
+#include <memory>
+
 #include "ComputerSystemProvider.h"
 #include "ProviderFactories.h"
 
@@ -80,7 +82,8 @@ protected:
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {
         ComputerSystemProvider::populateMethodArgs(className, args, method);
-        if (strcasecmp(method, kFindHost) == 0) args.addElement(new zemString("ElementName"));
+        if (strcasecmp(method, kFindHost) == 0)
+            args.addElement(std::make_unique<zemString>("ElementName"));
     }
 
 private:

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <memory>
 
 #include "EdpowerCaller.h"
 #include "EdsuspCaller.h"
@@ -120,7 +121,7 @@ void PartitionProvider::addCreationPairs(const CmpiInstance& instance, const Cmp
             continue;
         }
         const std::string text = toolText(row->kind, value);
-        pairs.addElement(new tagAttributePair{row->attribute, text.c_str()});
+        pairs.addElement(std::make_unique<tagAttributePair>(row->attribute, text.c_str()));
     }
 }
 
@@ -142,7 +143,7 @@ void PartitionProvider::performCreateInstance(const CmpiContext& context, CmpiRe
                 "PartitionProvider", "performCreateInstance",
                 ("There is a partition " + name + " already.").c_str());
         });
-        pairs.addElement(new tagAttributePair{New::ATTR_LPAR_ID, key.id.c_str()});
+        pairs.addElement(std::make_unique<tagAttributePair>(New::ATTR_LPAR_ID, key.id.c_str()));
     }
     addCreationPairs(instance, path, pairs);
     zemHostSystem(key.host.c_str(), client.user, client.locale).createVirtualSystem(pairs);

@@ -211,7 +211,7 @@ zemDynamicArray<zemAssociationData>* zemAssociationProvider::getAssoDataSet(
     for (int i = 0; i < m_assoData.size(); ++i) {
         const zemAssociationData* const row = m_assoData[i];
         if (row != nullptr && zemString::equalsIgnoreCase(row->m_assocClassName, name))
-            set->addElement(new zemAssociationData(*row));
+            set->addElement(std::make_unique<zemAssociationData>(*row));
     }
     return set.release();
 }

@@ -7,6 +7,7 @@
 #include <cstdio>
 #include <cstring>
 #include <ctime>
+#include <memory>
 #include <string>
 
 #include "BaseProvider.h"
@@ -385,7 +386,7 @@ zemDynamicArray<zemString> zemBaseProvider::convertStringArray(const CmpiArray& 
     for (CMPICount i = 0; i < strings.size(); ++i) {
         zemString text;
         zemReadText(strings[i].getData(), text);
-        texts.addElement(new zemString(text));
+        texts.addElement(std::make_unique<zemString>(text));
     }
     return texts;
 }

@@ -577,7 +577,8 @@ void zemEnhanceBaseZemMultiNtoNAssociationProvider::setValidAssociationIndexPair
     const PathsByKey& hash, IndexPairs& pairs, void* addInfo) {
     for (const int j : hash.getElement(getObjectPathHashKeyString(leftCop, true)))
         if (isValidateAssociationPlus(ctx, leftCop, *rightCops[j], addInfo))
-            pairs.addElement(new objectPathIndexPair{leftIndex, j});
+            pairs.addElement(
+                std::make_unique<objectPathIndexPair>(objectPathIndexPair{leftIndex, j}));
 }
 
 std::set<int> zemEnhanceBaseZemMultiNtoNAssociationProvider::getValidIndexSet(

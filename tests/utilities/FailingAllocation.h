@@ -37,6 +37,13 @@ private:
 
 void* operator new(std::size_t size) { return FailingAllocation::allocate(size); }
 void* operator new[](std::size_t size) { return FailingAllocation::allocate(size); }
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    try {
+        return FailingAllocation::allocate(size);
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
 void operator delete(void* memory) noexcept { FailingAllocation::release(memory); }
 void operator delete[](void* memory) noexcept { FailingAllocation::release(memory); }
 void operator delete(void* memory, std::size_t) noexcept { FailingAllocation::release(memory); }

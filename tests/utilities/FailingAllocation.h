@@ -3,6 +3,7 @@
 #pragma once
 
 #include <atomic>
+#include <cstdint>
 #include <cstdlib>
 #include <new>
 
@@ -17,8 +18,11 @@ public:
     /// How many allocations of the program have not been given back.
     static long live() { return s_live; }
 
+    /// The size beyond which allocations of this thread fail.
+    inline static thread_local std::size_t s_most = SIZE_MAX;
+
     static void* allocate(std::size_t size) {
-        if (s_left != kNone && s_left-- == 0) throw std::bad_alloc();
+        if (size > s_most || (s_left != kNone && s_left-- == 0)) throw std::bad_alloc();
         void* const memory = std::malloc(size != 0 ? size : 1);
         if (memory == nullptr) throw std::bad_alloc();
         ++s_live;

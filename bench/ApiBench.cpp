@@ -74,7 +74,9 @@ int walkRows(sqlite3* database, const char* kind, Take take) {
 void copyValue(std::string_view attributes, std::string_view line,
                std::vector<std::string>& values) {
     const std::size_t at = attributes.find(line);
-    if (at == std::string_view::npos) return;
+    if (at == std::string_view::npos) {
+        return;
+    }
     const std::size_t begin = at + line.size();
     values.emplace_back(attributes.substr(begin, attributes.find('\n', begin) - begin));
 }
@@ -99,7 +101,9 @@ void SqliteWalkLpars(benchmark::State& state) {
         walkRows(database, "profile",
                  [&](std::string_view attributes) { copyValue(attributes, "\nname=", values); });
         sqlite3_close(database);
-        if (rows != state.range(0)) state.SkipWithError("not the rows");
+        if (rows != state.range(0)) {
+            state.SkipWithError("not the rows");
+        }
         benchmark::DoNotOptimize(values);
     }
     state.SetItemsProcessed(state.iterations() * state.range(0));
@@ -125,7 +129,9 @@ void GetLparObj(benchmark::State& state) {
                    zemAutoReleaseApiProp(zemApiCaller().getAllCecs("", 1)).get() + 1, "Name"));
     for (auto _ : state) {
         const zemAutoReleaseApiProp result(zemApiCaller().getLparObj("", key.c_str(), 1));
-        if (zemApiCaller::getReturnCode(result.get()) != 0) state.SkipWithError("no result");
+        if (zemApiCaller::getReturnCode(result.get()) != 0) {
+            state.SkipWithError("no result");
+        }
     }
 }
 
@@ -144,7 +150,9 @@ Properties properties(std::int64_t count) {
 template <typename Find>
 void lookUp(benchmark::State& state, const Properties& all, Find find) {
     for (auto _ : state) {
-        for (const auto& property : all) benchmark::DoNotOptimize(find(property.first));
+        for (const auto& property : all) {
+            benchmark::DoNotOptimize(find(property.first));
+        }
     }
     state.SetItemsProcessed(state.iterations() * state.range(0));
 }
@@ -166,7 +174,9 @@ void LookUpInVector(benchmark::State& state) {
     const Properties all = properties(state.range(0));
     lookUp(state, all, [&](const std::string& key) {
         for (const auto& property : all) {
-            if (property.first == key) return property.second;
+            if (property.first == key) {
+                return property.second;
+            }
         }
         return std::string();
     });

@@ -66,7 +66,9 @@ public:
     const char* getMessageBundlePath() override { return ""; }
     int getInstance(const CmpiContext&, const CmpiObjectPath& cop, const char**,
                     CmpiInstance& out) override {
-        for (const char* key : {"Host", "Name"}) out.setProperty(key, cop.getKey(key));
+        for (const char* key : {"Host", "Name"}) {
+            out.setProperty(key, cop.getKey(key));
+        }
         return 0;
     }
     void enumInstanceNames(const CmpiContext&, const CmpiObjectPath& cop,
@@ -134,10 +136,12 @@ class Rows : public zemAssociationProvider {
 public:
     Rows(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx), zemAssociationProvider(mb, ctx, name, OP_ALLOps) {
-        for (const std::string& left : kLefts)
-            for (const std::string& right : kRights)
+        for (const std::string& left : kLefts) {
+            for (const std::string& right : kRights) {
                 addAssoData(new zemAssociationData("Bench_Link", "", left.c_str(), "Left", "",
                                                    right.c_str(), "Right", ""));
+            }
+        }
     }
     bool isValidateAssociation(const CmpiContext&, const zemAssociationData&,
                                const CmpiObjectPath& cop1, const CmpiObjectPath& cop2) override {
@@ -159,8 +163,11 @@ public:
 private:
     static std::string allPairs() {
         std::string block;
-        for (const std::string& left : kLefts)
-            for (const std::string& right : kRights) (block += left + '\0') += right + '\0';
+        for (const std::string& left : kLefts) {
+            for (const std::string& right : kRights) {
+                (block += left + '\0') += right + '\0';
+            }
+        }
         return block;
     }
 };
@@ -207,7 +214,9 @@ public:
             return;
         }
         enumerations = 0;
-        for (auto _ : state) benchmark::DoNotOptimize(operation());
+        for (auto _ : state) {
+            benchmark::DoNotOptimize(operation());
+        }
         state.counters["broker_calls"] = benchmark::Counter(static_cast<double>(enumerations),
                                                             benchmark::Counter::kAvgIterations);
     }
@@ -269,7 +278,9 @@ void plainLoop(benchmark::State& state) {
         cimom::Reply reply;
         for (long i = 0; i < objects; ++i) {
             cimom::ObjectPath target = element(kRights[0], i);
-            if (target.keys.find("Host")->text() == host) reply.paths.push_back(std::move(target));
+            if (target.keys.find("Host")->text() == host) {
+                reply.paths.push_back(std::move(target));
+            }
         }
         benchmark::DoNotOptimize(reply);
     }

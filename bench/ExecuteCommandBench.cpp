@@ -25,7 +25,9 @@ void run(benchmark::State& state, const char* user) {
         zemPropertiesHelper::executeCommand("/bin/true", out, err, &exitCode, user, 0, nullptr,
                                             true);
     }
-    if (exitCode != 0) state.SkipWithError("did not run");
+    if (exitCode != 0) {
+        state.SkipWithError("did not run");
+    }
 }
 
 /// Makes this process as large as a server, each page its own.
@@ -48,7 +50,9 @@ void ExecuteCommandInServerAsUser(benchmark::State& state) {
 
 void SpawnReadWait(benchmark::State& state) {
     const char* const argv[] = {"/bin/true", nullptr};
-    for (auto _ : state) benchmark::DoNotOptimize(spawnReadWait(argv));
+    for (auto _ : state) {
+        benchmark::DoNotOptimize(spawnReadWait(argv));
+    }
 }
 
 BENCHMARK(ExecuteCommand)->UseRealTime()->Unit(benchmark::kMillisecond);

@@ -57,7 +57,9 @@ BENCHMARK(Worker_EnumInstanceNames)->Unit(benchmark::kMicrosecond);
 
 // What the timing trace costs a tool's run or an operation while nobody has switched it on.
 void TimingOff_OneOperation(benchmark::State& state) {
-    if (CTimeLogerManager::getInstance()->isEnabled()) state.SkipWithError("the trace is on");
+    if (CTimeLogerManager::getInstance()->isEnabled()) {
+        state.SkipWithError("the trace is on");
+    }
     for (auto _ : state) {
         CTimeLoger* timing = CTimeLogerManager::getInstance()->getLogger("enumInstanceNames");
         timing->begin("Bench_Disk");

@@ -16,7 +16,9 @@ public:
         const std::int64_t hosts = lpars < kLparsPerHost ? 1 : lpars / kLparsPerHost;
         const auto outcome = run("appliance generate --hosts " + std::to_string(hosts) +
                                  " --lpars " + std::to_string(lpars / hosts));
-        if (outcome.exit != 0) throw std::runtime_error(outcome.err);
+        if (outcome.exit != 0) {
+            throw std::runtime_error(outcome.err);
+        }
     }
 };
 

@@ -31,12 +31,16 @@ public:
     CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
                                     const char**) override {
         const long number = std::atol(path.getKey("Name").getString().charPtr());
-        if (number >= instancesServed) throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
+        if (number >= instancesServed) {
+            throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
+        }
         return part(path, number);
     }
     void performEnumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
                               const char**) override {
-        for (long i = 0; i < instancesServed; ++i) result.returnData(part(path, i));
+        for (long i = 0; i < instancesServed; ++i) {
+            result.returnData(part(path, i));
+        }
     }
 
 private:
@@ -45,8 +49,9 @@ private:
         path.setKey("Name", CmpiData(std::to_string(number).c_str()));
         CmpiInstance instance(path);
         instance.setProperty("Name", CmpiData(std::to_string(number).c_str()));
-        for (const char* property : {"A", "B", "C", "D"})
+        for (const char* property : {"A", "B", "C", "D"}) {
             instance.setProperty(property, CmpiData("some text"));
+        }
         CmpiData state;
         state.setUint16(2);
         instance.setProperty("State", state);
@@ -85,12 +90,15 @@ void perInstance(benchmark::State& state, long count) {
 void Broker_GetInstance(benchmark::State& state) {
     Broker broker;
     instancesServed = state.range(0);
-    for (auto _ : state)
+    for (auto _ : state) {
         for (long i = 0; i < state.range(0); ++i) {
             const cimom::Reply reply = broker.server.getInstance(broker.request, partPath(i));
-            if (!reply.ok()) state.SkipWithError("wrong answer");
+            if (!reply.ok()) {
+                state.SkipWithError("wrong answer");
+            }
             benchmark::DoNotOptimize(reply);
         }
+    }
     perInstance(state, state.range(0));
 }
 BENCHMARK(Broker_GetInstance)->Arg(1)->Arg(100)->Arg(10000)->Unit(benchmark::kMicrosecond);
@@ -98,9 +106,10 @@ BENCHMARK(Broker_GetInstance)->Arg(1)->Arg(100)->Arg(10000)->Unit(benchmark::kMi
 void Broker_EnumInstances(benchmark::State& state) {
     Broker broker;
     instancesServed = state.range(0);
-    for (auto _ : state)
+    for (auto _ : state) {
         benchmark::DoNotOptimize(
             broker.server.enumInstances(broker.request, {"root/cimv2", kClass}));
+    }
     perInstance(state, state.range(0));
 }
 BENCHMARK(Broker_EnumInstances)->Arg(1)->Arg(100)->Arg(10000)->Unit(benchmark::kMicrosecond);
@@ -111,8 +120,9 @@ void Plain_EnumInstances(benchmark::State& state) {
         for (long i = 0; i < state.range(0); ++i) {
             cimom::Instance part(partPath(i));
             part.properties.set("Name", std::to_string(i));
-            for (const char* property : {"A", "B", "C", "D"})
+            for (const char* property : {"A", "B", "C", "D"}) {
                 part.properties.set(property, "some text");
+            }
             part.properties.set("State", static_cast<std::uint16_t>(2));
             reply.instances.push_back(std::move(part));
         }

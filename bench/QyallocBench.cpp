@@ -58,7 +58,9 @@ void Qyalloc(benchmark::State& state) {
                                                                               nullptr);
         });
         state.SetIterationTime(whole);
-        if (records.size() != state.range(0)) state.SkipWithError("not the records");
+        if (records.size() != state.range(0)) {
+            state.SkipWithError("not the records");
+        }
     }
 }
 
@@ -89,7 +91,9 @@ void QyallocSplit(benchmark::State& state) {
         timed(ours, [&] {
             return zemParseRecords(std::string_view(output), nullptr, kAttributes, records);
         });
-        if (records.size() != state.range(0)) state.SkipWithError("not the records");
+        if (records.size() != state.range(0)) {
+            state.SkipWithError("not the records");
+        }
         state.SetIterationTime(child + ours);
         oursInAll += ours;
         wholeInAll += child + ours;

@@ -12,7 +12,9 @@
 /// @return what it wrote to standard output; empty also when it could not be started
 inline std::string spawnReadWait(const char* const* argv) {
     int fds[2];
-    if (pipe(fds) != 0) return {};
+    if (pipe(fds) != 0) {
+        return {};
+    }
     posix_spawn_file_actions_t actions;
     posix_spawn_file_actions_init(&actions);
     posix_spawn_file_actions_addclose(&actions, fds[0]);
@@ -28,7 +30,9 @@ inline std::string spawnReadWait(const char* const* argv) {
         output.append(buffer, static_cast<std::size_t>(n));
     }
     close(fds[0]);
-    if (error == 0) waitpid(pid, nullptr, 0);
+    if (error == 0) {
+        waitpid(pid, nullptr, 0);
+    }
     return output;
 }
 

@@ -14,13 +14,17 @@ namespace {
 
 std::vector<std::string> names(int64_t count) {
     std::vector<std::string> list;
-    for (int64_t i = 0; i < count; ++i) list.push_back("Property" + std::to_string(i));
+    for (int64_t i = 0; i < count; ++i) {
+        list.push_back("Property" + std::to_string(i));
+    }
     return list;
 }
 
 cimom::Options withClassOf(const std::vector<std::string>& properties) {
     std::string mof = "class Bench_Disk {\n";
-    for (const std::string& name : properties) mof += "    string " + name + ";\n";
+    for (const std::string& name : properties) {
+        mof += "    string " + name + ";\n";
+    }
     mof += "};\n";
     cimom::Options options;
     options.classes =
@@ -32,7 +36,9 @@ void ValidateKeys(benchmark::State& state) {
     const auto keys = names(state.range(0));
     ProviderInBench bench(withClassOf(keys));
     cimom::ObjectPath path("root/cimv2", "Bench_Disk");
-    for (const std::string& key : keys) path.keys.set(key, cimom::Value("value of " + key));
+    for (const std::string& key : keys) {
+        path.keys.set(key, cimom::Value("value of " + key));
+    }
     for (auto _ : state) {
         cimom::RequestScope scope(bench.server);
         bench.provider().validateKeys(CmpiObjectPath(scope.wrap(path)),
@@ -45,7 +51,9 @@ void ValidateProperties(benchmark::State& state) {
     const auto properties = names(state.range(0));
     ProviderInBench bench(withClassOf(properties));
     std::vector<const char*> list;
-    for (const std::string& name : properties) list.push_back(name.c_str());
+    for (const std::string& name : properties) {
+        list.push_back(name.c_str());
+    }
     list.push_back(nullptr);
     for (auto _ : state) {
         cimom::RequestScope scope(bench.server);
@@ -61,7 +69,9 @@ void PlainKeys(benchmark::State& state) {
     for (auto _ : state) {
         int equal = 0;
         for (const std::string& x : a) {
-            for (const std::string& y : b) equal += strcasecmp(x.c_str(), y.c_str()) == 0;
+            for (const std::string& y : b) {
+                equal += strcasecmp(x.c_str(), y.c_str()) == 0;
+            }
         }
         benchmark::DoNotOptimize(equal);
     }

@@ -65,11 +65,15 @@ Broker::Broker(Server& server, const Options& options)
 }
 
 Broker::~Broker() {
-    for (void* block : m_blocks) std::free(block);
+    for (void* block : m_blocks) {
+        std::free(block);
+    }
 }
 
 Broker& Broker::of(const CMPIBroker* face) {
-    if (!face || !face->hdl) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "no broker");
+    if (!face || !face->hdl) {
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "no broker");
+    }
     return *static_cast<Broker*>(face->hdl);
 }
 
@@ -88,31 +92,44 @@ void Broker::log(const LogLine& line) {
         std::lock_guard<std::mutex> lock(m_hookMutex);
         hook = m_hook;
     }
-    if (hook) hook(line);
+    if (hook) {
+        hook(line);
+    }
 }
 
 void* Broker::allocate(void* old, std::size_t size, bool zeroed) {
     std::lock_guard<std::mutex> lock(m_blocksMutex);
-    if (old && m_blocks.count(old) == 0) return nullptr;
+    if (old && m_blocks.count(old) == 0) {
+        return nullptr;
+    }
     void* block = zeroed ? std::calloc(1, size) : std::realloc(old, size ? size : 1);
-    if (!block) return nullptr;
-    if (old) m_blocks.erase(old);
+    if (!block) {
+        return nullptr;
+    }
+    if (old) {
+        m_blocks.erase(old);
+    }
     m_blocks.insert(block);
     return block;
 }
 
 void Broker::freeBlock(void* block) {
-    if (!block) return;
+    if (!block) {
+        return;
+    }
     std::lock_guard<std::mutex> lock(m_blocksMutex);
-    if (m_blocks.erase(block) != 0)
+    if (m_blocks.erase(block) != 0) {
         std::free(block);
-    else
+    } else {
         countStaleUse();
+    }
 }
 
 std::vector<std::string> namesIn(const char** names) {
     const char** end = names;
-    while (*end) ++end;
+    while (*end) {
+        ++end;
+    }
     return {names, end};
 }
 
@@ -127,7 +144,9 @@ Activation::~Activation() { innermost = m_outer; }
 
 Activation* Activation::current(const Broker& broker) {
     Activation* at = innermost;
-    while (at && &at->m_pool.broker() != &broker) at = at->m_outer;
+    while (at && &at->m_pool.broker() != &broker) {
+        at = at->m_outer;
+    }
     return at;
 }
 
@@ -135,14 +154,19 @@ Activation* Activation::current(const Broker& broker) {
 
 NamedValues contextOf(const Request& request, bool lean) {
     NamedValues entries;
-    if (request.user)
+    if (request.user) {
         entries.set(CMPIPrincipal, *request.user);
-    else
+    } else {
         entries.set(CMPIPrincipal, lean ? Value::null(CMPI_string) : Value(""));
-    if (!request.language.empty()) entries.set(CMPIAcceptLanguage, request.language);
+    }
+    if (!request.language.empty()) {
+        entries.set(CMPIAcceptLanguage, request.language);
+    }
     entries.set(CMPIInitNameSpace, request.nameSpace);
     entries.set(CMPIInvocationFlags, Value(static_cast<std::uint32_t>(request.flags)));
-    for (const auto& entry : request.context) entries.set(entry.name, entry.value);
+    for (const auto& entry : request.context) {
+        entries.set(entry.name, entry.value);
+    }
     return entries;
 }
 
@@ -151,7 +175,9 @@ Request requestOf(const NamedValues& contextEntries) {
     for (const auto& [name, value] : contextEntries) {
         const bool isText = value.type() == CMPI_string && !value.isNull();
         if (sameName(name, CMPIPrincipal) && value.type() == CMPI_string) {
-            if (isText) request.user = value.text();
+            if (isText) {
+                request.user = value.text();
+            }
         } else if (sameName(name, CMPIAcceptLanguage) && isText) {
             request.language = value.text();
         } else if (sameName(name, CMPIInitNameSpace) && isText) {

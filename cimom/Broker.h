@@ -136,7 +136,9 @@ void endTableAfter(T& table, M T::*last) {
 template <class T, class M, class... Entries>
 T brokerTable(bool lean, int leanVersion, M T::*leanEnd, Entries... entries) {
     T table = {lean ? leanVersion : CMPIVersion200, entries...};
-    if (lean) endTableAfter(table, leanEnd);
+    if (lean) {
+        endTableAfter(table, leanEnd);
+    }
     return table;
 }
 

@@ -26,8 +26,9 @@ CMPIString* newString(Broker& broker, const char* text) {
 }
 CMPIArray* newArray(Broker& broker, CMPICount size, CMPIType type) {
     const Value null = readValue(nullptr, type);
-    if (null.isArray() || null.type() == CMPI_null || !isValueType(null.type()))
+    if (null.isArray() || null.type() == CMPI_null || !isValueType(null.type())) {
         throw Failure(CMPI_RC_ERR_INVALID_DATA_TYPE, "type " + std::to_string(type));
+    }
     const CMPIType seen = broker.lean() || type != CMPI_chars ? null.type() : type;
     return make<CMPIArray>(broker, {seen, Value::Array(size, null)});
 }
@@ -37,8 +38,9 @@ CMPIDateTime* newDateTimeFromBinary(Broker& broker, CMPIUint64 micros, CMPIBoole
 }
 CMPIDateTime* newDateTimeFromChars(Broker& broker, const char* text) {
     DateTime when;
-    if (!DateTime::parse(textOf(text), when))
+    if (!DateTime::parse(textOf(text), when)) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no date-time: " + textOf(text));
+    }
     return make<CMPIDateTime>(broker, when);
 }
 CMPISelectExp* newSelectExp(Broker& broker, const char* text, const char* language,
@@ -63,11 +65,18 @@ CMPIError* newError(Broker& broker, const char* owner, const char* messageId, co
 CMPIBoolean classPathIsA(Broker& broker, const CMPIObjectPath* path, const char* className) {
     const std::string& mine = bodyOf(path).className;
     const std::string other = textOf(className);
-    if (other.empty()) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no class name");
-    if (sameName(mine, other)) return 1;
-    if (!broker.classes()) return 0;
-    if (!broker.lean() && !broker.classes()->findClass(mine))
+    if (other.empty()) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no class name");
+    }
+    if (sameName(mine, other)) {
+        return 1;
+    }
+    if (!broker.classes()) {
+        return 0;
+    }
+    if (!broker.lean() && !broker.classes()->findClass(mine)) {
         throw Failure(CMPI_RC_ERR_NOT_FOUND, "no class " + mine);
+    }
     return broker.classes()->isA(mine, other);
 }
 
@@ -79,7 +88,9 @@ constexpr const char* kObjectTypes[] = {
 static_assert(std::size(kObjectTypes) == kKindCount, "one name for each kind");
 
 Node& anyNode(const void* object) {
-    if (!object) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "no object");
+    if (!object) {
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "no object");
+    }
     Node& node = nodeAt(object);
     withKind(node.chunk->kind, [object](auto kind) {
         nodeOf(static_cast<const typename decltype(kind)::Face*>(object));
@@ -91,25 +102,27 @@ std::string describe(Node& node) {
     return withKind(node.chunk->kind, [&node](auto kind) -> std::string {
         using B = typename decltype(kind)::Body;
         const B& body = *static_cast<NodeOf<typename decltype(kind)::Face>&>(node).body;
-        if constexpr (std::is_same_v<B, StringBody>)
+        if constexpr (std::is_same_v<B, StringBody>) {
             return body.text;
-        else if constexpr (std::is_same_v<B, InstanceBody>)
+        } else if constexpr (std::is_same_v<B, InstanceBody>) {
             return printInstance(body.value);
-        else if constexpr (std::is_same_v<B, ObjectPath>)
+        } else if constexpr (std::is_same_v<B, ObjectPath>) {
             return printPath(body);
-        else if constexpr (std::is_same_v<B, DateTime>)
+        } else if constexpr (std::is_same_v<B, DateTime>) {
             return body.text();
-        else if constexpr (std::is_same_v<B, ArrayBody>)
+        } else if constexpr (std::is_same_v<B, ArrayBody>) {
             return printValue(Value::array(stringFor(body.elementType), body.elements));
-        else if constexpr (std::is_same_v<B, std::shared_ptr<const Query>>)
+        } else if constexpr (std::is_same_v<B, std::shared_ptr<const Query>>) {
             return body->text();
-        else if constexpr (std::is_same_v<B, NamedValues>) {
+        } else if constexpr (std::is_same_v<B, NamedValues>) {
             std::string out = "{";
-            for (const auto& [name, value] : body)
+            for (const auto& [name, value] : body) {
                 out += (out.size() > 1 ? ", " : "") + name + " = " + printValue(value);
+            }
             return out + "}";
-        } else
+        } else {
             return kObjectTypes[node.chunk->kind];
+        }
     });
 }
 
@@ -117,8 +130,9 @@ std::string describe(Node& node) {
 CMPIString* objectText(Broker& broker, const void* object) {
     Node& node = anyNode(object);
     const std::size_t kind = node.chunk->kind;
-    if (broker.lean() && kind != kindOf<CMPIObjectPath>() && kind != kindOf<CMPIInstance>())
+    if (broker.lean() && kind != kindOf<CMPIObjectPath>() && kind != kindOf<CMPIInstance>()) {
         throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return makeString(broker, describe(node));
 }
 const char* typeOfObject(const void* object) { return kObjectTypes[anyNode(object).chunk->kind]; }
@@ -159,8 +173,9 @@ std::string insertText(int type, std::va_list& list) {
 }
 
 std::vector<std::string> readInserts(CMPICount count, std::va_list& list) {
-    if (count > kMostInserts)
+    if (count > kMostInserts) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, std::to_string(count) + " inserts");
+    }
     std::vector<std::string> inserts;
     for (CMPICount i = 0; i < count; ++i) {
         const int type = va_arg(list, int);
@@ -172,7 +187,9 @@ std::vector<std::string> readInserts(CMPICount count, std::va_list& list) {
 // The languages of the request on this thread, or of the process where the request says so.
 std::vector<std::string> languagesOf(const Broker& broker) {
     Activation* activation = Activation::current(broker);
-    if (!activation) return {};
+    if (!activation) {
+        return {};
+    }
     const NamedValues& context = bodyOf(activation->context());
     const auto given = [&context](const char* name, CMPIType type) {
         const Value* value = context.find(name);
@@ -180,9 +197,13 @@ std::vector<std::string> languagesOf(const Broker& broker) {
     };
     const Value* local = given("UseProcessLocale", CMPI_boolean);
     if (local && local->boolean()) {
-        for (const char* variable : {"LC_ALL", "LC_MESSAGES", "LANG"})
-            if (const char* locale = std::getenv(variable))
-                if (*locale) return wantedLanguages(locale);
+        for (const char* variable : {"LC_ALL", "LC_MESSAGES", "LANG"}) {
+            if (const char* locale = std::getenv(variable)) {
+                if (*locale) {
+                    return wantedLanguages(locale);
+                }
+            }
+        }
         return {};
     }
     const Value* accepted = given(CMPIAcceptLanguage, CMPI_string);
@@ -190,13 +211,16 @@ std::vector<std::string> languagesOf(const Broker& broker) {
 }
 
 void openMessageFile(Broker& broker, const char* file, CMPIMsgFileHandle* handle) {
-    if (!handle) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no place for the handle");
+    if (!handle) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no place for the handle");
+    }
     *handle = nullptr;
     *handle = const_cast<MessageTexts*>(broker.messages().open(textOf(file), languagesOf(broker)));
 }
 void closeMessageFile(Broker& broker, CMPIMsgFileHandle handle) {
-    if (!broker.messages().close(static_cast<MessageStore::Handle>(handle)))
+    if (!broker.messages().close(static_cast<MessageStore::Handle>(handle))) {
         throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "message file not open");
+    }
 }
 
 CMPIString* message(const CMPIBroker* mb, const char* id, CMPIMsgFileHandle handle,
@@ -223,7 +247,9 @@ CMPIString* giveMessageBack(const CMPIBroker* mb, const char*, const char* text,
                             CMPICount, ...) {
     CMPIString* back =
         brokerEntry(mb, rc, [text](Broker& broker) { return newString(broker, text); });
-    if (back) setStatus(rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    if (back) {
+        setStatus(rc, CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return back;
 }
 // Without a bundle of its own, a text is looked up in the default one.
@@ -235,7 +261,9 @@ CMPIString* getMessage(const CMPIBroker* mb, const char* id, const char* text, C
     va_start(list, count);
     CMPIString* result = message(mb, id, handle, text, rc, count, list);
     va_end(list);
-    if (handle) brokerStatus(mb, [&](Broker& broker) { closeMessageFile(broker, handle); });
+    if (handle) {
+        brokerStatus(mb, [&](Broker& broker) { closeMessageFile(broker, handle); });
+    }
     return result;
 }
 
@@ -244,7 +272,9 @@ CMPIString* getMessage(const CMPIBroker* mb, const char* id, const char* text, C
 CMPIStatus log(const CMPIBroker* mb, LogLine::Kind kind, int level, const char* component,
                const char* text, const CMPIString* string) {
     return brokerStatus(mb, [=](Broker& broker) {
-        if (broker.lean()) throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+        if (broker.lean()) {
+            throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+        }
         broker.log(
             {kind, level, textOf(component), text || !string ? textOf(text) : bodyOf(string).text});
     });

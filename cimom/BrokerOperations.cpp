@@ -26,8 +26,9 @@ void attachThread(Broker& broker, Context context) {
     attachments.push_back(std::make_unique<Activation>(broker, bodyOf(context)));
 }
 void detachThread(Broker& broker, Context context) {
-    if (attachments.empty() || Activation::current(broker) != attachments.back().get())
+    if (attachments.empty() || Activation::current(broker) != attachments.back().get()) {
         throw Failure(CMPI_RC_ERR_FAILED, "the thread is not attached");
+    }
     nodeOf(context);
     attachments.pop_back();
     releaseObject(const_cast<CMPIContext*>(context));  // made by prepareAttachThread
@@ -37,14 +38,18 @@ void detachThread(Broker& broker, Context context) {
 
 Request requestIn(Context context, const char** properties = nullptr) {
     Request request = requestOf(bodyOf(context));
-    if (properties) request.properties = namesIn(properties);
+    if (properties) {
+        request.properties = namesIn(properties);
+    }
     return request;
 }
 
 /// What a provider is handed of a reply: nothing but its success, or an enumeration of a part.
 /// @throws Failure with what the operation answered
 Reply succeeded(Reply reply) {
-    if (!reply.ok()) throw Failure(reply.rc, reply.message);
+    if (!reply.ok()) {
+        throw Failure(reply.rc, reply.message);
+    }
     return reply;
 }
 template <class List>
@@ -55,13 +60,17 @@ CMPIEnumeration* enumerationOf(Broker& broker, const List& items) {
 /// An instance as it is to be, under the path given with it.
 Instance instanceAt(Path path, const CMPIInstance* instance) {
     Instance placed = bodyOf(instance).value;
-    if (path) placed.path = bodyOf(path);
+    if (path) {
+        placed.path = bodyOf(path);
+    }
     return placed;
 }
 
 void deliverIndication(Broker& broker, Context context, Text ns, const CMPIInstance* indication) {
     Request request = requestIn(context);
-    if (ns && *ns) request.nameSpace = ns;
+    if (ns && *ns) {
+        request.nameSpace = ns;
+    }
     succeeded(broker.server().deliver(request, bodyOf(indication).value));
 }
 
@@ -98,7 +107,9 @@ void deleteInstance(Broker& broker, Context context, Path path) {
 }
 CMPIEnumeration* execQuery(Broker& broker, Context context, Path path, Text query, Text language) {
     Request request = requestIn(context);
-    if (path) request.nameSpace = bodyOf(path).nameSpace;
+    if (path) {
+        request.nameSpace = bodyOf(path).nameSpace;
+    }
     const Reply reply =
         succeeded(broker.server().execQuery(request, textOf(query), textOf(language)));
     return enumerationOf(broker, reply.instances);
@@ -144,8 +155,11 @@ CMPIData invokeMethod(Broker& broker, Context context, Path path, Text method, c
                       CMPIArgs* out) {
     const Reply reply = succeeded(broker.server().invokeMethod(
         requestIn(context), bodyOf(path), textOf(method), in ? bodyOf(in) : NamedValues()));
-    if (out)
-        for (const auto& [name, value] : reply.out) bodyOf(out).set(name, value);
+    if (out) {
+        for (const auto& [name, value] : reply.out) {
+            bodyOf(out).set(name, value);
+        }
+    }
     return makeData(broker, reply.value());
 }
 void setProperty(Broker& broker, Context context, Path path, Text name, const CMPIValue* value,

@@ -26,8 +26,12 @@ pthread_cond_t* conditionOf(CMPI_COND_TYPE cond) { return static_cast<pthread_co
 char* resolveFileName(const char* name) { return strdup(libraryFileName(textOf(name)).c_str()); }
 CMPI_THREAD_TYPE newThread(CMPI_THREAD_RETURN (*start)(void*), void* parm, int detached) {
     pthread_t thread{};
-    if (pthread_create(&thread, nullptr, start, parm) != 0) return nullptr;
-    if (detached) pthread_detach(thread);
+    if (pthread_create(&thread, nullptr, start, parm) != 0) {
+        return nullptr;
+    }
+    if (detached) {
+        pthread_detach(thread);
+    }
     return reinterpret_cast<CMPI_THREAD_TYPE>(thread);  // NOLINT(performance-no-int-to-ptr)
 }
 int joinThread(CMPI_THREAD_TYPE thread, CMPI_THREAD_RETURN* answer) {
@@ -83,13 +87,16 @@ int signalCondition(CMPI_COND_TYPE condition) {
 
 CMPIGcStat* mark(Broker& broker) {
     Activation* activation = Activation::current(broker);
-    if (!activation) throw Failure(CMPI_RC_ERR_FAILED, "no request on this thread");
+    if (!activation) {
+        throw Failure(CMPI_RC_ERR_FAILED, "no request on this thread");
+    }
     return const_cast<void*>(activation->pool().mark());
 }
 void release(Broker& broker, const CMPIGcStat* level) {
     Activation* activation = Activation::current(broker);
-    if (!activation || !activation->pool().release(level))
+    if (!activation || !activation->pool().release(level)) {
         throw Failure(CMPI_RC_ERR_FAILED, "no such mark in the request of this thread");
+    }
 }
 
 void* allocate(const CMPIBroker* mb, void* old, std::size_t size, bool zeroed) {

@@ -32,17 +32,24 @@ public:
         : m_declarations(declarations), m_repository(repository) {}
 
     void run() {
-        for (const MofQualifierType& declared : m_declarations.qualifierTypes)
+        for (const MofQualifierType& declared : m_declarations.qualifierTypes) {
             linkQualifierType(declared);
+        }
         for (const MofClass& declared : m_declarations.classes) {
             auto [at, isNew] = m_declared.emplace(declared.name, &declared);
-            if (!isNew)
+            if (!isNew) {
                 fault(declared.place, "class " + in(declared.name) + " is declared already at " +
                                           placeText(at->second->place));
+            }
         }
-        for (const MofClass& declared : m_declarations.classes)
-            if (m_declared[declared.name] == &declared) linkWithSuperclasses(declared);
-        if (!m_faults.empty()) throw MofError(std::move(m_faults));
+        for (const MofClass& declared : m_declarations.classes) {
+            if (m_declared[declared.name] == &declared) {
+                linkWithSuperclasses(declared);
+            }
+        }
+        if (!m_faults.empty()) {
+            throw MofError(std::move(m_faults));
+        }
     }
 
 private:
@@ -50,7 +57,9 @@ private:
 
     void fault(const MofPlace& place, const std::string& text) {
         m_faults.push_back({*place.file, place.line, place.column, text});
-        if (m_faults.size() >= kMaxFaults) throw MofError(std::move(m_faults));
+        if (m_faults.size() >= kMaxFaults) {
+            throw MofError(std::move(m_faults));
+        }
     }
 
     static std::string placeText(const MofPlace& place) {
@@ -61,14 +70,19 @@ private:
 
     void linkQualifierType(const MofQualifierType& declared) {
         Value unused;  // a default is checked and has no further use
-        if (declared.defaultValue) convert(*declared.defaultValue, declared.type, unused);
-        if (!m_repository.m_qualifierTypes.add(std::make_shared<CimQualifierType>(declared)))
+        if (declared.defaultValue) {
+            convert(*declared.defaultValue, declared.type, unused);
+        }
+        if (!m_repository.m_qualifierTypes.add(std::make_shared<CimQualifierType>(declared))) {
             fault(declared.place, "qualifier " + in(declared.name) + " is declared already");
+        }
     }
 
     void convert(const MofInitializer& initializer, const CimType& type, Value& value) {
         std::string why = convertMofValue(initializer, type, value);
-        if (!why.empty()) fault(initializer.place, why);
+        if (!why.empty()) {
+            fault(initializer.place, why);
+        }
     }
 
     // Qualifiers declared on something and those that it takes over from @p base, if any.
@@ -77,20 +91,26 @@ private:
         NamedList<CimQualifier> all;
         for (const MofQualifier& one : declared) {
             auto qualifier = linkQualifier(one, scope);
-            if (!qualifier) continue;
+            if (!qualifier) {
+                continue;
+            }
             const CimQualifier* inherited = base ? base->qualifiers.find(one.name) : nullptr;
             if (inherited &&
                 (inherited->flavors & (DisableOverride | Restricted)) == DisableOverride &&
-                inherited->value != qualifier->value)
+                inherited->value != qualifier->value) {
                 fault(one.place, "qualifier " + in(one.name) +
                                      " has another value in the superclass and cannot be changed");
-            if (!all.add(std::move(qualifier)))
+            }
+            if (!all.add(std::move(qualifier))) {
                 fault(one.place, "qualifier " + in(one.name) + " is given twice");
+            }
         }
         static const NamedList<CimQualifier> none;
         for (const auto& inherited : base ? base->qualifiers : none) {
             const bool goesDown = (inherited->flavors & Restricted) == 0;
-            if (goesDown) all.add(inherited);  // unless there is one of its own
+            if (goesDown) {
+                all.add(inherited);  // unless there is one of its own
+            }
         }
         m_listed += all.size();
         return all;
@@ -102,16 +122,18 @@ private:
             fault(declared.place, "qualifier " + in(declared.name) + " is not declared");
             return nullptr;
         }
-        if ((type->scopes & scope) == 0)
+        if ((type->scopes & scope) == 0) {
             fault(declared.place, "qualifier " + in(type->name) + " is not for this element");
+        }
         auto qualifier = std::make_shared<CimQualifier>();
         qualifier->name = type->name;
         qualifier->flavors = (type->flavors & ~declared.flavorsOff) | declared.flavorsOn;
         qualifier->value = Value::null(type->type.cmpiType());
-        if (declared.value)
+        if (declared.value) {
             convert(*declared.value, type->type, qualifier->value);
-        else if (type->type.cmpiType() == CMPI_boolean)
+        } else if (type->type.cmpiType() == CMPI_boolean) {
             qualifier->value = true;
+        }
         return qualifier;
     }
 
@@ -123,12 +145,19 @@ private:
         const MofClass* at = &declared;
         while (m_metFrom.emplace(at, &declared).second) {
             line.push_back(at);
-            if (at->superclass.empty()) break;
+            if (at->superclass.empty()) {
+                break;
+            }
             at = superclassOf(*at, declared);
-            if (!at) return;
+            if (!at) {
+                return;
+            }
         }
-        for (auto next = line.rbegin(); next != line.rend(); ++next)
-            if (!linkClass(**next)) return;
+        for (auto next = line.rbegin(); next != line.rend(); ++next) {
+            if (!linkClass(**next)) {
+                return;
+            }
+        }
     }
 
     // Declaration of the superclass. Null, and reported, when there is none, or when it closes a
@@ -141,7 +170,9 @@ private:
             return nullptr;
         }
         auto met = m_metFrom.find(found->second);
-        if (met == m_metFrom.end() || met->second != &start) return found->second;
+        if (met == m_metFrom.end() || met->second != &start) {
+            return found->second;
+        }
         fault(declared.superclassPlace, "class " + in(declared.name) + " inherits from itself");
         return nullptr;
     }
@@ -151,7 +182,9 @@ private:
         CimClass* superclass = nullptr;
         if (!declared.superclass.empty()) {
             auto found = m_linked.find(declared.superclass);
-            if (found == m_linked.end()) return false;
+            if (found == m_linked.end()) {
+                return false;
+            }
             superclass = found->second;
         }
         auto cls = std::make_shared<CimClass>();
@@ -175,7 +208,9 @@ private:
             fault(declared.place, "the classes have too many features");
             throw MofError(std::move(m_faults));
         }
-        if (superclass) superclass->subclasses.push_back(cls.get());
+        if (superclass) {
+            superclass->subclasses.push_back(cls.get());
+        }
         m_linked.emplace(cls->name, cls.get());
         m_repository.m_classes.add(std::move(cls));
         return true;
@@ -188,8 +223,12 @@ private:
         };
         const CimClass* base = cls.superclass;
         unsigned scope = ScopeClass;
-        if ((base && base->isAssociation) || has("Association")) scope |= ScopeAssociation;
-        if ((base && base->isIndication) || has("Indication")) scope |= ScopeIndication;
+        if ((base && base->isAssociation) || has("Association")) {
+            scope |= ScopeAssociation;
+        }
+        if ((base && base->isIndication) || has("Indication")) {
+            scope |= ScopeIndication;
+        }
         cls.qualifiers = linkQualifiers(declared.qualifiers, scope, base);
         cls.isAssociation = cls.flag("Association");
         cls.isIndication = cls.flag("Indication");
@@ -207,21 +246,28 @@ private:
                                          in(feature.name) + " is declared twice in this class");
                 continue;
             }
-            if (feature.isMethod)
+            if (feature.isMethod) {
                 linkMethod(feature, cls);
-            else
+            } else {
                 linkProperty(feature, cls);
+            }
         }
         std::size_t references = 0;
         for (const auto& property : cls.properties) {
-            if (property->isKey) cls.keys.push_back(property.get());
-            if (property->type == CMPI_ref) ++references;
+            if (property->isKey) {
+                cls.keys.push_back(property.get());
+            }
+            if (property->type == CMPI_ref) {
+                ++references;
+            }
         }
-        if (cls.isAssociation && references < 2)
+        if (cls.isAssociation && references < 2) {
             fault(declared.place, "association " + in(cls.name) + " has fewer than two references");
-        if (!cls.isAssociation && references > 0)
+        }
+        if (!cls.isAssociation && references > 0) {
             fault(declared.place, "class " + in(cls.name) +
                                       " has references and so needs the qualifier 'Association'");
+        }
     }
 
     // What all kinds of element share.
@@ -230,21 +276,29 @@ private:
         element.name = declared.name;
         static_cast<CimType&>(element) = declared.type;
         element.qualifiers = linkQualifiers(declared.qualifiers, scope, base);
-        if (element.type == CMPI_ref)
+        if (element.type == CMPI_ref) {
             element.referenceClass = classNamed(element.referenceClass, declared);
+        }
         const std::string* embedded = element.text("EmbeddedInstance");
         element.isEmbeddedObject = embedded || element.flag("EmbeddedObject");
-        if (embedded) element.embeddedClass = classNamed(*embedded, declared);
-        if (element.isEmbeddedObject && element.type != CMPI_string)
+        if (embedded) {
+            element.embeddedClass = classNamed(*embedded, declared);
+        }
+        if (element.isEmbeddedObject && element.type != CMPI_string) {
             fault(declared.place,
                   in(element.name) + " carries an instance and so must be a string");
-        if (base) checkOverride(declared, *base, element);
+        }
+        if (base) {
+            checkOverride(declared, *base, element);
+        }
     }
 
     // Name of a class as its declaration spells it.
     std::string classNamed(const std::string& name, const MofParameter& user) {
         auto found = m_declared.find(name);
-        if (found != m_declared.end()) return found->second->name;
+        if (found != m_declared.end()) {
+            return found->second->name;
+        }
         fault(user.place, "class " + in(name) + " of " + in(user.name) + " is not declared");
         return name;
     }
@@ -252,22 +306,27 @@ private:
     void checkOverride(const MofParameter& declared, const CimElement& base,
                        const CimElement& element) {
         if (element.type != base.type || element.isArray != base.isArray ||
-            element.arraySize != base.arraySize)
+            element.arraySize != base.arraySize) {
             fault(declared.place, in(element.name) + " overrides one of another type, " +
                                       mofTypeWord(base) + mofBrackets(base));
-        else if (!isDeclaredBelow(element.referenceClass, base.referenceClass) ||
-                 !isDeclaredBelow(element.embeddedClass, base.embeddedClass))
+        } else if (!isDeclaredBelow(element.referenceClass, base.referenceClass) ||
+                   !isDeclaredBelow(element.embeddedClass, base.embeddedClass)) {
             fault(declared.place, in(element.name) + " overrides one of class " +
                                       in(base.referenceClass + base.embeddedClass) +
                                       ", of which its own is no subclass");
+        }
     }
 
     // By the declarations, since a class referred to may not be linked yet.
     bool isDeclaredBelow(const std::string& name, const std::string& base) const {
-        if (base.empty()) return true;
+        if (base.empty()) {
+            return true;
+        }
         std::string_view at = name;
         for (std::size_t i = 0; i < kMaxLineage && !at.empty(); ++i) {
-            if (sameName(at, base)) return true;
+            if (sameName(at, base)) {
+                return true;
+            }
             auto found = m_declared.find(at);
             at = found == m_declared.end() ? std::string_view() : found->second->superclass;
         }
@@ -277,12 +336,15 @@ private:
     // The qualifier Override must name what is overridden, with or without the class.
     void checkOverrideName(const MofFeature& feature, const CimElement& element, bool hasBase) {
         const std::string* name = element.text("Override");
-        if (!name) return;
+        if (!name) {
+            return;
+        }
         std::size_t dot = name->rfind('.');
         std::string last = dot == std::string::npos ? *name : name->substr(dot + 1);
-        if (!hasBase || !sameName(last, feature.name))
+        if (!hasBase || !sameName(last, feature.name)) {
             fault(feature.place, in(feature.name) + " overrides " + in(*name) +
                                      ", which is no feature of that name in a superclass");
+        }
     }
 
     void linkProperty(const MofFeature& feature, CimClass& cls) {
@@ -291,22 +353,26 @@ private:
         bool isReference = feature.type.type == CMPI_ref;
         linkElement(feature, isReference ? ScopeReference : ScopeProperty, base, *property);
         checkOverrideName(feature, *property, base != nullptr);
-        if (feature.defaultValue)
+        if (feature.defaultValue) {
             convert(*feature.defaultValue, feature.type, property->defaultValue);
-        else if (base)
+        } else if (base) {
             property->defaultValue = base->defaultValue;
+        }
 
         property->isKey = property->flag("Key");
-        if (property->isKey && (property->isArray || property->isEmbeddedObject))
+        if (property->isKey && (property->isArray || property->isEmbeddedObject)) {
             fault(feature.place,
                   "key " + in(property->name) + " cannot be an array or an instance");
+        }
         bool wasKey = base && base->isKey;
-        if (property->isKey && !wasKey && cls.superclass && !cls.superclass->keys.empty())
+        if (property->isKey && !wasKey && cls.superclass && !cls.superclass->keys.empty()) {
             fault(feature.place, in(property->name) + " cannot become a key: " +
                                      in(cls.superclass->name) + " has its keys already");
-        if (wasKey && !property->isKey)
+        }
+        if (wasKey && !property->isKey) {
             fault(feature.place,
                   in(property->name) + " is a key of the superclass and must stay one");
+        }
         cls.properties.put(std::move(property));
     }
 
@@ -319,8 +385,9 @@ private:
             auto parameter = std::make_shared<CimParameter>();
             const CimParameter* old = base ? base->parameters.find(declared.name) : nullptr;
             linkElement(declared, ScopeParameter, old, *parameter);
-            if (!method->parameters.add(std::move(parameter)))
+            if (!method->parameters.add(std::move(parameter))) {
                 fault(declared.place, "parameter " + in(declared.name) + " is declared twice");
+            }
         }
         cls.methods.put(std::move(method));
     }

@@ -12,7 +12,9 @@ namespace {
 const Value* firstValue(const CimQualified& of, std::string_view qualifier) {
     const CimQualifier* found = of.qualifiers.find(qualifier);
     const Value* value = found && !found->value.isNull() ? &found->value : nullptr;
-    if (!value || !value->isArray()) return value;
+    if (!value || !value->isArray()) {
+        return value;
+    }
     return value->elements().empty() ? nullptr : &value->elements().front();
 }
 
@@ -30,7 +32,9 @@ const std::string* CimQualified::text(std::string_view qualifier) const {
 }
 
 CMPIType typeOf(const CimElement& element) {
-    if (!element.isEmbeddedObject) return element.cmpiType();
+    if (!element.isEmbeddedObject) {
+        return element.cmpiType();
+    }
     return element.isArray ? CMPI_instanceA : CMPI_instance;
 }
 
@@ -40,8 +44,9 @@ bool CimClass::isA(const CimClass& base) const {
 
 std::vector<const CimClass*> CimClass::allSubclasses() const {
     std::vector<const CimClass*> all(subclasses);
-    for (std::size_t i = 0; i < all.size(); ++i)
+    for (std::size_t i = 0; i < all.size(); ++i) {
         all.insert(all.end(), all[i]->subclasses.begin(), all[i]->subclasses.end());
+    }
     return all;
 }
 
@@ -50,7 +55,9 @@ const CimClass::InitialValues& CimClass::initialValues() const {
         for (const auto& property : properties) {
             Value value = property->defaultValue;
             value.retypeNull(typeOf(*property));
-            if (!value.isNull()) m_initialValues.ofDefaults.set(property->name, value);
+            if (!value.isNull()) {
+                m_initialValues.ofDefaults.set(property->name, value);
+            }
             m_initialValues.all.set(property->name, std::move(value));
         }
     });
@@ -75,10 +82,16 @@ public:
     std::string print(const CimClass& cls) {
         addQualifiers(cls.qualifiers, "");
         m_text += "class " + cls.name;
-        if (cls.superclass) m_text += " : " + cls.superclass->name;
+        if (cls.superclass) {
+            m_text += " : " + cls.superclass->name;
+        }
         m_text += " {\n";
-        for (const auto& property : cls.properties) addProperty(cls, *property);
-        for (const auto& method : cls.methods) addMethod(*method);
+        for (const auto& property : cls.properties) {
+            addProperty(cls, *property);
+        }
+        for (const auto& method : cls.methods) {
+            addMethod(*method);
+        }
         return m_text + "};\n";
     }
 
@@ -87,8 +100,9 @@ private:
         addElement(property, "    ");
         const CimProperty* base =
             cls.superclass ? cls.superclass->properties.find(property.name) : nullptr;
-        if (!property.defaultValue.isNull() || (base && !base->defaultValue.isNull()))
+        if (!property.defaultValue.isNull() || (base && !base->defaultValue.isNull())) {
             m_text += " = " + printMofValue(property.defaultValue);  // NULL against another
+        }
         m_text += ";\n";
     }
 
@@ -105,33 +119,42 @@ private:
     void addElement(const CimElement& element, const std::string& indent) {
         addQualifiers(element.qualifiers, indent);
         m_text += indent;
-        if (element.type == CMPI_ref) m_text += element.referenceClass + " ";
+        if (element.type == CMPI_ref) {
+            m_text += element.referenceClass + " ";
+        }
         m_text += mofTypeWord(element) + " " + element.name + mofBrackets(element);
     }
 
     void addQualifiers(const NamedList<CimQualifier>& qualifiers, const std::string& indent) {
         std::string list;
         for (const auto& qualifier : qualifiers) {
-            if (!list.empty()) list += ",\n" + indent + " ";
+            if (!list.empty()) {
+                list += ",\n" + indent + " ";
+            }
             list += qualifierText(*qualifier);
         }
-        if (!list.empty()) m_text += indent + "[" + list + "]\n";
+        if (!list.empty()) {
+            m_text += indent + "[" + list + "]\n";
+        }
     }
 
     std::string qualifierText(const CimQualifier& qualifier) const {
         std::string text = qualifier.name;
         std::string value = printMofValue(qualifier.value);
         bool isFlag = qualifier.value.type() == CMPI_boolean && value == "true";
-        if (value[0] == '{')
+        if (value[0] == '{') {
             text += value;
-        else if (!isFlag)
+        } else if (!isFlag) {
             text += "(" + value + ")";
+        }
 
         const CimQualifierType* type = m_types.find(qualifier.name);
         unsigned usual = type ? type->flavors : 0;
         std::string flavors;
         auto addFlavor = [&](unsigned flavor, const char* on, const char* off) {
-            if (((qualifier.flavors ^ usual) & flavor) == 0) return;
+            if (((qualifier.flavors ^ usual) & flavor) == 0) {
+                return;
+            }
             flavors += std::string(" ") + ((qualifier.flavors & flavor) != 0 ? on : off);
         };
         addFlavor(DisableOverride, "DisableOverride", "EnableOverride");

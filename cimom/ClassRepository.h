@@ -38,7 +38,9 @@ public:
 
     /// Appends @p item; false, and nothing is added, when its name is already taken.
     bool add(Item item) {
-        if (!m_index.emplace(item->name, m_items.size()).second) return false;
+        if (!m_index.emplace(item->name, m_items.size()).second) {
+            return false;
+        }
         m_items.push_back(std::move(item));
         return true;
     }

@@ -16,7 +16,9 @@ namespace {
 
 ObjectPath readPath(const Session& session, const std::string& text) {
     ObjectPath path = parsePath(text, session.unfit);
-    if (path.nameSpace.empty()) path.nameSpace = session.request.nameSpace;
+    if (path.nameSpace.empty()) {
+        path.nameSpace = session.request.nameSpace;
+    }
     return session.classes ? typedKeys(path, *session.classes, session.unfit) : path;
 }
 
@@ -33,7 +35,9 @@ Value readValue(const Session& session, const CimElement* declared, const std::s
 /// What to say of a name that is not declared or stands twice; nothing where the provider is to
 /// judge.
 void refuseName(const Session& session, CMPIrc rc, const std::string& message) {
-    if (session.unfit == Unfit::Refused) throw Failure(rc, message);
+    if (session.unfit == Unfit::Refused) {
+        throw Failure(rc, message);
+    }
 }
 
 /// The method or property that is named; null where it is not known and left to the provider.
@@ -41,8 +45,9 @@ template <class T>
 const T* named(const Session& session, const std::string& name, const CimClass* cls,
                NamedList<T> CimClass::*members, CMPIrc unknown, const char* what) {
     const T* found = cls ? (cls->*members).find(name) : nullptr;
-    if (cls && !found)
+    if (cls && !found) {
         refuseName(session, unknown, "class " + cls->name + " has no " + what + " " + name);
+    }
     return found;
 }
 
@@ -55,13 +60,17 @@ NamedValues readAssignments(const Session& session, const NamedList<T>* declared
     NamedValues values;
     for (const std::string& text : assignments) {
         const std::size_t equals = text.find('=');
-        if (equals == 0 || equals == std::string::npos)
+        if (equals == 0 || equals == std::string::npos) {
             throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "'" + text + "' is not name=value");
+        }
         const std::string name = text.substr(0, equals);
         const T* element = declared ? declared->find(name) : nullptr;
-        if (declared && !element) refuseName(session, unknown, "there is no '" + name + "' to set");
-        if (values.find(name))
+        if (declared && !element) {
+            refuseName(session, unknown, "there is no '" + name + "' to set");
+        }
+        if (values.find(name)) {
             refuseName(session, CMPI_RC_ERR_INVALID_PARAMETER, "'" + name + "' is given twice");
+        }
         values.add(element ? element->name : name,
                    readValue(session, element, text.substr(equals + 1)));
     }
@@ -73,7 +82,9 @@ Reply printed(Session& session, Reply reply, bool instances) {
     const std::string text =
         instances ? render(reply.instances, session.format) : render(reply.paths, session.format);
     const bool nothing = reply.instances.empty() && reply.paths.empty();
-    if (reply.ok() || !nothing) session.out.write(text);
+    if (reply.ok() || !nothing) {
+        session.out.write(text);
+    }
     return reply;
 }
 
@@ -96,17 +107,22 @@ Instance readInstance(const Session& session, const Arguments& arguments) {
 }
 Reply createInstance(Session& session, const Arguments& arguments) {
     Instance instance = readInstance(session, arguments);
-    if (const CimClass* cls = classOf(session, instance.path))
-        for (const CimProperty* key : cls->keys)
-            if (const Value* value = instance.properties.find(key->name))
+    if (const CimClass* cls = classOf(session, instance.path)) {
+        for (const CimProperty* key : cls->keys) {
+            if (const Value* value = instance.properties.find(key->name)) {
                 instance.path.keys.set(key->name, *value);
+            }
+        }
+    }
     return printed(session, session.server.createInstance(session.request, instance), false);
 }
 Reply modifyInstance(Session& session, const Arguments& arguments) {
     const Instance instance = readInstance(session, arguments);
     Request request = session.request;
     request.properties.emplace();
-    for (const auto& each : instance.properties) request.properties->push_back(each.name);
+    for (const auto& each : instance.properties) {
+        request.properties->push_back(each.name);
+    }
     return session.server.modifyInstance(request, instance);
 }
 Reply deleteInstance(Session& session, const Arguments& arguments) {
@@ -134,13 +150,17 @@ Reply invokeMethod(Session& session, const Arguments& arguments) {
     const NamedValues in = readAssignments(session, method ? &method->parameters : nullptr,
                                            arguments.assignments, CMPI_RC_ERR_INVALID_PARAMETER);
     Reply reply = session.server.invokeMethod(session.request, path, arguments.name, in);
-    if (reply.ok()) session.out.write(renderMethod(reply, session.format));
+    if (reply.ok()) {
+        session.out.write(renderMethod(reply, session.format));
+    }
     return reply;
 }
 Reply getProperty(Session& session, const Arguments& arguments) {
     Reply reply = session.server.getProperty(session.request, readPath(session, arguments.object),
                                              arguments.name);
-    if (reply.ok()) session.out.write(render(reply.value(), session.format));
+    if (reply.ok()) {
+        session.out.write(render(reply.value(), session.format));
+    }
     return reply;
 }
 Reply setProperty(Session& session, const Arguments& arguments) {
@@ -155,13 +175,16 @@ Reply setProperty(Session& session, const Arguments& arguments) {
 // -- classes ----------------------------------------------------------------------------------
 
 const ClassRepository& repository(const Session& session) {
-    if (!session.classes)
+    if (!session.classes) {
         throw Failure(CMPI_RC_ERR_NOT_SUPPORTED, "no classes are known without --schema");
+    }
     return *session.classes;
 }
 const CimClass& knownClass(const Session& session, const std::string& name) {
     const CimClass* cls = repository(session).findClass(name);
-    if (!cls) throw Failure(CMPI_RC_ERR_INVALID_CLASS, "no class " + name);
+    if (!cls) {
+        throw Failure(CMPI_RC_ERR_INVALID_CLASS, "no class " + name);
+    }
     return *cls;
 }
 Reply getClass(Session& session, const Arguments& arguments) {
@@ -173,10 +196,13 @@ Reply getClass(Session& session, const Arguments& arguments) {
 Reply enumClasses(Session& session, const Arguments& arguments) {
     std::vector<std::string> names;
     if (arguments.object.empty()) {
-        for (const auto& cls : repository(session).classes()) names.push_back(cls->name);
-    } else {
-        for (const CimClass* cls : knownClass(session, arguments.object).allSubclasses())
+        for (const auto& cls : repository(session).classes()) {
             names.push_back(cls->name);
+        }
+    } else {
+        for (const CimClass* cls : knownClass(session, arguments.object).allSubclasses()) {
+            names.push_back(cls->name);
+        }
     }
     session.out.write(render(names, session.format));
     return {};
@@ -188,13 +214,17 @@ int wakePipe[2] = {-1, -1};
 
 void wake(int) {
     const char byte = 0;
-    if (::write(wakePipe[1], &byte, 1) < 0) return;  // a full pipe wakes as well
+    if (::write(wakePipe[1], &byte, 1) < 0) {
+        return;  // a full pipe wakes as well
+    }
 }
 // Handlers and no blocked signals: the tools that providers start must be free of both.
 void wakeAtSignals() {
     struct sigaction action = {};
     action.sa_handler = wake;
-    for (int signal : {SIGINT, SIGTERM}) sigaction(signal, &action, nullptr);
+    for (int signal : {SIGINT, SIGTERM}) {
+        sigaction(signal, &action, nullptr);
+    }
 }
 
 // Until a signal asks to end, or enough indications have come, or nobody reads them.
@@ -202,23 +232,33 @@ Reply watch(Session& session, const Arguments& arguments) {
     const std::string query = arguments.query.find(' ') == std::string::npos
                                   ? "SELECT * FROM " + arguments.query
                                   : arguments.query;
-    if (pipe2(wakePipe, O_CLOEXEC) != 0) throw Failure(CMPI_RC_ERROR_SYSTEM, "no pipe");
+    if (pipe2(wakePipe, O_CLOEXEC) != 0) {
+        throw Failure(CMPI_RC_ERROR_SYSTEM, "no pipe");
+    }
     wakeAtSignals();
     std::size_t seen = 0;  // the handler runs one indication at a time
     Server::SubscriptionId id = 0;
     Reply reply = session.server.subscribe(
         session.request, query, arguments.queryLanguage,
         [&](const Indication& indication) {
-            if (arguments.count != 0 && seen == arguments.count) return;
+            if (arguments.count != 0 && seen == arguments.count) {
+                return;
+            }
             ++seen;
             const bool read = session.out.write(renderEvent(indication, session.format));
-            if (!read || seen == arguments.count) wake(0);
+            if (!read || seen == arguments.count) {
+                wake(0);
+            }
         },
         id);
-    if (!reply.ok()) return reply;
+    if (!reply.ok()) {
+        return reply;
+    }
     wakeAtSignals();  // once more: a Java VM of the providers takes them over
     char byte = 0;
-    while (::read(wakePipe[0], &byte, 1) < 0 && errno == EINTR) continue;
+    while (::read(wakePipe[0], &byte, 1) < 0 && errno == EINTR) {
+        continue;
+    }
     return session.server.unsubscribe(session.request, id);
 }
 

@@ -39,8 +39,9 @@ constexpr auto getCode = entryOf<getField<Field, &CMPIValue::uint32, Enum>>;
 Value fieldOf(const char* text) { return Value(text); }
 Value fieldOf(const CMPIArray* texts) {
     const ArrayBody& body = bodyOf(texts);
-    if (stringFor(body.elementType) != CMPI_string)
+    if (stringFor(body.elementType) != CMPI_string) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "not an array of strings");
+    }
     return Value::array(CMPI_string, body.elements);
 }
 template <class Enum, class = std::enable_if_t<std::is_enum_v<Enum>>>

@@ -10,8 +10,9 @@ namespace {
 
 /// What a provider answered to a step, NOT_SUPPORTED counting as consent where it may.
 void require(const Reply& reply, bool mayRefuse) {
-    if (!reply.ok() && !(mayRefuse && reply.rc == CMPI_RC_ERR_NOT_SUPPORTED))
+    if (!reply.ok() && !(mayRefuse && reply.rc == CMPI_RC_ERR_NOT_SUPPORTED)) {
         throw Failure(reply.rc, reply.message);
+    }
 }
 
 }  // namespace
@@ -75,7 +76,9 @@ void Server::Impl::activate(const Request& request, Subscription& subscription,
         throw;
     }
     subscription.targets.push_back(target);
-    if (enable) require(switchIndications(request, target, true), true);
+    if (enable) {
+        require(switchIndications(request, target, true), true);
+    }
 }
 
 void Server::Impl::deactivate(const Request& request, const Subscription& subscription) {
@@ -88,7 +91,9 @@ void Server::Impl::deactivate(const Request& request, const Subscription& subscr
             filterStep(inSpace, target, FilterStep::Deactivate, subscription.query, last);
         } catch (const Failure&) {  // the filter is gone whatever the provider thinks of it
         }
-        if (disable) switchIndications(inSpace, target, false);
+        if (disable) {
+            switchIndications(inSpace, target, false);
+        }
     }
 }
 
@@ -107,7 +112,9 @@ Reply Server::subscribe(const Request& request, const std::string& query,
                 m_impl->filterStep(request, target, FilterStep::Authorize, subscription->query,
                                    false);
             } catch (const Failure& failure) {
-                if (failure.rc() != CMPI_RC_ERR_NOT_SUPPORTED) throw;
+                if (failure.rc() != CMPI_RC_ERR_NOT_SUPPORTED) {
+                    throw;
+                }
             }
         }
         // Indications may come as soon as the first provider has the filter.
@@ -117,7 +124,9 @@ Reply Server::subscribe(const Request& request, const std::string& query,
             m_impl->subscriptions[id] = subscription;
         }
         try {
-            for (const Target& target : targets) m_impl->activate(request, *subscription, target);
+            for (const Target& target : targets) {
+                m_impl->activate(request, *subscription, target);
+            }
         } catch (const Failure&) {
             unsubscribe(request, id);
             throw;
@@ -132,8 +141,9 @@ Reply Server::unsubscribe(const Request& request, SubscriptionId id) {
         {
             std::lock_guard<std::mutex> lock(m_impl->subscriptionMutex);
             const auto at = m_impl->subscriptions.find(id);
-            if (at == m_impl->subscriptions.end())
+            if (at == m_impl->subscriptions.end()) {
                 throw Failure(CMPI_RC_ERR_NOT_FOUND, "no subscription " + std::to_string(id));
+            }
             subscription = at->second;
             m_impl->subscriptions.erase(at);
         }
@@ -146,19 +156,25 @@ Reply Server::unsubscribe(const Request& request, SubscriptionId id) {
 
 Reply Server::deliver(const Request& request, const Instance& indication) {
     Indication delivered{request.nameSpace, indication};
-    if (delivered.instance.path.nameSpace.empty())
+    if (delivered.instance.path.nameSpace.empty()) {
         delivered.instance.path.nameSpace = request.nameSpace;
+    }
     std::vector<std::shared_ptr<Subscription>> open;
     {
         std::lock_guard<std::mutex> lock(m_impl->subscriptionMutex);
-        for (const auto& each : m_impl->subscriptions) open.push_back(each.second);
+        for (const auto& each : m_impl->subscriptions) {
+            open.push_back(each.second);
+        }
     }
     for (const auto& subscription : open) {
         if (!sameName(subscription->nameSpace, request.nameSpace) ||
-            !instanceMatches(m_impl->broker, *subscription->query, indication))
+            !instanceMatches(m_impl->broker, *subscription->query, indication)) {
             continue;
+        }
         std::lock_guard<std::recursive_mutex> lock(subscription->mutex);
-        if (!subscription->ended && subscription->handler) subscription->handler(delivered);
+        if (!subscription->ended && subscription->handler) {
+            subscription->handler(delivered);
+        }
     }
     return {};
 }

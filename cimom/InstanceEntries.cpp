@@ -26,12 +26,16 @@ bool typeAgrees(const CimProperty& element, const Value& value) {
 Value checked(bool lean, const InstanceBody& body, const CimProperty* element,
               const std::string& name, Value value) {
     if (!element) {
-        if (lean) return value;
+        if (lean) {
+            return value;
+        }
         throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
                       "class " + body.cls->name + " has no property " + name);
     }
     value.retypeNull(typeOf(*element));
-    if (lean || typeAgrees(*element, value)) return value;
+    if (lean || typeAgrees(*element, value)) {
+        return value;
+    }
     throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, "property " + body.cls->name + "." + name + " is " +
                                                  typeName(typeOf(*element)) + ", not " +
                                                  typeName(value.type()));
@@ -40,7 +44,9 @@ Value checked(bool lean, const InstanceBody& body, const CimProperty* element,
 // Keys that are as they were stay shared with the path that they came from.
 void setKey(InstanceBody& body, const std::string& name, const Value& value) {
     const Value* present = body.value.path.keys.find(name);
-    if (!present || *present != value) body.value.path.keys.set(name, value);
+    if (!present || *present != value) {
+        body.value.path.keys.set(name, value);
+    }
 }
 
 // The keys of the path become properties, typed by the class. What the class does not have, or
@@ -51,7 +57,9 @@ void takeKeys(InstanceBody& body) {
         Value typed = value;
         if (body.cls) {
             const CimProperty* element = declared(body, name);
-            if (!element || !value.convertTo(typeOf(*element), typed)) continue;
+            if (!element || !value.convertTo(typeOf(*element), typed)) {
+                continue;
+            }
         }
         setKey(body, name, typed);
         body.value.properties.set(name, std::move(typed));
@@ -60,18 +68,23 @@ void takeKeys(InstanceBody& body) {
 
 CMPIData getProperty(InstanceBody& body, Broker& broker, const char* name) {
     const std::string wanted = textOf(name);
-    if (const Value* value = body.value.properties.find(wanted))
+    if (const Value* value = body.value.properties.find(wanted)) {
         return namedData<CMPIInstance>(broker, body, wanted, *value);
+    }
     // A property of the class that has not been set is there, and null, except in small brokers.
     const bool may = !broker.lean() && passesFilter(body, wanted);
     const CimProperty* element = may ? declared(body, wanted) : nullptr;
-    if (!element) throw Failure(missing<CMPIInstance>(broker), "no property " + wanted);
+    if (!element) {
+        throw Failure(missing<CMPIInstance>(broker), "no property " + wanted);
+    }
     return namedData<CMPIInstance>(broker, body, wanted, Value::null(typeOf(*element)));
 }
 
 void setProperty(InstanceBody& body, Broker& broker, const char* name, const CMPIValue* value,
                  CMPIType type) {
-    if (!name || !*name) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
+    if (!name || !*name) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
+    }
     setInstanceProperty(broker, body, name, readValue(value, type));
 }
 void setPropertyWithOrigin(InstanceBody& body, Broker& broker, const char* name,
@@ -96,28 +109,40 @@ bool stays(const InstanceBody& body, const Broker& broker, const std::string& na
 void setPropertyFilter(InstanceBody& body, Broker& broker, const char** properties,
                        const char** keys) {
     if (!properties) {
-        if (!broker.lean()) body.filter.reset();
+        if (!broker.lean()) {
+            body.filter.reset();
+        }
         return;
     }
     std::vector<std::string> names = namesIn(properties);
-    if (broker.lean() && keys)
-        for (std::string& key : namesIn(keys)) names.push_back(std::move(key));
+    if (broker.lean() && keys) {
+        for (std::string& key : namesIn(keys)) {
+            names.push_back(std::move(key));
+        }
+    }
     body.filter = std::make_shared<const NameSet>(names.begin(), names.end());
     const auto keep = [&](NamedValues& values) {
         NamedValues kept;
-        for (const auto& [name, value] : values)
-            if (stays(body, broker, name)) kept.set(name, value);
+        for (const auto& [name, value] : values) {
+            if (stays(body, broker, name)) {
+                kept.set(name, value);
+            }
+        }
         values = std::move(kept);
     };
     keep(body.value.properties);
-    if (broker.lean()) keep(body.value.path.keys);
+    if (broker.lean()) {
+        keep(body.value.path.keys);
+    }
 }
 
 }  // namespace
 
 // Without its class, an instance has the keys of its path.
 bool isKey(const InstanceBody& body, const std::string& name) {
-    if (!body.cls) return body.value.path.keys.find(name) != nullptr;
+    if (!body.cls) {
+        return body.value.path.keys.find(name) != nullptr;
+    }
     const CimProperty* element = declared(body, name);
     return element && element->isKey;
 }
@@ -129,19 +154,28 @@ InstanceBody instanceBody(Broker& broker, Instance value) {
 
 InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path) {
     InstanceBody body = instanceBody(broker, Instance(path));
-    if (!body.cls && broker.classes() && !broker.lean())
+    if (!body.cls && broker.classes() && !broker.lean()) {
         throw Failure(CMPI_RC_ERR_NOT_FOUND, "no class " + path.className);
-    if (body.cls) body.value.properties = broker.lean() ? body.cls->blank() : body.cls->defaults();
+    }
+    if (body.cls) {
+        body.value.properties = broker.lean() ? body.cls->blank() : body.cls->defaults();
+    }
     takeKeys(body);
     return body;
 }
 
 void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& name, Value value) {
     const CimProperty* element = declared(body, name);
-    if (body.cls) value = checked(broker.lean(), body, element, name, std::move(value));
+    if (body.cls) {
+        value = checked(broker.lean(), body, element, name, std::move(value));
+    }
     // The path of an instance is made of its key properties.
-    if (!stays(body, broker, name)) return;
-    if (!value.isNull() && isKey(body, name)) setKey(body, name, value);
+    if (!stays(body, broker, name)) {
+        return;
+    }
+    if (!value.isNull() && isKey(body, name)) {
+        setKey(body, name, value);
+    }
     body.value.properties.set(name, std::move(value));
 }
 

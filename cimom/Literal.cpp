@@ -59,10 +59,16 @@ std::string escaped(char c, char quote, Controls controls) {
     const bool marks = c == quote || c == '\\';
     const bool control =
         static_cast<unsigned char>(c) < 0x20 || (c == 0x7F && controls == Controls::ByNumber);
-    if (!marks && !control) return {c};
-    if (marks || controls == Controls::ByLetter)
-        for (const Escape& escape : kEscapes)
-            if (escape.meant == c) return {'\\', escape.letter};
+    if (!marks && !control) {
+        return {c};
+    }
+    if (marks || controls == Controls::ByLetter) {
+        for (const Escape& escape : kEscapes) {
+            if (escape.meant == c) {
+                return {'\\', escape.letter};
+            }
+        }
+    }
     return byNumber(static_cast<unsigned char>(c));
 }
 
@@ -72,19 +78,26 @@ bool isValueType(CMPIType type) { return rowOf(type) != nullptr; }
 
 std::string typeName(CMPIType type) {
     const TypeName* row = rowOf(type);
-    if (!row) return "type " + std::to_string(type);
+    if (!row) {
+        return "type " + std::to_string(type);
+    }
     return std::string(row->name) + ((type & CMPI_ARRAY) != 0 ? "[]" : "");
 }
 
 std::optional<CMPIType> declaredTypeNamed(std::string_view word) {
-    for (std::size_t i = 0; i < kDeclaredTypes; ++i)
-        if (sameName(kTypeNames[i].name, word)) return kTypeNames[i].type;
+    for (std::size_t i = 0; i < kDeclaredTypes; ++i) {
+        if (sameName(kTypeNames[i].name, word)) {
+            return kTypeNames[i].type;
+        }
+    }
     return std::nullopt;
 }
 
 std::string quoted(const std::string& text, char quote, Controls controls) {
     std::string all(1, quote);
-    for (char c : text) all += escaped(c, quote, controls);
+    for (char c : text) {
+        all += escaped(c, quote, controls);
+    }
     return all + quote;
 }
 
@@ -94,15 +107,22 @@ std::string quotedUnit(std::uint64_t unit, Controls controls) {
 }
 
 char meaningOfEscape(char letter) {
-    for (const Escape& escape : kEscapes)
-        if (escape.letter == letter) return escape.meant;
+    for (const Escape& escape : kEscapes) {
+        if (escape.letter == letter) {
+            return escape.meant;
+        }
+    }
     return 0;
 }
 
 std::string utf8(unsigned unit) {
     const auto byte = [](unsigned value) { return static_cast<char>(value); };
-    if (unit < 0x80) return {byte(unit)};
-    if (unit < 0x800) return {byte(0xC0 | unit >> 6), byte(0x80 | (unit & 0x3F))};
+    if (unit < 0x80) {
+        return {byte(unit)};
+    }
+    if (unit < 0x800) {
+        return {byte(0xC0 | unit >> 6), byte(0x80 | (unit & 0x3F))};
+    }
     return {byte(0xE0 | unit >> 12), byte(0x80 | (unit >> 6 & 0x3F)), byte(0x80 | (unit & 0x3F))};
 }
 
@@ -110,7 +130,9 @@ std::vector<std::string> splitAtCommas(const std::string& text) {
     std::vector<std::string> parts;
     for (std::size_t at = 0; at < text.size();) {
         const std::size_t comma = std::min(text.find(',', at), text.size());
-        if (comma > at) parts.push_back(text.substr(at, comma - at));
+        if (comma > at) {
+            parts.push_back(text.substr(at, comma - at));
+        }
         at = comma + 1;
     }
     return parts;

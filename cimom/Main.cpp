@@ -135,7 +135,7 @@ constexpr TextArgument kTextArguments[] = {
 CLI::App* addVerb(CLI::App& app, const cimom::Verb& row, Settings& settings, Arguments& arguments) {
     CLI::App* verb = app.add_subcommand(row.name, row.help);
     verb->fallthrough();
-    if (row.takes & cimom::kPropertyList)
+    if (row.takes & cimom::kPropertyList) {
         verb->add_option_function<std::string>(
                 "--properties",
                 [&settings](const std::string& names) {
@@ -143,17 +143,22 @@ CLI::App* addVerb(CLI::App& app, const cimom::Verb& row, Settings& settings, Arg
                 },
                 "Names of the properties wanted, separated by commas")
             ->option_text("NAMES");
-    for (const TextArgument& argument : kTextArguments)
-        if (row.takes & argument.takenBy)
+    }
+    for (const TextArgument& argument : kTextArguments) {
+        if (row.takes & argument.takenBy) {
             verb->add_option(argument.name, arguments.*argument.place, argument.help)
                 ->required(argument.required);
-    if (row.takes & cimom::kFilter)
+        }
+    }
+    if (row.takes & cimom::kFilter) {
         verb->add_option("--count", arguments.count, "End after this many indications");
-    if (row.takes & (cimom::kPropertyValues | cimom::kInputValues))
+    }
+    if (row.takes & (cimom::kPropertyValues | cimom::kInputValues)) {
         verb->add_option("values", arguments.assignments,
                          row.takes & cimom::kPropertyValues ? "Properties, each as name=value"
                                                             : "Input arguments, each as name=value")
             ->option_text("name=value ...");
+    }
     return verb;
 }
 
@@ -170,7 +175,9 @@ int reportFailure(CMPIrc rc, const std::string& message) {
 
 void printLine(const cimom::LogLine& line, int level) {
     const bool trace = line.kind == cimom::LogLine::Kind::Trace;
-    if (trace && line.level > level) return;
+    if (trace && line.level > level) {
+        return;
+    }
     std::fprintf(stderr, "%s %d %s: %s\n", trace ? "trace" : "log", line.level,
                  line.component.c_str(), line.text.c_str());
 }
@@ -180,16 +187,22 @@ class Waiting {
 public:
     /// @param what  the request; empty for one that lasts by its nature
     explicit Waiting(const std::string& what) {
-        if (what.empty() || isatty(STDERR_FILENO) == 0) return;
+        if (what.empty() || isatty(STDERR_FILENO) == 0) {
+            return;
+        }
         m_thread = std::thread([this, what] {
             std::unique_lock<std::mutex> lock(m_mutex);
             for (int seconds = 1;
                  !m_over.wait_for(lock, std::chrono::seconds(1), [this] { return m_ended; });
                  ++seconds) {
-                if (seconds > 1) std::fprintf(stderr, "\r%s: %d s", what.c_str(), seconds);
+                if (seconds > 1) {
+                    std::fprintf(stderr, "\r%s: %d s", what.c_str(), seconds);
+                }
                 m_shown = seconds > 1;
             }
-            if (m_shown) std::fputs("\r\033[K", stderr);
+            if (m_shown) {
+                std::fputs("\r\033[K", stderr);
+            }
         });
     }
     ~Waiting() { end(); }
@@ -198,7 +211,9 @@ public:
 
     /// Takes away what it shows.
     void end() {
-        if (!m_thread.joinable()) return;
+        if (!m_thread.joinable()) {
+            return;
+        }
         {
             const std::lock_guard<std::mutex> lock(m_mutex);
             m_ended = true;
@@ -216,17 +231,22 @@ private:
 };
 
 int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments) {
-    if (settings.registrations.empty() && !(verb.takes & cimom::kNoProvider))
+    if (settings.registrations.empty() && !(verb.takes & cimom::kNoProvider)) {
         throw std::runtime_error(
             "no providers: name a registration, by --registration or CIMOM_REGISTRATION");
+    }
     cimom::ResultStream out(settings.providerOutput);
-    if (!settings.schema.empty())
+    if (!settings.schema.empty()) {
         settings.options.classes = cimom::ClassRepository::load(settings.schema);
+    }
     cimom::Server server(settings.options);
-    for (const std::string& file : settings.registrations) server.loadRegistration(file);
-    if (settings.traceLevel >= 0)
+    for (const std::string& file : settings.registrations) {
+        server.loadRegistration(file);
+    }
+    if (settings.traceLevel >= 0) {
         server.setLogHook(
             [level = settings.traceLevel](const cimom::LogLine& line) { printLine(line, level); });
+    }
     const bool lean = settings.options.character == cimom::Character::Lean;
     cimom::Session session{server,
                            settings.request,
@@ -240,7 +260,9 @@ int run(const cimom::Verb& verb, Settings& settings, const Arguments& arguments)
     try {
         const cimom::Reply reply = verb.run(session, arguments);
         waiting.end();
-        if (!reply.ok()) return reportFailure(reply.rc, reply.message);
+        if (!reply.ok()) {
+            return reportFailure(reply.rc, reply.message);
+        }
         return out.failure() == 0 ? 0 : reportOutput(out.failure());
     } catch (const cimom::Failure& failure) {
         waiting.end();
@@ -258,8 +280,9 @@ int runCommandLine(int argc, char** argv) {
     Arguments arguments;
     addGlobals(app, settings);
     const cimom::Verb* chosen = nullptr;
-    for (const cimom::Verb& row : cimom::verbs())
+    for (const cimom::Verb& row : cimom::verbs()) {
         addVerb(app, row, settings, arguments)->callback([&chosen, verb = &row] { chosen = verb; });
+    }
     try {
         app.parse(argc, argv);
     } catch (const CLI::ParseError& error) {
@@ -268,7 +291,9 @@ int runCommandLine(int argc, char** argv) {
             std::fprintf(stderr, "cimom: no verb '%s'; cimom --help lists them\n", rest[0].c_str());
             return kUsageError;
         }
-        if (app.exit(error) != 0) return kUsageError;
+        if (app.exit(error) != 0) {
+            return kUsageError;
+        }
         return std::cout.flush() ? 0 : reportOutput(errno);
     }
     return run(*chosen, settings, arguments);

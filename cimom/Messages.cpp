@@ -21,7 +21,9 @@ struct Wish {
 
 std::string trimmed(const std::string& text) {
     const std::size_t from = text.find_first_not_of(" \t");
-    if (from == std::string::npos) return {};
+    if (from == std::string::npos) {
+        return {};
+    }
     return text.substr(from, text.find_last_not_of(" \t") - from + 1);
 }
 
@@ -33,7 +35,9 @@ Wish parseWish(const std::string& item) {
     std::replace(wish.language.begin(), wish.language.end(), '-', '_');
     if (semicolon != std::string::npos) {
         const std::size_t q = item.find("q=", semicolon);
-        if (q != std::string::npos) wish.weight = std::strtod(item.c_str() + q + 2, nullptr);
+        if (q != std::string::npos) {
+            wish.weight = std::strtod(item.c_str() + q + 2, nullptr);
+        }
     }
     return wish;
 }
@@ -48,7 +52,9 @@ std::vector<std::string> wantedLanguages(const std::string& acceptLanguage) {
         const bool plain = std::all_of(wish.language.begin(), wish.language.end(), [](char c) {
             return std::isalnum(static_cast<unsigned char>(c)) || c == '_';
         });
-        if (!wish.language.empty() && plain && wish.weight > 0) wishes.push_back(std::move(wish));
+        if (!wish.language.empty() && plain && wish.weight > 0) {
+            wishes.push_back(std::move(wish));
+        }
     }
     std::stable_sort(wishes.begin(), wishes.end(),
                      [](const Wish& a, const Wish& b) { return a.weight > b.weight; });
@@ -56,7 +62,9 @@ std::vector<std::string> wantedLanguages(const std::string& acceptLanguage) {
     for (const Wish& wish : wishes) {
         languages.push_back(wish.language);
         const std::size_t region = wish.language.find('_');
-        if (region != std::string::npos) languages.push_back(wish.language.substr(0, region));
+        if (region != std::string::npos) {
+            languages.push_back(wish.language.substr(0, region));
+        }
     }
     return languages;
 }
@@ -82,13 +90,20 @@ std::string withInserts(const std::string& text, const std::vector<std::string>&
 
 MessageStore::Handle MessageStore::read(const std::string& file) {
     const auto known = m_files.find(file);
-    if (known != m_files.end()) return known->second.get();
+    if (known != m_files.end()) {
+        return known->second.get();
+    }
     std::ifstream in(file);
     const auto json = in ? nlohmann::json::parse(in, nullptr, false) : nlohmann::json();
-    if (!json.is_object()) return nullptr;
+    if (!json.is_object()) {
+        return nullptr;
+    }
     auto texts = std::make_unique<MessageTexts>();
-    for (const auto& [id, text] : json.items())
-        if (text.is_string()) texts->emplace(id, text.get<std::string>());
+    for (const auto& [id, text] : json.items()) {
+        if (text.is_string()) {
+            texts->emplace(id, text.get<std::string>());
+        }
+    }
     return m_files.emplace(file, std::move(texts)).first->second.get();
 }
 
@@ -96,16 +111,23 @@ MessageStore::Handle MessageStore::open(const std::string& bundle,
                                         const std::vector<std::string>& languages) {
     std::vector<std::string> stems;
     const std::size_t slash = bundle.rfind('/');
-    if (slash != std::string::npos) stems.push_back(bundle);
+    if (slash != std::string::npos) {
+        stems.push_back(bundle);
+    }
     const std::string name = bundle.empty() ? kDefaultBundle : bundle.substr(slash + 1);
-    if (!m_folder.empty()) stems.push_back(m_folder + "/" + name);
+    if (!m_folder.empty()) {
+        stems.push_back(m_folder + "/" + name);
+    }
 
     std::lock_guard<std::mutex> lock(m_mutex);
     for (const std::string& stem : stems) {
         Handle handle = nullptr;
-        for (auto at = languages.begin(); !handle && at != languages.end(); ++at)
+        for (auto at = languages.begin(); !handle && at != languages.end(); ++at) {
             handle = read(stem + "_" + *at + ".json");
-        if (!handle) handle = read(stem + ".json");
+        }
+        if (!handle) {
+            handle = read(stem + ".json");
+        }
         if (handle) {
             m_open.insert(handle);
             return handle;
@@ -117,14 +139,18 @@ MessageStore::Handle MessageStore::open(const std::string& bundle,
 bool MessageStore::close(Handle handle) {
     std::lock_guard<std::mutex> lock(m_mutex);
     const auto at = m_open.find(handle);
-    if (at == m_open.end()) return false;
+    if (at == m_open.end()) {
+        return false;
+    }
     m_open.erase(at);
     return true;
 }
 
 const std::string* MessageStore::find(Handle handle, const std::string& id) {
     std::lock_guard<std::mutex> lock(m_mutex);
-    if (m_open.count(handle) == 0) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "bundle not open");
+    if (m_open.count(handle) == 0) {
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "bundle not open");
+    }
     const auto at = handle->find(id);
     return at == handle->end() ? nullptr : &at->second;
 }

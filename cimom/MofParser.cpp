@@ -56,7 +56,9 @@ template <std::size_t N>
 const Word& rowOf(const Word (&rows)[N], const MofPlace& place, const std::string& word) {
     std::string words;
     for (const Word& row : rows) {
-        if (sameName(row.word, word)) return row;
+        if (sameName(row.word, word)) {
+            return row;
+        }
         words += (words.empty() ? "" : ", ") + std::string(row.word);
     }
     MofInput::fail(place, "expected one of " + words + "; found '" + word + "'");
@@ -65,10 +67,13 @@ const Word& rowOf(const Word (&rows)[N], const MofPlace& place, const std::strin
 std::string describe(const std::vector<MofFault>& faults) {
     std::string all;
     for (const MofFault& fault : faults) {
-        if (!all.empty()) all += '\n';
+        if (!all.empty()) {
+            all += '\n';
+        }
         all += fault.file;
-        if (fault.line > 0)
+        if (fault.line > 0) {
             all += ':' + std::to_string(fault.line) + ':' + std::to_string(fault.column);
+        }
         all += ": " + fault.text;
     }
     return all;
@@ -92,13 +97,19 @@ MofError::MofError(std::vector<MofFault> faults)
 
 std::string readRegularFile(const std::string& path) {
     struct stat status = {};
-    if (stat(path.c_str(), &status) != 0)
+    if (stat(path.c_str(), &status) != 0) {
         throw std::runtime_error(std::generic_category().message(errno));
-    if (!S_ISREG(status.st_mode)) throw std::runtime_error("not a regular file");
-    if (static_cast<std::uintmax_t>(status.st_size) > kMaxFileSize)
+    }
+    if (!S_ISREG(status.st_mode)) {
+        throw std::runtime_error("not a regular file");
+    }
+    if (static_cast<std::uintmax_t>(status.st_size) > kMaxFileSize) {
         throw std::runtime_error("larger than 16 MiB");
+    }
     std::ifstream file(path, std::ios::binary);
-    if (!file) throw std::runtime_error(std::generic_category().message(errno));
+    if (!file) {
+        throw std::runtime_error(std::generic_category().message(errno));
+    }
     std::string text(static_cast<std::size_t>(status.st_size), '\0');
     file.read(text.data(), static_cast<std::streamsize>(text.size()));
     text.resize(static_cast<std::size_t>(file.gcount()));  // it may have shrunk meanwhile
@@ -108,13 +119,23 @@ std::string readRegularFile(const std::string& path) {
 void MofSession::parseFile(const std::string& path, const MofPlace* includedAt) {
     const std::string name = std::filesystem::path(path).lexically_normal().string();
     auto refuse = [&](const std::string& reason) {
-        if (includedAt) MofInput::fail(*includedAt, "cannot read '" + name + "': " + reason);
+        if (includedAt) {
+            MofInput::fail(*includedAt, "cannot read '" + name + "': " + reason);
+        }
         throw MofError({{name, 0, 0, "cannot be read: " + reason}});
     };
-    if (std::find(m_open.begin(), m_open.end(), name) != m_open.end()) refuse("it includes itself");
-    if (m_open.size() >= kMaxIncludeDepth) refuse("files are included too deep");
-    if (m_read.size() >= kMaxFiles) refuse("too many files");
-    if (!m_read.insert(name).second) return;
+    if (std::find(m_open.begin(), m_open.end(), name) != m_open.end()) {
+        refuse("it includes itself");
+    }
+    if (m_open.size() >= kMaxIncludeDepth) {
+        refuse("files are included too deep");
+    }
+    if (m_read.size() >= kMaxFiles) {
+        refuse("too many files");
+    }
+    if (!m_read.insert(name).second) {
+        return;
+    }
 
     std::string text;
     try {
@@ -122,15 +143,21 @@ void MofSession::parseFile(const std::string& path, const MofPlace* includedAt) 
     } catch (const std::runtime_error& failure) {
         refuse(failure.what());
     }
-    if (text.size() > kMaxFileSize) refuse("larger than 16 MiB");
+    if (text.size() > kMaxFileSize) {
+        refuse("larger than 16 MiB");
+    }
     std::string_view body = text;
-    if (body.substr(0, 3) == "\xEF\xBB\xBF") body.remove_prefix(3);
+    if (body.substr(0, 3) == "\xEF\xBB\xBF") {
+        body.remove_prefix(3);
+    }
 
     m_open.push_back(name);
     m_declarations.files.push_back(name);
     MofInput input(*this, &m_declarations.files.back());
     void* scanner = nullptr;
-    if (moflex_init_extra(&input, &scanner) != 0) throw std::bad_alloc();
+    if (moflex_init_extra(&input, &scanner) != 0) {
+        throw std::bad_alloc();
+    }
     const std::unique_ptr<void, int (*)(void*)> freed(scanner, moflex_destroy);
     mof_scan_bytes(body.data(), static_cast<int>(body.size()), scanner);
     MofGrammar(input, scanner).parse();
@@ -167,9 +194,13 @@ void MofInput::advance(const char* text, std::size_t length) {
 }
 
 std::string MofInput::shownLexeme() const {
-    if (m_lexeme.size() <= kShownLength) return m_lexeme;
+    if (m_lexeme.size() <= kShownLength) {
+        return m_lexeme;
+    }
     std::size_t length = kShownLength;
-    while ((static_cast<unsigned char>(m_lexeme[length]) & 0xC0) == 0x80) --length;
+    while ((static_cast<unsigned char>(m_lexeme[length]) & 0xC0) == 0x80) {
+        --length;
+    }
     return m_lexeme.substr(0, length) + "...";
 }
 
@@ -179,10 +210,14 @@ MofInteger MofInput::integer(std::string_view digits, int base) const {
         number.isNegative = digits[0] == '-';
         digits.remove_prefix(1);
     }
-    if (base == 16) digits.remove_prefix(2);
+    if (base == 16) {
+        digits.remove_prefix(2);
+    }
     auto result =
         std::from_chars(digits.data(), digits.data() + digits.size(), number.magnitude, base);
-    if (result.ec != std::errc()) fail(m_start, "'" + shownLexeme() + "' is too large");
+    if (result.ec != std::errc()) {
+        fail(m_start, "'" + shownLexeme() + "' is too large");
+    }
     return number;
 }
 
@@ -191,7 +226,9 @@ double MofInput::real() const {
     std::size_t sign = m_lexeme[0] == '+' ? 1 : 0;  // from_chars takes no plus
     auto result =
         std::from_chars(m_lexeme.data() + sign, m_lexeme.data() + m_lexeme.size(), number);
-    if (result.ec != std::errc()) fail(m_start, "'" + shownLexeme() + "' is out of range");
+    if (result.ec != std::errc()) {
+        fail(m_start, "'" + shownLexeme() + "' is out of range");
+    }
     return number;
 }
 
@@ -211,8 +248,9 @@ std::string MofInput::unquoted() const {
             continue;
         }
         unsigned code = readHex(m_lexeme, i);
-        if (code == 0 || (code >= 0xD800 && code < 0xE000))
+        if (code == 0 || (code >= 0xD800 && code < 0xE000)) {
             fail(m_start, "a \\x escape here names no character");
+        }
         text += utf8(code);
     }
     return text;
@@ -220,27 +258,34 @@ std::string MofInput::unquoted() const {
 
 std::uint16_t MofInput::character() const {
     const std::string text = unquoted();
-    if (text.size() > 3) fail(m_start, "this character does not fit 16 bits");
+    if (text.size() > 3) {
+        fail(m_start, "this character does not fit 16 bits");
+    }
     static constexpr unsigned kBitsOfFirst[] = {0x7F, 0x1F, 0x0F};  // of one, two, three bytes
     unsigned code = static_cast<unsigned char>(text[0]) & kBitsOfFirst[text.size() - 1];
-    for (std::size_t i = 1; i < text.size(); ++i)
+    for (std::size_t i = 1; i < text.size(); ++i) {
         code = code << 6 | (static_cast<unsigned char>(text[i]) & 0x3F);
+    }
     return static_cast<std::uint16_t>(code);
 }
 
 void MofInput::pragma(const MofPlace& place, const std::string& name,
                       const std::vector<MofLiteral>& arguments) {
-    if (!sameName(name, "include")) return;
+    if (!sameName(name, "include")) {
+        return;
+    }
     const Value* path = arguments.size() == 1 ? std::get_if<Value>(&arguments[0].value) : nullptr;
-    if (!path || path->type() != CMPI_string || path->text().empty())
+    if (!path || path->type() != CMPI_string || path->text().empty()) {
         fail(place, "expected one path in quotes behind 'include'");
+    }
     std::filesystem::path here(*place.file);
     m_session.parseFile((here.parent_path() / path->text()).string(), &arguments[0].place);
 }
 
 std::uint32_t MofInput::arraySize(const MofPlace& place, const MofInteger& size) const {
-    if (size.isNegative || size.magnitude == 0 || size.magnitude > UINT32_MAX)
+    if (size.isNegative || size.magnitude == 0 || size.magnitude > UINT32_MAX) {
         fail(place, "expected an array size from 1 to 4294967295");
+    }
     return static_cast<std::uint32_t>(size.magnitude);
 }
 

@@ -20,7 +20,9 @@ template <class C>
 CMPIData namedData(Broker& broker, const BodyOf<C>& body, const std::string& name,
                    const Value& value) {
     CMPIData data = makeData(broker, value);
-    if (isKey(body, name)) data.state |= CMPI_keyValue;
+    if (isKey(body, name)) {
+        data.state |= CMPI_keyValue;
+    }
     // Small brokers hand out a principal even when there is none: a string without a text.
     if (std::is_same_v<C, CMPIContext> && broker.lean() && value.isNull() &&
         sameName(name, CMPIPrincipal)) {
@@ -45,14 +47,18 @@ template <class C>
 CMPIData getNamed(BodyOf<C>& body, Broker& broker, const char* name) {
     const std::string wanted = textOf(name);
     const Value* value = namedIn(body).find(wanted);
-    if (!value) throw Failure(missingName<C>(broker), "no " + wanted);
+    if (!value) {
+        throw Failure(missingName<C>(broker), "no " + wanted);
+    }
     return namedData<C>(broker, body, wanted, *value);
 }
 
 template <class C>
 CMPIData getNamedAt(BodyOf<C>& body, Broker& broker, CMPICount index, CMPIString** name) {
     const NamedValues::Entry& entry = elementAt(namedIn(body), index, missing<C>(broker));
-    if (name) *name = makeString(broker, entry.name);
+    if (name) {
+        *name = makeString(broker, entry.name);
+    }
     return namedData<C>(broker, body, entry.name, entry.value);
 }
 
@@ -63,7 +69,9 @@ CMPICount countNamed(BodyOf<C>& body, Broker&) {
 
 template <class C>
 void setNamed(BodyOf<C>& body, Broker&, const char* name, const CMPIValue* value, CMPIType type) {
-    if (!name || !*name) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
+    if (!name || !*name) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "a value without name");
+    }
     namedIn(body).set(name, readValue(value, type));
 }
 

@@ -31,12 +31,15 @@ CMPIData badData(CMPIType type) {
 }
 // Small brokers find no fault with a position behind the end.
 CMPIData getElement(ArrayBody& body, Broker& broker, CMPICount index) {
-    if (broker.lean() && index >= body.elements.size()) return badData(body.elementType);
+    if (broker.lean() && index >= body.elements.size()) {
+        return badData(body.elementType);
+    }
     const Value& element = elementAt(body.elements, index);
     CMPIData data = makeData(broker, element);
     data.type = body.elementType;
-    if (data.type == CMPI_chars && !element.isNull())
+    if (data.type == CMPI_chars && !element.isNull()) {
         data.value.chars = const_cast<char*>(element.text().c_str());
+    }
     return data;
 }
 // Small brokers have arrays of strings alone and turn texts of C into these; others have arrays of
@@ -46,12 +49,15 @@ void setElement(ArrayBody& body, Broker& broker, CMPICount index, const CMPIValu
     const bool lean = broker.lean();
     Value& element =
         elementAt(body.elements, index, lean ? CMPI_RC_ERR_FAILED : CMPI_RC_ERR_NO_SUCH_PROPERTY);
-    if (!lean && !value) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no value");
+    if (!lean && !value) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no value");
+    }
     Value given = readValue(value, type);
     const CMPIType givenType = lean ? given.type() : type;
-    if (givenType != body.elementType && givenType != CMPI_null)
+    if (givenType != body.elementType && givenType != CMPI_null) {
         throw Failure(lean ? CMPI_RC_ERR_FAILED : CMPI_RC_ERR_TYPE_MISMATCH,
                       typeName(givenType) + " in an array of " + typeName(body.elementType));
+    }
     given.retypeNull(stringFor(body.elementType));
     element = std::move(given);
 }
@@ -60,10 +66,16 @@ void setElement(ArrayBody& body, Broker& broker, CMPICount index, const CMPIValu
 // with going on behind the last.
 CMPIData nextItem(EnumerationBody& body, Broker& broker) {
     const bool over = body.next == body.items.size();
-    if (over && broker.lean()) return badData(CMPI_null);
-    if (over) throw Failure(CMPI_RC_NO_MORE_ELEMENTS);
+    if (over && broker.lean()) {
+        return badData(CMPI_null);
+    }
+    if (over) {
+        throw Failure(CMPI_RC_NO_MORE_ELEMENTS);
+    }
     CMPIData data = makeData(broker, body.items[body.next++]);
-    if (!broker.lean()) data.state = CMPI_nullValue;
+    if (!broker.lean()) {
+        data.state = CMPI_nullValue;
+    }
     return data;
 }
 CMPIBoolean hasNext(EnumerationBody& body, Broker&) { return body.next < body.items.size(); }
@@ -86,7 +98,9 @@ template <bool WithHost>
 void setPlaceFrom(ObjectPath& body, Broker&, const CMPIObjectPath* source) {
     const ObjectPath& from = bodyOf(source);
     body.nameSpace = from.nameSpace;
-    if (WithHost) body.host = from.host;
+    if (WithHost) {
+        body.host = from.host;
+    }
 }
 CMPIString* pathText(ObjectPath& body, Broker& broker) {
     return makeString(broker, printPath(body));
@@ -95,13 +109,21 @@ CMPIString* pathText(ObjectPath& body, Broker& broker) {
 // The qualifier of whatever @p select finds in the class of a path.
 template <class F>
 CMPIData qualifier(const ObjectPath& path, Broker& broker, const char* name, F select) {
-    if (broker.lean() || !broker.classes()) throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    if (broker.lean() || !broker.classes()) {
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     const CimClass* cls = broker.classOf(path);
-    if (!cls) throw Failure(CMPI_RC_ERR_INVALID_CLASS, path.className);
+    if (!cls) {
+        throw Failure(CMPI_RC_ERR_INVALID_CLASS, path.className);
+    }
     const auto* element = select(*cls);
-    if (!element) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no such element");
+    if (!element) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no such element");
+    }
     const CimQualifier* found = element->qualifiers.find(textOf(name));
-    if (!found) throw Failure(CMPI_RC_ERR_NOT_FOUND, textOf(name));
+    if (!found) {
+        throw Failure(CMPI_RC_ERR_NOT_FOUND, textOf(name));
+    }
     return makeData(broker, found->value);
 }
 CMPIData classQualifier(ObjectPath& path, Broker& broker, const char* name) {
@@ -128,23 +150,29 @@ CMPIData parameterQualifier(ObjectPath& path, Broker& broker, const char* method
 // -- contexts ---------------------------------------------------------------------------------
 
 CMPIContext* cloneContext(NamedValues& body, Broker& broker) {
-    if (broker.lean()) throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    if (broker.lean()) {
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED);
+    }
     return cloneBody<CMPIContext>(body, broker);
 }
 
 // -- results ----------------------------------------------------------------------------------
 
 void returnData(ResultBody& body, Broker& broker, const CMPIValue* value, CMPIType type) {
-    if (!broker.lean() && !value) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no value");
-    if (broker.lean() && type == CMPI_ref)
+    if (!broker.lean() && !value) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no value");
+    }
+    if (broker.lean() && type == CMPI_ref) {
         throw Failure(CMPI_RC_ERR_FAILED, "a path is returned by returnObjectPath alone");
+    }
     const Value given = readValue(value, type);
-    if (!given.isNull() && given.type() == CMPI_instance)
+    if (!given.isNull() && given.type() == CMPI_instance) {
         body.reply->instances.push_back(given.instance());
-    else if (!given.isNull() && given.type() == CMPI_ref)
+    } else if (!given.isNull() && given.type() == CMPI_ref) {
         body.reply->paths.push_back(given.reference());
-    else
+    } else {
         body.reply->values.push_back(given);
+    }
 }
 void returnInstance(ResultBody& body, Broker&, const CMPIInstance* instance) {
     body.reply->instances.push_back(bodyOf(instance).value);

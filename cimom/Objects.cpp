@@ -16,7 +16,9 @@ public:
         Lines& lines = mine();
         std::lock_guard<std::mutex> lock(lines.mutex);
         Link& line = lines.ofKind[kind];
-        if (line.next == &line) return make(kind);
+        if (line.next == &line) {
+            return make(kind);
+        }
         auto& chunk = static_cast<Chunk&>(*line.next);
         chunk.remove();
         return chunk;
@@ -82,7 +84,9 @@ Pool::Pool(Broker& broker) : m_broker(broker) { mark(); }
 
 // What could throw is a lock of a broken process, which then ends.
 Pool::~Pool() {  // NOLINT(bugprone-exception-escape)
-    for (const auto& each : m_levels) clear(*each);
+    for (const auto& each : m_levels) {
+        clear(*each);
+    }
 }
 
 void Pool::clear(Level& level) {
@@ -91,8 +95,11 @@ void Pool::clear(Level& level) {
         auto& chunk = static_cast<Chunk&>(*level.chunks.prev);
         withKind(chunk.kind, [&chunk](auto of) {
             auto& nodes = static_cast<ChunkOf<typename decltype(of)::Face>&>(chunk).nodes;
-            for (unsigned i = chunk.used; i-- > 0;)
-                if (nodes[i].body) retire(nodes[i]);
+            for (unsigned i = chunk.used; i-- > 0;) {
+                if (nodes[i].body) {
+                    retire(nodes[i]);
+                }
+            }
         });
         countLive(m_broker, -static_cast<std::ptrdiff_t>(chunk.alive));
         giveBack(chunk);
@@ -115,7 +122,9 @@ Chunk& Pool::openChunk(std::size_t kind) {
         open->insertBefore(level.chunks);
     }
     Chunk& chunk = *open;
-    if (chunk.used + 1 == Chunk::kNodes) open = nullptr;
+    if (chunk.used + 1 == Chunk::kNodes) {
+        open = nullptr;
+    }
     return chunk;
 }
 
@@ -131,11 +140,15 @@ bool Pool::release(const void* level) {
         std::lock_guard<std::mutex> lock(m_mutex);
         const auto from = std::find_if(m_levels.begin() + 1, m_levels.end(),
                                        [level](const auto& l) { return l.get() == level; });
-        if (from == m_levels.end()) return false;
+        if (from == m_levels.end()) {
+            return false;
+        }
         std::move(from, m_levels.end(), std::back_inserter(ended));
         m_levels.erase(from, m_levels.end());
     }
-    for (const auto& each : ended) clear(*each);
+    for (const auto& each : ended) {
+        clear(*each);
+    }
     return true;
 }
 
@@ -145,7 +158,9 @@ void Pool::free(Node& node) {
              [&node](auto of) { retire(static_cast<NodeOf<typename decltype(of)::Face>&>(node)); });
     countLive(m_broker, -1);
     std::lock_guard<std::mutex> lock(m_mutex);
-    if (--chunk.alive == 0 && chunk.used == Chunk::kNodes) giveBack(chunk);
+    if (--chunk.alive == 0 && chunk.used == Chunk::kNodes) {
+        giveBack(chunk);
+    }
 }
 
 // -- from C and back -------------------------------------------------------------------------
@@ -155,11 +170,17 @@ CMPIString* makeString(Broker& broker, const std::string& text) {
 }
 
 void setStatus(CMPIStatus* out, CMPIrc rc, Broker* broker, const char* text) {
-    if (!out) return;
+    if (!out) {
+        return;
+    }
     out->rc = rc;
     out->msg = nullptr;
-    if (!broker || !text || !*text) return;
-    if (&currentPool(*broker) == &strayPool(*broker)) return;  // nobody would release the text
+    if (!broker || !text || !*text) {
+        return;
+    }
+    if (&currentPool(*broker) == &strayPool(*broker)) {
+        return;  // nobody would release the text
+    }
     try {
         out->msg = makeString(*broker, text);
     } catch (const std::exception&) {  // out of memory: the code alone must do
@@ -193,7 +214,9 @@ bool withNumber(CMPIType type, F f) {
 }
 
 Value readArray(const CMPIArray* array, CMPIType type) {
-    if (!array) return Value::null(type);
+    if (!array) {
+        return Value::null(type);
+    }
     const ArrayBody& body = bodyOf(array);
     return Value::array(stringFor(body.elementType), body.elements);
 }
@@ -201,7 +224,9 @@ Value readArray(const CMPIArray* array, CMPIType type) {
 Value readObject(const CMPIValue& value, CMPIType type) {
     switch (type) {
         case CMPI_string: {
-            if (!value.string) return Value::null(CMPI_string);
+            if (!value.string) {
+                return Value::null(CMPI_string);
+            }
             const StringBody& body = bodyOf(value.string);
             return body.null ? Value::null(CMPI_string) : Value(body.text);
         }
@@ -224,25 +249,45 @@ Value readObject(const CMPIValue& value, CMPIType type) {
 
 CMPIType stringFor(CMPIType type) {
     const auto element = static_cast<CMPIType>(type & ~CMPI_ARRAY);
-    if (element != CMPI_chars && element != CMPI_charsptr) return type;
+    if (element != CMPI_chars && element != CMPI_charsptr) {
+        return type;
+    }
     return static_cast<CMPIType>(CMPI_string | (type & CMPI_ARRAY));
 }
 
 Value readValue(const CMPIValue* value, CMPIType type) {
-    if (!value) return Value::null(stringFor(type));
-    if (type & CMPI_ARRAY) return readArray(value->array, stringFor(type));
-    if (type == CMPI_null) return Value();
-    if (type == CMPI_boolean) return Value(value->boolean != 0);
-    if (type == CMPI_char16) return Value::char16(value->char16);
-    if (type == CMPI_chars) return Value(reinterpret_cast<const char*>(value));
+    if (!value) {
+        return Value::null(stringFor(type));
+    }
+    if (type & CMPI_ARRAY) {
+        return readArray(value->array, stringFor(type));
+    }
+    if (type == CMPI_null) {
+        return Value();
+    }
+    if (type == CMPI_boolean) {
+        return Value(value->boolean != 0);
+    }
+    if (type == CMPI_char16) {
+        return Value::char16(value->char16);
+    }
+    if (type == CMPI_chars) {
+        return Value(reinterpret_cast<const char*>(value));
+    }
     Value number;
-    if (withNumber(type, [&](auto member) { number = Value(value->*member); })) return number;
+    if (withNumber(type, [&](auto member) { number = Value(value->*member); })) {
+        return number;
+    }
     return readObject(*value, type);
 }
 
 Value readData(const CMPIData& data) {
-    if (data.state & (CMPI_nullValue | CMPI_notFound)) return Value::null(stringFor(data.type));
-    if (data.type == CMPI_chars) return Value(static_cast<const char*>(data.value.chars));
+    if (data.state & (CMPI_nullValue | CMPI_notFound)) {
+        return Value::null(stringFor(data.type));
+    }
+    if (data.type == CMPI_chars) {
+        return Value(static_cast<const char*>(data.value.chars));
+    }
     return readValue(&data.value, data.type);
 }
 
@@ -250,35 +295,41 @@ namespace {
 
 CMPIValue makeNumber(const Value& value) {
     CMPIValue out{};
-    if (value.type() == CMPI_boolean) out.boolean = value.boolean() ? 1 : 0;
-    if (value.type() == CMPI_char16) out.char16 = static_cast<CMPIChar16>(value.uint());
+    if (value.type() == CMPI_boolean) {
+        out.boolean = value.boolean() ? 1 : 0;
+    }
+    if (value.type() == CMPI_char16) {
+        out.char16 = static_cast<CMPIChar16>(value.uint());
+    }
     withNumber(value.type(), [&](auto member) {
         using Number = std::decay_t<decltype(out.*member)>;
-        if constexpr (std::is_floating_point_v<Number>)
+        if constexpr (std::is_floating_point_v<Number>) {
             out.*member = static_cast<Number>(value.real());
-        else if constexpr (std::is_signed_v<Number>)
+        } else if constexpr (std::is_signed_v<Number>) {
             out.*member = static_cast<Number>(value.sint());
-        else
+        } else {
             out.*member = static_cast<Number>(value.uint());
+        }
     });
     return out;
 }
 
 CMPIValue makeObject(Broker& broker, const Value& value) {
     CMPIValue out{};
-    if (value.isArray())
+    if (value.isArray()) {
         out.array = make<CMPIArray>(
             broker, {static_cast<CMPIType>(value.type() & ~CMPI_ARRAY), value.elements()});
-    else if (value.type() == CMPI_string)
+    } else if (value.type() == CMPI_string) {
         out.string = makeString(broker, value.text());
-    else if (value.type() == CMPI_dateTime)
+    } else if (value.type() == CMPI_dateTime) {
         out.dateTime = make<CMPIDateTime>(broker, value.dateTime());
-    else if (value.type() == CMPI_ref)
+    } else if (value.type() == CMPI_ref) {
         out.ref = make<CMPIObjectPath>(broker, value.reference());
-    else if (value.type() == CMPI_instance)
+    } else if (value.type() == CMPI_instance) {
         out.inst = make<CMPIInstance>(broker, instanceBody(broker, value.instance()));
-    else
+    } else {
         out.dataPtr = value.pointer();
+    }
     return out;
 }
 
@@ -288,7 +339,9 @@ CMPIData makeData(Broker& broker, const Value& value) {
     CMPIData data{};
     data.type = value.type();
     data.state = value.isNull() ? CMPI_nullValue : CMPI_goodValue;
-    if (value.isNull()) return data;
+    if (value.isNull()) {
+        return data;
+    }
     const bool encapsulated = (value.type() & (CMPI_ARRAY | CMPI_ENC)) != 0;
     data.value = encapsulated ? makeObject(broker, value) : makeNumber(value);
     return data;

@@ -83,10 +83,11 @@ constexpr std::size_t kKindCount = std::tuple_size_v<Kinds>;
 
 template <class C, std::size_t I = 0>
 constexpr std::size_t kindOf() {
-    if constexpr (std::is_same_v<typename std::tuple_element_t<I, Kinds>::Face, C>)
+    if constexpr (std::is_same_v<typename std::tuple_element_t<I, Kinds>::Face, C>) {
         return I;
-    else
+    } else {
         return kindOf<C, I + 1>();
+    }
 }
 template <class C>
 using BodyOf = typename std::tuple_element_t<kindOf<C>(), Kinds>::Body;
@@ -145,7 +146,9 @@ inline Node& nodeAt(const void* face) {
 template <class C>
 struct ChunkOf : Chunk {
     ChunkOf() : Chunk(kindOf<C>()) {
-        for (Node& node : nodes) node.chunk = this;
+        for (Node& node : nodes) {
+            node.chunk = this;
+        }
     }
     NodeOf<C> nodes[kNodes];
 };
@@ -153,8 +156,11 @@ struct ChunkOf : Chunk {
 /// Calls @p f with the Kind at a position in Kinds.
 template <std::size_t I = 0, class F>
 decltype(auto) withKind(std::size_t kind, F f) {
-    if constexpr (I + 1 < kKindCount)
-        if (kind != I) return withKind<I + 1>(kind, f);
+    if constexpr (I + 1 < kKindCount) {
+        if (kind != I) {
+            return withKind<I + 1>(kind, f);
+        }
+    }
     return f(std::tuple_element_t<I, Kinds>());
 }
 
@@ -215,10 +221,11 @@ template <class C>
 C* makeIn(Pool& pool, BodyOf<C> body) {
     NodeOf<C>& node = pool.take<C>();
     node.body.emplace(std::move(body));
-    if constexpr (std::is_same_v<C, CMPIString>)
+    if constexpr (std::is_same_v<C, CMPIString>) {
         node.face.hdl = node.body->null ? nullptr : node.body->text.data();
-    else
+    } else {
         node.face.hdl = &node;
+    }
     node.face.ft = &std::get<TableOf<C>>(objectTables(pool.broker()));
     countLive(pool.broker(), 1);
     return &node.face;
@@ -234,10 +241,13 @@ C* make(Broker& broker, BodyOf<C> body) {
 /// @throws Failure CMPI_RC_ERR_INVALID_HANDLE for null, released, or of another kind
 template <class C>
 NodeOf<C>& nodeOf(const C* object) {
-    if (!object) throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "null object");
+    if (!object) {
+        throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "null object");
+    }
     Node& node = nodeAt(object);
-    if (node.chunk->kind != kindOf<C>())
+    if (node.chunk->kind != kindOf<C>()) {
         throw Failure(CMPI_RC_ERR_INVALID_HANDLE, "object of another kind");
+    }
     auto& own = static_cast<NodeOf<C>&>(node);
     if (!own.body) {
         countStaleUse();
@@ -258,7 +268,9 @@ CMPIString* makeString(Broker& broker, const std::string& text);
 /// @throws Failure with @p missing when there is none
 template <class List>
 auto& elementAt(List& list, CMPICount index, CMPIrc missing = CMPI_RC_ERR_NO_SUCH_PROPERTY) {
-    if (index >= list.size()) throw Failure(missing, "index " + std::to_string(index));
+    if (index >= list.size()) {
+        throw Failure(missing, "index " + std::to_string(index));
+    }
     return list.begin()[index];
 }
 /// Reads a C value. A null @p value gives a null of the type; CMPI_chars values are the text
@@ -293,10 +305,11 @@ auto entry(CMPIStatus* rc, Broker* broker, F body) -> decltype(body()) {
     } catch (const std::exception& e) {
         setStatus(rc, CMPI_RC_ERROR_SYSTEM, broker, e.what());
     }
-    if constexpr (std::is_same_v<decltype(body()), CMPIData>)
+    if constexpr (std::is_same_v<decltype(body()), CMPIData>) {
         return noData(broker);
-    else if constexpr (!std::is_void_v<decltype(body())>)
+    } else if constexpr (!std::is_void_v<decltype(body())>) {
         return {};
+    }
 }
 
 /// Runs @p body with the content of an object and its broker.

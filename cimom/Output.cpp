@@ -24,25 +24,35 @@ ResultStream::ResultStream(const std::string& providerOutput)
                                   S_IRUSR | S_IWUSR | S_IRGRP | S_IROTH);
     if (target < 0 || m_descriptor < 0) {
         const std::string why = std::strerror(errno);
-        if (m_descriptor >= 0) close(m_descriptor);
+        if (m_descriptor >= 0) {
+            close(m_descriptor);
+        }
         throw std::runtime_error(file + ": " + why);
     }
     dup2(target, STDOUT_FILENO);
-    if (target != STDERR_FILENO) close(target);
+    if (target != STDERR_FILENO) {
+        close(target);
+    }
 }
 
 // Descriptor 1 stays as it is: what providers have in their buffers comes out at exit.
 ResultStream::~ResultStream() { close(m_descriptor); }
 
 bool ResultStream::write(const std::string& text) {
-    if (m_hook) std::exchange(m_hook, nullptr)();
+    if (m_hook) {
+        std::exchange(m_hook, nullptr)();
+    }
     for (std::size_t done = 0; done < text.size();) {
         const ssize_t count = ::write(m_descriptor, text.data() + done, text.size() - done);
         if (count < 0 && errno != EINTR) {
-            if (errno != EPIPE) m_failure = errno;
+            if (errno != EPIPE) {
+                m_failure = errno;
+            }
             return false;
         }
-        if (count > 0) done += static_cast<std::size_t>(count);
+        if (count > 0) {
+            done += static_cast<std::size_t>(count);
+        }
     }
     return true;
 }
@@ -56,23 +66,34 @@ using Json = nlohmann::ordered_json;
 Json toJson(const Instance& instance);
 
 Json toJson(const Value& value) {
-    if (value.isNull()) return nullptr;
+    if (value.isNull()) {
+        return nullptr;
+    }
     if (value.isArray()) {
         Json array = Json::array();
-        for (const Value& element : value.elements()) array.push_back(toJson(element));
+        for (const Value& element : value.elements()) {
+            array.push_back(toJson(element));
+        }
         return array;
     }
-    if (value.type() == CMPI_boolean) return value.boolean();
-    if (isReal(value.type())) return value.real();
-    if (isInteger(value.type())) return value.isSigned() ? Json(value.sint()) : Json(value.uint());
+    if (value.type() == CMPI_boolean) {
+        return value.boolean();
+    }
+    if (isReal(value.type())) {
+        return value.real();
+    }
+    if (isInteger(value.type())) {
+        return value.isSigned() ? Json(value.sint()) : Json(value.uint());
+    }
     return value.type() == CMPI_instance ? toJson(value.instance()) : Json(plainText(value));
 }
 
 // The names are known to differ, and so are put behind one another, not looked for.
 Json toJson(const NamedValues& values) {
     Json::object_t object;
-    for (const auto& [name, value] : values)
+    for (const auto& [name, value] : values) {
         object.Json::object_t::Container::emplace_back(name, toJson(value));
+    }
     return object;
 }
 
@@ -95,11 +116,15 @@ template <class List>
 std::string renderAll(const List& items, Format format) {
     if (format == Format::Json) {
         Json array = Json::array();
-        for (const auto& item : items) array.push_back(toJson(item));
+        for (const auto& item : items) {
+            array.push_back(toJson(item));
+        }
         return dump(array);
     }
     std::string out;
-    for (const auto& item : items) out += toText(item);
+    for (const auto& item : items) {
+        out += toText(item);
+    }
     return out;
 }
 
@@ -120,10 +145,13 @@ std::string render(const Value& value, Format format) {
 }
 
 std::string renderMethod(const Reply& reply, Format format) {
-    if (format == Format::Json)
+    if (format == Format::Json) {
         return dump({{"returnValue", toJson(reply.value())}, {"out", toJson(reply.out)}});
+    }
     std::string out = "returnValue = " + printValue(reply.value()) + ";\n";
-    for (const auto& [name, value] : reply.out) out += name + " = " + printValue(value) + ";\n";
+    for (const auto& [name, value] : reply.out) {
+        out += name + " = " + printValue(value) + ";\n";
+    }
     return out;
 }
 

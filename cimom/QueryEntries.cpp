@@ -21,7 +21,9 @@ Query::IsA isAIn(Broker& broker) {
 }
 
 Query::Accessor through(CMPIAccessor* accessor, void* parm) {
-    if (!accessor) throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no accessor");
+    if (!accessor) {
+        throw Failure(CMPI_RC_ERR_INVALID_PARAMETER, "no accessor");
+    }
     return [accessor, parm](const std::string& name) {
         return readData(accessor(name.c_str(), parm));
     };
@@ -40,7 +42,9 @@ CMPISelectCond* normalForm(QueryPtr& query, Broker& broker) {
 }
 
 CMPICount conditionCount(ConditionPtr& body, Broker&, int* type) {
-    if (type) *type = body->type;
+    if (type) {
+        *type = body->type;
+    }
     return static_cast<CMPICount>(body->parts.size());
 }
 CMPISubCond* subConditionAt(ConditionPtr& body, Broker& broker, CMPICount index) {
@@ -53,9 +57,11 @@ CMPIPredicate* predicateAt(SubConditionPtr& body, Broker& broker, CMPICount inde
     return make<CMPIPredicate>(broker, PredicatePtr(body, &elementAt(body->predicates, index)));
 }
 CMPIPredicate* predicateOf(SubConditionPtr& body, Broker& broker, const char* name) {
-    for (const Predicate& predicate : body->predicates)
-        if (sameName(predicate.name, textOf(name)))
+    for (const Predicate& predicate : body->predicates) {
+        if (sameName(predicate.name, textOf(name))) {
             return make<CMPIPredicate>(broker, PredicatePtr(body, &predicate));
+        }
+    }
     throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, textOf(name));
 }
 
@@ -65,17 +71,28 @@ CMPIType literalType(const Predicate& predicate) {
                                                         {CMPI_sint64, CMPI_integerString},
                                                         {CMPI_real64, CMPI_realString},
                                                         {CMPI_boolean, CMPI_booleanString}};
-    for (const auto& [type, kind] : kKinds)
-        if (type == predicate.literal.type()) return kind;
+    for (const auto& [type, kind] : kKinds) {
+        if (type == predicate.literal.type()) {
+            return kind;
+        }
+    }
     return CMPI_null;
 }
 void predicateData(PredicatePtr& body, Broker& broker, CMPIType* type, CMPIPredOp* op,
                    CMPIString** left, CMPIString** right) {
     const Value& literal = body->literal;
-    if (type) *type = literalType(*body);
-    if (op) *op = body->op;
-    if (left) *left = makeString(broker, body->name);
-    if (right) *right = literal.isNull() ? nullptr : makeString(broker, plainText(literal));
+    if (type) {
+        *type = literalType(*body);
+    }
+    if (op) {
+        *op = body->op;
+    }
+    if (left) {
+        *left = makeString(broker, body->name);
+    }
+    if (right) {
+        *right = literal.isNull() ? nullptr : makeString(broker, plainText(literal));
+    }
 }
 CMPIBoolean predicateHolds(PredicatePtr& body, Broker& broker, CMPIAccessor* accessor, void* parm) {
     return holds(*body, through(accessor, parm)(body->name), isAIn(broker));
@@ -84,14 +101,19 @@ CMPIBoolean predicateHolds(PredicatePtr& body, Broker& broker, CMPIAccessor* acc
 // The value of a name such as SourceInstance.Name; the class of the query may stand before it.
 Value valueAt(const Instance& instance, const std::string& className, const std::string& name) {
     // The class itself, as the left side of ISA, goes by the name SELF or OBJECTCLASS.
-    if (sameName(name, "SELF") || sameName(name, "OBJECTCLASS"))
+    if (sameName(name, "SELF") || sameName(name, "OBJECTCLASS")) {
         return Value(instance.path.className);
+    }
     const std::size_t dot = name.find('.');
     const std::string first = name.substr(0, dot);
     const Value* value = instance.properties.find(first);
-    if (dot == std::string::npos) return value ? *value : Value();
+    if (dot == std::string::npos) {
+        return value ? *value : Value();
+    }
     const std::string rest = name.substr(dot + 1);
-    if (sameName(first, className)) return valueAt(instance, {}, rest);
+    if (sameName(first, className)) {
+        return valueAt(instance, {}, rest);
+    }
     const bool deeper = value && !value->isNull() && value->type() == CMPI_instance;
     return deeper ? valueAt(value->instance(), {}, rest) : Value();
 }

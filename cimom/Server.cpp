@@ -13,8 +13,11 @@ namespace {
 class NameList {
 public:
     explicit NameList(const std::optional<std::vector<std::string>>& names) : m_all(!names) {
-        if (names)
-            for (const std::string& name : *names) m_pointers.push_back(name.c_str());
+        if (names) {
+            for (const std::string& name : *names) {
+                m_pointers.push_back(name.c_str());
+            }
+        }
         m_pointers.push_back(nullptr);
     }
     const char** get() { return m_all ? nullptr : m_pointers.data(); }
@@ -36,8 +39,12 @@ Server::Server(const Options& options) : m_impl(std::make_unique<Impl>(*this, op
 
 Server::~Server() {
     std::vector<SubscriptionId> open;
-    for (const auto& each : m_impl->subscriptions) open.push_back(each.first);
-    for (SubscriptionId id : open) unsubscribe({}, id);
+    for (const auto& each : m_impl->subscriptions) {
+        open.push_back(each.first);
+    }
+    for (SubscriptionId id : open) {
+        unsubscribe({}, id);
+    }
     unloadProviders(true);
 }
 
@@ -47,7 +54,9 @@ std::vector<std::string> Server::unloadProviders(bool terminating) {
     std::vector<std::string> stayed;
     for (Provider& provider : m_impl->providers) {
         Activation activation(m_impl->broker, contextOf({}, m_impl->broker.lean()));
-        if (!provider.unload(activation.context(), terminating)) stayed.push_back(provider.name());
+        if (!provider.unload(activation.context(), terminating)) {
+            stayed.push_back(provider.name());
+        }
     }
     return stayed;
 }
@@ -100,7 +109,9 @@ Reply Server::execQuery(const Request& request, const std::string& query,
             };
             found.erase(std::remove_if(found.begin(), found.end(), fails), found.end());
         }
-        if (!parsed->projection().empty()) all.properties = parsed->projection();
+        if (!parsed->projection().empty()) {
+            all.properties = parsed->projection();
+        }
         Impl::keepProperties(all.properties, reply);
         return reply;
     });
@@ -127,8 +138,9 @@ Reply Server::createInstance(const Request& request, const Instance& instance) {
             request, path, [&](CMPIInstanceMI* mi, const Call& call) {
                 const CMPIStatus status = calling(&CMPIInstanceMIFT::createInstance,
                                                   wrapInstance(m_impl->broker, whole))(mi, call);
-                if (status.rc == CMPI_RC_OK && call.reply.paths.empty())
+                if (status.rc == CMPI_RC_OK && call.reply.paths.empty()) {
                     throw ProviderFault("no path of the instance that it was to create");
+                }
                 return status;
             });
     });
@@ -139,7 +151,9 @@ Reply Server::modifyInstance(const Request& request, const Instance& instance) {
         std::optional<std::vector<std::string>> list = request.properties;
         if (!list && !m_impl->broker.lean()) {  // what the client gave, for more is in the instance
             list.emplace();
-            for (const auto& each : instance.properties) list->push_back(each.name);
+            for (const auto& each : instance.properties) {
+                list->push_back(each.name);
+            }
         }
         NameList names(list);
         const Instance whole = m_impl->filled(Instance(path, instance.properties));
@@ -213,8 +227,12 @@ namespace {
 
 // A value that is an instance or a path came the way of instances and paths.
 Reply withValues(Reply reply) {
-    for (const Instance& instance : reply.instances) reply.values.emplace_back(instance);
-    for (const ObjectPath& path : reply.paths) reply.values.emplace_back(path);
+    for (const Instance& instance : reply.instances) {
+        reply.values.emplace_back(instance);
+    }
+    for (const ObjectPath& path : reply.paths) {
+        reply.values.emplace_back(path);
+    }
     reply.instances.clear();
     reply.paths.clear();
     return reply;
@@ -225,7 +243,9 @@ NamedValues typedArguments(const Broker& broker, const ObjectPath& path, const s
                            const NamedValues& in) {
     const CimClass* cls = broker.classOf(path);
     const CimMethod* declared = cls ? cls->methods.find(method) : nullptr;
-    if (!declared) return in;
+    if (!declared) {
+        return in;
+    }
     NamedValues typed;
     for (const auto& [name, value] : in) {
         const CimParameter* parameter = declared->parameters.find(name);
@@ -257,15 +277,20 @@ Reply Server::invokeMethod(const Request& request, const ObjectPath& path,
 
 Reply Server::getProperty(const Request& request, const ObjectPath& path, const std::string& name) {
     return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
-        if (m_impl->providerOf(full, kProperty))
+        if (m_impl->providerOf(full, kProperty)) {
             return withValues(m_impl->callFor<CMPIPropertyMI>(
                 request, full, calling(&CMPIPropertyMIFT::getProperty, name.c_str())));
+        }
         Request one = request;
         one.properties = {name};
         Reply reply = getInstance(one, full);
-        if (!reply.ok()) return reply;
+        if (!reply.ok()) {
+            return reply;
+        }
         const Value* value = reply.instances.front().properties.find(name);
-        if (!value) throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, name);
+        if (!value) {
+            throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, name);
+        }
         reply.values.push_back(*value);
         reply.instances.clear();
         return reply;
@@ -275,12 +300,13 @@ Reply Server::getProperty(const Request& request, const ObjectPath& path, const 
 Reply Server::setProperty(const Request& request, const ObjectPath& path, const std::string& name,
                           const Value& value) {
     return answerAt(*m_impl, request, path, [&](const ObjectPath& full) {
-        if (m_impl->providerOf(full, kProperty))
+        if (m_impl->providerOf(full, kProperty)) {
             return m_impl->callFor<CMPIPropertyMI>(
                 request, full, [&](CMPIPropertyMI* mi, const Call& call) {
                     return calling(&CMPIPropertyMIFT::setProperty, name.c_str(),
                                    makeData(m_impl->broker, value))(mi, call);
                 });
+        }
         Request one = request;
         one.properties = {name};
         return modifyInstance(one, Instance(full, {{name, value}}));
@@ -386,8 +412,11 @@ constexpr StatusName kStatusNames[] = {
 }  // namespace
 
 const char* statusName(CMPIrc rc) {
-    for (const StatusName& row : kStatusNames)
-        if (row.rc == static_cast<int>(rc)) return row.name;
+    for (const StatusName& row : kStatusNames) {
+        if (row.rc == static_cast<int>(rc)) {
+            return row.name;
+        }
+    }
     return "CIM_ERR_UNKNOWN";
 }
 

@@ -87,7 +87,9 @@ public:
     Instance filled(Instance instance) const;
     /// Drops the properties not asked for, where the broker does that for its providers.
     void select(const Request& request, Reply& reply) const {
-        if (!broker.lean()) keepProperties(request.properties, reply);
+        if (!broker.lean()) {
+            keepProperties(request.properties, reply);
+        }
     }
     static void keepProperties(const std::optional<std::vector<std::string>>& names, Reply& reply);
 
@@ -178,8 +180,12 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
                          target.className.empty() ? nullptr : target.className.c_str(), *reply};
         const CMPIStatus status = body(&mi, parts);
         reply->rc = status.rc;
-        if (status.msg) reply->message = bodyOf(status.msg).text;
-        if (reply->ok()) refuseUnplaced(*reply);
+        if (status.msg) {
+            reply->message = bodyOf(status.msg).text;
+        }
+        if (reply->ok()) {
+            refuseUnplaced(*reply);
+        }
     } catch (const ProviderFault& fault) {
         reply->instances.clear();
         reply->paths.clear();
@@ -191,7 +197,9 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
         reply->fail(CMPI_RC_ERR_FAILED,
                     "provider " + target.provider->name() + " threw: " + e.what());
     } catch (...) {
-        if (!std::current_exception()) throw;  // a cancelled thread must end
+        if (!std::current_exception()) {
+            throw;  // a cancelled thread must end
+        }
         reply->fail(CMPI_RC_ERR_FAILED, "provider " + target.provider->name() + " threw");
     }
     return std::move(*reply);
@@ -200,10 +208,11 @@ Reply Server::Impl::call(const Request& request, const Target& target, const Obj
 /// Puts the elements of one list behind those of another.
 template <class List>
 void append(List& all, List& more) {
-    if (all.empty())
+    if (all.empty()) {
         all.swap(more);
-    else
+    } else {
         std::move(more.begin(), more.end(), std::back_inserter(all));
+    }
 }
 
 template <class MI, class Body>
@@ -224,7 +233,9 @@ Reply Server::Impl::callAll(const Request& request, const std::vector<Target>& t
         // a lean broker.
         const bool refuses =
             !broker.lean() && one.rc == CMPI_RC_ERR_NOT_SUPPORTED && ++refused < targets.size();
-        if (all.ok() && !one.ok() && !refuses) all.fail(one.rc, one.message);
+        if (all.ok() && !one.ok() && !refuses) {
+            all.fail(one.rc, one.message);
+        }
     }
     return all;
 }

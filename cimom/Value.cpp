@@ -41,9 +41,13 @@ bool isDigit(char c) { return c >= '0' && c <= '9'; }
 // Value of a field; asterisks give its lowest value.
 unsigned fieldValue(const std::string& text, const Field& field) {
     const std::string digits = text.substr(field.at, field.length);
-    if (digits.front() == '*') return field.low;
+    if (digits.front() == '*') {
+        return field.low;
+    }
     unsigned value = 0;
-    for (char c : digits) value = value * 10 + (c == '*' ? 0U : static_cast<unsigned>(c - '0'));
+    for (char c : digits) {
+        value = value * 10 + (c == '*' ? 0U : static_cast<unsigned>(c - '0'));
+    }
     return value;
 }
 
@@ -54,32 +58,45 @@ bool validFields(const std::string& text, const Field (&fields)[N]) {
         const std::string part = text.substr(field.at, field.length);
         const std::size_t digits =
             part.find('*') == std::string::npos ? part.size() : part.find('*');
-        if (!std::all_of(part.begin(), part.begin() + static_cast<std::ptrdiff_t>(digits), isDigit))
+        if (!std::all_of(part.begin(), part.begin() + static_cast<std::ptrdiff_t>(digits),
+                         isDigit)) {
             return false;
-        if (part.find_first_not_of('*', digits) != std::string::npos) return false;
+        }
+        if (part.find_first_not_of('*', digits) != std::string::npos) {
+            return false;
+        }
         // Only microseconds may be cut within the field.
-        if (digits != 0 && digits != part.size() && field.length != 6) return false;
-        if (wild && digits != 0) return false;
+        if (digits != 0 && digits != part.size() && field.length != 6) {
+            return false;
+        }
+        if (wild && digits != 0) {
+            return false;
+        }
         wild = digits != part.size();
         const unsigned value = fieldValue(text, field);
-        if (value < field.low || value > field.high) return false;
+        if (value < field.low || value > field.high) {
+            return false;
+        }
     }
     return true;
 }
 
 template <class T>
 std::shared_ptr<const T> nested(const T& object, unsigned nesting) {
-    if (nesting >= Value::kMostNested)
+    if (nesting >= Value::kMostNested) {
         throw Failure(CMPI_RC_ERR_INVALID_PARAMETER,
                       "paths and instances lie in one another more than " +
                           std::to_string(Value::kMostNested) + " deep");
+    }
     return std::make_shared<const T>(object);
 }
 
 // Range check and conversion between the integer representations.
 bool integerFits(CMPIType type, bool negative, std::uint64_t magnitude) {
     const unsigned bits = 8U << (type >> 4 & 3);
-    if ((type & CMPI_SINT) != CMPI_SINT) return !negative && (bits == 64 || magnitude >> bits == 0);
+    if ((type & CMPI_SINT) != CMPI_SINT) {
+        return !negative && (bits == 64 || magnitude >> bits == 0);
+    }
     const std::uint64_t limit = std::uint64_t{1} << (bits - 1);
     return negative ? magnitude <= limit : magnitude < limit;
 }
@@ -101,7 +118,9 @@ bool sameName(std::string_view a, std::string_view b) {
 
 std::size_t NameHash::operator()(std::string_view name) const {
     std::uint64_t hash = 14695981039346656037u;  // FNV-1a
-    for (char c : name) hash = (hash ^ static_cast<unsigned char>(lower(c))) * 1099511628211u;
+    for (char c : name) {
+        hash = (hash ^ static_cast<unsigned char>(lower(c))) * 1099511628211u;
+    }
     return static_cast<std::size_t>(hash);
 }
 
@@ -145,12 +164,17 @@ DateTime DateTime::now() {
 }
 
 bool DateTime::parse(const std::string& text, DateTime& result) {
-    if (text.size() != kDateTimeLength || text[kPointAt] != '.') return false;
+    if (text.size() != kDateTimeLength || text[kPointAt] != '.') {
+        return false;
+    }
     const char sign = text[kSignAt];
-    if (!std::all_of(text.begin() + kSignAt + 1, text.end(), isDigit)) return false;
+    if (!std::all_of(text.begin() + kSignAt + 1, text.end(), isDigit)) {
+        return false;
+    }
     if (sign == ':') {
-        if (text.compare(kSignAt, 4, ":000") != 0 || !validFields(text, kIntervalFields))
+        if (text.compare(kSignAt, 4, ":000") != 0 || !validFields(text, kIntervalFields)) {
             return false;
+        }
     } else if ((sign != '+' && sign != '-') || !validFields(text, kTimestampFields)) {
         return false;
     }
@@ -164,8 +188,9 @@ std::uint64_t DateTime::binary() const {
     if (isInterval()) {
         constexpr std::uint64_t kOfTheOneBefore[] = {1, 24, 60, 60, kMicrosPerSecond};
         std::uint64_t value = 0;
-        for (std::size_t i = 0; i < std::size(kIntervalFields); ++i)
+        for (std::size_t i = 0; i < std::size(kIntervalFields); ++i) {
             value = value * kOfTheOneBefore[i] + fieldValue(m_text, kIntervalFields[i]);
+        }
         return value;
     }
     const auto field = [this](std::size_t i) {
@@ -180,7 +205,9 @@ std::uint64_t DateTime::binary() const {
     utc.tm_sec = field(5);
     const long offset = std::strtol(m_text.c_str() + kSignAt, nullptr, 10);
     const std::int64_t seconds = timegm(&utc) - offset * 60;
-    if (seconds < 0) return 0;
+    if (seconds < 0) {
+        return 0;
+    }
     return static_cast<std::uint64_t>(seconds) * kMicrosPerSecond +
            static_cast<std::uint64_t>(field(6));
 }
@@ -215,13 +242,17 @@ Value Value::pointer(CMPIValuePtr area) {
 Value Value::array(CMPIType elementType, Array elements) {
     Value value;
     value.m_type = static_cast<CMPIType>(elementType | CMPI_ARRAY);
-    for (Value& element : elements) element.retypeNull(elementType);
+    for (Value& element : elements) {
+        element.retypeNull(elementType);
+    }
     value.m_data = std::move(elements);
     return value;
 }
 
 Value::Value(const char* text) : m_type(CMPI_string) {
-    if (text) m_data = std::string(text);
+    if (text) {
+        m_data = std::string(text);
+    }
 }
 Value::Value(std::string text) : m_data(std::move(text)), m_type(CMPI_string) {}
 Value::Value(DateTime when) : m_data(std::move(when)), m_type(CMPI_dateTime) {}
@@ -233,18 +264,28 @@ Value::Value(const Instance& embedded)
       m_type(CMPI_instance) {}
 
 unsigned Value::nesting() const {
-    if (isNull()) return 0;
-    if (m_type == CMPI_ref) return 1 + reference().keys.nesting();
-    if (m_type == CMPI_instance)
+    if (isNull()) {
+        return 0;
+    }
+    if (m_type == CMPI_ref) {
+        return 1 + reference().keys.nesting();
+    }
+    if (m_type == CMPI_instance) {
         return 1 + std::max(instance().path.keys.nesting(), instance().properties.nesting());
+    }
     unsigned most = 0;
-    if (m_type == CMPI_refA || m_type == CMPI_instanceA)
-        for (const Value& element : elements()) most = std::max(most, element.nesting());
+    if (m_type == CMPI_refA || m_type == CMPI_instanceA) {
+        for (const Value& element : elements()) {
+            most = std::max(most, element.nesting());
+        }
+    }
     return most;
 }
 
 void Value::retypeNull(CMPIType type) {
-    if (isNull()) m_type = type;
+    if (isNull()) {
+        m_type = type;
+    }
 }
 
 bool Value::convertTo(CMPIType type, Value& result) const {
@@ -253,12 +294,17 @@ bool Value::convertTo(CMPIType type, Value& result) const {
         result.retypeNull(type);
         return true;
     }
-    if (isArray() != ((type & CMPI_ARRAY) != 0)) return false;
+    if (isArray() != ((type & CMPI_ARRAY) != 0)) {
+        return false;
+    }
     if (isArray()) {
         const auto elementType = static_cast<CMPIType>(type & ~CMPI_ARRAY);
         Array converted(elements().size());
-        for (std::size_t i = 0; i < converted.size(); ++i)
-            if (!elements()[i].convertTo(elementType, converted[i])) return false;
+        for (std::size_t i = 0; i < converted.size(); ++i) {
+            if (!elements()[i].convertTo(elementType, converted[i])) {
+                return false;
+            }
+        }
         result = array(elementType, std::move(converted));
         return true;
     }
@@ -268,10 +314,11 @@ bool Value::convertTo(CMPIType type, Value& result) const {
         if (isReal(type)) {
             result.m_data = negative ? static_cast<double>(sint()) : static_cast<double>(raw);
         } else if (isInteger(type) && integerFits(type, negative, negative ? ~raw + 1 : raw)) {
-            if ((type & CMPI_SINT) == CMPI_SINT)
+            if ((type & CMPI_SINT) == CMPI_SINT) {
                 result.m_data = static_cast<std::int64_t>(raw);
-            else
+            } else {
                 result.m_data = raw;
+            }
         } else {
             return false;
         }
@@ -281,7 +328,9 @@ bool Value::convertTo(CMPIType type, Value& result) const {
             type == CMPI_real32 ? static_cast<double>(static_cast<float>(value)) : value;
     } else if (m_type == CMPI_string && type == CMPI_dateTime) {
         DateTime when;
-        if (!DateTime::parse(text(), when)) return false;
+        if (!DateTime::parse(text(), when)) {
+            return false;
+        }
         result.m_data = when;
     } else {
         return false;
@@ -291,17 +340,20 @@ bool Value::convertTo(CMPIType type, Value& result) const {
 }
 
 bool Value::operator==(const Value& other) const {
-    if (m_type != other.m_type || m_data.index() != other.m_data.index()) return false;
+    if (m_type != other.m_type || m_data.index() != other.m_data.index()) {
+        return false;
+    }
     return std::visit(
         [&other](const auto& mine) {
             using T = std::decay_t<decltype(mine)>;
             const T& theirs = std::get<T>(other.m_data);
-            if constexpr (std::is_same_v<T, PathPtr> || std::is_same_v<T, InstancePtr>)
+            if constexpr (std::is_same_v<T, PathPtr> || std::is_same_v<T, InstancePtr>) {
                 return *mine == *theirs;
-            else if constexpr (std::is_same_v<T, CMPIValuePtr>)
+            } else if constexpr (std::is_same_v<T, CMPIValuePtr>) {
                 return mine.ptr == theirs.ptr && mine.length == theirs.length;
-            else
+            } else {
                 return mine == theirs;
+            }
         },
         m_data);
 }
@@ -309,15 +361,21 @@ bool Value::operator==(const Value& other) const {
 // -- NamedValues, ObjectPath, Instance ------------------------------------------------------
 
 NamedValues::NamedValues(std::initializer_list<Entry> entries) {
-    for (const Entry& entry : entries) set(entry.name, entry.value);
+    for (const Entry& entry : entries) {
+        set(entry.name, entry.value);
+    }
 }
 
 NamedValues::NamedValues(const NamedValues& other) : m_block(other.m_block) {
-    if (m_block) m_block->users.fetch_add(1, std::memory_order_relaxed);
+    if (m_block) {
+        m_block->users.fetch_add(1, std::memory_order_relaxed);
+    }
 }
 
 NamedValues::~NamedValues() {
-    if (!m_block || m_block->users.fetch_sub(1, std::memory_order_acq_rel) != 1) return;
+    if (!m_block || m_block->users.fetch_sub(1, std::memory_order_acq_rel) != 1) {
+        return;
+    }
     std::destroy_n(m_block->entries(), m_block->size);
     m_block->~Block();
     ::operator delete(m_block);
@@ -326,28 +384,37 @@ NamedValues::~NamedValues() {
 // Makes sure that nobody else has the block and that so many entries fit.
 void NamedValues::makeOwn(std::size_t room) {
     const bool own = m_block && m_block->users.load(std::memory_order_acquire) == 1;
-    if (own && room <= m_block->room) return;
-    if (room > size()) room *= 2;
+    if (own && room <= m_block->room) {
+        return;
+    }
+    if (room > size()) {
+        room *= 2;
+    }
     NamedValues other;
     other.m_block = new (::operator new(sizeof(Block) + room * sizeof(Entry))) Block;
     other.m_block->room = static_cast<std::uint32_t>(room);
     Entry* const entries = other.m_block->entries();
-    if (own)
+    if (own) {
         std::uninitialized_move_n(m_block->entries(), size(), entries);
-    else
+    } else {
         std::uninitialized_copy_n(begin(), size(), entries);
+    }
     other.m_block->size = static_cast<std::uint32_t>(size());
     other.m_block->nesting = nesting();
     if (room > kLookedThrough) {
         other.m_block->index = std::make_unique<Index>(room);
-        for (std::size_t i = 0; i < size(); ++i) other.m_block->index->emplace(entries[i].name, i);
+        for (std::size_t i = 0; i < size(); ++i) {
+            other.m_block->index->emplace(entries[i].name, i);
+        }
     }
     std::swap(m_block, other.m_block);
 }
 
 void NamedValues::set(const std::string& name, Value value) {
     const std::size_t at = indexOf(name);
-    if (at == size()) return add(name, std::move(value));
+    if (at == size()) {
+        return add(name, std::move(value));
+    }
     makeOwn(size());
     m_block->nesting = std::max(m_block->nesting, value.nesting());
     m_block->entries()[at].value = std::move(value);
@@ -359,7 +426,9 @@ void NamedValues::add(const std::string& name, Value value) {
     Entry* const entry = new (m_block->entries() + m_block->size) Entry{name, std::move(value)};
     ++m_block->size;
     m_block->nesting = std::max(m_block->nesting, nesting);
-    if (m_block->index) m_block->index->emplace(entry->name, m_block->size - 1);
+    if (m_block->index) {
+        m_block->index->emplace(entry->name, m_block->size - 1);
+    }
 }
 
 const Value* NamedValues::find(const std::string& name) const {

@@ -88,14 +88,15 @@ public:
     /// From the C++ types that CIM has: bool, integers by width and sign, float, double.
     template <class T, class = std::enable_if_t<std::is_arithmetic_v<T>>>
     Value(T v) : m_type(typeOf<T>()) {  // NOLINT: a value reads as one
-        if constexpr (std::is_same_v<T, bool>)
+        if constexpr (std::is_same_v<T, bool>) {
             m_data = v;
-        else if constexpr (std::is_floating_point_v<T>)
+        } else if constexpr (std::is_floating_point_v<T>) {
             m_data = static_cast<double>(v);
-        else if constexpr (std::is_signed_v<T>)
+        } else if constexpr (std::is_signed_v<T>) {
             m_data = static_cast<std::int64_t>(v);
-        else
+        } else {
             m_data = static_cast<std::uint64_t>(v);
+        }
     }
     Value(const char* text);  // NOLINT
     Value(std::string text);  // NOLINT
@@ -143,8 +144,12 @@ private:
 
     template <class T>
     static constexpr CMPIType typeOf() {
-        if (std::is_same_v<T, bool>) return CMPI_boolean;
-        if (std::is_floating_point_v<T>) return sizeof(T) == 4 ? CMPI_real32 : CMPI_real64;
+        if (std::is_same_v<T, bool>) {
+            return CMPI_boolean;
+        }
+        if (std::is_floating_point_v<T>) {
+            return sizeof(T) == 4 ? CMPI_real32 : CMPI_real64;
+        }
         constexpr CMPIType bySize[] = {CMPI_uint8, CMPI_uint16, CMPI_uint32, CMPI_uint64,
                                        CMPI_sint8, CMPI_sint16, CMPI_sint32, CMPI_sint64};
         const int width = sizeof(T) == 1 ? 0 : sizeof(T) == 2 ? 1 : sizeof(T) == 4 ? 2 : 3;

@@ -3,7 +3,9 @@
 namespace brokercall {
 
 void check(const CMPIStatus& rc) {
-    if (rc.rc != CMPI_RC_OK) throw CmpiStatus(rc);
+    if (rc.rc != CMPI_RC_OK) {
+        throw CmpiStatus(rc);
+    }
 }
 
 void refuse(CMPIrc rc, const char* text) { throw CmpiStatus(rc, text); }
@@ -22,7 +24,9 @@ CMPIData found(const CMPIData& data, const CMPIStatus& rc, const char* name) {
         case CMPI_RC_ERR_NOT_FOUND:
             return missing();
         default:
-            if (rc.msg) throw CmpiStatus(rc);
+            if (rc.msg) {
+                throw CmpiStatus(rc);
+            }
             throw CmpiStatus(rc.rc, name);
     }
 }
@@ -30,7 +34,9 @@ CMPIData found(const CMPIData& data, const CMPIStatus& rc, const char* name) {
 namespace {
 
 bool isKnown(CMPIType type) {
-    if (type & CMPI_ENC) return true;
+    if (type & CMPI_ENC) {
+        return true;
+    }
     switch (type & ~CMPI_ARRAY) {
         case CMPI_boolean:
         case CMPI_char16:
@@ -53,13 +59,19 @@ bool isKnown(CMPIType type) {
 }  // namespace
 
 const CMPIValue* valueOf(const CMPIData& data) {
-    if (data.state & CMPI_nullValue) return nullptr;
+    if (data.state & CMPI_nullValue) {
+        return nullptr;
+    }
     if (!isKnown(data.type)) {
         refuse(CMPI_RC_ERR_INVALID_DATA_TYPE, "The value is of no CMPI type.");
     }
     if (data.type & (CMPI_ARRAY | CMPI_ENC)) {
-        if (!data.value.dataPtr.ptr) return nullptr;
-        if (data.type == CMPI_chars) return reinterpret_cast<const CMPIValue*>(data.value.chars);
+        if (!data.value.dataPtr.ptr) {
+            return nullptr;
+        }
+        if (data.type == CMPI_chars) {
+            return reinterpret_cast<const CMPIValue*>(data.value.chars);
+        }
     }
     return &data.value;
 }

@@ -17,13 +17,17 @@ void check(const CMPIStatus& rc);
 /// An object that is passed on to the server.
 template <class Object>
 Object* given(Object* object) {
-    if (!object) refuse(CMPI_RC_ERR_INVALID_HANDLE, "A null object was passed.");
+    if (!object) {
+        refuse(CMPI_RC_ERR_INVALID_HANDLE, "A null object was passed.");
+    }
     return object;
 }
 
 /// A name that is passed on to the server.
 inline const char* named(const char* name) {
-    if (!name) refuse(CMPI_RC_ERR_INVALID_PARAMETER, "No name was passed.");
+    if (!name) {
+        refuse(CMPI_RC_ERR_INVALID_PARAMETER, "No name was passed.");
+    }
     return name;
 }
 
@@ -33,12 +37,16 @@ inline const char* orEmpty(const char* text) { return text ? text : ""; }
 /// An object that the server has to return.
 template <class Object>
 Object* need(Object* object) {
-    if (!object) refuse(CMPI_RC_ERR_FAILED, "The CIM server returned no object.");
+    if (!object) {
+        refuse(CMPI_RC_ERR_FAILED, "The CIM server returned no object.");
+    }
     return object;
 }
 
 inline const CMPIBroker* theBroker(const CMPIBroker* broker) {
-    if (!broker) refuse(CMPI_RC_ERR_FAILED, "There is no broker.");
+    if (!broker) {
+        refuse(CMPI_RC_ERR_FAILED, "There is no broker.");
+    }
     return broker;
 }
 inline const CMPIBrokerFT* tableOf(const CMPIBroker* broker, const CMPIBrokerFT*) {
@@ -94,7 +102,9 @@ CMPIData find(Object* object, Entry entry, const char* name) {
 /// Calls an entry that searches by position and tells the name.
 template <class Object, class Entry>
 CMPIData findAt(Object* object, Entry entry, int position, CMPIString** name) {
-    if (position < 0) return missing();
+    if (position < 0) {
+        return missing();
+    }
     CMPIStatus rc = {CMPI_RC_OK, nullptr};
     const CMPIData data =
         entryOf(object, entry)(object, static_cast<CMPICount>(position), name, &rc);

@@ -22,7 +22,9 @@ CmpiData CmpiArgs::getArg(const char* name) const {
 CmpiData CmpiArgs::getArg(const int index, CmpiString* name) const {
     CMPIString* argName = nullptr;
     const CMPIData data = findAt(getEnc(), &CMPIArgsFT::getArgAt, index, &argName);
-    if (name) *name = CmpiString(argName);
+    if (name) {
+        *name = CmpiString(argName);
+    }
     return CmpiData(data);
 }
 

@@ -17,7 +17,9 @@ CMPIArray* CmpiArray::getEnc() const { return static_cast<CMPIArray*>(enc); }
 CMPICount CmpiArray::size() const { return isNull() ? 0 : ask(getEnc(), &CMPIArrayFT::getSize); }
 
 CmpiArrayIdx CmpiArray::operator[](CMPICount idx) const {
-    if (idx >= size()) throw CmpiStatus(CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    if (idx >= size()) {
+        throw CmpiStatus(CMPI_RC_ERR_NO_SUCH_PROPERTY);
+    }
     return CmpiArrayIdx(*this, idx);
 }
 
@@ -40,7 +42,9 @@ CmpiArrayIdx& CmpiArrayIdx::operator=(const CmpiData& v) {
     if (wanted == CMPI_chars && type == CMPI_string) {
         return *this = CmpiData(v.getString().charPtr());
     }
-    if (type != wanted && !sameCType) throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
+    if (type != wanted && !sameCType) {
+        throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
+    }
     tell(ar.getEnc(), &CMPIArrayFT::setElementAt, idx, valueOf(v._data), wanted);
     return *this;
 }

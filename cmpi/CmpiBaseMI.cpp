@@ -36,11 +36,17 @@ CMPIStatus CmpiBaseMI::driveBaseCleanup(void* mi, const CMPIContext* eCtx,
         // Whatever its kind, a record begins with the handle.
         void** const hdl = static_cast<void**>(mi);
         auto* const provider = hdl ? static_cast<CmpiBaseMI*>(*hdl) : nullptr;
-        if (!provider) throw CmpiStatus(CMPI_RC_ERR_INVALID_HANDLE, "The provider is gone.");
-        if (!terminating && !provider->isUnloadable()) throw CmpiStatus(CMPI_RC_ERR_NOT_SUPPORTED);
+        if (!provider) {
+            throw CmpiStatus(CMPI_RC_ERR_INVALID_HANDLE, "The provider is gone.");
+        }
+        if (!terminating && !provider->isUnloadable()) {
+            throw CmpiStatus(CMPI_RC_ERR_NOT_SUPPORTED);
+        }
 
         CmpiProviderBase* const base = provider->getProviderBase();
-        if (!base || base->decUseCount() != 0) return kOk;
+        if (!base || base->decUseCount() != 0) {
+            return kOk;
+        }
         CmpiContext ctx(const_cast<CMPIContext*>(eCtx));
         const CMPIStatus outcome =
             CmpiDriver::guarded([&] { return provider->cleanup(ctx).status(); });
@@ -68,16 +74,24 @@ CmpiBaseMI* CmpiBaseMI::acquire(CmpiProviderBase& base, const CMPIBroker* mb,
     };
     const Known known(mb);
     const CMPIStatus outcome = CmpiDriver::guarded([&]() -> CMPIStatus {
-        if (base.getBaseMI()) return kOk;
+        if (base.getBaseMI()) {
+            return kOk;
+        }
         CmpiContext ctx(const_cast<CMPIContext*>(eCtx));
         std::unique_ptr<CmpiBaseMI> made(create(CmpiBroker(const_cast<CMPIBroker*>(mb)), ctx));
         made->setProviderBase(&base);
         const CmpiStatus initialized = made->initialize(ctx);
-        if (initialized.rc() == CMPI_RC_OK) base.setBaseMI(made.release());
+        if (initialized.rc() == CMPI_RC_OK) {
+            base.setBaseMI(made.release());
+        }
         return initialized.status();
     });
-    if (rc) *rc = outcome;
-    if (outcome.rc != CMPI_RC_OK) return nullptr;
+    if (rc) {
+        *rc = outcome;
+    }
+    if (outcome.rc != CMPI_RC_OK) {
+        return nullptr;
+    }
     base.incUseCount();
     return base.getBaseMI();
 }

@@ -20,7 +20,9 @@ CMPIData scalar(CMPIType type, T CMPIValue::*member, T value) {
 template <class T>
 CMPIData handle(CMPIType type, T* CMPIValue::*member, T* value) {
     CMPIData data = scalar(type, member, value);
-    if (!value) data.state = CMPI_nullValue;
+    if (!value) {
+        data.state = CMPI_nullValue;
+    }
     return data;
 }
 
@@ -38,7 +40,9 @@ CMPIData arrayOf(CMPIArray* array) {
 /// servers don't always clear it.
 template <class T>
 T read(const CMPIData& data, T CMPIValue::*member, CMPIType wanted, CMPIType also) {
-    if (data.type != wanted && data.type != also) throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
+    if (data.type != wanted && data.type != also) {
+        throw CmpiStatus(CMPI_RC_ERR_TYPE_MISMATCH);
+    }
     return data.state & CMPI_nullValue ? T() : data.value.*member;
 }
 

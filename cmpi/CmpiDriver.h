@@ -30,7 +30,9 @@ public:
             return CmpiStatus(CMPI_RC_ERR_FAILED, failure.what()).status();
         } catch (...) {
             // The unwinding of a cancelled thread, which alone has no exception.
-            if (!std::current_exception()) throw;
+            if (!std::current_exception()) {
+                throw;
+            }
             return CmpiStatus(CMPI_RC_ERR_FAILED, "The provider failed.").status();
         }
     }
@@ -41,9 +43,13 @@ public:
     static CMPIStatus drive(Record* record, CmpiStatus (MI::*operation)(Params...), Args... args) {
         return guarded([&] {
             auto* const base = record ? static_cast<CmpiBaseMI*>(record->hdl) : nullptr;
-            if (!base) throw CmpiStatus(CMPI_RC_ERR_INVALID_HANDLE, "The provider is gone.");
+            if (!base) {
+                throw CmpiStatus(CMPI_RC_ERR_INVALID_HANDLE, "The provider is gone.");
+            }
             auto* const provider = dynamic_cast<MI*>(base);
-            if (!provider) throw CmpiStatus(CMPI_RC_ERR_NOT_SUPPORTED);
+            if (!provider) {
+                throw CmpiStatus(CMPI_RC_ERR_NOT_SUPPORTED);
+            }
             return call(*provider, operation, wrap(args)...);
         });
     }

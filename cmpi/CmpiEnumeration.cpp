@@ -17,7 +17,9 @@ CmpiBoolean CmpiEnumeration::hasNext() { return ask(getEnc(), &CMPIEnumerationFT
 CmpiData CmpiEnumeration::getNext() {
     CMPIData element = ask(getEnc(), &CMPIEnumerationFT::getNext);
     // An element is an object, never null. Servers leave the mark of an empty value on it.
-    if (element.value.inst) element.state = CMPI_goodValue;
+    if (element.value.inst) {
+        element.state = CMPI_goodValue;
+    }
     return CmpiData(element);
 }
 

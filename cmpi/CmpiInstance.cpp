@@ -30,7 +30,9 @@ CmpiData CmpiInstance::getProperty(const char* name) const {
 CmpiData CmpiInstance::getProperty(const int index, CmpiString* name) const {
     CMPIString* propertyName = nullptr;
     const CMPIData data = findAt(getEnc(), &CMPIInstanceFT::getPropertyAt, index, &propertyName);
-    if (name) *name = CmpiString(propertyName);
+    if (name) {
+        *name = CmpiString(propertyName);
+    }
     return CmpiData(data);
 }
 

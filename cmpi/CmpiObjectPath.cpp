@@ -60,16 +60,22 @@ CmpiData CmpiObjectPath::getKey(const char* name) const {
 }
 
 CmpiData CmpiObjectPath::getKey(const int index, CmpiString* name) const {
-    if (index < 0) throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
+    if (index < 0) {
+        throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND);
+    }
     CMPIString* keyName = nullptr;
     const CMPIData data =
         ask(getEnc(), &CMPIObjectPathFT::getKeyAt, static_cast<CMPICount>(index), &keyName);
-    if (name) *name = CmpiString(keyName);
+    if (name) {
+        *name = CmpiString(keyName);
+    }
     return CmpiData(data);
 }
 
 void CmpiObjectPath::setKey(const char* name, const CmpiData data) {
     const CMPIValue* value = valueOf(data._data);
-    if (!value) throw CmpiStatus(CMPI_RC_ERR_INVALID_PARAMETER, name);
+    if (!value) {
+        throw CmpiStatus(CMPI_RC_ERR_INVALID_PARAMETER, name);
+    }
     tell(getEnc(), &CMPIObjectPathFT::addKey, named(name), value, data._data.type);
 }

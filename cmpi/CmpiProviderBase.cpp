@@ -40,7 +40,9 @@ CMPIBroker* CmpiProviderBase::getBroker() {
 }
 
 void CmpiProviderBase::setBroker(const CMPIBroker* mb) {
-    if (!mb) return;
+    if (!mb) {
+        return;
+    }
     Brokers& b = brokers();
     const std::lock_guard<std::mutex> guard(b.lock);
     b.all.push_back(mb);
@@ -51,7 +53,9 @@ void CmpiProviderBase::dropBroker(const CMPIBroker* mb) {
     Brokers& b = brokers();
     const std::lock_guard<std::mutex> guard(b.lock);
     const auto last = std::find(b.all.rbegin(), b.all.rend(), mb);
-    if (last == b.all.rend()) return;
+    if (last == b.all.rend()) {
+        return;
+    }
     b.all.erase(std::next(last).base());
     b.youngest = b.all.empty() ? nullptr : b.all.back();
 }

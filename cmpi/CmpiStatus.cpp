@@ -7,7 +7,9 @@
 namespace {
 
 CMPIString* messageOf(const CMPIBroker* broker, const char* text) {
-    if (!text || !broker || !broker->eft || !broker->eft->newString) return nullptr;
+    if (!text || !broker || !broker->eft || !broker->eft->newString) {
+        return nullptr;
+    }
     try {
         return broker->eft->newString(broker, text, nullptr);
     } catch (const std::exception&) {

@@ -14,7 +14,9 @@ namespace {
 using Compare = int (*)(const char*, const char*);
 
 CmpiBoolean same(const char* left, const char* right, Compare compare) {
-    if (!left || !right) return left == right;
+    if (!left || !right) {
+        return left == right;
+    }
     return compare(left, right) == 0;
 }
 

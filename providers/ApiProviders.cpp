@@ -46,7 +46,9 @@ template <class System>
 std::string stateOf(const std::string& value) {
     char* end = nullptr;
     const long state = std::strtol(value.c_str(), &end, 10);
-    if (value.empty() || *end != '\0' || state < 0 || state > 0xFFFF) return "";
+    if (value.empty() || *end != '\0' || state < 0 || state > 0xFFFF) {
+        return "";
+    }
     return static_cast<const char*>(System::getStateByID(static_cast<int>(state)));
 }
 
@@ -110,8 +112,9 @@ protected:
     ApiSystemProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name,
                       const SystemClass& system)
         : CmpiBaseMI(mb, ctx), zemBaseZemInstanceProvider(mb, ctx, name), m_system(system) {
-        for (const Field& field : system.fields)
+        for (const Field& field : system.fields) {
             m_rows.push_back({field.property, field.kind, static_cast<int>(m_rows.size())});
+        }
     }
 
     using zemBaseZemInstanceProvider::enumInstanceNames;
@@ -122,15 +125,18 @@ protected:
                     CmpiInstance& out) override {
         const CmpiString creationClass = getKeyBinding(path, "CreationClassName").getString();
         const std::string name = getKeyBinding(path, "Name").getString().charPtr();
-        if (strcasecmp(creationClass.charPtr(), m_system.name) != 0 || !m_system.isKey(name))
+        if (strcasecmp(creationClass.charPtr(), m_system.name) != 0 || !m_system.isKey(name)) {
             return -1;
+        }
         try {
             const zemApiObjects systems(
                 m_system.oneReader,
                 (zemApiCaller().*m_system.one)(getUserContext(context), name.c_str(), kLevel));
             out = makeInstance(path, properties, systems.only(name.c_str()));
         } catch (const zemException& e) {
-            if (!isUnknownSystem(e)) throw;
+            if (!isUnknownSystem(e)) {
+                throw;
+            }
             return -1;
         }
         return 0;
@@ -138,16 +144,18 @@ protected:
 
     void enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
                            zemDynamicArray<CmpiObjectPath>& out, const CmpiObjectPath&) override {
-        for (apiProp& system : all(context))
+        for (apiProp& system : all(context)) {
             out.addElement(
                 std::make_unique<CmpiObjectPath>(systemPath(path, m_system.name, nameOf(system))));
+        }
     }
 
     void enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                        const char** properties, zemDynamicArray<CmpiInstance>& out,
                        const CmpiObjectPath&) override {
-        for (apiProp& system : all(context))
+        for (apiProp& system : all(context)) {
             out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, system)));
+        }
     }
 
     CMPIBoolean isValidInstanceClass(const char* className) override {

@@ -17,7 +17,9 @@ bool hasTimeout(const CmpiArgs& in) {
     } catch (const CmpiStatus&) {
         return false;  // it was not given, in the way of some servers
     }
-    if (limit.isNotFound() || limit.isNullValue()) return false;
+    if (limit.isNotFound() || limit.isNullValue()) {
+        return false;
+    }
     return limit.getDateTime().getDateTime() != 0;
 }
 
@@ -46,7 +48,9 @@ CmpiInstance ComputerSystemProvider::performGetInstance(const CmpiContext& conte
                      makeInstance(path, properties, foundName, record));
              });
     }
-    if (!found) throwObjectNotFoundExc("getInstance", m_className, objectPathToString(path));
+    if (!found) {
+        throwObjectNotFoundExc("getInstance", m_className, objectPathToString(path));
+    }
     return *found;
 }
 
@@ -74,33 +78,40 @@ void ComputerSystemProvider::performSetInstance(const CmpiContext& context, Cmpi
                                                 const char** properties) {
     const auto asked = askedFor(instance, path, m_className, properties);
     std::vector<const char*> toCompare = {"Name"};
-    for (const auto& [property, value] : asked) toCompare.push_back(property.c_str());
+    for (const auto& [property, value] : asked) {
+        toCompare.push_back(property.c_str());
+    }
     toCompare.push_back(nullptr);
     const CmpiInstance present = performGetInstance(context, path, toCompare.data());
     std::vector<std::pair<const char*, std::string>> changes;
     for (const auto& [property, value] : asked) {
         const char* const name = property.c_str();
-        if (!isChangeable(name))
+        if (!isChangeable(name)) {
             validateUnmodifiableProperty(present, instance, name);
-        else if (!(cmpidata2String(value) == cmpidata2String(present.getProperty(name))))
+        } else if (!(cmpidata2String(value) == cmpidata2String(present.getProperty(name)))) {
             changes.emplace_back(name, value.getString().charPtr());
+        }
     }
     const CmpiString name = getKeyBinding(path, "Name").getString();
-    for (const auto& [property, value] : changes)
+    for (const auto& [property, value] : changes) {
         change(clientOf(context), name.charPtr(), property, value);
+    }
 }
 
 void ComputerSystemProvider::performInvokeMethod(const CmpiContext& context, CmpiResult& result,
                                                  const CmpiObjectPath& path, const char* method,
                                                  const CmpiArgs& in, CmpiArgs&) {
-    if (strcasecmp(method, kStateChange) != 0) throwMethodNotFoundExc(method, m_className);
+    if (strcasecmp(method, kStateChange) != 0) {
+        throwMethodNotFoundExc(method, m_className);
+    }
     const CmpiData asked = getParmVal(in, "RequestedState");
     const CMPIUint16 state = asked.getUint16();
     constexpr RequestedState kStates[] = {Enabled, Disabled, ShutDown, Offline, Test,
                                           Defer,   Quiesce,  Reboot,   Reset};
     const auto* const found = std::find(std::begin(kStates), std::end(kStates), state);
-    if (found == std::end(kStates))
+    if (found == std::end(kStates)) {
         throwInvalidMethodArgValueExc("RequestedState", cmpidata2String(asked), method);
+    }
     if (hasTimeout(in)) {
         result.returnData(methodResult(TimeoutNotSupported));
         return;
@@ -123,7 +134,9 @@ void ComputerSystemProvider::populateEssentialKeys(const char*, CmpiArray& keys)
 
 void ComputerSystemProvider::populateMethodArgs(const char*, zemDynamicArray<zemString>& args,
                                                 const char* method) {
-    if (strcasecmp(method, kStateChange) != 0) return;
+    if (strcasecmp(method, kStateChange) != 0) {
+        return;
+    }
     args.addElement(std::make_unique<zemString>("RequestedState"));
     args.addElement(std::make_unique<zemString>("TimeoutPeriod"));
 }
@@ -144,7 +157,9 @@ void ComputerSystemProvider::find(const Client& client, const std::string& name,
     try {
         read(client, name, attributes, sink);
     } catch (const zemException& e) {
-        if (!isUnknownObject(e)) throw;
+        if (!isUnknownObject(e)) {
+            throw;
+        }
     }
 }
 

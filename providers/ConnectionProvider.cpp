@@ -59,7 +59,9 @@ ConnectionProvider::ConnectionProvider(const CmpiBroker& mb, const CmpiContext& 
 std::string ConnectionProvider::hostOf(const std::string& id) {
     const std::size_t prefix = sizeof kPrefix - 1;
     const std::size_t colon = id.rfind(':');
-    if (id.compare(0, prefix, kPrefix) != 0 || colon < prefix) return "";
+    if (id.compare(0, prefix, kPrefix) != 0 || colon < prefix) {
+        return "";
+    }
     const std::string host = id.substr(prefix, colon - prefix);
     return isHostName(host) ? host : "";
 }
@@ -68,16 +70,22 @@ int ConnectionProvider::getInstance(const CmpiContext& context, const CmpiObject
                                     const char** properties, CmpiInstance& out) {
     const std::string id = getKeyBinding(path, "InstanceID").getString().charPtr();
     const std::string host = hostOf(id);
-    if (host.empty()) return -1;
+    if (host.empty()) {
+        return -1;
+    }
     try {
         const zemRecordSetsType links = readLinks(context, properties, host.c_str());
         for (int i = 0; i < links.size(); ++i) {
-            if (idOf(*links[i]) != id) continue;
+            if (idOf(*links[i]) != id) {
+                continue;
+            }
             out = makeInstance(path, properties, *links[i]);
             return 0;
         }
     } catch (const zemException& e) {
-        if (!isUnknownObject(e)) throw;
+        if (!isUnknownObject(e)) {
+            throw;
+        }
     }
     return -1;
 }
@@ -87,16 +95,18 @@ void ConnectionProvider::enumInstanceNames(const CmpiContext& context, const Cmp
                                            const CmpiObjectPath&) {
     static const char* justTheKey[] = {"InstanceID", nullptr};
     const zemRecordSetsType links = readLinks(context, justTheKey, nullptr);
-    for (int i = 0; i < links.size(); ++i)
+    for (int i = 0; i < links.size(); ++i) {
         out.addElement(std::make_unique<CmpiObjectPath>(connectionPath(path, idOf(*links[i]))));
+    }
 }
 
 void ConnectionProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                                        const char** properties, zemDynamicArray<CmpiInstance>& out,
                                        const CmpiObjectPath&) {
     const zemRecordSetsType links = readLinks(context, properties, nullptr);
-    for (int i = 0; i < links.size(); ++i)
+    for (int i = 0; i < links.size(); ++i) {
         out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, *links[i])));
+    }
 }
 
 CMPIBoolean ConnectionProvider::isValidInstanceClass(const char* className) {

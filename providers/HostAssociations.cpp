@@ -32,8 +32,9 @@ bool isOfClass(const CmpiObjectPath& path, const char* className) {
 }
 
 zemString hostOf(const CmpiObjectPath& path) {
-    if (isOfClass(path, kConnection))
+    if (isOfClass(path, kConnection)) {
         return ConnectionProvider::hostOf(path.getKey("InstanceID").getString().charPtr()).c_str();
+    }
     return zemDataTypeConvertManager::getMTMSByOP(path);
 }
 

@@ -48,7 +48,9 @@ public:
 protected:
     void read(const Client& client, const std::string& name, int* attributes,
               const Sink& sink) override {
-        if (isHostName(name)) readHosts(client, name.c_str(), attributes, sink);
+        if (isHostName(name)) {
+            readHosts(client, name.c_str(), attributes, sink);
+        }
     }
 
     void readAll(const Client& client, int* attributes, const Sink& sink) override {
@@ -68,9 +70,13 @@ protected:
         std::string found;
         readAll(clientOf(context), attributes,
                 [&](const std::string& name, const zemRecordType& host) {
-                    if (host[Host::ATTR_NAME] == wanted.charPtr()) found = name;
+                    if (host[Host::ATTR_NAME] == wanted.charPtr()) {
+                        found = name;
+                    }
                 });
-        if (found.empty()) throwObjectNotFoundExc(kFindHost, m_className, wanted.charPtr());
+        if (found.empty()) {
+            throwObjectNotFoundExc(kFindHost, m_className, wanted.charPtr());
+        }
         out.setArg("Host", CmpiData(systemPath(path, m_className, found)));
         result.returnData(methodResult(0));
     }
@@ -82,8 +88,9 @@ protected:
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {
         ComputerSystemProvider::populateMethodArgs(className, args, method);
-        if (strcasecmp(method, kFindHost) == 0)
+        if (strcasecmp(method, kFindHost) == 0) {
             args.addElement(std::make_unique<zemString>("ElementName"));
+        }
     }
 
 private:
@@ -91,7 +98,9 @@ private:
                           const Sink& sink) {
         const zemRecordSetsType hosts =
             toolFor(client).getManagedSystemInformation(attributes, host);
-        for (int i = 0; i < hosts.size(); ++i) sink(hostName(*hosts[i]), *hosts[i]);
+        for (int i = 0; i < hosts.size(); ++i) {
+            sink(hostName(*hosts[i]), *hosts[i]);
+        }
     }
 };
 

@@ -90,10 +90,15 @@ constexpr Transition kTransitions[] = {
 
 /// The text that the tool has for the value of a property.
 std::string toolText(ValueKind kind, const CmpiData& value) {
-    if (kind == ValueKind::Flag) return value.getBoolean() ? "1" : "0";
-    if (kind == ValueKind::Text)
+    if (kind == ValueKind::Flag) {
+        return value.getBoolean() ? "1" : "0";
+    }
+    if (kind == ValueKind::Text) {
         return std::string(zemCommandCaller::itemValue(value.getString().charPtr()));
-    if (kind == ValueKind::Uint16) return std::to_string(value.getUint16());
+    }
+    if (kind == ValueKind::Uint16) {
+        return std::to_string(value.getUint16());
+    }
     const CMPIUint32 number = value.getUint32();
     return kind == ValueKind::Hundredths ? hundredthsText(number) : std::to_string(number);
 }
@@ -102,9 +107,11 @@ std::string toolText(ValueKind kind, const CmpiData& value) {
 std::string idOfName(zemQyplatCmdCaller& tool, const std::string& host, const std::string& name) {
     int attributes[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_NAME, Partition::ATTR_END};
     const zemRecordSetsType all = tool.getPartitionsInformation(attributes, host.c_str(), nullptr);
-    for (int i = 0; i < all.size(); ++i)
-        if ((*all[i])[Partition::ATTR_NAME] == name.c_str())
+    for (int i = 0; i < all.size(); ++i) {
+        if ((*all[i])[Partition::ATTR_NAME] == name.c_str()) {
             return std::string((*all[i])[Partition::ATTR_LPAR_ID]);
+        }
+    }
     return "";
 }
 
@@ -114,7 +121,9 @@ void PartitionProvider::addCreationPairs(const CmpiInstance& instance, const Cmp
                                          zemDynamicArray<tagAttributePair>& pairs) {
     for (const auto& [property, value] : askedFor(instance, path, m_className, nullptr)) {
         const char* const said = property.c_str();
-        if (strcasecmp(said, "Name") == 0 || strcasecmp(said, "CreationClassName") == 0) continue;
+        if (strcasecmp(said, "Name") == 0 || strcasecmp(said, "CreationClassName") == 0) {
+            continue;
+        }
         const auto row = rowOf(kCreation, said);
         if (row == std::end(kCreation)) {
             validateCannotSpecifiedProperty(instance, said);
@@ -131,8 +140,9 @@ void PartitionProvider::performCreateInstance(const CmpiContext& context, CmpiRe
     const std::string name = instance.getProperty("Name").getString().charPtr();
     const bool anyNumber = !name.empty() && name.front() == '*';
     Key key;
-    if (!split(anyNumber ? "0" + name : name, key))
+    if (!split(anyNumber ? "0" + name : name, key)) {
         throwInvalidKeyExc("createInstance", m_className, "Name");
+    }
 
     const Client client = clientOf(context);
     zemDynamicArray<tagAttributePair> pairs;
@@ -185,8 +195,9 @@ PartitionProvider::StateChangeAnswer PartitionProvider::requestState(const Clien
                                                                      const std::string& name,
                                                                      RequestedState state) {
     const auto requested = [&](const Transition& row) { return row.requested == state; };
-    if (std::none_of(std::begin(kTransitions), std::end(kTransitions), requested))
+    if (std::none_of(std::begin(kTransitions), std::end(kTransitions), requested)) {
         return NotSupported;
+    }
 
     int attributes[] = {Partition::ATTR_LPAR_ID, Partition::ATTR_STATE,
                         Partition::ATTR_DEFAULT_PROFILE, Partition::ATTR_END};
@@ -198,7 +209,9 @@ PartitionProvider::StateChangeAnswer PartitionProvider::requestState(const Clien
     const auto row = std::find_if(
         std::begin(kTransitions), std::end(kTransitions),
         [&](const Transition& t) { return t.requested == state && present == t.from; });
-    if (row == std::end(kTransitions)) return InvalidTransition;
+    if (row == std::end(kTransitions)) {
+        return InvalidTransition;
+    }
 
     Key key;
     split(name, key);

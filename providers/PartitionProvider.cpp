@@ -67,13 +67,19 @@ using Profiles = std::map<std::pair<std::string, std::string>, const zemRecordTy
 struct Needs {
     explicit Needs(const int* attributes) {
         for (; *attributes != Partition::ATTR_END; ++attributes) {
-            if (*attributes >= kOfProfile) profile.push_back(*attributes - kOfProfile);
-            if (*attributes < kHostOfPartition) partition.push_back(*attributes);
+            if (*attributes >= kOfProfile) {
+                profile.push_back(*attributes - kOfProfile);
+            }
+            if (*attributes < kHostOfPartition) {
+                partition.push_back(*attributes);
+            }
         }
         ofProfile = profile;
         if (!profile.empty()) {
             partition.push_back(Partition::ATTR_DEFAULT_PROFILE);
-            for (int key : {Profile::ATTR_LPAR_ID, Profile::ATTR_NAME}) profile.push_back(key);
+            for (int key : {Profile::ATTR_LPAR_ID, Profile::ATTR_NAME}) {
+                profile.push_back(key);
+            }
         }
         for (Attributes* list : {&partition, &profile}) {
             std::sort(list->begin(), list->end());
@@ -93,8 +99,9 @@ using Sink = std::function<void(const std::string& name, const zemRecordType& re
 template <class ProfileValue>
 void hand(zemRecordType& partition, const std::string& host, const Needs& needs,
           ProfileValue profileValue, const Sink& sink) {
-    for (int attribute : needs.ofProfile)
+    for (int attribute : needs.ofProfile) {
         partition.insert(kOfProfile + attribute, profileValue(attribute));
+    }
     partition.insert(kHostOfPartition, host.c_str());
     sink(std::string(partition[Partition::ATTR_LPAR_ID]) + "*" + host, partition);
 }
@@ -114,8 +121,12 @@ std::string modeWord(const zemApiProp& profile, const char* key) {
 /// The library's sharing and donor modes are one word of the tool's.
 std::string sharingWord(const zemApiProp& profile, const char* key) {
     const bool isGreedy = same(profile, key) == "1", isDonor = same(profile, "DonorMode") == "1";
-    if (!isDedicated(same(profile, "ProcMode"))) return isGreedy ? "uncap" : "cap";
-    if (isDonor) return isGreedy ? "share_idle_procs_active" : "share_idle_procs_always";
+    if (!isDedicated(same(profile, "ProcMode"))) {
+        return isGreedy ? "uncap" : "cap";
+    }
+    if (isDonor) {
+        return isGreedy ? "share_idle_procs_active" : "share_idle_procs_always";
+    }
     return isGreedy ? "keep_idle_procs" : "share_idle_procs";
 }
 
@@ -161,8 +172,9 @@ void handWithLibraryProfile(zemRecordType& partition, const std::string& host, c
         for (apiProp& found :
              zemApiObjects(kProfileReader,
                            zemApiCaller().getLparProfile(user, key.c_str(), name, kFullLevel))) {
-            for (const LibraryRow& row : kLibraryRows)
+            for (const LibraryRow& row : kLibraryRows) {
                 values[row.attribute] = row.words(zemApiProp(&found), row.key);
+            }
         }
     }
     hand(
@@ -171,12 +183,16 @@ void handWithLibraryProfile(zemRecordType& partition, const std::string& host, c
 
 /// The profiles of a host; none when no attribute of a profile is wanted.
 zemRecordSetsType readProfiles(zemQyplatCmdCaller& tool, Needs& needs, const std::string& host) {
-    if (needs.ofProfile.empty()) return zemRecordSetsType();
+    if (needs.ofProfile.empty()) {
+        return zemRecordSetsType();
+    }
     try {
         return tool.getPartitionsProfileInformation(needs.profile.data(), host.c_str(), nullptr);
     } catch (const zemException& e) {
         // partitions without a profile are partitions still
-        if (!isUnknownObject(e)) throw;
+        if (!isUnknownObject(e)) {
+            throw;
+        }
         return zemRecordSetsType();
     }
 }
@@ -196,10 +212,11 @@ void readPartitions(zemQyplatCmdCaller& tool, Needs& needs, const std::string& h
     for (int i = 0; i < partitions.size(); ++i) {
         zemRecordType& partition = *partitions[i];
         auto found = profiles.end();
-        if (!needs.ofProfile.empty())
+        if (!needs.ofProfile.empty()) {
             found = profiles.find(
                 {static_cast<const char*>(partition[Partition::ATTR_LPAR_ID]),
                  static_cast<const char*>(partition[Partition::ATTR_DEFAULT_PROFILE])});
+        }
         hand(
             partition, host, needs,
             [&](int attribute) {
@@ -225,12 +242,15 @@ bool PartitionProvider::split(const std::string& name, Key& key) {
 void PartitionProvider::read(const Client& client, const std::string& name, int* attributes,
                              const Sink& sink) {
     Key key;
-    if (!split(name, key)) return;
+    if (!split(name, key)) {
+        return;
+    }
     Needs needs(attributes);
     const zemRecordSetsType found = toolFor(client).getPartitionsInformation(
         needs.partition.data(), key.host.c_str(), ("\"lpar_ids=" + key.id + "\"").c_str());
-    for (int i = 0; i < found.size(); ++i)
+    for (int i = 0; i < found.size(); ++i) {
         handWithLibraryProfile(*found[i], key.host, needs, client.user, sink);
+    }
 }
 
 void PartitionProvider::readAll(const Client& client, int* attributes, const Sink& sink) {
@@ -243,7 +263,9 @@ void PartitionProvider::readAll(const Client& client, int* attributes, const Sin
             readPartitions(tool, needs, hostName(*hosts[i]), sink);
         } catch (const zemException& e) {
             // a host without partitions answers so; one removed meanwhile has none either
-            if (!isUnknownObject(e)) throw;
+            if (!isUnknownObject(e)) {
+                throw;
+            }
         }
     }
 }

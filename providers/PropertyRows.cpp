@@ -85,10 +85,13 @@ bool parseHundredths(const char* text, unsigned long& value) {
     const std::string number = text;
     const std::size_t point = std::min(number.find('.'), number.size());
     std::string places = number.substr(std::min(point + 1, number.size()));
-    if (places.size() > 2 || places.find_first_not_of("0123456789") != std::string::npos)
+    if (places.size() > 2 || places.find_first_not_of("0123456789") != std::string::npos) {
         return false;
+    }
     places.resize(2, '0');
-    if (!parseNumber(number.substr(0, point).c_str(), 0xFFFFFFFF / 100 - 1, value)) return false;
+    if (!parseNumber(number.substr(0, point).c_str(), 0xFFFFFFFF / 100 - 1, value)) {
+        return false;
+    }
     value = value * 100 + std::strtoul(places.c_str(), nullptr, 10);
     return true;
 }
@@ -116,7 +119,9 @@ CmpiArray listOf(Operational status) {
 /// Sets @p data from the text of an attribute.
 /// @return false when the text is empty or of another form, so that the property stays null
 bool convert(ValueKind kind, const char* text, CmpiData& data) {
-    if (*text == '\0') return false;
+    if (*text == '\0') {
+        return false;
+    }
     unsigned long value = 0;
     std::tm when = {};
     switch (kind) {
@@ -127,23 +132,33 @@ bool convert(ValueKind kind, const char* text, CmpiData& data) {
             data = CmpiData(textList(text));
             return true;
         case ValueKind::Uint16:
-            if (!parseNumber(text, 0xFFFF, value)) return false;
+            if (!parseNumber(text, 0xFFFF, value)) {
+                return false;
+            }
             data.setUint16(static_cast<CMPIUint16>(value));
             return true;
         case ValueKind::Uint32:
-            if (!parseNumber(text, 0xFFFFFFFF, value)) return false;
+            if (!parseNumber(text, 0xFFFFFFFF, value)) {
+                return false;
+            }
             data.setUint32(static_cast<CMPIUint32>(value));
             return true;
         case ValueKind::Hundredths:
-            if (!parseHundredths(text, value)) return false;
+            if (!parseHundredths(text, value)) {
+                return false;
+            }
             data.setUint32(static_cast<CMPIUint32>(value));
             return true;
         case ValueKind::Flag:
-            if (!parseNumber(text, 1, value)) return false;
+            if (!parseNumber(text, 1, value)) {
+                return false;
+            }
             data.setBoolean(static_cast<CMPIBoolean>(value));
             return true;
         case ValueKind::Timestamp:
-            if (strptime(text, "%m/%d/%Y %H:%M:%S", &when) == nullptr) return false;
+            if (strptime(text, "%m/%d/%Y %H:%M:%S", &when) == nullptr) {
+                return false;
+            }
             data.setDateTime(zemBaseProvider::convertDateTime(static_cast<long>(timegm(&when))));
             return true;
         case ValueKind::EnabledState:
@@ -163,7 +178,9 @@ std::vector<std::pair<std::string, CmpiData>> valuesOf(const CmpiInstance& insta
     for (unsigned i = 0; i < count; ++i) {
         CmpiString name;
         const CmpiData value = instance.getProperty(static_cast<int>(i), &name);
-        if (!value.isNullValue()) values.emplace_back(name.charPtr(), value);
+        if (!value.isNullValue()) {
+            values.emplace_back(name.charPtr(), value);
+        }
     }
     return values;
 }
@@ -177,10 +194,12 @@ std::string textOf(const CmpiData& value) {
 Attributes attributesFor(const std::vector<PropertyRow>& rows, const Attributes& identity,
                          const char** properties) {
     Attributes attributes = identity;
-    for (const PropertyRow& row : rows)
+    for (const PropertyRow& row : rows) {
         if (zemBaseProvider::containsProperty(properties, row.property) &&
-            std::find(attributes.begin(), attributes.end(), row.attribute) == attributes.end())
+            std::find(attributes.begin(), attributes.end(), row.attribute) == attributes.end()) {
             attributes.push_back(row.attribute);
+        }
+    }
     attributes.push_back(Host::ATTR_END);
     return attributes;
 }
@@ -190,8 +209,9 @@ void setProperties(CmpiInstance& instance, const std::vector<PropertyRow>& rows,
     for (const PropertyRow& row : rows) {
         CmpiData value;
         if (zemBaseProvider::containsProperty(properties, row.property) &&
-            convert(row.kind, record[row.attribute], value))
+            convert(row.kind, record[row.attribute], value)) {
             instance.setProperty(row.property, value);
+        }
     }
 }
 
@@ -248,10 +268,14 @@ CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties) {
             instance.setPropertyFilter(properties, keys.data());
         } catch (const CmpiStatus& status) {
             // a server without filters leaves the choice to its clients
-            if (status.rc() != CMPI_RC_ERR_NOT_SUPPORTED) throw;
+            if (status.rc() != CMPI_RC_ERR_NOT_SUPPORTED) {
+                throw;
+            }
         }
     }
-    for (unsigned i = 0; i < count; ++i) instance.setProperty(keys[i], values[i]);
+    for (unsigned i = 0; i < count; ++i) {
+        instance.setProperty(keys[i], values[i]);
+    }
     return instance;
 }
 
@@ -263,15 +287,18 @@ std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& insta
     const std::map<std::string, std::string> defaults = [&] {
         std::map<std::string, std::string> texts;
         const CmpiInstance fresh(zemBaseProvider::createObjectPath(near, className));
-        for (const auto& [name, value] : valuesOf(fresh)) texts.emplace(name, textOf(value));
+        for (const auto& [name, value] : valuesOf(fresh)) {
+            texts.emplace(name, textOf(value));
+        }
         return texts;
     }();
     std::vector<std::pair<std::string, CmpiData>> asked;
     for (const auto& [name, value] : valuesOf(instance)) {
         const auto standard = defaults.find(name);
         if (zemBaseProvider::containsProperty(properties, name.c_str()) &&
-            (standard == defaults.end() || standard->second != textOf(value)))
+            (standard == defaults.end() || standard->second != textOf(value))) {
             asked.emplace_back(name, value);
+        }
     }
     return asked;
 }

@@ -13,7 +13,7 @@ packages_build="g++ cmake ninja-build ccache pkg-config flex bison
   libsqlite3-dev nlohmann-json3-dev libcli11-dev"
 packages_test="libgtest-dev"
 packages_bench="libbenchmark-dev libcsv-dev python3"
-packages_style="clang clang-format clang-tidy libclang-rt-14-dev"
+packages_style="clang clang-format-16 clang-tidy libclang-rt-14-dev"
 
 # install_missing <package>...: installs through apt what dpkg does not know yet.
 install_missing() {

@@ -16,7 +16,7 @@ esac
 install_missing $packages_build $packages_test $packages_style
 cd "$top"
 say "layout"
-git ls-files '*.h' '*.cpp' | xargs clang-format --dry-run --Werror
+git ls-files '*.h' '*.cpp' '*.c' | xargs clang-format-16 --dry-run --Werror
 
 [ "${1:-}" = --format ] && exit 0
 say "lint"

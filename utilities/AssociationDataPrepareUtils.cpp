@@ -19,7 +19,9 @@ void runQuietly(Hook hook) noexcept {
 zemAssociationDataPrepareUtility::zemAssociationDataPrepareUtility(
     zemBaseZemMultiNtoNAssociationProvider* provider, const CmpiContext& ctx, const char* className)
     : m_provider(provider), m_ctx(ctx), m_className(className), m_Initialized(false) {
-    if (m_provider == nullptr) return;
+    if (m_provider == nullptr) {
+        return;
+    }
     try {
         m_Initialized = m_provider->BeforeGenerateAssociation(m_ctx, m_className);
     } catch (zemException& failure) {
@@ -31,7 +33,9 @@ zemAssociationDataPrepareUtility::zemAssociationDataPrepareUtility(
 }
 
 zemAssociationDataPrepareUtility::~zemAssociationDataPrepareUtility() {
-    if (m_provider == nullptr) return;
+    if (m_provider == nullptr) {
+        return;
+    }
     runQuietly([this] { m_provider->AfterGenerateAssociation(m_ctx, m_className); });
 }
 
@@ -45,16 +49,21 @@ zemAssociationDataPrepareUtilityPlus::zemAssociationDataPrepareUtilityPlus(
       m_cop(cop) {}
 
 void* zemAssociationDataPrepareUtilityPlus::run() {
-    if (m_providerPlus == nullptr) return nullptr;
+    if (m_providerPlus == nullptr) {
+        return nullptr;
+    }
     for (const char* line :
-         {"", "+++++++++++++call for BeforeGenerateAssociation+++++++++++++++++++", "", ""})
+         {"", "+++++++++++++call for BeforeGenerateAssociation+++++++++++++++++++", "", ""}) {
         zemLog::LogPlain(line);
+    }
     m_addInfo = m_providerPlus->BeforeGenerateAssociation(m_ctx, m_className, m_cop);
     return m_addInfo;
 }
 
 zemAssociationDataPrepareUtilityPlus::~zemAssociationDataPrepareUtilityPlus() {
-    if (m_providerPlus == nullptr) return;
+    if (m_providerPlus == nullptr) {
+        return;
+    }
     runQuietly([this] {
         zemLog::LogPlain(
             "+++++++++++++++++auto release AfterGenerateAssociation++++++++++++++++++++++++");

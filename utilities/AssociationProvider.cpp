@@ -40,23 +40,30 @@ void checkReferences(const Rows& rows, const CmpiObjectPath& cop1, const CmpiObj
 
 /// Whether a path is of the class on one side of some row.
 bool isOfAny(const Rows& rows, const CmpiObjectPath& cop, zemString zemAssociationData::*side) {
-    for (int i = 0; i < rows.size(); ++i)
-        if (zemPathIsA(cop, rows[i]->*side)) return true;
+    for (int i = 0; i < rows.size(); ++i) {
+        if (zemPathIsA(cop, rows[i]->*side)) {
+            return true;
+        }
+    }
     return false;
 }
 
 /// Whether the class of a path is named in some row as first class.
 bool isNamedFirst(const Rows& rows, const CmpiObjectPath& cop) {
     const zemString className = zemClassOf(cop);
-    for (int i = 0; i < rows.size(); ++i)
-        if (zemBaseProvider::compareClassNames(className, rows[i]->m_refClassName1)) return true;
+    for (int i = 0; i < rows.size(); ++i) {
+        if (zemBaseProvider::compareClassNames(className, rows[i]->m_refClassName1)) {
+            return true;
+        }
+    }
     return false;
 }
 
 /// A line of progress on standard output, which the enumeration of names alone reports.
 void report(const zemAssociationRequest& r, const char* text) {
-    if (r.is(zemAssociationBits::OP_EnumInstNamesOp))
+    if (r.is(zemAssociationBits::OP_EnumInstNamesOp)) {
         zemLog::LogPlain((std::string("performEnumInstanceNames") + text).c_str());
+    }
 }
 
 /// The same with two inserts: "label: first;second".
@@ -101,8 +108,12 @@ struct zemAssociationData::Filters {
 };
 
 const zemString* zemAssociationData::matchRole(const char* role) const {
-    if (zemString::equalsIgnoreCase(m_refPropName1, role)) return &m_refPropName1;
-    if (zemString::equalsIgnoreCase(m_refPropName2, role)) return &m_refPropName2;
+    if (zemString::equalsIgnoreCase(m_refPropName1, role)) {
+        return &m_refPropName1;
+    }
+    if (zemString::equalsIgnoreCase(m_refPropName2, role)) {
+        return &m_refPropName2;
+    }
     return nullptr;
 }
 
@@ -111,8 +122,9 @@ const zemString* zemAssociationData::matchClass(const CmpiObjectPath& cop,
     const zemString nameSpace = zemTextOf(cop.getNameSpace());
     for (const zemString* side : {&m_refClassName1, &m_refClassName2}) {
         if (zemBaseProvider::compareClassNames(className, *side) ||
-            zemClassIsA(nameSpace, *side, className))
+            zemClassIsA(nameSpace, *side, className)) {
             return side;
+        }
     }
     return nullptr;
 }
@@ -120,29 +132,45 @@ const zemString* zemAssociationData::matchClass(const CmpiObjectPath& cop,
 bool zemAssociationData::checkSide(bool first, const CmpiObjectPath& cop, zemString& sourceClass,
                                    zemString& sourceRole, zemString* resultRole,
                                    const Filters& filters) const {
-    if (resultRole != nullptr) *resultRole = "";
-    if (!zemIsOfClass(cop, first ? m_refClassName1 : m_refClassName2)) return false;
+    if (resultRole != nullptr) {
+        *resultRole = "";
+    }
+    if (!zemIsOfClass(cop, first ? m_refClassName1 : m_refClassName2)) {
+        return false;
+    }
     sourceClass = first ? m_refClassName1 : m_refClassName2;
     sourceRole = first ? m_refPropName1 : m_refPropName2;
     const zemString& resultClass = first ? m_refClassName2 : m_refClassName1;
-    if (resultRole != nullptr) *resultRole = first ? m_refPropName2 : m_refPropName1;
+    if (resultRole != nullptr) {
+        *resultRole = first ? m_refPropName2 : m_refPropName1;
+    }
 
     if (zemIsGiven(filters.role)) {
         const zemString* const role = matchRole(filters.role);
-        if (role == nullptr || *role != sourceRole) return false;
+        if (role == nullptr || *role != sourceRole) {
+            return false;
+        }
     }
     const zemString* wantedRole = nullptr;
     if (zemIsGiven(filters.resultRole)) {
         wantedRole = matchRole(filters.resultRole);
-        if (wantedRole == nullptr) return false;
-        if (resultRole != nullptr && *wantedRole != *resultRole) return false;
+        if (wantedRole == nullptr) {
+            return false;
+        }
+        if (resultRole != nullptr && *wantedRole != *resultRole) {
+            return false;
+        }
     }
     const zemString* wantedClass = nullptr;
     if (zemIsGiven(filters.resultClass)) {
         wantedClass = matchClass(cop, filters.resultClass);
-        if (wantedClass == nullptr || *wantedClass != resultClass) return false;
+        if (wantedClass == nullptr || *wantedClass != resultClass) {
+            return false;
+        }
     }
-    if (wantedRole == nullptr || wantedClass == nullptr) return true;
+    if (wantedRole == nullptr || wantedClass == nullptr) {
+        return true;
+    }
     // With one class on both sides, the role wanted would have to be that of both.
     const auto agrees = [&](const zemString& className, const zemString& role) {
         return !zemString::equalsIgnoreCase(resultClass, className) ||
@@ -200,7 +228,9 @@ void zemAssociationProvider::addAssoData(zemAssociationData* row) { m_assoData.a
 zemAssociationData* zemAssociationProvider::getAssoData(const char* name) const {
     for (int i = 0; i < m_assoData.size(); ++i) {
         zemAssociationData* const row = m_assoData[i];
-        if (row != nullptr && zemString::equalsIgnoreCase(row->m_assocClassName, name)) return row;
+        if (row != nullptr && zemString::equalsIgnoreCase(row->m_assocClassName, name)) {
+            return row;
+        }
     }
     return nullptr;
 }
@@ -210,15 +240,18 @@ zemDynamicArray<zemAssociationData>* zemAssociationProvider::getAssoDataSet(
     auto set = std::make_unique<Rows>(25);
     for (int i = 0; i < m_assoData.size(); ++i) {
         const zemAssociationData* const row = m_assoData[i];
-        if (row != nullptr && zemString::equalsIgnoreCase(row->m_assocClassName, name))
+        if (row != nullptr && zemString::equalsIgnoreCase(row->m_assocClassName, name)) {
             set->addElement(std::make_unique<zemAssociationData>(*row));
+        }
     }
     return set.release();
 }
 
 const zemAssociationData& zemAssociationProvider::requireAssoData(const char* name) const {
     const zemAssociationData* const row = getAssoData(name);
-    if (row == nullptr) throwInvalidName(name);
+    if (row == nullptr) {
+        throwInvalidName(name);
+    }
     return *row;
 }
 
@@ -272,8 +305,9 @@ int zemAssociationProvider::getReferenceClass(const CmpiObjectPath& cop1,
         const zemAssociationData& row = *(*rows)[i];
         strRefClassName1 = row.m_refClassName1;
         strRefClassName2 = row.m_refClassName2;
-        if (zemIsOfClass(cop1, row.m_refClassName1) && zemIsOfClass(cop2, row.m_refClassName2))
+        if (zemIsOfClass(cop1, row.m_refClassName1) && zemIsOfClass(cop2, row.m_refClassName2)) {
             break;
+        }
     }
     return 0;
 }
@@ -304,7 +338,9 @@ CmpiInstance zemAssociationProvider::performGetInstance(const CmpiContext& ctx,
     zemAssociationCall call(*this, m_providerName, *broker, OP_GetInstOp, ctx, cop);
     call.require(m_supportedOperations);
     const std::unique_ptr<Rows> rows(getAssoDataSet(call.className()));
-    if (rows->size() == 0) throwInvalidName(call.className());
+    if (rows->size() == 0) {
+        throwInvalidName(call.className());
+    }
 
     const CmpiObjectPath cop1 = call.reference((*rows)[0]->m_refPropName1);
     const CmpiObjectPath cop2 = call.reference((*rows)[0]->m_refPropName2);
@@ -331,9 +367,10 @@ CmpiInstance zemAssociationProvider::makeInstance(zemAssociationCall& call, cons
     const CmpiObjectPath path1 = call.getInstance(cop1, timed).getObjectPath();
     const CmpiObjectPath path2 = call.getInstance(cop2, timed).getObjectPath();
     const char* const className = call.className();
-    if (!BeforeGenerateAssociation(ctx, className))
+    if (!BeforeGenerateAssociation(ctx, className)) {
         throw zemOperationFailedException(className, "getInstance", "getInstance", "CIM_ERR",
                                           "Error to initialize data for association.");
+    }
     isValidateAssociation(ctx, row, path1, path2);
     CmpiObjectPath ncop = createObjectPath(cop);
     CmpiInstance instance = zemReferenceInstance(*this, ncop, path1, path2, properties, className);
@@ -347,17 +384,22 @@ void zemAssociationProvider::enumerate(const zemAssociationRequest& r) {
     call.require(m_supportedOperations);
     const char* const className = call.className();
     const std::unique_ptr<Rows> rows(getAssoDataSet(className));
-    if (rows->size() == 0) throwInvalidName(className);
+    if (rows->size() == 0) {
+        throwInvalidName(className);
+    }
     call.guard([&] {
         report(r, " before BeforeGenerateAssociation");
-        if (!BeforeGenerateAssociation(r.ctx, className)) return;
+        if (!BeforeGenerateAssociation(r.ctx, className)) {
+            return;
+        }
         report(r, " after BeforeGenerateAssociation");
         for (int i = 0; i < rows->size(); ++i) {
             const zemAssociationData* const row = (*rows)[i];
-            if (row == nullptr)
+            if (row == nullptr) {
                 report(r, ": the association data error.");
-            else
+            } else {
                 enumerateRow(call, r, *row);
+            }
         }
         AfterGenerateAssociation(r.ctx, className);
     });
@@ -376,7 +418,9 @@ void zemAssociationProvider::enumerateRow(zemAssociationCall& call, const zemAss
     if (zemString::equalsIgnoreCase(row.m_refClassName1, row.m_refClassName2)) {
         // one set of objects for both sides; in the end all are in the namespace of side 2
         cops2 = cops1;
-        for (CmpiObjectPath& path : cops2) call.place(path, nameSpace2);
+        for (CmpiObjectPath& path : cops2) {
+            call.place(path, nameSpace2);
+        }
     } else {
         cops2 = call.paths(nameSpace2, class2.c_str());
     }
@@ -385,7 +429,9 @@ void zemAssociationProvider::enumerateRow(zemAssociationCall& call, const zemAss
         report(r, ": obj1: ");
         for (const CmpiObjectPath& cop2 : cops2) {
             report(r, ": obj2: ");
-            if (!isValidateAssociation(r.ctx, row, cop1, cop2)) continue;
+            if (!isValidateAssociation(r.ctx, row, cop1, cop2)) {
+                continue;
+            }
             report(r, ": an association found: ");
             zemReturnReference(*this, r.rslt, createObjectPath(r.cop), cop1, cop2, r.properties,
                                call.className(), r.is(OP_EnumInstsOp));
@@ -399,11 +445,18 @@ void zemAssociationProvider::navigate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);
     call.require(m_supportedOperations);
     const std::unique_ptr<Rows> rows(getAssoDataSet(r.assocClass));
-    if (rows->size() == 0) throwInvalidName(r.assocClass);
+    if (rows->size() == 0) {
+        throwInvalidName(r.assocClass);
+    }
     call.guard([&] {
-        if (!BeforeGenerateAssociation(r.ctx, r.assocClass)) return;
-        for (int i = 0; i < rows->size(); ++i)
-            if (!navigateRow(call, r, *(*rows)[i])) return;
+        if (!BeforeGenerateAssociation(r.ctx, r.assocClass)) {
+            return;
+        }
+        for (int i = 0; i < rows->size(); ++i) {
+            if (!navigateRow(call, r, *(*rows)[i])) {
+                return;
+            }
+        }
         AfterGenerateAssociation(r.ctx, r.assocClass);
     });
 }
@@ -418,7 +471,9 @@ bool zemAssociationProvider::navigateRow(zemAssociationCall& call, const zemAsso
                                                        r.resultClass, r.role, r.resultRole);
     const bool isSecond = row.getAssoDataFromOperation2(r.cop, sourceClass, role2, roleOut,
                                                         r.resultClass, r.role, r.resultRole);
-    if (!isFirst && !isSecond) return true;
+    if (!isFirst && !isSecond) {
+        return true;
+    }
     // the orientation of each side: whether the source comes first in a pair
     const bool first = role1 == row.m_refPropName1;
     const bool second = role2 == row.m_refPropName1;
@@ -426,28 +481,38 @@ bool zemAssociationProvider::navigateRow(zemAssociationCall& call, const zemAsso
     const zemString nameSpace =
         targetIsSecond ? row.getNameSpace2(r.cop) : row.getNameSpace1(r.cop);
     const zemString& target = targetIsSecond ? row.m_refClassName2 : row.m_refClassName1;
-    if (validateSourceObject(r.ctx, r.cop, call.word()) != 0) return false;
+    if (validateSourceObject(r.ctx, r.cop, call.word()) != 0) {
+        return false;
+    }
 
     const zemSynchronizer hold(m_synchContext);
-    if (r.is(OP_RefsOp))
+    if (r.is(OP_RefsOp)) {
         validateProerties(createObjectPath(r.cop, row.m_assocClassName), r.properties, call.word());
+    }
     std::vector<zemAssociationCandidate> candidates;
     CmpiEnumeration objects =
         call.targets(r, call.classPath(nameSpace, target), row.m_refClassName1);
     while (objects.hasNext()) {
         candidates.push_back(zemNextCandidate(objects, r.is(OP_AssocsOp)));
-        if (references) call.place(candidates.back().path, nameSpace);
+        if (references) {
+            call.place(candidates.back().path, nameSpace);
+        }
     }
     const auto makePath = [&] { return call.classPath(row.m_assoNameSpace, row.m_assocClassName); };
     const auto pass = [&](bool sourceFirst) {
         for (const zemAssociationCandidate& candidate : candidates) {
             const CmpiObjectPath& cop1 = sourceFirst ? r.cop : candidate.path;
             const CmpiObjectPath& cop2 = sourceFirst ? candidate.path : r.cop;
-            if (isValidateAssociation(r.ctx, row, cop1, cop2))
+            if (isValidateAssociation(r.ctx, row, cop1, cop2)) {
                 zemReturnNeighbour(*this, r, candidate, cop1, cop2, row.m_assocClassName, makePath);
+            }
         }
     };
-    if (isFirst) pass(first);
-    if (isSecond) pass(second);
+    if (isFirst) {
+        pass(first);
+    }
+    if (isSecond) {
+        pass(second);
+    }
     return true;
 }

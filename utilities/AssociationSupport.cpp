@@ -33,7 +33,9 @@ constexpr zemAssociationRow kRows[] = {
 
 const zemAssociationRow& rowOf(int bit) {
     std::size_t i = 0;
-    while (i + 1 < std::size(kRows) && kRows[i].bit != bit) ++i;
+    while (i + 1 < std::size(kRows) && kRows[i].bit != bit) {
+        ++i;
+    }
     return kRows[i];
 }
 
@@ -73,7 +75,9 @@ constexpr StatusRow kStatusRows[] = {
 
 zemBrokerTiming::zemBrokerTiming(const char* mark, const char* className) {
     CTimeLogerManager* const manager = CTimeLogerManager::getInstance();
-    if (!manager->isEnabled()) return;
+    if (!manager->isEnabled()) {
+        return;
+    }
     m_id = std::string(mark) + className;
     CTimeLoger* const loger = manager->getLogger("brokerCaller");
     loger->begin(m_id.c_str());
@@ -81,7 +85,9 @@ zemBrokerTiming::zemBrokerTiming(const char* mark, const char* className) {
 }
 
 zemBrokerTiming::~zemBrokerTiming() {
-    if (m_loger == nullptr) return;
+    if (m_loger == nullptr) {
+        return;
+    }
     const zemUncancelled uncancelled;
     zemQuietly([this] { m_loger->end(m_id.c_str()); });
 }
@@ -113,14 +119,18 @@ zemAssociationCall::~zemAssociationCall() {
 }
 
 void zemAssociationCall::traceExit() {
-    if (m_exited) return;
+    if (m_exited) {
+        return;
+    }
     m_exited = true;
     zemProviderTracer::_traceExit(m_broker.getEnc(), PROV_TRACE_FILE, __LINE__, m_providerName,
                                   m_function);
 }
 
 void zemAssociationCall::require(int supported) {
-    if ((supported & m_row.bit) != 0) return;
+    if ((supported & m_row.bit) != 0) {
+        return;
+    }
     traceExit();
     m_provider.throwMethodNotSupportedExc(m_word, m_className);
 }
@@ -171,7 +181,9 @@ CmpiObjectPath zemAssociationCall::reference(const char* property) const {
     const CmpiData key = zemBaseProvider::getKeyBinding(m_cop, property);
     if (zemIsMissing(key) || key.getType() != CMPI_ref) {
         zemString text;
-        if (!zemReadText(key, text)) text = zemBaseProvider::cmpidata2String(key);
+        if (!zemReadText(key, text)) {
+            text = zemBaseProvider::cmpidata2String(key);
+        }
         zemRefuseReferences(text, property, nullptr, nullptr, m_className, m_providerName);
     }
     return key.getObjectPath();
@@ -197,19 +209,26 @@ void zemAssociationCall::translate(const CmpiStatus& status) const {
         std::find_if(std::begin(kStatusRows), std::end(kStatusRows),
                      [&](const StatusRow& r) { return r.code == static_cast<int>(status.rc()); });
     const bool known = row != std::end(kStatusRows);
-    if (!known && m_row.bit >= zemAssociationBits::OP_AssocsOp) return;
+    if (!known && m_row.bit >= zemAssociationBits::OP_AssocsOp) {
+        return;
+    }
     (known ? row->raise : kFailed)(m_className, m_word, m_access, codeAsId ? code : "CIM_ERR",
                                    text);
 }
 
 bool zemPathIsA(const CmpiObjectPath& path, const char* ancestor) {
-    if (!zemIsGiven(ancestor)) return false;
-    if (zemString::equalsIgnoreCase(zemClassOf(path), ancestor)) return true;
+    if (!zemIsGiven(ancestor)) {
+        return false;
+    }
+    if (zemString::equalsIgnoreCase(zemClassOf(path), ancestor)) {
+        return true;
+    }
     try {
         return path.classPathIsA(ancestor) != 0;
     } catch (const CmpiStatus& status) {
-        if (status.rc() == CMPI_RC_ERR_INVALID_CLASS || status.rc() == CMPI_RC_ERR_NOT_FOUND)
+        if (status.rc() == CMPI_RC_ERR_INVALID_CLASS || status.rc() == CMPI_RC_ERR_NOT_FOUND) {
             return false;
+        }
         throw;
     }
 }
@@ -230,7 +249,9 @@ CmpiInstance zemNextInstance(CmpiEnumeration& instances) {
 }
 
 zemAssociationCandidate zemNextCandidate(CmpiEnumeration& enumeration, bool instances) {
-    if (!instances) return {zemNextPath(enumeration), std::nullopt};
+    if (!instances) {
+        return {zemNextPath(enumeration), std::nullopt};
+    }
     const CmpiInstance instance = zemNextInstance(enumeration);
     return {instance.getObjectPath(), instance};
 }
@@ -258,10 +279,14 @@ bool zemServesClass(const char* name, const char* assocClass, int supported, int
 
 void zemRefuseReferences(const char* text1, const char* property1, const char* text2,
                          const char* property2, const char* className, const char* providerName) {
-    if (text1 == nullptr && text2 == nullptr) return;
+    if (text1 == nullptr && text2 == nullptr) {
+        return;
+    }
     std::string message;
     const auto complain = [&message](const char* text, const char* property) {
-        if (text == nullptr) return;
+        if (text == nullptr) {
+            return;
+        }
         message += message.empty() ? "Invalid value \"" : " and invalid value \"";
         message.append(text).append("\" for the property ").append(property);
     };

@@ -229,13 +229,14 @@ template <class Provider, class MakePath>
 void zemReturnNeighbour(Provider& provider, const zemAssociationRequest& r,
                         const zemAssociationCandidate& candidate, const CmpiObjectPath& cop1,
                         const CmpiObjectPath& cop2, const char* className, MakePath makePath) {
-    if (r.is(zemAssociationBits::OP_OnlyRefOps))
+    if (r.is(zemAssociationBits::OP_OnlyRefOps)) {
         zemReturnReference(provider, r.rslt, makePath(), cop1, cop2, r.properties, className,
                            r.is(zemAssociationBits::OP_RefsOp));
-    else if (candidate.instance)
+    } else if (candidate.instance) {
         r.rslt.returnData(*candidate.instance);
-    else
+    } else {
         r.rslt.returnData(candidate.path);
+    }
 }
 
 #endif

@@ -28,7 +28,9 @@ zemBaseProvider::zemBaseProvider(const CmpiBroker& mb, const CmpiContext& ctx,
       CmpiPropertyMI(mb, ctx),
       m_providerName(providerName) {
     PROV_TRACE_LOCALS();
-    if (PROV_TRACE_BROKER == nullptr) return;
+    if (PROV_TRACE_BROKER == nullptr) {
+        return;
+    }
     PROV_TRACE_STRING(4, "0x%p - BROKER[0x%p: hdl 0x%p,bft 0x%p,eft 0x%p,xft 0x%p]",
                       static_cast<const void*>(broker), static_cast<const void*>(PROV_TRACE_BROKER),
                       static_cast<const void*>(PROV_TRACE_BROKER->hdl),
@@ -92,7 +94,9 @@ CmpiStatus zemBaseProvider::returnOK() const { return CmpiStatus(CMPI_RC_OK); }
 
 CmpiStatus zemBaseProvider::returnStatus(CMPIrc rc, const char* text) const {
     CMPIBroker* raw = rawBroker();
-    if (raw == nullptr) return CmpiStatus(rc);
+    if (raw == nullptr) {
+        return CmpiStatus(rc);
+    }
     const zemString message = zemShortened(text, kMaxMessage);
     CMPIString* const none = nullptr;
     const CMPIStatus status = {rc, zemCallServer(raw->eft, &CMPIBrokerEncFT::newString, none, raw,
@@ -102,7 +106,9 @@ CmpiStatus zemBaseProvider::returnStatus(CMPIrc rc, const char* text) const {
 
 void zemBaseProvider::trace(const char* text) const {
     CMPIBroker* raw = rawBroker();
-    if (raw == nullptr) return;
+    if (raw == nullptr) {
+        return;
+    }
     zemCallServer(raw->eft, &CMPIBrokerEncFT::trace, kZemNotServed, raw, static_cast<CMPILevel>(0),
                   "ProviderAgent", text, nullptr);
 }

@@ -102,9 +102,13 @@ constexpr zemFailure kParameterNotFound = {"throwParameterNotFoundExc", "Error.P
                                            kInvalidParameter};
 
 Text insertFor(char mark, Text provider, std::initializer_list<zemInsert> inserts) {
-    if (mark == 'P') return provider;
+    if (mark == 'P') {
+        return provider;
+    }
     for (const zemInsert& insert : inserts) {
-        if (insert.mark == mark) return insert.text;
+        if (insert.mark == mark) {
+            return insert.text;
+        }
     }
     return nullptr;
 }

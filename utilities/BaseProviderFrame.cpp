@@ -90,7 +90,9 @@ zemOperationFrame::zemOperationFrame(zemBaseProvider& provider, zemOperation ope
       m_ctx(ctx),
       m_path(path),
       m_result(result) {
-    if (path != nullptr) m_className = zemClassOf(*path);
+    if (path != nullptr) {
+        m_className = zemClassOf(*path);
+    }
     m_testedClass = m_className;
     m_namedClass = m_className;
 }
@@ -105,9 +107,15 @@ void zemOperationFrame::setEventType(const char* eventType) { m_namedClass = eve
 CmpiStatus zemOperationFrame::run(const std::function<void()>& work) {
     enter();
     try {
-        if (admit()) work();
-        if (m_answer) return *m_answer;
-        if (m_row.resultEnd == kDone) m_result->returnDone();
+        if (admit()) {
+            work();
+        }
+        if (m_answer) {
+            return *m_answer;
+        }
+        if (m_row.resultEnd == kDone) {
+            m_result->returnDone();
+        }
         leave();
         return m_provider.returnOK();
     } catch (const CmpiStatus& status) {
@@ -120,9 +128,13 @@ CmpiStatus zemOperationFrame::run(const std::function<void()>& work) {
 void zemOperationFrame::enter() {
     zemProviderTracer::_traceEnter(m_provider.rawBroker(), PROV_TRACE_FILE, __LINE__,
                                    m_provider.m_providerName, m_row.method);
-    if (m_row.keyMark == kUntimed) return;
+    if (m_row.keyMark == kUntimed) {
+        return;
+    }
     CTimeLogerManager* manager = CTimeLogerManager::getInstance();
-    if (!manager->isEnabled()) return;
+    if (!manager->isEnabled()) {
+        return;
+    }
     m_timing = manager->getLogger(m_row.method);
     m_timingKey = timingKey();
     m_timing->begin(m_timingKey.c_str());
@@ -130,24 +142,38 @@ void zemOperationFrame::enter() {
 
 bool zemOperationFrame::admit() {
     if (m_row.disabled != kNotAsked && !m_provider.isProviderEnabled(m_ctx)) {
-        if (m_row.disabled == kNothing) return false;
+        if (m_row.disabled == kNothing) {
+            return false;
+        }
         endTiming(m_timingKey);
         m_provider.throwObjectNotFoundExc("getInstance", "zemBaseProvider", kDisabledText);
     }
     const zemString path =
         m_path != nullptr ? zemBaseProvider::objectPathToString(*m_path) : zemString();
-    if (path.length() > kZemPrintable) refuseKeys();
-    if (m_row.banner != nullptr) traceBanner(path);
-    if (m_filterLabel != nullptr) logFilter();
+    if (path.length() > kZemPrintable) {
+        refuseKeys();
+    }
+    if (m_row.banner != nullptr) {
+        traceBanner(path);
+    }
+    if (m_filterLabel != nullptr) {
+        logFilter();
+    }
     testClass();
-    if (m_row.keys != kNoKeys) testKeys();
+    if (m_row.keys != kNoKeys) {
+        testKeys();
+    }
     return true;
 }
 
 void zemOperationFrame::leave() {
-    if (m_row.leaving == kTracedThenTimed) traceExit();
+    if (m_row.leaving == kTracedThenTimed) {
+        traceExit();
+    }
     endTiming(m_timingKey);
-    if (m_row.leaving == kTimedThenTraced) traceExit();
+    if (m_row.leaving == kTimedThenTraced) {
+        traceExit();
+    }
 }
 
 std::string zemOperationFrame::timingKey() const {
@@ -159,11 +185,15 @@ std::string zemOperationFrame::timingKey() const {
 }
 
 void zemOperationFrame::endTiming(const std::string& key) const {
-    if (m_timing != nullptr) m_timing->end(key.c_str());
+    if (m_timing != nullptr) {
+        m_timing->end(key.c_str());
+    }
 }
 
 void zemOperationFrame::traceExit() const {
-    if (m_row.rule == kSwitch) return;
+    if (m_row.rule == kSwitch) {
+        return;
+    }
     zemProviderTracer::_traceExit(m_provider.rawBroker(), PROV_TRACE_FILE, __LINE__,
                                   m_provider.m_providerName, m_row.method);
 }
@@ -187,8 +217,12 @@ void zemOperationFrame::refuseKeys() const {
         CmpiString name;
         const CmpiData data = m_path->getKey(static_cast<int>(i), &name);
         zemString text;
-        if (!zemReadText(data, text)) text = zemBaseProvider::cmpidata2String(data);
-        if (text.length() < value.length()) continue;
+        if (!zemReadText(data, text)) {
+            text = zemBaseProvider::cmpidata2String(data);
+        }
+        if (text.length() < value.length()) {
+            continue;
+        }
         key = zemTextOf(name);
         value = text;
     }
@@ -241,8 +275,12 @@ void zemOperationFrame::testClass() {
             served = m_provider.isValidIndicationClass(m_testedClass);
             break;
     }
-    if (served) return;
-    if (m_row.rule != kEnumeration) traceExit();
+    if (served) {
+        return;
+    }
+    if (m_row.rule != kEnumeration) {
+        traceExit();
+    }
     m_provider.throwMethodNotSupportedExc(m_row.errName, m_namedClass);
 }
 
@@ -251,7 +289,9 @@ void zemOperationFrame::testKeys() {
     m_provider.populateEssentialKeys(m_className, keys);
     zemString key;
     for (CMPICount i = 0; i < keys.size() && zemReadText(keys[i].getData(), key); ++i) {
-        if (hasKey(key)) continue;
+        if (hasKey(key)) {
+            continue;
+        }
         traceExit();
         m_provider.throwKeyNotFoundExc(m_row.errName, m_className, key);
     }
@@ -263,8 +303,12 @@ bool zemOperationFrame::hasKey(const char* key) const {
         zemQuietly([&] { has = !zemIsMissing(m_instance->getProperty(key)); });
         return has;
     }
-    if (!zemIsMissing(zemBaseProvider::getKeyBinding(*m_path, key))) return true;
-    if (m_row.keys == kOnPath) return false;
+    if (!zemIsMissing(zemBaseProvider::getKeyBinding(*m_path, key))) {
+        return true;
+    }
+    if (m_row.keys == kOnPath) {
+        return false;
+    }
     try {
         return !zemIsMissing(m_provider.getPropVal(*m_instance, key));
     } catch (const zemException&) {
@@ -292,13 +336,17 @@ CmpiStatus zemOperationFrame::answerFailure(const zemException& failure) const {
             status.rc() != CMPI_RC_ERR_INVALID_PARAMETER && status.rc() != CMPI_RC_ERR_FAILED) {
             return logAndAnswerOK(status);
         }
-        if (m_timing != nullptr) endTiming(timingKey());
+        if (m_timing != nullptr) {
+            endTiming(timingKey());
+        }
         traceExit();
         return status;
     }
     endTiming(m_timingKey);
     traceExit();
-    if (m_row.rule != kWrapped) return m_provider.handleException(m_row.errName, failure);
+    if (m_row.rule != kWrapped) {
+        return m_provider.handleException(m_row.errName, failure);
+    }
 
     // Clients of methods rely on one code and on this sentence, whatever went wrong.
     const std::string text =

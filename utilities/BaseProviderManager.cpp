@@ -125,7 +125,9 @@ zemBaseProviderManager* zemBaseProviderManager::getProviderManager() {
 template <class Kind>
 typename Kind::MI* zemBaseProviderManager::getMI(CMPIBroker* mb, CMPIContext* ctx, const char* name,
                                                  CMPIStatus* status, createMI create) {
-    if (status != nullptr) *status = kOK;
+    if (status != nullptr) {
+        *status = kOK;
+    }
     // The server, which may be written in C, cannot take an exception.
     typename Kind::MI* record = nullptr;
     zemQuietly([&] { record = getProviderManager()->implGetMI<Kind>(mb, ctx, name, create); });
@@ -145,10 +147,14 @@ typename Kind::MI* zemBaseProviderManager::implGetMI(CMPIBroker* mb, CMPIContext
                                                      const char* name, createMI create) {
     zemSynchronizer hold(m_synchContext);
     const int index = findRecord<Kind>(name);
-    if (index >= 0) return (this->*Kind::kList)[index];
+    if (index >= 0) {
+        return (this->*Kind::kList)[index];
+    }
 
     BaseMIItem* item = getBaseMIItem(mb, ctx, name, create);
-    if (item == nullptr) return nullptr;
+    if (item == nullptr) {
+        return nullptr;
+    }
     std::unique_ptr<Table<typename Kind::FT>> table(new Table<typename Kind::FT>{Kind::kTable, {}});
     table->miName = item->m_miName;
     auto record = std::make_unique<typename Kind::MI>();
@@ -166,7 +172,9 @@ CMPIStatus zemBaseProviderManager::implCleanupMI(typename Kind::MI* mi, const CM
     zemSynchronizer hold(m_synchContext);
     // Sought by address: a record that was cleaned up before must not be looked into.
     const int index = indexOf<Kind>(mi);
-    if (index < 0) return kOK;
+    if (index < 0) {
+        return kOK;
+    }
     const zemString name(mi->ft->miName);  // a copy: the record's text goes with the last record
     if (!terminating) {
         const BaseMIItem* item = getBaseMIItem(name);
@@ -182,7 +190,9 @@ template <class Kind>
 int zemBaseProviderManager::findRecord(const char* name) {
     const auto& records = this->*Kind::kList;
     for (int i = 0; i < records.size(); ++i) {
-        if (strcmp(records[i]->ft->miName, name) == 0) return i;
+        if (strcmp(records[i]->ft->miName, name) == 0) {
+            return i;
+        }
     }
     return -1;
 }
@@ -191,7 +201,9 @@ template <class Kind>
 int zemBaseProviderManager::indexOf(const typename Kind::MI* mi) {
     const auto& records = this->*Kind::kList;
     for (int i = 0; i < records.size(); ++i) {
-        if (records[i] == mi) return i;
+        if (records[i] == mi) {
+            return i;
+        }
     }
     return -1;
 }
@@ -204,12 +216,16 @@ void zemBaseProviderManager::dropRecord(int index) {
 
 template <class Kind>
 void zemBaseProviderManager::dropRecords() {
-    while ((this->*Kind::kList).size() > 0) dropRecord<Kind>((this->*Kind::kList).size() - 1);
+    while ((this->*Kind::kList).size() > 0) {
+        dropRecord<Kind>((this->*Kind::kList).size() - 1);
+    }
 }
 
 zemBaseProviderManager::BaseMIItem* zemBaseProviderManager::getBaseMIItem(const char* name) {
     for (int i = 0; i < m_baseMIList.size(); ++i) {
-        if (strcmp(m_baseMIList[i]->m_miName, name) == 0) return m_baseMIList[i];
+        if (strcmp(m_baseMIList[i]->m_miName, name) == 0) {
+            return m_baseMIList[i];
+        }
     }
     return nullptr;
 }
@@ -219,13 +235,19 @@ zemBaseProviderManager::BaseMIItem* zemBaseProviderManager::getBaseMIItem(CMPIBr
                                                                           const char* name,
                                                                           createMI create) {
     BaseMIItem* item = getBaseMIItem(name);
-    if (item != nullptr) return item;
+    if (item != nullptr) {
+        return item;
+    }
     std::unique_ptr<CmpiBaseMI> mi(create(CmpiBroker(mb), CmpiContext(ctx), name));
-    if (mi == nullptr) return nullptr;
+    if (mi == nullptr) {
+        return nullptr;
+    }
     addBaseMI(name, mi.get());
     item = getBaseMIItem(name);
     // A creation function that asks for its own name meanwhile has made another, which stays.
-    if (item->m_mi == mi.get()) static_cast<void>(mi.release());
+    if (item->m_mi == mi.get()) {
+        static_cast<void>(mi.release());
+    }
     return item;
 }
 
@@ -234,10 +256,14 @@ void zemBaseProviderManager::addBaseMI(const char* name, CmpiBaseMI* mi) {
     // The manager counts the uses, no anchor of the binding does. Objects are made without one, so
     // that saying it once in the life of the library is enough.
     static bool first = true;
-    if (first) mi->setProviderBase(nullptr);
+    if (first) {
+        mi->setProviderBase(nullptr);
+    }
     first = false;
 
-    if (getBaseMIItem(name) != nullptr) return;
+    if (getBaseMIItem(name) != nullptr) {
+        return;
+    }
     auto ownName = std::make_unique<zemString>(name);
     auto item = std::make_unique<BaseMIItem>(BaseMIItem{*ownName, 0, mi});
     m_miNameList.addElement(ownName.get());
@@ -250,13 +276,17 @@ CMPIStatus zemBaseProviderManager::cleanupMI(const char* name, const CMPIContext
                                              CMPIBoolean terminating) {
     zemSynchronizer hold(m_synchContext);
     BaseMIItem* item = getBaseMIItem(name);
-    if (item == nullptr) return kOK;
+    if (item == nullptr) {
+        return kOK;
+    }
     if (item->m_miCount > 1) {
         --item->m_miCount;
         return kOK;
     }
     item->m_miCount = 0;
-    if (!terminating && item->m_mi->isUnloadable() == 0) return kOK;
+    if (!terminating && item->m_mi->isUnloadable() == 0) {
+        return kOK;
+    }
 
     const zemString ownName(name);  // the one in the list is about to go
     CmpiContext context(const_cast<CMPIContext*>(ctx));

@@ -40,7 +40,9 @@ constexpr KindRow kOtherKind = {zemOperationFailedException::kind, CMPI_RC_ERR_F
 
 const KindRow& rowOf(int kind) {
     for (const KindRow& row : kKinds) {
-        if (row.kind == kind) return row;
+        if (row.kind == kind) {
+            return row;
+        }
     }
     return kOtherKind;
 }
@@ -60,7 +62,9 @@ constexpr const char* kOtherLocale = "en_US";
 
 zemString contextText(const CmpiContext& ctx, const char* entry) {
     zemString text;
-    if (ctx.isNull()) return text;
+    if (ctx.isNull()) {
+        return text;
+    }
     zemQuietly([&] { zemReadText(ctx.getEntry(entry), text); });
     return text;
 }
@@ -69,10 +73,14 @@ zemString contextText(const CmpiContext& ctx, const char* entry) {
 // in. False, and the weight as it was, for another text.
 bool readWeight(const char* text, float& weight) {
     static const locale_t pointLocale = newlocale(LC_ALL_MASK, "C", nullptr);
-    if (strncmp(text, "q=", 2) != 0) return false;
+    if (strncmp(text, "q=", 2) != 0) {
+        return false;
+    }
     char* end = nullptr;
     const float value = strtof_l(text + 2, &end, pointLocale);
-    if (end == text + 2) return false;
+    if (end == text + 2) {
+        return false;
+    }
     weight = value;
     return true;
 }
@@ -86,7 +94,9 @@ std::string preferredLanguage(const std::string& ranges) {
         const size_t comma = std::min(ranges.find(',', start), ranges.size());
         std::string range = ranges.substr(start, comma - start);
         const size_t semicolon = range.find(';');
-        if (semicolon == std::string::npos) return range;
+        if (semicolon == std::string::npos) {
+            return range;
+        }
         readWeight(range.c_str() + semicolon + 1, weight);
         if (weight > bestWeight) {
             best = range.substr(0, semicolon);
@@ -118,9 +128,13 @@ public:
             status = zemCallServer(m_broker->eft, &CMPIBrokerEncFT::openMessageFile, kZemNotServed,
                                    m_broker, bundle, &m_handle);
         });
-        if (answered && status.rc == CMPI_RC_OK) return true;
+        if (answered && status.rc == CMPI_RC_OK) {
+            return true;
+        }
         m_handle = nullptr;
-        if (!answered) return false;
+        if (!answered) {
+            return false;
+        }
         PROV_TRACE_OF(m_broker, m_component);
         PROV_TRACE_STRING(2, "OPEN MESSAGE BUNDLE FILE(%s) FAILED,RETURN DEFAULT STRING %s:%s",
                           zemOrEmpty(bundle), zemOrEmpty(key), zemOrEmpty(dfltString));
@@ -129,11 +143,15 @@ public:
 
     bool read(const char* bundle, const char* key, const char* dfltString,
               const char* const (&a)[kMaxInserts], zemString& text) {
-        if (m_handle == nullptr) return false;
+        if (m_handle == nullptr) {
+            return false;
+        }
         PROV_TRACE_OF(m_broker, m_component);
         PROV_TRACE_STRING(4, "READ ICU MESSAGE %s FROM %s", zemOrEmpty(key), zemOrEmpty(bundle));
         CMPICount count = 0;
-        while (count < kMaxInserts && a[count] != nullptr) ++count;
+        while (count < kMaxInserts && a[count] != nullptr) {
+            ++count;
+        }
         bool found = false;
         zemQuietly([&] {
             CMPIStatus status = kZemServed;
@@ -143,11 +161,15 @@ public:
                 dfltString, &status, count, CMPI_chars, a[0], CMPI_chars, a[1], CMPI_chars, a[2],
                 CMPI_chars, a[3], CMPI_chars, a[4], CMPI_chars, a[5], CMPI_chars, a[6], CMPI_chars,
                 a[7], CMPI_chars, a[8], CMPI_chars, a[9]);
-            if (status.rc != CMPI_RC_OK || message == nullptr) return;
+            if (status.rc != CMPI_RC_OK || message == nullptr) {
+                return;
+            }
             Text const unread = nullptr;
             Text const chars =
                 zemCallServer(message->ft, &CMPIStringFT::getCharPtr, unread, message, &status);
-            if (chars != nullptr) text = chars;
+            if (chars != nullptr) {
+                text = chars;
+            }
             found = chars != nullptr;
             zemCallServer(message->ft, &CMPIStringFT::release, kZemNotServed, message);
         });
@@ -155,7 +177,9 @@ public:
     }
 
     void close() {
-        if (m_handle == nullptr) return;
+        if (m_handle == nullptr) {
+            return;
+        }
         zemQuietly([&] {
             zemCallServer(m_broker->eft, &CMPIBrokerEncFT::closeMessageFile, kZemNotServed,
                           m_broker, m_handle);
@@ -236,7 +260,9 @@ zemString zemBaseProvider::retrieveLocalizedString(
     const char* arg3, const char* arg4, const char* arg5, const char* arg6, const char* arg7,
     const char* arg8, const char* arg9) {
     zemString text(dfltString);
-    if (brkr == nullptr) return text;
+    if (brkr == nullptr) {
+        return text;
+    }
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_ENTER();
     if (brkr->eft == nullptr) {
@@ -263,15 +289,21 @@ zemString zemBaseProvider::retrieveLocalizedString(
 }
 
 void zemBaseProvider::logMessage(int severity, const char* id, const char* text) const {
-    if (broker == nullptr) return;
+    if (broker == nullptr) {
+        return;
+    }
     logMessage(rawBroker(), m_providerName, severity, id, text);
 }
 
 void zemBaseProvider::logMessage(CMPIBroker* brkr, const char* providerName, int severity,
                                  const char* id, const char* text) {
-    if (brkr == nullptr || (id == nullptr && text == nullptr)) return;
+    if (brkr == nullptr || (id == nullptr && text == nullptr)) {
+        return;
+    }
     std::string message = zemOrEmpty(text);
-    if (zemOrEmpty(id)[0] != '\0') message = std::string(id) + ": " + message;
+    if (zemOrEmpty(id)[0] != '\0') {
+        message = std::string(id) + ": " + message;
+    }
 
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_STRING(4, "LOG MESSAGE: %s", message.c_str());
@@ -297,7 +329,9 @@ void zemBaseProvider::logICUMessage(CMPIBroker* brkr, CMPIContext* ctx, const ch
                                     const char* arg1, const char* arg2, const char* arg3,
                                     const char* arg4, const char* arg5, const char* arg6,
                                     const char* arg7, const char* arg8, const char* arg9) {
-    if (brkr == nullptr) return;
+    if (brkr == nullptr) {
+        return;
+    }
     zemString text(dfltString);
     if (ctx != nullptr) {
         const bool answered = zemQuietly([&] {
@@ -309,7 +343,9 @@ void zemBaseProvider::logICUMessage(CMPIBroker* brkr, CMPIContext* ctx, const ch
                 retrieveLocalizedString(brkr, providerName, msgBundle, msgKey, dfltString, 0, arg0,
                                         arg1, arg2, arg3, arg4, arg5, arg6, arg7, arg8, arg9);
         });
-        if (!answered) text = dfltString;
+        if (!answered) {
+            text = dfltString;
+        }
     }
     PROV_TRACE_OF(brkr, providerName);
     PROV_TRACE_STRING(4, "LOG ICU MESSAGE %s: %s", zemOrEmpty(msgKey),
@@ -323,21 +359,31 @@ zemString zemBaseProvider::getUserContext(const CmpiContext& ctx) {
 
 zemString zemBaseProvider::getExternalLanguageName(const CmpiContext& ctx) {
     const zemString accepted = contextText(ctx, "CMPIAcceptLanguage");
-    if (accepted.length() < 2 || zemString::equalsIgnoreCase(accepted, "root")) return zemString();
+    if (accepted.length() < 2 || zemString::equalsIgnoreCase(accepted, "root")) {
+        return zemString();
+    }
     std::string language = preferredLanguage(static_cast<const char*>(accepted));
-    if (language.size() < 2) return zemString();
+    if (language.size() < 2) {
+        return zemString();
+    }
 
     if (language.size() == 2) {
         const char* locale = kOtherLocale;
         for (const LanguageRow& row : kLanguages) {
-            if (language == row.language) locale = row.locale;
+            if (language == row.language) {
+                locale = row.locale;
+            }
         }
         language = locale;
     } else {
         bool behindUnderscore = false;
         for (char& c : language) {
-            if (c == '-') c = '_';
-            if (behindUnderscore && c >= 'a' && c <= 'z') c = static_cast<char>(c - 'a' + 'A');
+            if (c == '-') {
+                c = '_';
+            }
+            if (behindUnderscore && c >= 'a' && c <= 'z') {
+                c = static_cast<char>(c - 'a' + 'A');
+            }
             behindUnderscore = behindUnderscore || c == '_';
         }
     }

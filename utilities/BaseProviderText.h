@@ -25,13 +25,17 @@ inline bool zemIsMissing(const CmpiData& data) {
 
 /// Copies the text of a string value. False for a missing value, another type, or no text.
 inline bool zemReadText(const CmpiData& data, zemString& text) {
-    if (zemIsMissing(data)) return false;
+    if (zemIsMissing(data)) {
+        return false;
+    }
     if (data.getType() == CMPI_chars) {
         const char* chars = data.getCString();
         text = chars;
         return chars != nullptr;
     }
-    if (data.getType() != CMPI_string) return false;
+    if (data.getType() != CMPI_string) {
+        return false;
+    }
     const CmpiString string = data.getString();
     text = string.charPtr();
     return string.charPtr() != nullptr;
@@ -42,7 +46,9 @@ inline bool zemReadText(const CmpiData& data, zemString& text) {
 inline bool zemPrint(CmpiObject object, zemString& text) {
     try {
         const CmpiString printed = object.toString();
-        if (printed.charPtr() == nullptr) return false;
+        if (printed.charPtr() == nullptr) {
+            return false;
+        }
         text = printed.charPtr();
         return true;
     } catch (const CmpiStatus&) {
@@ -56,16 +62,22 @@ constexpr size_t kZemPrintable = 4095;
 /// The server's text of a path, or the library's own.
 inline zemString zemPathText(const CmpiObjectPath& path) {
     zemString text = zemBaseProvider::objectPathToString(path);
-    if (text.length() <= kZemPrintable) zemPrint(path, text);
+    if (text.length() <= kZemPrintable) {
+        zemPrint(path, text);
+    }
     return text;
 }
 
 /// A text from outside for a message: what goes beyond @p limit becomes "...", between characters
 /// of UTF-8.
 inline zemString zemShortened(const char* text, size_t limit) {
-    if (strnlen(zemOrEmpty(text), limit + 1) <= limit) return zemString(text);
+    if (strnlen(zemOrEmpty(text), limit + 1) <= limit) {
+        return zemString(text);
+    }
     size_t length = limit;
-    while (length > 0 && (text[length] & 0xC0) == 0x80) --length;
+    while (length > 0 && (text[length] & 0xC0) == 0x80) {
+        --length;
+    }
     return zemString(text, static_cast<unsigned>(length)) + "...";
 }
 

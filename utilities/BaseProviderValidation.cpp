@@ -58,7 +58,9 @@ bool convert(From from, To& to) {
         const double value = static_cast<double>(from);
         const double limit = std::ldexp(1.0, std::numeric_limits<To>::digits);
         const double low = std::is_signed_v<To> ? -limit : 0.0;
-        if (!(value >= low && value < limit)) return false;
+        if (!(value >= low && value < limit)) {
+            return false;
+        }
     }
     to = static_cast<To>(from);  // NOLINT(bugprone-signed-char-misuse): numbers, not characters
     return true;
@@ -111,7 +113,9 @@ bool equalTexts(const CmpiData& value1, const CmpiData& value2, zemString& text1
 
 bool equalPaths(const CmpiData& value1, const CmpiData& value2, zemString& text1,
                 zemString& text2) {
-    if (value2.getType() != CMPI_ref) return false;
+    if (value2.getType() != CMPI_ref) {
+        return false;
+    }
     const CmpiObjectPath path1 = value1.getObjectPath();
     const CmpiObjectPath path2 = value2.getObjectPath();
     text1 = zemPathText(path1);
@@ -124,7 +128,9 @@ bool equalPaths(const CmpiData& value1, const CmpiData& value2, zemString& text1
     for (const Key& key : keysOf(path1)) {
         const CmpiData other = zemBaseProvider::getKeyBinding(path2, key.name);
         zemString ignored1, ignored2;
-        if (!zemBaseProvider::compareKeyValues(key.value, other, ignored1, ignored2)) return false;
+        if (!zemBaseProvider::compareKeyValues(key.value, other, ignored1, ignored2)) {
+            return false;
+        }
     }
     return true;
 }
@@ -156,7 +162,9 @@ void zemBaseProvider::validateKeys(const CmpiObjectPath& copt, const CmpiObjectP
     for (const Key& key : keysOf(cop)) {
         bool found = false;
         for (const Key& candidate : given) {
-            if (strcasecmp(candidate.name, key.name) != 0) continue;
+            if (strcasecmp(candidate.name, key.name) != 0) {
+                continue;
+            }
             if (found) {
                 PROV_TRACE_EXIT();
                 throwDuplicateKeyExc(callingMethod, className, key.name);
@@ -206,12 +214,16 @@ CMPIBoolean zemBaseProvider::compareKeyValues(const CmpiData& value1, const Cmpi
 void zemBaseProvider::validateProerties(const CmpiObjectPath& cop, const char** properties,
                                         const char* callingMethod) const {
     CMPIBroker* raw = rawBroker();
-    if (raw == nullptr || properties == nullptr || properties[0] == nullptr) return;
+    if (raw == nullptr || properties == nullptr || properties[0] == nullptr) {
+        return;
+    }
     PROV_TRACE_LOCALS();
     PROV_TRACE_ENTER();
     const zemString className = zemClassOf(cop);
     std::vector<const char*> names;
-    for (const char** next = properties; *next != nullptr; ++next) names.push_back(*next);
+    for (const char** next = properties; *next != nullptr; ++next) {
+        names.push_back(*next);
+    }
 
     // A server that does not know the class cannot tell what belongs to it.
     CMPIStatus made = kZemServed;
@@ -237,10 +249,16 @@ void zemBaseProvider::validateProerties(const CmpiObjectPath& cop, const char** 
 }
 
 CMPIBoolean zemBaseProvider::containsProperty(const char** properties, const char* name) {
-    if (properties == nullptr || properties[0] == nullptr) return true;
-    if (name == nullptr) return false;
+    if (properties == nullptr || properties[0] == nullptr) {
+        return true;
+    }
+    if (name == nullptr) {
+        return false;
+    }
     for (const char** next = properties; *next != nullptr; ++next) {
-        if (strcasecmp(*next, name) == 0) return true;
+        if (strcasecmp(*next, name) == 0) {
+            return true;
+        }
     }
     return false;
 }

@@ -93,7 +93,9 @@ std::string arrayText(const CmpiArray& array) {
     std::string text = "{";
     const CMPICount count = array.size();
     for (CMPICount i = 0; i < count; ++i) {
-        if (i != 0) text += ',';
+        if (i != 0) {
+            text += ',';
+        }
         text += zemBaseProvider::cmpidata2String(array[i].getData());
     }
     return text + "}";
@@ -115,7 +117,9 @@ std::string dateTimeText(const CmpiDateTime& time) {
 }
 
 std::string valueText(const CmpiData& data) {
-    if ((data.getType() & CMPI_ARRAY) != 0) return arrayText(data.getArray());
+    if ((data.getType() & CMPI_ARRAY) != 0) {
+        return arrayText(data.getArray());
+    }
     switch (data.getType()) {
         case CMPI_boolean:
             return data.getBoolean() ? "TRUE" : "FALSE";
@@ -162,9 +166,13 @@ std::string valueText(const CmpiData& data) {
 std::string pathText(const CmpiObjectPath& path) {
     std::string text;
     const zemString host = zemTextOf(path.getHostname());
-    if (!host.isEmpty()) text.append("//").append(host).append("/");
+    if (!host.isEmpty()) {
+        text.append("//").append(host).append("/");
+    }
     const zemString nameSpace = zemTextOf(path.getNameSpace());
-    if (!nameSpace.isEmpty()) text.append(nameSpace).append(":");
+    if (!nameSpace.isEmpty()) {
+        text.append(nameSpace).append(":");
+    }
     text.append(zemTextOf(path.getClassName()));
     const unsigned count = path.getKeyCount();
     for (unsigned i = 0; i < count; ++i) {
@@ -196,7 +204,9 @@ CmpiDateTime dateTimeOf(const timeval& time) {
 
 std::string stripQuotes(const std::string& value) {
     const size_t first = value.find_first_not_of('"');
-    if (first == std::string::npos) return "";
+    if (first == std::string::npos) {
+        return "";
+    }
     return value.substr(first, value.find_last_not_of('"') - first + 1);
 }
 
@@ -208,7 +218,9 @@ bool belongsToSharedSchema(const char* className) {
 
 const char* zemBaseProvider::cmpiRcToString(CMPIrc rc) {
     for (const CodeRow& row : kCodes) {
-        if (row.rc == static_cast<int>(rc)) return row.name;
+        if (row.rc == static_cast<int>(rc)) {
+            return row.name;
+        }
     }
     return "CIM_ERR_UNKNOWN";
 }
@@ -216,15 +228,21 @@ const char* zemBaseProvider::cmpiRcToString(CMPIrc rc) {
 zemString zemBaseProvider::cmpiDataTypeToString(CMPIType type) {
     zemString name("Unknown Type");
     for (const TypeRow& row : kTypes) {
-        if (row.type == (type & ~CMPI_ARRAY)) name = row.name;
+        if (row.type == (type & ~CMPI_ARRAY)) {
+            name = row.name;
+        }
     }
-    if ((type & CMPI_ARRAY) != 0) name += "[]";
+    if ((type & CMPI_ARRAY) != 0) {
+        name += "[]";
+    }
     return name;
 }
 
 // NOLINTNEXTLINE(performance-unnecessary-value-param): providers link against this form
 zemString zemBaseProvider::cmpidata2String(CmpiData data) {
-    if (zemIsMissing(data)) return zemString("");
+    if (zemIsMissing(data)) {
+        return zemString("");
+    }
     try {
         return zemString(valueText(data).c_str());
     } catch (const CmpiStatus&) {
@@ -264,7 +282,9 @@ CmpiDateTime zemBaseProvider::getCurrentDateTime() {
 }
 
 CmpiDateTime zemBaseProvider::convertDateTime(long seconds) {
-    if (seconds == 0) return CmpiDateTime(kZeroInterval);
+    if (seconds == 0) {
+        return CmpiDateTime(kZeroInterval);
+    }
     timeval time = {};
     time.tv_sec = seconds;
     return dateTimeOf(time);
@@ -293,7 +313,9 @@ CmpiObjectPath zemBaseProvider::createObjectPath(const CmpiObjectPath& path, con
                                                  const char* className) {
     CmpiObjectPath created(ns, className);
     const zemString host = zemTextOf(path.getHostname());
-    if (!host.isEmpty()) created.setHostname(static_cast<const char*>(host));
+    if (!host.isEmpty()) {
+        created.setHostname(static_cast<const char*>(host));
+    }
     return created;
 }
 
@@ -305,7 +327,9 @@ CmpiObjectPath zemBaseProvider::createObjectPath(const zemString& source) {
     const bool hasHost = text.compare(0, 2, "//") == 0;
     if (hasHost) {
         const size_t slash = text.find('/', 2);
-        if (slash == std::string::npos) throw zemInvalidParameterException(source);
+        if (slash == std::string::npos) {
+            throw zemInvalidParameterException(source);
+        }
         host = text.substr(2, slash - 2);
         at = slash + 1;
     }
@@ -321,12 +345,16 @@ CmpiObjectPath zemBaseProvider::createObjectPath(const zemString& source) {
 
     const size_t dot = std::min(text.find('.', at), text.size());
     CmpiObjectPath path(nameSpace.c_str(), text.substr(at, dot - at).c_str());
-    if (!host.empty()) path.setHostname(host.c_str());
+    if (!host.empty()) {
+        path.setHostname(host.c_str());
+    }
 
     for (at = dot + 1; dot < text.size() && at <= text.size();) {
         const size_t comma = std::min(text.find(',', at), text.size());
         const size_t equals = text.find('=', at);
-        if (equals >= comma) throw zemInvalidParameterException(source);
+        if (equals >= comma) {
+            throw zemInvalidParameterException(source);
+        }
         const std::string value = stripQuotes(text.substr(equals + 1, comma - equals - 1));
         path.setKey(text.substr(at, equals - at).c_str(), CmpiData(value.c_str()));
         at = comma + 1;
@@ -347,19 +375,25 @@ CmpiData zemBaseProvider::getKeyBinding(const CmpiObjectPath& path, const char* 
 CmpiData zemBaseProvider::getParmVal(const CmpiArgs& args, const char* name) const {
     CmpiData value;  // missing, as which some servers throw
     zemQuietly([&] { value = args.getArg(name); });
-    if (!zemIsMissing(value)) return value;
+    if (!zemIsMissing(value)) {
+        return value;
+    }
     throwParameterNotFoundExc(name);
 }
 
 CmpiData zemBaseProvider::getPropVal(const CmpiInstance& instance, const char* name) const {
     CmpiData value;
     zemQuietly([&] { value = instance.getProperty(name); });
-    if (!zemIsMissing(value)) return value;
+    if (!zemIsMissing(value)) {
+        return value;
+    }
     throwPropertyNotFoundExc(zemClassOf(instance), name);
 }
 
 void zemBaseProvider::setText(CmpiArray& array, CMPICount index, const char* text) {
-    if (text == nullptr) return;
+    if (text == nullptr) {
+        return;
+    }
     const bool ofStrings = CmpiData(array).getType() == CMPI_stringA;
     array[index] = ofStrings ? CmpiData(CmpiString(text)) : CmpiData(text);
 }
@@ -368,7 +402,9 @@ CmpiArray zemBaseProvider::convertStringArray(const zemDynamicArray<zemString>& 
     CmpiArray array(static_cast<CMPICount>(strings.size()), CMPI_chars);
     for (int i = 0; i < strings.size(); ++i) {
         const zemString* text = strings.getElementAt(i);
-        if (text != nullptr) setText(array, static_cast<CMPICount>(i), *text);
+        if (text != nullptr) {
+            setText(array, static_cast<CMPICount>(i), *text);
+        }
     }
     return array;
 }
@@ -394,7 +430,9 @@ zemDynamicArray<zemString> zemBaseProvider::convertStringArray(const CmpiArray& 
 CMPIBoolean zemBaseProvider::compareClassNames(const char* className, const char* compareName) {
     const char* name = zemOrEmpty(className);
     const char* other = zemOrEmpty(compareName);
-    if (other[0] == '_') name = zemOrEmpty(strchr(name, '_'));
+    if (other[0] == '_') {
+        name = zemOrEmpty(strchr(name, '_'));
+    }
     return strcasecmp(name, other) == 0;
 }
 

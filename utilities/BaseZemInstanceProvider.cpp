@@ -6,14 +6,18 @@ namespace {
 
 // Where the host's key begins in a key: behind the first of two stars, else at the start.
 unsigned hostKeyStart(const zemString& key) {
-    if (key.count('*') < 2) return 0;
+    if (key.count('*') < 2) {
+        return 0;
+    }
     return static_cast<unsigned>(key.find('*')) + 1;
 }
 
 template <class Object>
 void returnAll(CmpiResult& result, const zemDynamicArray<Object>& objects) {
     for (int i = 0; i < objects.size(); ++i) {
-        if (objects[i] != nullptr) result.returnData(*objects[i]);
+        if (objects[i] != nullptr) {
+            result.returnData(*objects[i]);
+        }
     }
 }
 

@@ -33,7 +33,9 @@ bool zemMultiNtoNAssociationPair::isOf(const char* associationClassName) const {
 zemMultiNtoNAssociationDataSet::zemMultiNtoNAssociationDataSet() : m_assoDataSet(25) {}
 
 void zemMultiNtoNAssociationDataSet::addNewAssoPair(zemMultiNtoNAssociationPair* pair) {
-    if (pair != nullptr) m_assoDataSet.addElement(pair);
+    if (pair != nullptr) {
+        m_assoDataSet.addElement(pair);
+    }
 }
 
 const zemDynamicArray<zemMultiNtoNAssociationPair>& zemMultiNtoNAssociationDataSet::getAssoDataSet()
@@ -48,9 +50,11 @@ zemMultiNtoNAssociationPair* zemMultiNtoNAssociationDataSet::getAssoPairByID(int
 int zemMultiNtoNAssociationDataSet::size() const { return m_assoDataSet.size(); }
 
 bool zemMultiNtoNAssociationDataSet::isFoundClassName(const char* name) const {
-    for (int i = 0; i < m_assoDataSet.size(); ++i)
-        if (zemBaseProvider::compareClassNames(name, m_assoDataSet[i]->m_AssociationClassName))
+    for (int i = 0; i < m_assoDataSet.size(); ++i) {
+        if (zemBaseProvider::compareClassNames(name, m_assoDataSet[i]->m_AssociationClassName)) {
             return true;
+        }
+    }
     return false;
 }
 

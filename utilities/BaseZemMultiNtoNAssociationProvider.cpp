@@ -20,7 +20,9 @@ constexpr const char* kNoTargetHandle =
     "Error occured while retrive the handle of the associated class.";
 
 zemBaseZemInstanceProvider& given(zemBaseZemInstanceProvider* handle, const char* complaint) {
-    if (handle != nullptr) return *handle;
+    if (handle != nullptr) {
+        return *handle;
+    }
     throw zemOperationFailedException("zemBaseZemMultiNtoNAssociationProvider", "getInstance",
                                       complaint);
 }
@@ -41,8 +43,11 @@ std::unique_ptr<Paths> fetch(const CmpiContext& ctx, const CmpiObjectPath& cop,
                                  cop, zemNameSpaceOr(side.m_nameSpace, cop), side.m_className),
                              all, cop);
     auto objects = std::make_unique<Paths>(all.size(), 25, 1);  // so that adding cannot fail
-    for (int i = 0; i < all.size(); ++i)
-        if (all[i] != nullptr) objects->addElement(all[i]);
+    for (int i = 0; i < all.size(); ++i) {
+        if (all[i] != nullptr) {
+            objects->addElement(all[i]);
+        }
+    }
     all.relinquishOwnership();
     return objects;
 }
@@ -61,7 +66,9 @@ public:
 
     CmpiObjectPath make() const {
         CmpiObjectPath path(static_cast<const char*>(m_nameSpace), m_className);
-        if (!m_host.isEmpty()) path.setHostname(static_cast<const char*>(m_host));
+        if (!m_host.isEmpty()) {
+            path.setHostname(static_cast<const char*>(m_host));
+        }
         return path;
     }
     const zemString& className() const { return m_className; }
@@ -99,8 +106,11 @@ zemBaseZemInstanceProvider* zemProviderPairAssociation::getProviderHandleByClass
     const char* name) const {
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
-        for (const auto* side : {&pair.m_leftAssiData, &pair.m_rightAssiData})
-            if (sameName(side->m_className, name)) return side->m_providerHandle;
+        for (const auto* side : {&pair.m_leftAssiData, &pair.m_rightAssiData}) {
+            if (sameName(side->m_className, name)) {
+                return side->m_providerHandle;
+            }
+        }
     }
     return nullptr;
 }
@@ -108,8 +118,9 @@ zemBaseZemInstanceProvider* zemProviderPairAssociation::getProviderHandleByClass
 bool zemProviderPairAssociation::findClassBySide(const char* name, bool isLeft) const {
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
-        if (sameName((isLeft ? pair.m_leftAssiData : pair.m_rightAssiData).m_className, name))
+        if (sameName((isLeft ? pair.m_leftAssiData : pair.m_rightAssiData).m_className, name)) {
             return true;
+        }
     }
     return false;
 }
@@ -119,8 +130,9 @@ bool zemProviderPairAssociation::hasRelationShipBetweenTwoClass(const char* left
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
         if (sameName(pair.m_leftAssiData.m_className, left) &&
-            sameName(pair.m_rightAssiData.m_className, right))
+            sameName(pair.m_rightAssiData.m_className, right)) {
             return true;
+        }
     }
     return false;
 }
@@ -141,7 +153,9 @@ void zemProviderPairAssociation::getCopsByClassName(const CmpiContext& ctx,
                                                     CachedPaths& cache2, bool isLeft) {
     const zemMultiNtoNAssociationData& side = isLeft ? pair.m_leftAssiData : pair.m_rightAssiData;
     int at = 0;
-    while (at < cache1.size() && !sameName(*cache1[at], side.m_className)) ++at;
+    while (at < cache1.size() && !sameName(*cache1[at], side.m_className)) {
+        ++at;
+    }
     if (at == cache1.size()) {
         zemAppend(cache2, fetch(ctx, cop, side, kNoHandle));
         zemAppend(cache1, std::make_unique<zemString>(side.m_className));
@@ -179,7 +193,9 @@ void zemProviderPairAssociation::enumerate(zemAssociationCall& call, const Enume
             CachedPaths paths(25);
             for (int i = 0; i < m_associationDataSet.size(); ++i) {
                 const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
-                if (!pair.isOf(call.className())) continue;
+                if (!pair.isOf(call.className())) {
+                    continue;
+                }
                 Paths lefts(25), rights(25);
                 getCopsByClassName(e.ctx, e.cop, pair, lefts, names, paths, true);
                 getCopsByClassName(e.ctx, e.cop, pair, rights, names, paths, false);
@@ -229,7 +245,9 @@ int zemProviderPairAssociation::getInstance(const CmpiContext& ctx, const CmpiOb
                         getRightRefPropName(), call.className(), m_providerName);
     bool found = false;
     call.guard([&] {
-        if (!exists(ctx, cop1, nullptr) || !exists(ctx, cop2, nullptr)) return;
+        if (!exists(ctx, cop1, nullptr) || !exists(ctx, cop2, nullptr)) {
+            return;
+        }
         prepare(ctx, call.className(), cop, [&](void* addInfo) {
             const Make make = [&](const CmpiObjectPath& left, const CmpiObjectPath& right) {
                 out = *associate(PathsLike(cop), left, right, properties, addInfo);
@@ -280,12 +298,14 @@ void zemProviderPairAssociation::collectTargets(const CmpiContext& ctx, const Cm
     for (int i = 0; i < m_associationDataSet.size(); ++i) {
         const Pair& pair = *m_associationDataSet.getAssoPairByID(i);
         bool isFirst = false;
-        if (!pair.isOf(assocClass) || !CheckClassNameInAssociationPair(ctx, cop, pair, isFirst))
+        if (!pair.isOf(assocClass) || !CheckClassNameInAssociationPair(ctx, cop, pair, isFirst)) {
             continue;
+        }
         auto target = std::make_unique<zemMultiTargetAssociationData>(pair, isFirst);
         target->m_AssoData.m_nameSpace = zemNameSpaceOr(target->m_AssoData.m_nameSpace, cop);
-        if (CheckRolesAndResultClass(resultRole, role, resultClass, *target))
+        if (CheckRolesAndResultClass(resultRole, role, resultClass, *target)) {
             zemAppend(targets, std::move(target));
+        }
     }
 }
 
@@ -293,13 +313,18 @@ void zemProviderPairAssociation::navigate(const zemAssociationRequest& r) {
     zemAssociationCall call(*this, m_providerName, *broker, r.operation, r.ctx, r.cop);
     call.require(m_supportedOperations);
     call.guard([&] {
-        if (!ValidateInputObjectPath(r.ctx, r.cop, call.word())) return;
+        if (!ValidateInputObjectPath(r.ctx, r.cop, call.word())) {
+            return;
+        }
         Targets targets(25);
         findTargets(r.ctx, r.cop, r.assocClass, r.resultClass, r.role, r.resultRole, targets);
-        if (r.is(OP_RefsOp) && zemIsGiven(r.assocClass))
+        if (r.is(OP_RefsOp) && zemIsGiven(r.assocClass)) {
             validateProerties(createObjectPath(r.cop, r.assocClass), r.properties, call.word());
+        }
         prepare(r.ctx, r.assocClass, r.cop, [&](void* addInfo) {
-            for (int i = 0; i < targets.size(); ++i) visitTarget(call, r, *targets[i], addInfo);
+            for (int i = 0; i < targets.size(); ++i) {
+                visitTarget(call, r, *targets[i], addInfo);
+            }
         });
     });
 }
@@ -322,23 +347,29 @@ void zemProviderPairAssociation::visitTarget(zemAssociationCall& call,
     std::optional<CmpiObjectPath> path;
     std::optional<CmpiInstance> instance;
     const Make make = [&](const CmpiObjectPath& left, const CmpiObjectPath& right) {
-        if (!r.is(OP_OnlyRefOps)) return;
+        if (!r.is(OP_OnlyRefOps)) {
+            return;
+        }
         path = call.classPath(zemNameSpaceOr(target.m_AssoNameSpace, r.cop), className);
         nameKeys(*path, left, right, className);
-        if (!r.is(OP_RefsOp)) return;
+        if (!r.is(OP_RefsOp)) {
+            return;
+        }
         instance = CmpiInstance(*path);
         complete(*instance, left, right, r.properties, className, addInfo);
     };
     const auto returnMade = [&](const CmpiObjectPath& found) {
         if (r.is(OP_AssocsOp)) {
             instance = CmpiInstance(found);
-            if (far.m_providerHandle->getInstance(r.ctx, found, r.properties, *instance) != 0)
+            if (far.m_providerHandle->getInstance(r.ctx, found, r.properties, *instance) != 0) {
                 return;
+            }
         }
-        if (instance)
+        if (instance) {
             r.rslt.returnData(*instance);
-        else
+        } else {
             r.rslt.returnData(path ? *path : found);
+        }
     };
     neighbours({r.ctx, r.cop, target.isFirst(), pair, addInfo}, *objects, make, returnMade);
 }
@@ -420,7 +451,9 @@ private:
 void zemBaseZemMultiNtoNAssociationProvider::prepare(const CmpiContext& ctx, const char* className,
                                                      const CmpiObjectPath&, const Work& work) {
     const Preparation preparation(*this, ctx, className);
-    if (preparation.succeeded()) work(nullptr);
+    if (preparation.succeeded()) {
+        work(nullptr);
+    }
 }
 
 void zemBaseZemMultiNtoNAssociationProvider::join(const Enumeration& e, const Paths& lefts,
@@ -431,11 +464,14 @@ void zemBaseZemMultiNtoNAssociationProvider::join(const Enumeration& e, const Pa
         for (int j = 0; j < rights.size(); ++j) {
             const CmpiObjectPath& left = *lefts[i];
             const CmpiObjectPath& right = *rights[j];
-            if (!isValidateAssociation(e.ctx, left, right, pair)) continue;
-            if (e.paths != nullptr)
+            if (!isValidateAssociation(e.ctx, left, right, pair)) {
+                continue;
+            }
+            if (e.paths != nullptr) {
                 zemAppend(*e.paths, associate(request, left, right));
-            else
+            } else {
                 zemAppend(*e.instances, associate(request, left, right, e.properties, nullptr));
+            }
         }
     }
 }
@@ -445,8 +481,9 @@ void zemBaseZemMultiNtoNAssociationProvider::neighbours(const Source& source, co
     for (int i = 0; i < targets.size(); ++i) {
         const CmpiObjectPath& target = *targets[i];
         if (belongs(source.ctx, source.left(target), source.right(target), source.pair, nullptr,
-                    make))
+                    make)) {
             found(target);
+        }
     }
 }
 
@@ -455,7 +492,9 @@ bool zemBaseZemMultiNtoNAssociationProvider::belongs(const CmpiContext& ctx,
                                                      const CmpiObjectPath& right, const Pair& pair,
                                                      void*, const Make& make) {
     const zemSynchronizer hold(m_operationLock);
-    if (!isValidateAssociation(ctx, left, right, pair)) return false;
+    if (!isValidateAssociation(ctx, left, right, pair)) {
+        return false;
+    }
     make(left, right);
     return true;
 }
@@ -559,26 +598,30 @@ zemEnhanceBaseZemMultiNtoNAssociationProvider::findValidAssociationCopMappingPai
     const CmpiContext& ctx, const Paths& leftCops, const Paths& rightCops, void* addInfo) {
     IndexPairs pairs(25);
     const PathsByKey hash = getObjectPathHashRes(rightCops);
-    for (int i = 0; i < leftCops.size(); ++i)
+    for (int i = 0; i < leftCops.size(); ++i) {
         setValidAssociationIndexPairSet(ctx, *leftCops[i], i, rightCops, hash, pairs, addInfo);
+    }
     return pairs;
 }
 
 zemEnhanceBaseZemMultiNtoNAssociationProvider::PathsByKey
 zemEnhanceBaseZemMultiNtoNAssociationProvider::getObjectPathHashRes(const Paths& rightCops) {
     PathsByKey hash;
-    for (int j = 0; j < rightCops.size(); ++j)
+    for (int j = 0; j < rightCops.size(); ++j) {
         hash.insert(getObjectPathHashKeyString(*rightCops[j], false), j);
+    }
     return hash;
 }
 
 void zemEnhanceBaseZemMultiNtoNAssociationProvider::setValidAssociationIndexPairSet(
     const CmpiContext& ctx, const CmpiObjectPath& leftCop, int leftIndex, const Paths& rightCops,
     const PathsByKey& hash, IndexPairs& pairs, void* addInfo) {
-    for (const int j : hash.getElement(getObjectPathHashKeyString(leftCop, true)))
-        if (isValidateAssociationPlus(ctx, leftCop, *rightCops[j], addInfo))
+    for (const int j : hash.getElement(getObjectPathHashKeyString(leftCop, true))) {
+        if (isValidateAssociationPlus(ctx, leftCop, *rightCops[j], addInfo)) {
             pairs.addElement(
                 std::make_unique<objectPathIndexPair>(objectPathIndexPair{leftIndex, j}));
+        }
+    }
 }
 
 std::set<int> zemEnhanceBaseZemMultiNtoNAssociationProvider::getValidIndexSet(
@@ -586,11 +629,13 @@ std::set<int> zemEnhanceBaseZemMultiNtoNAssociationProvider::getValidIndexSet(
     void* addInfo) {
     const zemString key = getObjectPathHashKeyString(source, isFirst);
     std::set<int> found;
-    for (int i = 0; i < targets.size(); ++i)
+    for (int i = 0; i < targets.size(); ++i) {
         if (getObjectPathHashKeyString(*targets[i], !isFirst) == key &&
             isValidateAssociationPlus(ctx, isFirst ? source : *targets[i],
-                                      isFirst ? *targets[i] : source, addInfo))
+                                      isFirst ? *targets[i] : source, addInfo)) {
             found.insert(found.end(), i);
+        }
+    }
     return found;
 }
 
@@ -598,18 +643,20 @@ void zemEnhanceBaseZemMultiNtoNAssociationProvider::setValidAssociationKeys(
     const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights, const IndexPairs& pairs,
     Paths& out) {
     const PathsLike request(cop);
-    for (int i = 0; i < pairs.size(); ++i)
+    for (int i = 0; i < pairs.size(); ++i) {
         zemAppend(out, associate(request, *lefts[pairs[i]->m_copsIndex1],
                                  *rights[pairs[i]->m_copsIndex2]));
+    }
 }
 
 void zemEnhanceBaseZemMultiNtoNAssociationProvider::setValidAssociationProperties(
     const CmpiObjectPath& cop, const Paths& lefts, const Paths& rights, const IndexPairs& pairs,
     const char** properties, void* addInfo, zemDynamicArray<CmpiInstance>& out) {
     const PathsLike request(cop);
-    for (int i = 0; i < pairs.size(); ++i)
+    for (int i = 0; i < pairs.size(); ++i) {
         zemAppend(out, associate(request, *lefts[pairs[i]->m_copsIndex1],
                                  *rights[pairs[i]->m_copsIndex2], properties, addInfo));
+    }
 }
 
 void zemEnhanceBaseZemMultiNtoNAssociationProvider::prepare(const CmpiContext& ctx,
@@ -624,11 +671,12 @@ void zemEnhanceBaseZemMultiNtoNAssociationProvider::join(const Enumeration& e, c
                                                          const Paths& rights, const Pair&,
                                                          void* addInfo) {
     const IndexPairs pairs = findValidAssociationCopMappingPair(e.ctx, lefts, rights, addInfo);
-    if (e.paths != nullptr)
+    if (e.paths != nullptr) {
         setValidAssociationKeys(e.cop, lefts, rights, pairs, *e.paths);
-    else
+    } else {
         setValidAssociationProperties(e.cop, lefts, rights, pairs, e.properties, addInfo,
                                       *e.instances);
+    }
 }
 
 void zemEnhanceBaseZemMultiNtoNAssociationProvider::neighbours(const Source& source,
@@ -650,8 +698,9 @@ bool zemEnhanceBaseZemMultiNtoNAssociationProvider::belongs(const CmpiContext& c
                                                             const Make& make) {
     if (getObjectPathHashKeyString(left, true) != getObjectPathHashKeyString(right, false) ||
         !isValidateAssociationPlus(ctx, left, right, addInfo) ||
-        !isValidateAssociation(ctx, left, right, addInfo))
+        !isValidateAssociation(ctx, left, right, addInfo)) {
         return false;
+    }
     make(left, right);
     return true;
 }

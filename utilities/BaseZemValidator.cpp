@@ -94,8 +94,9 @@ CmpiData zemBaseZemValidator::getInstanceProperty(const CmpiInstance& instance, 
         value = instance.getProperty(name);
     } catch (const CmpiStatus& status) {
         // Small servers call it not found, which not every binding takes for an answer.
-        if (status.rc() == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc() == CMPI_RC_ERR_NOT_FOUND)
+        if (status.rc() == CMPI_RC_ERR_NO_SUCH_PROPERTY || status.rc() == CMPI_RC_ERR_NOT_FOUND) {
             return CmpiData();
+        }
         const zemString className = zemClassOf(instance);
         PROV_TRACE_STRING(4, "Internal error.Get property:\"%s\" of %s failed. CMPI STATUS:%s  %s",
                           name, Text(className), cmpiRcToString(status.rc()),
@@ -120,7 +121,9 @@ CmpiData zemBaseZemValidator::getInstanceProperty(const CmpiInstance& instance, 
 }
 
 void zemBaseZemValidator::validateRequestedProperty(const CmpiInstance& instance, Text name) {
-    if (!zemIsMissing(anyProperty(instance, name))) return;
+    if (!zemIsMissing(anyProperty(instance, name))) {
+        return;
+    }
     PROV_TRACE_LOCALS();
     PROV_TRACE_STRING(4, "Invalid \"%s\"", name);
     fail(kRequested, {{'p', name}, {'K', zemClassOf(instance)}});
@@ -141,10 +144,14 @@ void zemBaseZemValidator::validateCannotSpecifiedProperty(const CmpiInstance& in
 void zemBaseZemValidator::validateUnmodifiableProperty(const CmpiInstance& oldInstance,
                                                        const CmpiInstance& newInstance, Text name) {
     const CmpiData newValue = anyProperty(newInstance, name);
-    if (zemIsMissing(newValue)) return;
+    if (zemIsMissing(newValue)) {
+        return;
+    }
     const zemString oldText = cmpidata2String(anyProperty(oldInstance, name));
     const zemString newText = cmpidata2String(newValue);
-    if (oldText == newText) return;
+    if (oldText == newText) {
+        return;
+    }
     traceInvalid(newInstance, name);
     fail(kUnmodifiable,
          {{'p', name}, {'K', zemClassOf(newInstance)}, {'v', oldText}, {'w', newText}});
@@ -154,10 +161,16 @@ void zemBaseZemValidator::validateFixedValueProperty(const CmpiInstance& instanc
                                                      Text propertyName, const zemString& value,
                                                      bool allowEmpty) {
     const CmpiData found = anyProperty(instance, propertyName);
-    if (allowEmpty && zemIsMissing(found)) return;
+    if (allowEmpty && zemIsMissing(found)) {
+        return;
+    }
     zemString text;
-    if (!zemReadText(found, text)) text = cmpidata2String(found);
-    if (text == value) return;
+    if (!zemReadText(found, text)) {
+        text = cmpidata2String(found);
+    }
+    if (text == value) {
+        return;
+    }
     traceInvalid(instance, propertyName);
     throwPropertyValueDoesntMatchExc(zemClassOf(instance), propertyName, text, value);
 }
@@ -171,7 +184,9 @@ CmpiInstance zemBaseZemValidator::validateEmbeddedObject(const CmpiContext& ctx,
                                                          const CmpiObjectPath& cop,
                                                          Text parameterName, Text methodName) {
     const zemString path = objectPathToString(cop);
-    if (cop.getKeyCount() == 0) throwInvalidMethodArgValueExc(parameterName, path, methodName);
+    if (cop.getKeyCount() == 0) {
+        throwInvalidMethodArgValueExc(parameterName, path, methodName);
+    }
     try {
         return broker->getInstance(ctx, cop, nullptr);
     } catch (const CmpiStatus& status) {
@@ -242,7 +257,9 @@ CmpiData zemBaseZemValidator::anyProperty(const CmpiInstance& instance, Text nam
 
 void zemBaseZemValidator::refuseValue(const CmpiInstance& instance, Text name, Text sentence) {
     const CmpiData value = anyProperty(instance, name);
-    if (zemIsMissing(value)) return;
+    if (zemIsMissing(value)) {
+        return;
+    }
     traceInvalid(instance, name);
     fail(sentence, {{'p', name}, {'K', zemClassOf(instance)}, {'v', cmpidata2String(value)}});
 }
@@ -251,6 +268,8 @@ void zemBaseZemValidator::traceInvalid(const CmpiInstance& instance, Text name) 
     PROV_TRACE_LOCALS();
     CmpiInstance readable(instance);
     zemString text = instanceToString(readable);
-    if (text.length() <= kZemPrintable) zemPrint(instance, text);
+    if (text.length() <= kZemPrintable) {
+        zemPrint(instance, text);
+    }
     PROV_TRACE_STRING(4, "Invalid \"%s\":%s", name, Text(text));
 }

@@ -89,9 +89,13 @@ bool isOneValue(std::string_view text) {
         const std::string_view field = text.substr(begin);
         const size_t word = field.find_first_not_of("abcdefghijklmnopqrstuvwxyz_");
         const char after = word != field.npos ? field[word] : '\0';
-        if ((word == 0 && after == '"') || (begin > 0 && word > 0 && after == '=')) return false;
+        if ((word == 0 && after == '"') || (begin > 0 && word > 0 && after == '=')) {
+            return false;
+        }
         begin = text.find(',', begin);
-        if (begin == text.npos) return true;
+        if (begin == text.npos) {
+            return true;
+        }
     }
 }
 

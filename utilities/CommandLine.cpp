@@ -42,7 +42,9 @@ bool collectArgument(const std::string& text, size_t& pos, std::string& argument
 std::string zemEscaped(const char* text) {
     std::string result;
     for (; zemIsGiven(text); ++text) {
-        if (*text == '"' || *text == '\\') result += '\\';
+        if (*text == '"' || *text == '\\') {
+            result += '\\';
+        }
         result += *text;
     }
     return result;

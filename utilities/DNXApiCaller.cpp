@@ -40,7 +40,9 @@ constexpr ErrorRow kUndefined = {0, "DNX_API_UNKNOWN", "Undefined error."};
 
 const ErrorRow& errorOf(int code) {
     for (const ErrorRow& row : kErrors) {
-        if (row.code == code) return row;
+        if (row.code == code) {
+            return row;
+        }
     }
     return kUndefined;
 }
@@ -163,12 +165,16 @@ int zemApiCaller::getReturnCode(void* result) {
 }
 
 char* zemApiCaller::getProperty(void* record, const char* key) {
-    if (record == nullptr || key == nullptr) return nullptr;
+    if (record == nullptr || key == nullptr) {
+        return nullptr;
+    }
     return ::getProperty(static_cast<apiProp*>(record), argument(key));
 }
 
 void zemApiCaller::freeApi(void* result) {
-    if (result != nullptr) ::freeApi(static_cast<apiProp*>(result));
+    if (result != nullptr) {
+        ::freeApi(static_cast<apiProp*>(result));
+    }
 }
 
 void zemApiProp::freeApi() {
@@ -178,11 +184,19 @@ void zemApiProp::freeApi() {
 
 zemApiObjects::zemApiObjects(const zemApiReader& reader, apiProp* result)
     : m_reader(reader), m_result(result) {
-    if (result == nullptr && reader.nullId != nullptr) throwNoResult(reader);
+    if (result == nullptr && reader.nullId != nullptr) {
+        throwNoResult(reader);
+    }
     const int code = zemApiCaller::getReturnCode(result);
-    if (code == kNotFound && reader.notFoundIsEmpty) return;
-    if (code != 0) throwCode(reader, code);
-    if (result->objCount > 1) m_size = static_cast<std::size_t>(result->objCount) - 1;
+    if (code == kNotFound && reader.notFoundIsEmpty) {
+        return;
+    }
+    if (code != 0) {
+        throwCode(reader, code);
+    }
+    if (result->objCount > 1) {
+        m_size = static_cast<std::size_t>(result->objCount) - 1;
+    }
 }
 
 apiProp& zemApiObjects::only(const char* key) const {

@@ -19,8 +19,11 @@ zemString behind(const zemString& value, int position) {
 }
 
 bool isOneOf(const zemString& className, std::initializer_list<const char*> parts) {
-    for (const char* part : parts)
-        if (className.find(part) >= 0) return true;
+    for (const char* part : parts) {
+        if (className.find(part) >= 0) {
+            return true;
+        }
+    }
     return false;
 }
 
@@ -54,9 +57,12 @@ struct Row {
     void (*cut)(const Reading& r);
 
     bool fits(const zemString& className) const {
-        for (const char* const* name = classes; *name != nullptr; ++name)
-            if (byPart ? className.find(*name) >= 0 : zemString::equalsIgnoreCase(className, *name))
+        for (const char* const* name = classes; *name != nullptr; ++name) {
+            if (byPart ? className.find(*name) >= 0
+                       : zemString::equalsIgnoreCase(className, *name)) {
                 return true;
+            }
+        }
         return false;
     }
 };
@@ -81,7 +87,9 @@ struct zemIdentityCuts {
         const zemString value = r.value();
         const int last = value.reverseFind('*');
         const int second = last > 0 ? value.reverseFind('*', static_cast<unsigned>(last) - 1) : -1;
-        if (second > 0) r.mtms = behind(value, second);
+        if (second > 0) {
+            r.mtms = behind(value, second);
+        }
     }
     static void behindFirstDash(const Reading& r) {
         const zemString value = r.value();
@@ -95,24 +103,27 @@ struct zemIdentityCuts {
     }
     /// A pool class ends with the word; classes about pools, with text behind it, have no host.
     static void pool(const Reading& r) {
-        if (static_cast<std::size_t>(r.className.find("Pool")) + 4 == r.className.length())
+        if (static_cast<std::size_t>(r.className.find("Pool")) + 4 == r.className.length()) {
             behindFirstStar(r);
+        }
     }
     /// Devices of a host carry its MTMS, those of anything else are cut like a partition's.
     static void device(const Reading& r) {
-        if (zemString::equalsIgnoreCase(keyOf(r.cop, "SystemCreationClassName"), kHostClass))
+        if (zemString::equalsIgnoreCase(keyOf(r.cop, "SystemCreationClassName"), kHostClass)) {
             whole(r);
-        else
+        } else {
             behindFirstStar(r);
+        }
     }
     /// The same, but only for hosts and partitions.
     static void knownDevice(const Reading& r) {
         const zemString creator = keyOf(r.cop, "SystemCreationClassName");
         const zemString value = r.value();
-        if (zemString::equalsIgnoreCase(creator, kHostClass))
+        if (zemString::equalsIgnoreCase(creator, kHostClass)) {
             r.mtms = value;
-        else if (zemString::equalsIgnoreCase(creator, kPartitionClass))
+        } else if (zemString::equalsIgnoreCase(creator, kPartitionClass)) {
             zemDataTypeConvertManager::seperateMTMSAndLparID(value, r.mtms, r.lparid);
+        }
     }
     static void behindCapabilitiesPrefix(const Reading& r) {
         r.mtms = r.value().extractSubstring(kCapabilitiesLength);
@@ -128,10 +139,11 @@ struct zemIdentityCuts {
     static void metric(const Reading& r) {
         const zemString value = r.value();
         const zemString text = value.extractSubstring(kCapabilitiesLength);
-        if (value.find(kMetricOfHosts) >= 0)
+        if (value.find(kMetricOfHosts) >= 0) {
             r.mtms = text;
-        else
+        } else {
             zemDataTypeConvertManager::seperateMTMSAndLparID(text, r.mtms, r.lparid);
+        }
     }
 };
 
@@ -185,7 +197,9 @@ template <std::size_t N>
 void apply(const Row (&rows)[N], const CmpiObjectPath& cop, zemString& mtms, zemString& lparid) {
     const zemString className(cop.getClassName().charPtr());
     for (const Row& row : rows) {
-        if (!row.fits(className)) continue;
+        if (!row.fits(className)) {
+            continue;
+        }
         row.cut({cop, className, row.key, mtms, lparid});
         return;
     }
@@ -209,7 +223,9 @@ void zemDataTypeConvertManager::getMTMSAndLparIDByOp(const CmpiObjectPath& cop, 
 void zemDataTypeConvertManager::seperateMTMSAndLparID(const zemString& key, zemString& mtms,
                                                       zemString& lparid) {
     const int star = key.find('*');
-    if (star < 0) return;
+    if (star < 0) {
+        return;
+    }
     lparid = key.extractSubstring(0, static_cast<unsigned>(star));
     mtms = behind(key, star);
 }

@@ -57,6 +57,7 @@ void zemJMPIInstanceProviderBrokerInterface::enumInstances(const CmpiContext& ct
     const zemSynchronizer hold(getSynchronizerContext());
     const zemBrokerTiming timing("<ei>", className);
     CmpiEnumeration instances = m_broker.enumInstances(ctx, cop, properties);
-    while (instances.hasNext())
+    while (instances.hasNext()) {
         zemAppend(out, std::make_unique<CmpiInstance>(zemNextInstance(instances)));
+    }
 }

@@ -21,7 +21,9 @@
 /// Passes on the unwinding of a thread, which alone is no current exception. A handler of its type
 /// would do the same, but binds a reference to no object, which is undefined.
 inline void zemLetUnwind() {
-    if (std::current_exception() == nullptr) throw;
+    if (std::current_exception() == nullptr) {
+        throw;
+    }
 }
 
 /// Keeps this thread from being cancelled while the object lives; a request that comes meanwhile is
@@ -29,10 +31,14 @@ inline void zemLetUnwind() {
 class zemUncancelled {
 public:
     explicit zemUncancelled(bool wanted = true) : m_wanted(wanted) {
-        if (m_wanted) pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &m_before);
+        if (m_wanted) {
+            pthread_setcancelstate(PTHREAD_CANCEL_DISABLE, &m_before);
+        }
     }
     ~zemUncancelled() {
-        if (m_wanted) pthread_setcancelstate(m_before, nullptr);
+        if (m_wanted) {
+            pthread_setcancelstate(m_before, nullptr);
+        }
     }
     zemUncancelled(const zemUncancelled&) = delete;
     zemUncancelled& operator=(const zemUncancelled&) = delete;

@@ -15,8 +15,12 @@ void zemPutLogText(const char* text, Put put) {
     const char* next = text;
     for (; *next != '\0'; ++next) {
         const auto byte = static_cast<unsigned char>(*next);
-        if ((byte >= ' ' && byte != 0x7F) || byte == '\t') continue;
-        if (byte == '\n' && strchr(" \t}", next[1]) != nullptr) continue;  // the end, too
+        if ((byte >= ' ' && byte != 0x7F) || byte == '\t') {
+            continue;
+        }
+        if (byte == '\n' && strchr(" \t}", next[1]) != nullptr) {
+            continue;  // the end, too
+        }
         char escape[8];
         const int size = snprintf(escape, sizeof escape,
                                   byte == '\n'   ? "\\n"

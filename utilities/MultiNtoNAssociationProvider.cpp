@@ -24,11 +24,15 @@ zemStringPairs readPairs(const char* block) {
     const char* name = block;
     while (zemIsGiven(name)) {
         const char* const second = name + std::strlen(name) + 1;
-        if (*second == '\0') throw zemInvalidParameterException("");
+        if (*second == '\0') {
+            throw zemInvalidParameterException("");
+        }
         pairs.addPair(name, second);
         name = second + std::strlen(second) + 1;
     }
-    if (pairs.size() == 0) throw zemInvalidParameterException("");
+    if (pairs.size() == 0) {
+        throw zemInvalidParameterException("");
+    }
     return pairs;
 }
 
@@ -38,7 +42,9 @@ bool anyPair(const zemStringPairs& pairs, Fits fits) {
     zemString first, second;
     for (int i = 0; i < pairs.size(); ++i) {
         pairs.getPair(i, first, second);
-        if (fits(first, second)) return true;
+        if (fits(first, second)) {
+            return true;
+        }
     }
     return false;
 }
@@ -48,9 +54,12 @@ zemArray<zemString> aggregate(const zemDynamicArray<zemString>& names, const cha
     zemArray<zemString> kept(16);
     for (int i = 0; i < names.size(); ++i) {
         bool covered = false;
-        for (int j = i + 1; j < names.size() && !covered; ++j)
+        for (int j = i + 1; j < names.size() && !covered; ++j) {
             covered = zemClassIsA(nameSpace, *names[i], *names[j]);
-        if (!covered) kept.append(*names[i]);
+        }
+        if (!covered) {
+            kept.append(*names[i]);
+        }
     }
     return kept;
 }
@@ -66,7 +75,9 @@ public:
     std::shared_ptr<const Paths> paths(const zemString& className, const zemString& nameSpace) {
         const zemString key = className + nameSpace;
         std::shared_ptr<const Paths> objects;
-        if (m_objects.lookup(key, objects) == 0) return objects;
+        if (m_objects.lookup(key, objects) == 0) {
+            return objects;
+        }
         const zemSynchronizer hold(m_lock);
         objects = std::make_shared<const Paths>(m_call.paths(nameSpace, className));
         m_objects.insert(key, objects);
@@ -149,7 +160,9 @@ zemString zemMultiNtoNAssociationProvider::getAssoNameSpace(const CmpiObjectPath
 
 void zemMultiNtoNAssociationProvider::aggregateReferenceClasses() {
     const zemSynchronizer hold(m_refClassCacheMtx);
-    if (m_isAggregated) return;
+    if (m_isAggregated) {
+        return;
+    }
     const auto first = aggregate(m_refClassNamePairs.getFirstElements(), getNameSpace1());
     const auto second = aggregate(m_refClassNamePairs.getSecondElements(), getNameSpace2());
     // both lists or none: the server may fail meanwhile, and the next operation tries again
@@ -160,16 +173,24 @@ void zemMultiNtoNAssociationProvider::aggregateReferenceClasses() {
 
 bool zemMultiNtoNAssociationProvider::isFirstClass(const CmpiObjectPath& cop, zemString* out) {
     return anyPair(m_refClassNamePairs, [&](const zemString& first, const zemString&) {
-        if (!zemPathIsA(cop, first)) return false;
-        if (out != nullptr) *out = first;
+        if (!zemPathIsA(cop, first)) {
+            return false;
+        }
+        if (out != nullptr) {
+            *out = first;
+        }
         return true;
     });
 }
 
 bool zemMultiNtoNAssociationProvider::isSecondClass(const CmpiObjectPath& cop, zemString* out) {
     return anyPair(m_refClassNamePairs, [&](const zemString&, const zemString& second) {
-        if (!zemPathIsA(cop, second)) return false;
-        if (out != nullptr) *out = second;
+        if (!zemPathIsA(cop, second)) {
+            return false;
+        }
+        if (out != nullptr) {
+            *out = second;
+        }
         return true;
     });
 }
@@ -180,7 +201,9 @@ int zemMultiNtoNAssociationProvider::getReferenceClass(const CmpiObjectPath& cop
                                                        zemString& strRefClassName2) {
     const bool found =
         anyPair(m_refClassNamePairs, [&](const zemString& first, const zemString& second) {
-            if (!zemIsOfClass(cop1, first) || !zemIsOfClass(cop2, second)) return false;
+            if (!zemIsOfClass(cop1, first) || !zemIsOfClass(cop2, second)) {
+                return false;
+            }
             strRefClassName1 = first;
             strRefClassName2 = second;
             return true;
@@ -246,8 +269,9 @@ CmpiInstance zemMultiNtoNAssociationProvider::performGetInstance(const CmpiConte
     zemRefuseReferences(fits1 ? nullptr : static_cast<const char*>(text1), m_refPropName1,
                         fits2 ? nullptr : static_cast<const char*>(text2), m_refPropName2,
                         m_assocClassName, m_providerName);
-    if (!joined || !isValidateAssociation(ctx, cop1, cop2))
+    if (!joined || !isValidateAssociation(ctx, cop1, cop2)) {
         throwObjectNotFoundExc(call.word(), call.className(), objectPathToString(cop));
+    }
 
     const zemSynchronizer hold(m_synchContext);
     const CmpiObjectPath path1 = call.getInstance(cop1).getObjectPath();
@@ -278,15 +302,20 @@ void zemMultiNtoNAssociationProvider::implementEnumeration(const CmpiContext& ct
         ObjectCache cache(call, m_synchContext, firsts.size() + seconds.size());
         for (int i = 0; i < firsts.size(); ++i) {
             for (int j = 0; j < seconds.size(); ++j) {
-                if (!hasAssociationBetweenClasses(firsts[i], seconds[j])) continue;
+                if (!hasAssociationBetweenClasses(firsts[i], seconds[j])) {
+                    continue;
+                }
                 const auto cops1 = cache.paths(firsts[i], getNameSpace1(cop));
                 const auto cops2 = cache.paths(seconds[j], getNameSpace2(cop));
-                for (const CmpiObjectPath& cop1 : *cops1)
-                    for (const CmpiObjectPath& cop2 : *cops2)
-                        if (isValidateAssociation(ctx, cop1, cop2))
+                for (const CmpiObjectPath& cop1 : *cops1) {
+                    for (const CmpiObjectPath& cop2 : *cops2) {
+                        if (isValidateAssociation(ctx, cop1, cop2)) {
                             zemReturnReference(*this, rslt, createObjectPath(cop), cop1, cop2,
                                                properties, call.className(),
                                                opType == OP_EnumInstsOp);
+                        }
+                    }
+                }
             }
         }
     });
@@ -306,10 +335,13 @@ void zemMultiNtoNAssociationProvider::implementAssociation(
     const char* resultClass, const char* role, const char* resultRole, const char** properties,
     SupportedOpType opType, const char* callingMethod) {
     aggregateReferenceClasses();
-    if (validateSourceObject(ctx, cop, callingMethod) != 0) return;
-    if (opType == OP_RefsOp)
+    if (validateSourceObject(ctx, cop, callingMethod) != 0) {
+        return;
+    }
+    if (opType == OP_RefsOp) {
         validateProerties(createObjectPath(cop, getAssoNameSpace(cop), m_assocClassName),
                           properties, callingMethod);
+    }
     const auto fits = [](const char* wanted, const zemString& property) {
         return !zemIsGiven(wanted) || zemString::equalsIgnoreCase(property, wanted);
     };
@@ -318,12 +350,14 @@ void zemMultiNtoNAssociationProvider::implementAssociation(
                        fits(resultRole, m_refPropName2);
     const bool second = fits(role, m_refPropName2) && isSecondClass(cop, &sourceName2) &&
                         fits(resultRole, m_refPropName1);
-    if (first)
+    if (first) {
         association(ctx, rslt, cop, resultClass, properties, sourceName1, true, opType,
                     callingMethod);
-    if (second)
+    }
+    if (second) {
         association(ctx, rslt, cop, resultClass, properties, sourceName2, false, opType,
                     callingMethod);
+    }
 }
 
 void zemMultiNtoNAssociationProvider::association(const CmpiContext& ctx, CmpiResult& rslt,
@@ -345,8 +379,9 @@ void zemMultiNtoNAssociationProvider::association(const CmpiContext& ctx, CmpiRe
             const char* const target = targets[i];
             const bool joined = isFirst ? hasAssociationBetweenClasses(source, target)
                                         : hasAssociationBetweenClasses(target, source);
-            if (joined && isWanted(target, nameSpace, resultClass))
+            if (joined && isWanted(target, nameSpace, resultClass)) {
                 returnNeighbours(call, request, target, nameSpace, isFirst);
+            }
         }
     });
 }
@@ -365,7 +400,9 @@ void zemMultiNtoNAssociationProvider::returnNeighbours(zemAssociationCall& call,
     PROV_TRACE_LOCALS();
     const CmpiObjectPath target = call.classPath(nameSpace, targetName);
     const bool instances = r.is(OP_AssocsOp);
-    if (instances) validateProerties(target, r.properties, call.word());
+    if (instances) {
+        validateProerties(target, r.properties, call.word());
+    }
     const auto makePath = [&] { return call.classPath(getAssoNameSpace(r.cop), m_assocClassName); };
 
     const zemSynchronizer hold(m_synchContext);
@@ -376,8 +413,12 @@ void zemMultiNtoNAssociationProvider::returnNeighbours(zemAssociationCall& call,
         zemAssociationCandidate candidate = zemNextCandidate(objects, instances);
         const CmpiObjectPath& cop1 = isFirst ? r.cop : candidate.path;
         const CmpiObjectPath& cop2 = isFirst ? candidate.path : r.cop;
-        if (!isValidateAssociation(r.ctx, cop1, cop2)) continue;
-        if (!instances) candidate.path.setNameSpace(nameSpace);
+        if (!isValidateAssociation(r.ctx, cop1, cop2)) {
+            continue;
+        }
+        if (!instances) {
+            candidate.path.setNameSpace(nameSpace);
+        }
         zemReturnNeighbour(*this, r, candidate, cop1, cop2, m_assocClassName, makePath);
     }
 }

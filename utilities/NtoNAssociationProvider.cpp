@@ -75,24 +75,42 @@ void zemNtoNAssociationProvider::addProperties(CmpiInstance& inst, const CmpiObj
 bool zemNtoNAssociationProvider::isFirstClass(const CmpiObjectPath& cop, const char* resultClass,
                                               const char* role, const char* resultRole) {
     if (zemIsGiven(role)) {
-        if (zemString::equalsIgnoreCase(m_refPropName1, role)) return true;
-        if (zemString::equalsIgnoreCase(m_refPropName2, role)) return false;
+        if (zemString::equalsIgnoreCase(m_refPropName1, role)) {
+            return true;
+        }
+        if (zemString::equalsIgnoreCase(m_refPropName2, role)) {
+            return false;
+        }
     }
     const zemString className = zemClassOf(cop);
-    if (compareClassNames(className, m_refClassName1)) return true;
-    if (compareClassNames(className, m_refClassName2)) return false;
+    if (compareClassNames(className, m_refClassName1)) {
+        return true;
+    }
+    if (compareClassNames(className, m_refClassName2)) {
+        return false;
+    }
 
     const bool is1 = zemPathIsA(cop, m_refClassName1);
     const bool is2 = zemPathIsA(cop, m_refClassName2);
-    if (is1 != is2) return is1;
+    if (is1 != is2) {
+        return is1;
+    }
     const zemString nameSpace = zemTextOf(cop.getNameSpace());
     if (is1) {
-        if (zemClassIsA(nameSpace, m_refClassName1, m_refClassName2)) return true;
-        if (zemClassIsA(nameSpace, m_refClassName2, m_refClassName1)) return false;
+        if (zemClassIsA(nameSpace, m_refClassName1, m_refClassName2)) {
+            return true;
+        }
+        if (zemClassIsA(nameSpace, m_refClassName2, m_refClassName1)) {
+            return false;
+        }
     }
     if (zemIsGiven(resultRole)) {
-        if (zemString::equalsIgnoreCase(m_refPropName1, resultRole)) return false;
-        if (zemString::equalsIgnoreCase(m_refPropName2, resultRole)) return true;
+        if (zemString::equalsIgnoreCase(m_refPropName1, resultRole)) {
+            return false;
+        }
+        if (zemString::equalsIgnoreCase(m_refPropName2, resultRole)) {
+            return true;
+        }
     }
     return !zemIsGiven(resultClass) || !zemClassIsA(nameSpace, m_refClassName1, resultClass);
 }
@@ -130,7 +148,9 @@ CmpiInstance zemNtoNAssociationProvider::performGetInstance(const CmpiContext& c
         const CmpiObjectPath path1 = call.getInstance(cop1).getObjectPath();
         const CmpiObjectPath path2 = call.getInstance(cop2).getObjectPath();
         const zemString refusal = refuseReferences(ctx, cop1, cop2);
-        if (!refusal.isEmpty()) throw zemInvalidParameterException(refusal);
+        if (!refusal.isEmpty()) {
+            throw zemInvalidParameterException(refusal);
+        }
         CmpiObjectPath ncop = createObjectPath(cop);
         result = zemReferenceInstance(*this, ncop, path1, path2, properties, call.className());
     });
@@ -148,9 +168,15 @@ zemString zemNtoNAssociationProvider::refuseReferences(const CmpiContext& ctx,
                m_assocClassName + " is provided to method getInstance on provider " +
                m_providerName;
     };
-    if (!zemIsOfClass(cop1, m_refClassName1)) return invalid(text1, m_refPropName1);
-    if (!zemIsOfClass(cop2, m_refClassName2)) return invalid(text2, m_refPropName2);
-    if (isValidateAssociation(ctx, cop1, cop2)) return zemString();
+    if (!zemIsOfClass(cop1, m_refClassName1)) {
+        return invalid(text1, m_refPropName1);
+    }
+    if (!zemIsOfClass(cop2, m_refClassName2)) {
+        return invalid(text2, m_refPropName2);
+    }
+    if (isValidateAssociation(ctx, cop1, cop2)) {
+        return zemString();
+    }
     return "There doesn't exist an association " + m_assocClassName + " between the property " +
            m_refPropName1 + " with value " + text1 + " and the property " + m_refPropName2 +
            " with value " + text2;
@@ -163,12 +189,17 @@ void zemNtoNAssociationProvider::enumerate(const zemAssociationRequest& r) {
         const zemSynchronizer hold(m_synchContext);
         const auto cops1 = call.paths(getNameSpace1(r.cop), m_refClassName1);
         const auto cops2 = call.paths(getNameSpace2(r.cop), m_refClassName2);
-        if (!BeforeGenerateAssociation(r.ctx)) return;
-        for (const CmpiObjectPath& cop1 : cops1)
-            for (const CmpiObjectPath& cop2 : cops2)
-                if (isValidateAssociation(r.ctx, cop1, cop2))
+        if (!BeforeGenerateAssociation(r.ctx)) {
+            return;
+        }
+        for (const CmpiObjectPath& cop1 : cops1) {
+            for (const CmpiObjectPath& cop2 : cops2) {
+                if (isValidateAssociation(r.ctx, cop1, cop2)) {
                     zemReturnReference(*this, r.rslt, createObjectPath(r.cop), cop1, cop2,
                                        r.properties, call.className(), r.is(OP_EnumInstsOp));
+                }
+            }
+        }
         AfterGenerateAssociation(r.ctx);
     });
 }
@@ -180,14 +211,21 @@ void zemNtoNAssociationProvider::navigate(const zemAssociationRequest& r) {
     call.require(m_supportedOperations);
     call.guard([&] {
         const bool first = isFirstClass(r.cop, r.resultClass, r.role, r.resultRole);
-        if (!passesFilters(r, first)) return;
+        if (!passesFilters(r, first)) {
+            return;
+        }
         const zemString nameSpace = first ? getNameSpace2(r.cop) : getNameSpace1(r.cop);
         zemString target = first ? m_refClassName2 : m_refClassName1;
-        if (!narrowTarget(r, nameSpace, target)) return;
-        if (validateSourceObject(r.ctx, r.cop, call.word()) != 0) return;
-        if (r.is(OP_RefsOp))
+        if (!narrowTarget(r, nameSpace, target)) {
+            return;
+        }
+        if (validateSourceObject(r.ctx, r.cop, call.word()) != 0) {
+            return;
+        }
+        if (r.is(OP_RefsOp)) {
             validateProerties(call.classPath(getAssoNameSpace(r.cop), m_assocClassName),
                               r.properties, call.word());
+        }
         const zemSynchronizer hold(m_synchContext);
         returnNeighbours(call, r, call.classPath(nameSpace, target), first);
     });
@@ -211,8 +249,12 @@ bool zemNtoNAssociationProvider::passesFilters(const zemAssociationRequest& r, b
 /// @return false when neither is derived from the other, so that there is nothing to return
 bool zemNtoNAssociationProvider::narrowTarget(const zemAssociationRequest& r, const char* nameSpace,
                                               zemString& target) const {
-    if (!zemIsGiven(r.resultClass) || zemClassIsA(nameSpace, target, r.resultClass)) return true;
-    if (!zemClassIsA(nameSpace, r.resultClass, target)) return false;
+    if (!zemIsGiven(r.resultClass) || zemClassIsA(nameSpace, target, r.resultClass)) {
+        return true;
+    }
+    if (!zemClassIsA(nameSpace, r.resultClass, target)) {
+        return false;
+    }
     target = r.resultClass;
     return true;
 }
@@ -222,22 +264,31 @@ bool zemNtoNAssociationProvider::narrowTarget(const zemAssociationRequest& r, co
 void zemNtoNAssociationProvider::returnNeighbours(zemAssociationCall& call,
                                                   const zemAssociationRequest& r,
                                                   const CmpiObjectPath& target, bool first) {
-    if (r.is(OP_AssocsOp)) validateProerties(target, r.properties, call.word());
+    if (r.is(OP_AssocsOp)) {
+        validateProerties(target, r.properties, call.word());
+    }
     CmpiEnumeration objects = call.targets(r, target, zemClassOf(target));
     std::vector<zemAssociationCandidate> all;
     while (r.is(OP_OnlyRefOps) && objects.hasNext()) {
         all.push_back(zemNextCandidate(objects, false));
         call.place(all.back().path, zemTextOf(target.getNameSpace()));
     }
-    if (!BeforeGenerateAssociation(r.ctx)) return;
+    if (!BeforeGenerateAssociation(r.ctx)) {
+        return;
+    }
     const auto makePath = [&] { return call.classPath(getAssoNameSpace(r.cop), m_assocClassName); };
     const auto tryPair = [&](const zemAssociationCandidate& candidate) {
         const CmpiObjectPath& cop1 = first ? r.cop : candidate.path;
         const CmpiObjectPath& cop2 = first ? candidate.path : r.cop;
-        if (isValidateAssociation(r.ctx, cop1, cop2))
+        if (isValidateAssociation(r.ctx, cop1, cop2)) {
             zemReturnNeighbour(*this, r, candidate, cop1, cop2, m_assocClassName, makePath);
+        }
     };
-    for (const zemAssociationCandidate& candidate : all) tryPair(candidate);
-    while (objects.hasNext()) tryPair(zemNextCandidate(objects, r.is(OP_AssocsOp)));
+    for (const zemAssociationCandidate& candidate : all) {
+        tryPair(candidate);
+    }
+    while (objects.hasNext()) {
+        tryPair(zemNextCandidate(objects, r.is(OP_AssocsOp)));
+    }
     AfterGenerateAssociation(r.ctx);
 }

@@ -86,7 +86,9 @@ public:
         : m_descriptor(static_cast<int>(syscall(SYS_pidfd_open, pid, 0))) {}
     ~ChildEnd() {
         const zemUncancelled uncancelled;
-        if (isKnown()) close(m_descriptor);
+        if (isKnown()) {
+            close(m_descriptor);
+        }
     }
     ChildEnd(const ChildEnd&) = delete;
     ChildEnd& operator=(const ChildEnd&) = delete;
@@ -231,7 +233,9 @@ private:
             }
             for (pollfd& pipe : watched) {
                 // The child may close its output and go on.
-                if ((pipe.revents & (POLLHUP | POLLIN)) == POLLHUP) pipe.fd = -1;
+                if ((pipe.revents & (POLLHUP | POLLIN)) == POLLHUP) {
+                    pipe.fd = -1;
+                }
             }
         }
     }

@@ -44,7 +44,9 @@ void dropCutConversion(char* format) {
 
 void zemProviderTracer::_traceEnter(CMPIBroker* broker, const char* file, unsigned line,
                                     const char* component, const char* function, ...) {
-    if (broker == nullptr) return;
+    if (broker == nullptr) {
+        return;
+    }
     char text[kMessageSize];
     methodLine(text, "Entering", file, line, function);
     va_list args;
@@ -55,7 +57,9 @@ void zemProviderTracer::_traceEnter(CMPIBroker* broker, const char* file, unsign
 
 void zemProviderTracer::_traceExit(CMPIBroker* broker, const char* file, unsigned line,
                                    const char* component, const char* function, ...) {
-    if (broker == nullptr) return;
+    if (broker == nullptr) {
+        return;
+    }
     char text[kMessageSize];
     methodLine(text, "Exiting", file, line, function);
     va_list args;
@@ -66,11 +70,15 @@ void zemProviderTracer::_traceExit(CMPIBroker* broker, const char* file, unsigne
 
 void zemProviderTracer::_traceString(CMPIBroker* broker, const char* file, unsigned line, int level,
                                      const char* component, const char* fmt, ...) {
-    if (broker == nullptr) return;
+    if (broker == nullptr) {
+        return;
+    }
     char format[kMessageSize];
     const int wanted =
         snprintf(format, sizeof format, "<%s:%u> %s", orEmpty(file), line, orEmpty(fmt));
-    if (wanted >= static_cast<int>(sizeof format)) dropCutConversion(format);
+    if (wanted >= static_cast<int>(sizeof format)) {
+        dropCutConversion(format);
+    }
     va_list args;
     va_start(args, fmt);
     _trace(broker, level, component, format, args);
@@ -93,7 +101,9 @@ void zemProviderTracer::_trace(CMPIBroker* broker, int level, const char* compon
     snprintf(line, sizeof line, "Component:%s, Log message: %s", orEmpty(component), message);
     zemLog::Log(line);
 
-    if (broker == nullptr) return;
+    if (broker == nullptr) {
+        return;
+    }
     zemQuietly([&] {
         zemCallServer(broker->eft, &CMPIBrokerEncFT::trace, kZemNotServed, broker,
                       static_cast<CMPILevel>(level), component, message, nullptr);

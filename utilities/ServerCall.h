@@ -8,7 +8,9 @@
 /// @param missing  the answer where there is no such function
 template <class Table, class Function, class Answer, class... Args>
 Answer zemCallServer(const Table* table, Function Table::*entry, Answer missing, Args... args) {
-    if (table == nullptr || table->*entry == nullptr) return missing;
+    if (table == nullptr || table->*entry == nullptr) {
+        return missing;
+    }
     return (table->*entry)(args...);
 }
 

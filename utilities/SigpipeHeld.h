@@ -26,7 +26,9 @@ public:
     }
     ~zemSigpipeHeld() {
         const int error = errno;  // of the write
-        if (error == EPIPE && !m_wasPending) take();
+        if (error == EPIPE && !m_wasPending) {
+            take();
+        }
         pthread_sigmask(SIG_SETMASK, &m_before, nullptr);
         errno = error;
     }

@@ -74,7 +74,9 @@ constexpr struct {
 template <std::size_t N>
 const char* textOf(const Word (&words)[N], int number, const char* otherwise) {
     for (const Word& word : words) {
-        if (word.number == number) return word.text;
+        if (word.number == number) {
+            return word.text;
+        }
     }
     return otherwise;
 }
@@ -93,21 +95,27 @@ const char* zemEnvironmentText(int definitionState) {
 
 zemKeylock zemKeylockOf(int number) {
     for (const auto& row : kKeylocks) {
-        if (row.number == number) return row.position;
+        if (row.number == number) {
+            return row.position;
+        }
     }
     return KEYLOCK_UNKNOWN;
 }
 
 const char* zemKeylockText(int position) {
     for (const auto& row : kKeylocks) {
-        if (row.position == position) return row.text;
+        if (row.position == position) {
+            return row.text;
+        }
     }
     return "";
 }
 
 zemMigrationState zemMigrationStateOf(int number) {
     for (const auto& row : kMigrationStates) {
-        if (row.number == number) return row.state;
+        if (row.number == number) {
+            return row.state;
+        }
     }
     return MIGRATION_UNKNOWN;
 }
@@ -118,14 +126,18 @@ zemMigrationState zemMigrationStateOf(const char* text) {
         const bool fits = row.state == MIGRATION_LOST_CONNECTION
                               ? strcasestr(text, row.text) != nullptr
                               : strcasecmp(text, row.text) == 0;
-        if (fits) return row.state;
+        if (fits) {
+            return row.state;
+        }
     }
     return MIGRATION_UNKNOWN;
 }
 
 const char* zemMigrationStateText(zemMigrationState state) {
     for (const auto& row : kMigrationStates) {
-        if (row.state == state) return row.text;
+        if (row.state == state) {
+            return row.text;
+        }
     }
     return "";
 }

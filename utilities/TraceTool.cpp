@@ -138,7 +138,9 @@ void CFileLoger::log(const char* text) {
     const zemSigpipeHeld held;
     char newline = '\n';
     const iovec line[] = {{const_cast<char*>(text), std::strlen(text)}, {&newline, 1}};
-    if (writev(m_logger, line, 2) < 0) return;  // a trace that is lost is no failure
+    if (writev(m_logger, line, 2) < 0) {
+        return;  // a trace that is lost is no failure
+    }
 }
 
 // Never destroyed: other threads may still be timing while the process ends. Only its own thread

@@ -45,21 +45,29 @@ struct Scope {
 };
 
 std::string argument(const char* text) {
-    if (text == nullptr || *text == '\0') throw Refusal{API_INVALID_INPUT};
+    if (text == nullptr || *text == '\0') {
+        throw Refusal{API_INVALID_INPUT};
+    }
     return text;
 }
 
 Scope scopeOf(const Call& call) {
-    if (call.of == Of::All) return {};
+    if (call.of == Of::All) {
+        return {};
+    }
     const std::string key = argument(call.key);
-    if (call.of == Of::Host) return {key, {}, {}};
+    if (call.of == Of::Host) {
+        return {key, {}, {}};
+    }
     const std::size_t star = key.find('*');
     std::int64_t id = 0;
     if (star == std::string::npos || !wholeNumber(key.substr(0, star), &id)) {
         throw Refusal{API_INVALID_INPUT};
     }
     Scope scope{argument(key.c_str() + star + 1), id, {}};
-    if (call.of == Of::Name) scope.name = argument(call.name);
+    if (call.of == Of::Name) {
+        scope.name = argument(call.name);
+    }
     return scope;
 }
 
@@ -67,24 +75,36 @@ std::vector<Row> rowsOf(const Hosts& hosts, Kind kind, const Scope& scope) {
     std::vector<Row> rows;
     bool isKnown = scope.mtms.empty();
     for (const auto& host : hosts) {
-        if (!scope.mtms.empty() && host->mtms() != scope.mtms) continue;
+        if (!scope.mtms.empty() && host->mtms() != scope.mtms) {
+            continue;
+        }
         isKnown = true;
-        if (scope.lpar && host->lpar(*scope.lpar) == nullptr) throw Refusal{API_NOT_FOUND};
+        if (scope.lpar && host->lpar(*scope.lpar) == nullptr) {
+            throw Refusal{API_NOT_FOUND};
+        }
         for (const Object& object : host->all(kind)) {
-            if (scope.lpar && object.place().lpar != *scope.lpar) continue;
+            if (scope.lpar && object.place().lpar != *scope.lpar) {
+                continue;
+            }
             if (!scope.name || object.get("name") == *scope.name) {
                 rows.push_back(rowOf(*host, object));
             }
         }
     }
-    if (!isKnown) throw Refusal{API_UNKNOWN_SYSTEM};
-    if (scope.name && rows.empty()) throw Refusal{API_NOT_FOUND};
+    if (!isKnown) {
+        throw Refusal{API_UNKNOWN_SYSTEM};
+    }
+    if (scope.name && rows.empty()) {
+        throw Refusal{API_NOT_FOUND};
+    }
     return rows;
 }
 
 apiProp* read(const Call& call) {
     const Scope scope = scopeOf(call);
-    if (call.level != 1 && call.level != 2) throw Refusal{API_INVALID_INPUT};
+    if (call.level != 1 && call.level != 2) {
+        throw Refusal{API_INVALID_INPUT};
+    }
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
     const Hosts hosts = allHosts(store);
@@ -93,7 +113,9 @@ apiProp* read(const Call& call) {
     for (const Row& row : rows) {
         result.addObject(call.family.classType);
         for (const Property& property : call.family.properties) {
-            if (property.level > call.level) continue;
+            if (property.level > call.level) {
+                continue;
+            }
             result.put(property.key, property.make(row, property.attribute));
         }
     }
@@ -106,17 +128,25 @@ apiProp* answer(const Call& call) noexcept {
         try {
             if (const auto fault = takeFault(call.operation)) {
                 pause(*fault);
-                if (fault->isNull) return nullptr;
-                if (fault->code) throw Refusal{*fault->code};
+                if (fault->isNull) {
+                    return nullptr;
+                }
+                if (fault->code) {
+                    throw Refusal{*fault->code};
+                }
             }
-            if (call.user == nullptr) throw Refusal{API_INVALID_INPUT};
+            if (call.user == nullptr) {
+                throw Refusal{API_INVALID_INPUT};
+            }
             return read(call);
         } catch (const Refusal& refusal) {
             return Result().release(refusal.code);
         } catch (const std::length_error&) {
             return Result().release(API_FAILED);
         } catch (const Failure& failure) {
-            if (failure.fault() == Fault::StateBusy) return Result().release(API_FAILED);
+            if (failure.fault() == Fault::StateBusy) {
+                return Result().release(API_FAILED);
+            }
             return nullptr;
         }
     } catch (const std::exception&) {
@@ -149,10 +179,14 @@ apiProp* answer(const Call& call) noexcept {
 API_OPERATIONS(OPERATION_ALL, OPERATION_OF_HOST, OPERATION_OF_LPAR, OPERATION_NAMED)
 
 API char* getProperty(apiProp* record, const char* key) {
-    if (record == nullptr || key == nullptr || *key == '\0') return nullptr;
+    if (record == nullptr || key == nullptr || *key == '\0') {
+        return nullptr;
+    }
     const int count = std::min<int>(record->propertyCount, API_MAX_PROPERTIES);
     for (int i = 0; i < count; ++i) {
-        if (std::strncmp(record->name[i], key, API_TEXT_SIZE) != 0) continue;
+        if (std::strncmp(record->name[i], key, API_TEXT_SIZE) != 0) {
+            continue;
+        }
         // Entries lie far apart, and readers mostly ask for the next key next: what a record fills
         // comes into the cache while its caller works on the value before.
         if (i + 1 < count) {

@@ -59,7 +59,9 @@ std::string codeOf(const std::string& word) {
         return map;
     }();
     auto found = all.find(word);
-    if (found == all.end()) found = all.find("*");
+    if (found == all.end()) {
+        found = all.find("*");
+    }
     return found == all.end() ? word : found->second;
 }
 
@@ -119,7 +121,9 @@ std::string definition(const Row& row, const std::string&) {
 /// "<number>,<name>" of the partition's profile whose name stands in @p attribute.
 std::string profileOf(const Row& row, const std::string& attribute) {
     const std::string name = valueOf(row, attribute);
-    if (name.empty()) return "null,";
+    if (name.empty()) {
+        return "null,";
+    }
     const Object* profile = row.view->profile(row.self->place().lpar, name);
     return std::to_string(profile == nullptr ? 0 : profile->place().number) + ',' + name;
 }
@@ -152,10 +156,14 @@ constexpr CapabilityBit kCapabilities[] = {
 std::string capabilities(const Row& row, const std::string&) {
     std::array<unsigned, 8> words{};
     for (const CapabilityBit& capability : kCapabilities) {
-        if (valueOf(row, capability.attribute) == "1") words[capability.word] |= capability.bit;
+        if (valueOf(row, capability.attribute) == "1") {
+            words[capability.word] |= capability.bit;
+        }
     }
     std::string list;
-    for (unsigned word : words) list += (list.empty() ? '[' : ',') + std::to_string(word);
+    for (unsigned word : words) {
+        list += (list.empty() ? '[' : ',') + std::to_string(word);
+    }
     return list + ']';
 }
 

@@ -32,7 +32,9 @@ Result::Result(std::size_t most) {
     const std::size_t size = prefixSize() + (most + 1) * sizeof(apiProp);
     void* mapping = mmap(nullptr, size, PROT_READ | PROT_WRITE,
                          MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE, -1, 0);
-    if (mapping == MAP_FAILED) throw std::bad_alloc();
+    if (mapping == MAP_FAILED) {
+        throw std::bad_alloc();
+    }
     madvise(mapping, size, MADV_NOHUGEPAGE);
     std::memcpy(mapping, &size, sizeof size);
     m_header = reinterpret_cast<apiProp*>(static_cast<char*>(mapping) + prefixSize());
@@ -61,7 +63,9 @@ apiProp* Result::release(int rc) {
 }
 
 void Result::free(apiProp* header) {
-    if (header == nullptr) return;
+    if (header == nullptr) {
+        return;
+    }
     char* mapping = reinterpret_cast<char*>(header) - prefixSize();
     std::size_t size = 0;
     std::memcpy(&size, mapping, sizeof size);

@@ -32,7 +32,9 @@ class Progress {
 public:
     explicit Progress(std::int64_t total) : m_total(total) {}
     ~Progress() {
-        if (m_shown) std::fputc('\n', stderr);
+        if (m_shown) {
+            std::fputc('\n', stderr);
+        }
     }
     Progress(const Progress&) = delete;
     Progress& operator=(const Progress&) = delete;
@@ -89,7 +91,9 @@ int checkState() {
     Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
     const std::vector<std::string> findings = check(store);
-    for (const std::string& finding : findings) std::cout << finding << '\n';
+    for (const std::string& finding : findings) {
+        std::cout << finding << '\n';
+    }
     return findings.empty() ? 0 : kExitRefused;
 }
 
@@ -141,11 +145,15 @@ int run(int argc, char** argv) {
         ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
     journal->add_flag("--json", asJson, "A JSON object in a line for each change");
-    for (CLI::App* verb : app.get_subcommands({})) verb->footer(kFooter);
+    for (CLI::App* verb : app.get_subcommands({})) {
+        verb->footer(kFooter);
+    }
 
     try {
         app.parse(argc, argv);
-        if (app.get_subcommands().empty()) throw CLI::RequiredError::Subcommand(1);
+        if (app.get_subcommands().empty()) {
+            throw CLI::RequiredError::Subcommand(1);
+        }
     } catch (const CLI::ParseError& error) {
         return app.exit(error) == 0 ? 0 : kExitUsage;
     }
@@ -158,7 +166,9 @@ int main(int argc, char** argv) {
     try {
         const int status = run(argc, argv);
         std::cout.flush();
-        if (!std::cout) throw Failure(Fault::Output, {"standard output"});
+        if (!std::cout) {
+            throw Failure(Fault::Output, {"standard output"});
+        }
         return status;
     } catch (const Failure& failure) {
         std::cerr << failure.text(languageOfEnvironment()) << '\n';

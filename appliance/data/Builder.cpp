@@ -51,7 +51,9 @@ void setSharing(Object& object, const LparPlan& plan, const std::string& prefix)
         object.set(prefix + "shared_proc_pool_id", "null");
         return;
     }
-    if (plan.sharing == "uncap") object.set(prefix + "uncap_weight", "128");
+    if (plan.sharing == "uncap") {
+        object.set(prefix + "uncap_weight", "128");
+    }
     if (plan.procPool != 0) {
         object.set(prefix + "shared_proc_pool_id", std::to_string(plan.procPool));
     }
@@ -60,8 +62,12 @@ void setSharing(Object& object, const LparPlan& plan, const std::string& prefix)
 /// What runs is what is in effect, as long as nothing else is stored.
 void setState(Object& lpar, const LparPlan& plan) {
     lpar.set("state", plan.state);
-    if (plan.state != "Not Activated") lpar.set("os_version", osVersion(plan.env));
-    if (!isActive(lpar)) setInactive(lpar, plan.state.c_str());
+    if (plan.state != "Not Activated") {
+        lpar.set("os_version", osVersion(plan.env));
+    }
+    if (!isActive(lpar)) {
+        setInactive(lpar, plan.state.c_str());
+    }
 }
 
 }  // namespace
@@ -90,7 +96,9 @@ HostBuilder::HostBuilder(Store& store, std::int64_t number, const HostPlan& plan
     addLinks(plan);
 
     add(Kind::ProcPool, {m_number}).set("name", "DefaultPool");
-    if (plan.memPool == 0) return;
+    if (plan.memPool == 0) {
+        return;
+    }
     add(Kind::MemPool, {m_number}).set("curr_pool_mem", std::to_string(plan.memPool));
 }
 
@@ -162,7 +170,9 @@ void HostBuilder::addAdapters(const LparPlan& plan) {
         set(eth, "ieee_virtual_eth=1;addl_vlan_ids=10,20,30;is_trunk=1");
         eth.set("trunk_priority", std::to_string(plan.id));
     }
-    if (plan.scsiServer != 0) addScsi(plan);
+    if (plan.scsiServer != 0) {
+        addScsi(plan);
+    }
 }
 
 void HostBuilder::addScsi(const LparPlan& plan) {
@@ -177,7 +187,9 @@ void HostBuilder::addScsi(const LparPlan& plan) {
 }
 
 void HostBuilder::addSlots(const LparPlan& plan) {
-    if (plan.env == "tmxlinux") return;
+    if (plan.env == "tmxlinux") {
+        return;
+    }
     std::vector<std::string>& list = m_slots[plan.id];
     const std::string drc = addSlot(plan.id, "Storage controller");
     list.push_back(drc + "/none/1");
@@ -187,7 +199,9 @@ void HostBuilder::addSlots(const LparPlan& plan) {
     }
     const std::string tags =
         "load_source_slot=" + drc + ";alt_restart_device_slot=" + drc + ";console_slot=dnx";
-    for (Kind kind : {Kind::Lpar, Kind::Profile}) set(first(kind, plan.id), tags);
+    for (Kind kind : {Kind::Lpar, Kind::Profile}) {
+        set(first(kind, plan.id), tags);
+    }
 }
 
 std::string HostBuilder::addSlot(std::int64_t lpar, const char* description) {
@@ -197,7 +211,9 @@ std::string HostBuilder::addSlot(std::int64_t lpar, const char* description) {
     const std::int64_t inUnit = m_slotCount % kSlotsPerUnit + 1;
     const std::string unit =
         "U2222.00" + std::to_string(unitIndex + 1) + '.' + m_host.get("serial_num");
-    if (inUnit == 1) add(Kind::Unit, {m_number, 0, unitIndex}).set("unit_phys_loc", unit);
+    if (inUnit == 1) {
+        add(Kind::Unit, {m_number, 0, unitIndex}).set("unit_phys_loc", unit);
+    }
     if (m_slotCount % kSlotsPerBus == 0) {
         add(Kind::Bus, {m_number, 0, bus}).set("unit_phys_loc", unit);
     }
@@ -205,7 +221,9 @@ std::string HostBuilder::addSlot(std::int64_t lpar, const char* description) {
     Object& slot = add(Kind::Slot, {m_number, lpar, m_slotCount});
     set(slot, "unit_phys_loc=" + unit + ";bus_id=" + std::to_string(bus) + ";phys_loc=" + unit +
                   "-P1-C" + std::to_string(inUnit) + ";drc_index=" + drc);
-    if (description == nullptr) return drc;
+    if (description == nullptr) {
+        return drc;
+    }
     slot.set("description", description);
     set(slot,
         "feature_codes=2201,2202;pci_vendor_id=1234;pci_device_id=0101;pci_subs_vendor_id=1234;"
@@ -219,9 +237,13 @@ void HostBuilder::writeLists(std::vector<Object>& objects) {
     std::int64_t highest = 0;
     for (Object& object : objects) {
         const bool isProfile = object.kind() == Kind::Profile;
-        if (isProfile || object.kind() == Kind::Lpar) owners.push_back(&object);
+        if (isProfile || object.kind() == Kind::Lpar) {
+            owners.push_back(&object);
+        }
         const AdapterForm* form = adapterForm(object.kind());
-        if (form == nullptr) continue;
+        if (form == nullptr) {
+            continue;
+        }
         lists[object.kind()].push_back(adapterElement(*form, object));
         highest = std::max(highest, object.place().number);
     }
@@ -243,7 +265,9 @@ void HostBuilder::writeLists(std::vector<Object>& objects) {
 
 void HostBuilder::finish() {
     constexpr int kFreeSlots = 2;
-    for (int i = 0; i < kFreeSlots; ++i) addSlot(0, nullptr);
+    for (int i = 0; i < kFreeSlots; ++i) {
+        addSlot(0, nullptr);
+    }
     m_store.put(m_host);
     std::vector<std::string> starts;
     for (auto& [id, objects] : m_objects) {
@@ -251,9 +275,13 @@ void HostBuilder::finish() {
             writeLists(objects);
             starts.push_back(std::to_string(id) + "/0");
         }
-        for (const Object& object : objects) m_store.put(object);
+        for (const Object& object : objects) {
+            m_store.put(object);
+        }
     }
-    if (starts.empty()) return;
+    if (starts.empty()) {
+        return;
+    }
     Object all(Kind::SystemProfile, {m_number});
     all.set("name", "all");
     all.set("lpar_profiles", joined(starts));

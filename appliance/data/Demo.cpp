@@ -101,16 +101,22 @@ void fillDemo(Store& store) {
     std::int64_t number = 0;
     for (const DemoHost& demo : hosts()) {
         HostBuilder host(store, ++number, demo.plan);
-        for (const LparPlan& lpar : demo.lpars) host.add(lpar);
-        if (number == 1) host.addProfile(4, "small, \"safe\"");
+        for (const LparPlan& lpar : demo.lpars) {
+            host.add(lpar);
+        }
+        if (number == 1) {
+            host.addProfile(4, "small, \"safe\"");
+        }
         for (const Particular& rarity : kRarities) {
-            if (rarity.place.host == number)
+            if (rarity.place.host == number) {
                 set(host.add(rarity.kind, rarity.place), rarity.settings);
+            }
         }
         for (const Particular& particular : kParticulars) {
             const Place& place = particular.place;
-            if (place.host == number)
+            if (place.host == number) {
                 set(host.first(particular.kind, place.lpar), particular.settings);
+            }
         }
         host.finish();
     }

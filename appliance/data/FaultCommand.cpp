@@ -21,7 +21,9 @@ std::vector<std::string> names() {
 #define NAME(OPERATION, FAMILY) #OPERATION,
     std::vector<std::string> all = {API_OPERATIONS(NAME, NAME, NAME, NAME)};
 #undef NAME
-    for (const ToolName& tool : kToolNames) all.emplace_back(tool.name);
+    for (const ToolName& tool : kToolNames) {
+        all.emplace_back(tool.name);
+    }
     std::sort(all.begin(), all.end());
     return all;
 }
@@ -31,23 +33,39 @@ std::vector<std::string> names() {
 std::string judge(const std::string& name) {
     constexpr std::size_t kColumns = 3, kWidth = 30;
     const std::vector<std::string> all = names();
-    if (std::binary_search(all.begin(), all.end(), name)) return {};
+    if (std::binary_search(all.begin(), all.end(), name)) {
+        return {};
+    }
     std::string text = "there is no tool or operation " + name + "; there are";
     for (std::size_t i = 0; i < all.size(); ++i) {
-        if (i % kColumns == 0) text += "\n  ";
+        if (i % kColumns == 0) {
+            text += "\n  ";
+        }
         text += all[i];
-        if (i % kColumns + 1 < kColumns) text.append(kWidth - std::min(kWidth, all[i].size()), ' ');
+        if (i % kColumns + 1 < kColumns) {
+            text.append(kWidth - std::min(kWidth, all[i].size()), ' ');
+        }
     }
     return text;
 }
 
 std::string describe(const PlannedFault& fault) {
     std::string text = fault.name + ": " + std::to_string(fault.calls) + " calls";
-    if (fault.delay != 0) text += ", delay " + std::to_string(fault.delay) + " ms";
-    if (fault.isNull) text += ", null";
-    if (fault.code) text += ", code " + std::to_string(*fault.code);
-    if (fault.signal != 0) text += ", signal " + std::to_string(fault.signal);
-    if (!fault.text.empty()) text += ", text \"" + fault.text + '"';
+    if (fault.delay != 0) {
+        text += ", delay " + std::to_string(fault.delay) + " ms";
+    }
+    if (fault.isNull) {
+        text += ", null";
+    }
+    if (fault.code) {
+        text += ", code " + std::to_string(*fault.code);
+    }
+    if (fault.signal != 0) {
+        text += ", signal " + std::to_string(fault.signal);
+    }
+    if (!fault.text.empty()) {
+        text += ", text \"" + fault.text + '"';
+    }
     return text;
 }
 
@@ -59,9 +77,13 @@ struct Options {
 
 void carryOut(Options& options) {
     PlannedFault& plan = options.plan;
-    if (options.clear) clearFaults();
+    if (options.clear) {
+        clearFaults();
+    }
     if (plan.name.empty()) {
-        for (const PlannedFault& fault : plannedFaults()) std::cout << describe(fault) << '\n';
+        for (const PlannedFault& fault : plannedFaults()) {
+            std::cout << describe(fault) << '\n';
+        }
         return;
     }
     plan.isNull = options.code == "null";

@@ -41,7 +41,9 @@ LparPlan lparPlan(Dice& dice, std::int64_t id, std::int64_t servers, const char*
                                               "Not Activated", "Open Firmware"};
     LparPlan plan{id, prefix + padded(id, 4), "tmxlinux", "Not Activated"};
     const std::int64_t state = dice.below(8);
-    if (std::string(hostState) == "Operating") plan.state = kStates[state];
+    if (std::string(hostState) == "Operating") {
+        plan.state = kStates[state];
+    }
     plan.mem = kMemRegion * (2 + dice.below(30));
     plan.procUnits = 10 + 5 * dice.below(40);
     plan.sharing = dice.percent(70) ? "uncap" : "cap";
@@ -50,7 +52,9 @@ LparPlan lparPlan(Dice& dice, std::int64_t id, std::int64_t servers, const char*
         return plan;
     }
     plan.scsiServer = 1 + id % servers;
-    if (!dice.percent(5)) return plan;
+    if (!dice.percent(5)) {
+        return plan;
+    }
     plan.env = "osq00";
     plan.sharing = "share_idle_procs";
     plan.procUnits = 100 * (1 + dice.below(4));
@@ -73,7 +77,9 @@ void addHost(Store& store, Dice& dice, const Size& size, std::int64_t number) {
     host.procUnits = (host.procUnits + 99) / 100 * 100;
 
     HostBuilder builder(store, number, host);
-    for (const LparPlan& lpar : lpars) builder.add(lpar);
+    for (const LparPlan& lpar : lpars) {
+        builder.add(lpar);
+    }
     builder.host().set("max_lpars", std::to_string(std::max<std::int64_t>(1000, size.lpars)));
     builder.finish();
 }

@@ -28,7 +28,9 @@ std::string table(const std::vector<Line>& lines) {
         text += "   ";
         for (std::size_t i = 0; i < line.size(); ++i) {
             text += ' ' + line[i];
-            if (i + 1 < line.size()) text.append(widths[i] - characters(line[i]) + 1, ' ');
+            if (i + 1 < line.size()) {
+                text.append(widths[i] - characters(line[i]) + 1, ' ');
+            }
         }
         text += '\n';
     }
@@ -44,12 +46,16 @@ std::string overview(const HostView& view) {
                        valueOf(row, "configurable_sys_proc_units") + " processing units, " +
                        valueOf(row, "pend_avail_sys_mem") + " of " +
                        valueOf(row, "configurable_sys_mem") + " MB\n";
-    if (lpars.empty()) return text;
+    if (lpars.empty()) {
+        return text;
+    }
     std::vector<Line> lines = {
         {"id", "name", "environment", "state", "processors", "memory", "profile"}};
     for (const Object& lpar : lpars) {
         lines.push_back({lpar.get("lpar_id")});
-        for (const char* column : kColumns) lines.back().push_back(lpar.get(column));
+        for (const char* column : kColumns) {
+            lines.back().push_back(lpar.get(column));
+        }
     }
     return text + table(lines);
 }
@@ -57,7 +63,9 @@ std::string overview(const HostView& view) {
 Json attributes(const Object& object) {
     const Place& place = object.place();
     Json json = {{"host", place.host}, {"lpar", place.lpar}, {"number", place.number}};
-    for (const auto& [name, value] : object.settings()) json[std::string(name)] = value;
+    for (const auto& [name, value] : object.settings()) {
+        json[std::string(name)] = value;
+    }
     return json;
 }
 
@@ -72,21 +80,29 @@ std::string changes(const Json& object) {
     const bool isBoth = object.at("event") == "modify";
     std::string text;
     for (const auto& [name, value] : (old.empty() ? now : old).items()) {
-        if (!isBoth && name != "name") continue;
+        if (!isBoth && name != "name") {
+            continue;
+        }
         text += (text.empty() ? ": " : ", ") + name + ' ' + dumped(value);
-        if (isBoth) text += " -> " + dumped(now.at(name));
+        if (isBoth) {
+            text += " -> " + dumped(now.at(name));
+        }
     }
     return text;
 }
 
 std::string entry(const Json& change) {
     std::string text = timeText(change.at("time")) + "  " + change.at("tool").get<std::string>();
-    if (change.contains("move")) text += ": " + change["move"].at("state").get<std::string>();
+    if (change.contains("move")) {
+        text += ": " + change["move"].at("state").get<std::string>();
+    }
     for (const Json& object : change.at("objects")) {
         const std::string kind = object.at("kind"), event = object.at("event");
         const std::int64_t lpar = object.at("lpar"), number = object.at("number");
         text.append("\n    ").append(event).append(1, ' ').append(kind);
-        if (lpar != 0) text += ' ' + std::to_string(lpar);
+        if (lpar != 0) {
+            text += ' ' + std::to_string(lpar);
+        }
         if (kind != "lpar" && kind != "host") {
             text += (lpar != 0 ? '/' : ' ') + std::to_string(number);
         }
@@ -113,7 +129,9 @@ std::string journalText(std::int64_t number, const std::string& line) {
 
 std::string showText(Store& store) {
     std::string text;
-    for (const auto& view : allHosts(store)) text += overview(*view);
+    for (const auto& view : allHosts(store)) {
+        text += overview(*view);
+    }
     return text;
 }
 
@@ -122,7 +140,9 @@ std::string showJson(Store& store) {
     for (int i = 0; i < kKinds; ++i) {
         const Kind kind = static_cast<Kind>(i);
         Json& list = json[kindName(kind)] = Json::array();
-        for (const Object& object : store.all(kind)) list.push_back(attributes(object));
+        for (const Object& object : store.all(kind)) {
+            list.push_back(attributes(object));
+        }
     }
     return json.dump(2, ' ', false, Json::error_handler_t::replace) + '\n';
 }

@@ -37,7 +37,9 @@ constexpr NumberRule kNumberRules[] = {
 };
 
 std::optional<std::string> vlanIds(const std::string& list) {
-    if (list.empty() || list == "none") return std::string();
+    if (list.empty() || list == "none") {
+        return std::string();
+    }
     std::set<std::int64_t> ids;
     std::vector<std::string> texts;
     for (const std::string& text : split(list)) {
@@ -47,7 +49,9 @@ std::optional<std::string> vlanIds(const std::string& list) {
         }
         texts.push_back(std::to_string(id));
     }
-    if (texts.size() > kMostVlans) return std::nullopt;
+    if (texts.size() > kMostVlans) {
+        return std::nullopt;
+    }
     return joined(texts);
 }
 
@@ -56,14 +60,20 @@ std::optional<std::vector<std::string>> cut(const std::string& text, char separa
     std::vector<std::string> parts;
     bool inside = false;
     for (std::size_t begin = 0, i = 0; i <= text.size(); ++i) {
-        if (i < text.size() && text[i] == '"') inside = !inside;
-        if (i < text.size() && (text[i] != separator || inside)) continue;
+        if (i < text.size() && text[i] == '"') {
+            inside = !inside;
+        }
+        if (i < text.size() && (text[i] != separator || inside)) {
+            continue;
+        }
         const std::string part = text.substr(begin, i - begin);
         const bool isQuoted = part.size() > 1 && part.front() == '"' && part.back() == '"';
         parts.push_back(isQuoted ? unquoted(part) : part);
         begin = i + 1;
     }
-    if (inside) return std::nullopt;
+    if (inside) {
+        return std::nullopt;
+    }
     return parts;
 }
 
@@ -76,7 +86,9 @@ std::string withRemoteName(const AdapterForm& form, const HostView& view, std::s
         }
         before = begin;
         begin = element.find('/', begin) + 1;
-        if (begin == 0) break;
+        if (begin == 0) {
+            break;
+        }
     }
     return element;
 }
@@ -92,8 +104,12 @@ const AdapterForm* adapterForm(Kind kind) {
 std::string adapterElement(const AdapterForm& form, const Object& adapter) {
     std::string element;
     for (std::string_view field : namesIn(form.fields)) {
-        if (!element.empty()) element += '/';
-        if (!field.empty()) element += adapter.get(field);
+        if (!element.empty()) {
+            element += '/';
+        }
+        if (!field.empty()) {
+            element += adapter.get(field);
+        }
     }
     return element;
 }
@@ -103,28 +119,42 @@ std::string adapterList(const std::vector<std::string>& elements) {
 }
 
 std::vector<std::string> elementsOf(const std::string& key, const std::string& list) {
-    if (list.empty() || list == "none") return {};
+    if (list.empty() || list == "none") {
+        return {};
+    }
     auto elements = cut(list, ',');
-    if (!elements) throw Failure(Fault::BadValue, {key, list});
+    if (!elements) {
+        throw Failure(Fault::BadValue, {key, list});
+    }
     return std::move(*elements);
 }
 
 std::optional<std::string> adapterValue(const std::string& name, const std::string& value) {
     for (const NumberRule& rule : kNumberRules) {
-        if (name != rule.field) continue;
-        if (rule.absent != nullptr && (value.empty() || value == rule.absent)) return rule.absent;
+        if (name != rule.field) {
+            continue;
+        }
+        if (rule.absent != nullptr && (value.empty() || value == rule.absent)) {
+            return rule.absent;
+        }
         std::int64_t number = 0;
         if (!wholeNumber(value, &number) || number < rule.least || number > rule.most) {
             return std::nullopt;
         }
         return std::to_string(number);
     }
-    if (name == "addl_vlan_ids") return vlanIds(value);
+    if (name == "addl_vlan_ids") {
+        return vlanIds(value);
+    }
     if (name == "vswitch") {
-        if (value.find_first_of("/\"") != std::string::npos) return std::nullopt;
+        if (value.find_first_of("/\"") != std::string::npos) {
+            return std::nullopt;
+        }
         return value.empty() ? "default" : value;
     }
-    if (name == "adapter_type" && (value == "client" || value == "server")) return value;
+    if (name == "adapter_type" && (value == "client" || value == "server")) {
+        return value;
+    }
     return std::nullopt;
 }
 
@@ -147,12 +177,18 @@ Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std:
     }
     fields->resize(names.size());
     const auto slot = adapterValue("slot_num", fields->front());
-    if (!slot) throw malformed;
+    if (!slot) {
+        throw malformed;
+    }
     Object adapter(form.kind, {lpar.host, lpar.lpar, number(*slot)});
     for (std::size_t i = 1; i < names.size(); ++i) {
-        if (names[i].empty()) continue;
+        if (names[i].empty()) {
+            continue;
+        }
         const auto value = adapterValue(std::string(names[i]), (*fields)[i]);
-        if (!value) throw malformed;
+        if (!value) {
+            throw malformed;
+        }
         adapter.set(names[i], *value);
     }
     if (form.kind == Kind::Ethernet) {
@@ -160,7 +196,9 @@ Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std:
     } else if (form.kind == Kind::Serial && adapter.get("adapter_type") == "client") {
         adapter.set("supports_dnx", "0");
     }
-    if (!isWhole(adapter)) throw malformed;
+    if (!isWhole(adapter)) {
+        throw malformed;
+    }
     return adapter;
 }
 
@@ -203,10 +241,14 @@ bool serves(const Object& other, const Object& client) {
 
 std::string newMac(const HostView& view, const Place& place) {
     std::set<std::string> used;
-    for (const Object& adapter : view.all(Kind::Ethernet)) used.insert(adapter.get("mac_addr"));
+    for (const Object& adapter : view.all(Kind::Ethernet)) {
+        used.insert(adapter.get("mac_addr"));
+    }
     const std::string prefix = view.host().get("mac_prefix");
     std::int64_t suffix = (place.lpar * 256 + place.number % 256) % (1 << 24);
-    while (used.count(prefix + hex(suffix, 6)) != 0) suffix = (suffix + 1) % (1 << 24);
+    while (used.count(prefix + hex(suffix, 6)) != 0) {
+        suffix = (suffix + 1) % (1 << 24);
+    }
     return prefix + hex(suffix, 6);
 }
 
@@ -218,17 +260,23 @@ std::vector<IoSlot> ioSlotsFromList(const std::string& list) {
     for (const std::string& element : elementsOf("io_slots", list)) {
         const Failure malformed(Fault::BadValue, {"io_slots", element});
         const auto fields = cut(element, '/');
-        if (!fields || fields->size() != 3) throw malformed;
+        if (!fields || fields->size() != 3) {
+            throw malformed;
+        }
         const auto required = adapterValue("is_required", (*fields)[2]);
         IoSlot slot{upperHex((*fields)[0]), (*fields)[1], required == "1"};
-        if (slot.pool.empty()) slot.pool = "none";
+        if (slot.pool.empty()) {
+            slot.pool = "none";
+        }
         std::int64_t pool = 0;
         const bool fits =
             !slot.drcIndex.empty() && slot.drcIndex.size() <= kMostDigits &&
             slot.drcIndex.find_first_not_of("0123456789ABCDEF") == std::string::npos &&
             (slot.pool == "none" || (wholeNumber(slot.pool, &pool) && pool <= kMostPool)) &&
             required;
-        if (!fits || !drcs.insert(slot.drcIndex).second) throw malformed;
+        if (!fits || !drcs.insert(slot.drcIndex).second) {
+            throw malformed;
+        }
         slots.push_back(std::move(slot));
     }
     return slots;
@@ -240,10 +288,14 @@ std::string ioSlotElement(const IoSlot& slot) {
 
 std::string namedAdapters(const Row& row, const char* key) {
     std::string list = row.self->get(key);
-    if (list == "none") return list;
+    if (list == "none") {
+        return list;
+    }
     std::vector<std::string> elements = split(list);
     for (const AdapterForm& form : kAdapterForms) {
-        if (std::string_view(form.list) != key) continue;
+        if (std::string_view(form.list) != key) {
+            continue;
+        }
         for (std::string& element : elements) {
             element = withRemoteName(form, *row.view, std::move(element));
         }

@@ -41,8 +41,12 @@ public:
     explicit AttributeIndex(const Row (&rows)[N]) {
         for (const Row& row : rows) {
             for (std::size_t kind = 0; kind < kKinds; ++kind) {
-                if (!row.kinds.has(kind)) continue;
-                for (std::string_view name : namesIn(row.names)) m_rows[kind][name] = &row;
+                if (!row.kinds.has(kind)) {
+                    continue;
+                }
+                for (std::string_view name : namesIn(row.names)) {
+                    m_rows[kind][name] = &row;
+                }
             }
         }
     }

@@ -19,10 +19,14 @@ struct Findings {
     std::vector<std::string> texts;
 
     void require(bool holds, const std::string& what) {
-        if (!holds) texts.push_back(host + ": " + what);
+        if (!holds) {
+            texts.push_back(host + ": " + what);
+        }
     }
     void require(bool holds, const Object& object, const std::string& what) {
-        if (holds) return;
+        if (holds) {
+            return;
+        }
         const Place& place = object.place();
         require(false, std::string(kindName(object.kind())) + ' ' + std::to_string(place.number) +
                            " of partition " + std::to_string(place.lpar) + ' ' + what);
@@ -130,7 +134,9 @@ void virtualSlotsFit(const HostView& view, Findings& findings) {
     }
     std::set<VirtualSlot> servers;
     for (const auto& [place, adapter] : slots) {
-        if (adapter->kind() == Kind::Ethernet || adapter->get("adapter_type") != "client") continue;
+        if (adapter->kind() == Kind::Ethernet || adapter->get("adapter_type") != "client") {
+            continue;
+        }
         const std::optional<VirtualSlot> server = serverOf(*adapter);
         const auto found = server ? slots.find(*server) : slots.end();
         const bool served = found != slots.end() && serves(*found->second, *adapter);
@@ -163,7 +169,9 @@ void movesHaveTwoEnds(const HostView& view, Findings& findings) {
         "dest_lpar_id,bytes_remaining,bytes_transmitted");
     const std::string name = view.host().get("name");
     for (const Object& lpar : view.all(Kind::Lpar)) {
-        if (!isMoving(lpar)) continue;
+        if (!isMoving(lpar)) {
+            continue;
+        }
         const bool leaves = lpar.get("source_sys_name") == name &&
                             lpar.get("source_lpar_id") == lpar.get("lpar_id");
         const bool arrives =
@@ -193,7 +201,9 @@ constexpr Rule kRules[] = {ownersExist,
 
 std::vector<std::string> check(const HostView& view) {
     Findings findings{view.host().get("name"), {}};
-    for (Rule rule : kRules) rule(view, findings);
+    for (Rule rule : kRules) {
+        rule(view, findings);
+    }
     return findings.texts;
 }
 
@@ -204,7 +214,9 @@ std::vector<std::string> check(Store& store) {
         Findings findings{view->host().get("name"), {}};
         findings.require(names.insert(findings.host).second && names.insert(view->mtms()).second,
                          "another host has the same name or serial number");
-        for (Rule rule : kRules) rule(*view, findings);
+        for (Rule rule : kRules) {
+            rule(*view, findings);
+        }
         all.insert(all.end(), findings.texts.begin(), findings.texts.end());
     }
     return all;

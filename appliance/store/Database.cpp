@@ -26,13 +26,17 @@ Database::Database(std::string path, Access access) : m_path(std::move(path)) {
     check(code);
     sqlite3_extended_result_codes(handle, 1);
     sqlite3_busy_timeout(handle, kBusyMilliseconds);
-    if (access == Access::Read) return;
+    if (access == Access::Read) {
+        return;
+    }
     // The files beside the state stay when the last connection closes, so that users who may read
     // the folder but not write to it can open the state.
     int persist = 1;
     check(sqlite3_file_control(handle, "main", SQLITE_FCNTL_PERSIST_WAL, &persist));
     Statement(*this, "PRAGMA journal_size_limit = 0").step();
-    if (access == Access::Write) return;
+    if (access == Access::Write) {
+        return;
+    }
     Statement(*this, "PRAGMA journal_mode = WAL").step();
     execute(kLargeCache);
 }
@@ -42,8 +46,12 @@ void Database::execute(const char* sql) {
 }
 
 void Database::check(int code) const {
-    if (code == SQLITE_OK || code == SQLITE_ROW || code == SQLITE_DONE) return;
-    if ((code & 0xFF) == SQLITE_BUSY) throw Failure(Fault::StateBusy, {m_path});
+    if (code == SQLITE_OK || code == SQLITE_ROW || code == SQLITE_DONE) {
+        return;
+    }
+    if ((code & 0xFF) == SQLITE_BUSY) {
+        throw Failure(Fault::StateBusy, {m_path});
+    }
     const char* reason = m_handle ? sqlite3_errmsg(m_handle.get()) : sqlite3_errstr(code);
     throw Failure(Fault::StateUnusable, {m_path, reason});
 }
@@ -66,7 +74,9 @@ void Statement::set(int parameter, std::string_view value) {
 
 bool Statement::step() {
     const int code = sqlite3_step(m_handle.get());
-    if (code == SQLITE_ROW) return true;
+    if (code == SQLITE_ROW) {
+        return true;
+    }
     reset();
     m_database.check(code);
     return false;
@@ -88,7 +98,9 @@ Transaction::Transaction(Database& database, Purpose purpose) : m_database(datab
 
 Transaction::~Transaction() {
     // Nothing can be done about a failing rollback: closing the connection rolls back as well.
-    if (m_open) sqlite3_exec(m_database.handle(), "ROLLBACK", nullptr, nullptr, nullptr);
+    if (m_open) {
+        sqlite3_exec(m_database.handle(), "ROLLBACK", nullptr, nullptr, nullptr);
+    }
 }
 
 void Transaction::commit() {

@@ -37,7 +37,9 @@ std::string filled(const char* sentence, const std::vector<std::string>& words) 
 Language languageOfEnvironment() {
     for (const char* variable : {"LC_ALL", "LC_MESSAGES", "LANG"}) {
         const char* value = std::getenv(variable);
-        if (value == nullptr || *value == '\0') continue;
+        if (value == nullptr || *value == '\0') {
+            continue;
+        }
         const std::string locale = value;
         const std::string language = locale.substr(0, locale.find_first_of("_.@"));
         return language == "de" ? Language::German : Language::English;
@@ -55,8 +57,12 @@ std::string Failure::text(Language language) const {
 
 ExitStatus Failure::exitStatus() const noexcept {
     // These end otherwise than their like: what a host refuses, what --force allows, lost output.
-    if (m_fault == Fault::BadValue || m_fault == Fault::StateExists) return kExitRefused;
-    if (m_fault == Fault::Output) return kExitOutput;
+    if (m_fault == Fault::BadValue || m_fault == Fault::StateExists) {
+        return kExitRefused;
+    }
+    if (m_fault == Fault::Output) {
+        return kExitOutput;
+    }
     const int group = static_cast<int>(m_fault) / 1000;
     return group == 1 ? kExitUsage : group == 2 ? kExitState : kExitRefused;
 }

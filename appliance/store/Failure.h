@@ -55,7 +55,9 @@ private:
 /// @param words  are made whether or not they are needed
 /// @throws Failure @p wrong is true
 inline void refuseIf(bool wrong, Fault fault, std::vector<std::string> words = {}) {
-    if (wrong) throw Failure(fault, std::move(words));
+    if (wrong) {
+        throw Failure(fault, std::move(words));
+    }
 }
 
 }  // namespace appliance

@@ -41,19 +41,29 @@ public:
     ///         locked
     explicit PlanFile(Missing missing) : PlanFile(faultsFile(), missing) {
         const bool creates = missing == Missing::Create;
-        if (creates && m_path.empty()) throw Failure(Fault::NoHome);
+        if (creates && m_path.empty()) {
+            throw Failure(Fault::NoHome);
+        }
         const char* damage = m_file < 0 ? std::strerror(errno) : "it is no regular file";
         struct stat status {};
         const bool isFile = fstat(m_file, &status) == 0 && S_ISREG(status.st_mode);
-        if (creates && !isFile) throw Failure(Fault::StateUnusable, {m_path, damage});
+        if (creates && !isFile) {
+            throw Failure(Fault::StateUnusable, {m_path, damage});
+        }
         // Tools of other users count what they take, where the maker's umask lets them write. Who
         // could only read could do nothing but hold the lock.
-        if (creates) fchmod(m_file, 0600 | (status.st_mode & 0022) * 3);
+        if (creates) {
+            fchmod(m_file, 0600 | (status.st_mode & 0022) * 3);
+        }
         m_isLocked = isFile && lock();
-        if (creates && !m_isLocked) throw Failure(Fault::StateBusy, {m_path});
+        if (creates && !m_isLocked) {
+            throw Failure(Fault::StateBusy, {m_path});
+        }
     }
     ~PlanFile() {
-        if (m_file >= 0) close(m_file);
+        if (m_file >= 0) {
+            close(m_file);
+        }
     }
     PlanFile(const PlanFile&) = delete;
     PlanFile& operator=(const PlanFile&) = delete;
@@ -75,7 +85,9 @@ private:
     bool lock() const {
         constexpr int kTries = 200;
         for (int i = 0; i < kTries; ++i) {
-            if (flock(m_file, LOCK_EX | LOCK_NB) == 0) return true;
+            if (flock(m_file, LOCK_EX | LOCK_NB) == 0) {
+                return true;
+            }
             std::this_thread::sleep_for(std::chrono::milliseconds(10));
         }
         return false;
@@ -92,20 +104,26 @@ Plans PlanFile::read() const {
     for (ssize_t size = 0; static_cast<off_t>(text.size()) < kMostBytes;
          text.append(part, static_cast<std::size_t>(size))) {
         size = pread(m_file, part, sizeof part, static_cast<off_t>(text.size()));
-        if (size <= 0) break;
+        if (size <= 0) {
+            break;
+        }
     }
     Plans plans;
     std::istringstream lines(text);
     for (std::string line; std::getline(lines, line) && !lines.eof();) {
         std::istringstream in(line);
         std::string fields[6];
-        for (std::string& field : fields) std::getline(in, field, '\t');
+        for (std::string& field : fields) {
+            std::getline(in, field, '\t');
+        }
         PlannedFault fault;
         fault.name = fields[0];
         fault.calls = number(fields[1]);
         fault.delay = std::clamp<std::int64_t>(number(fields[2]), 0, kMostDelay);
         fault.isNull = fields[3] == "null";
-        if (!fault.isNull && !fields[3].empty()) fault.code = static_cast<int>(number(fields[3]));
+        if (!fault.isNull && !fields[3].empty()) {
+            fault.code = static_cast<int>(number(fields[3]));
+        }
         fault.signal = static_cast<int>(number(fields[4]));
         fault.text = fields[5];
         plans.push_back(fault);
@@ -132,7 +150,9 @@ Plans::iterator find(Plans& plans, const std::string& name) {
 }
 
 void change(const PlanFile& file, const Plans& plans) {
-    if (!file.write(plans)) throw Failure(Fault::StateUnusable, {"faults", std::strerror(errno)});
+    if (!file.write(plans)) {
+        throw Failure(Fault::StateUnusable, {"faults", std::strerror(errno)});
+    }
 }
 
 }  // namespace
@@ -156,14 +176,22 @@ void clearFaults() { change(PlanFile(Missing::Create), {}); }
 
 std::optional<PlannedFault> takeFault(const std::string& name) {
     const PlanFile file(Missing::Ignore);
-    if (!file.isLocked()) return {};
+    if (!file.isLocked()) {
+        return {};
+    }
     Plans plans = file.read();
     const auto planned = find(plans, name);
-    if (planned == plans.end()) return {};
+    if (planned == plans.end()) {
+        return {};
+    }
     PlannedFault fault = *planned;
-    if (--planned->calls <= 0) plans.erase(planned);
+    if (--planned->calls <= 0) {
+        plans.erase(planned);
+    }
     // A plan that cannot be counted down would hold for ever.
-    if (!file.write(plans)) return {};
+    if (!file.write(plans)) {
+        return {};
+    }
     return fault;
 }
 

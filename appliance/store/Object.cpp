@@ -208,13 +208,17 @@ constexpr AttributeRow kAttributes[] = {
 /// @throws std::logic_error the kind has no such attribute
 const char* defaultOf(Kind kind, std::string_view name) {
     static const AttributeIndex<AttributeRow> index(kAttributes);
-    if (const AttributeRow* row = index.find(kind, name)) return row->value;
+    if (const AttributeRow* row = index.find(kind, name)) {
+        return row->value;
+    }
     throw std::logic_error(std::string(kindName(kind)) + " has no attribute " + std::string(name));
 }
 
 /// The attribute that @p other stands for as the default of @p name: itself, or a prefix.
 std::string otherName(std::string other, std::string_view name) {
-    if (other.back() == '_') other += name.substr(name.find('_') + 1);
+    if (other.back() == '_') {
+        other += name.substr(name.find('_') + 1);
+    }
     return other;
 }
 
@@ -225,8 +229,12 @@ const char* kindName(Kind kind) { return kKindNames[static_cast<std::size_t>(kin
 Object::Object(Kind kind, Place place, std::string attributes)
     : m_kind(kind), m_place(place), m_attributes(std::move(attributes)) {
     // What is stored may have been written by others: every line has both its ends from here on.
-    if (m_attributes.empty() || m_attributes.front() != '\n') m_attributes.insert(0, 1, '\n');
-    if (m_attributes.back() != '\n') m_attributes += '\n';
+    if (m_attributes.empty() || m_attributes.front() != '\n') {
+        m_attributes.insert(0, 1, '\n');
+    }
+    if (m_attributes.back() != '\n') {
+        m_attributes += '\n';
+    }
 }
 
 std::size_t Object::find(std::string_view name, std::size_t* size) const {
@@ -246,14 +254,20 @@ std::size_t Object::find(std::string_view name, std::size_t* size) const {
 std::string Object::get(std::string_view name) const {
     std::size_t size = 0;
     const std::size_t at = find(name, &size);
-    if (at != std::string::npos) return m_attributes.substr(at, size);
+    if (at != std::string::npos) {
+        return m_attributes.substr(at, size);
+    }
 
     const char* value = defaultOf(m_kind, name);
     if (value == nullptr) {
         throw std::logic_error(std::string(kindName(m_kind)) + " without " + std::string(name));
     }
-    if (*value == '$') return get(otherName(value + 1, name));
-    if (*value == '#') return std::to_string(value[1] == 'l' ? m_place.lpar : m_place.number);
+    if (*value == '$') {
+        return get(otherName(value + 1, name));
+    }
+    if (*value == '#') {
+        return std::to_string(value[1] == 'l' ? m_place.lpar : m_place.number);
+    }
     return value;
 }
 
@@ -276,7 +290,9 @@ void Object::unset(std::string_view name) {
     std::size_t size = 0;
     const std::size_t at = find(name, &size);
     const std::size_t line = name.size() + 1;  // with the equals sign
-    if (at != std::string::npos) m_attributes.erase(at - line, line + size + 1);
+    if (at != std::string::npos) {
+        m_attributes.erase(at - line, line + size + 1);
+    }
 }
 
 std::vector<std::pair<std::string_view, std::string_view>> Object::settings() const {

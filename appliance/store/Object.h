@@ -83,7 +83,9 @@ public:
 
     /// As set(), but leaves alone what has the value already, so that what is stored stays short.
     void update(std::string_view name, std::string_view value) {
-        if (get(name) != value) set(name, value);
+        if (get(name) != value) {
+            set(name, value);
+        }
     }
 
     /// Gives the attribute the kind's own value again.

@@ -33,7 +33,9 @@ constexpr const char* kSchema = R"(
 
 std::filesystem::path home() {
     const char* folder = std::getenv("APPLIANCE_HOME");
-    if (folder == nullptr || *folder == '\0') throw Failure(Fault::NoHome);
+    if (folder == nullptr || *folder == '\0') {
+        throw Failure(Fault::NoHome);
+    }
     return folder;
 }
 
@@ -43,8 +45,12 @@ std::filesystem::path home() {
 bool isThere(const std::filesystem::path& file) {
     std::error_code error;
     const auto type = std::filesystem::status(file, error).type();
-    if (type == std::filesystem::file_type::not_found) return false;
-    if (type == std::filesystem::file_type::regular) return true;
+    if (type == std::filesystem::file_type::not_found) {
+        return false;
+    }
+    if (type == std::filesystem::file_type::regular) {
+        return true;
+    }
     throw Failure(Fault::StateUnusable,
                   {file.string(), error ? error.message() : "it is no regular file"});
 }
@@ -76,10 +82,14 @@ std::int64_t Store::version() {
 
 Store Store::open(Database::Access access) {
     const auto file = home() / "appliance.db";
-    if (!isThere(file)) throw Failure(Fault::NoState, {home().string()});
+    if (!isThere(file)) {
+        throw Failure(Fault::NoState, {home().string()});
+    }
     Store store(std::make_unique<Database>(file.string(), access));
     const std::int64_t version = store.version();
-    if (version == 0) throw Failure(Fault::NoState, {home().string()});
+    if (version == 0) {
+        throw Failure(Fault::NoState, {home().string()});
+    }
     if (version != kVersion) {
         throw Failure(Fault::StateVersion, {std::to_string(version), std::to_string(kVersion)});
     }
@@ -90,13 +100,17 @@ Store Store::create() {
     const auto file = home() / "appliance.db";
     std::error_code error;
     std::filesystem::create_directories(home(), error);
-    if (error) throw Failure(Fault::StateUnusable, {home().string(), error.message()});
+    if (error) {
+        throw Failure(Fault::StateUnusable, {home().string(), error.message()});
+    }
     isThere(file);
     return Store(std::make_unique<Database>(file.string(), Database::Access::Create));
 }
 
 void Store::clear(bool force) {
-    if (!force && version() != 0) throw Failure(Fault::StateExists, {home().string()});
+    if (!force && version() != 0) {
+        throw Failure(Fault::StateExists, {home().string()});
+    }
     m_put.reset();
     m_database->execute(kSchema);
     m_database->execute(("PRAGMA user_version = " + std::to_string(kVersion)).c_str());
@@ -126,7 +140,9 @@ std::optional<Object> Store::find(Kind kind, const Place& place) {
     std::vector<Object> found =
         select(*m_database, kind, "AND host = ? AND lpar = ? AND number = ?", place.host,
                place.lpar, place.number);
-    if (found.empty()) return std::nullopt;
+    if (found.empty()) {
+        return std::nullopt;
+    }
     return std::move(found.front());
 }
 
@@ -142,7 +158,9 @@ std::vector<std::pair<std::int64_t, std::string>> Store::journal(std::int64_t af
                     "SELECT number, line FROM journal WHERE number > ? ORDER BY number LIMIT ?");
     query.bind(after, most);
     std::vector<std::pair<std::int64_t, std::string>> lines;
-    while (query.step()) lines.emplace_back(query.integer(0), query.text(1));
+    while (query.step()) {
+        lines.emplace_back(query.integer(0), query.text(1));
+    }
     return lines;
 }
 

@@ -7,10 +7,14 @@
 namespace appliance {
 
 std::string quoted(std::string_view value) {
-    if (value.find_first_of(",\"") == std::string_view::npos) return std::string(value);
+    if (value.find_first_of(",\"") == std::string_view::npos) {
+        return std::string(value);
+    }
     std::string field = "\"";
     for (char c : value) {
-        if (c == '"') field += '"';
+        if (c == '"') {
+            field += '"';
+        }
         field += c;
     }
     return field += '"';
@@ -19,16 +23,22 @@ std::string quoted(std::string_view value) {
 std::string joined(const std::vector<std::string>& values) {
     std::string line;
     for (std::size_t i = 0; i < values.size(); ++i) {
-        if (i != 0) line += ',';
+        if (i != 0) {
+            line += ',';
+        }
         line += quoted(values[i]);
     }
     return line;
 }
 
 bool quotedFieldAt(std::string_view text, std::size_t begin, std::size_t* end) {
-    if (begin >= text.size() || text[begin] != '"') return false;
+    if (begin >= text.size() || text[begin] != '"') {
+        return false;
+    }
     for (std::size_t i = begin + 1; i < text.size(); ++i) {
-        if (text[i] != '"') continue;
+        if (text[i] != '"') {
+            continue;
+        }
         if (i + 1 < text.size() && text[i + 1] == '"') {
             ++i;
             continue;
@@ -43,7 +53,9 @@ std::string unquoted(std::string_view field) {
     std::string value;
     for (std::size_t i = 1; i + 1 < field.size(); ++i) {
         value += field[i];
-        if (field[i] == '"') ++i;
+        if (field[i] == '"') {
+            ++i;
+        }
     }
     return value;
 }
@@ -58,7 +70,9 @@ std::vector<std::string> split(std::string_view text) {
             end = std::min(text.find(',', begin), text.size());
             fields.emplace_back(text.substr(begin, end - begin));
         }
-        if (end == text.size()) return fields;
+        if (end == text.size()) {
+            return fields;
+        }
         begin = end + 1;
     }
 }
@@ -75,14 +89,18 @@ std::vector<std::string_view> namesIn(std::string_view list) {
 bool isListed(std::string_view list, std::string_view word) {
     for (std::size_t begin = 0, end = 0; end != list.size(); begin = end + 1) {
         end = std::min(list.find(',', begin), list.size());
-        if (list.substr(begin, end - begin) == word) return true;
+        if (list.substr(begin, end - begin) == word) {
+            return true;
+        }
     }
     return false;
 }
 
 std::int64_t hundredths(std::string_view units) {
     const bool negative = !units.empty() && units.front() == '-';
-    if (negative) units.remove_prefix(1);
+    if (negative) {
+        units.remove_prefix(1);
+    }
     const std::size_t point = std::min(units.find('.'), units.size());
     std::string decimals(units.substr(std::min(point + 1, units.size())).substr(0, 2));
     decimals.resize(2, '0');
@@ -91,7 +109,9 @@ std::int64_t hundredths(std::string_view units) {
 }
 
 std::string units(std::int64_t hundredths) {
-    if (hundredths == 0) return "0.0";
+    if (hundredths == 0) {
+        return "0.0";
+    }
     const char* sign = hundredths < 0 ? "-" : "";
     const auto size = hundredths < 0 ? -hundredths : hundredths;
     char text[32];
@@ -152,7 +172,9 @@ std::size_t characters(std::string_view text) {
 
 std::string upperHex(std::string text) {
     for (char& c : text) {
-        if (c >= 'a' && c <= 'f') c = static_cast<char>(c - 'a' + 'A');
+        if (c >= 'a' && c <= 'f') {
+            c = static_cast<char>(c - 'a' + 'A');
+        }
     }
     return text;
 }

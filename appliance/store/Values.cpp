@@ -44,7 +44,9 @@ std::string namesOfIds(const Row& row, const char* key) {
     std::vector<std::string> names;
     for (const std::string& id : split(own(row, key))) {
         std::string name = row.view->lparName(id);
-        if (!name.empty()) names.push_back(std::move(name));
+        if (!name.empty()) {
+            names.push_back(std::move(name));
+        }
     }
     return noneWhenEmpty(joined(names));
 }
@@ -58,7 +60,9 @@ bool isMember(const Row& row, const Object& lpar, const std::string& key) {
 std::string members(const Row& row, const char* key, const char* attribute) {
     std::vector<std::string> texts;
     for (const Object& lpar : row.view->all(Kind::Lpar)) {
-        if (isMember(row, lpar, key)) texts.push_back(lpar.get(attribute));
+        if (isMember(row, lpar, key)) {
+            texts.push_back(lpar.get(attribute));
+        }
     }
     return noneWhenEmpty(joined(texts));
 }
@@ -86,8 +90,12 @@ std::string dynamicCapabilities(const Row& row, const char*) {
 std::string sampleTime(const Row& row, const char*) { return timeText(row.time); }
 
 std::string hostTime(const Row& row, const char* key) {
-    if (row.time != 0) return sampleTime(row, key);
-    if (ofHost(row, "state") == "No Connection") return "unavailable";
+    if (row.time != 0) {
+        return sampleTime(row, key);
+    }
+    if (ofHost(row, "state") == "No Connection") {
+        return "unavailable";
+    }
     return timeText(std::time(nullptr));
 }
 
@@ -118,7 +126,9 @@ std::string when(const char* key) { return {key, 5}; }
 template <typename Amount>
 std::int64_t sumOfLpars(const Row& row, Amount amount) {
     std::int64_t sum = 0;
-    for (const Object& lpar : row.view->all(Kind::Lpar)) sum += amount(lpar);
+    for (const Object& lpar : row.view->all(Kind::Lpar)) {
+        sum += amount(lpar);
+    }
     return sum;
 }
 
@@ -191,7 +201,9 @@ std::string poolUnits(const Row& row, const char* key) {
 }
 
 std::string availablePoolUnits(const Row& row, const char* key) {
-    if (row.self->place().number == 0) return availableUnits(row, key);
+    if (row.self->place().number == 0) {
+        return availableUnits(row, key);
+    }
     const std::string pool = when(key) + "shared_proc_pool_id";
     const std::int64_t held = sumOfLpars(row, [&](const Object& lpar) {
         return isMember(row, lpar, pool) ? hundredths(lpar.get(key)) : 0;
@@ -306,7 +318,9 @@ constexpr Derived kDerived[] = {
 std::string valueOf(const Row& row, const std::string& name) {
     static const AttributeIndex<Derived> index(kDerived);
     const Derived* derived = index.find(row.self->kind(), name);
-    if (derived == nullptr) return row.self->get(name);
+    if (derived == nullptr) {
+        return row.self->get(name);
+    }
     return derived->make(row, derived->key == nullptr ? name.c_str() : derived->key);
 }
 

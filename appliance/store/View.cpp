@@ -17,7 +17,9 @@ std::int64_t HostView::memRegion() const {
 
 const std::vector<Object>& HostView::all(Kind kind) const {
     const auto found = m_objects.find(kind);
-    if (found != m_objects.end()) return found->second;
+    if (found != m_objects.end()) {
+        return found->second;
+    }
     return m_objects.emplace(kind, m_store.all(kind, m_host.place().host)).first->second;
 }
 
@@ -34,7 +36,9 @@ Objects HostView::all(Kind kind, std::int64_t lpar) const {
 
 const Object* HostView::find(Kind kind, const char* attribute, const std::string& value) const {
     for (const Object& object : all(kind)) {
-        if (object.get(attribute) == value) return &object;
+        if (object.get(attribute) == value) {
+            return &object;
+        }
     }
     return nullptr;
 }
@@ -46,7 +50,9 @@ const Object* HostView::lpar(std::int64_t id) const {
 
 const Object* HostView::profile(std::int64_t lpar, const std::string& name) const {
     for (const Object& profile : all(Kind::Profile, lpar)) {
-        if (profile.get("name") == name) return &profile;
+        if (profile.get("name") == name) {
+            return &profile;
+        }
     }
     return nullptr;
 }
@@ -76,7 +82,9 @@ Hosts allHosts(Store& store) {
 
 Hosts hostsNamed(Store& store, const std::string& name, char joint) {
     Hosts all = allHosts(store);
-    if (name.empty()) return all;
+    if (name.empty()) {
+        return all;
+    }
     Hosts found;
     for (auto& host : all) {
         const Object& self = host->host();
@@ -85,7 +93,9 @@ Hosts hostsNamed(Store& store, const std::string& name, char joint) {
             found.push_back(std::move(host));
         }
     }
-    if (found.empty()) throw Failure(Fault::HostNotFound, {name});
+    if (found.empty()) {
+        throw Failure(Fault::HostNotFound, {name});
+    }
     return found;
 }
 

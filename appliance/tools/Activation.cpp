@@ -36,7 +36,9 @@ constexpr const char* kPending =
 std::int64_t granted(const char* attribute, std::int64_t room, std::int64_t step,
                      std::int64_t least, std::int64_t wanted) {
     const std::int64_t given = std::min(wanted, room / step * step);
-    if (given >= least) return given;
+    if (given >= least) {
+        return given;
+    }
     const bool isMemory = std::string(attribute).find("mem") != std::string::npos;
     throw Failure(Fault::NotEnough, {attribute, isMemory ? std::to_string(room) : units(room)});
 }
@@ -74,10 +76,14 @@ Activation::Activation(const HostView& host) : m_host(host) {
     for (Kind kind : kVirtual) {
         for (const Object& adapter : host.all(kind)) {
             m_adapters.emplace(slotOf(adapter), adapter);
-            if (const auto server = serverOf(adapter)) m_clients[*server] = slotOf(adapter);
+            if (const auto server = serverOf(adapter)) {
+                m_clients[*server] = slotOf(adapter);
+            }
         }
     }
-    for (const Object& slot : host.all(Kind::Slot)) m_slots.emplace(slot.get("drc_index"), slot);
+    for (const Object& slot : host.all(Kind::Slot)) {
+        m_slots.emplace(slot.get("drc_index"), slot);
+    }
 }
 
 Activation::Amounts Activation::held(const Object& lpar) {
@@ -118,7 +124,9 @@ void Activation::setMemory(const Object& before, const Object& profile, Object& 
     // The appliance's own choice is that of the time before, or else one region.
     const std::string entitled = profile.get("desired_io_entitled_mem");
     std::int64_t share = number(entitled == "auto" ? before.get("pend_io_entitled_mem") : entitled);
-    if (entitled == "auto" && share == 0) share = region;
+    if (entitled == "auto" && share == 0) {
+        share = region;
+    }
     granted("pend_avail_pool_mem", room(kEntitlement, before), 1, share, share);
     setQuantity(lpar, profile, "mem", text(wanted));
     lpar.set("pend_io_entitled_mem", text(share));
@@ -174,20 +182,28 @@ std::map<VirtualSlot, Object> Activation::adaptersFor(const Object& lpar,
         const auto old = m_adapters.find(slotOf(wanted));
         const bool stays = old != m_adapters.end() && old->second.kind() == wanted.kind();
         Object adapter(wanted.kind(), wanted.place(), stays ? old->second.stored() : "");
-        for (const auto& [name, value] : wanted.settings()) adapter.set(name, value);
+        for (const auto& [name, value] : wanted.settings()) {
+            adapter.set(name, value);
+        }
         if (wanted.kind() == Kind::Ethernet && !stays) {
             adapter.set("mac_addr", newMac(m_host, wanted.place()));
         }
-        if (serverOf(adapter)) requireServer(adapter);
+        if (serverOf(adapter)) {
+            requireServer(adapter);
+        }
         adapters.emplace(slotOf(adapter), std::move(adapter));
     }
     const std::int64_t id = lpar.place().lpar;
     for (auto used = m_clients.lower_bound({id, 0});
          used != m_clients.end() && used->first.first == id; ++used) {
         const auto server = m_adapters.find(used->first);
-        if (server != m_adapters.end()) adapters.insert_or_assign(server->first, server->second);
+        if (server != m_adapters.end()) {
+            adapters.insert_or_assign(server->first, server->second);
+        }
     }
-    for (auto& [slot, adapter] : adapters) adapter.set("state", "1");
+    for (auto& [slot, adapter] : adapters) {
+        adapter.set("state", "1");
+    }
     return adapters;
 }
 
@@ -204,7 +220,9 @@ std::map<std::string, Object> Activation::slotsFor(const Object& lpar,
         const std::int64_t owner = slot == m_slots.end() ? -1 : slot->second.place().lpar;
         if (owner == 0 || owner == id) {
             Object& given = give(slot->second, id);
-            if (wanted.pool != "none") given.set("slot_io_pool_id", wanted.pool);
+            if (wanted.pool != "none") {
+                given.set("slot_io_pool_id", wanted.pool);
+            }
         } else if (wanted.isRequired && owner < 0) {
             throw Failure(Fault::SlotNotFound, {wanted.drcIndex});
         } else if (wanted.isRequired) {
@@ -212,7 +230,9 @@ std::map<std::string, Object> Activation::slotsFor(const Object& lpar,
         }
     }
     for (const auto& [drc, slot] : m_slots) {
-        if (slot.place().lpar == id && slots.count(drc) == 0) give(slot, 0);
+        if (slot.place().lpar == id && slots.count(drc) == 0) {
+            give(slot, 0);
+        }
     }
     return slots;
 }
@@ -258,7 +278,9 @@ void Activation::start(const Object& before, const std::string& profileName,
     lpar.set("curr_lpar_proc_compat_mode", compat == "default" ? newest : compat);
     lpar.set("resource_config", "1");
     lpar.set("curr_profile", profileName);
-    if (!bootMode.empty()) lpar.set("boot_mode", bootMode);
+    if (!bootMode.empty()) {
+        lpar.set("boot_mode", bootMode);
+    }
     setActive(lpar, lpar.get("boot_mode") == "of" ? "Open Firmware" : "Running");
     clearRefcode(lpar);
 
@@ -267,14 +289,20 @@ void Activation::start(const Object& before, const std::string& profileName,
     const auto first = m_adapters.lower_bound({id, 0});
     const auto last = m_adapters.lower_bound({id + 1, 0});
     for (auto old = first; old != last; ++old) {
-        if (const auto server = serverOf(old->second)) m_clients.erase(*server);
+        if (const auto server = serverOf(old->second)) {
+            m_clients.erase(*server);
+        }
     }
     m_adapters.erase(first, last);
     for (const auto& [slot, adapter] : adapters) {
-        if (const auto server = serverOf(adapter)) m_clients[*server] = slot;
+        if (const auto server = serverOf(adapter)) {
+            m_clients[*server] = slot;
+        }
     }
     m_adapters.merge(adapters);
-    for (auto& [drc, slot] : slots) m_slots.insert_or_assign(drc, std::move(slot));
+    for (auto& [drc, slot] : slots) {
+        m_slots.insert_or_assign(drc, std::move(slot));
+    }
     m_lpars.emplace(id, std::move(lpar));
 }
 
@@ -282,25 +310,37 @@ void Activation::apply(Change& change) const {
     std::vector<Object> before, after;
     for (Kind kind : kVirtual) {
         for (const Object& adapter : m_host.all(kind)) {
-            if (hasStarted(adapter)) before.push_back(adapter);
+            if (hasStarted(adapter)) {
+                before.push_back(adapter);
+            }
         }
     }
     for (const auto& [slot, adapter] : m_adapters) {
-        if (hasStarted(adapter)) after.push_back(adapter);
+        if (hasStarted(adapter)) {
+            after.push_back(adapter);
+        }
     }
     for (const Object& slot : m_host.all(Kind::Slot)) {
         const Object& now = m_slots.at(slot.get("drc_index"));
-        if (now.place().lpar == slot.place().lpar && now.stored() == slot.stored()) continue;
+        if (now.place().lpar == slot.place().lpar && now.stored() == slot.stored()) {
+            continue;
+        }
         before.push_back(slot);
         after.push_back(now);
     }
-    for (const auto& [id, lpar] : m_lpars) after.push_back(lpar);
+    for (const auto& [id, lpar] : m_lpars) {
+        after.push_back(lpar);
+    }
     if (!m_lpars.empty() && m_host.host().get("state") == "Standby") {
         after.push_back(m_host.host());
         after.back().set("state", "Operating");
     }
-    for (const Object& object : before) change.remove(object);
-    for (const Object& object : after) change.put(object);
+    for (const Object& object : before) {
+        change.remove(object);
+    }
+    for (const Object& object : after) {
+        change.put(object);
+    }
 }
 
 void enter(Change& change, const HostView& host, std::vector<Object> lpars, const char* state) {
@@ -316,22 +356,30 @@ void enter(Change& change, const HostView& host, std::vector<Object> lpars, cons
             }
         }
     }
-    for (const Object& object : lpars) change.put(object);
-    for (const Object& object : adapters) change.put(object);
+    for (const Object& object : lpars) {
+        change.put(object);
+    }
+    for (const Object& object : adapters) {
+        change.put(object);
+    }
 }
 
 void takeSettings(const Object& profile, Object& lpar) {
     for (std::string_view name : namesIn(kTaken)) {
         std::string_view stored = name;
         for (std::string_view prefix : {"pend_", "desired_"}) {
-            if (name.substr(0, prefix.size()) == prefix) stored.remove_prefix(prefix.size());
+            if (name.substr(0, prefix.size()) == prefix) {
+                stored.remove_prefix(prefix.size());
+            }
         }
         lpar.set(name, profile.get(stored));
     }
 }
 
 void clearRefcode(Object& lpar) {
-    for (const char* code : {"refcode", "word2"}) lpar.set(code, "00000000");
+    for (const char* code : {"refcode", "word2"}) {
+        lpar.set(code, "00000000");
+    }
     lpar.set("fru_call_out_loc_codes", "none");
     lpar.set("refcode_time", timeText(std::time(nullptr)));
 }

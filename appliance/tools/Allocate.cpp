@@ -89,7 +89,9 @@ void changeMemory(Change& change, const Operation& operation) {
     refuseIf(size % host.memRegion() != 0, Fault::BadOptionValue, {"-q", request.value("-q")});
     const int sign = signOf(operation);
     const bool isShared = lpar.get("mem_mode") == "shared";
-    if (size != 0) add(lpar, "mem", sign * size * 100);
+    if (size != 0) {
+        add(lpar, "mem", sign * size * 100);
+    }
     if (!isShared) {
         refuseIf(entitled != 0, Fault::Disagree, {"--entitled", "mem_mode"});
         requireFree({&host, &host.host()}, "curr_avail_sys_mem,pend_avail_sys_mem",
@@ -97,7 +99,9 @@ void changeMemory(Change& change, const Operation& operation) {
     } else {
         // The memory itself comes from the pool as it is used; what I/O may hold is promised.
         add(lpar, "io_entitled_mem", sign * entitled * 100, 0, hundredths(lpar.get("pend_mem")));
-        if (entitled != 0) lpar.set("auto_io_entitled_mem", "0");
+        if (entitled != 0) {
+            lpar.set("auto_io_entitled_mem", "0");
+        }
         for (const Object& pool : host.all(Kind::MemPool)) {
             requireFree(rowOf(host, pool), "pend_avail_pool_mem", sign * entitled * 100);
         }
@@ -127,10 +131,18 @@ void changeProcessors(Change& change, const Operation& operation) {
     const int sign = signOf(operation);
     const bool isDedicated = lpar.get("pend_proc_mode") == "ded";
     refuseIf(isDedicated && size != 0, Fault::Disagree, {"--procunits", "proc_mode"});
-    if (isDedicated) size = procs * 100;
-    if (procs != 0) add(lpar, "procs", sign * procs * 100);
-    if (size != 0) add(lpar, "proc_units", sign * size);
-    if (!isDedicated) requireShares(host, lpar);
+    if (isDedicated) {
+        size = procs * 100;
+    }
+    if (procs != 0) {
+        add(lpar, "procs", sign * procs * 100);
+    }
+    if (size != 0) {
+        add(lpar, "proc_units", sign * size);
+    }
+    if (!isDedicated) {
+        requireShares(host, lpar);
+    }
     requireFree({&host, &host.host()}, "curr_avail_sys_proc_units,pend_avail_sys_proc_units",
                 sign * size);
     const std::string pool = lpar.get("pend_shared_proc_pool_id");
@@ -232,7 +244,9 @@ std::int64_t freeSlot(const Request& request, const HostView& host, const Object
         }
     }
     std::int64_t slot = kFirstSlot;
-    while (used.count(slot) != 0) ++slot;
+    while (used.count(slot) != 0) {
+        ++slot;
+    }
     slot = request.number("-s", 0, 65535, slot);
     refuseIf(slot < kFirstSlot || slot >= end || used.count(slot) != 0, Fault::VirtualSlotNotFree,
              {std::to_string(slot)});
@@ -262,10 +276,14 @@ void requireWhole(const HostView& host, const Object& adapter) {
         isEthernet && (adapter.get("is_trunk") == "1") != (adapter.get("trunk_priority") != "0"),
         Fault::Disagree, {"is_trunk", "trunk_priority"});
     const auto server = serverOf(adapter);
-    if (!server) return;
+    if (!server) {
+        return;
+    }
     bool found = false;
     for (const Object& other : host.all(adapter.kind())) {
-        if (slotOf(other) == *server) found = serves(other, adapter);
+        if (slotOf(other) == *server) {
+            found = serves(other, adapter);
+        }
         refuseIf(serverOf(other) == server, Fault::InUse, {std::to_string(other.place().lpar)});
     }
     refuseIf(!found, Fault::NoServerAdapter, {adapter.get("slot_num")});
@@ -280,7 +298,9 @@ void addAdapter(Change& change, const Operation& operation) {
     adapter.set("state", isActive(lpar) ? "1" : "0");
     adapter.set("is_required", "0");
     const Settings settings = settingsOf(change, operation);
-    for (const Setting& setting : settings) setAdapter(host, setting, adapter);
+    for (const Setting& setting : settings) {
+        setAdapter(host, setting, adapter);
+    }
     needed(settings, kind == Kind::Ethernet ? "port_vlan_id" : "adapter_type");
     if (kind == Kind::Ethernet) {
         adapter.set("mac_addr", newMac(host, adapter.place()));
@@ -299,7 +319,9 @@ void removeAdapter(Change& change, const Operation& operation) {
     const std::string text = std::to_string(slot.second);
     const Object* adapter = nullptr;
     for (const Object& other : host.all(kindOf(operation))) {
-        if (slotOf(other) == slot) adapter = &other;
+        if (slotOf(other) == slot) {
+            adapter = &other;
+        }
         refuseIf(serverOf(other) == slot, Fault::InUse, {std::to_string(other.place().lpar)});
     }
     refuseIf(adapter == nullptr, Fault::AdapterNotFound, {text});

@@ -23,7 +23,9 @@ Json attributes(const Object& object, const std::optional<Object>& other) {
     for (const Object* setter : {&object, other ? &*other : &object}) {
         for (const auto& setting : setter->settings()) {
             const std::string name(setting.first), value = object.get(name);
-            if (!other || value != other->get(name)) json[name] = value;
+            if (!other || value != other->get(name)) {
+                json[name] = value;
+            }
         }
     }
     return json;
@@ -77,7 +79,9 @@ Object Change::lpar() {
 
 void Change::keep(const Object& object) {
     const std::pair key(object.kind(), object.place());
-    if (m_before.count(key) != 0) return;
+    if (m_before.count(key) != 0) {
+        return;
+    }
     m_before.emplace(key, m_session->store.find(key.first, key.second));
 }
 
@@ -102,22 +106,34 @@ std::string Change::journalLine() {
     for (const auto& [key, before] : m_before) {
         const auto& [kind, place] = key;
         const std::optional<Object> after = m_session->store.find(kind, place);
-        if (!before && !after) continue;
+        if (!before && !after) {
+            continue;
+        }
         const char* event = !before ? "add" : !after ? "delete" : "modify";
         Json object = {{"event", event},
                        {"kind", kindName(kind)},
                        {"host", view(place.host).mtms()},
                        {"lpar", place.lpar},
                        {"number", place.number}};
-        if (before) object["old"] = attributes(*before, after);
-        if (after) object["new"] = attributes(*after, before);
+        if (before) {
+            object["old"] = attributes(*before, after);
+        }
+        if (after) {
+            object["new"] = attributes(*after, before);
+        }
         const bool same = before && after && object["new"].empty();
-        if (!same) objects.push_back(std::move(object));
+        if (!same) {
+            objects.push_back(std::move(object));
+        }
     }
-    if (objects.empty()) return {};
+    if (objects.empty()) {
+        return {};
+    }
     Json line = {{"tool", m_request.tool().name}, {"time", std::time(nullptr)}};
     for (const auto& [name, values] : m_notes) {
-        for (const auto& [key, value] : values) line[name][key] = value;
+        for (const auto& [key, value] : values) {
+            line[name][key] = value;
+        }
     }
     line["objects"] = std::move(objects);
     // Names may hold bytes that are no text in UTF-8, which the stored state keeps as they are.
@@ -130,18 +146,26 @@ void Change::note(const char* name, std::vector<std::pair<const char*, std::stri
 
 void Change::verify() {
     std::set<std::int64_t> hosts;
-    for (const auto& [key, before] : m_before) hosts.insert(key.second.host);
+    for (const auto& [key, before] : m_before) {
+        hosts.insert(key.second.host);
+    }
     for (std::int64_t host : hosts) {
         const std::vector<std::string> findings = check(view(host));
-        if (!findings.empty()) throw Failure(Fault::Unsound, {findings.front()});
+        if (!findings.empty()) {
+            throw Failure(Fault::Unsound, {findings.front()});
+        }
     }
 }
 
 void Change::commit() {
-    if (!m_session) return;
+    if (!m_session) {
+        return;
+    }
     verify();
     const std::string line = journalLine();
-    if (!line.empty()) m_session->store.append(line);
+    if (!line.empty()) {
+        m_session->store.append(line);
+    }
     m_session->transaction.commit();
     m_session.reset();
 }

@@ -40,18 +40,26 @@ const Row& commandFor(const std::vector<Row>& commands, const Request& request) 
     const std::vector<const char*> options = selectorsOf(request.tool().tool);
     std::size_t most = 0;  // options in front whose values some row has
     for (const Row& row : commands) {
-        if (row.tool != request.tool().tool) continue;
+        if (row.tool != request.tool().tool) {
+            continue;
+        }
         const std::vector<const char*> words = row.words();
         std::size_t fits = 0;
         for (; fits < options.size(); ++fits) {
             const std::string value = request.value(options[fits]);
             const char* word = words[fits];
-            if (word == nullptr ? !value.empty() : !isListed(word, value)) break;
+            if (word == nullptr ? !value.empty() : !isListed(word, value)) {
+                break;
+            }
         }
-        if (fits == options.size()) return row;
+        if (fits == options.size()) {
+            return row;
+        }
         most = std::max(most, fits);
     }
-    if (!request.has(options[most])) throw Failure(Fault::MissingOption, {options[most]});
+    if (!request.has(options[most])) {
+        throw Failure(Fault::MissingOption, {options[most]});
+    }
     throw Failure(Fault::BadOptionValue, {options[most], request.value(options[most])});
 }
 

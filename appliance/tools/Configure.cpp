@@ -35,7 +35,9 @@ Object lparOf(const HostView& host, const Settings& settings, const char* id, co
 void applyAll(const HostView& host, const AttributeRules& rules, const Settings& settings,
               const char* selectors, Object& object) {
     for (const Setting& setting : settings) {
-        if (!isListed(selectors, setting.name)) apply(host, rules, setting, object);
+        if (!isListed(selectors, setting.name)) {
+            apply(host, rules, setting, object);
+        }
     }
 }
 
@@ -49,7 +51,9 @@ void editHost(Change& change, const Operation& operation) {
     if (name != view.host().get("name")) {
         refuseIf(change.isHost(name), Fault::NameTaken, {name});
         // Both ends of a move know each other by name.
-        for (const Object& lpar : view.all(Kind::Lpar)) requireStill(lpar);
+        for (const Object& lpar : view.all(Kind::Lpar)) {
+            requireStill(lpar);
+        }
     }
     change.put(host);
 }
@@ -62,7 +66,9 @@ void editLpar(Change& change, const Operation& operation) {
     requireStill(lpar);
     const std::string before = lpar.get("name"), current = lpar.get("curr_profile");
     applyAll(host, lparRules(), settings, "lpar_id,name", lpar);
-    if (lpar.get("name") != before) requireFreeName(host, lpar.get("name"));
+    if (lpar.get("name") != before) {
+        requireFreeName(host, lpar.get("name"));
+    }
     lpar.set("curr_profile", current);  // until it is set, it is taken to be the default one
     const std::string profile = lpar.get("default_profile");
     refuseIf(host.profile(lpar.place().lpar, profile) == nullptr, Fault::ProfileNotFound,
@@ -73,12 +79,16 @@ void editLpar(Change& change, const Operation& operation) {
 /// Gives a profile the name that "new_name" asks for, wherever its partition names it.
 void renameProfile(Change& change, Object lpar, const std::string& name, Object& profile) {
     const std::string before = profile.get("name");
-    if (name == before) return;
+    if (name == before) {
+        return;
+    }
     refuseIf(!isPrintable(name), Fault::BadValue, {"new_name", name});
     refuseIf(change.host().profile(lpar.place().lpar, name) != nullptr, Fault::NameTaken, {name});
     profile.set("name", name);
     const std::string current = lpar.get("curr_profile"), usual = lpar.get("default_profile");
-    if (usual == before) lpar.set("default_profile", name);
+    if (usual == before) {
+        lpar.set("default_profile", name);
+    }
     lpar.set("curr_profile", current == before ? name : current);
     change.put(lpar);
 }
@@ -104,7 +114,9 @@ void editProfile(Change& change, const Operation& operation) {
 void requireUnused(const HostView& host, const Object& lpar) {
     const std::string id = lpar.get("lpar_id");
     const auto requireOther = [&](const Object& user, bool uses) {
-        if (!uses || user.place().lpar == lpar.place().lpar) return;
+        if (!uses || user.place().lpar == lpar.place().lpar) {
+            return;
+        }
         throw Failure(Fault::InUse, {std::to_string(user.place().lpar)});
     };
     for (Kind kind : {Kind::VirtualScsi, Kind::Serial}) {

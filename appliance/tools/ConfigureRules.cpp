@@ -27,7 +27,9 @@ Value words(const HostView&, const std::string& value, const char* argument) {
 /// A number within the first two of @p argument, or the word behind them.
 Value numberIn(const HostView&, const std::string& value, const char* argument) {
     const std::vector<std::string> limits = split(argument);
-    if (limits.size() > 2 && value == limits[2]) return value;
+    if (limits.size() > 2 && value == limits[2]) {
+        return value;
+    }
     std::int64_t found = 0;
     if (!wholeNumber(value, &found) || found < number(limits[0]) || found > number(limits[1])) {
         return std::nullopt;
@@ -64,9 +66,13 @@ Value nothing(const HostView& host, const std::string& value, const char*) {
 
 template <Kind kind>
 Value poolId(const HostView& host, const std::string& value, const char* argument) {
-    if (value == argument) return value;
+    if (value == argument) {
+        return value;
+    }
     for (const Object& pool : host.all(kind)) {
-        if (value == std::to_string(pool.place().number)) return value;
+        if (value == std::to_string(pool.place().number)) {
+            return value;
+        }
     }
     return std::nullopt;
 }
@@ -78,7 +84,9 @@ Value procPoolNamed(const HostView& host, const std::string& value, const char*)
 
 /// The ID of a partition, of the environment @p argument unless that is empty.
 Value lparId(const HostView& host, const std::string& value, const char* argument) {
-    if (isNone(value)) return kNone;
+    if (isNone(value)) {
+        return kNone;
+    }
     std::int64_t id = 0;
     const Object* lpar = wholeNumber(value, &id) ? host.lpar(id) : nullptr;
     const bool fits = lpar != nullptr && (*argument == '\0' || lpar->get("lpar_env") == argument);
@@ -86,15 +94,21 @@ Value lparId(const HostView& host, const std::string& value, const char* argumen
 }
 
 Value lparNamed(const HostView& host, const std::string& value, const char* argument) {
-    if (isNone(value)) return kNone;
+    if (isNone(value)) {
+        return kNone;
+    }
     const Object* lpar = host.find(Kind::Lpar, "name", value);
     return lpar == nullptr ? Value() : lparId(host, lpar->get("lpar_id"), argument);
 }
 
 /// A physical slot by its DRC index, a virtual slot by its number, or the word @p argument.
 Value taggedSlot(const HostView& host, const std::string& value, const char* argument) {
-    if (isNone(value)) return kNone;
-    if (value == argument || host.find(Kind::Slot, "drc_index", value) != nullptr) return value;
+    if (isNone(value)) {
+        return kNone;
+    }
+    if (value == argument || host.find(Kind::Slot, "drc_index", value) != nullptr) {
+        return value;
+    }
     return adapterValue("slot_num", value);
 }
 
@@ -102,11 +116,15 @@ Value taggedSlot(const HostView& host, const std::string& value, const char* arg
 
 template <Rule rule>
 Value eachOf(const HostView& host, const std::string& list, const char* argument) {
-    if (isNone(list)) return kNone;
+    if (isNone(list)) {
+        return kNone;
+    }
     std::vector<std::string> elements;
     for (const std::string& element : split(list)) {
         const Value value = rule(host, element, argument);
-        if (!value || *value == kNone) return std::nullopt;
+        if (!value || *value == kNone) {
+            return std::nullopt;
+        }
         elements.push_back(*value);
     }
     return joined(elements);
@@ -120,7 +138,9 @@ Value hca(const HostView& host, const std::string& value, const char*) {
 Value adapters(const HostView&, const std::string& list, const char* argument) {
     std::vector<std::string> elements;
     for (const AdapterForm& form : kAdapterForms) {
-        if (std::string(argument) != form.list) continue;
+        if (std::string(argument) != form.list) {
+            continue;
+        }
         for (const std::string& element : elementsOf(argument, list)) {
             elements.push_back(adapterElement(form, adapterFromElement(form, {}, element)));
         }
@@ -130,7 +150,9 @@ Value adapters(const HostView&, const std::string& list, const char* argument) {
 
 Value ioSlots(const HostView&, const std::string& list, const char*) {
     std::vector<std::string> elements;
-    for (const IoSlot& slot : ioSlotsFromList(list)) elements.push_back(ioSlotElement(slot));
+    for (const IoSlot& slot : ioSlotsFromList(list)) {
+        elements.push_back(ioSlotElement(slot));
+    }
     return adapterList(elements);
 }
 
@@ -144,7 +166,9 @@ std::string merged(const std::string& key, Setting::Operator op, const std::stri
                    const std::string& changes) {
     std::vector<std::string> elements = elementsOf(key, list);
     std::set<std::string> keys;
-    for (const std::string& element : elements) keys.insert(keyOf(element));
+    for (const std::string& element : elements) {
+        keys.insert(keyOf(element));
+    }
     for (const std::string& element : elementsOf(key, changes)) {
         const std::string changed = keyOf(element);
         if (op != Setting::Operator::Remove) {
@@ -249,7 +273,9 @@ const AttributeRules& profileRules() {
 }
 
 std::string namesOf(const AttributeRules& rules, std::string others) {
-    for (const AttributeRule& rule : rules) others.append(",").append(rule.names);
+    for (const AttributeRule& rule : rules) {
+        others.append(",").append(rule.names);
+    }
     return others.substr(others[0] == ',');
 }
 
@@ -259,9 +285,13 @@ std::string checkedValue(const HostView& host, const AttributeRules& rules,
     const bool replaces = setting.op == Setting::Operator::Set;
     refuseIf(!replaces && !rule.isList, Fault::NotAList, {setting.name});
     // What is removed from a list need not be written in full.
-    if (setting.op == Setting::Operator::Remove && rule.stored == nullptr) return setting.value;
+    if (setting.op == Setting::Operator::Remove && rule.stored == nullptr) {
+        return setting.value;
+    }
     Value value = rule.rule(host, setting.value, rule.argument);
-    if (value) return std::move(*value);
+    if (value) {
+        return std::move(*value);
+    }
     const Fault fault = rule.rule == nothing ? Fault::NotCapable : Fault::BadValue;
     throw Failure(fault, {setting.name, setting.value});
 }
@@ -270,9 +300,13 @@ void apply(const HostView& host, const AttributeRules& rules, const Setting& set
            Object& object) {
     const AttributeRule& rule = ruleFor(rules, setting.name);
     const std::string value = checkedValue(host, rules, setting);
-    if (rule.rule == nothing) return;
+    if (rule.rule == nothing) {
+        return;
+    }
     const std::string name = rule.stored == nullptr ? setting.name : rule.stored;
-    if (!rule.isList) return object.set(name, value);
+    if (!rule.isList) {
+        return object.set(name, value);
+    }
     const bool replaces = setting.op == Setting::Operator::Set;
     object.set(name, merged(name, setting.op, replaces ? kNone : object.get(name), value));
 }

@@ -41,7 +41,9 @@ void settleMemory(const HostView& host, const Settings& settings, Object& profil
     const auto& pools = host.all(Kind::MemPool);
     refuseIf(pools.empty(), Fault::BadValue, {"mem_mode", "shared"});
     refuseIf(profile.get("proc_mode") == "ded", Fault::Disagree, {"mem_mode", "proc_mode"});
-    if (!given(settings, "mem_mode")) return;
+    if (!given(settings, "mem_mode")) {
+        return;
+    }
     if (profile.get("primary_psp_id") == "none") {
         profile.update("primary_psp_id", split(pools.front().get("psp_ids")).front());
     }
@@ -104,7 +106,9 @@ void settleSlots(const HostView& host, Object& profile) {
     for (std::int64_t console = 0; console < 2; ++console) {
         const std::string key = std::to_string(console) + '/';
         const auto isIt = [&](const std::string& e) { return e.rfind(key, 0) == 0; };
-        if (std::any_of(serial.begin(), serial.end(), isIt)) continue;
+        if (std::any_of(serial.begin(), serial.end(), isIt)) {
+            continue;
+        }
         const auto size = static_cast<std::ptrdiff_t>(serial.size());
         serial.insert(serial.begin() + std::min<std::ptrdiff_t>(console, size),
                       adapterElement(*adapterForm(Kind::Serial), {Kind::Serial, {0, 0, console}}));
@@ -124,7 +128,9 @@ void settle(const HostView& host, const Settings& settings, Object& profile) {
     settleMemory(host, settings, profile);
     settleSharing(settings, profile);
     settleSlots(host, profile);
-    if (profile.get("all_resources") == "1") return;
+    if (profile.get("all_resources") == "1") {
+        return;
+    }
     requireRise(profile, "mem", 100);
     settleProcessors(host, settings, profile);
 }

@@ -66,13 +66,19 @@ void parse(const std::string& text, bool outermost, std::vector<Item>& items) {
         // Inside a quoted field, only its beginning names a filter.
         if (!quoted && (begin == 0 || outermost)) {
             head = headLength(text.substr(begin, text.find(',', begin) - begin));
-            if (head != 0) items.push_back({text.substr(begin, head - 1), {}});
+            if (head != 0) {
+                items.push_back({text.substr(begin, head - 1), {}});
+            }
             begin += head;
             quoted = quotedFieldAt(text, begin, &end);
         }
-        if (!quoted) end = std::min(text.find(',', begin), text.size());
+        if (!quoted) {
+            end = std::min(text.find(',', begin), text.size());
+        }
         std::string value = text.substr(begin, end - begin);
-        if (quoted) value = unquoted(value);
+        if (quoted) {
+            value = unquoted(value);
+        }
         if (quoted && outermost && head == 0 && headLength(value) != 0) {
             parse(value, false, items);
             continue;
@@ -100,8 +106,12 @@ Words resolve(const Item& item, const Words& known, std::vector<std::string>& st
                 taken = n;
                 best = run;
             }
-            if (n == longest || i + n == item.values.size()) break;
-            if (item.values[i + n - 1].quoted || item.values[i + n].quoted) break;
+            if (n == longest || i + n == item.values.size()) {
+                break;
+            }
+            if (item.values[i + n - 1].quoted || item.values[i + n].quoted) {
+                break;
+            }
             run += ',' + item.values[i + n].text;
         }
         if (taken != 0) {
@@ -118,7 +128,9 @@ Words resolve(const Item& item, const Words& known, std::vector<std::string>& st
 /// @throws Failure UnknownFilter
 const Rule& ruleFor(const Item& item, const char* names) {
     for (const Rule& rule : kRules) {
-        if (item.name == rule.name && isListed(names, item.name)) return rule;
+        if (item.name == rule.name && isListed(names, item.name)) {
+            return rule;
+        }
     }
     throw Failure(Fault::UnknownFilter, {item.name});
 }
@@ -127,7 +139,9 @@ const Rule& ruleFor(const Item& item, const char* names) {
 Words valuesOf(const Rule& rule, const Hosts& hosts, const std::vector<Row>& rows) {
     Words words;
     if (!rule.unknown) {
-        for (const Row& row : rows) words.insert(valueOf(row, rule.attribute));
+        for (const Row& row : rows) {
+            words.insert(valueOf(row, rule.attribute));
+        }
         return words;
     }
     for (const auto& host : hosts) {
@@ -148,7 +162,9 @@ void applyFilter(const std::string& text, const char* names, const Hosts& hosts,
         const Rule& rule = ruleFor(item, names);
         std::vector<std::string> strangers;
         const Words chosen = resolve(item, valuesOf(rule, hosts, rows), strangers);
-        if (rule.unknown && !strangers.empty()) throw Failure(*rule.unknown, {strangers.front()});
+        if (rule.unknown && !strangers.empty()) {
+            throw Failure(*rule.unknown, {strangers.front()});
+        }
         keep(rows, [&](const Row& row) { return chosen.count(valueOf(row, rule.attribute)) != 0; });
     }
 }

@@ -38,7 +38,9 @@ std::string optionLines(Tool tool) {
     std::string text;
     for (const Option& option : optionsOf(tool)) {
         std::string line = std::string("  ") + option.name;
-        if (option.value != nullptr) line += std::string(" ") + option.value;
+        if (option.value != nullptr) {
+            line += std::string(" ") + option.value;
+        }
         line.resize(std::max(line.size() + 2, kColumn), ' ');
         text += line + option.meaning + '\n';
     }
@@ -49,12 +51,18 @@ std::string commandLines(const Command& command) {
     std::string text = "\n ";
     const auto options = selectorsOf(command.tool), values = command.words();
     for (std::size_t i = 0; i < options.size(); ++i) {
-        if (values[i] == nullptr || values[i] == std::string(kAnyLevel)) continue;
+        if (values[i] == nullptr || values[i] == std::string(kAnyLevel)) {
+            continue;
+        }
         text += std::string(" ") + options[i] + ' ' + values[i];
     }
     text += '\n';
-    if (*command.attributes != '\0') text += wrapped("attributes:", command.attributes);
-    if (*command.filters != '\0') text += wrapped("filters:", command.filters);
+    if (*command.attributes != '\0') {
+        text += wrapped("attributes:", command.attributes);
+    }
+    if (*command.filters != '\0') {
+        text += wrapped("filters:", command.filters);
+    }
     return text;
 }
 
@@ -64,10 +72,14 @@ std::string help(const ToolName& tool) {
     std::string text = std::string("Usage: ") + tool.name + " <options>\n" + tool.name + ' ' +
                        tool.purpose + ".\n\nOptions:\n" + optionLines(tool.tool);
     for (const Resource& resource : resources()) {
-        if (resource.tool == tool.tool) text += commandLines(resource);
+        if (resource.tool == tool.tool) {
+            text += commandLines(resource);
+        }
     }
     const std::vector<Operation> operations = operationsOf(tool.tool);
-    for (const Operation& operation : operations) text += commandLines(operation);
+    for (const Operation& operation : operations) {
+        text += commandLines(operation);
+    }
     return text + '\n' + (operations.empty() ? kRecords : "") + kEnds;
 }
 

@@ -22,7 +22,9 @@ using namespace appliance;
 void writeAll(const std::string& text) {
     for (std::size_t done = 0; done < text.size();) {
         const ssize_t written = write(STDOUT_FILENO, text.data() + done, text.size() - done);
-        if (written < 0 && errno == EINTR) continue;
+        if (written < 0 && errno == EINTR) {
+            continue;
+        }
         refuseIf(written < 0, Fault::Output, {std::strerror(errno)});
         done += static_cast<std::size_t>(written);
     }
@@ -30,7 +32,9 @@ void writeAll(const std::string& text) {
 
 const ToolName& toolNamed(const std::string& name) {
     for (const ToolName& tool : kToolNames) {
-        if (name == tool.name) return tool;
+        if (name == tool.name) {
+            return tool;
+        }
     }
     throw Failure(Fault::UnknownTool, {name});
 }
@@ -39,9 +43,13 @@ const ToolName& toolNamed(const std::string& name) {
 /// @return whether the tool ends here, with @p status
 bool failsAsPlanned(const std::string& name, int* status) {
     const auto fault = takeFault(name);
-    if (!fault) return false;
+    if (!fault) {
+        return false;
+    }
     pause(*fault);
-    if (!fault->text.empty()) std::fprintf(stderr, "%s\n", fault->text.c_str());
+    if (!fault->text.empty()) {
+        std::fprintf(stderr, "%s\n", fault->text.c_str());
+    }
     if (fault->signal != 0) {
         std::signal(fault->signal, SIG_DFL);
         std::raise(fault->signal);
@@ -53,7 +61,9 @@ bool failsAsPlanned(const std::string& name, int* status) {
 int run(const std::string& name, const char* const* arguments) {
     const ToolName& tool = toolNamed(name);
     int status = 0;
-    if (failsAsPlanned(name, &status)) return status;
+    if (failsAsPlanned(name, &status)) {
+        return status;
+    }
     const Request request(tool, arguments);
     if (request.has("--help")) {
         writeAll(help(tool));

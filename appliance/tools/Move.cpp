@@ -43,9 +43,13 @@ bool holds(const Object& lpar, const Object& object) {
 /// The adapter to which a client is joined; null for other adapters.
 const Object* serverOf(const HostView& host, const Object& client) {
     const auto server = serverOf(client);
-    if (!server) return nullptr;
+    if (!server) {
+        return nullptr;
+    }
     for (const Object& other : host.all(client.kind(), server->first)) {
-        if (other.place().number == server->second) return &other;
+        if (other.place().number == server->second) {
+            return &other;
+        }
     }
     return nullptr;
 }
@@ -67,7 +71,9 @@ void requireMovable(const HostView& source, const Object& lpar) {
         for (const Object& adapter : source.all(kind)) {
             const auto server = serverOf(adapter);
             const bool isClient = server && kind == Kind::Serial && holds(lpar, adapter);
-            if (!isClient && !(server && server->first == lpar.place().lpar)) continue;
+            if (!isClient && !(server && server->first == lpar.place().lpar)) {
+                continue;
+            }
             const std::int64_t slot = isClient ? adapter.place().number : server->second;
             throw Failure(Fault::JoinedAdapters, {std::to_string(slot)});
         }
@@ -89,7 +95,9 @@ void requireRoom(const HostView& target, const Object& lpar) {
     const bool isShared = lpar.get("mem_mode") == "shared";
     refuseIf(isShared && target.all(Kind::MemPool).empty(), Fault::NoPool, {"mem_mode"});
     for (const std::string quantity : {"mem", "proc_units"}) {
-        if (isShared && quantity == "mem") continue;
+        if (isShared && quantity == "mem") {
+            continue;
+        }
         for (const std::string when : {"curr_", "pend_"}) {
             const std::string attribute = std::string(when).append("avail_sys_").append(quantity);
             const std::string left = valueOf({&target, &target.host()}, attribute);
@@ -111,7 +119,9 @@ bool isRunningServer(const Object& lpar) {
 /// The I/O server that carries the memory of active partitions.
 const Object& moverOf(const HostView& host) {
     for (const Object& lpar : host.all(Kind::Lpar)) {
-        if (isRunningServer(lpar)) return lpar;
+        if (isRunningServer(lpar)) {
+            return lpar;
+        }
     }
     throw Failure(Fault::NoMover, {host.host().get("name")});
 }
@@ -124,7 +134,9 @@ public:
     /// @param mustRun  only I/O servers that run are of use
     Servers(const HostView& host, bool mustRun) : m_host(host), m_mustRun(mustRun) {
         for (Kind kind : kVirtual) {
-            for (const Object& adapter : host.all(kind)) m_used.insert(slotOf(adapter));
+            for (const Object& adapter : host.all(kind)) {
+                m_used.insert(slotOf(adapter));
+            }
         }
     }
 
@@ -146,8 +158,9 @@ private:
     VirtualSlot take() {
         constexpr std::int64_t kFirst = 2;  // behind the consoles
         for (const Object& lpar : m_host.all(Kind::Lpar)) {
-            if (lpar.get("lpar_env") != kIoServer || (m_mustRun && !isRunningServer(lpar)))
+            if (lpar.get("lpar_env") != kIoServer || (m_mustRun && !isRunningServer(lpar))) {
                 continue;
+            }
             const std::int64_t end = number(lpar.get("curr_max_virtual_slots"));
             for (std::int64_t slot = kFirst; slot < end; ++slot) {
                 if (m_used.emplace(lpar.place().lpar, slot).second) {
@@ -211,16 +224,24 @@ void detach(Object& object, const HostView& target) {
          {"power_ctrl_lpar_ids", "work_group_id", "hsl_pool_id", "virtual_opti_pool_id"}) {
         object.update(name, "none");
     }
-    if (isProfile) object.update("io_slots", "none");
+    if (isProfile) {
+        object.update("io_slots", "none");
+    }
     for (const std::string when : {"pend_", "curr_"}) {
         const std::string name = (isProfile ? "" : when) + "shared_proc_pool_id";
-        if (object.get(name) != "null") object.update(name, "0");
+        if (object.get(name) != "null") {
+            object.update(name, "0");
+        }
     }
-    if (object.get("mem_mode") != "shared" || target.all(Kind::MemPool).empty()) return;
+    if (object.get("mem_mode") != "shared" || target.all(Kind::MemPool).empty()) {
+        return;
+    }
     const auto servers = split(target.all(Kind::MemPool).front().get("psp_ids"));
     object.update("primary_psp_id", servers.front());
     object.update("secondary_psp_id", servers.size() > 1 ? servers[1] : "none");
-    if (!isProfile) object.update("curr_psp_id", servers.front());
+    if (!isProfile) {
+        object.update("curr_psp_id", servers.front());
+    }
 }
 
 /// The partition as it will be, not active yet, and all that it will have; itself first.
@@ -233,7 +254,9 @@ std::vector<Object> placeFor(const HostView& source, const Object& lpar, const H
         objects.push_back(profile.movedTo(place));
         rejoin(objects.back(), adapters);
     }
-    for (Object& object : objects) detach(object, target);
+    for (Object& object : objects) {
+        detach(object, target);
+    }
     objects.insert(objects.end(), adapters.begin(), adapters.end());
     return objects;
 }
@@ -242,10 +265,14 @@ std::vector<Object> placeFor(const HostView& source, const Object& lpar, const H
 void vacate(Change& change, const HostView& host, const Object& lpar) {
     std::vector<Object> servers;
     for (const Object& client : host.all(Kind::VirtualScsi, lpar.place().lpar)) {
-        if (const Object* server = serverOf(host, client)) servers.push_back(*server);
+        if (const Object* server = serverOf(host, client)) {
+            servers.push_back(*server);
+        }
     }
     eraseLpar(change, host, lpar);
-    for (const Object& server : servers) change.remove(server);
+    for (const Object& server : servers) {
+        change.remove(server);
+    }
 }
 
 // The move.
@@ -330,7 +357,9 @@ Object reserve(Change& change) {
     }
     objects.front() = ends.place;
     change.put(ends.lpar);
-    for (const Object& object : objects) change.put(object);
+    for (const Object& object : objects) {
+        change.put(object);
+    }
     note(change, ends.lpar, "Migration Starting");
     return ends.lpar;
 }
@@ -351,7 +380,9 @@ Ends endsOf(Change& change, const std::string& token) {
     change.host();  // what keeps it from starting has not stopped the move
     try {
         Ends ends = endsOf(change);
-        if (ends.lpar.get("migration_token") == token) return ends;
+        if (ends.lpar.get("migration_token") == token) {
+            return ends;
+        }
     } catch (const Failure&) {
         // Of whatever kind: the partition itself may be gone.
     }
@@ -392,7 +423,9 @@ void giveUp(Change& change, Ends ends) {
 double duration() {
     constexpr double kUsual = 3, kMost = 86'400;
     const char* text = std::getenv("APPLIANCE_MOVE_SECONDS");
-    if (text == nullptr) return kUsual;
+    if (text == nullptr) {
+        return kUsual;
+    }
     char* end = nullptr;
     const double seconds = std::strtod(text, &end);
     return end == text || !(seconds >= 0) ? kUsual : std::min(seconds, kMost);
@@ -417,7 +450,9 @@ void move(Change& first, const Operation&) {
         Change change(request);
         arrive(change, endsOf(change, token));
     } catch (const Failure& failure) {
-        if (failure.fault() == Fault::MoveStopped) throw;
+        if (failure.fault() == Fault::MoveStopped) {
+            throw;
+        }
         Change change(request);
         giveUp(change, endsOf(change, token));
         throw;

@@ -34,7 +34,9 @@ constexpr const char* kEdges[] = {"min_", "desired_", "max_"};
 std::string environment(const HostView& host, const Settings& settings) {
     std::string word = needed(settings, "lpar_env");
     for (const Environment& known : kEnvironments) {
-        if (word != known.word) continue;
+        if (word != known.word) {
+            continue;
+        }
         refuseIf(known.capability != nullptr && host.host().get(known.capability) != "1",
                  Fault::NotCapable, {"lpar_env"});
         return word;
@@ -46,8 +48,12 @@ std::string environment(const HostView& host, const Settings& settings) {
 void requireQuantities(const Settings& settings) {
     const bool isDedicated = given(settings, "proc_mode") == "ded";
     for (const std::string quantity : {"mem", "procs", "proc_units"}) {
-        if (quantity == "proc_units" && isDedicated) continue;
-        for (const char* edge : kEdges) needed(settings, edge + quantity);
+        if (quantity == "proc_units" && isDedicated) {
+            continue;
+        }
+        for (const char* edge : kEdges) {
+            needed(settings, edge + quantity);
+        }
     }
 }
 
@@ -56,7 +62,9 @@ Object newProfile(const HostView& host, const Settings& settings, const Place& p
     refuseIf(!isPrintable(name), Fault::BadValue, {"profile_name", name});
     const std::string all = given(settings, "all_resources").value_or("0");
     refuseIf(all != "0" && all != "1", Fault::BadValue, {"all_resources", all});
-    if (all == "0") requireQuantities(settings);
+    if (all == "0") {
+        requireQuantities(settings);
+    }
 
     Object profile(Kind::Profile, place);
     profile.set("name", name);
@@ -67,7 +75,9 @@ Object newProfile(const HostView& host, const Settings& settings, const Place& p
         profile.set(edge + "proc_units", "0.0");
     }
     for (const Setting& setting : settings) {
-        if (isListed(kOwn, setting.name) || isListed(kLparNames, setting.name)) continue;
+        if (isListed(kOwn, setting.name) || isListed(kLparNames, setting.name)) {
+            continue;
+        }
         apply(host, profileRules(), setting, profile);
     }
     settle(host, settings, profile);
@@ -92,7 +102,9 @@ Object newLpar(const HostView& host, const Settings& settings, const Object& pro
     }
     takeSettings(profile, lpar);
     for (const Setting& setting : settings) {
-        if (isListed(kLparNames, setting.name)) apply(host, lparRules(), setting, lpar);
+        if (isListed(kLparNames, setting.name)) {
+            apply(host, lparRules(), setting, lpar);
+        }
     }
     return lpar;
 }
@@ -103,7 +115,9 @@ template <typename IsGone>
 bool takeFrom(Object& object, const char* attribute, const std::string& empty, IsGone isGone) {
     std::vector<std::string> elements = split(object.get(attribute));
     const auto gone = std::remove_if(elements.begin(), elements.end(), isGone);
-    if (gone == elements.end()) return false;
+    if (gone == elements.end()) {
+        return false;
+    }
     elements.erase(gone, elements.end());
     object.set(attribute, elements.empty() ? empty : joined(elements));
     return true;
@@ -125,7 +139,9 @@ std::vector<Object> freed(const HostView& host, std::int64_t lpar) {
         }
     }
     for (Object system : host.all(Kind::SystemProfile)) {
-        if (takeFrom(system, "lpar_profiles", "", isStart)) changed.push_back(std::move(system));
+        if (takeFrom(system, "lpar_profiles", "", isStart)) {
+            changed.push_back(std::move(system));
+        }
     }
     if (host.host().get("service_lpar_id") == id) {
         changed.push_back(host.host());
@@ -149,7 +165,9 @@ std::int64_t newId(const HostView& host, const Settings& settings) {
         return id;
     }
     for (const Object& lpar : lpars) {
-        if (lpar.place().lpar != id) break;
+        if (lpar.place().lpar != id) {
+            break;
+        }
         ++id;
     }
     return id;
@@ -181,11 +199,17 @@ void eraseLpar(Change& change, const HostView& host, const Object& lpar) {
     for (Kind kind : kOfLpar) {
         for (const Object& object : host.all(kind, id)) {
             gone.push_back(object);
-            if (isPhysical(kind)) kept.push_back(object.movedTo({object.place().host, 0}));
+            if (isPhysical(kind)) {
+                kept.push_back(object.movedTo({object.place().host, 0}));
+            }
         }
     }
-    for (const Object& object : gone) change.remove(object);
-    for (const Object& object : kept) change.put(object);
+    for (const Object& object : gone) {
+        change.remove(object);
+    }
+    for (const Object& object : kept) {
+        change.put(object);
+    }
 }
 
 }  // namespace appliance

@@ -7,7 +7,9 @@ std::vector<Operation> operationsOf(Tool tool) {
     for (const auto* table :
          {&kAllocateOperations, &kConfigureOperations, &kPowerOperations, &kMoveOperations}) {
         for (const Operation& operation : *table) {
-            if (operation.tool == tool) found.push_back(operation);
+            if (operation.tool == tool) {
+                found.push_back(operation);
+            }
         }
     }
     return found;

@@ -55,7 +55,9 @@ void stopLpar(Change& change, const Operation& operation) {
     requireNoMoveThrough(change.host(), lpar);
     const bool restarts =
         change.request().has("--restart") || std::string(operation.last) == "dumprestart";
-    if (restarts) clearRefcode(lpar);
+    if (restarts) {
+        clearRefcode(lpar);
+    }
     enter(change, change.host(), {lpar}, restarts ? "Running" : "Not Activated");
 }
 
@@ -98,11 +100,15 @@ void start(Activation& activation, const HostView& host, const std::vector<LparP
            bool passOver) {
     for (const LparProfile& row : lpars) {
         const Object* lpar = host.lpar(row.lpar);
-        if (lpar == nullptr || isActive(*lpar) || activation.hasStarted(*lpar)) continue;
+        if (lpar == nullptr || isActive(*lpar) || activation.hasStarted(*lpar)) {
+            continue;
+        }
         try {
             activation.start(*lpar, row.profile, "");
         } catch (const Failure&) {
-            if (!passOver) throw;
+            if (!passOver) {
+                throw;
+            }
         }
     }
 }
@@ -122,10 +128,14 @@ void startSystemProfile(Change& change, const Operation& operation) {
 
 /// Which partitions start with the host.
 std::vector<LparProfile> lparsToStart(const HostView& host, const Request& request) {
-    if (request.value("-o") == "onsysprof") return systemProfile(host, request.value("-f"));
+    if (request.value("-o") == "onsysprof") {
+        return systemProfile(host, request.value("-f"));
+    }
     std::vector<LparProfile> lpars;
     for (const Object& lpar : host.all(Kind::Lpar)) {
-        if (lpar.get("auto_start") != "1") continue;
+        if (lpar.get("auto_start") != "1") {
+            continue;
+        }
         lpars.push_back({lpar.place().lpar, lpar.get("default_profile")});
     }
     return lpars;
@@ -160,7 +170,9 @@ void startHost(Change& change, const Operation& operation) {
     refuseIf(name == "onsysprof" && !change.request().has("-f"), Fault::MissingOption, {"-f"});
     const bool standsBy = name == "onstandby";
     requireState(change.host(), standsBy ? "Power Off" : "Power Off,Standby");
-    if (standsBy) return setState(change, "Standby");
+    if (standsBy) {
+        return setState(change, "Standby");
+    }
     operate(change);
 }
 
@@ -173,11 +185,15 @@ void stopHost(Change& change, const Operation&) {
     std::vector<Object> active;
     for (const Object& lpar : host.all(Kind::Lpar)) {
         requireStill(lpar);
-        if (isActive(lpar)) active.push_back(lpar);
+        if (isActive(lpar)) {
+            active.push_back(lpar);
+        }
     }
     refuseIf(!active.empty() && !isImmediate, Fault::LparsActive);
     enter(change, host, active, "Not Activated");
-    if (restarts) return operate(change);
+    if (restarts) {
+        return operate(change);
+    }
     setState(change, "Power Off");
 }
 
@@ -217,7 +233,9 @@ void suspend(Change& change, const Operation& operation) {
         *std::find_if(std::begin(kSuspensions), std::end(kSuspensions),
                       [&](const Suspension& s) { return std::string(s.name) == operation.last; });
     const Request& request = change.request();
-    if (row.hasSubject || request.has("-t")) oneOf(request, "-t", "suspend");
+    if (row.hasSubject || request.has("-t")) {
+        oneOf(request, "-t", "suspend");
+    }
     const Object lpar = change.lpar();
     refuseIf(row.from == nullptr, Fault::NoSuspension, {request.value("--id")});
     if (std::string(row.from) == "Running") {
@@ -226,7 +244,9 @@ void suspend(Change& change, const Operation& operation) {
         requireState(change.host(), "Operating");
         requireState(lpar, row.from);
     }
-    if (row.to != nullptr) enter(change, change.host(), {lpar}, row.to);
+    if (row.to != nullptr) {
+        enter(change, change.host(), {lpar}, row.to);
+    }
 }
 
 }  // namespace

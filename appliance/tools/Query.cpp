@@ -25,7 +25,9 @@ std::string records(const std::vector<Row>& rows, const std::vector<std::string>
         const char* comma = "";
         for (const std::string& attribute : attributes) {
             std::string value = valueOf(row, attribute);
-            if (withNames) value.insert(0, attribute + '=');
+            if (withNames) {
+                value.insert(0, attribute + '=');
+            }
             text.append(comma).append(quoted(value));
             comma = ",";
         }
@@ -46,7 +48,9 @@ std::string answer(const Request& request) {
                                                 : hostsNamed(store, request.value("-m"), '*');
     std::vector<Row> rows = resource.rows(hosts, request);
     applyFilter(request.value("--filter"), resource.filters, hosts, rows);
-    if (rows.empty()) return kNothing;
+    if (rows.empty()) {
+        return kNothing;
+    }
     const bool withNames = !request.has("-F") && request.has("-r");
     return records(rows, attributes, withNames);
 }

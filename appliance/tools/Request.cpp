@@ -76,7 +76,9 @@ constexpr Option kOptions[] = {
 
 const Option& find(Tool tool, const std::string& name) {
     for (const Option& option : kOptions) {
-        if (name == option.name && (option.tools & tool) != 0) return option;
+        if (name == option.name && (option.tools & tool) != 0) {
+            return option;
+        }
     }
     throw Failure(name.rfind('-', 0) == 0 ? Fault::UnknownOption : Fault::UnexpectedArgument,
                   {name});
@@ -87,7 +89,9 @@ const Option& find(Tool tool, const std::string& name) {
 std::vector<Option> optionsOf(Tool tool) {
     std::vector<Option> options;
     for (const Option& option : kOptions) {
-        if ((option.tools & tool) != 0) options.push_back(option);
+        if ((option.tools & tool) != 0) {
+            options.push_back(option);
+        }
     }
     return options;
 }
@@ -117,7 +121,9 @@ std::string Request::value(const char* option) const {
 
 std::int64_t Request::number(const char* option, std::int64_t least, std::int64_t most,
                              std::int64_t absent) const {
-    if (!has(option)) return absent;
+    if (!has(option)) {
+        return absent;
+    }
     std::int64_t number = 0;
     refuseIf(!wholeNumber(value(option), &number) || number < least || number > most,
              Fault::BadOptionValue, {option, value(option)});

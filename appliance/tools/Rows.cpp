@@ -31,7 +31,9 @@ std::vector<std::time_t> sampleTimes(const Request& request, std::time_t rate) {
     const std::time_t start = std::max(moment(request, "start", end - kHour), now - kKept);
     const auto most = static_cast<std::size_t>(request.number("-n", 1, 1'000'000, 1'000'000));
     std::vector<std::time_t> times;
-    if (rate <= 0) return times;
+    if (rate <= 0) {
+        return times;
+    }
     for (std::time_t time = end - end % rate; time >= start && times.size() < most; time -= rate) {
         times.push_back(time);
     }
@@ -59,7 +61,9 @@ std::vector<Row> samples(const std::vector<Row>& objects, const Request& request
 
 std::vector<Row> eachHost(const Hosts& hosts, const Request&) {
     std::vector<Row> rows;
-    for (const auto& view : hosts) rows.push_back({view.get(), &view->host()});
+    for (const auto& view : hosts) {
+        rows.push_back({view.get(), &view->host()});
+    }
     return rows;
 }
 
@@ -67,7 +71,9 @@ std::vector<Row> hostCapacity(const Hosts& hosts, const Request& request) {
     constexpr std::int64_t kMost = 1LL << 40;
     request.number("--procunits", 1, kMost, 0);
     std::vector<Row> rows = eachHost(hosts, request);
-    for (Row& row : rows) row.maxMem = request.number("--maxmem", 1, kMost, 0);
+    for (Row& row : rows) {
+        row.maxMem = request.number("--maxmem", 1, kMost, 0);
+    }
     return rows;
 }
 
@@ -87,14 +93,18 @@ std::vector<Row> lparSamples(const Hosts& hosts, const Request& request) {
 
 std::vector<Row> theAppliance(const Hosts& hosts, const Request& request) {
     std::vector<Row> rows = eachHost(hosts, request);
-    if (rows.size() > 1) rows.resize(1);
+    if (rows.size() > 1) {
+        rows.resize(1);
+    }
     return rows;
 }
 
 std::vector<Row> singleHostManager(const Hosts& hosts, const Request& request) {
     if (hosts.size() == 1) {
         for (const Row& row : each<Kind::Lpar>(hosts, request)) {
-            if (row.lpar->get("lpar_env") == "xbrgserver") return {row};
+            if (row.lpar->get("lpar_env") == "xbrgserver") {
+                return {row};
+            }
         }
     }
     throw Failure(Fault::NoSingleHostManager);

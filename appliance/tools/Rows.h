@@ -24,9 +24,13 @@ std::vector<Row> each(const Hosts& hosts, const Request&) {
     for (const auto& view : hosts) {
         const auto begin = static_cast<std::ptrdiff_t>(rows.size());
         for (Kind kind : {kinds...}) {
-            for (const Object& object : view->all(kind)) rows.push_back(rowOf(*view, object));
+            for (const Object& object : view->all(kind)) {
+                rows.push_back(rowOf(*view, object));
+            }
         }
-        if (sizeof...(kinds) == 1) continue;
+        if (sizeof...(kinds) == 1) {
+            continue;
+        }
         std::stable_sort(rows.begin() + begin, rows.end(), [](const Row& a, const Row& b) {
             return a.self->place() < b.self->place();
         });

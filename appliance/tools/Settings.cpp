@@ -15,8 +15,12 @@ Setting settingOf(const std::string& item) {
     Setting setting;
     setting.value = item.substr(equals + 1);
     const char before = item[equals - 1];
-    if (before == '+') setting.op = Setting::Operator::Add;
-    if (before == '-') setting.op = Setting::Operator::Remove;
+    if (before == '+') {
+        setting.op = Setting::Operator::Add;
+    }
+    if (before == '-') {
+        setting.op = Setting::Operator::Remove;
+    }
     setting.name = item.substr(0, setting.op == Setting::Operator::Set ? equals : equals - 1);
     return setting;
 }
@@ -26,7 +30,9 @@ Setting settingOf(const std::string& item) {
 Settings settingsOf(const Request& request, const char* option, const char* names) {
     Settings settings;
     const std::string text = request.value(option);
-    if (text.empty()) return settings;
+    if (text.empty()) {
+        return settings;
+    }
     for (const std::string& item : split(text)) {
         Setting setting = settingOf(item);
         refuseIf(!isListed(names, setting.name), Fault::UnknownAttribute, {setting.name});
@@ -40,7 +46,9 @@ Settings settingsOf(const Request& request, const char* option, const char* name
 
 std::optional<std::string> given(const Settings& settings, const std::string& name) {
     for (const Setting& setting : settings) {
-        if (setting.name != name) continue;
+        if (setting.name != name) {
+            continue;
+        }
         refuseIf(setting.op != Setting::Operator::Set, Fault::NotAList, {name});
         return setting.value;
     }

@@ -47,7 +47,9 @@ void spreadAmounts(const std::string& partition) {
     appliance::Store store = appliance::Store::open(appliance::Database::Access::Write);
     appliance::Transaction change = store.write();
     for (appliance::Object& lpar : store.all(appliance::Kind::Lpar)) {
-        if (lpar.get("name") != partition) continue;
+        if (lpar.get("name") != partition) {
+            continue;
+        }
         int number = 1;
         for (const std::string& name : appliance::split(
                  "curr_min_mem,curr_mem,curr_max_mem,pend_min_mem,pend_mem,pend_max_mem,"
@@ -146,7 +148,9 @@ TEST_F(ApiTest, ReturnCodes) {
         [] { return getLparVirtualScsi("anyone", kLpar, 2); },
         [] { return getAllLparsFromCec("", "1111-AAD*0000004", 1); },  // no partitions
     };
-    for (const auto& call : ok) EXPECT_EQ(API_SUCCESS, Answer(call()).code());
+    for (const auto& call : ok) {
+        EXPECT_EQ(API_SUCCESS, Answer(call()).code());
+    }
     EXPECT_EQ(0, Answer(ok[2]()).size());
 
     const struct {
@@ -245,7 +249,9 @@ TEST_F(ApiTest, PlannedFaults) {
 long residentKilobytes() {
     std::ifstream status("/proc/self/status");
     for (std::string line; std::getline(status, line);) {
-        if (line.rfind("VmRSS:", 0) == 0) return std::stol(line.substr(6));
+        if (line.rfind("VmRSS:", 0) == 0) {
+            return std::stol(line.substr(6));
+        }
     }
     return 0;
 }
@@ -267,7 +273,9 @@ TEST_F(ApiTest, EveryCallIsOnePicture) {
         readers.emplace_back([&] {
             while (!done) {
                 const Answer lpars(getAllLparMemoryCfgs("", 2));
-                if (lpars.size() != 40) ++failed;
+                if (lpars.size() != 40) {
+                    ++failed;
+                }
                 for (int j = 1; j < lpars.size(); ++j) {
                     mixed +=
                         lpars.value(j, "RuntimeVRMWeight") != lpars.value(0, "RuntimeVRMWeight");
@@ -285,7 +293,9 @@ TEST_F(ApiTest, EveryCallIsOnePicture) {
         change.commit();
     }
     done = true;
-    for (std::thread& reader : readers) reader.join();
+    for (std::thread& reader : readers) {
+        reader.join();
+    }
     EXPECT_EQ(0, mixed);
     EXPECT_EQ(0, failed);
 }

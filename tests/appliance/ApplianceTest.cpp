@@ -136,7 +136,9 @@ TEST_F(ApplianceTest, CheckFindsWhatAHostWouldRefuse) {
         Object changed(row.kind, row.place);
         for (const Object& object : store.all(row.kind, row.place.host)) {
             const Place& place = object.place();
-            if (place.lpar == row.place.lpar && place.number == row.place.number) changed = object;
+            if (place.lpar == row.place.lpar && place.number == row.place.number) {
+                changed = object;
+            }
         }
         changed.set(row.attribute, row.value);
         if (changed.stored().find("mem") == std::string::npos && row.kind == Kind::Profile) {
@@ -170,12 +172,16 @@ TEST_F(ApplianceTest, AToolSeesTheOldApplianceOrTheNewOne) {
             "qyplat -r lpar -F lpar_id | wc -l");
     EXPECT_EQ("", outcome.err);
     const auto counts = testing_support::lines(outcome.out);
-    for (const std::string& count : counts) EXPECT_TRUE(count == "100" || count == "6000") << count;
+    for (const std::string& count : counts) {
+        EXPECT_TRUE(count == "100" || count == "6000") << count;
+    }
     EXPECT_EQ("6000", counts.back());
 }
 
 TEST_F(ApplianceTest, UsersWhoMayOnlyReadTheFolderCanAsk) {
-    if (geteuid() != 0) GTEST_SKIP() << "needs another user";
+    if (geteuid() != 0) {
+        GTEST_SKIP() << "needs another user";
+    }
     ASSERT_EQ(0, run("umask 022 && appliance init").exit);
     const auto asOther = [&](const std::string& command) {
         return run("setpriv --reuid=65534 --regid=65534 --clear-groups " + command);

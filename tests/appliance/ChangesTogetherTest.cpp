@@ -45,7 +45,9 @@ TEST_F(ChangesTogetherTest, WhatSucceedsAddsUp) {
     const Outcome outcome = m_appliance.run("for p in 1 2 3 4 5 6 7 8; do changes $p " + count +
                                             " 2>$APPLIANCE_HOME/err.$p & done; wait");
     std::map<char, std::int64_t> done;
-    for (char c : outcome.out) ++done[c];
+    for (char c : outcome.out) {
+        ++done[c];
+    }
     EXPECT_LT(0, done['a']);
     EXPECT_LT(0, done['d']);
     EXPECT_EQ(std::to_string(16384 + 256 * (done['a'] - done['r'])) + '\n',
@@ -63,7 +65,9 @@ TEST_F(ChangesTogetherTest, WhatSucceedsAddsUp) {
 void runKilled(const std::vector<std::string>& command, std::int64_t microseconds) {
     std::vector<char*> arguments;
     arguments.reserve(command.size() + 1);
-    for (const std::string& word : command) arguments.push_back(const_cast<char*>(word.c_str()));
+    for (const std::string& word : command) {
+        arguments.push_back(const_cast<char*>(word.c_str()));
+    }
     arguments.push_back(nullptr);
     const pid_t child = fork();
     if (child == 0) {

@@ -44,7 +44,9 @@ TEST_F(MoveTest, RunsInTheBackground) {
         EXPECT_EQ("", out("appliance check"));
         const int now = partition.getMigrationPercentComplete("");
         const Answer lpar(getLparObj("", (std::string("7*") + kAlpha).c_str(), 1));
-        if (now <= 0 || lpar.size() == 0) continue;
+        if (now <= 0 || lpar.size() == 0) {
+            continue;
+        }
         EXPECT_EQ("13", lpar.value(0, "MigrationState"));
         EXPECT_LE(percent, now);
         percent = now;
@@ -183,11 +185,15 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
         const auto usual = store.find(row.kind, row.place);
         const auto put = [&](appliance::Object object, const char* value) {
             auto change = store.write();
-            if (value != nullptr) object.set(row.attribute, value);
+            if (value != nullptr) {
+                object.set(row.attribute, value);
+            }
             store.put(object);
             change.commit();
         };
-        if (usual) put(*usual, row.value);
+        if (usual) {
+            put(*usual, row.value);
+        }
         const std::string before = shown(), journal = out("appliance journal --json");
         for (const std::string operation : {"v", "m"}) {
             const auto outcome =
@@ -198,7 +204,9 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
         }
         EXPECT_EQ(before, shown()) << row.options << row.code;
         EXPECT_EQ(journal, out("appliance journal --json"));
-        if (usual) put(*usual, nullptr);
+        if (usual) {
+            put(*usual, nullptr);
+        }
     }
     EXPECT_EQ("WRTL8073", m_appliance.run("domove -o s -m alpha --id 7").err.substr(0, 8));
 }

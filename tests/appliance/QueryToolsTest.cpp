@@ -17,7 +17,9 @@ protected:
     /// The values of one field.
     std::vector<std::string> column(const std::string& command) {
         std::vector<std::string> values;
-        for (const Record& record : recordsOf(run(command).out)) values.push_back(record[0]);
+        for (const Record& record : recordsOf(run(command).out)) {
+            values.push_back(record[0]);
+        }
         return values;
     }
 };
@@ -123,13 +125,17 @@ TEST_F(QueryToolsTest, AmountsAddUp) {
             const std::string m = " -m '" + host + "' -F ";
             const auto ids = column("qyplat -r lpar" + m + "lpar_id");
             EXPECT_EQ(ids, column("qymove -r lpar" + m + "lpar_id"));  // callers pair the lines
-            if (ids.front() == "No results were found.") continue;
+            if (ids.front() == "No results were found.") {
+                continue;
+            }
 
             std::int64_t mem =
                 number(column("qyalloc -r mem --level sys" + m + "sys_firmware_mem")[0]);
             for (const Record& lpar :
                  recordsOf(run("qyalloc -r mem --level lpar" + m + "pend_mem,mem_mode").out)) {
-                if (lpar[1] == "ded") mem += number(lpar[0]);
+                if (lpar[1] == "ded") {
+                    mem += number(lpar[0]);
+                }
             }
             const auto pool = column("qyalloc -r mempool" + m + "pend_pool_mem");
             mem += number(pool[0]) +

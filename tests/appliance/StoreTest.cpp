@@ -25,7 +25,9 @@ protected:
         Store store = Store::create();
         Transaction change = store.write();
         store.clear(false);
-        for (int id = 1; id <= kLpars; ++id) store.put(lpar(id, "0"));
+        for (int id = 1; id <= kLpars; ++id) {
+            store.put(lpar(id, "0"));
+        }
         change.commit();
     }
 
@@ -39,7 +41,9 @@ protected:
         Store store = Store::open(Database::Access::Read);
         const Transaction picture = store.read();
         std::int64_t sum = 0;
-        for (const Object& object : store.all(Kind::Lpar)) sum += number(object.get("pend_mem"));
+        for (const Object& object : store.all(Kind::Lpar)) {
+            sum += number(object.get("pend_mem"));
+        }
         return sum;
     }
 
@@ -56,7 +60,9 @@ protected:
     /// Runs @p work in a process of its own, which ends with 0 unless it throws.
     static pid_t inChild(const std::function<void()>& work) {
         const pid_t child = fork();
-        if (child != 0) return child;
+        if (child != 0) {
+            return child;
+        }
         try {
             work();
             _exit(0);
@@ -81,7 +87,9 @@ TEST_F(StoreTest, ProcessesThatWriteTakeTurnsAndReadersSeeWholeChanges) {
     for (int i = 0; i < kWriters; ++i) {
         children.push_back(inChild([] {
             Store store = Store::open(Database::Access::Write);
-            for (int change = 0; change < kChanges; ++change) addToAll(store);
+            for (int change = 0; change < kChanges; ++change) {
+                addToAll(store);
+            }
         }));
     }
     for (int i = 0; i < kReaders; ++i) {
@@ -89,13 +97,19 @@ TEST_F(StoreTest, ProcessesThatWriteTakeTurnsAndReadersSeeWholeChanges) {
             std::int64_t last = 0;
             while (last < kWriters * kChanges * kLpars) {
                 const std::int64_t sum = totalMem();
-                if (sum % kLpars != 0) throw std::runtime_error("half a change was seen");
-                if (sum < last) throw std::runtime_error("a change was undone");
+                if (sum % kLpars != 0) {
+                    throw std::runtime_error("half a change was seen");
+                }
+                if (sum < last) {
+                    throw std::runtime_error("a change was undone");
+                }
                 last = sum;
             }
         }));
     }
-    for (pid_t child : children) EXPECT_EQ(0, statusOf(child));
+    for (pid_t child : children) {
+        EXPECT_EQ(0, statusOf(child));
+    }
     EXPECT_EQ(kWriters * kChanges * kLpars, totalMem());
 }
 
@@ -116,8 +130,12 @@ TEST_F(StoreTest, AKilledWriterLeavesNothingOfItsChange) {
         Store store = Store::open(Database::Access::Write);
         Transaction change = store.write();
         store.clear(true);
-        for (int id = 1; id <= 20'000; ++id) store.put(lpar(id, std::string(500, '7')));
-        if (write(ready[1], "x", 1) == 1) pause();
+        for (int id = 1; id <= 20'000; ++id) {
+            store.put(lpar(id, std::string(500, '7')));
+        }
+        if (write(ready[1], "x", 1) == 1) {
+            pause();
+        }
     });
     char byte = 0;
     ASSERT_EQ(1, read(ready[0], &byte, 1));

@@ -44,10 +44,16 @@ struct ToolRow {
 
     /// 1 is a refusal, 2 a wrong command line, 3 a state and 4 an output that cannot be used.
     int exit() const {
-        if (answer.rfind("WRTL", 0) != 0) return 0;
+        if (answer.rfind("WRTL", 0) != 0) {
+            return 0;
+        }
         const std::string code = answer.substr(4, 4);
-        if (code == "1011") return 1;  // a value that the host refuses
-        if (code == "2007") return 4;
+        if (code == "1011") {
+            return 1;  // a value that the host refuses
+        }
+        if (code == "2007") {
+            return 4;
+        }
         return code[0] == '1' ? 2 : code[0] == '2' ? 3 : 1;
     }
 };

@@ -35,13 +35,16 @@ protected:
     pid_t start(std::vector<std::string> arguments, const char* out = "out") {
         arguments.insert(arguments.begin(), CIMOM_PROGRAM);
         std::vector<char*> argv;
-        for (std::string& each : arguments) argv.push_back(each.data());
+        for (std::string& each : arguments) {
+            argv.push_back(each.data());
+        }
         argv.push_back(nullptr);
         const pid_t child = fork();
         if (child == 0) {
             if (chdir((m_folder / "").c_str()) != 0 || !freopen(out, "w", stdout) ||
-                !freopen("err", "w", stderr))
+                !freopen("err", "w", stderr)) {
                 _exit(99);
+            }
             setenv("CIMOM_REGISTRATION", m_registration, 1);
             execv(CIMOM_PROGRAM, argv.data());
             _exit(98);
@@ -242,7 +245,9 @@ TEST_F(CommandLine, LeanLeavesNamesAndTypesToTheProvider) {
 // Nothing fires in that process, and so it watches until it is told to end.
 TEST_F(CommandLine, WatchingEndsWithASignal) {
     const pid_t child = start({"--trace", "1", "watch", "Fix_Event"});
-    for (int i = 0; i < 500 && read("err").find("enable") == std::string::npos; ++i) usleep(20000);
+    for (int i = 0; i < 500 && read("err").find("enable") == std::string::npos; ++i) {
+        usleep(20000);
+    }
     kill(child, SIGTERM);
     const Run result = finish(child);
     EXPECT_EQ(result.exit, 0);

@@ -42,7 +42,9 @@ static Text keyOf(Path path) {
 
 static CMPIStatus status(CMPIrc rc, Text text) {
     CMPIStatus result = {rc, NULL};
-    if (text) result.msg = broker->eft->newString(broker, text, NULL);
+    if (text) {
+        result.msg = broker->eft->newString(broker, text, NULL);
+    }
     return result;
 }
 static CMPIStatus done(Result result) {
@@ -51,8 +53,11 @@ static CMPIStatus done(Result result) {
 }
 
 static int findThing(Text name) {
-    for (int i = 0; i < thingCount; ++i)
-        if (strcmp(things[i].name, name) == 0) return i;
+    for (int i = 0; i < thingCount; ++i) {
+        if (strcmp(things[i].name, name) == 0) {
+            return i;
+        }
+    }
     return -1;
 }
 static CMPIObjectPath* newPath(Path like, Text className) {
@@ -67,8 +72,12 @@ static CMPIInstance* thingInstance(Path like, const Thing* thing, Text* properti
     CMPIInstance* inst = broker->eft->newInstance(broker, thingPath(like, thing), NULL);
     CMPIValue value;
     Text keys[] = {"Name", NULL};
-    if (!inst) return NULL;
-    if (properties) inst->ft->setPropertyFilter(inst, properties, keys);
+    if (!inst) {
+        return NULL;
+    }
+    if (properties) {
+        inst->ft->setPropertyFilter(inst, properties, keys);
+    }
     value.uint32 = thing->size;
     inst->ft->setProperty(inst, "Size", &value, CMPI_uint32);
     value.array = broker->eft->newArray(broker, 2, CMPI_chars, NULL);
@@ -79,7 +88,9 @@ static CMPIInstance* thingInstance(Path like, const Thing* thing, Text* properti
 static void takeSize(Thing* thing, const CMPIInstance* inst) {
     CMPIStatus rc;
     CMPIData size = inst->ft->getProperty(inst, "Size", &rc);
-    if (rc.rc == CMPI_RC_OK && !(size.state & CMPI_nullValue)) thing->size = size.value.uint32;
+    if (rc.rc == CMPI_RC_OK && !(size.state & CMPI_nullValue)) {
+        thing->size = size.value.uint32;
+    }
 }
 
 /* -- instances -- */
@@ -92,10 +103,11 @@ static CMPIStatus enumerate(Result result, Path path, int names, Text* propertie
     printf("fixture: a line for standard output\n");
     pthread_mutex_lock(&storeMutex);
     for (int i = 0; i < thingCount; ++i) {
-        if (names)
+        if (names) {
             result->ft->returnObjectPath(result, thingPath(path, &things[i]));
-        else
+        } else {
             result->ft->returnInstance(result, thingInstance(path, &things[i], properties));
+        }
     }
     pthread_mutex_unlock(&storeMutex);
     return done(result);
@@ -113,7 +125,9 @@ static CMPIStatus FixtureGetInstance(CMPIInstanceMI* mi, Context ctx, Result res
     int at;
     pthread_mutex_lock(&storeMutex);
     at = findThing(keyOf(path));
-    if (at >= 0) result->ft->returnInstance(result, thingInstance(path, &things[at], properties));
+    if (at >= 0) {
+        result->ft->returnInstance(result, thingInstance(path, &things[at], properties));
+    }
     pthread_mutex_unlock(&storeMutex);
     return at < 0 ? status(CMPI_RC_ERR_NOT_FOUND, "no such thing") : done(result);
 }
@@ -129,7 +143,9 @@ static CMPIStatus FixtureCreateInstance(CMPIInstanceMI* mi, Context ctx, Result 
         takeSize(thing, inst);
     }
     pthread_mutex_unlock(&storeMutex);
-    if (!fits) return status(CMPI_RC_ERR_ALREADY_EXISTS, "such a thing is there");
+    if (!fits) {
+        return status(CMPI_RC_ERR_ALREADY_EXISTS, "such a thing is there");
+    }
     result->ft->returnObjectPath(result, path);
     return done(result);
 }
@@ -137,8 +153,12 @@ static CMPIStatus change(Path path, const CMPIInstance* inst, int delete) {
     int at;
     pthread_mutex_lock(&storeMutex);
     at = findThing(keyOf(path));
-    if (at >= 0 && delete) things[at] = things[--thingCount];
-    if (at >= 0 && !delete) takeSize(&things[at], inst);
+    if (at >= 0 && delete) {
+        things[at] = things[--thingCount];
+    }
+    if (at >= 0 && !delete) {
+        takeSize(&things[at], inst);
+    }
     pthread_mutex_unlock(&storeMutex);
     return at < 0 ? status(CMPI_RC_ERR_NOT_FOUND, "no such thing") : status(CMPI_RC_OK, NULL);
 }
@@ -171,18 +191,27 @@ static CMPIStatus related(Context ctx, Result result, Path from, Text role, int 
                           Text* properties) {
     CMPIStatus rc;
     CMPIEnumeration* all;
-    if (role && strcmp(role, "Dependent") == 0) return status(CMPI_RC_OK, NULL);
+    if (role && strcmp(role, "Dependent") == 0) {
+        return status(CMPI_RC_OK, NULL);
+    }
     all = broker->bft->enumerateInstances(broker, ctx, newPath(from, "Fix_Thing"), properties, &rc);
-    if (!all) return rc;
+    if (!all) {
+        return rc;
+    }
     while (all->ft->hasNext(all, NULL)) {
         CMPIInstance* inst = all->ft->getNext(all, NULL).value.inst;
         CMPIObjectPath* path = inst->ft->getObjectPath(inst, NULL);
-        if (strcmp(keyOf(path), keyOf(from)) == 0) continue;
-        if (what & Links) inst = linkInstance(from, path);
-        if (what & Paths)
+        if (strcmp(keyOf(path), keyOf(from)) == 0) {
+            continue;
+        }
+        if (what & Links) {
+            inst = linkInstance(from, path);
+        }
+        if (what & Paths) {
             result->ft->returnObjectPath(result, inst->ft->getObjectPath(inst, NULL));
-        else
+        } else {
             result->ft->returnInstance(result, inst);
+        }
     }
     return done(result);
 }
@@ -237,7 +266,9 @@ static CMPIStatus FixtureInvokeMethod(CMPIMethodMI* mi, Context ctx, Result resu
         value.uint32 = data.value.uint32;
     } else if (strcmp(method, "Fire") == 0) {
         CMPIStatus rc = fire(ctx, path, in);
-        if (rc.rc != CMPI_RC_OK) return rc;
+        if (rc.rc != CMPI_RC_OK) {
+            return rc;
+        }
     } else if (strcmp(method, "Keep") == 0) { /* a clone that nobody releases */
         path->ft->clone(path, NULL);
     } else {
@@ -259,8 +290,12 @@ static CMPIStatus FixtureGetProperty(CMPIPropertyMI* mi, Context ctx, Result res
                                      Text name) {
     const int at = findThing(keyOf(path));
     CMPIValue value;
-    if (strcmp(name, "Size") != 0) return status(CMPI_RC_ERR_NO_SUCH_PROPERTY, name);
-    if (at < 0) return status(CMPI_RC_ERR_NOT_FOUND, "no such thing");
+    if (strcmp(name, "Size") != 0) {
+        return status(CMPI_RC_ERR_NO_SUCH_PROPERTY, name);
+    }
+    if (at < 0) {
+        return status(CMPI_RC_ERR_NOT_FOUND, "no such thing");
+    }
     value.uint32 = things[at].size;
     result->ft->returnData(result, &value, CMPI_uint32);
     return done(result);
@@ -326,7 +361,9 @@ CMInstanceMIStub(Fixture, Fixture, broker, CMNoHook)
 CMPI_EXTERN_C CMPIInstanceMI* _Generic_Create_InstanceMI(const CMPIBroker* mb, Context ctx,
                                                          Text name, CMPIStatus* rc) {
     static CMPIInstanceMI stayer;
-    if (strcmp(name, "Stayer") != 0) return NULL;
+    if (strcmp(name, "Stayer") != 0) {
+        return NULL;
+    }
     stayer = *Fixture_Create_InstanceMI(mb, ctx, rc);
     stayer.hdl = &stayer;
     return &stayer;

@@ -26,12 +26,16 @@ protected:
     std::string greet(const std::string& bundle, const std::string& language, bool local = false) {
         Request request;
         request.language = language;
-        if (local) request.context.set("UseProcessLocale", true);
+        if (local) {
+            request.context.set("UseProcessLocale", true);
+        }
         const RequestScope scope(m_server, request);
         CMPIBroker* mb = m_server.broker();
         CMPIMsgFileHandle handle = nullptr;
         const CMPIStatus opened = CMOpenMessageFile(mb, bundle.c_str(), &handle);
-        if (opened.rc != CMPI_RC_OK) return statusName(opened.rc);
+        if (opened.rc != CMPI_RC_OK) {
+            return statusName(opened.rc);
+        }
         CMPIStatus rc{CMPI_RC_OK, nullptr};
         CMPIString* text = mb->eft->getMessage2(mb, "Greet", handle, "default $0", &rc, 2,
                                                 CMPI_chars, "Eve", CMPI_sint32, -3);
@@ -62,8 +66,9 @@ TEST_F(Messages, BundlesAreFoundByLanguage) {
         {"other", "de", "CIM_ERR_NOT_FOUND"},
         {"broken", "de", "CIM_ERR_NOT_FOUND"},
     };
-    for (const auto& [bundle, language, expected] : rows)
+    for (const auto& [bundle, language, expected] : rows) {
         EXPECT_EQ(greet(bundle, language), expected) << bundle << language;
+    }
     setenv("LC_ALL", "de_AT.UTF-8", 1);
     EXPECT_EQ(greet("", "fr", true), "Servus Eve");
     unsetenv("LC_ALL");
@@ -75,7 +80,9 @@ TEST_F(Messages, TextsTakeInserts) {
                                                         {"$2 {2} $ {x} {0", "$2 {2} $ {x} {0"},
                                                         {"{0}{0}", "aa"},
                                                         {"", ""}};
-    for (const auto& [text, expected] : rows) EXPECT_EQ(withInserts(text, {"a", "b"}), expected);
+    for (const auto& [text, expected] : rows) {
+        EXPECT_EQ(withInserts(text, {"a", "b"}), expected);
+    }
     EXPECT_EQ(withInserts("$0", {"$1", "x"}), "$1");  // an insert is not looked at again
 
     const RequestScope scope(m_server);

@@ -29,7 +29,9 @@ Repository loadFiles(Files files) {
     files["q.mof"] = kQualifiers;
     return ClassRepository::load("dir/main.mof", [&](const std::string& path) {
         auto found = files.find(path);
-        if (found == files.end()) throw std::runtime_error("no such file");
+        if (found == files.end()) {
+            throw std::runtime_error("no such file");
+        }
         return found->second;
     });
 }
@@ -47,7 +49,9 @@ std::string faultsOf(const Files& files) {
 
 std::string names(const std::vector<const CimClass*>& classes) {
     std::string all;
-    for (const CimClass* cls : classes) all += cls->name + " ";
+    for (const CimClass* cls : classes) {
+        all += cls->name + " ";
+    }
     return all;
 }
 
@@ -145,8 +149,9 @@ TEST(Mof, TellsPlaceAndReasonOfWhatItRejects) {
         {"[Abstract, ABSTRACT] class A {};", "1:12: qualifier 'ABSTRACT' is given twice"},
         {"Qualifier key : boolean, Scope(any);", "1:11: qualifier 'key' is declared already"},
     };
-    for (const auto& [text, fault] : rows)
+    for (const auto& [text, fault] : rows) {
         EXPECT_EQ("dir/t.mof:" + fault, faultsOf({{"dir/t.mof", text}})) << text;
+    }
 }
 
 TEST(Mof, ReportsFaultsOfMeaningTogetherUpToALimit) {
@@ -155,7 +160,9 @@ TEST(Mof, ReportsFaultsOfMeaningTogetherUpToALimit) {
         "dir/t.mof:1:11: superclass 'None' of 'A' is not declared\n"
         "dir/t.mof:3:21: 300 is out of the range of uint8",
         faultsOf({{"dir/t.mof", text}}));
-    for (int i = 0; i < 100; ++i) text += "class C {};";
+    for (int i = 0; i < 100; ++i) {
+        text += "class C {};";
+    }
     std::string faults = faultsOf({{"dir/t.mof", text}});
     EXPECT_EQ(49, std::count(faults.begin(), faults.end(), '\n'));
 }
@@ -270,7 +277,9 @@ TEST(ClassRepository, AnswersForMethods) {
 TEST(ClassRepository, PrintsWhatItReadsAgain) {
     const auto printAll = [](const Repository& classes) {
         std::string all;
-        for (const auto& cls : classes->classes()) all += classes->toMof(*cls);
+        for (const auto& cls : classes->classes()) {
+            all += classes->toMof(*cls);
+        }
         return all;
     };
     const Repository classes = load(kFamily);
@@ -297,25 +306,32 @@ TEST(Mof, IncludesFiles) {
               faultsOf({{"dir/t.mof", "#pragma include (\"b.mof\")"},
                         {"dir/b.mof", "\n#pragma include (\"t.mof\")"}}));
     Files deep = {{"dir/t.mof", "#pragma include (\"0\")"}};
-    for (int i = 0; i < 20; ++i)
+    for (int i = 0; i < 20; ++i) {
         deep["dir/" + std::to_string(i)] = "#pragma include (\"" + std::to_string(i + 1) + "\")";
+    }
     EXPECT_EQ("dir/13:1:18: cannot read 'dir/14': files are included too deep", faultsOf(deep));
 
-    for (const char* path : {"/nowhere.mof", "/dev/zero", "/"})
+    for (const char* path : {"/nowhere.mof", "/dev/zero", "/"}) {
         EXPECT_THROW(ClassRepository::load(path), MofError) << path;
+    }
 }
 
 TEST(Mof, BoundsWhatSmallTextsCanStandFor) {
     std::string chain = "class C0 {};";
-    for (int i = 1; i < 100; ++i)
+    for (int i = 1; i < 100; ++i) {
         chain += "class C" + std::to_string(i) + " : C" + std::to_string(i - 1) + " {};";
+    }
     EXPECT_NE(std::string::npos,
               faultsOf({{"dir/t.mof", chain}}).find("'C64' has more than 63 classes above it"));
 
     std::string wide = "class C {";
-    for (int i = 0; i < 3000; ++i) wide += "uint8 p" + std::to_string(i) + ";";
+    for (int i = 0; i < 3000; ++i) {
+        wide += "uint8 p" + std::to_string(i) + ";";
+    }
     wide += "};";
-    for (int i = 0; i < 1000; ++i) wide += "class C" + std::to_string(i) + " : C {};";
+    for (int i = 0; i < 1000; ++i) {
+        wide += "class C" + std::to_string(i) + " : C {};";
+    }
     EXPECT_NE(std::string::npos,
               faultsOf({{"dir/t.mof", wide}}).find("the classes have too many features"));
 }
@@ -334,7 +350,7 @@ TEST(Schema, HoldsTheClassesOfTheAppliance) {
         EXPECT_EQ("CIM_ConcreteJob", change->parameters[1].referenceClass);
         EXPECT_FALSE(change->parameters[1].flag("In", true));
     }
-    for (const auto& cls : classes->classes())
+    for (const auto& cls : classes->classes()) {
         for (const auto& property : cls->properties) {
             const CimQualifier* map = property->qualifiers.find("ValueMap");
             const CimQualifier* values = property->qualifiers.find("Values");
@@ -343,6 +359,7 @@ TEST(Schema, HoldsTheClassesOfTheAppliance) {
                         map->value.elements().size() == values->value.elements().size())
                 << property->name;
         }
+    }
 }
 
 }  // namespace

@@ -41,8 +41,9 @@ TEST_P(Objects, ValuesOfAllTypesComeBack) {
              Value::array(CMPI_instance, {part(), part()}),
              Value::array(CMPI_dateTime, {DateTime()}),
              Value::array(CMPI_ref, {ObjectPath("n", "C")}), Value::null(CMPI_uint32),
-             Value::null(CMPI_stringA), Value::null(CMPI_instance)))
+             Value::null(CMPI_stringA), Value::null(CMPI_instance))) {
         all.set("v" + std::to_string(all.size()), value);
+    }
     CMPIArgs* from = m_scope->wrap(all);
     CMPIArgs* to = CMNewArgs(m_mb, nullptr);
     CMPIInstance* inst = m_scope->wrap(Instance({"test/x", "Any"}));
@@ -149,8 +150,9 @@ TEST_P(Objects, PathsAndInstances) {
     EXPECT_EQ(CMGetKeyCount(CMGetObjectPath(keyless, nullptr), nullptr), lean() ? 0U : 1U);
     CMRelease(keyless);
     CMSetPropertyFilter(inst, wanted, keys);
-    for (const char* name : {"Kept", "Dropped"})
+    for (const char* name : {"Kept", "Dropped"}) {
         EXPECT_EQ(CMSetProperty(inst, name, "v", CMPI_chars).rc, CMPI_RC_OK);
+    }
     EXPECT_EQ(RequestScope::read(inst).properties, NamedValues({{"Name", "b"}, {"Kept", "v"}}));
     EXPECT_EQ(textOf(CDToString(m_mb, CMGetObjectPath(inst, nullptr), nullptr)),
               "//h/test/x:Thing.Name=\"b\"");
@@ -246,7 +248,9 @@ TEST_P(Objects, ManyPropertiesAndDeepOnes) {
     for (m_rc.rc = CMPI_RC_OK; m_rc.rc == CMPI_RC_OK && depth < 100000; ++depth) {
         CMPIInstance* outer = m_scope->wrap(Instance({"n", "C"}));
         value.array = array;
-        if (depth > 0) CMSetProperty(outer, "Parts", &value, CMPI_instanceA);
+        if (depth > 0) {
+            CMSetProperty(outer, "Parts", &value, CMPI_instanceA);
+        }
         value.inst = outer;
         array = CMNewArray(m_mb, 1, CMPI_instance, nullptr);
         m_rc = CMSetArrayElementAt(array, 0, &value, CMPI_instance);
@@ -311,7 +315,9 @@ TEST_P(Objects, ContextsTellTheRequest) {
     EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_NO_SUCH_PROPERTY);
     CMPIContext* clone = ctx->ft->clone(ctx, &m_rc);
     EXPECT_EQ(m_rc.rc, lean() ? CMPI_RC_ERR_NOT_SUPPORTED : CMPI_RC_OK);
-    if (clone) CMRelease(clone);
+    if (clone) {
+        CMRelease(clone);
+    }
 }
 
 // Null entries of a table behind its version, "" for a complete one.
@@ -321,7 +327,9 @@ std::string nullEntries(const T& table, std::size_t header) {
     for (std::size_t at = header; at < sizeof table; at += sizeof(void*)) {
         void* entry = nullptr;
         std::memcpy(&entry, reinterpret_cast<const char*>(&table) + at, sizeof entry);
-        if (!entry) nulls += std::to_string(at / sizeof(void*)) + " ";
+        if (!entry) {
+            nulls += std::to_string(at / sizeof(void*)) + " ";
+        }
     }
     return nulls;
 }
@@ -440,13 +448,17 @@ TEST_F(FullObjects, QueriesSelect) {
         const std::string text = std::string("SELECT * FROM Fix_Event ") + where;
         CMPISelectExp* query = CMNewSelectExp(m_mb, text.c_str(), "WQL", nullptr, &m_rc);
         EXPECT_EQ(m_rc.rc, expected < 0 ? CMPI_RC_ERR_INVALID_QUERY : CMPI_RC_OK) << text;
-        if (!query) continue;
+        if (!query) {
+            continue;
+        }
         EXPECT_EQ(CMEvaluateSelExp(query, m_scope.wrap(event), nullptr), expected) << text;
     }
     CMNewSelectExp(m_mb, "SELECT * FROM X", "SQL", nullptr, &m_rc);
     EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_QUERY_LANGUAGE_NOT_SUPPORTED);
     std::string wide = "SELECT * FROM X WHERE a=1";
-    for (int i = 0; i < 20; ++i) wide += " AND (b=1 OR c=2)";
+    for (int i = 0; i < 20; ++i) {
+        wide += " AND (b=1 OR c=2)";
+    }
     CMPISelectExp* query = CMNewSelectExp(m_mb, wide.c_str(), "WQL", nullptr, &m_rc);
     EXPECT_EQ(CMGetDoc(query, &m_rc), nullptr);
     EXPECT_EQ(m_rc.rc, CMPI_RC_ERR_FAILED);
@@ -503,7 +515,9 @@ TEST_F(FullObjects, MemoryAndThreadsOfProviders) {
             return parm;
         },
         &shared, 0);
-    while (!shared.ready) xft->condWait(shared.condition, shared.mutex);
+    while (!shared.ready) {
+        xft->condWait(shared.condition, shared.mutex);
+    }
     xft->unlockMutex(shared.mutex);
     void* answer = nullptr;
     EXPECT_EQ(xft->joinThread(thread, &answer), 0);

@@ -35,8 +35,9 @@ TEST(PathText, PathsRoundTrip) {
 TEST(PathText, MistakesAreFound) {
     for (const char* text : {"", ":C", "//host", "///C", "n:", "C.", "C.a", "C.a=", "C.a=\"x",
                              "C.=1", "C.a=1,", "C.a=x", "C.a=1,A=2", "C.a=\"x\"b", "C.a=\"\\q\"",
-                             "C.a=\"\\x12\"", "C\"", "C.a=99999999999999999999x", "C.a='ab'"})
+                             "C.a=\"\\x12\"", "C\"", "C.a=99999999999999999999x", "C.a='ab'"}) {
         EXPECT_THROW(parsePath(text), Failure) << text;
+    }
 }
 
 TEST(PathText, KeysAreTypedByTheClass) {
@@ -74,10 +75,11 @@ TEST(PathText, ValuesAreReadByType) {
         {"{1}2", CMPI_uint16A, {}},
     };
     for (const auto& [text, type, expected] : rows) {
-        if (expected.isNull())
+        if (expected.isNull()) {
             EXPECT_THROW(parseValue(text, type), Failure) << text;
-        else
+        } else {
             EXPECT_EQ(parseValue(text, type), expected) << text;
+        }
     }
     EXPECT_EQ(guessValue("-7"), Value(std::int64_t{-7}));
     EXPECT_EQ(guessValue("\"7\""), Value("7"));
@@ -103,8 +105,9 @@ TEST(PathText, InstancesReadBackAsTheirClassSays) {
     const char* const two = "{Fix_Thing{Size=1;}, instance of Fix_Base { Name = \"x\"; }}";
     EXPECT_EQ(parseValue(two, CMPI_instanceA, &classes).elements().size(), 2U);
     for (const char* bad : {"Fix_Thing{Size=-1;}", "Fix_Thing{Sise=1;}", "Fix_Thing{Size=1;", "{}",
-                            "Fix_Thing{Size=1;}x", "Fix_Thing{Size 1;}"})
+                            "Fix_Thing{Size=1;}x", "Fix_Thing{Size 1;}"}) {
         EXPECT_THROW(parseValue(bad, CMPI_instance, &classes), Failure) << bad;
+    }
     std::string deep, wide = "A{";
     for (int i = 0; i < 100; ++i) {
         deep += "A{p=instance of ";
@@ -115,8 +118,9 @@ TEST(PathText, InstancesReadBackAsTheirClassSays) {
 }
 
 TEST(PathText, RealsKeepTheirValue) {
-    for (const double value : {0.0, 1e-310, 0.1, 1.0 / 3, 1e-300, 123456789.0, -2.5e10})
+    for (const double value : {0.0, 1e-310, 0.1, 1.0 / 3, 1e-300, 123456789.0, -2.5e10}) {
         EXPECT_EQ(parseValue(printValue(value), CMPI_real64), Value(value));
+    }
     EXPECT_EQ(printValue(0.1F), "0.1");
 }
 

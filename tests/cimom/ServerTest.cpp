@@ -174,7 +174,9 @@ TEST_P(Operations, IndicationsReachWhoAskedForThem) {
     EXPECT_EQ(m_server.unsubscribe(m_request, first).rc, CMPI_RC_OK);
     if (!lean()) {
         std::string steps;
-        for (const LogLine& line : log.lines()) steps += line.text + "; ";
+        for (const LogLine& line : log.lines()) {
+            steps += line.text + "; ";
+        }
         EXPECT_EQ(steps,
                   "activate Fix_Event edge; enable  edge; activate Fix_Event inner; "
                   "deactivate Fix_Event inner; deactivate Fix_Event edge; disable  edge; ");
@@ -218,8 +220,9 @@ TEST_P(Operations, RequestsRunAtOnce) {
             const Reply context = m_server.invokeMethod(request, thing("one"), "Context");
             fire(1, request);
             if (found.instances.size() != 1 ||
-                *context.out.find(CMPIPrincipal) != Value(*request.user))
+                *context.out.find(CMPIPrincipal) != Value(*request.user)) {
                 ++failures;
+            }
         }
     });
     EXPECT_EQ(failures, 0);
@@ -289,7 +292,9 @@ Probe probe;
 const CMPIStatus kDone{CMPI_RC_OK, nullptr};
 
 CMPIStatus returnLink(const CMPIResult* result) {
-    if (!probe.returns) return kDone;
+    if (!probe.returns) {
+        return kDone;
+    }
     CMPIValue thing{};
     thing.ref = CMNewObjectPath(probe.broker, probe.thingNameSpace, "Fix_Thing", nullptr);
     CMPIObjectPath* link = CMNewObjectPath(probe.broker, probe.nameSpace, "Fix_Link", nullptr);
@@ -309,8 +314,12 @@ CMPIInstanceMI* probeInstances(const CMPIBroker* mb, const CMPIContext*, CMPISta
     table.modifyInstance = [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
                               const CMPIObjectPath*, const CMPIInstance* inst, const char** names) {
         probe.given = RequestScope::read(inst).properties;
-        if (!names) probe.heard += "all";
-        for (; names && *names; ++names) probe.heard += *names;
+        if (!names) {
+            probe.heard += "all";
+        }
+        for (; names && *names; ++names) {
+            probe.heard += *names;
+        }
         probe.meanwhile();
         return kDone;
     };

@@ -20,8 +20,9 @@ namespace {
 CMPIData arrived;
 CMPIStatus take(const CMPIArgs*, const char*, const CMPIValue* value, CMPIType type) {
     arrived = {type, CMPIValueState(value ? CMPI_goodValue : CMPI_nullValue), {}};
-    if (value && type == CMPI_chars)
+    if (value && type == CMPI_chars) {
         arrived.value.chars = const_cast<char*>(reinterpret_cast<const char*>(value));
+    }
     return {CMPI_RC_OK, nullptr};
 }
 
@@ -30,7 +31,9 @@ CMPIrc outcome;
 template <class... Args>
 void report(Args&... args) {
     CMPIStatus* const rc = std::get<sizeof...(Args) - 1>(std::tie(args...));
-    if (rc) rc->rc = outcome;
+    if (rc) {
+        rc->rc = outcome;
+    }
 }
 /// Has a search find nothing, and leave garbage as careless servers do.
 template <class... Args>
@@ -67,7 +70,9 @@ CMPIrc codeOf(Call call, std::string* text = nullptr) {
     try {
         call();
     } catch (const CmpiStatus& status) {
-        if (text) *text = status.msg();
+        if (text) {
+            *text = status.msg();
+        }
         return status.rc();
     }
     return CMPI_RC_OK;
@@ -156,9 +161,10 @@ TEST_F(BindingTest, ValuesArriveAsTheTablesWantThem) {
     EXPECT_EQ(arrived.value.chars, text);
     EXPECT_STREQ(string.charPtr(), text);
 
-    for (const CMPIType bad : {CMPIType(CMPI_null), CMPIType(77)})
+    for (const CMPIType bad : {CMPIType(CMPI_null), CMPIType(77)}) {
         EXPECT_EQ(codeOf([&] { args.setArg("Arg", Raw(bad, CMPI_goodValue)); }),
                   CMPI_RC_ERR_INVALID_DATA_TYPE);
+    }
     CmpiObjectPath path("root", "C");
     EXPECT_EQ(codeOf([&] { path.setKey("K", CmpiString()); }), CMPI_RC_ERR_INVALID_PARAMETER);
     EXPECT_EQ(codeOf([&] { path.setKey(nullptr, "x"); }), CMPI_RC_ERR_INVALID_PARAMETER);
@@ -223,8 +229,9 @@ TEST_F(BindingTest, MissingValuesAreNullAndNotFound) {
     };
     for (const CMPIrc rc : {CMPI_RC_ERR_NO_SUCH_PROPERTY, CMPI_RC_ERR_NOT_FOUND}) {
         outcome = rc;
-        for (const auto& lookup : kLookups)
+        for (const auto& lookup : kLookups) {
             EXPECT_TRUE(lookup().isNullValue() && lookup().isNotFound());
+        }
     }
     EXPECT_EQ(codeOf([&] { path.getKey("X"); }), CMPI_RC_ERR_NOT_FOUND);
     EXPECT_EQ(codeOf([&] { path.getKey(-1); }), CMPI_RC_ERR_NOT_FOUND);
@@ -336,16 +343,20 @@ TEST_F(BindingTest, WhatTheServerLacksBecomesAStatus) {
                 ofInstances.getObjectPath);
     for (const CMPIrc rc : {CMPI_RC_OK, CMPI_RC_ERR_ACCESS_DENIED}) {
         outcome = rc;
-        for (const auto& [creates, call] : kCalls)
+        for (const auto& [creates, call] : kCalls) {
             EXPECT_TRUE(!creates || codeOf(call) == (rc == CMPI_RC_OK ? CMPI_RC_ERR_FAILED : rc));
+        }
     }
     const auto emptied = [](auto&... tables) { ((tables = {}), ...); };
     emptied(*m_mb.bft, eft, *m_scope.context()->ft, ofInstances, ofPaths, *args.getEnc()->ft,
             ofArrays);
     for (const bool tables : {true, false}) {
-        if (!tables) emptied(m_mb.bft, m_mb.eft);
-        for (const auto& c : kCalls)
+        if (!tables) {
+            emptied(m_mb.bft, m_mb.eft);
+        }
+        for (const auto& c : kCalls) {
             EXPECT_EQ(codeOf(c.second), CMPI_RC_ERR_NOT_SUPPORTED) << &c - kCalls;
+        }
     }
 }
 
@@ -360,7 +371,9 @@ TEST_F(BindingTest, NullHandlesAreRefused) {
         [] { CmpiContext(nullptr).getEntry("X"); },
         [] { CmpiDateTime(static_cast<const CMPIDateTime*>(nullptr)).isInterval(); },
     };
-    for (const auto& call : kCalls) EXPECT_EQ(codeOf(call), CMPI_RC_ERR_INVALID_HANDLE);
+    for (const auto& call : kCalls) {
+        EXPECT_EQ(codeOf(call), CMPI_RC_ERR_INVALID_HANDLE);
+    }
 }
 
 TEST(WithoutBroker, NothingIsMade) {

@@ -120,7 +120,9 @@ struct ProviderTest : testing::Test {
     ProviderTest() { script = &m_script; }
     ~ProviderTest() override {
         m_script.cleanup = succeed;
-        for (int i = 0; i < 5 && m_script.alive; ++i) cleanup(true);
+        for (int i = 0; i < 5 && m_script.alive; ++i) {
+            cleanup(true);
+        }
         EXPECT_EQ(m_script.alive, 0);
     }
 
@@ -323,7 +325,9 @@ TEST_F(ProviderTest, WhenAProviderMayStay) {
         m_script.cleanup = succeed;
         m_script.unloadable = 1;
         // What stayed still has its one use: one more cleanup ends it.
-        if (c.alive) cleanup(false);
+        if (c.alive) {
+            cleanup(false);
+        }
         EXPECT_EQ(m_script.alive, 0);
     }
 }

@@ -53,12 +53,15 @@ public:
         const std::string sharing =
             one(dedicated ? Words{"keep_idle_procs", "share_idle_procs"} : Words{"cap", "uncap"});
         add(New::ATTR_SHARING_MODE, Profile::ATTR_SHARING_MODE, sharing);
-        if (sharing == "uncap")
+        if (sharing == "uncap") {
             add(New::ATTR_UNCAP_WEIGHT, Profile::ATTR_UNCAP_WEIGHT, number(below(256)));
+        }
         add(New::ATTR_MIN_PROCS, Profile::ATTR_MIN_PROCS, "1");
         add(New::ATTR_DESIRED_PROCS, Profile::ATTR_DESIRED_PROCS, number(procs));
         add(New::ATTR_MAX_PROCS, Profile::ATTR_MAX_PROCS, number(procs + below(4)));
-        if (!dedicated) addUnits(procs);
+        if (!dedicated) {
+            addUnits(procs);
+        }
         addAdapters();
         return std::move(m_asked);
     }
@@ -97,8 +100,9 @@ private:
                                             : start + "//0/" + flag() + "/default";
             ethernet += (ethernet.empty() ? "" : ",") + element;
         }
-        for (int slot = 10; slot < 10 + below(3); ++slot)
+        for (int slot = 10; slot < 10 + below(3); ++slot) {
             scsi += (scsi.empty() ? "" : ",") + number(slot) + "/server/any//any/" + flag();
+        }
         add(New::ATTR_VIRTUAL_ETH_ADAPTERS, Profile::ATTR_VIRTUAL_ETH_ADAPTERS,
             ethernet.empty() ? "none" : ethernet);
         add(New::ATTR_VIRTUAL_SCSI_ADAPTERS, Profile::ATTR_VIRTUAL_SCSI_ADAPTERS,
@@ -116,7 +120,9 @@ private:
 
 void expectLibraryTells(const Configuration& all, zemHostSystem& host, const zemString& id) {
     std::map<int, std::string> asked;
-    for (const Asked& item : all) asked[item.creation] = item.value;
+    for (const Asked& item : all) {
+        asked[item.creation] = item.value;
+    }
     zemVirtualSystem partition = host.getVirtualSystemById(id);
     EXPECT_FALSE(partition.isLive());
     zemVirtualSystemProfile profile =
@@ -141,7 +147,9 @@ void expectLibraryTells(const Configuration& all, zemHostSystem& host, const zem
         {New::ATTR_VIRTUAL_ETH_ADAPTERS, list(profile.getVirtualEthernetAdapterString())},
         {New::ATTR_VIRTUAL_SCSI_ADAPTERS, list(profile.getVirtualSCSIAdapterString())},
     };
-    for (const auto& [attribute, value] : told) EXPECT_EQ(asked[attribute], value) << attribute;
+    for (const auto& [attribute, value] : told) {
+        EXPECT_EQ(asked[attribute], value) << attribute;
+    }
     const std::string units = asked[New::ATTR_DESIRED_PROC_UNITS];
     EXPECT_EQ(
         units.empty() ? profile.getDesiredProcs() * 100L : std::lround(std::stod(units) * 100),
@@ -156,9 +164,10 @@ TEST(ConfigurationTest, ToolsAndLibraryTellWhatWasAskedFor) {
     for (unsigned i = 0; i < 50; ++i) {
         const Configuration configuration = Generator(i).make();
         zemDynamicArray<tagAttributePair> pairs;
-        for (const Asked& item : configuration)
+        for (const Asked& item : configuration) {
             pairs.addElement(new tagAttributePair{item.creation,
                                                   zemCommandCaller::itemValue(item.value.c_str())});
+        }
         try {
             ASSERT_EQ(0, host.createVirtualSystem(pairs));
             const zemString id(std::to_string(kFirstId + i).c_str());
@@ -166,8 +175,9 @@ TEST(ConfigurationTest, ToolsAndLibraryTellWhatWasAskedFor) {
             const zemRecordSetsType profiles =
                 tool.getPartitionsProfileInformation(nullptr, kHost, filter);
             ASSERT_EQ(1, profiles.size());
-            for (const Asked& item : configuration)
+            for (const Asked& item : configuration) {
                 EXPECT_EQ(item.value, std::string((*profiles[0])[item.profile])) << item.profile;
+            }
             expectLibraryTells(configuration, host, id);
         } catch (const zemException& e) {
             FAIL() << "configuration " << i << ": " << e.toString();

@@ -105,8 +105,9 @@ protected:
         refuseGuests(ctx, kGet);
         const CmpiString asked = getKeyBinding(path, "Name").getString();
         fail(asked.charPtr());
-        if (!asked.equals(kDisk) && !asked.equals("moved"))
+        if (!asked.equals(kDisk) && !asked.equals("moved")) {
             throwObjectNotFoundExc(kGet, kClass, objectPathToString(path));
+        }
         return CmpiInstance(diskPath(path));
     }
     void performEnumInstances(const CmpiContext& ctx, CmpiResult& result,
@@ -114,7 +115,9 @@ protected:
         result.returnData(CmpiInstance(diskPath(path)));
         refuseGuests(ctx, "enumerateInstances");
         const zemString user = getUserContext(ctx);
-        if (!user.isEmpty()) fail(user);
+        if (!user.isEmpty()) {
+            fail(user);
+        }
     }
     void performCreateInstance(const CmpiContext& ctx, CmpiResult&, const CmpiObjectPath&,
                                const CmpiInstance& disk) override {
@@ -129,7 +132,9 @@ protected:
     void performSetInstance(const CmpiContext& ctx, CmpiResult&, const CmpiObjectPath&,
                             const CmpiInstance& disk, const char** properties) override {
         getInstanceProperty(disk, "Size", CMPI_uint64);
-        if (!containsProperty(properties, "Host")) return;
+        if (!containsProperty(properties, "Host")) {
+            return;
+        }
         validateEmbeddedObject(ctx, getPropVal(disk, "Host").getInstance().getObjectPath(), "Host",
                                "modifyInstance");
     }
@@ -153,11 +158,16 @@ protected:
 private:
     void refuseGuests(const CmpiContext& ctx, const char* method) const {
         const zemString user = getUserContext(ctx);
-        if (user == kRefusedUser) throwUserAccessDeniedExc(method, kClass, user);
+        if (user == kRefusedUser) {
+            throwUserAccessDeniedExc(method, kClass, user);
+        }
     }
     void fail(const char* name) const {
-        for (const Failure& failure : kFailures)
-            if (strcmp(failure.name, name) == 0) failure.raise(*this);
+        for (const Failure& failure : kFailures) {
+            if (strcmp(failure.name, name) == 0) {
+                failure.raise(*this);
+            }
+        }
     }
     static CmpiObjectPath diskPath(const CmpiObjectPath& near) {
         CmpiObjectPath path = createObjectPath(near);

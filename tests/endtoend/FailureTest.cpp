@@ -164,12 +164,20 @@ const nlohmann::json& bundle() {
 Texts says(const std::string& name, const std::map<std::size_t, Texts>& given = {}) {
     const auto* const row = std::find_if(std::begin(kSentences), std::end(kSentences),
                                          [&](const Sentence& each) { return each.name == name; });
-    if (row == std::end(kSentences)) throw std::out_of_range(name);
+    if (row == std::end(kSentences)) {
+        throw std::out_of_range(name);
+    }
     std::vector<Texts> inserts;
-    for (const std::string& word : lines(row->inserts)) inserts.push_back(word);
-    for (const auto& [number, text] : given) inserts.at(number) = text;
+    for (const std::string& word : lines(row->inserts)) {
+        inserts.push_back(word);
+    }
+    for (const auto& [number, text] : given) {
+        inserts.at(number) = text;
+    }
     const std::string english = filled(row->english, inserts, false);
-    if (row->untranslated) return {english, english};
+    if (row->untranslated) {
+        return {english, english};
+    }
     const auto german = bundle().find("Error." + name);
     return german == bundle().end() ? english : Texts(english, filled(*german, inserts, true));
 }
@@ -217,12 +225,13 @@ protected:
     /// answer differently, without.
     void expectFailure(const Row& row) {
         const bool differ = row.leanStatus.code != 0;
-        if (differ && !full())
+        if (differ && !full()) {
             expectFailure(row.arguments, row.leanStatus, row.leanText.english);
-        else if (full() && !differ && !row.text.german.empty())
+        } else if (full() && !differ && !row.text.german.empty()) {
             expectGerman(row.arguments, row.status, row.text.german);
-        else if (!full() || differ)
+        } else if (!full() || differ) {
             expectFailure(row.arguments, row.status, row.text.english);
+        }
     }
 
     TestAppliance m_appliance{ZEM_PROGRAMS};
@@ -239,7 +248,9 @@ TEST_P(FailureTest, ProvidersThrowByName) {
         const std::string arguments = "gi " + disk("Name=\"" + name + "\",Slot=1");
         const Texts text = says(name);
         expectFailure(arguments, sentence.status, text.english);
-        if (full() && !text.german.empty()) expectGerman(arguments, sentence.status, text.german);
+        if (full() && !text.german.empty()) {
+            expectGerman(arguments, sentence.status, text.german);
+        }
     }
     expectFailure({"gp " + disk("Name=\"PropertiesAccessException2\",Slot=1") + " Size", kFailed,
                    says(kOnBehalf, {{0, "getProperty"}})});
@@ -252,8 +263,9 @@ TEST_P(FailureTest, MethodsThrowByName) {
     const std::string fail = "im Test_Disk Fail Failure=";
     for (const char* name :
          {"MethodNotSupported", "MethodNotFound", "UserAccessDenied", "ParameterNotFound",
-          "ObjectNotFound", "AlreadyExists", "NoSuchProperty", "OtherKind"})
+          "ObjectNotFound", "AlreadyExists", "NoSuchProperty", "OtherKind"}) {
         expectFailure({fail + name, kFailed, general(says(name))});
+    }
     expectFailure({fail + kOfAClass, kFailed, general("it \"broke\"")});
     expectFailure({fail + kOnBehalf, kFailed, general("broke")});
     expectFailure({fail + "Status", kNotFound, says("Status")});
@@ -313,9 +325,10 @@ TEST_P(FailureTest, ClassesMustBeServed) {
         {"ai " + kDisk, "associators", full() ? "Test_Link" : "Test_Disk"},
         {"rin " + kDisk, "referenceNames", full() ? "Test_Link" : "Test_Disk"},
     };
-    for (const auto& [arguments, operation, className] : rows)
+    for (const auto& [arguments, operation, className] : rows) {
         expectFailure({arguments, kNotSupported,
                        says("MethodNotSupported", {{0, operation}, {2, className}})});
+    }
     expectFailure({"im " + other + " Work", kFailed,
                    general(says("MethodNotSupported", {{0, "invokeMethod"}, {2, "Test_Other"}}))});
     // what an indication provider says of its failures does not reach the server
@@ -350,9 +363,12 @@ TEST_P(FailureTest, KeysMustBeThoseOfTheObject) {
         {"getProperty", "gp " + half + " Size"},
         {"setProperty", "sp " + half + " Size 5"},
     };
-    for (const auto& [method, arguments] : incomplete)
+    for (const auto& [method, arguments] : incomplete) {
         expectFailure({arguments, kInvalid, says("KeyNotFound", {{0, "Slot"}, {2, method}})});
-    for (const Row& row : kWrongKeys) expectFailure(row);
+    }
+    for (const Row& row : kWrongKeys) {
+        expectFailure(row);
+    }
     expectFailure("gi ORXC_Unknown.Name=1", {5, "CIM_ERR_INVALID_CLASS"}, "no class ORXC_Unknown");
 
     ScopedEnvironment none("CIMOM_SCHEMA", "");
@@ -365,7 +381,9 @@ TEST_P(FailureTest, KeysMustBeThoseOfTheObject) {
          "class "
          "above it, with the interface instance"},
     };
-    for (const Row& row : untyped) expectFailure(row);
+    for (const Row& row : untyped) {
+        expectFailure(row);
+    }
 }
 
 const std::string kCreate = "ci Test_Disk Name=sdb Slot=1 ";
@@ -461,7 +479,9 @@ const std::vector<Row> kWrongRequests = {
 };
 
 TEST_P(FailureTest, PropertiesArgumentsAndReferencesMustBeRight) {
-    for (const Row& row : kWrongRequests) expectFailure(row);
+    for (const Row& row : kWrongRequests) {
+        expectFailure(row);
+    }
 }
 
 TEST_P(FailureTest, UsersMayBeRefused) {
@@ -470,9 +490,10 @@ TEST_P(FailureTest, UsersMayBeRefused) {
         {"getInstance", "gp " + kDisk + " Size"},
         {"createInstance", "ci Test_Disk Name=sdb Slot=1"},
     };
-    for (const auto& [method, arguments] : rows)
+    for (const auto& [method, arguments] : rows) {
         expectFailure({"--user guest " + arguments, kDenied,
                        says("UserAccessDenied", {{0, "guest"}, {1, method}})});
+    }
     EXPECT_EQ(cimom("--user kim gi " + kDisk).exit, 0);
 }
 
@@ -496,7 +517,9 @@ TEST_P(FailureTest, DisabledProvidersFindNothing) {
         {"di " + kDisk, kNotSupported, says("MethodNotSupported", {{0, "deleteInstance"}})},
         {"im Test_Disk Fail Failure=OtherKind", kFailed, general("of no kind")},
     };
-    for (const Row& row : rows) expectFailure(row);
+    for (const Row& row : rows) {
+        expectFailure(row);
+    }
 }
 
 // -- associations ---------------------------------------------------------------------------------
@@ -517,7 +540,7 @@ TEST_P(FailureTest, AssociationsOfWhatIsNotThereAreRefused) {
     const Texts missing =
         says("ObjectNotFound",
              {{0, "root/cimv2:" + kNoHost}, {1, "ORXC_CEC_CS"}, {3, "ORXC_CEC_CSProvider"}});
-    for (const auto& [name, id, access] : rows)
+    for (const auto& [name, id, access] : rows) {
         expectFailure({"ain '" + kNoHost + "' --assoc-class " + name, kInvalid,
                        says(kOnBehalf, {{0, "associatorNames"},
                                         {1, std::string(name) + "Provider"},
@@ -526,6 +549,7 @@ TEST_P(FailureTest, AssociationsOfWhatIsNotThereAreRefused) {
                                         {4, id},
                                         {5, missing},
                                         {6, access}})});
+    }
 }
 
 // -- languages ------------------------------------------------------------------------------------
@@ -582,10 +606,13 @@ TEST(FailureBundle, HasEveryKeyOfTheLibrary) {
     const std::regex key(R"re("(Error\.\w+)")re");
     for (const fs::directory_entry& file : fs::directory_iterator(ZEM_UTILITIES)) {
         const std::string source = contents(file.path());
-        for (std::sregex_iterator at(source.begin(), source.end(), key), end; at != end; ++at)
+        for (std::sregex_iterator at(source.begin(), source.end(), key), end; at != end; ++at) {
             used.insert((*at)[1]);
+        }
     }
-    for (const auto& [name, text] : bundle().items()) translated.insert(name);
+    for (const auto& [name, text] : bundle().items()) {
+        translated.insert(name);
+    }
     EXPECT_GE(used.size(), 15U);
     EXPECT_EQ(translated, used);
 }

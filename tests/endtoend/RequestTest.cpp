@@ -199,14 +199,18 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
         for (const std::string& wider :
              {std::string(), std::string(" --assoc-class ") + row.base}) {
             const std::vector<std::string> all = answers("ain " + row.source + wider);
-            for (const std::string& target : targets)
+            for (const std::string& target : targets) {
                 EXPECT_NE(std::find(all.begin(), all.end(), target), all.end())
                     << row.name << wider << ": " << target;
+            }
         }
 
         std::vector<std::string> found;
-        for (const std::string& line : answers("ai " + of))
-            if (line.rfind("// ", 0) == 0) found.push_back(line.substr(3));
+        for (const std::string& line : answers("ai " + of)) {
+            if (line.rfind("// ", 0) == 0) {
+                found.push_back(line.substr(3));
+            }
+        }
         EXPECT_EQ(found, targets) << row.name;
 
         const std::string named = row.source + " --result-class " + row.name;

@@ -13,7 +13,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     cimom::RequestScope scope(fuzzServer(), request);
     const std::string locale(static_cast<const char*>(
         zemBaseProvider::getExternalLanguageName(CmpiContext(scope.context()))));
-    if (locale.empty()) return 0;
+    if (locale.empty()) {
+        return 0;
+    }
     const std::string encoding = ".UTF-8";
     const std::size_t end = locale.size() - encoding.size();
     if (locale.size() < 3 + encoding.size() || locale.substr(end) != encoding ||

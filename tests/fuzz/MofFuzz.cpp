@@ -29,16 +29,24 @@ constexpr std::size_t kQualifierCount = 8;
 
 std::shared_ptr<const ClassRepository> load(const std::string& input) {
     return ClassRepository::load("main", [&](const std::string& path) -> std::string {
-        if (path == "main") return kMain;
-        if (path == "qualifiers") return kQualifiers;
-        if (path == "input") return input;
+        if (path == "main") {
+            return kMain;
+        }
+        if (path == "qualifiers") {
+            return kQualifiers;
+        }
+        if (path == "input") {
+            return input;
+        }
         throw std::runtime_error("no such file");
     });
 }
 
 std::string print(const ClassRepository& classes) {
     std::string all;
-    for (const auto& cls : classes.classes()) all += classes.toMof(*cls);
+    for (const auto& cls : classes.classes()) {
+        all += classes.toMof(*cls);
+    }
     return all;
 }
 
@@ -53,7 +61,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     }
     const std::string printed = print(*classes);
     // Types of qualifiers are not printed, so classes that need others than ours stop here.
-    if (classes->qualifierTypes().size() != kQualifierCount) return 0;
+    if (classes->qualifierTypes().size() != kQualifierCount) {
+        return 0;
+    }
     const std::string again = print(*load(printed));
     if (printed != again) {
         std::fprintf(stderr, "first:\n%s\nagain:\n%s\n", printed.c_str(), again.c_str());

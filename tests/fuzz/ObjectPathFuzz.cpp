@@ -22,7 +22,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         }
         zemBaseProvider::objectPathToString(path);
     } catch (const zemInvalidParameterException& e) {
-        if (text != e.getExceptionString()) std::abort();
+        if (text != e.getExceptionString()) {
+            std::abort();
+        }
     } catch (const CmpiStatus&) {
         // A name that the server takes for none.
     }

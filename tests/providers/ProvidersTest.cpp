@@ -24,7 +24,9 @@ ObjectPath system(const char* className, const std::string& name) {
 
 std::string textOf(const Instance& instance, const char* property) {
     const Value* value = instance.properties.find(property);
-    if (value == nullptr || value->isNull()) return "";
+    if (value == nullptr || value->isNull()) {
+        return "";
+    }
     return value->type() == CMPI_string ? value->text() : std::to_string(value->uint());
 }
 
@@ -33,8 +35,9 @@ std::string textOf(const Instance& instance, const char* properties, char separa
     std::string record, property;
     for (std::istringstream names(properties); names >> property;) {
         std::string value = textOf(instance, property.c_str());
-        if (value.find_first_of(",\"") != std::string::npos)
+        if (value.find_first_of(",\"") != std::string::npos) {
             value = '"' + std::regex_replace(value, std::regex("\""), "\"\"") + '"';
+        }
         record += (record.empty() ? "" : std::string(1, separator)) + value;
     }
     return record;
@@ -146,16 +149,18 @@ TEST_P(ProvidersTest, OnlyWantedPropertiesAreAskedOfTheToolAndAnswered) {
     const Value* time = hosts.instances[0].properties.find("SystemTime");
     ASSERT_NE(time, nullptr);
     EXPECT_EQ(time->dateTime().text(), "20240701120000.000000+000");
-    for (const char* other : {"TypeModel", "EnabledState"})
+    for (const char* other : {"TypeModel", "EnabledState"}) {
         EXPECT_EQ(textOf(hosts.instances[0], other), "") << other;
+    }
     EXPECT_EQ(testing_support::contents(seen), "-r sys -F type_model,serial_num,state,sys_time\n");
 }
 
 TEST_P(ProvidersTest, GetOfOneObjectStartsNoSecondTool) {
     const std::string seen = (m_appliance.folder() / "seen").string();
-    for (const std::string tool : {"qyplat", "qylink"})
+    for (const std::string tool : {"qyplat", "qylink"}) {
         m_appliance.replaceTool(
             tool, "echo " + tool + " >>'" + seen + "'\nexec " ZEM_PROGRAMS "/" + tool + " \"$@\"");
+    }
     const struct {
         ObjectPath path;
         const char* tools;
@@ -175,7 +180,9 @@ TEST_P(ProvidersTest, GetOfOneObjectStartsNoSecondTool) {
 }
 
 TEST_P(ProvidersTest, ToolRunsAsTheClientAndInItsLanguage) {
-    if (geteuid() != 0) GTEST_SKIP() << "only root can become another user";
+    if (geteuid() != 0) {
+        GTEST_SKIP() << "only root can become another user";
+    }
     m_appliance.replaceTool("qyplat", "printf 'T-1,S1,%s %s\\n' \"$(id -un)\" \"$LC_ALL\"");
     m_request.user = "nobody";
     m_request.language = "fr;q=0.5,de";
@@ -190,10 +197,11 @@ TEST_P(ProvidersTest, NoKeyReachesACommandLineUnlessItHasItsForm) {
     m_appliance.replaceTool("qyplat", "echo called >'" + seen + "'");
     for (const char* name : {"1111-AAA", "*0000001", "1111-AAA*", "a*b*c",
                              "1111-AAA*1\" -r prof \"", "a b*c", "a\\*c", "", "\xC3\xA4*1"}) {
-        for (const char* className : {kHostClass, kPartitionClass})
+        for (const char* className : {kHostClass, kPartitionClass}) {
             EXPECT_EQ(m_server->getInstance(m_request, system(className, name)).rc,
                       CMPI_RC_ERR_NOT_FOUND)
                 << className << ' ' << name;
+        }
     }
     EXPECT_FALSE(std::filesystem::exists(seen));
 }

@@ -25,7 +25,9 @@ inline std::string contents(const fs::path& file) {
 inline std::vector<std::string> lines(const std::string& text) {
     std::vector<std::string> result;
     std::istringstream in(text);
-    for (std::string line; std::getline(in, line);) result.push_back(line);
+    for (std::string line; std::getline(in, line);) {
+        result.push_back(line);
+    }
     return result;
 }
 
@@ -35,14 +37,17 @@ public:
     ScopedEnvironment(const char* name, const std::string& value) : m_name(name) {
         const char* before = std::getenv(name);
         m_had = before != nullptr;
-        if (m_had) m_before = before;
+        if (m_had) {
+            m_before = before;
+        }
         setenv(name, value.c_str(), 1);
     }
     ~ScopedEnvironment() {
-        if (m_had)
+        if (m_had) {
             setenv(m_name.c_str(), m_before.c_str(), 1);
-        else
+        } else {
             unsetenv(m_name.c_str());
+        }
     }
     ScopedEnvironment(const ScopedEnvironment&) = delete;
     ScopedEnvironment& operator=(const ScopedEnvironment&) = delete;
@@ -97,7 +102,9 @@ public:
 private:
     static fs::path makeFolder() {
         std::string name = (fs::temp_directory_path() / "zemtest.XXXXXX").string();
-        if (mkdtemp(name.data()) == nullptr) throw std::runtime_error("no temporary folder");
+        if (mkdtemp(name.data()) == nullptr) {
+            throw std::runtime_error("no temporary folder");
+        }
         return name;
     }
 

@@ -89,7 +89,9 @@ inline std::unique_ptr<WorldScript> world;
 /// Has something done on another thread while the first pair is looked at.
 inline void whilePairing(const std::function<void()>& other) {
     world->valid = [other, met = false](const std::string&, const std::string&) mutable {
-        if (!std::exchange(met, true)) std::thread(other).join();
+        if (!std::exchange(met, true)) {
+            std::thread(other).join();
+        }
         return true;
     };
 }
@@ -119,20 +121,27 @@ public:
 
     CmpiStatus enumInstanceNames(const CmpiContext&, CmpiResult& result,
                                  const CmpiObjectPath& path) override {
-        for (const CmpiObjectPath& object : askWorld("names", path)) result.returnData(object);
+        for (const CmpiObjectPath& object : askWorld("names", path)) {
+            result.returnData(object);
+        }
         return CmpiStatus(CMPI_RC_OK);
     }
     CmpiStatus enumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
                              const char**) override {
-        for (const CmpiObjectPath& object : askWorld("instances", path))
+        for (const CmpiObjectPath& object : askWorld("instances", path)) {
             giveInstance(result, object);
+        }
         return CmpiStatus(CMPI_RC_OK);
     }
     CmpiStatus getInstance(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
                            const char**) override {
-        if (path.getKeyCount() == 0) return CmpiStatus(CMPI_RC_ERR_INVALID_PARAMETER, "no key");
+        if (path.getKeyCount() == 0) {
+            return CmpiStatus(CMPI_RC_ERR_INVALID_PARAMETER, "no key");
+        }
         for (const CmpiObjectPath& object : askWorld("get", path)) {
-            if (nameOf(object) != nameOf(path)) continue;
+            if (nameOf(object) != nameOf(path)) {
+                continue;
+            }
             giveInstance(result, object);
             return CmpiStatus(CMPI_RC_OK);
         }
@@ -175,9 +184,10 @@ public:
     Rows(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx), Scripted(mb, ctx, name, supported()) {
         // A row puts its namespace on the paths of its associations as it stands.
-        for (const Row& r : world->rows)
+        for (const Row& r : world->rows) {
             addAssoData(new zemAssociationData(r[0], *r[1] != '\0' ? r[1] : "root/cimv2", r[2],
                                                r[3], r[4], r[5], r[6], r[7]));
+        }
     }
     bool isValidateAssociation(const CmpiContext&, const zemAssociationData&,
                                const CmpiObjectPath& cop1, const CmpiObjectPath& cop2) override {
@@ -236,23 +246,33 @@ inline cimom::ObjectPath linkPath(const std::string& left, const std::string& ri
 /// "s1" is an object, "s1-d1" an association, "" the class of associations.
 inline cimom::ObjectPath pathOf(const std::string& text) {
     const std::size_t dash = text.find('-');
-    if (text.empty()) return {kNameSpace, "Test_Link"};
+    if (text.empty()) {
+        return {kNameSpace, "Test_Link"};
+    }
     return dash == std::string::npos ? objectPath(text)
                                      : linkPath(text.substr(0, dash), text.substr(dash + 1));
 }
 
 /// The reverse, for answers.
 inline std::string show(const cimom::NamedValues& values) {
-    if (const cimom::Value* const name = values.find("Name")) return name->text();
+    if (const cimom::Value* const name = values.find("Name")) {
+        return name->text();
+    }
     return show(values.find("Left")->reference().keys) + "-" +
            show(values.find("Right")->reference().keys);
 }
 
 inline std::string show(const cimom::Reply& reply) {
     std::string text;
-    for (const cimom::Instance& each : reply.instances) text += show(each.properties) + " ";
-    for (const cimom::ObjectPath& each : reply.paths) text += show(each.keys) + " ";
-    if (!text.empty()) text.pop_back();
+    for (const cimom::Instance& each : reply.instances) {
+        text += show(each.properties) + " ";
+    }
+    for (const cimom::ObjectPath& each : reply.paths) {
+        text += show(each.keys) + " ";
+    }
+    if (!text.empty()) {
+        text.pop_back();
+    }
     return text;
 }
 
@@ -271,8 +291,9 @@ public:
 
     /// A provider beside the one that the server calls, for calling its workers directly.
     Provider& provider() {
-        if (!m_provider)
+        if (!m_provider) {
             m_provider = std::make_unique<Provider>(CmpiBroker(server.broker()), ctx(), "Direct");
+        }
         return *m_provider;
     }
     CmpiContext ctx() const { return CmpiContext(scope.context()); }
@@ -292,11 +313,21 @@ public:
     cimom::Reply run(const std::string& operation, const std::string& object,
                      const cimom::AssociationFilter& filter = kNone) {
         const cimom::ObjectPath path = pathOf(object);
-        if (operation == "ei") return server.enumInstances({}, path);
-        if (operation == "ein") return server.enumInstanceNames({}, path);
-        if (operation == "gi") return server.getInstance({}, path);
-        if (operation == "a") return server.associators({}, path, filter);
-        if (operation == "an") return server.associatorNames({}, path, filter);
+        if (operation == "ei") {
+            return server.enumInstances({}, path);
+        }
+        if (operation == "ein") {
+            return server.enumInstanceNames({}, path);
+        }
+        if (operation == "gi") {
+            return server.getInstance({}, path);
+        }
+        if (operation == "a") {
+            return server.associators({}, path, filter);
+        }
+        if (operation == "an") {
+            return server.associatorNames({}, path, filter);
+        }
         cimom::AssociationFilter references = filter;
         references.resultClass = filter.assocClass;
         return operation == "r" ? server.references({}, path, references)

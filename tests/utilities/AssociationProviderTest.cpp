@@ -94,7 +94,9 @@ TEST(AssociationRows, AnswersAsTheRowsSay) {
         {{kSystemDevice, kSystemSystem}, {"several rows", "an", "s1", {"Test_Link", "", "Left", ""}, "d1 d2 s1 s2 b1"}},
     };
     // clang-format on
-    for (const auto& c : cases) expectAnswer<Rows>(c.second, [&] { world->rows = c.first; });
+    for (const auto& c : cases) {
+        expectAnswer<Rows>(c.second, [&] { world->rows = c.first; });
+    }
     World<Rows> w(cimom::Character::Lean);  // which hands on that no class was named
     const cimom::Reply reply = w.run("an", "s1", {"", "", "", ""});
     EXPECT_EQ(CMPI_RC_ERR_INVALID_PARAMETER, reply.rc);
@@ -157,8 +159,11 @@ TEST(AssociationRows, ReportsTheEnumerationOfNames) {
     const std::string output = testing::internal::GetCapturedStdout();
     std::string progress;
     std::istringstream lines(output);
-    for (std::string line; std::getline(lines, line);)
-        if (line.rfind("performEnumInstanceNames", 0) == 0) progress += line.substr(24) + "\n";
+    for (std::string line; std::getline(lines, line);) {
+        if (line.rfind("performEnumInstanceNames", 0) == 0) {
+            progress += line.substr(24) + "\n";
+        }
+    }
     EXPECT_EQ(
         " <-\n before BeforeGenerateAssociation\n after BeforeGenerateAssociation\n"
         ": Test_System;Test_Disk\n: objs size: 1;2\n: obj1: \n: obj2: \n: obj2: \n"

@@ -20,14 +20,27 @@ public:
         DirectResult result(w.scope.result(reply));
         const CmpiObjectPath path = w.path(pathOf(op.object));
         Provider& p = w.provider();
-        if (op.bit == 1) p.performGetInstance(w.ctx(), path, nullptr);
-        if (op.bit == 2) p.performEnumInstances(w.ctx(), result, path, nullptr);
-        if (op.bit == 4) p.performEnumInstanceNames(w.ctx(), result, path);
-        if (op.bit == 8)
+        if (op.bit == 1) {
+            p.performGetInstance(w.ctx(), path, nullptr);
+        }
+        if (op.bit == 2) {
+            p.performEnumInstances(w.ctx(), result, path, nullptr);
+        }
+        if (op.bit == 4) {
+            p.performEnumInstanceNames(w.ctx(), result, path);
+        }
+        if (op.bit == 8) {
             p.performAssociators(w.ctx(), result, path, "Test_Link", "", "", "", nullptr);
-        if (op.bit == 16) p.performAssociatorNames(w.ctx(), result, path, "Test_Link", "", "", "");
-        if (op.bit == 32) p.performReferences(w.ctx(), result, path, "Test_Link", "", nullptr);
-        if (op.bit == 64) p.performReferenceNames(w.ctx(), result, path, "Test_Link", "");
+        }
+        if (op.bit == 16) {
+            p.performAssociatorNames(w.ctx(), result, path, "Test_Link", "", "", "");
+        }
+        if (op.bit == 32) {
+            p.performReferences(w.ctx(), result, path, "Test_Link", "", nullptr);
+        }
+        if (op.bit == 64) {
+            p.performReferenceNames(w.ctx(), result, path, "Test_Link", "");
+        }
         return reply;
     }
 };
@@ -58,8 +71,12 @@ TYPED_TEST(AssociationFamily, AnswersBetweenItsClasses) {
 
 /// Kind of exception by code; 0 for codes that a navigation lets pass.
 int kindOf(int rc) {
-    if (std::set<int>{3, 4, 5, 6, 10, 12}.count(rc) != 0) return 3;
-    if (std::set<int>{13, 60, 61, 100, 200}.count(rc) != 0) return 6;
+    if (std::set<int>{3, 4, 5, 6, 10, 12}.count(rc) != 0) {
+        return 3;
+    }
+    if (std::set<int>{13, 60, 61, 100, 200}.count(rc) != 0) {
+        return 6;
+    }
     return rc == 7 ? 4 : rc == 2 ? 1 : 0;
 }
 
@@ -67,16 +84,21 @@ int kindOf(int rc) {
 TYPED_TEST(AssociationFamily, StatusBecomesException) {
     using Family = AssociationFamily<TypeParam>;
     std::vector<int> codes = {50, 51, 60, 61, 77, 100, 200};
-    for (int rc = 1; rc <= 18; ++rc) codes.push_back(rc);
+    for (int rc = 1; rc <= 18; ++rc) {
+        codes.push_back(rc);
+    }
     for (const Operation& op : kOperations) {
         for (const std::string failing : {"get:", op.bit == 8 ? "instances:" : "names:"}) {
-            if ((op.bit == 1) != (failing == "get:") && op.bit < 8) continue;
+            if ((op.bit == 1) != (failing == "get:") && op.bit < 8) {
+                continue;
+            }
             World<TypeParam> w;
             for (const int rc : codes) {
                 SCOPED_TRACE(op.letters + (" " + failing) + std::to_string(rc));
                 world->onCall = [&](const std::string& call) {
-                    if (call.compare(0, failing.size(), failing) == 0)
+                    if (call.compare(0, failing.size(), failing) == 0) {
                         throw CmpiStatus(static_cast<CMPIrc>(rc), "boom");
+                    }
                 };
                 const int kind = kindOf(rc) == 0 && op.bit < 8 ? 6 : kindOf(rc);
                 try {
@@ -143,7 +165,9 @@ TYPED_TEST(AssociationFamily, HooksThatRefuseOrThrow) {
             SCOPED_TRACE(op.letters + (" " + hook));
             World<TypeParam> w;
             const auto act = [&](const std::string& name) {
-                if (name == hook) throw zemOperationFailedException("hook failed");
+                if (name == hook) {
+                    throw zemOperationFailedException("hook failed");
+                }
                 return hook != "refuse";
             };
             world->onHook = act;
@@ -182,11 +206,15 @@ TYPED_TEST(AssociationFamily, BadInput) {
         {"no such target", "gi", "s1-d9", kNone, "", std::is_same_v<TypeParam, Pairs> ? CMPI_RC_ERR_NOT_FOUND : invalid},
     };
     // clang-format on
-    for (const RequestCase& c : cases) expectAnswer<TypeParam>(c);
+    for (const RequestCase& c : cases) {
+        expectAnswer<TypeParam>(c);
+    }
     World<TypeParam> w;
     for (const cimom::Value& bad : {cimom::Value("Test_System.Name=\"s1\""), cimom::Value()}) {
         cimom::ObjectPath path(kNameSpace, "Test_Link", {{"Right", objectPath("d1")}});
-        if (!bad.isNull()) path.keys.set("Left", bad);
+        if (!bad.isNull()) {
+            path.keys.set("Left", bad);
+        }
         const auto get = [&] { w.provider().performGetInstance(w.ctx(), w.path(path), nullptr); };
         EXPECT_EQ("3/Invalid value \"" + (bad.isNull() ? "" : bad.text()) +
                       "\" for the property Left of the class Test_Link was provided to method "
@@ -207,7 +235,9 @@ TYPED_TEST(AssociationFamily, UpcallsComeBack) {
         World<TypeParam> w;
         bool inside = false;
         world->onCall = [&](const std::string&) {
-            if (inside) return;
+            if (inside) {
+                return;
+            }
             inside = true;
             EXPECT_EQ("s1 s2 b1", show(w.run("an", "d1")));
             inside = false;
@@ -232,10 +262,11 @@ TYPED_TEST(AssociationFamily, ManyThreads) {
         const CmpiContext ctx(scope.context());
         TypeParam other(CmpiBroker(w.server.broker()), ctx, "Other");
         for (int n = 0; n < 5; ++n) {
-            if (number % 2 == 0)
+            if (number % 2 == 0) {
                 EXPECT_EQ(6U, w.run("ei", "").instances.size());
-            else
+            } else {
                 EXPECT_EQ("s1-d1 s2-d1 b1-d1", show(w.run("rn", "d1")));
+            }
             cimom::Reply reply;
             DirectResult result(scope.result(reply));
             other.performEnumInstanceNames(ctx, result, CmpiObjectPath(scope.wrap(pathOf(""))));

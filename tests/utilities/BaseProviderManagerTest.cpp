@@ -22,7 +22,9 @@ public:
     ~CountedProvider() override { --alive; }
     CmpiStatus cleanup(CmpiContext&) override {
         ++cleaned;
-        if (onCleanup) onCleanup();
+        if (onCleanup) {
+            onCleanup();
+        }
         return returnOK();
     }
     int isUnloadable() const override { return unloadable; }
@@ -107,7 +109,9 @@ TEST_F(BaseProviderManager, ReportsWhatIsLeft) {
         "zemBaseProviderManager::cleanupMI:A;count=2\n"
         "zemBaseProviderManager::cleanupMI:C;count=1\n",
         output.substr(output.find("\nzem")));
-    for (const Record* record : {&a0, &a1, &c}) record->cleanup(false);
+    for (const Record* record : {&a0, &a1, &c}) {
+        record->cleanup(false);
+    }
 }
 
 TEST_F(BaseProviderManager, KeepsProvidersThatMustStay) {
@@ -130,7 +134,9 @@ TEST_F(BaseProviderManager, AnswersNullWhenCreationFails) {
     const createMI failing[] = {
         [](const CmpiBroker&, const CmpiContext&, const char*) -> CmpiBaseMI* { return nullptr; },
         [](const CmpiBroker&, const CmpiContext&, const char*) -> CmpiBaseMI* { throw 1; }};
-    for (createMI create : failing) EXPECT_EQ(nullptr, get(0, "P", nullptr, create).mi);
+    for (createMI create : failing) {
+        EXPECT_EQ(nullptr, get(0, "P", nullptr, create).mi);
+    }
     CMPIInstanceMI foreign = {nullptr, nullptr};  // a record that is none of the manager's
     EXPECT_EQ(CMPI_RC_OK, M::cleanupInstanceMI(&foreign, scope.context(), false).rc);
     // One that has made its own name's object meanwhile: that one stays, the second goes.
@@ -140,7 +146,9 @@ TEST_F(BaseProviderManager, AnswersNullWhenCreationFails) {
         return create(mb, ctx, name);
     });
     EXPECT_EQ(1, alive);
-    for (const Record& last : {record, get(2)}) last.cleanup(true);
+    for (const Record& last : {record, get(2)}) {
+        last.cleanup(true);
+    }
 }
 
 TEST_F(BaseProviderManager, CountsExactlyInAnyOrderAndFromManyThreads) {
@@ -151,13 +159,16 @@ TEST_F(BaseProviderManager, CountsExactlyInAnyOrderAndFromManyThreads) {
         CMPIObjectPath* path = own.wrap(cimom::ObjectPath("root/cimv2", "Test_Disk"));
         for (int round = 0; round < 250; ++round) {
             std::vector<Record> records;
-            for (int kind = 0; kind < kKinds; ++kind)
+            for (int kind = 0; kind < kKinds; ++kind) {
                 records.push_back(get(kind, name.c_str(), own.context()));
+            }
             auto* mi = static_cast<CMPIInstanceMI*>(records[0].mi);
             EXPECT_EQ(CMPI_RC_ERR_NOT_SUPPORTED,
                       mi->ft->enumerateInstanceNames(mi, own.context(), nullptr, path).rc);
             std::shuffle(records.begin(), records.end(), random);
-            for (const Record& r : records) EXPECT_EQ(CMPI_RC_OK, r.cleanup(round % 2 == 0));
+            for (const Record& r : records) {
+                EXPECT_EQ(CMPI_RC_OK, r.cleanup(round % 2 == 0));
+            }
         }
     });
     EXPECT_EQ(1000, made);
@@ -264,9 +275,14 @@ TEST(OutOfMemory, EachAllocationMayFail) {
     get();
     drop();
     const long before = FailingAllocation::live();
-    for (long n = 0; during(n, get); ++n)
-        if (mi != nullptr) drop();
-    for (long n = 0; during(n, drop); ++n) get();
+    for (long n = 0; during(n, get); ++n) {
+        if (mi != nullptr) {
+            drop();
+        }
+    }
+    for (long n = 0; during(n, drop); ++n) {
+        get();
+    }
     EXPECT_EQ(before, FailingAllocation::live());
     testing::internal::GetCapturedStdout();
     EXPECT_LT(100, failures);

@@ -74,7 +74,9 @@ TEST_P(BaseProviderStatus, TurnsExceptionsIntoStatus) {
               handled(zemOperationFailedException("Tool", "run", "getLPAR", "E7", "")).text);
     // Texts from outside may be of any length; what is told ends between two characters.
     std::string text = "x";
-    for (int i = 0; i < 10000; ++i) text += "\xC3\xA4";
+    for (int i = 0; i < 10000; ++i) {
+        text += "\xC3\xA4";
+    }
     EXPECT_EQ(text.substr(0, 16383) + "...",
               handled(zemOperationFailedException(text.c_str())).text);
 }
@@ -110,7 +112,9 @@ TEST_P(BaseProviderStatus, TakesServersThatLackFunctions) {
 
 CMPIString* readMessage(const CMPIBroker*, const char* key, const CMPIMsgFileHandle, const char*,
                         CMPIStatus*, CMPICount, ...) {
-    if (*key == 'T') throw std::bad_alloc();
+    if (*key == 'T') {
+        throw std::bad_alloc();
+    }
     return nullptr;
 }
 
@@ -129,11 +133,12 @@ TEST_P(BaseProviderStatus, ClosesWhatItOpens) {
         return CMPIStatus{CMPI_RC_OK, nullptr};
     };
     h.server.broker()->eft = &table;
-    for (const auto message : {readMessage, decltype(&readMessage){nullptr}})
+    for (const auto message : {readMessage, decltype(&readMessage){nullptr}}) {
         for (const char* key : {"Throws", "Unopened", "None", "Unopened"}) {
             table.getMessage2 = message;
             EXPECT_STREQ("as is", p.retrieveLocalizedString("b", key, "as is", 0));
         }
+    }
     EXPECT_EQ(8, opened);
     EXPECT_EQ(4, closed);
 }
@@ -165,7 +170,9 @@ TEST_P(BaseProviderStatus, LogsThroughTheServer) {
     EXPECT_EQ(1, answer.traced("LOG MESSAGE: Id: text"));
     EXPECT_EQ(3, answer.traced("LOG MESSAGE: .*"));
     EXPECT_EQ(1, answer.traced("LOG ICU MESSAGE E.X: default"));
-    if (GetParam() == Character::Lean) return;  // it logs nothing
+    if (GetParam() == Character::Lean) {
+        return;  // it logs nothing
+    }
     using Kind = cimom::LogLine::Kind;
     EXPECT_TRUE(log.contains(Kind::Message, 2, "TestProvider", "text alone"));
     EXPECT_TRUE(log.contains(Kind::Message, 4, "TestProvider", "Id: default"));

@@ -84,8 +84,11 @@ const Operation kOperations[] = {
 // clang-format on
 
 Answer call(Harness& h, const std::string& name) {
-    for (const Operation& op : kOperations)
-        if (name == op.name) return op.call(h);
+    for (const Operation& op : kOperations) {
+        if (name == op.name) {
+            return op.call(h);
+        }
+    }
     throw std::out_of_range(name);
 }
 
@@ -127,7 +130,9 @@ TEST_P(BaseProvider, SucceedsInItsSteps) {
 TEST_P(BaseProvider, RefusesClassesItDoesNotServe) {
     script.instanceClass = script.methodClass = script.indicationClass = false;
     for (const Operation& op : kOperations) {
-        if (op.refusal == nullptr) continue;
+        if (op.refusal == nullptr) {
+            continue;
+        }
         SCOPED_TRACE(op.name);
         const Answer answer = op.call(h);
         // A filter's refusal names the event; its message does not reach the server.
@@ -144,8 +149,9 @@ TEST_P(BaseProvider, RefusesClassesItDoesNotServe) {
         EXPECT_FALSE(answer.reply.done);
     }
     script.instanceClass = script.associationClass = true;
-    for (const char* name : {"setInstance", "createInstance", "deleteInstance", "setProperty"})
+    for (const char* name : {"setInstance", "createInstance", "deleteInstance", "setProperty"}) {
         EXPECT_EQ(CMPI_RC_ERR_NOT_SUPPORTED, call(h, name).rc);
+    }
     script.associationClass = false;  // that of the filter counts, where it is given
     EXPECT_EQ(notSupported("references", "Test_Link"),
               h.call(h.association, &A::references, h.path(), "Test_Link", no, no).text);
@@ -155,7 +161,9 @@ TEST_P(BaseProvider, RefusesClassesItDoesNotServe) {
 TEST(BaseProviderDefaults, RefuseWhatIsNotOverridden) {
     Harness plain(Character::Full, FactoriesOf<PlainProvider>::create);
     for (const Operation& op : kOperations) {
-        if (op.unsupported == nullptr) continue;
+        if (op.unsupported == nullptr) {
+            continue;
+        }
         EXPECT_EQ(1, op.call(plain).traced("Exception: " + notSupported(op.unsupported)))
             << op.name;
     }
@@ -182,7 +190,9 @@ TEST_P(BaseProvider, AnswersFailuresByTheRuleOfTheOperation) {
             const std::string worker(op.worker), code = zemBaseProvider::cmpiRcToString(failure);
             SCOPED_TRACE(worker + " kind " + std::to_string(kind) + " " + code);
             script.actions[worker.substr(0, worker.find(' '))] = [kind = kind, rc = failure] {
-                if (kind == 0) throw CmpiStatus(rc, "it is so");
+                if (kind == 0) {
+                    throw CmpiStatus(rc, "it is so");
+                }
                 throw zemException(kind, "it is so");
             };
             const Answer answer = op.call(h);
@@ -209,7 +219,9 @@ TEST_P(BaseProvider, WantsTheEssentialKeys) {
     script.keys = {"Name", "Serial"};
     for (const Operation& op : kOperations) {
         const bool wants = op.rule == kOrdinary && op.refusal != nullptr;
-        if (op.rule == kMethod) continue;
+        if (op.rule == kMethod) {
+            continue;
+        }
         const Answer answer = op.call(h);
         EXPECT_EQ(wants ? CMPI_RC_ERR_INVALID_PARAMETER : CMPI_RC_OK, answer.rc) << op.name;
         EXPECT_EQ(wants ? "Key Serial for class Test_Disk is not provided to method " +
@@ -242,11 +254,12 @@ TEST_P(BaseProvider, ValidatesNamesAndKeys) {
     script.keys.clear();  // an instance without properties is not looked at
     EXPECT_EQ(CMPI_RC_OK, h.call(h.instance, &I::createInstance, h.classPath(), h.disk({})).rc);
     script.name = "other";
-    for (const std::string name : {"getInstance", "getProperty"})
+    for (const std::string name : {"getInstance", "getProperty"}) {
         EXPECT_EQ("A key provided for class Test_Disk to method " + name +
                       " on provider TestProvider had an unexpected value. A value of d1 was "
                       "provided for key Name instead of the expected value of other.",
                   call(h, name).text);
+    }
 }
 
 TEST_P(BaseProvider, AnswersAndSetsOneProperty) {
@@ -403,7 +416,9 @@ TEST_P(BaseProvider, TimesItsOperations) {
 TEST_P(BaseProvider, LetsACancelledThreadEnd) {
     static const char* where = nullptr;
     static const auto cancelAt = [](const char* place) {
-        if (std::strstr(place, where) == nullptr) return CMPIStatus{CMPI_RC_OK, nullptr};
+        if (std::strstr(place, where) == nullptr) {
+            return CMPIStatus{CMPI_RC_OK, nullptr};
+        }
         pthread_cancel(pthread_self());
         pthread_testcancel();
         return CMPIStatus{CMPI_RC_OK, nullptr};

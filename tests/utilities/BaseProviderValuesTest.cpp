@@ -40,8 +40,9 @@ TEST_P(BaseProviderValues, PrintsValues) {
         {Value::array(CMPI_string, {Value("a"), Value::null(CMPI_string)}), "{\"a\",}"},
         {Value::char16(65), ""},
     };
-    for (const auto& [value, expected] : rows)
+    for (const auto& [value, expected] : rows) {
         EXPECT_STREQ(expected, Z::cmpidata2String(data(value)));
+    }
     // Further properties depend on the server.
     CmpiInstance disk = Disk(h.disk());
     const std::string mof(Z::instanceToString(disk));
@@ -79,15 +80,18 @@ TEST_P(BaseProviderValues, ConvertsDateTimes) {
         {Z::convertDateTime(timeval{1000000000, 7}), "20010909014640.000007+000"},
         {Z::convertDateTime(std::numeric_limits<long>::max()), "00000000000000.000000:000"},
     };
-    for (const auto& [time, text] : rows) EXPECT_STREQ(text, Z::cmpidata2String(CmpiData(time)));
+    for (const auto& [time, text] : rows) {
+        EXPECT_STREQ(text, Z::cmpidata2String(CmpiData(time)));
+    }
     EXPECT_EQ(1000000000L, Z::convertDateTime(Z::convertDateTime(1000000000L)));
     // before and after a change to and from summer time, wherever the process thinks it is
     for (const char* zone : {"UTC", "Europe/Berlin", "America/St_Johns", "Asia/Kolkata"}) {
         setenv("TZ", zone, 1);
         tzset();
         for (const long when :
-             {1L, 1364691599L, 1364691600L, 1382835599L, 1382835600L, 4102444800L})
+             {1L, 1364691599L, 1364691600L, 1382835599L, 1382835600L, 4102444800L}) {
             EXPECT_EQ(when, Z::convertDateTime(Z::convertDateTime(when))) << zone;
+        }
         EXPECT_LE(std::abs(Z::convertDateTime(Z::getCurrentDateTime()) - time(nullptr)), 5) << zone;
     }
     unsetenv("TZ");
@@ -182,10 +186,14 @@ TEST(BaseProviderValidation, FindsRepeatedNamesInLongLists) {
     Harness h(cimom::Character::Full);
     h.className = "Test_Unknown";  // of which the server cannot tell the properties
     std::vector<std::string> names;
-    for (int i = 0; i < 20000; ++i) names.push_back("Caption" + std::to_string(i));
+    for (int i = 0; i < 20000; ++i) {
+        names.push_back("Caption" + std::to_string(i));
+    }
     names.insert(names.end(), {"CAPTION7", "caption3"});
     std::vector<const char*> list;
-    for (const std::string& name : names) list.push_back(name.c_str());
+    for (const std::string& name : names) {
+        list.push_back(name.c_str());
+    }
     list.push_back(nullptr);
     EXPECT_EQ(
         "3/Duplicate property name Caption3 for class Test_Unknown is provided to "

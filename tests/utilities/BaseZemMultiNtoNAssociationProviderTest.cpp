@@ -17,7 +17,9 @@ public:
     int getInstance(const CmpiContext&, const CmpiObjectPath& cop, const char**,
                     CmpiInstance& out) override {
         const auto& names = world->objects[cop.getClassName().charPtr()];
-        if (std::find(names.begin(), names.end(), nameOf(cop)) == names.end()) return -1;
+        if (std::find(names.begin(), names.end(), nameOf(cop)) == names.end()) {
+            return -1;
+        }
         out.setProperty("Name", CmpiData(nameOf(cop).c_str()));
         return 0;
     }
@@ -35,9 +37,10 @@ void addPairs(zemMultiNtoNAssociationDataSet& set, Side& side) {
     const auto handle = [&](const char* nameSpace) {
         return std::string(nameSpace) == "none" ? nullptr : &side;
     };
-    for (const Row& r : world->rows)
+    for (const Row& r : world->rows) {
         set.addNewAssoPair(new zemMultiNtoNAssociationPair(
             {handle(r[4]), r[2], r[3], ""}, {handle(r[7]), r[5], r[6], ""}, r[0], r[1]));
+    }
 }
 
 class Plain : public Scripted<zemBaseZemMultiNtoNAssociationProvider> {
@@ -151,11 +154,14 @@ TYPED_TEST(ProviderPairs, AnswerFromTheirHandles) {
         const auto configure = [&] {
             world->rows = c.first;
             // a pair of no class serves whatever class its provider answers for
-            if (c.first[0][0][0] == '\0') world->rows.push_back(kPortDisk);
+            if (c.first[0][0][0] == '\0') {
+                world->rows.push_back(kPortDisk);
+            }
         };
         expectAnswer<TypeParam>(c.second, configure, [] {
-            for (const char* cls : {"Test_System", "Test_Disk", "Test_Port"})
+            for (const char* cls : {"Test_System", "Test_Disk", "Test_Port"}) {
                 EXPECT_LE(world->count(std::string("names:") + cls), 1) << "asked once";
+            }
         });
     }
 }
@@ -184,7 +190,9 @@ TEST(ProviderPairsOneByOne, OrderOfCalls) {
         world->rows = {{"Test_Link", "", "Test_Disk", "Left", "", "Test_Port", "Right", ""}};
         w.run(operation, object);
         std::string made;
-        for (const std::string& call : world->calls) made += call + " ";
+        for (const std::string& call : world->calls) {
+            made += call + " ";
+        }
         EXPECT_EQ(calls, made) << operation;
     }
 }
@@ -197,7 +205,9 @@ TYPED_TEST(ProviderPairs, HooksThatThrow) {
             SCOPED_TRACE(op.letters + (" " + hook));
             World<TypeParam> w;
             const auto act = [&](const std::string& name) {
-                if (name == hook) throw zemOperationFailedException("hook failed");
+                if (name == hook) {
+                    throw zemOperationFailedException("hook failed");
+                }
                 return true;
             };
             world->onHook = act;
@@ -205,7 +215,9 @@ TYPED_TEST(ProviderPairs, HooksThatThrow) {
             const cimom::Reply reply = w.run(op.letters, op.object);
             EXPECT_EQ(hook == "after" ? CMPI_RC_OK : CMPI_RC_ERR_FAILED, reply.rc);
             EXPECT_EQ(plain && hook == "before" ? 0 : 1, world->count("after"));
-            if (!plain || hook != "before") continue;
+            if (!plain || hook != "before") {
+                continue;
+            }
             EXPECT_NE(std::string::npos,
                       reply.message.find("thrown from method zemAssociationDataPrepareUtility "
                                          "on class zemAssociationDataPrepareUtility"))

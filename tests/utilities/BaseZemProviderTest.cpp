@@ -25,7 +25,9 @@ public:
     int getInstance(const CmpiContext&, const CmpiObjectPath& cop, const char**,
                     CmpiInstance& out) override {
         zemString name;
-        if (!zemReadText(getKeyBinding(cop, "Name"), name) || !name.startsWith("d")) return -1;
+        if (!zemReadText(getKeyBinding(cop, "Name"), name) || !name.startsWith("d")) {
+            return -1;
+        }
         out.setProperty("Name", CmpiData(static_cast<const char*>(name)));
         return 0;
     }
@@ -103,7 +105,9 @@ TEST_P(BaseZemProvider, TestsPropertiesOfInstances) {
          "of \"VirtualQuantity\" were specified for class K for partition p on managed system s. "
          "Desired memory should be greater than or equal to min memory."},
     };
-    for (const auto& [call, text] : rows) EXPECT_EQ(text, failureText(call, "kt"));
+    for (const auto& [call, text] : rows) {
+        EXPECT_EQ(text, failureText(call, "kt"));
+    }
 }
 
 TEST_P(BaseZemProvider, FetchesEmbeddedObjects) {

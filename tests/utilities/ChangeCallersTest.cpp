@@ -80,8 +80,9 @@ TEST(ChangeCallersTest, Edalloc) {
         {"removeVSERIAL:", "virtualio --rsubtype serial -m h*1 -o r --id 3 -s 2 ", [&] { c.removeVSERIAL("h*1", "3", 2, p, f); }},
     };
     // clang-format on
-    for (const auto& [log, line, change] : rows)
+    for (const auto& [log, line, change] : rows) {
         check(std::string(kPrefix) + log, std::string("edalloc -r ") + line, "", change);
+    }
 }
 
 TEST(ChangeCallersTest, EdplatAndNwplat) {
@@ -103,8 +104,9 @@ TEST(ChangeCallersTest, EdplatAndNwplat) {
         {"nwplat -r lpar", R"( -i "")", [&] { create.makePartitionsInformation(pairs({}), nullptr); }},
     };
     // clang-format on
-    for (const auto& [begin, end, change] : rows)
+    for (const auto& [begin, end, change] : rows) {
         check(kPrefix, std::string(begin) + end, "", change);
+    }
 }
 
 TEST(ChangeCallersTest, ValuesReachTheToolAsTheyAre) {
@@ -159,7 +161,9 @@ void run(const Power& settings, int times = 1) {
     c.setBootMode(settings.bootMode);
     c.setLparProfileName(settings.profile);
     c.setLparId(settings.lparId);
-    for (; times > 0; --times) c.run();
+    for (; times > 0; --times) {
+        c.run();
+    }
 }
 
 void suspend(int operation) {
@@ -198,8 +202,9 @@ TEST(ChangeCallersTest, EdpowerAndEdsusp) {
 
 TEST(ChangeCallersTest, RefusalsRunNoTool) {
     ToolFolder tools;
-    for (const char* tool : {"edalloc", "edplat", "nwplat", "edpower", "edsusp"})
+    for (const char* tool : {"edalloc", "edplat", "nwplat", "edpower", "edsusp"}) {
         tools.recorder(tool);
+    }
     zemEdallocCmdCaller edalloc("", "");
     const std::string parms = "4/EdpowerCaller/validateParms//edpower ";
     const std::string atRun = "4/EdpowerCaller/run//";
@@ -264,7 +269,9 @@ TEST(ChangeCallersTest, BackgroundRunsBelongToTheCaller) {
                          .addMemory("M", zemString(i), 0, 1, &pid, &stream));
     }
     for (int i = 1; i <= kRuns; ++i) {  // all have begun and none can end
-        while (access(tools.file("started." + std::to_string(i)).c_str(), F_OK) != 0) usleep(2000);
+        while (access(tools.file("started." + std::to_string(i)).c_str(), F_OK) != 0) {
+            usleep(2000);
+        }
         EXPECT_EQ(0, waitpid(children[i].first, nullptr, WNOHANG));
     }
     EXPECT_EQ(kRuns, write(gate, std::string(kRuns, '\n').c_str(), kRuns));

@@ -33,8 +33,9 @@ constexpr const char* kNames[] = {"lpar_id", "name", "state", "mode"};
 std::string text(const zemRecordSetsType& records, const std::vector<int>& keys) {
     std::string all;
     for (int i = 0; i < records.size(); ++i) {
-        for (size_t k = 0; k < keys.size(); ++k)
+        for (size_t k = 0; k < keys.size(); ++k) {
             all += (k > 0 ? "|" : "") + std::string((*records.getElementAt(i))[keys[k]]);
+        }
         all += ';';
     }
     return all;
@@ -82,7 +83,9 @@ TEST(RecordParserTest, AsksTwiceForOneField) {
 TEST(RecordParserTest, RecordsTakeWhatTheirFieldsTake) {
     constexpr unsigned kFields = 62;
     std::string full = "\"a\"\"\"";
-    for (unsigned i = 1; i < kFields; ++i) full += ",ab";
+    for (unsigned i = 1; i < kFields; ++i) {
+        full += ",ab";
+    }
     const std::pair<std::string, long> rows[] = {
         {"", 0}, {std::string(kFields, ','), 0}, {"x", 1}, {full, kFields}};
     for (const auto& [line, texts] : rows) {
@@ -210,11 +213,12 @@ TEST(CommandCallerTest, BuildsChangesAndCreations) {
     for (const auto& row : rows) {
         std::filesystem::remove(tools.file("argv"));
         const auto run = [&row] {
-            if (row.op < 0)
+            if (row.op < 0) {
                 Caller().callMkCommand("tool -r x", pairs(row.single), kNames, 4);
-            else
+            } else {
                 Caller().callChCommand("tool -r x", pairs(row.single), pairs(row.multi), kNames, 4,
                                        static_cast<Caller::CH_OP_TYPE>(row.op), "-i");
+            }
         };
         const std::string failure = failureText(run, "kmiat");
         EXPECT_EQ(row.result, failure + tools.arguments());
@@ -240,7 +244,9 @@ TEST(CommandCallerTest, CutsTheFrontOfALine) {
 
 void* operator new(size_t size) {
     void* const memory = heap.left == 0 ? nullptr : std::malloc(size);
-    if (memory == nullptr) throw std::bad_alloc();
+    if (memory == nullptr) {
+        throw std::bad_alloc();
+    }
     heap.left -= heap.left > 0;
     heap.held += static_cast<long>(malloc_usable_size(memory));
     return memory;

@@ -26,7 +26,9 @@ public:
     CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
                                     const char**) override {
         const zemString name(getKeyBinding(path, "Name").getString().charPtr());
-        if (name == "missing") throwObjectNotFoundExc("getInstance", kClass, name);
+        if (name == "missing") {
+            throwObjectNotFoundExc("getInstance", kClass, name);
+        }
         CmpiInstance found(path);
         found.setProperty("Name", CmpiData(static_cast<const char*>(name)));
         return found;
@@ -112,7 +114,9 @@ TEST_P(Concurrency, AllOperationsOfOneProviderAtOnce) {
         wrong += mixOperations(server);
         const std::size_t before = server.liveObjects();
         onThreads(8, [&](int) {
-            for (; std::chrono::steady_clock::now() < end; ++rounds) wrong += mixOperations(server);
+            for (; std::chrono::steady_clock::now() < end; ++rounds) {
+                wrong += mixOperations(server);
+            }
         });
         stale = server.staleUses();
         alive = server.liveObjects() - before;

@@ -18,10 +18,14 @@ TEST(DynamicArrayTest, GrowsShrinksAndDeletesWhatItOwns) {
     const Item item = std::make_shared<int>(0);
     for (const int grow : {0, -3, 1, 25}) {
         zemDynamicArray<Item> items(grow);
-        for (int i = 0; i < 1000; ++i) items.addElement(new Item(item));
+        for (int i = 0; i < 1000; ++i) {
+            items.addElement(new Item(item));
+        }
         const Item* const last = items.getElementAt(999);
         EXPECT_EQ(item.use_count(), 1001);
-        while (items.size() > 2) EXPECT_EQ(items.removeElementAt(1), 0);
+        while (items.size() > 2) {
+            EXPECT_EQ(items.removeElementAt(1), 0);
+        }
         EXPECT_EQ(items.getElementAt(1), last);
         EXPECT_EQ(items.removeElementAt(2), 1);
         items.clear();
@@ -70,8 +74,12 @@ TEST(DynamicArrayTest, IndexesPastTheEndExtend) {
 
 TEST(ArrayTest, Values) {
     zemArray<zemString> texts(0);
-    for (int i = 0; i < 20; ++i) texts.append(zemString(i));
-    for (int i = 0; i < 5; ++i) texts.append(texts[0]);  // an element of the array that grows
+    for (int i = 0; i < 20; ++i) {
+        texts.append(zemString(i));
+    }
+    for (int i = 0; i < 5; ++i) {
+        texts.append(texts[0]);  // an element of the array that grows
+    }
     zemString nine("9");
     EXPECT_EQ(texts.remove(nine), 0);
     EXPECT_EQ(texts.remove(nine), 1);
@@ -93,7 +101,9 @@ TEST(HashTableTest, ReturnCodesAndTheThrownThree) {
     zemString value("before");
     EXPECT_EQ(table.lookup(1, value), 3);
     EXPECT_EQ(table.remove(1), 3);
-    for (int key = -20; key < 20; ++key) EXPECT_EQ(table.insert(key, zemString(key)), 0);
+    for (int key = -20; key < 20; ++key) {
+        EXPECT_EQ(table.insert(key, zemString(key)), 0);
+    }
     EXPECT_EQ(table.insert(9, "other"), 2);
     EXPECT_EQ(table.lookup(99, value), 3);
     EXPECT_STREQ(value, "before");

@@ -128,7 +128,9 @@ TEST_F(DNXApiCallerTest, ObjectsAreWalked) {
     Names names;
     const zemApiObjects lpars(kReader,
                               zemApiCaller().getAllLparsFromCec("", "1111-AAC*0000003", 1));
-    for (apiProp& lpar : lpars) zemReadApiFields(&lpar, names, kFields);
+    for (apiProp& lpar : lpars) {
+        zemReadApiFields(&lpar, names, kFields);
+    }
     EXPECT_EQ("xbrg; 1 linux-a; 1 my-test; 1 ", names.text);
     EXPECT_EQ(lpars.begin(), &lpars.only("any"));
 

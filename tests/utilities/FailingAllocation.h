@@ -22,14 +22,20 @@ public:
     inline static thread_local std::size_t s_most = SIZE_MAX;
 
     static void* allocate(std::size_t size) {
-        if (size > s_most || (s_left != kNone && s_left-- == 0)) throw std::bad_alloc();
+        if (size > s_most || (s_left != kNone && s_left-- == 0)) {
+            throw std::bad_alloc();
+        }
         void* const memory = std::malloc(size != 0 ? size : 1);
-        if (memory == nullptr) throw std::bad_alloc();
+        if (memory == nullptr) {
+            throw std::bad_alloc();
+        }
         ++s_live;
         return memory;
     }
     static void release(void* memory) {
-        if (memory != nullptr) --s_live;
+        if (memory != nullptr) {
+            --s_live;
+        }
         std::free(memory);
     }
 

@@ -11,7 +11,9 @@
 inline std::string fieldsOf(const zemException& e, const std::string& letters) {
     std::string all;
     for (const char letter : letters) {
-        if (!all.empty()) all += '/';
+        if (!all.empty()) {
+            all += '/';
+        }
         all += letter == 'k'   ? std::to_string(e.getExceptionType()).c_str()
                : letter == 'c' ? e.getThrowingClass()
                : letter == 'm' ? e.getThrowingMethod()

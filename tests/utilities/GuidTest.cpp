@@ -19,7 +19,9 @@ TEST(GuidTest, ReadsAndPrints) {
         {"", zero},
         {nullptr, zero},
     };
-    for (const auto& [text, printed] : rows) EXPECT_STREQ(zemGuid(text).toString(), printed);
+    for (const auto& [text, printed] : rows) {
+        EXPECT_STREQ(zemGuid(text).toString(), printed);
+    }
     EXPECT_TRUE(zemGuid(rows[0].first) == zemGuid(rows[0].second));
     EXPECT_FALSE(zemGuid(rows[0].first) == zemGuid());
     EXPECT_FALSE(zemGuid::getNewGuid() == zemGuid::getNewGuid());

@@ -67,8 +67,12 @@ TEST(ProviderStubs, OfAProviderThatAsksStubs) {
     std::promise<void> asked;
     world->onHook = [&, first = std::this_thread::get_id()](const std::string& hook) {
         const bool here = std::this_thread::get_id() == first;
-        if (!here && hook == "asked") asked.set_value();
-        if (!here || hook != "before") return true;
+        if (!here && hook == "asked") {
+            asked.set_value();
+        }
+        if (!here || hook != "before") {
+            return true;
+        }
         other = std::thread([&] {
             const cimom::RequestScope scope(w.server);
             const CmpiContext ctx(scope.context());

@@ -12,7 +12,9 @@ std::string block(const std::string& names) {
 
 std::string joined(const zemArray<zemString>& names) {
     std::string text;
-    for (int i = 0; i < names.size(); ++i) text += (i == 0 ? "" : " ") + std::string(names[i]);
+    for (int i = 0; i < names.size(); ++i) {
+        text += (i == 0 ? "" : " ") + std::string(names[i]);
+    }
     return text;
 }
 
@@ -73,8 +75,9 @@ TEST(MultiNtoNAssociation, AnswersAmongItsClasses) {
         {chain, {"classes that are in no pair", "gi", "s1-p1", kNone, "", CMPI_RC_ERR_NOT_FOUND}},
     };
     // clang-format on
-    for (const auto& c : cases)
+    for (const auto& c : cases) {
         expectAnswer<Pairs>(c.second, [&] { world->pairs = block(c.first); });
+    }
 }
 
 TEST(MultiNtoNAssociation, AsksForAClassOnceAnEnumeration) {
@@ -82,8 +85,9 @@ TEST(MultiNtoNAssociation, AsksForAClassOnceAnEnumeration) {
     world->pairs = block("Test_System Test_Disk Test_System Test_Port Test_Disk Test_Disk");
     for (int round = 1; round <= 2; ++round) {
         w.run("ein", "");
-        for (const char* call : {"names:Test_System", "names:Test_Disk", "names:Test_Port"})
+        for (const char* call : {"names:Test_System", "names:Test_Disk", "names:Test_Port"}) {
             EXPECT_EQ(round, world->count(call)) << call;
+        }
         world->objects["Test_Port"].push_back("p2");
     }
     EXPECT_EQ("s1-p2 s2-p2 b1-p2", show(w.run("rn", "p2"))) << "nothing is kept";

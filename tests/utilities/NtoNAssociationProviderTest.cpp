@@ -46,11 +46,12 @@ TEST(NtoNAssociation, AnswersBetweenItsClasses) {
         {"Test_System", "Test_System", {"the other by role", "rn", "s1", {"Test_Link", "", "Right", ""}, "s1-s1 s2-s1 b1-s1"}},
     };
     // clang-format on
-    for (const auto& c : cases)
+    for (const auto& c : cases) {
         expectAnswer<Pair>(std::get<RequestCase>(c), [&] {
             world->class1 = std::get<0>(c);
             world->class2 = std::get<1>(c);
         });
+    }
 }
 
 TEST(NtoNAssociation, RefusedReferences) {
@@ -86,14 +87,18 @@ TEST(NtoNAssociation, OrderOfCalls) {
     };
     for (const auto& [operation, object, calls] : cases) {
         World<Pair> w;
-        if (operation == "ein") world->class1 = "Test_Disk";
+        if (operation == "ein") {
+            world->class1 = "Test_Disk";
+        }
         world->valid = [](const std::string&, const std::string&) {
             world->note("pair");
             return true;
         };
         w.run(operation, object);
         std::string made;
-        for (const std::string& call : world->calls) made += call + " ";
+        for (const std::string& call : world->calls) {
+            made += call + " ";
+        }
         EXPECT_EQ(calls, made) << operation;
     }
 }

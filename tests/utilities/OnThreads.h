@@ -11,7 +11,11 @@ inline void onThreads(
     int count, const std::function<void(int)>& work,
     const std::function<void()>& meanwhile = [] {}) {
     std::vector<std::thread> threads;
-    for (int i = 0; i < count; ++i) threads.emplace_back(work, i);
+    for (int i = 0; i < count; ++i) {
+        threads.emplace_back(work, i);
+    }
     meanwhile();
-    for (std::thread& thread : threads) thread.join();
+    for (std::thread& thread : threads) {
+        thread.join();
+    }
 }

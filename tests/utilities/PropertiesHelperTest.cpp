@@ -42,7 +42,9 @@ struct ToolRun {
                                        true);
             },
             "cmkiat");
-        if (failure.empty()) return;
+        if (failure.empty()) {
+            return;
+        }
         EXPECT_EQ(0U, failure.find(kThrower));
         failure.erase(0, kThrower.size());
     }
@@ -67,8 +69,9 @@ struct Running {
 
 /// The process that a tool wrote to the file "pid"; throws if none does within ten seconds.
 pid_t waitForPid(const ToolFolder& tools) {
-    for (int i = 0; i < 10000 && tools.read("pid").find('\n') == std::string::npos; ++i)
+    for (int i = 0; i < 10000 && tools.read("pid").find('\n') == std::string::npos; ++i) {
         std::this_thread::sleep_for(1ms);
+    }
     return std::stoi(tools.read("pid"));
 }
 
@@ -91,7 +94,9 @@ TEST(CommandLineTest, SplitsLikeAShell) {
     for (const auto& [command, arguments, fault] : rows) {
         const zemCommandLine line = zemSplitCommandLine(command);
         std::string joined;
-        for (const std::string& argument : line.arguments) joined += argument + '|';
+        for (const std::string& argument : line.arguments) {
+            joined += argument + '|';
+        }
         EXPECT_EQ(arguments + '|', joined) << command;
         EXPECT_EQ(line.danglingBackslash, fault == 'd') << command;
         EXPECT_EQ(line.unbalancedQuote, fault == 'u') << command;
@@ -112,7 +117,9 @@ TEST(PollPlanTest, LimitsCountInTenthsOfASecond) {
         zemPollPlan plan(waitTime);
         std::chrono::microseconds slept(0);
         int count = 0;
-        for (; count < 1000 && !plan.expired(); ++count) slept += plan.pause();
+        for (; count < 1000 && !plan.expired(); ++count) {
+            slept += plan.pause();
+        }
         EXPECT_EQ(passes, count) << waitTime;
         EXPECT_EQ(total, slept) << waitTime;
     }
@@ -125,8 +132,9 @@ TEST(PollPlanTest, BacksOffAfterTwentyMinutes) {
         ASSERT_EQ(2ms, plan.pause());
     }
     EXPECT_EQ(0ms, plan.pause());
-    for (int wait = 1; wait <= 32768; wait *= 2)
+    for (int wait = 1; wait <= 32768; wait *= 2) {
         EXPECT_EQ(std::chrono::milliseconds(wait), plan.pause());
+    }
     EXPECT_EQ(1min, plan.pause());
     EXPECT_EQ(1min, plan.pause());
 }
@@ -286,7 +294,9 @@ TEST(ExecuteCommandTest, CancelledThreadLeavesOnlyTheTool) {
         pthread_t thread;
         ASSERT_EQ(0, pthread_create(&thread, nullptr, work, nullptr));
         const pid_t pid = work == works[0] ? waitForPid(tools) : 0;
-        if (pid != 0) pthread_cancel(thread);
+        if (pid != 0) {
+            pthread_cancel(thread);
+        }
         void* result = nullptr;
         pthread_join(thread, &result);
         EXPECT_EQ(PTHREAD_CANCELED, result);
@@ -336,7 +346,9 @@ TEST(ExecuteCommandTest, EachAllocationMayFail) {
             ASSERT_EQ(before, openDescriptors()) << n;
             ASSERT_FALSE(hasChildren()) << n;
         }
-        if (&operation != operations) continue;
+        if (&operation != operations) {
+            continue;
+        }
         tools.script("talk", "exec yes");  // output without end
         FailingAllocation::s_most = 1 << 20;
         EXPECT_THROW(operation(), std::bad_alloc) << "a tool that no one reads any more ends";
@@ -389,7 +401,9 @@ TEST(ExecuteCommandTest, FullDescriptorTableIsAFailureOfThePipe) {
 }
 
 TEST(UserContextTest, SwitchesGroupAndUser) {
-    if (geteuid() != 0) GTEST_SKIP() << "needs root";
+    if (geteuid() != 0) {
+        GTEST_SKIP() << "needs root";
+    }
     // First, as its process starts the test anew and leaves by the shortest way.
     EXPECT_EXIT(
         {
@@ -462,16 +476,19 @@ TEST(HostTest, NamesAndAddresses) {
 }
 
 TEST(ValidatorTest, AddressesAndNames) {
-    for (const char* good : {"1.2.3.4", "1..2.3.4", "-1.2.3.4", "255.255.255.255", "1.2.3.4x"})
+    for (const char* good : {"1.2.3.4", "1..2.3.4", "-1.2.3.4", "255.255.255.255", "1.2.3.4x"}) {
         EXPECT_EQ(1, Helper::isValidIPAddress(good)) << good;
-    for (const char* bad : {"", "1.2.3", "1.2.3.256", "a.b.c.d"})
+    }
+    for (const char* bad : {"", "1.2.3", "1.2.3.256", "a.b.c.d"}) {
         EXPECT_EQ(0, Helper::isValidIPAddress(bad)) << bad;
+    }
     const std::tuple<const char*, const char*, int> rows[] = {
         {"$ab", "", 1},  {"a9$#@", "", 1}, {"9a", "", 0},   {"a_b", "", 0},
         {"$ab", "_", 0}, {"a_b", "_", 1},  {"a$b", "_", 0}, {"", "", 0},
         {"", "_", 0},    {"_a", "_", 0},   {"Zz", "", 1},   {"\xe4", "", 0}};
-    for (const auto& [name, extra, valid] : rows)
+    for (const auto& [name, extra, valid] : rows) {
         EXPECT_EQ(valid, Helper::isValidName(name, extra)) << name;
+    }
 }
 
 TEST(TimeStampTest, AreLocalTime) {

@@ -40,7 +40,9 @@ public:
     CMPIBoolean isValidIndicationClass(const char*) override { return script.indicationClass; }
     void populateEssentialKeys(const char*, CmpiArray& keys) override {
         CMPICount i = 0;
-        for (const std::string& key : script.keys) setText(keys, i++, key.c_str());
+        for (const std::string& key : script.keys) {
+            setText(keys, i++, key.c_str());
+        }
     }
     void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
                             const char* method) override {
@@ -103,7 +105,9 @@ private:
     static void note(const std::string& worker, const char* detail = "") {
         script.calls.push_back(*detail == '\0' ? worker : worker + " " + detail);
         const auto action = script.actions.find(worker);
-        if (action != script.actions.end()) action->second();
+        if (action != script.actions.end()) {
+            action->second();
+        }
     }
 };
 
@@ -169,7 +173,9 @@ public:
     }
     CMPIInstance* disk(const cimom::NamedValues& properties = {{"Name", "d1"}}) const {
         cimom::ObjectPath path("root/cimv2", className);
-        if (!properties.empty()) path.keys.set("Name", "d1");
+        if (!properties.empty()) {
+            path.keys.set("Name", "d1");
+        }
         return scope.wrap(cimom::Instance(path, properties));
     }
     CMPIArgs* args(const cimom::NamedValues& values = {}) const { return scope.wrap(values); }
@@ -182,7 +188,9 @@ public:
         const CMPIStatus status = run(scope.result(answer.reply));
         answer.output = testing::internal::GetCapturedStdout();
         answer.rc = status.rc;
-        if (status.msg != nullptr) answer.text = status.msg->ft->getCharPtr(status.msg, nullptr);
+        if (status.msg != nullptr) {
+            answer.text = status.msg->ft->getCharPtr(status.msg, nullptr);
+        }
         return answer;
     }
     /// Calls an entry of a function table with context, result and the arguments given.

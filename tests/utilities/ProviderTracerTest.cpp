@@ -108,7 +108,9 @@ TEST(Log, AReaderThatIsGoneHarmsNobody) {
     int ends[2];
     ASSERT_EQ(0, pipe(ends));
     dup2(ends[1], STDOUT_FILENO);
-    for (const int end : ends) close(end);
+    for (const int end : ends) {
+        close(end);
+    }
     sigset_t none, pipeSignal, seen, waiting;
     sigemptyset(&none);
     sigemptyset(&pipeSignal);

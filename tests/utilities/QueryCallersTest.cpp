@@ -36,9 +36,12 @@ void check(const Row& row, const char* system, const char* filter) {
         return text != nullptr && row.takes.find(what) != std::string::npos;
     };
     std::string front = row.front;
-    if (takes('M', system) || (takes('m', system) && *system != '\0'))
+    if (takes('M', system) || (takes('m', system) && *system != '\0')) {
         front += std::string(" -m \"") + system + '"';
-    if (takes('f', filter) && *filter != '\0') front += std::string(" --filter ") + filter;
+    }
+    if (takes('f', filter) && *filter != '\0') {
+        front += std::string(" --filter ") + filter;
+    }
     front += row.back + " -F ";
     int records = 0;
     const LoggedCall call = logged(row.front.substr(0, row.front.find(' ')), "1\n2\n",
@@ -57,7 +60,9 @@ void checkAnswer(const Row& row) {
     std::string without;
     for (int field = 0; field < row.count; ++field) {
         bool found = false;
-        for (int i = 0; i < records.size(); ++i) found |= !(*records[i])[field].isEmpty();
+        for (int i = 0; i < records.size(); ++i) {
+            found |= !(*records[i])[field].isEmpty();
+        }
         without += found ? "" : std::to_string(field) + ' ';
     }
     EXPECT_EQ("", without) << row.front;
@@ -71,8 +76,11 @@ void checkAll(const std::vector<Row>& rows) {
     }
     testing_support::TestAppliance appliance(ZEM_PROGRAMS);
     ASSERT_EQ(0, appliance.run("appliance init").exit);
-    for (const Row& row : rows)  // there are samples of the last days only
-        if (row.count > 0 && row.back.find("year") == std::string::npos) checkAnswer(row);
+    for (const Row& row : rows) {  // there are samples of the last days only
+        if (row.count > 0 && row.back.find("year") == std::string::npos) {
+            checkAnswer(row);
+        }
+    }
 }
 
 /// A query that takes a list, a system and a filter.

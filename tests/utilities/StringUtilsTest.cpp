@@ -11,7 +11,9 @@ std::string bytes(const zemString& s) {
 }
 
 void expectRows(const std::vector<std::pair<zemString, std::string>>& rows) {
-    for (const auto& [got, want] : rows) EXPECT_EQ(bytes(got), want);
+    for (const auto& [got, want] : rows) {
+        EXPECT_EQ(bytes(got), want);
+    }
 }
 
 TEST(StringTest, TextsOfConstructorsAndTransformations) {
@@ -67,7 +69,9 @@ TEST(StringTest, ClearedStringKeepsItsLengthAndTakesNewText) {
     text = "hi";  // shorter than before: the old size must not be trusted
     EXPECT_STREQ(text, "hi");
     text.clear();
-    for (int i = 0; i < 100; ++i) text += 'x';
+    for (int i = 0; i < 100; ++i) {
+        text += 'x';
+    }
     EXPECT_EQ(bytes(text), std::string(100, 'x'));
 }
 
@@ -130,7 +134,9 @@ TEST(StringTest, Format) {
 
 TEST(StringPairsTest, KeepsOrderAndDuplicates) {
     zemStringPairs pairs;
-    for (int i = 0; i < 25; ++i) pairs.addPair(zemString(i % 20), zemString(100 + i));
+    for (int i = 0; i < 25; ++i) {
+        pairs.addPair(zemString(i % 20), zemString(100 + i));
+    }
     zemString key("k");
     zemString value("v");
     EXPECT_EQ(pairs.getPair(24, key, value), 24);

@@ -90,14 +90,18 @@ TEST_F(SystemConfigTest, ProductDataIsReadOnce) {
             const bool alone = unshare(CLONE_NEWNS) == 0 &&
                                mount("none", "/", nullptr, MS_REC | MS_PRIVATE, nullptr) == 0 &&
                                mount("none", "/opt", "tmpfs", 0, nullptr) == 0;
-            if (!alone) _exit(77);
+            if (!alone) {
+                _exit(77);
+            }
             std::filesystem::create_directories("/opt/wrt/data");
             check(mtms);
             _exit(HasFailure() ? 1 : 0);
         }
         int status = 0;
         waitpid(child, &status, 0);
-        if (status == 77 << 8) GTEST_SKIP() << "this machine allows no mounts";
+        if (status == 77 << 8) {
+            GTEST_SKIP() << "this machine allows no mounts";
+        }
         EXPECT_EQ(0, status) << mtms;
     }
 }
@@ -238,8 +242,9 @@ std::string shown(Profile p) {
     // clang-format on
     for (int type = 0; type < 5; ++type) {
         const auto list = p.getVirtualIOResources(static_cast<Profile::IOResourceType>(type));
-        for (int i = 0; i < list.size(); ++i)
+        for (int i = 0; i < list.size(); ++i) {
             text += (i == 0 ? '{' : '&') + std::string(*list.getElementAt(i));
+        }
     }
     return text;
 }
@@ -252,8 +257,9 @@ TEST_F(SystemConfigTest, ParsesProfiles) {
         {"SFPSurveillance=2;AutoIPLEnabled=2;BootMode=;MinProcUnit=null;DesiredProcUnit=Null;MaxProcUnit=;virtual_scsi_adapters=None;virtual_serial_adapters=none;virtual_eth_adapters=NONE;io_slots=none", "|0|0|0|||-1|-1|-1|-1|-1|-1|-1|-1|-1|-1|||||"},
     };
     // clang-format on
-    for (const auto& [properties, text] : rows)
+    for (const auto& [properties, text] : rows) {
         EXPECT_EQ(text, shown(Profile(*object(properties), m_partition, "", "")));
+    }
     const auto open = [&] {
         shown(Profile(*object("BootMode=1;io_slots=1,\"2"), m_partition, "", ""));
     };
@@ -266,7 +272,9 @@ TEST_F(SystemConfigTest, NumbersHaveWords) {
         std::string words;
         for (int number = -1; number <= 256; ++number) {
             const std::string word = std::string(wordOf(number));
-            if (word != other) words += std::to_string(number) + ' ' + word + ';';
+            if (word != other) {
+                words += std::to_string(number) + ' ' + word + ';';
+            }
         }
         return words;
     };
@@ -284,8 +292,9 @@ TEST_F(SystemConfigTest, NumbersHaveWords) {
         {"to x: LOST connection (1)", 5}, {"Migration Complete", 6}, {"Lost", 0}, {"Migration Complete.", 0},
     };
     // clang-format on
-    for (const auto& [text, state] : texts)
+    for (const auto& [text, state] : texts) {
         EXPECT_EQ(state, Partition::getMigrationStateFromString(text)) << text;
+    }
 }
 
 // What the appliance has as a word reaches objects as a number that stands for the same word.
@@ -319,7 +328,9 @@ TEST_F(SystemConfigTest, WordsSurviveTheLibrary) {
     for (const auto& row : rows) {
         for (int number = 0; number < 256; ++number) {
             const zemString word = row.word(number);
-            if (word.isEmpty() || word == "unknown") continue;
+            if (word.isEmpty() || word == "unknown") {
+                continue;
+            }
             {
                 auto store = appliance::Store::open(appliance::Database::Access::Write);
                 appliance::Transaction change = store.write();
@@ -392,7 +403,9 @@ TEST_F(SystemConfigTest, LinesOfTheTools) {
 std::string with(const std::string& name, const std::string& text) {
     std::string result;
     for (const char c : text) {
-        if (c != '@' && c != '#') result += c;
+        if (c != '@' && c != '#') {
+            result += c;
+        }
         for (const char n : c == '@' || c == '#' ? name : "") {
             result.append(c == '#' && n == '"' ? 2 : 1, n);
         }
@@ -509,8 +522,9 @@ TEST_F(SystemConfigTest, FailuresOfTheTools) {
     // clang-format on
     for (const std::string id : {"WRTL8018", "WRTL8011", "WRTL8010", "WRTL8019"}) {
         for (const char* tool :
-             {"dlplat", "edplat", "edpower", "nwplat", "qymove", "qyplat", "domove"})
+             {"dlplat", "edplat", "edpower", "nwplat", "qymove", "qyplat", "domove"}) {
             m_tools.script(tool, "echo \"" + id + " $(id -u) $LC_ALL\" >&2; exit 1");
+        }
         for (const auto& [who, ids, operation] : rows) {
             const bool unknown = ids.find(id) != std::string::npos;
             EXPECT_EQ((unknown ? "5/" + who : "6/zemCommandCaller/callGenericCommand") + '/' + id +

@@ -15,7 +15,9 @@ using Clock = std::chrono::steady_clock;
 using std::chrono::milliseconds;
 
 bool eventually(const std::function<bool()>& holds) {
-    for (int i = 0; i < 20000 && !holds(); ++i) usleep(1000);
+    for (int i = 0; i < 20000 && !holds(); ++i) {
+        usleep(1000);
+    }
     return holds();
 }
 
@@ -60,7 +62,9 @@ TEST(ThreadConditionTest, SignalWakesAllWaiters) {
         usleep(100000);
         condition.signal();
         EXPECT_TRUE(eventually([&] { return awake > 1; })) << "a broadcast";
-        while (awake < 4) condition.signal();  // one that came late to its wait
+        while (awake < 4) {
+            condition.signal();  // one that came late to its wait
+        }
     });
 }
 

@@ -27,7 +27,9 @@ public:
     std::string waitFor(const std::string& text, const std::function<void()>& work) const {
         std::string lines;
         for (int i = 0; i < 100 && lines.find(text) == std::string::npos; ++i) {
-            for (int more = 0; more < 10; ++more) work();
+            for (int more = 0; more < 10; ++more) {
+                work();
+            }
             std::this_thread::sleep_for(std::chrono::milliseconds(50));
             std::ifstream file(m_file);
             lines.assign(std::istreambuf_iterator<char>(file), {});

@@ -78,7 +78,9 @@ inline std::string readAll(FILE* stream) {
         pollfd ready = {fileno(stream), POLLIN, 0};
         poll(&ready, 1, -1);
         const ssize_t n = read(fileno(stream), buffer, sizeof buffer);
-        if (n <= 0) break;
+        if (n <= 0) {
+            break;
+        }
         text.append(buffer, static_cast<size_t>(n));
     }
     fclose(stream);
@@ -88,7 +90,9 @@ inline std::string readAll(FILE* stream) {
 /// Attributes for a change tool.
 inline zemDynamicArray<tagAttributePair> pairs(const std::vector<tagAttributePair>& list) {
     zemDynamicArray<tagAttributePair> all;
-    for (const tagAttributePair& pair : list) all.addElement(new tagAttributePair(pair));
+    for (const tagAttributePair& pair : list) {
+        all.addElement(new tagAttributePair(pair));
+    }
     return all;
 }
 

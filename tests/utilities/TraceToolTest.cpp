@@ -48,7 +48,9 @@ protected:
     }
 
     bool waitForLines(std::size_t count) const {
-        for (int i = 0; i < 1000 && lines(contents(m_trace)).size() < count; ++i) usleep(50000);
+        for (int i = 0; i < 1000 && lines(contents(m_trace)).size() < count; ++i) {
+            usleep(50000);
+        }
         return lines(contents(m_trace)).size() == count;
     }
 
@@ -75,11 +77,14 @@ TEST_F(TraceToolTest, OffUnlessAskedFor) {
 TEST_F(TraceToolTest, SaysWhereTheDefaultFileIsAndEndsWithoutWaitingForThePoll) {
     const bool wasThere = fs::exists("/tmp/CIMTestPerfData.txt");
     const auto start = std::chrono::steady_clock::now();
-    for (int i = 0; i < 5; ++i)
+    for (int i = 0; i < 5; ++i) {
         EXPECT_EQ(run("", nullptr, CTimeLogerManager::getInstance),
                   "env not set for VM_CIMPROVIDER_TRACE_PATH\npath:/tmp/CIMTestPerfData.txt\n");
+    }
     EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2400));
-    if (!wasThere) fs::remove("/tmp/CIMTestPerfData.txt");
+    if (!wasThere) {
+        fs::remove("/tmp/CIMTestPerfData.txt");
+    }
 }
 
 TEST_F(TraceToolTest, FiftyLinesAreWrittenFewerWait) {
@@ -91,7 +96,9 @@ TEST_F(TraceToolTest, FiftyLinesAreWrittenFewerWait) {
         logger->begin(std::string(10000, 'k').c_str());
         logger->end("short");
         logger->log("a", "b", "c");
-        for (int i = 3; i < 49; ++i) manager->log("fill");
+        for (int i = 3; i < 49; ++i) {
+            manager->log("fill");
+        }
         usleep(1200000);  // two polls of the drain
         EXPECT_TRUE(lines(contents(m_trace)).empty());
         manager->log("fill");
@@ -106,8 +113,9 @@ TEST_F(TraceToolTest, FiftyLinesAreWrittenFewerWait) {
     const char* const forms[] = {R"(\+\+\+op:-?\d+ op-k begin at \d{16}\.)",
                                  R"(\+\+\+op:-?\d+ op-short end at \d{16}\.)",
                                  R"(\+\+\+op:-?\d+,\d{16}, op,a-b,c)"};
-    for (std::size_t i = 0; i < 3; ++i)
+    for (std::size_t i = 0; i < 3; ++i) {
         EXPECT_TRUE(std::regex_match(written[i], std::regex(forms[i]))) << written[i];
+    }
 }
 
 // ZEM_TRACE_LINES is the number of lines of each thread, for a long run.
@@ -124,7 +132,9 @@ TEST_F(TraceToolTest, ThreadsLinesArriveWholeAndInOrder) {
                 CTimeLogerManager::getInstance()->getLogger(zemString(number / 2))->begin(key);
             }
         });
-        for (int i = 0; i < 50; ++i) CTimeLogerManager::getInstance()->log("fill");
+        for (int i = 0; i < 50; ++i) {
+            CTimeLogerManager::getInstance()->log("fill");
+        }
         EXPECT_TRUE(waitForLines(static_cast<std::size_t>(threadCount * lineCount) + 50));
     });
     int next[threadCount] = {};
@@ -143,11 +153,15 @@ TEST_F(TraceToolTest, ThreadsLinesArriveWholeAndInOrder) {
 TEST_F(TraceToolTest, OpensNothingButAFileOfItsOwn) {
     const auto fill = [this] {
         alarm(20);
-        for (int i = 0; i < 50; ++i) CTimeLogerManager::getInstance()->log("fill");
+        for (int i = 0; i < 50; ++i) {
+            CTimeLogerManager::getInstance()->log("fill");
+        }
         usleep(700000);  // more than a poll of the drain
         for (const auto& entry : fs::directory_iterator("/proc/self/fd")) {
             std::error_code gone;
-            if (fs::read_symlink(entry, gone) != m_trace) continue;
+            if (fs::read_symlink(entry, gone) != m_trace) {
+                continue;
+            }
             const int fd = std::stoi(entry.path().filename());
             EXPECT_EQ(FD_CLOEXEC, fcntl(fd, F_GETFD));
         }
@@ -171,14 +185,20 @@ TEST_F(TraceToolTest, LateLinesAreDropped) {
         static CTimeLoger* logger = nullptr;
         static const pid_t process = getpid();
         const auto late = [] {
-            if (getpid() != process) return;  // a lock of the drain's may be held there for good
-            for (int i = 0; i < 100; ++i) logger->end("late");
+            if (getpid() != process) {
+                return;  // a lock of the drain's may be held there for good
+            }
+            for (int i = 0; i < 100; ++i) {
+                logger->end("late");
+            }
             CTimeLogerManager::getInstance()->getLogger("later")->begin("late");
         };
         std::atexit(late);  // runs behind the end of all that is made from here on
         logger = CTimeLogerManager::getInstance()->getLogger("op");
         const pid_t child = fork();
-        if (child == 0) std::exit(0);
+        if (child == 0) {
+            std::exit(0);
+        }
         int status = -1;
         EXPECT_EQ(child, waitpid(child, &status, 0));
         EXPECT_EQ(0, status);

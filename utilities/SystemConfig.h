@@ -344,6 +344,9 @@ public:
     zemString getProcMode();
     zemString getSharingMode();
 
+    /// How many virtual slots there may be; -1 where the library tells none.
+    int getMaxVirtualSlots();
+
     /// Quantities as the library gives them, units in hundredths of a processor and memory in
     /// megabytes; -1 where it tells none.
     int getMinProcUnits();
@@ -410,6 +413,7 @@ private:
     int m_uncapWeight = -1;
     bool m_autoStart = false;
     zemVirtualSystem m_virtualSystem;
+    int m_maxVirtualSlots = -1;
 };
 
 #endif

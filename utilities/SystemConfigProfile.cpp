@@ -82,6 +82,7 @@ void zemVirtualSystemProfile::parseApiProp(apiProp& prop) {
         {"MaximumMemory", setQuantity<&Self::m_maxMem>},
         {"UncappedWeight", setQuantity<&Self::m_uncapWeight>},
         {"AutoIPLEnabled", zemSetFlag<&Self::m_autoStart>},
+        {"MaxVirtualSlots", setQuantity<&Self::m_maxVirtualSlots>},
     };
     m_gotLevel1 = true;
     zemReadApiFields(&prop, *this, kLevel1);
@@ -106,6 +107,7 @@ ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMinMem, 2, m_minMem)
 ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getDesiredMem, 2, m_desiredMem)
 ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMaxMem, 2, m_maxMem)
 ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getUncapWeight, 2, m_uncapWeight)
+ZEM_CONFIG_GETTER(zemVirtualSystemProfile, int, getMaxVirtualSlots, 2, m_maxVirtualSlots)
 ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getVirtualSerialAdapterString, 2,
                   m_virtualSerialAdapters)
 ZEM_CONFIG_GETTER(zemVirtualSystemProfile, zemString, getVirtualSCSIAdapterString, 2,

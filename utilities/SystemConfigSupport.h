@@ -6,18 +6,12 @@
 #define SYSTEM_CONFIG_SUPPORT_H
 
 #include <cstddef>
-#include <cstdlib>
 #include <cstring>
 
 #include "DNXApiCaller.h"
 #include "Exception.h"
+#include "NumberText.h"
 #include "StringUtils.h"
-
-/// The decimal number with which @p text begins; 0 if there is none.
-inline int zemNumberOf(const zemString& text) {
-    constexpr int kBase = 10;
-    return static_cast<int>(std::strtol(text, nullptr, kBase));
-}
 
 /// @throws zemInvalidParameterException @p index is the mark that ends a list, and no attribute
 inline void zemExpectAttribute(int index, const char* throwClass, const char* throwMethod) {

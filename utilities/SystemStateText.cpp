@@ -34,16 +34,43 @@ constexpr Word kHostStates[] = {
     {254, "No Connection"},
 };
 
-constexpr Word kPartitionStates[] = {
-    {0, "Not Activated"}, {1, "Starting"},        {2, "Running"},
-    {3, "Shutting Down"}, {4, "Error"},           {8, "Open Firmware"},
-    {9, "Suspended"},     {252, "Not Available"}, {255, "unknown"},
+/// The last column: whether a user is shown the text.
+constexpr struct {
+    int number;
+    const char* text;
+    bool isShown;
+} kPartitionStates[] = {
+    {0, "Not Activated", true}, {1, "Starting", true},
+    {2, "Running", true},       {3, "Shutting Down", true},
+    {4, "Error", true},         {8, "Open Firmware", true},
+    {9, "Suspended", true},     {252, "Not Available", false},
+    {255, "unknown", false},
 };
 
 constexpr Word kBootModes[] = {{1, "norm"}, {2, "ds"}, {3, "sms"}, {4, "of"}, {5, "dd"}};
 
 constexpr Word kEnvironments[] = {{1, "tmxlinux"},   {2, "tmxlinux"}, {3, "xbrgserver"},
                                   {4, "xbrgserver"}, {129, "osq00"},  {130, "osq00"}};
+
+/// The number, the text of fields, and that for a user.
+constexpr struct {
+    int number;
+    const char* text;
+    const char* shown;
+} kCompatModes[] = {
+    {0, "CORAL5", "C5"},
+    {1, "CORAL6_enhanced", "C6 enhanced"},
+    {2, "CORAL6", "C6"},
+    {3, "CORAL6+", "C6+"},
+    {4, "CORAL7", "C7"},
+    {5, "CORAL6+_enhanced", "C6+ enhanced"},
+    {6, "CORAL7_enhanced", "C7 enhanced"},
+    {7, "CORAL7+", "C7+"},
+    {8, "CORAL7+_enhanced", "C7+ enhanced"},
+    {9, "CORAL8", "C8"},
+    {10, "CORAL8_enhanced", "C8 enhanced"},
+    {63, "default", "Default"},
+};
 
 /// The tools' word, the number of the management library, and that of this library's objects.
 constexpr struct {
@@ -71,14 +98,21 @@ constexpr struct {
     {16, "Migration Complete", MIGRATION_COMPLETE},
 };
 
-template <std::size_t N>
-const char* textOf(const Word (&words)[N], int number, const char* otherwise) {
-    for (const Word& word : words) {
-        if (word.number == number) {
-            return word.text;
+/// The row of a number; null if the table does not list it.
+template <class Row, std::size_t N>
+const Row* rowOf(const Row (&rows)[N], int number) {
+    for (const Row& row : rows) {
+        if (row.number == number) {
+            return &row;
         }
     }
-    return otherwise;
+    return nullptr;
+}
+
+template <class Row, std::size_t N>
+const char* textOf(const Row (&rows)[N], int number, const char* otherwise) {
+    const Row* const row = rowOf(rows, number);
+    return row == nullptr ? otherwise : row->text;
 }
 
 }  // namespace
@@ -87,19 +121,42 @@ const char* zemHostStateText(int state) { return textOf(kHostStates, state, "");
 
 const char* zemPartitionStateText(int state) { return textOf(kPartitionStates, state, ""); }
 
-const char* zemBootModeText(int bootMode) { return textOf(kBootModes, bootMode, "unknown"); }
+const char* zemPartitionStateShown(int state) {
+    const auto* const row = rowOf(kPartitionStates, state);
+    return row == nullptr || !row->isShown ? "unknown" : row->text;
+}
+
+const char* zemBootModeText(int bootMode, const char* otherwise) {
+    return textOf(kBootModes, bootMode, otherwise);
+}
+
+int zemBootModeOf(const char* text) {
+    for (const Word& word : kBootModes) {
+        if (std::strcmp(word.text, text) == 0) {
+            return word.number;
+        }
+    }
+    return -1;
+}
+
+const char* zemCompatModeText(int mode) { return textOf(kCompatModes, mode, "unknown"); }
+
+const char* zemCompatModeShown(int mode) {
+    const auto* const row = rowOf(kCompatModes, mode);
+    return row == nullptr ? "unknown" : row->shown;
+}
 
 const char* zemEnvironmentText(int definitionState) {
     return textOf(kEnvironments, definitionState, "");
 }
 
 zemKeylock zemKeylockOf(int number) {
-    for (const auto& row : kKeylocks) {
-        if (row.number == number) {
-            return row.position;
-        }
-    }
-    return KEYLOCK_UNKNOWN;
+    const auto* const row = rowOf(kKeylocks, number);
+    return row == nullptr ? KEYLOCK_UNKNOWN : row->position;
+}
+
+const char* zemKeylockWord(int number, const char* otherwise) {
+    return textOf(kKeylocks, number, otherwise);
 }
 
 const char* zemKeylockText(int position) {
@@ -112,12 +169,8 @@ const char* zemKeylockText(int position) {
 }
 
 zemMigrationState zemMigrationStateOf(int number) {
-    for (const auto& row : kMigrationStates) {
-        if (row.number == number) {
-            return row.state;
-        }
-    }
-    return MIGRATION_UNKNOWN;
+    const auto* const row = rowOf(kMigrationStates, number);
+    return row == nullptr ? MIGRATION_UNKNOWN : row->state;
 }
 
 zemMigrationState zemMigrationStateOf(const char* text) {

@@ -73,6 +73,7 @@ ROWS = [
     ("LookUp/10", "LookUpInMap/10", None, 0),
     ("LookUp/100", "LookUpInMap/100", None, 0),
     ("LookUp/1000", "LookUpInMap/1000", None, 0),
+    ("Adapters", "PlainFields", 3.0, 0),
 ]
 # Counters: benchmark, counter, the most that it may be.
 COUNTERS = [

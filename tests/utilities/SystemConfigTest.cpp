@@ -237,7 +237,7 @@ TEST_F(SystemConfigTest, ParsesProperties) {
 std::string shown(Profile p) {
     // clang-format off
     std::string text = joined(p.getName(), p.getConnMonitoring(), p.getAutoStart(), p.getBootMode(), p.getProcMode(), p.getSharingMode(),
-                              p.getMinProcUnits(), p.getDesiredProcUnits(), p.getMaxProcUnits(), p.getMinProcs(), p.getDesiredProcs(), p.getMaxProcs(), p.getMinMem(), p.getDesiredMem(), p.getMaxMem(), p.getUncapWeight(),
+                              p.getMinProcUnits(), p.getDesiredProcUnits(), p.getMaxProcUnits(), p.getMinProcs(), p.getDesiredProcs(), p.getMaxProcs(), p.getMinMem(), p.getDesiredMem(), p.getMaxMem(), p.getUncapWeight(), p.getMaxVirtualSlots(),
                               p.getVirtualSCSIAdapterString(), p.getVirtualSerialAdapterString(), p.getVirtualEthernetAdapterString(), p.getIOSlotAdapterString());
     // clang-format on
     for (int type = 0; type < 5; ++type) {
@@ -252,9 +252,9 @@ std::string shown(Profile p) {
 TEST_F(SystemConfigTest, ParsesProfiles) {
     // clang-format off
     const std::pair<const char*, const char*> rows[] = {
-        {"UserDefinedName=n;SFPSurveillance=1;AutoIPLEnabled=1;BootMode=3;ProcMode=p;SharingMode=None;MinProcUnit=1;DesiredProcUnit=2;MaxProcUnit=3;MinimumCPUCount=4;DesiredCPUCount=5;MaximumCPUCount=6;MinimumMemory=0;DesiredMemory=8;MaximumMemory=9;UncappedWeight=10;virtual_scsi_adapters=a,b;virtual_serial_adapters=c;virtual_eth_adapters=2/0,\"3/\"\"5,7\"\"/0\",4;io_slots=d,",
-         "n|1|1|3|p|None|1|2|3|4|5|6|0|8|9|10|a,b|c|2/0,\"3/\"\"5,7\"\"/0\",4|d,|{a&b{c{2/0&3/\"5,7\"/0&4{d&"},
-        {"SFPSurveillance=2;AutoIPLEnabled=2;BootMode=;MinProcUnit=null;DesiredProcUnit=Null;MaxProcUnit=;virtual_scsi_adapters=None;virtual_serial_adapters=none;virtual_eth_adapters=NONE;io_slots=none", "|0|0|0|||-1|-1|-1|-1|-1|-1|-1|-1|-1|-1|||||"},
+        {"UserDefinedName=n;SFPSurveillance=1;AutoIPLEnabled=1;BootMode=3;ProcMode=p;SharingMode=None;MinProcUnit=1;DesiredProcUnit=2;MaxProcUnit=3;MinimumCPUCount=4;DesiredCPUCount=5;MaximumCPUCount=6;MinimumMemory=0;DesiredMemory=8;MaximumMemory=9;UncappedWeight=10;MaxVirtualSlots=11;virtual_scsi_adapters=a,b;virtual_serial_adapters=c;virtual_eth_adapters=2/0,\"3/\"\"5,7\"\"/0\",4;io_slots=d,",
+         "n|1|1|3|p|None|1|2|3|4|5|6|0|8|9|10|11|a,b|c|2/0,\"3/\"\"5,7\"\"/0\",4|d,|{a&b{c{2/0&3/\"5,7\"/0&4{d&"},
+        {"SFPSurveillance=2;AutoIPLEnabled=2;BootMode=;MinProcUnit=null;DesiredProcUnit=Null;MaxProcUnit=;virtual_scsi_adapters=None;virtual_serial_adapters=none;virtual_eth_adapters=NONE;io_slots=none", "|0|0|0|||-1|-1|-1|-1|-1|-1|-1|-1|-1|-1|-1|||||"},
     };
     // clang-format on
     for (const auto& [properties, text] : rows) {

@@ -140,10 +140,10 @@ void check(const std::string& element, const std::string& other, const std::stri
     }
     const bool isSlot = kinds[0] == 't';
     const std::string form = formOf(*adapter);
-    const auto quotes = element.find('"') & form.find('"');  // npos: in neither
+    const bool isPlain = (element + form).find('"') == std::string::npos;
     const bool hasPool = !isSlot || fieldsOf(*adapter)[1] != "-1";
     require(hasPool || form.rfind("none/", 0) == 0);
-    if (quotes == std::string::npos && hasPool) {
+    if (isPlain && hasPool) {
         require(formOf(*read<Adapter>(form, kinds)) == form);
     }
     if (!source) {

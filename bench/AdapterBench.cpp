@@ -22,11 +22,13 @@ struct Elements {
 
     Elements() {
         for (int i = 0; i < kElements; i += 4) {
-            const std::string n = std::to_string(i);
-            slots.emplace_back(("21" + n + "/3/1").c_str());
-            serials.emplace_back((n + "/server/1/any//any/0").c_str());
-            scsis.emplace_back((n + "/client/2/io server/" + n + "/1").c_str());
-            ethernets.emplace_back((n + "/1/1/\"3,4," + n + "\"/0/1/ETHERNET0").c_str());
+            const auto add = [i](std::vector<zemString>& list, const char* form) {
+                list.emplace_back().format(form, i, i);
+            };
+            add(slots, "21%08d/3/1");
+            add(serials, "%d/server/1/any//any/0");
+            add(scsis, "%d/client/2/io server/%d/1");
+            add(ethernets, "%d/1/1/\"3,4,%d\"/0/1/ETHERNET0");
         }
     }
 };

@@ -47,9 +47,9 @@ private:                                                        \
     TYPE MEMBER = zemUnsetField<TYPE>()
 
 /// A field of any type: member, getter, and a setter that stores what it gets.
-#define ZEM_FIELD(TYPE, MEMBER, NAME)                                \
-public:                                                              \
-    void set##NAME(zemFieldArgument<TYPE> value) { MEMBER = value; } \
+#define ZEM_FIELD(TYPE, MEMBER, NAME)                                      \
+public:                                                                    \
+    void set##NAME(zemFieldArgument<TYPE> value) { this->MEMBER = value; } \
     ZEM_READ_FIELD_OF(TYPE, MEMBER, NAME)
 
 /// A text kept as it comes.

@@ -196,7 +196,7 @@ TEST(VirtualSystemResourceTest, NumbersHaveWords) {
 /// The text of a setting; its clone, which outlives it, must have the same.
 template <class Setting>
 std::string valueOf(Setting setting) {
-    const std::string value(setting.getValue());
+    std::string value(setting.getValue());
     const std::unique_ptr<zemSystemSetting> copy(Setting(setting).clone());
     EXPECT_NE(nullptr, dynamic_cast<Setting*>(copy.get()));
     EXPECT_EQ(value, std::string(copy->getValue()));

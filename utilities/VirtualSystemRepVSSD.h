@@ -158,7 +158,7 @@ public:
     bool equalvssd(const zemVSSD* vssd) const;
 
 private:
-    struct SettingClass;
+    struct Fields;
 
     int initializeSide(zemSettingSide side, const zemString& userName, const zemString& profileName,
                        zemCEC* cec, zemLPAR* lpar, const zemString& className, int type);

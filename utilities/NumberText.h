@@ -34,4 +34,12 @@ inline int zemNumberOf(std::string_view text) {
 /// The same of a text that ends with a NUL.
 inline int zemNumberOf(const char* text) { return zemNumberOf(std::string_view(text)); }
 
+/// The number that a text is which consists of digits; -1, which no table lists, for any other.
+inline int zemWholeNumberOf(std::string_view text) {
+    const bool isNumber =
+        !text.empty() && text.find_first_not_of("0123456789") == std::string_view::npos;
+    return isNumber ? zemNumberOf(text) : -1;
+}
+inline int zemWholeNumberOf(const char* text) { return zemWholeNumberOf(std::string_view(text)); }
+
 #endif

@@ -24,16 +24,6 @@ constexpr int kBase = 10;
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using PartitionChange = zemEdplatCmdCaller::PartitionAttribute;
 
-/// The name behind the number in "<number>,<profile name>"; empty when there is no profile.
-zemString profileNameOf(const zemString& text) {
-    const int comma = text.find(',');
-    if (comma <= 0 || zemString::equalsIgnoreCase(
-                          text.extractSubstring(0, static_cast<unsigned>(comma)), "null")) {
-        return zemString();
-    }
-    return text.extractSubstring(static_cast<unsigned>(comma) + 1);
-}
-
 /// What a tool of moves says of its failure: an id up to the first blank, and the words behind it.
 [[noreturn]] void throwMoveFailure(const std::string& line, const zemString& errors,
                                    const zemString& output, const char* method) {
@@ -114,11 +104,11 @@ void zemVirtualSystem::parseApiProp(apiProp& prop) {
     static constexpr zemConfigField<Self> kLevel2[] = {
         {"Default_prof",
          [](Self& partition, const zemString& profile) {
-             partition.m_defaultProfile = profileNameOf(profile);
+             partition.m_defaultProfile = zemProfileNameOf(profile);
          }},
         {"Curr_prof",
          [](Self& partition, const zemString& profile) {
-             partition.m_currProfile = profileNameOf(profile);
+             partition.m_currProfile = zemProfileNameOf(profile);
          }},
     };
     m_gotLevel1 = true;

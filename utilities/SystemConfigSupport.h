@@ -21,6 +21,20 @@ inline void zemExpectAttribute(int index, const char* throwClass, const char* th
     }
 }
 
+/// The name behind the number in "<number>,<profile name>", as partitions tell their profiles;
+/// empty when there is no profile, for which either side of the comma says "null".
+inline zemString zemProfileNameOf(const zemString& text) {
+    const int comma = text.find(',');
+    if (comma <= 0) {
+        return zemString();
+    }
+    const auto end = static_cast<unsigned>(comma);
+    const zemString name = text.extractSubstring(end + 1);
+    const bool isNone = zemString::equalsIgnoreCase(text.extractSubstring(0, end), "null") ||
+                        zemString::equalsIgnoreCase(name, "null");
+    return isNone ? zemString() : name;
+}
+
 /// One datum of the management library, and what an object makes of it.
 template <class Object>
 using zemConfigField = zemApiField<void (*)(Object&, const zemString&)>;

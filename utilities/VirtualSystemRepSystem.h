@@ -63,6 +63,12 @@ public:
     virtual ~zemComputerSystem();
 
 protected:
+    /// Appends @p element, which belongs to @p array from here on, also when there is no room.
+    template <class Element>
+    static void own(zemDynamicArray<Element>& array, Element* element) {
+        array.addElement(std::unique_ptr<Element>(element));
+    }
+
     zemDynamicArray<zemLogicalDevice> m_LDs;
     zemCSCapability m_Capability;
     zemComputerSystemData m_Data;
@@ -181,7 +187,7 @@ public:
     /// @throws zemInvalidParameterException there is none with this number
     zemDynamicArray<zemProcessorPoolResource>& getProcessorPool() { return m_ProcessorPool; }
     zemProcessorPoolResource& getProcessorPool(const zemString& poolId) const;
-    void addProcessorPool(zemProcessorPoolResource* pool);
+    void addProcessorPool(zemProcessorPoolResource* pool) { own(m_ProcessorPool, pool); }
 
 private:
     zemDynamicArray<zemResourcePool> m_RPs;
@@ -204,9 +210,9 @@ private:
 
 // A text of a partition: its getter, the member, and a setter that stores the text as it is, or one
 // that the class defines.
-#define ZEM_LPAR_TEXT(MEMBER, NAME)                            \
-public:                                                        \
-    void set##NAME(const zemString& value) { MEMBER = value; } \
+#define ZEM_LPAR_TEXT(MEMBER, NAME)                                  \
+public:                                                              \
+    void set##NAME(const zemString& value) { this->MEMBER = value; } \
     ZEM_LPAR_GETTER(MEMBER, NAME)
 #define ZEM_LPAR_TRANSLATED(MEMBER, NAME)   \
 public:                                     \
@@ -220,16 +226,6 @@ public:                                     \
                                                 \
 private:                                        \
     zemString MEMBER = zemString("zemNULL")
-
-// The records of one kind that a partition has: the member, its getter, and the operation by which
-// one more becomes the partition's.
-#define ZEM_LPAR_RECORDS(RECORD, MEMBER, GETTER, ADD)                                \
-public:                                                                              \
-    zemDynamicArray<RECORD>& GETTER() { return MEMBER; }                             \
-    void ADD(RECORD* record) { MEMBER.addElement(std::unique_ptr<RECORD>(record)); } \
-                                                                                     \
-private:                                                                             \
-    zemDynamicArray<RECORD> MEMBER
 
 /// One partition. Texts that nobody has set yet are "zemNULL".
 ///
@@ -292,7 +288,7 @@ public:
 
     /// The settings of each profile.
     zemDynamicArray<zemVSSD>& getDefinedVSSDs() { return m_definedVSSD; }
-    void addDefinedVSSD(zemVSSD* vssd);
+    void addDefinedVSSD(zemVSSD* vssd) { own(m_definedVSSD, vssd); }
 
     /// Processors and memory, and whether there has been a record of each.
     const zemPartitionProcessorResource& getLparProcessor() const { return m_LparProcessor; }
@@ -301,6 +297,30 @@ public:
     const zemPartitionMemoryResource& getLparMemory() const { return m_LparMemory; }
     void setLparMemory(const zemPartitionMemoryResource& record);
     bool isLparMemoryAvailable() const { return m_isLparMemAvailable; }
+
+    /// Records of the profiles, of slots and of virtual adapters.
+    zemDynamicArray<zemPartitionProfileConfiguration>& getLparProfile() { return m_LparProfile; }
+    zemDynamicArray<zemPartitionIOSlotResource>& getLparIOSlots() { return m_LparIOSlot; }
+    zemDynamicArray<zemPartitionSerialAdapterResource>& getLparSerialAdapters() {
+        return m_LparSerialAdapter;
+    }
+    zemDynamicArray<zemPartitionSCSIAdapterResource>& getLparSCSIAdapters() {
+        return m_LparSCSIAdapter;
+    }
+    zemDynamicArray<zemPartitionEthernetAdapterResource>& getLparEthernetAdapters() {
+        return m_LparEthernetAdapter;
+    }
+    void addLparProfile(zemPartitionProfileConfiguration* record) { own(m_LparProfile, record); }
+    void addLparIOSlot(zemPartitionIOSlotResource* record) { own(m_LparIOSlot, record); }
+    void addLparSerialAdapter(zemPartitionSerialAdapterResource* record) {
+        own(m_LparSerialAdapter, record);
+    }
+    void addLparSCSIAdapter(zemPartitionSCSIAdapterResource* record) {
+        own(m_LparSCSIAdapter, record);
+    }
+    void addLparEthernetAdapter(zemPartitionEthernetAdapterResource* record) {
+        own(m_LparEthernetAdapter, record);
+    }
 
 private:
     /// Each getter of a text passes by here, with the name of the member; nothing is checked yet.
@@ -342,17 +362,13 @@ private:
 
     zemVSSD m_stateVSSD;
     zemDynamicArray<zemVSSD> m_definedVSSD;
-    ZEM_LPAR_RECORDS(zemPartitionProfileConfiguration, m_LparProfile, getLparProfile,
-                     addLparProfile);
+    zemDynamicArray<zemPartitionProfileConfiguration> m_LparProfile;
     zemPartitionProcessorResource m_LparProcessor;
     zemPartitionMemoryResource m_LparMemory;
-    ZEM_LPAR_RECORDS(zemPartitionIOSlotResource, m_LparIOSlot, getLparIOSlots, addLparIOSlot);
-    ZEM_LPAR_RECORDS(zemPartitionSerialAdapterResource, m_LparSerialAdapter, getLparSerialAdapters,
-                     addLparSerialAdapter);
-    ZEM_LPAR_RECORDS(zemPartitionSCSIAdapterResource, m_LparSCSIAdapter, getLparSCSIAdapters,
-                     addLparSCSIAdapter);
-    ZEM_LPAR_RECORDS(zemPartitionEthernetAdapterResource, m_LparEthernetAdapter,
-                     getLparEthernetAdapters, addLparEthernetAdapter);
+    zemDynamicArray<zemPartitionIOSlotResource> m_LparIOSlot;
+    zemDynamicArray<zemPartitionSerialAdapterResource> m_LparSerialAdapter;
+    zemDynamicArray<zemPartitionSCSIAdapterResource> m_LparSCSIAdapter;
+    zemDynamicArray<zemPartitionEthernetAdapterResource> m_LparEthernetAdapter;
     bool m_isLparProcAvailable = false;
     bool m_isLparMemAvailable = false;
 };
@@ -360,6 +376,5 @@ private:
 #undef ZEM_LPAR_TEXT
 #undef ZEM_LPAR_TRANSLATED
 #undef ZEM_LPAR_GETTER
-#undef ZEM_LPAR_RECORDS
 
 #endif

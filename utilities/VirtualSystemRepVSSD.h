@@ -122,7 +122,7 @@ public:
     /// Deletes the first RASD with this key, ignoring case, and tells whether there was one.
     bool removeRASD(const zemString& key);
 
-    /// Appends @p rasd, which belongs to this object from here on. Returns 0.
+    /// Appends @p rasd, not null, which belongs to this object from here on. Returns 0.
     int addRASD(zemRASD* rasd);
 
     /// A new RASD of a kind, made from @p key; null for an unknown type. createRASD() gives it to

@@ -33,21 +33,27 @@ zemString stringOf(std::string_view text) {
 }
 
 /// Hands @p visit each element of @p list that has more than one field: its first field, and the
-/// element. An element ends at a comma; where @p quotes count, one that begins with a quote ends at
-/// the next quote before a comma, or with the list.
+/// element. Elements end at commas. One that holds commas itself begins with a quote and ends with
+/// one; or with an empty field, as running adapters do that their profile does not know.
 template <class Visit>
-void walkList(std::string_view list, bool quotes, Visit visit) {
+void walkList(std::string_view list, Visit visit) {
     while (!list.empty()) {
-        const bool quoted = quotes && list.front() == '"';
+        const bool quoted = list.front() == '"';
         list.remove_prefix(quoted ? 1 : 0);
-        const std::string_view end = quoted ? "\"," : ",";
-        const std::size_t length = std::min(list.find(end), list.size());
-        const std::string_view element = list.substr(0, length);
+        std::size_t comma = list.find(',');
+        while (quoted && comma != std::string_view::npos &&
+               (comma == 0 || (list[comma - 1] != '"' && list[comma - 1] != '/'))) {
+            comma = list.find(',', comma + 1);
+        }
+        std::string_view element = list.substr(0, comma);
+        if (quoted && !element.empty() && element.back() == '"') {
+            element.remove_suffix(1);
+        }
         const std::size_t slash = element.find('/');
         if (slash != std::string_view::npos) {
             visit(element.substr(0, slash), element);
         }
-        list.remove_prefix(std::min(length + end.size(), list.size()));
+        list.remove_prefix(comma == std::string_view::npos ? list.size() : comma + 1);
     }
 }
 
@@ -99,7 +105,7 @@ using StoredSwitches = std::unordered_map<std::string_view, std::optional<std::s
 
 StoredSwitches storedSwitches(std::string_view list) {
     StoredSwitches switches;
-    walkList(list, true, [&](std::string_view, std::string_view element) {
+    walkList(list, [&](std::string_view, std::string_view element) {
         constexpr int kFields = 6;
         std::size_t end = 0;
         for (int field = 0; field < kFields && end != std::string_view::npos; ++field) {
@@ -146,28 +152,25 @@ std::unique_ptr<zemResourceRASettingData> make() {
 struct SettingClass {
     const zemRASDKind& kind;
     bool ofActivated;  ///< on the state side there are none unless the partition is activated
-    bool quotes;       ///< elements of its lists may be quoted
     const zemString& (zemVSSD::*stored)() const;  ///< null: a partition has one of the resource
     zemString (zemVSSD::*live)(const zemString&, const zemString&, const zemString&) const;
     std::unique_ptr<zemResourceRASettingData> (*make[2])();  ///< by zemSettingSide
 };
 
 template <const zemRASDKind& kind>
-constexpr SettingClass settingClass(bool ofActivated, bool quotes,
-                                    decltype(SettingClass::stored) stored,
+constexpr SettingClass settingClass(bool ofActivated, decltype(SettingClass::stored) stored,
                                     decltype(SettingClass::live) live) {
-    return {kind,   ofActivated, quotes,
-            stored, live,        {make<kind, SIDE_DEFINED>, make<kind, SIDE_STATE>}};
+    return {kind, ofActivated, stored, live, {make<kind, SIDE_DEFINED>, make<kind, SIDE_STATE>}};
 }
 
 // clang-format off
 constexpr SettingClass kSettingClasses[] = {
-    settingClass<zemRASDKinds::processor>(true,  false, nullptr, nullptr),
-    settingClass<zemRASDKinds::memory>   (true,  false, nullptr, nullptr),
-    settingClass<zemRASDKinds::ioSlot>   (true,  false, &zemVSSD::getIOSlotInfo,          nullptr),
-    settingClass<zemRASDKinds::serial>   (false, false, &zemVSSD::getSerialAdapterInfo,   &zemVSSD::getSerialAdapterInfo),
-    settingClass<zemRASDKinds::scsi>     (false, false, &zemVSSD::getSCSIAdapterInfo,     &zemVSSD::getSCSIAdapterInfo),
-    settingClass<zemRASDKinds::ethernet> (false, true,  &zemVSSD::getEthernetAdapterInfo, &zemVSSD::getEthernetAdapterInfo),
+    settingClass<zemRASDKinds::processor>(true,  nullptr, nullptr),
+    settingClass<zemRASDKinds::memory>   (true,  nullptr, nullptr),
+    settingClass<zemRASDKinds::ioSlot>   (true,  &zemVSSD::getIOSlotInfo,          nullptr),
+    settingClass<zemRASDKinds::serial>   (false, &zemVSSD::getSerialAdapterInfo,   &zemVSSD::getSerialAdapterInfo),
+    settingClass<zemRASDKinds::scsi>     (false, &zemVSSD::getSCSIAdapterInfo,     &zemVSSD::getSCSIAdapterInfo),
+    settingClass<zemRASDKinds::ethernet> (false, &zemVSSD::getEthernetAdapterInfo, &zemVSSD::getEthernetAdapterInfo),
 };
 // clang-format on
 
@@ -260,8 +263,8 @@ zemString zemVSSD::getEthernetAdapterInfo(const zemString& userName, const zemSt
     const zemApiObjects adapters(
         kReader, zemApiCaller().getLparVirtualEthernet(userName, lparId + "*" + mtms,
                                                        zemConfigObject::OP_LEVEL_2));
-    const zemString list = m_virtualEthetnetAdaptersInfo + ",";
-    const StoredSwitches stored = storedSwitches(static_cast<const char*>(list));
+    const StoredSwitches stored =
+        storedSwitches(static_cast<const char*>(m_virtualEthetnetAdaptersInfo));
     std::string running;
     for (apiProp& adapter : adapters) {
         running += ethernetElement(adapter, stored) + ',';
@@ -310,10 +313,8 @@ int zemVSSD::initializeSide(zemSettingSide side, const zemString& userName,
     const bool asks = side == SIDE_STATE && wanted->live != nullptr;
     zemString list =
         asks ? (this->*wanted->live)(userName, mtms, lparID) : (this->*wanted->stored)();
-    list += ",";
-    walkList(static_cast<const char*>(list), wanted->quotes,
-             [&](std::string_view id, std::string_view element) {
-                 add(stringOf(id), stringOf(element));
-             });
+    walkList(static_cast<const char*>(list), [&](std::string_view id, std::string_view element) {
+        add(stringOf(id), stringOf(element));
+    });
     return 0;
 }

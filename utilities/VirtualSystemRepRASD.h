@@ -25,10 +25,10 @@
 class zemVSSD;
 
 /// The two sides of a partition's settings: what a profile says, and what is running.
-enum zemSettingSide { SIDE_DEFINED, SIDE_STATE };
+enum ZEM_EXPORT zemSettingSide { SIDE_DEFINED, SIDE_STATE };
 
 /// What all resources of one kind have in common.
-struct zemRASDKind {
+struct ZEM_EXPORT zemRASDKind {
     int resourceType;          ///< CIM's number for the kind
     const char* settingClass;  ///< the CIM class of its setting data
     const char* units;         ///< of the quantities
@@ -36,7 +36,7 @@ struct zemRASDKind {
     int automaticDeallocation;
 };
 
-struct zemRASDKinds {
+struct ZEM_EXPORT zemRASDKinds {
     // clang-format off
     static constexpr zemRASDKind processor = { 3, "ORXC_ProcessorRASettingData",       "Percent",   1, 1};
     static constexpr zemRASDKind memory    = { 4, "ORXC_MemoryRASettingData",          "byte*2^10", 1, 1};

@@ -8,6 +8,7 @@
 
 #include "LibraryFaults.h"
 #include "LibrarySpy.h"
+#include "ProviderHarness.h"
 #include "QyplatCmdCaller.h"
 #include "ResourcePoolManager.h"
 #include "SystemConfig.h"
@@ -319,6 +320,30 @@ TEST_F(VirtualSystemRepVSSDTest, SettingDataOfOneClass) {
             EXPECT_EQ("", idsOf(names));
             EXPECT_STREQ("ORX:4*4*1111-AAA*0000001", names.getInstanceID());
         }
+    }
+}
+
+TEST_F(VirtualSystemRepVSSDTest, SettingDataBecomeTheWantedProperties) {
+    Harness harness(cimom::Character::Lean);
+    zemSCSIAdapterRASettingDataState adapter;
+    for (const char* id : {"", "\"7", "x", "-7"}) {
+        EXPECT_EQ(-1, adapter.initialize("", &m_lpar, &m_cec, "p", id, "", 34)) << id;
+    }
+    EXPECT_EQ(-1, adapter.initialize(nullptr, &m_cec, "", 34));
+    EXPECT_EQ(0, adapter.initialize("", &m_lpar, &m_cec, "p", "7", "", 34));
+    EXPECT_STREQ("ORXC_SCSIAdapterRASettingData", adapter.getType());
+    const char* some[] = {"resourcetype", "INSTANCEID", nullptr};
+    const std::pair<const char**, const char*> rows[] = {{some, ""}, {nullptr, "Adapter"}};
+    for (const auto& [wanted, units] : rows) {
+        CmpiInstance instance = FromServer<CmpiInstance>(harness.disk());
+        zemSCSIAdapterRASettingDataState().addSpecificProperties(instance, wanted, "");
+        EXPECT_TRUE(instance.getProperty("ResourceType").isNullValue());
+        adapter.addSpecificProperties(instance, wanted, "");
+        EXPECT_EQ(6, instance.getProperty("ResourceType").getUint16());
+        EXPECT_STREQ("ORX:4*7*4*1111-AAA*0000001",
+                     instance.getProperty("InstanceID").getString().charPtr());
+        const CmpiData shown = instance.getProperty("AllocationUnits");
+        EXPECT_STREQ(units, shown.isNullValue() ? "" : shown.getString().charPtr());
     }
 }
 

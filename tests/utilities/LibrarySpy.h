@@ -6,6 +6,7 @@
 #include <dlfcn.h>
 
 #include <string>
+#include <vector>
 
 #include "libapi.h"
 
@@ -25,9 +26,11 @@
     KEYED(getAllLparMemoryCfg) KEYED(getAllLparProcessorCfg)
 // clang-format on
 
-/// The last call, as "getCecObj(user,key,1)", what it gave, and the results not given back yet.
+/// The last call, as "getCecObj(user,key,1)", what it gave, the results not given back yet, and the
+/// names of all calls.
 struct LibrarySpy {
     std::string call;
+    std::vector<std::string> names;
     apiProp* result = nullptr;
     int held = 0;
 };
@@ -43,6 +46,7 @@ inline std::string textOf(int number) { return std::to_string(number); }
 
 template <class... Arguments>
 apiProp* watchedCall(const char* name, Arguments... arguments) {
+    librarySpy.names.emplace_back(name);
     librarySpy.call = name;
     const char* separator = "(";
     ((librarySpy.call += separator + textOf(arguments), separator = ","), ...);

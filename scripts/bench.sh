@@ -79,6 +79,7 @@ ROWS = [
 COUNTERS = [
     ("GetAllLpars/1000", "resident_MB", 100),
     ("QyallocSplit/1000/manual_time", "ours_percent", 10),
+    ("Initialize/1000/iterations:1/repeats:1/manual_time", "ours_percent", 10),
 ]
 TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}
 

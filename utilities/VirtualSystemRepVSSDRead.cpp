@@ -14,7 +14,6 @@
 #include "QyallocCmdCaller.h"
 #include "QyplatCmdCaller.h"
 #include "SystemConfig.h"
-#include "SystemStateText.h"
 #include "VirtualSystemInstanceId.h"
 #include "VirtualSystemRepSystem.h"
 #include "VirtualSystemRepVSSD.h"
@@ -229,7 +228,7 @@ int zemVSSD::initialize(zemLPAR* lpar, const zemRecordType& record) {
 int zemVSSD::initialize(zemLPAR* lpar, zemVirtualSystemProfile& profile) {
     // The first question reads the profile, its name too.
     const int bootMode = profile.getBootMode();
-    m_bootMode = bootMode == -1 ? "" : zemBootModeText(bootMode);
+    m_bootMode = zemSystemSetting::getBootModeString(bootMode);
     m_autoActivate = profile.getAutoStart() ? 1 : 0;
     m_enableConnectionMonitoring = profile.getConnMonitoring() ? 1 : 0;
     m_maxVirtualSlots = profile.getMaxVirtualSlots();

@@ -17,6 +17,12 @@ namespace {
 
 constexpr char kHost[] = "1111-AAA*0000001";
 
+// Provider libraries were built with these.
+static_assert(VISITOR_TYPE_LPAR_KEY == 0x100 && VISITOR_TYPE_VSSD_KEY == 0x400 &&
+              VISITOR_TYPE_RASD_PROC_KEY == 0x1000 && VISITOR_TYPE_RASD_MEM == 0x8000 &&
+              VISITOR_TYPE_RASD_IOSLOT == 0x20000 && VISITOR_TYPE_RASD_VSCSI == 0x80000 &&
+              VISITOR_TYPE_RASD_VSERIAL == 0x200000 && VISITOR_TYPE_RASD_VETH == 0x800000);
+
 template <class... Values>
 std::string joined(const Values&... values) {
     std::ostringstream text;
@@ -94,13 +100,14 @@ TEST(VirtualSystemRepTest, CapabilitiesOfAHost) {
     // clang-format off
     const std::tuple<std::string, std::string, const char*> rows[] = {
         {"[0,32,0,0,0,0]", "0", "a 0"}, {"[0,64]", "0", "i 0"}, {"[8]", "0", "v 0"}, {"[0,1]", "0", "s 0"}, {"[64]", bit30, "o 0"},
-        {"[64]", others, " 0"}, {"[32]", "0", "r 0"}, {"[0,0,16]", "0", " 1"}, {"[0,0,0,0,0,16]", "0", "S 0"},
+        {"[64]", others, " 0"}, {"[32]", "0", "r 0"}, {"[1,2,1,255,255,1]", "0", " 0"}, {"[0,0,16]", "0", " 1"}, {"[0,0,0,0,0,16]", "0", "S 0"},
         {"[104,97,16,0,0,16,0,0]", bit30, "aivsorS 1"}, {"[0,32," + std::string(500, ',') + "]", "", "a 0"}, {"[99999999999999999999,,16]", "", "vr 1"},
         {"18,64,16", "", "iv 0"},  // the first and the last character go, whatever they are
         {"[", bit30, " 0"}, {"", "", " 0"},
     };
     // clang-format on
     zemCEC host;
+    EXPECT_EQ(" ", shown(host.getCapability()));
     for (const auto& [words, runtime, capabilities] : rows) {
         host.setCapability(words.c_str(), runtime.c_str());
         EXPECT_EQ(capabilities, shown(host.getCapability())) << words << ' ' << runtime;

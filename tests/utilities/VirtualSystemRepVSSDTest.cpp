@@ -157,6 +157,14 @@ TEST_F(VirtualSystemRepVSSDTest, DumpsPrintALineAField) {
     testing::internal::CaptureStdout();
     zemVSSD::dumpVSSD(&vssd);
     const std::string dump = testing::internal::GetCapturedStdout();
+    const auto count = [&dump](const std::string& text) {
+        int found = 0;
+        for (size_t at = 0; (at = dump.find(text, at)) != std::string::npos; at += text.size()) {
+            ++found;
+        }
+        return found;
+    };
+    EXPECT_EQ(1 + 10 + 3 + 10, count(":-1\n"));  // what nobody has set
     for (const char* part :
          {"VSSD, id:\n\tm_MTMS:1111-AAA*0000001\n\tm_virtualSystemType:osq00\n\tm_autoActivate:1\n"
           "\tm_virtualSystemIdentifier:3*1111-AAA*0000001\n\tm_lparID:3\n\tm_lparName:a\\nb\n",

@@ -1,7 +1,7 @@
 // edalloc, edplat, nwplat and dlplat: tools and management library show what they change; what they
 // refuse changes nothing.
 
-#include <nlohmann/json.hpp>
+#include <regex>
 
 #include "ApiAnswer.h"
 #include "EdallocCmdCaller.h"
@@ -241,20 +241,14 @@ TEST_F(ChangeToolsTest, TheJournalTellsWhatChanged) {
     const auto since = std::time(nullptr);
     out("edplat -r lpar -m alpha -i '\"lpar_id=3\",\"new_name=\xff\"'");
     out("edalloc -r io --rsubtype slot -m alpha -o a --id 4 -l 30000006");
-    const auto lines = testing_support::lines(out("appliance journal --json"));
-    ASSERT_EQ(2U, lines.size());
-    const auto rename = nlohmann::json::parse(lines[0]);
-    EXPECT_EQ(1, rename["number"]);
-    EXPECT_EQ("edplat", rename["tool"]);
-    EXPECT_LE(since, rename["time"].get<std::time_t>());
-    EXPECT_EQ(nlohmann::json::parse(R"([{"event": "modify", "kind": "lpar", "lpar": 3, "number": 0,
-        "host": "1111-AAA*0000001", "old": {"name": "web server"}, "new": {"name": "�"}}])"),
-              rename["objects"]);
-    const auto slot = nlohmann::json::parse(lines[1])["objects"];
-    ASSERT_EQ(2U, slot.size());
-    EXPECT_EQ("delete", slot[0]["event"]);
-    EXPECT_EQ("add", slot[1]["event"]);
-    EXPECT_EQ(4, slot[1]["lpar"]);
+    const std::string journal = out("appliance journal --json");
+    const std::regex time(R"("time":(\d+),)"), slot(R"(\{"unit_phys_loc":[^}]*"30000006"\})");
+    EXPECT_LE(since, std::stoll((*std::sregex_iterator(journal.begin(), journal.end(), time))[1]));
+    EXPECT_EQ(
+        R"({"number":1,"tool":"edplat","objects":[{"event":"modify","kind":"lpar","host":"1111-AAA*0000001","lpar":3,"number":0,"old":{"name":"web server"},"new":{"name":"�"}}]}
+{"number":2,"tool":"edalloc","objects":[{"event":"delete","kind":"slot","host":"1111-AAA*0000001","lpar":0,"number":6,"old":SLOT},{"event":"add","kind":"slot","host":"1111-AAA*0000001","lpar":4,"number":6,"new":SLOT}]}
+)",
+        std::regex_replace(std::regex_replace(journal, time, ""), slot, "SLOT"));
 }
 
 using Pairs = zemDynamicArray<tagAttributePair>;

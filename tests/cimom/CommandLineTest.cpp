@@ -5,7 +5,6 @@
 #include <unistd.h>
 
 #include <fstream>
-#include <nlohmann/json.hpp>
 #include <sstream>
 
 #include "Fixture.h"
@@ -22,14 +21,12 @@ protected:
 
     CommandLine() {
         m_folder.write("fixture.mof", fixture::kMof);
-        const nlohmann::json row = {
-            {"provider", "Fixture"},
-            {"interfaces", {"instance", "association", "method", "indication", "property"}}};
-        const nlohmann::json json = {
-            {"namespace", "root/cimv2"},
-            {"library", FIXTURE_LIBRARY},
-            {"classes", {{"Fix_Thing", row}, {"Fix_Link", row}, {"Fix_Event", row}}}};
-        m_folder.write("fixture.json", json.dump());
+        const std::string row = R"({"provider": "Fixture", "interfaces":
+            ["instance", "association", "method", "indication", "property"]})";
+        m_folder.write("fixture.json", R"({"namespace": "root/cimv2", "library": ")" FIXTURE_LIBRARY
+                                       R"(", "classes": {"Fix_Thing": )" +
+                                           row + R"(, "Fix_Link": )" + row + R"(, "Fix_Event": )" +
+                                           row + "}}");
     }
 
     pid_t start(std::vector<std::string> arguments, const char* out = "out") {
@@ -82,11 +79,20 @@ TEST_F(CommandLine, PathsThatArePrintedCanBeGivenBack) {
     const std::string path = second.substr(0, second.size() - 1);
     const Run one = run({"gi", path, "--properties", "Size"});
     EXPECT_EQ(one.out, "// " + path + "\ninstance of Fix_Thing {\n    Size = 2;\n};\n");
-    const Run json = run({"--format", "json", "ei", "Fix_Thing"});
-    const auto parsed = nlohmann::json::parse(json.out);
-    ASSERT_EQ(parsed.size(), 2U);
-    EXPECT_EQ(parsed[1]["path"], path);
-    EXPECT_EQ(parsed[1]["properties"]["Tags"], nlohmann::json({"first", nullptr}));
+    const Run json = run({"--format", "json", "gi", path, "--properties", "Tags"});
+    EXPECT_EQ(json.out, R"([
+  {
+    "path": "root/cimv2:Fix_Thing.Name=\"two, \\\"quoted\\\" \\\\\"",
+    "class": "Fix_Thing",
+    "properties": {
+      "Tags": [
+        "first",
+        null
+      ]
+    }
+  }
+]
+)");
 }
 
 TEST_F(CommandLine, FailuresAreTold) {

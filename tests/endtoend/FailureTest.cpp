@@ -3,10 +3,10 @@
 #include <gtest/gtest.h>
 
 #include <map>
-#include <nlohmann/json.hpp>
 #include <regex>
 #include <set>
 
+#include "Json.h"
 #include "TestAppliance.h"
 
 namespace {
@@ -155,8 +155,8 @@ std::string filled(std::string text, const std::vector<Texts>& inserts, bool inG
     return text;
 }
 
-const nlohmann::json& bundle() {
-    static const auto texts = nlohmann::json::parse(contents(ZEM_MESSAGES "/default_de.json"));
+const cimom::MessageTexts& bundle() {
+    static const auto texts = cimom::readTexts(ZEM_MESSAGES "/default_de.json").value();
     return texts;
 }
 
@@ -179,7 +179,8 @@ Texts says(const std::string& name, const std::map<std::size_t, Texts>& given = 
         return {english, english};
     }
     const auto german = bundle().find("Error." + name);
-    return german == bundle().end() ? english : Texts(english, filled(*german, inserts, true));
+    return german == bundle().end() ? english
+                                    : Texts(english, filled(german->second, inserts, true));
 }
 
 /// What comes of the text of a failure in a method.
@@ -610,7 +611,7 @@ TEST(FailureBundle, HasEveryKeyOfTheLibrary) {
             used.insert((*at)[1]);
         }
     }
-    for (const auto& [name, text] : bundle().items()) {
+    for (const auto& [name, text] : bundle()) {
         translated.insert(name);
     }
     EXPECT_GE(used.size(), 15U);

@@ -4,10 +4,6 @@
 #include <regex>
 
 #include "ApiAnswer.h"
-#include "EdallocCmdCaller.h"
-#include "EdplatCmdCaller.h"
-#include "Exception.h"
-#include "NwplatCmdCaller.h"
 
 namespace {
 
@@ -249,49 +245,6 @@ TEST_F(ChangeToolsTest, TheJournalTellsWhatChanged) {
 {"number":2,"tool":"edalloc","objects":[{"event":"delete","kind":"slot","host":"1111-AAA*0000001","lpar":0,"number":6,"old":SLOT},{"event":"add","kind":"slot","host":"1111-AAA*0000001","lpar":4,"number":6,"new":SLOT}]}
 )",
         std::regex_replace(std::regex_replace(journal, time, ""), slot, "SLOT"));
-}
-
-using Pairs = zemDynamicArray<tagAttributePair>;
-
-Pairs pairs(const std::vector<std::pair<int, const char*>>& values) {
-    Pairs all;
-    for (const auto& [index, value] : values) {
-        all.addElement(new tagAttributePair{index, value});
-    }
-    return all;
-}
-
-TEST_F(ChangeToolsTest, TheLibrarysCallersAreUnderstood) {
-    using Vlan = zemEdallocCmdCaller::AddVETHAttribute;
-    using Profile = zemEdplatCmdCaller::PartitionProfileAttribute;
-    using New = zemNwplatCmdCaller::PartitionAttribute;
-    const char* host = "1111-AAA*0000001";
-    zemEdallocCmdCaller edalloc("", "");
-    zemEdplatCmdCaller edplat("", "");
-    edalloc.addMemory(host, "4", 0, 1024, nullptr, nullptr);
-    edalloc.addProcessing(host, "4", 100, 50, nullptr, nullptr);
-    edalloc.addIOSlot(host, "4", "30000006", Pairs(), nullptr, nullptr);
-    edalloc.removeIOSlot(host, "4", "30000006", nullptr, nullptr);
-    const Pairs vlans = pairs({{Vlan::ATTR_IEEE_VIRTUAL_ETH, "1"},
-                               {Vlan::ATTR_PORT_VLAN_ID, "4"},
-                               {Vlan::ATTR_ADDL_VLAN_IDS, "5,7"}});
-    edalloc.addVETH(host, "3", 5, vlans, nullptr, nullptr);
-    edplat.addPartitionsProfileInformation(
-        "normal", pairs({{Profile::ATTR_VIRTUAL_ETH_ADAPTERS, R"(\"\"7/1/1/5,7//0\"\")"}}), "4",
-        host);
-    EXPECT_THROW(edplat.modifyPartitionsProfileInformation("x", Pairs(), "4", host),
-                 zemOperationFailedException);
-    zemNwplatCmdCaller("", "").makePartitionsInformation(pairs({{New::ATTR_NAME, "a, b"},
-                                                                {New::ATTR_LPAR_ENV, "osq00"},
-                                                                {New::ATTR_ALL_RESOURCES, "1"}}),
-                                                         host);
-    expectRows({
-        {"qyalloc -r mem --level lpar -m alpha --filter lpar_ids=4 -F curr_mem", "17408\n"},
-        {"qyplat -r prof -m alpha --filter lpar_ids=4,profile_names=normal -F virtual_eth_adapters",
-         "\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/storage\"\",\"\"7/1/1/5,7/0/0/default\"\"\"\n"},
-        {"qyplat -r lpar -m alpha --filter lpar_ids=8 -F name", "\"a, b\"\n"},
-        {"appliance journal --json | wc -l", "7\n"},
-    });
 }
 
 }  // namespace

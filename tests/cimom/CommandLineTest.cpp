@@ -196,58 +196,6 @@ TEST_F(CommandLine, VerbsThatChange) {
               std::string::npos);
 }
 
-// What the class does not have, or not so, is refused here, or where small servers do not look, by
-// the provider; the fixture takes it.
-TEST_F(CommandLine, LeanLeavesNamesAndTypesToTheProvider) {
-    const struct {
-        std::vector<std::string> arguments;
-        int exit;
-        std::string err;
-        std::string leanOut;
-    } rows[] = {
-        {{"Echo", "Number=five"},
-         13,
-         "CIM_ERR_TYPE_MISMATCH (13): 'five' is no uint16\n",
-         "returnValue = 1;\nNumber = \"five\";\n"},
-        {{"Echo", "number=-1"},
-         13,
-         "CIM_ERR_TYPE_MISMATCH (13): '-1' is no uint16\n",
-         "returnValue = 1;\nNumber = -1;\n"},
-        {{"Echo", "Colour=red"},
-         4,
-         "CIM_ERR_INVALID_PARAMETER (4): there is no 'Colour' to set\n",
-         "returnValue = 1;\nColour = \"red\";\n"},
-        {{"Echo", "Thing=Fix_Base.Name=5"},
-         4,
-         "CIM_ERR_INVALID_PARAMETER (4): key Name of Fix_Base is of type string\n",
-         "returnValue = 1;\nThing = \"Fix_Base.Name=5\";\n"},
-        {{"Echo", "Parts={instance of Fix_Thing { Size = \"big\"; Colour = \"red\"; }}"},
-         13,
-         "CIM_ERR_TYPE_MISMATCH (13): 'big' is no uint32\n",
-         "returnValue = 1;\nParts = {instance of Fix_Thing {\n    Size = \"big\";\n"
-         "    Colour = \"red\";\n}};\n"},
-        {{"Keep", "Any=1"},
-         17,
-         "CIM_ERR_METHOD_NOT_FOUND (17): class Fix_Thing has no method Keep\n",
-         "returnValue = 1;\n"},
-    };
-    for (const auto& row : rows) {
-        std::vector<std::string> arguments = {"im", "Fix_Thing.Name=\"one\""};
-        arguments.insert(arguments.end(), row.arguments.begin(), row.arguments.end());
-        const Run full = runTyped(arguments);
-        EXPECT_EQ(full.exit, row.exit) << row.arguments[1];
-        EXPECT_EQ(full.err, row.err);
-        EXPECT_EQ(full.out, "");
-        arguments.insert(arguments.begin(), {"--broker", "lean"});
-        const Run lean = runTyped(arguments);
-        EXPECT_EQ(lean.exit, 0) << lean.err;
-        EXPECT_EQ(lean.out, row.leanOut);
-    }
-    const Run twice = runTyped({"ci", "Fix_Thing", "Name=a", "name=b"});
-    EXPECT_EQ(twice.exit, 4);
-    EXPECT_EQ(twice.err, "CIM_ERR_INVALID_PARAMETER (4): 'name' is given twice\n");
-}
-
 // Nothing fires in that process, and so it watches until it is told to end.
 TEST_F(CommandLine, WatchingEndsWithASignal) {
     const pid_t child = start({"--trace", "1", "watch", "Fix_Event"});

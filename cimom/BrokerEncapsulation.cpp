@@ -98,6 +98,7 @@ Node& anyNode(const void* object) {
     return node;
 }
 
+/// Its text; of what has none of its own, the name of its type.
 std::string describe(Node& node) {
     return withKind(node.chunk->kind, [&node](auto kind) -> std::string {
         using B = typename decltype(kind)::Body;
@@ -110,16 +111,6 @@ std::string describe(Node& node) {
             return printPath(body);
         } else if constexpr (std::is_same_v<B, DateTime>) {
             return body.text();
-        } else if constexpr (std::is_same_v<B, ArrayBody>) {
-            return printValue(Value::array(stringFor(body.elementType), body.elements));
-        } else if constexpr (std::is_same_v<B, std::shared_ptr<const Query>>) {
-            return body->text();
-        } else if constexpr (std::is_same_v<B, NamedValues>) {
-            std::string out = "{";
-            for (const auto& [name, value] : body) {
-                out += (out.size() > 1 ? ", " : "") + name + " = " + printValue(value);
-            }
-            return out + "}";
         } else {
             return kObjectTypes[node.chunk->kind];
         }

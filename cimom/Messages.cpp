@@ -2,10 +2,9 @@
 
 #include <algorithm>
 #include <cstdlib>
-#include <fstream>
-#include <nlohmann/json.hpp>
 
 #include "Failure.h"
+#include "Json.h"
 #include "Literal.h"
 
 namespace cimom {
@@ -93,18 +92,12 @@ MessageStore::Handle MessageStore::read(const std::string& file) {
     if (known != m_files.end()) {
         return known->second.get();
     }
-    std::ifstream in(file);
-    const auto json = in ? nlohmann::json::parse(in, nullptr, false) : nlohmann::json();
-    if (!json.is_object()) {
+    std::optional<MessageTexts> texts = readTexts(file);
+    if (!texts) {
         return nullptr;
     }
-    auto texts = std::make_unique<MessageTexts>();
-    for (const auto& [id, text] : json.items()) {
-        if (text.is_string()) {
-            texts->emplace(id, text.get<std::string>());
-        }
-    }
-    return m_files.emplace(file, std::move(texts)).first->second.get();
+    return m_files.emplace(file, std::make_unique<const MessageTexts>(std::move(*texts)))
+        .first->second.get();
 }
 
 MessageStore::Handle MessageStore::open(const std::string& bundle,

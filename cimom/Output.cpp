@@ -5,10 +5,10 @@
 
 #include <cerrno>
 #include <cstring>
-#include <nlohmann/json.hpp>
 #include <stdexcept>
 #include <utility>
 
+#include "Json.h"
 #include "PathText.h"
 
 namespace cimom {
@@ -61,65 +61,14 @@ bool ResultStream::write(const std::string& text) {
 
 namespace {
 
-using Json = nlohmann::ordered_json;
-
-Json toJson(const Instance& instance);
-
-Json toJson(const Value& value) {
-    if (value.isNull()) {
-        return nullptr;
-    }
-    if (value.isArray()) {
-        Json array = Json::array();
-        for (const Value& element : value.elements()) {
-            array.push_back(toJson(element));
-        }
-        return array;
-    }
-    if (value.type() == CMPI_boolean) {
-        return value.boolean();
-    }
-    if (isReal(value.type())) {
-        return value.real();
-    }
-    if (isInteger(value.type())) {
-        return value.isSigned() ? Json(value.sint()) : Json(value.uint());
-    }
-    return value.type() == CMPI_instance ? toJson(value.instance()) : Json(plainText(value));
-}
-
-// The names are known to differ, and so are put behind one another, not looked for.
-Json toJson(const NamedValues& values) {
-    Json::object_t object;
-    for (const auto& [name, value] : values) {
-        object.Json::object_t::Container::emplace_back(name, toJson(value));
-    }
-    return object;
-}
-
-Json toJson(const Instance& instance) {
-    return {{"path", printPath(instance.path)},
-            {"class", instance.path.className},
-            {"properties", toJson(instance.properties)}};
-}
-
 std::string toText(const Instance& instance) { return printInstance(instance); }
 std::string toText(const ObjectPath& path) { return printPath(path) + "\n"; }
 std::string toText(const std::string& name) { return name + "\n"; }
 
-// Texts of providers need not be UTF-8.
-std::string dump(const Json& json, int indent = 2) {
-    return json.dump(indent, ' ', false, Json::error_handler_t::replace) + "\n";
-}
-
 template <class List>
 std::string renderAll(const List& items, Format format) {
     if (format == Format::Json) {
-        Json array = Json::array();
-        for (const auto& item : items) {
-            array.push_back(toJson(item));
-        }
-        return dump(array);
+        return jsonOf(items);
     }
     std::string out;
     for (const auto& item : items) {
@@ -141,12 +90,12 @@ std::string render(const std::vector<std::string>& names, Format format) {
 }
 
 std::string render(const Value& value, Format format) {
-    return format == Format::Json ? dump(toJson(value)) : printValue(value) + "\n";
+    return format == Format::Json ? jsonOf(value) : printValue(value) + "\n";
 }
 
 std::string renderMethod(const Reply& reply, Format format) {
     if (format == Format::Json) {
-        return dump({{"returnValue", toJson(reply.value())}, {"out", toJson(reply.out)}});
+        return jsonOfMethod(reply);
     }
     std::string out = "returnValue = " + printValue(reply.value()) + ";\n";
     for (const auto& [name, value] : reply.out) {
@@ -156,7 +105,7 @@ std::string renderMethod(const Reply& reply, Format format) {
 }
 
 std::string renderEvent(const Indication& indication, Format format) {
-    return format == Format::Json ? dump(toJson(indication.instance), -1)
+    return format == Format::Json ? jsonLineOf(indication.instance)
                                   : printInstance(indication.instance);
 }
 

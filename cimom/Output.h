@@ -42,7 +42,6 @@ private:
 enum class Format { Text, Json };
 
 /// The parts of a reply as text that ends with a newline; empty for an empty list of texts.
-/// In JSON, instances are {path, class, properties}, and paths are their texts.
 std::string render(const std::deque<Instance>& instances, Format format);
 std::string render(const std::deque<ObjectPath>& paths, Format format);
 /// The return value and the output arguments of a method.

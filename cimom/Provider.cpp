@@ -3,108 +3,7 @@
 #include <dlfcn.h>
 #include <unistd.h>
 
-#include <algorithm>
-#include <nlohmann/json.hpp>
-#include <stdexcept>
-
 namespace cimom {
-
-// -- registration files -------------------------------------------------------------------------
-
-namespace {
-
-using Json = nlohmann::json;
-
-/// What is read of a registration, and where in it, for what is said of its faults.
-class Part {
-public:
-    Part(const Json& json, std::string place) : m_json(json), m_place(std::move(place)) {}
-
-    [[noreturn]] void refuse(const std::string& why) const {
-        throw std::runtime_error(m_place + ": " + why);
-    }
-    bool has(const char* name) const { return m_json.is_object() && m_json.contains(name); }
-    Part member(const char* name) const {
-        if (!has(name)) {
-            refuse('"' + std::string(name) + "\" is missing");
-        }
-        return {m_json.at(name), m_place + ": \"" + name + '"'};
-    }
-    /// Its elements; of what is no list, it alone.
-    std::vector<Part> oneOrMore() const {
-        if (!m_json.is_array()) {
-            return {*this};
-        }
-        std::vector<Part> parts;
-        for (const Json& each : m_json) {
-            parts.emplace_back(each, m_place);
-        }
-        return parts;
-    }
-    std::vector<std::pair<std::string, Part>> members() const {
-        if (!m_json.is_object()) {
-            refuse("not an object of classes");
-        }
-        std::vector<std::pair<std::string, Part>> all;
-        for (const auto& [name, json] : m_json.items()) {
-            all.emplace_back(name, Part(json, m_place + ": class " + name));
-        }
-        return all;
-    }
-    std::string text() const {
-        if (!m_json.is_string() || m_json.get_ref<const std::string&>().empty()) {
-            refuse("not a name");
-        }
-        return m_json.get<std::string>();
-    }
-
-private:
-    const Json& m_json;
-    const std::string m_place;
-};
-
-unsigned interfaceBit(const Part& part) {
-    const std::string name = part.text();
-    const unsigned bit = interfacesThat([&](const auto& kind) { return name == kind.name; });
-    if (bit != 0) {
-        return bit;
-    }
-    part.refuse("there is no interface '" + name + "', but " + interfaceNames(~0U));
-}
-
-Registration readRow(const std::string& className, const Part& row, const Part& whole) {
-    const auto either = [&](const char* name) {
-        return row.has(name) || !whole.has(name) ? row.member(name) : whole.member(name);
-    };
-    Registration registration;
-    registration.className = className;
-    registration.provider = row.member("provider").text();
-    registration.library = either("library").text();
-    for (const Part& name : either("namespace").oneOrMore()) {
-        registration.nameSpaces.push_back(name.text());
-    }
-    for (const Part& name : row.member("interfaces").oneOrMore()) {
-        registration.interfaces |= interfaceBit(name);
-    }
-    return registration;
-}
-
-Json parseJson(const std::string& file, const std::string& text) {
-    try {
-        return Json::parse(text);
-    } catch (const Json::parse_error& error) {
-        if (error.byte > text.size()) {
-            throw std::runtime_error(file + ": ends before its JSON does");
-        }
-        const std::string before = text.substr(0, error.byte > 0 ? error.byte - 1 : 0);
-        const auto line = std::count(before.begin(), before.end(), '\n') + 1;
-        const std::size_t column = before.size() - (before.rfind('\n') + 1) + 1;
-        throw std::runtime_error(file + ":" + std::to_string(line) + ":" + std::to_string(column) +
-                                 ": not JSON from here on");
-    }
-}
-
-}  // namespace
 
 std::string interfaceNames(unsigned bits) {
     std::string names;
@@ -115,24 +14,6 @@ std::string interfaceNames(unsigned bits) {
         return false;
     });
     return names;
-}
-
-std::vector<Registration> readRegistration(const std::string& file) {
-    std::string text;
-    try {
-        text = readRegularFile(file);
-    } catch (const std::exception& e) {
-        throw std::runtime_error(file + ": cannot be read: " + e.what());
-    }
-    const Json json = parseJson(file, text);
-    const Part whole(json, file);
-    std::vector<Registration> rows;
-    for (const auto& [className, entry] : whole.member("classes").members()) {
-        for (const Part& row : entry.oneOrMore()) {
-            rows.push_back(readRow(className, row, whole));
-        }
-    }
-    return rows;
 }
 
 // -- libraries ------------------------------------------------------------------------------------

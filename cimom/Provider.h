@@ -1,21 +1,4 @@
 /// Providers: where they come from, their CMPI interfaces, and their life from load to unload.
-///
-/// A registration file is JSON and says which class is served by which provider:
-///
-///     {
-///       "namespace": "root/cimv2",
-///       "library": "zemproviders",
-///       "classes": {
-///         "ORXC_Host": {"provider": "ORXC_HostProvider", "interfaces": ["instance", "method"]},
-///         "ORXC_HostedPartition": [{"provider": "A", "interfaces": ["association"]},
-///                                  {"provider": "B", "interfaces": ["instance"]}]
-///       }
-///     }
-///
-/// "namespace" may be a list, and both it and "library" may stand again in a row of "classes".
-/// Interfaces are instance, association, method, indication and property. A library is a file
-/// name, or a bare name that stands for lib<name>.so; it is looked for in the folder of the
-/// registration file, then in the server's library folders, then by the system's loader.
 #ifndef CIMOM_PROVIDER_H
 #define CIMOM_PROVIDER_H
 
@@ -29,17 +12,6 @@
 
 namespace cimom {
 
-/// One row of a registration.
-struct Registration {
-    std::string className;
-    std::string provider;
-    std::string library;
-    std::vector<std::string> nameSpaces;
-    unsigned interfaces = 0;  ///< bits of Interface
-};
-
-/// @throws std::runtime_error with the file and the reason
-std::vector<Registration> readRegistration(const std::string& file);
 /// "lib<name>.so" for a bare name, any other name as it stands.
 std::string libraryFileName(const std::string& name);
 

@@ -373,10 +373,6 @@ bool LogCollector::contains(LogLine::Kind kind, int level, const std::string& co
                line.text.find(text) != std::string::npos;
     });
 }
-void LogCollector::clear() {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    m_lines.clear();
-}
 
 namespace {
 

@@ -293,7 +293,6 @@ public:
     /// Whether a line has the level and component and contains the text.
     bool contains(LogLine::Kind kind, int level, const std::string& component,
                   const std::string& text) const;
-    void clear();
 
 private:
     Server& m_server;

@@ -5,6 +5,7 @@
 #include <algorithm>
 #include <set>
 
+#include "Json.h"
 #include "PathText.h"
 
 namespace cimom {

@@ -1,4 +1,4 @@
-// The one road from the server's C calls to a provider's virtual operations, and back.
+// The one way from the server's C calls to a provider's virtual operations, and back.
 //
 // Nothing but a status may cross into the server. Every exception becomes one here, save the
 // unwinding of a cancelled thread, which must reach the end of the thread's stack.

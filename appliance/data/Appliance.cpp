@@ -4,13 +4,16 @@
 
 #include <CLI/CLI.hpp>
 #include <chrono>
+#include <csignal>
 #include <cstdio>
 #include <iostream>
+#include <limits>
 
 #include "Appliances.h"
 #include "Check.h"
 #include "Failure.h"
 #include "FaultCommand.h"
+#include "Json.h"
 #include "Show.h"
 
 namespace {
@@ -97,39 +100,28 @@ int checkState() {
     return findings.empty() ? 0 : kExitRefused;
 }
 
-int run(int argc, char** argv) {
-    CLI::App app{"Makes and shows the state of an appliance that manages partitioned hosts."};
-    app.footer(kFooter);
-    app.require_subcommand(0, 1);  // with one at least, a mistyped one would not be named
-    app.set_version_flag("--version", "appliance " APPLIANCE_VERSION);
+struct Options {
     bool force = false, asJson = false;
     Size size{3, 10, 1};
     std::string format = "text";
     std::int64_t after = 0;
-    int status = 0;
+    FaultOptions fault;
+    int status = 0;  ///< what a verb that did its work ends with
+};
 
+void addMakers(CLI::App& app, Options& options) {
     CLI::App* init = app.add_subcommand(
         "init", "Make the demo appliance: four hosts in four states, fourteen partitions.");
-    init->callback([&] { fill(force, fillDemo); });
+    init->callback([&options] { fill(options.force, fillDemo); });
     CLI::App* generate = app.add_subcommand(
         "generate", "Make an appliance of any size; the same options always make the same one.");
-    generate->callback([&] {
+    Size& size = options.size;
+    generate->callback([&options, &size] {
         Progress progress(size.hosts);
-        fill(force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
+        fill(options.force, [&](Store& store) { fillGenerated(store, size, std::ref(progress)); });
     });
-    CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
-    show->callback([&] { showState(format); });
-    CLI::App* journal = app.add_subcommand(
-        "journal", "Show the journal of changes, each with its number: oldest first.");
-    journal->callback([&] { showJournal(after, asJson); });
-    app.add_subcommand("check",
-                       "Check that the state obeys the rules of hosts, and print those that it "
-                       "breaks.")
-        ->callback([&] { status = checkState(); });
-    addFaultCommand(app);
-
     for (CLI::App* maker : {init, generate}) {
-        maker->add_flag("--force", force, "Replace an appliance that is there already");
+        maker->add_flag("--force", options.force, "Replace an appliance that is there already");
     }
     generate->add_option("--hosts", size.hosts, "How many hosts")
         ->check(CLI::Range(std::int64_t{0}, kMostHosts))
@@ -138,13 +130,59 @@ int run(int argc, char** argv) {
         ->check(CLI::Range(std::int64_t{0}, kMostLpars))
         ->capture_default_str();
     generate->add_option("--seed", size.seed, "Start of the random choices")->capture_default_str();
-    show->add_option("--format", format, "text, or json with every attribute that was set")
+}
+
+void addReaders(CLI::App& app, Options& options) {
+    CLI::App* show = app.add_subcommand("show", "Show hosts and partitions.");
+    show->callback([&options] { showState(options.format); });
+    show->add_option("--format", options.format, "text, or json with every attribute that was set")
         ->check(CLI::IsMember({"text", "json"}))
         ->capture_default_str();
-    journal->add_option("--after", after, "Only changes behind the one with this number")
+    CLI::App* journal = app.add_subcommand(
+        "journal", "Show the journal of changes, each with its number: oldest first.");
+    journal->callback([&options] { showJournal(options.after, options.asJson); });
+    journal->add_option("--after", options.after, "Only changes behind the one with this number")
         ->check(CLI::NonNegativeNumber)
         ->capture_default_str();
-    journal->add_flag("--json", asJson, "A JSON object in a line for each change");
+    journal->add_flag("--json", options.asJson, "A JSON object in a line for each change");
+    app.add_subcommand("check",
+                       "Check that the state obeys the rules of hosts, and print those that it "
+                       "breaks.")
+        ->callback([&options] { options.status = checkState(); });
+}
+
+void addFault(CLI::App& app, FaultOptions& options) {
+    constexpr std::int64_t kMost = std::numeric_limits<std::int32_t>::max();
+    CLI::App* fault = app.add_subcommand(
+        "fault",
+        "Let the next calls of a tool (qyplat ...) or of an operation of the management library\n"
+        "(getCecObj ...) go wrong. Without a name: show what is planned.");
+    fault->callback([&options] { carryOut(options); });
+    fault->add_option("name", options.plan.name, "Tool or operation")
+        ->check(CLI::Validator(judgeFaultName, ""));
+    fault->add_option("--calls", options.plan.calls, "How many calls")
+        ->check(CLI::Range(std::int64_t{1}, kMost))
+        ->capture_default_str();
+    fault->add_option("--code", options.code,
+                      "Exit status of a tool, or return code of an operation; null lets an "
+                      "operation return no result at all");
+    fault->add_option("--text", options.plan.text, "What a tool writes to standard error");
+    fault->add_option("--delay", options.plan.delay, "Milliseconds before anything else")
+        ->check(CLI::Range(std::int64_t{0}, kMost));
+    fault->add_option("--signal", options.plan.signal, "Number of the signal that ends a tool")
+        ->check(CLI::Range(1, SIGRTMAX));
+    fault->add_flag("--clear", options.clear, "Forget what is planned");
+}
+
+int run(int argc, char** argv) {
+    CLI::App app{"Makes and shows the state of an appliance that manages partitioned hosts."};
+    app.footer(kFooter);
+    app.require_subcommand(0, 1);  // with one at least, a mistyped one would not be named
+    app.set_version_flag("--version", "appliance " APPLIANCE_VERSION);
+    Options options;
+    addMakers(app, options);
+    addReaders(app, options);
+    addFault(app, options.fault);
     for (CLI::App* verb : app.get_subcommands({})) {
         verb->footer(kFooter);
     }
@@ -157,7 +195,7 @@ int run(int argc, char** argv) {
     } catch (const CLI::ParseError& error) {
         return app.exit(error) == 0 ? 0 : kExitUsage;
     }
-    return status;
+    return options.status;
 }
 
 }  // namespace

@@ -2,36 +2,15 @@
 
 #include <algorithm>
 #include <ctime>
-#include <nlohmann/json.hpp>
 #include <set>
 
 #include "Check.h"
 #include "Failure.h"
+#include "Json.h"
 #include "LparState.h"
 #include "Text.h"
 
 namespace appliance {
-
-namespace {
-
-using Json = nlohmann::ordered_json;
-
-/// The attributes that @p object has set; where there is an @p other, those that differ between
-/// them, whichever set them.
-Json attributes(const Object& object, const std::optional<Object>& other) {
-    Json json = Json::object();
-    for (const Object* setter : {&object, other ? &*other : &object}) {
-        for (const auto& setting : setter->settings()) {
-            const std::string name(setting.first), value = object.get(name);
-            if (!other || value != other->get(name)) {
-                json[name] = value;
-            }
-        }
-    }
-    return json;
-}
-
-}  // namespace
 
 const HostView& Change::host() {
     if (!m_session) {
@@ -102,42 +81,15 @@ void Change::remove(const Object& object) {
 }
 
 std::string Change::journalLine() {
-    Json objects = Json::array();
+    std::vector<ChangedObject> objects;
     for (const auto& [key, before] : m_before) {
         const auto& [kind, place] = key;
-        const std::optional<Object> after = m_session->store.find(kind, place);
-        if (!before && !after) {
-            continue;
-        }
-        const char* event = !before ? "add" : !after ? "delete" : "modify";
-        Json object = {{"event", event},
-                       {"kind", kindName(kind)},
-                       {"host", view(place.host).mtms()},
-                       {"lpar", place.lpar},
-                       {"number", place.number}};
-        if (before) {
-            object["old"] = attributes(*before, after);
-        }
-        if (after) {
-            object["new"] = attributes(*after, before);
-        }
-        const bool same = before && after && object["new"].empty();
-        if (!same) {
-            objects.push_back(std::move(object));
+        std::optional<Object> after = m_session->store.find(kind, place);
+        if (before || after) {
+            objects.push_back({view(place.host).mtms(), before, std::move(after)});
         }
     }
-    if (objects.empty()) {
-        return {};
-    }
-    Json line = {{"tool", m_request.tool().name}, {"time", std::time(nullptr)}};
-    for (const auto& [name, values] : m_notes) {
-        for (const auto& [key, value] : values) {
-            line[name][key] = value;
-        }
-    }
-    line["objects"] = std::move(objects);
-    // Names may hold bytes that are no text in UTF-8, which the stored state keeps as they are.
-    return line.dump(-1, ' ', false, Json::error_handler_t::replace);
+    return appliance::journalLine(m_request.tool().name, std::time(nullptr), m_notes, objects);
 }
 
 void Change::note(const char* name, std::vector<std::pair<const char*, std::string>> values) {

@@ -3,13 +3,7 @@
 /// What is put and removed is seen at once by the change itself, and by others when it is
 /// committed. Before that, the rules that every appliance obeys (Check.h) are applied to the hosts
 /// that were touched: a change that would break one is refused, and nothing of it remains. The
-/// journal's line is a JSON object with the tool, the time, and each object that differs
-/// afterwards:
-///
-///     {"tool":"edplat","time":1700000000,"objects":[{"event":"modify","kind":"lpar",
-///      "host":"1111-AAA*0000001","lpar":3,"number":0,"old":{"name":"web"},"new":{"name":"www"}}]}
-///
-/// "old" and "new" have the attributes that differ; an "add" has no "old", a "delete" no "new".
+/// journal's line (Json.h) tells of each object that differs afterwards.
 ///
 ///     Change change(request);
 ///     Object lpar = change.lpar();
@@ -25,6 +19,7 @@
 #include <string>
 #include <vector>
 
+#include "Json.h"
 #include "Request.h"
 #include "View.h"
 
@@ -89,7 +84,7 @@ private:
     std::unique_ptr<Session> m_session;  ///< while the change is under way
     std::int64_t m_host = 0;
     std::map<std::pair<Kind, Place>, std::optional<Object>> m_before;
-    std::map<std::string, std::vector<std::pair<const char*, std::string>>> m_notes;
+    JournalNotes m_notes;
 };
 
 /// @param states  with commas between them

@@ -1,13 +1,9 @@
 // edalloc, edplat, nwplat and dlplat: tools and management library show what they change; what they
 // refuse changes nothing.
 
-#include <nlohmann/json.hpp>
+#include <regex>
 
 #include "ApiAnswer.h"
-#include "EdallocCmdCaller.h"
-#include "EdplatCmdCaller.h"
-#include "Exception.h"
-#include "NwplatCmdCaller.h"
 
 namespace {
 
@@ -241,63 +237,14 @@ TEST_F(ChangeToolsTest, TheJournalTellsWhatChanged) {
     const auto since = std::time(nullptr);
     out("edplat -r lpar -m alpha -i '\"lpar_id=3\",\"new_name=\xff\"'");
     out("edalloc -r io --rsubtype slot -m alpha -o a --id 4 -l 30000006");
-    const auto lines = testing_support::lines(out("appliance journal --json"));
-    ASSERT_EQ(2U, lines.size());
-    const auto rename = nlohmann::json::parse(lines[0]);
-    EXPECT_EQ(1, rename["number"]);
-    EXPECT_EQ("edplat", rename["tool"]);
-    EXPECT_LE(since, rename["time"].get<std::time_t>());
-    EXPECT_EQ(nlohmann::json::parse(R"([{"event": "modify", "kind": "lpar", "lpar": 3, "number": 0,
-        "host": "1111-AAA*0000001", "old": {"name": "web server"}, "new": {"name": "�"}}])"),
-              rename["objects"]);
-    const auto slot = nlohmann::json::parse(lines[1])["objects"];
-    ASSERT_EQ(2U, slot.size());
-    EXPECT_EQ("delete", slot[0]["event"]);
-    EXPECT_EQ("add", slot[1]["event"]);
-    EXPECT_EQ(4, slot[1]["lpar"]);
-}
-
-using Pairs = zemDynamicArray<tagAttributePair>;
-
-Pairs pairs(const std::vector<std::pair<int, const char*>>& values) {
-    Pairs all;
-    for (const auto& [index, value] : values) {
-        all.addElement(new tagAttributePair{index, value});
-    }
-    return all;
-}
-
-TEST_F(ChangeToolsTest, TheLibrarysCallersAreUnderstood) {
-    using Vlan = zemEdallocCmdCaller::AddVETHAttribute;
-    using Profile = zemEdplatCmdCaller::PartitionProfileAttribute;
-    using New = zemNwplatCmdCaller::PartitionAttribute;
-    const char* host = "1111-AAA*0000001";
-    zemEdallocCmdCaller edalloc("", "");
-    zemEdplatCmdCaller edplat("", "");
-    edalloc.addMemory(host, "4", 0, 1024, nullptr, nullptr);
-    edalloc.addProcessing(host, "4", 100, 50, nullptr, nullptr);
-    edalloc.addIOSlot(host, "4", "30000006", Pairs(), nullptr, nullptr);
-    edalloc.removeIOSlot(host, "4", "30000006", nullptr, nullptr);
-    const Pairs vlans = pairs({{Vlan::ATTR_IEEE_VIRTUAL_ETH, "1"},
-                               {Vlan::ATTR_PORT_VLAN_ID, "4"},
-                               {Vlan::ATTR_ADDL_VLAN_IDS, "5,7"}});
-    edalloc.addVETH(host, "3", 5, vlans, nullptr, nullptr);
-    edplat.addPartitionsProfileInformation(
-        "normal", pairs({{Profile::ATTR_VIRTUAL_ETH_ADAPTERS, R"(\"\"7/1/1/5,7//0\"\")"}}), "4",
-        host);
-    EXPECT_THROW(edplat.modifyPartitionsProfileInformation("x", Pairs(), "4", host),
-                 zemOperationFailedException);
-    zemNwplatCmdCaller("", "").makePartitionsInformation(pairs({{New::ATTR_NAME, "a, b"},
-                                                                {New::ATTR_LPAR_ENV, "osq00"},
-                                                                {New::ATTR_ALL_RESOURCES, "1"}}),
-                                                         host);
-    expectRows({
-        {"qyalloc -r mem --level lpar -m alpha --filter lpar_ids=4 -F curr_mem", "17408\n"},
-        {"qyplat -r prof -m alpha --filter lpar_ids=4,profile_names=normal -F virtual_eth_adapters",
-         "\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/storage\"\",\"\"7/1/1/5,7/0/0/default\"\"\"\n"},
-        {"qyplat -r lpar -m alpha --filter lpar_ids=8 -F name", "\"a, b\"\n"},
-        {"appliance journal --json | wc -l", "7\n"},
-    });
+    const std::string journal = out("appliance journal --json");
+    const std::regex time(R"("time":(\d+),)"), slot(R"(\{"unit_phys_loc":[^}]*"30000006"\})");
+    EXPECT_LE(since, std::stoll((*std::sregex_iterator(journal.begin(), journal.end(), time))[1]));
+    EXPECT_EQ(
+        R"({"number":1,"tool":"edplat","objects":[{"event":"modify","kind":"lpar","host":"1111-AAA*0000001","lpar":3,"number":0,"old":{"name":"web server"},"new":{"name":"�"}}]}
+{"number":2,"tool":"edalloc","objects":[{"event":"delete","kind":"slot","host":"1111-AAA*0000001","lpar":0,"number":6,"old":SLOT},{"event":"add","kind":"slot","host":"1111-AAA*0000001","lpar":4,"number":6,"new":SLOT}]}
+)",
+        std::regex_replace(std::regex_replace(journal, time, ""), slot, "SLOT"));
 }
 
 }  // namespace

@@ -2,8 +2,6 @@
 // nothing.
 
 #include "ApiAnswer.h"
-#include "EdpowerCaller.h"
-#include "EdsuspCaller.h"
 
 namespace {
 
@@ -212,25 +210,6 @@ TEST_F(PowerToolsTest, WhatIsRefusedChangesNothing) {
         "edpower -r sys -o off -m alpha");
     EXPECT_EQ("WRTL8063 Partitions are active on the managed system; --immed ends them.\n",
               active.err);
-}
-
-TEST_F(PowerToolsTest, TheLibrarysCallersWorkThem) {
-    testing::internal::CaptureStdout();  // their log
-    EdpowerCaller power("", "");
-    power.setResource(1);
-    power.setOperation(1);
-    power.setManagedSystem("1111-AAB*0000002");
-    power.setLparId(1);
-    power.setLparProfileName("normal");
-    EXPECT_NO_THROW(power.run());
-    EdsuspCaller suspend("", "");
-    suspend.setOperation(2);
-    suspend.setManagedSystem("alpha");
-    suspend.setLparId(5);
-    EXPECT_NO_THROW(suspend.run());
-    testing::internal::GetCapturedStdout();
-    EXPECT_EQ("Running\n", out("qyplat -r lpar --filter lpar_ids=1 -F state" BETA));
-    EXPECT_EQ("Running\n", out("qyplat -r lpar -m alpha --filter lpar_ids=5 -F state"));
 }
 
 }  // namespace

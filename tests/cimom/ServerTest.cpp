@@ -138,6 +138,44 @@ TEST_P(Operations, MethodsTakeAndGive) {
     m_kept = 1;  // the leak shows
 }
 
+TEST_P(Operations, UpcallsReachEveryOperation) {
+    const RequestScope scope(m_server);
+    const CMPIBroker* mb = m_server.broker();
+    const CMPIContext* ctx = scope.context();
+    const CMPIObjectPath *one = scope.wrap(thing("one")), *three = scope.wrap(thing("three"));
+    const auto sized = [&](std::uint32_t size) {
+        return scope.wrap(Instance(thing("three"), {{"Name", "three"}, {"Size", size}}));
+    };
+    const auto size = [&] { return CBGetProperty(mb, ctx, three, "Size", nullptr).value.uint32; };
+    const auto count = [](CMPIEnumeration* all) {
+        return all ? CMGetArrayCount(CMToArray(all, nullptr), nullptr) : 1000;
+    };
+    EXPECT_EQ(RequestScope::read(CBCreateInstance(mb, ctx, three, sized(3), nullptr)),
+              thing("three"));
+    EXPECT_EQ(CBModifyInstance(mb, ctx, three, sized(4), nullptr).rc, CMPI_RC_OK);
+    EXPECT_EQ(size(), 4U);
+    const CMPIUint32 five = 5;
+    EXPECT_EQ(CBSetProperty(mb, ctx, three, "Size", &five, CMPI_uint32).rc, CMPI_RC_OK);
+    EXPECT_EQ(size(), 5U);
+    const char* const query = "SELECT * FROM Fix_Thing WHERE Size > 4";
+    EXPECT_EQ(count(CBExecQuery(mb, ctx, three, query, "WQL", nullptr)), 1U);
+    EXPECT_EQ(CBDeleteInstance(mb, ctx, three).rc, CMPI_RC_OK);
+    EXPECT_EQ(count(CBEnumInstanceNames(mb, ctx, one, nullptr)), 2U);
+    const char *no = nullptr, *link = "Fix_Link", *far = "Dependent";  // which the fixture minds
+    EXPECT_EQ(count(CBAssociators(mb, ctx, one, link, no, no, far, nullptr, nullptr)), 1U);
+    EXPECT_EQ(count(CBAssociatorNames(mb, ctx, one, link, no, no, far, nullptr)), 1U);
+    EXPECT_EQ(count(CBReferences(mb, ctx, one, link, no, nullptr, nullptr)), 1U);
+    EXPECT_EQ(count(CBReferenceNames(mb, ctx, one, link, far, nullptr)), 0U);
+
+    // Properties of a class whose provider has no entries for them go with the instance.
+    Server plain({GetParam(), "", {}, fixture::classes()});
+    plain.registerProvider("Fixture", {"Fix_Thing"}, {fixture::factories().instance});
+    for (const std::uint32_t value : {9U, 1U}) {
+        EXPECT_EQ(plain.setProperty({}, thing("one"), "Size", value).rc, CMPI_RC_OK);
+        EXPECT_EQ(plain.getProperty({}, thing("one"), "Size").value(), Value(value));
+    }
+}
+
 TEST_P(Operations, QueriesAreAnsweredByEnumeration) {
     const Reply reply = m_server.execQuery(m_request, "SELECT Name FROM Fix_Base WHERE Size > 1");
     ASSERT_EQ(reply.instances.size(), 1U) << reply.message;

@@ -224,14 +224,6 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
     }
 }
 
-TEST_P(RequestTest, TimingTraceIsWrittenWhenAskedFor) {
-    const std::string file = (m_appliance.folder() / "timing").string();
-    ScopedEnvironment on("VM_CIMPROVIDER_TRACE", "1"), path("VM_CIMPROVIDER_TRACE_PATH", file);
-    EXPECT_EQ(cimom("ei ORXC_CEC_CS").exit, 0);
-    EXPECT_TRUE(std::filesystem::exists(file));
-    EXPECT_FALSE(std::filesystem::exists(m_appliance.folder() / "CIMTestPerfData.txt"));
-}
-
 INSTANTIATE_TEST_SUITE_P(Brokers, RequestTest, ::testing::Values("full", "lean"),
                          [](const auto& broker) { return std::string(broker.param); });
 

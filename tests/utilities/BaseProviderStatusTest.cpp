@@ -29,16 +29,9 @@ TEST_P(BaseProviderStatus, ThrowsTheFamily) {
          "8/CIM_ERR_METHOD_NOT_FOUND (The invoked method  M is not supported for class K)"},
         {[&] { p.throwUserAccessDeniedExc("M", "K", nullptr); },
          "1/User  is not authorized to utilize M operation of class K on provider TestProvider."},
-        {[&] { p.throwKeyValueDoesntMatchExc("M", "K", "k", "1", "2"); },
-         "3/A key provided for class K to method M on provider TestProvider had an unexpected "
-         "value. A value of 1 was provided for key k instead of the expected value of 2."},
         {[&] { p.throwInvalidPropertyExc("M", "K", "100%s$M"); },
          "3/Invalid property name 100%s$M for class K is provided to method M on provider "
          "TestProvider."},
-        {[&] { p.throwDuplicateMethodArgExc("a", "M"); },
-         "3/Duplicate method argument a when invoking method M on provider TestProvider."},
-        {[&] { p.throwParameterNotFoundExc("a"); },
-         "3/Parameter a is not found in provided parameters."},
     };
     for (const auto& [call, text] : rows) {
         testing::internal::CaptureStdout();

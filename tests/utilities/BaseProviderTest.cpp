@@ -10,15 +10,7 @@ namespace {
 
 using cimom::Character;
 
-bool enabled = true;
 const TimingTrace timing("zemBaseProviderTest");
-
-}  // namespace
-
-// A deployment's own answer, as it would be put ahead of the library's.
-CMPIBoolean zemBaseProvider::isProviderEnabled(const CmpiContext&) { return enabled; }
-
-namespace {
 
 enum Rule { kOrdinary, kEnumeration, kMethod, kIndication };
 
@@ -108,7 +100,7 @@ std::string general(const std::string& text) {
 
 class BaseProvider : public BothBrokers {
 protected:
-    BaseProvider() : h(GetParam()) { enabled = true; }
+    BaseProvider() : h(GetParam()) {}
     Harness h;
 };
 
@@ -215,51 +207,14 @@ TEST_P(BaseProvider, AnswersFailuresByTheRuleOfTheOperation) {
     EXPECT_THROW(h.provider().enableIndications(CmpiContext(h.ctx())), int);
 }
 
-TEST_P(BaseProvider, WantsTheEssentialKeys) {
-    script.keys = {"Name", "Serial"};
-    for (const Operation& op : kOperations) {
-        const bool wants = op.rule == kOrdinary && op.refusal != nullptr;
-        if (op.rule == kMethod) {
-            continue;
-        }
-        const Answer answer = op.call(h);
-        EXPECT_EQ(wants ? CMPI_RC_ERR_INVALID_PARAMETER : CMPI_RC_OK, answer.rc) << op.name;
-        EXPECT_EQ(wants ? "Key Serial for class Test_Disk is not provided to method " +
-                              std::string(op.refusal) + " on provider TestProvider."
-                        : "",
-                  answer.text);
-    }
-    // Those of a setInstance may stand on the instance; without any on the path, nothing is looked
-    // up.
-    script = Script();
+TEST_P(BaseProvider, FindsEssentialKeysOnTheInstanceToo) {
+    // Without any on the path, nothing is looked up.
     const Answer set = h.call(h.instance, &I::modifyInstance, h.classPath(), h.disk(), no);
     EXPECT_EQ(CMPI_RC_OK, set.rc);
     EXPECT_EQ(1U, script.calls.size());
     EXPECT_EQ(1, set.traced("Exiting method setInstance"));
-}
-
-TEST_P(BaseProvider, ValidatesNamesAndKeys) {
-    const char* names[] = {"Caption", "caption", nullptr};
-    const auto where =
-        " for class Test_Disk is provided to method enumerateInstances on provider "
-        "TestProvider.";
-    const auto enumerate = [&] {
-        return h.call(h.instance, &I::enumerateInstances, h.classPath(),
-                      static_cast<const char**>(names));
-    };
-    EXPECT_EQ(std::string("Duplicate property name Caption") + where, enumerate().text);
-    names[1] = "Colour";
-    EXPECT_EQ(std::string("Invalid property name Colour") + where, enumerate().text);
-
     script.keys.clear();  // an instance without properties is not looked at
     EXPECT_EQ(CMPI_RC_OK, h.call(h.instance, &I::createInstance, h.classPath(), h.disk({})).rc);
-    script.name = "other";
-    for (const std::string name : {"getInstance", "getProperty"}) {
-        EXPECT_EQ("A key provided for class Test_Disk to method " + name +
-                      " on provider TestProvider had an unexpected value. A value of d1 was "
-                      "provided for key Name instead of the expected value of other.",
-                  call(h, name).text);
-    }
 }
 
 TEST_P(BaseProvider, AnswersAndSetsOneProperty) {
@@ -337,26 +292,6 @@ TEST_P(BaseProvider, RefusesKeysThatNoServerPrints) {
         }
     }
     EXPECT_EQ(4095U, longest);
-}
-
-TEST_P(BaseProvider, StaysSilentWhenDisabled) {
-    enabled = false;
-    for (const char* name : {"enumInstances", "enumInstanceNames", "associators", "associatorNames",
-                             "references", "referenceNames"}) {
-        const Answer answer = call(h, name);
-        EXPECT_EQ(CMPI_RC_OK, answer.rc);
-        EXPECT_TRUE(answer.reply.done);
-        EXPECT_EQ(1, answer.traced(std::string("Exiting method ") + name));
-    }
-    EXPECT_TRUE(script.calls.empty());
-    const Answer answer = call(h, "getInstance");
-    EXPECT_EQ(CMPI_RC_ERR_NOT_FOUND, answer.rc);
-    EXPECT_EQ(
-        "The requested object The XBRG is managed by DNX, this provider on the XGRB in dissabled. "
-        "of class zemBaseProvider can not be found. The exception was thrown from method "
-        "getInstance on provider TestProvider.",
-        answer.text);
-    EXPECT_EQ(CMPI_RC_OK, call(h, "deleteInstance").rc);
 }
 
 // begin and end have one key; the outer getInstance has a mark of its own; an enumeration that

@@ -85,12 +85,7 @@ TEST_P(BaseZemProvider, TestsPropertiesOfInstances) {
     const std::string unexpected =
         "3/A property provided for class Test_Disk had an unexpected value. An invalid value of ";
     const std::pair<std::function<void()>, std::string> rows[] = {
-        {[&] { service.validateRequestedProperty(disk, "Caption"); },
-         "3/The requested property  \"Caption\" for class Test_Disk was not provided."},
         {[&] { service.validateUnsupportedProperty(disk, "Caption"); }, ""},
-        {[&] { service.validateUnimplementedProperty(disk, "Name"); },
-         "3/Attempt to create or modify unimplemented property \"Name\" of class Test_Disk to "
-         "\"d1\"."},
         {[&] { service.validateUnmodifiableProperty(other, disk, "Caption"); }, ""},
         {[&] { service.validateUnmodifiableProperty(other, disk, "Size"); },
          "3/Attempt to change unmodifiable property \"Size\" of class Test_Disk from 8 to 7."},
@@ -108,25 +103,6 @@ TEST_P(BaseZemProvider, TestsPropertiesOfInstances) {
     for (const auto& [call, text] : rows) {
         EXPECT_EQ(text, failureText(call, "kt"));
     }
-}
-
-TEST_P(BaseZemProvider, FetchesEmbeddedObjects) {
-    h.server.registerProvider("Disks", {"Test_Disk"}, FactoriesOf<DiskProvider>::all());
-    const auto check = [&](CMPIObjectPath* path) {
-        const CmpiContext ctx(h.ctx());
-        const CmpiObjectPath target(path);
-        return failureText([&] { service.validateEmbeddedObject(ctx, target, "Target", "Force"); },
-                           "kt");
-    };
-    const std::string end =
-        " is provided for parameter Target to method Force on provider Service.";
-    EXPECT_EQ("", check(h.path()));
-    EXPECT_EQ("3/Invalid value of root/cimv2:Test_Disk" + end, check(h.classPath()));
-    EXPECT_EQ("3/Invalid value of root/cimv2:Test_Disk.Name=\"x9\"" + end, check(h.path("x9")));
-    h.className = "Test_Unserved";
-    EXPECT_EQ(0U, check(h.path()).find("6/An error ocurred, when validate value "
-                                       "root/cimv2:Test_Unserved.Name=\"d1\" of parameter "
-                                       "\"Target\". And the error string was \""));
 }
 
 TEST_P(BaseZemProvider, ServesArraysThroughTheFrame) {

@@ -1,9 +1,8 @@
 #include <gtest/gtest.h>
-#include <malloc.h>
 
-#include <new>
 #include <tuple>
 
+#include "FailingAllocation.h"
 #include "RecordParser.h"
 #include "TimingTrace.h"
 #include "ToolFolder.h"
@@ -20,12 +19,6 @@ public:
 };
 
 const TimingTrace timing("zemcommandtrace");
-
-/// What this thread has allocated, and how often it still may; -1: for ever.
-thread_local struct {
-    long held = 0;
-    long left = -1;
-} heap;
 
 constexpr const char* kNames[] = {"lpar_id", "name", "state", "mode"};
 
@@ -92,19 +85,20 @@ TEST(RecordParserTest, RecordsTakeWhatTheirFieldsTake) {
         const std::string output = line + '\n' + line + '\n' + line + '\n';
         bool parsed = false;
         for (long allocations = 0; !parsed; ++allocations) {
-            const long before = heap.held;
+            const long before = FailingAllocation::bytes();
             try {
                 zemRecordSetsType records(0, 25, 1);
-                heap.left = allocations;
-                parsed = zemParseRecords(output, nullptr, kFields, records);
-                heap.left = -1;
-                EXPECT_GE(3 * (300 + texts * 96), heap.held - before) << line;
+                {
+                    const FailingAllocation failing(allocations);
+                    parsed = zemParseRecords(output, nullptr, kFields, records);
+                }
+                EXPECT_GE(3 * (300 + texts * 96), FailingAllocation::bytes() - before) << line;
                 zemString last;
                 EXPECT_EQ(0, records.getElementAt(2)->lookup(kFields - 1, last));
             } catch (const std::bad_alloc&) {
-                heap.left = -1;
             }
-            ASSERT_EQ(before, heap.held) << "without the allocation " << allocations;
+            ASSERT_EQ(before, FailingAllocation::bytes())
+                << "without the allocation " << allocations;
         }
     }
 }
@@ -241,18 +235,3 @@ TEST(CommandCallerTest, CutsTheFrontOfALine) {
 }
 
 }  // namespace
-
-void* operator new(size_t size) {
-    void* const memory = heap.left == 0 ? nullptr : std::malloc(size);
-    if (memory == nullptr) {
-        throw std::bad_alloc();
-    }
-    heap.left -= heap.left > 0;
-    heap.held += static_cast<long>(malloc_usable_size(memory));
-    return memory;
-}
-void operator delete(void* memory) noexcept {
-    heap.held -= static_cast<long>(malloc_usable_size(memory));
-    std::free(memory);
-}
-void operator delete(void* memory, size_t) noexcept { operator delete(memory); }

@@ -2,6 +2,8 @@
 /// allocation functions for all of it, the libraries too.
 #pragma once
 
+#include <malloc.h>
+
 #include <atomic>
 #include <cstdint>
 #include <cstdlib>
@@ -17,6 +19,8 @@ public:
 
     /// How many allocations of the program have not been given back.
     static long live() { return s_live; }
+    /// What this thread has taken and not given back, in bytes.
+    static long bytes() { return s_bytes; }
 
     /// The size beyond which allocations of this thread fail.
     inline static thread_local std::size_t s_most = SIZE_MAX;
@@ -30,11 +34,13 @@ public:
             throw std::bad_alloc();
         }
         ++s_live;
+        s_bytes += static_cast<long>(malloc_usable_size(memory));
         return memory;
     }
     static void release(void* memory) {
         if (memory != nullptr) {
             --s_live;
+            s_bytes -= static_cast<long>(malloc_usable_size(memory));
         }
         std::free(memory);
     }
@@ -42,6 +48,7 @@ public:
 private:
     static constexpr long kNone = 1L << 40;
     inline static thread_local long s_left = kNone;
+    inline static thread_local long s_bytes = 0;
     inline static std::atomic<long> s_live{0};
 };
 

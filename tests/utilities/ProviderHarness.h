@@ -21,7 +21,6 @@ struct Script {
     std::vector<std::string> keys = {"Name"};
     std::string argsOf;  ///< class and method whose arguments were asked for
     std::string bundle;
-    std::string name;  ///< "Name" of the instances it returns, where that is not the path's
     std::map<std::string, std::function<void()>> actions;  ///< by worker, run when it is called
     std::vector<std::string> calls;                        ///< workers called, with a detail each
 };
@@ -65,8 +64,7 @@ public:
     CmpiInstance performGetInstance(Ctx, Path path, Text*) override {
         note("performGetInstance");
         CmpiInstance instance(path);
-        const CmpiData asked = getKeyBinding(path, "Name");
-        instance.setProperty("Name", script.name.empty() ? asked : CmpiData(script.name.c_str()));
+        instance.setProperty("Name", getKeyBinding(path, "Name"));
         return instance;
     }
     void performSetInstance(Ctx, CmpiResult&, Path, Instance instance, Text*) override {

@@ -160,6 +160,12 @@ public:
     /// @throws zemObjectNotFoundException there is none; the text is @p key
     apiProp& only(const char* key) const;
 
+    /// Gives the result, with its objects, up to the caller.
+    apiProp* release() {
+        m_size = 0;
+        return m_result.release();
+    }
+
 private:
     zemApiReader m_reader;
     zemAutoReleaseApiProp m_result;

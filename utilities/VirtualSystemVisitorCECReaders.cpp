@@ -1,0 +1,429 @@
+#include <cstddef>
+#include <iterator>
+#include <memory>
+#include <utility>
+
+#include "DNXApiCaller.h"
+#include "NumberText.h"
+#include "VirtualSystemVisitorCEC.h"
+
+namespace {
+
+using Lpar = zemLPAR;
+using Profile = zemPartitionProfileConfiguration;
+using Processor = zemPartitionProcessorResource;
+using Memory = zemPartitionMemoryResource;
+using Slot = zemPartitionIOSlotResource;
+using Serial = zemPartitionSerialAdapterResource;
+using Scsi = zemPartitionSCSIAdapterResource;
+using Ethernet = zemPartitionEthernetAdapterResource;
+using SysProcessor = zemSystemProcessorResource;
+using PoolProcessor = zemPoolProcessorResource;
+using ProcessorPool = zemProcessorPoolResource;
+using SysMemory = zemSystemMemoryResource;
+using MemoryPool = zemMemoryPoolResource;
+
+/// One row of a reader's table: a property, and what of the record it fills. Few take other
+/// properties besides.
+template <class Record>
+using Field = zemApiField<void (*)(Record&, const zemApiProp& object, const char* key)>;
+
+template <auto setter, class Record>
+void set(Record& record, const zemApiProp& object, const char* key) {
+    (record.*setter)(object.getProperty(key));
+}
+
+/// How processors are shared follows from the mode, from donating, and from the row's own property.
+template <auto setter, class Record>
+void sharing(Record& record, const zemApiProp& object, const char* mode, const char* donor,
+             const char* key) {
+    (record.*setter)(object.getProperty(mode), object.getProperty(donor), object.getProperty(key));
+}
+
+constexpr Field<zemCEC> kHost[] = {
+    {"PrimaryFSP_IP", set<&zemCEC::setPrimaryFSPIP>},
+    {"BackupFSP_IP", set<&zemCEC::setBackupFSPIP>},
+    {"Name", set<&zemCEC::setMTMS>},
+    {"State", set<&zemCEC::setStatePlus>},
+    {"UserDefinedName", set<&zemCEC::setSystemName>},
+    {"GlvExCaps",
+     [](zemCEC& host, const zemApiProp& object, const char* key) {
+         host.setCapability(object.getProperty(key), object.getProperty("RuntimeCapability"));
+     }},
+};
+
+/// The first row is all that is read below Level_All.
+constexpr Field<Lpar> kLpar[] = {
+    {"PartitionState", set<&Lpar::setStatePlus>},
+    {"UserDefinedName", set<&Lpar::setLparName>},
+    {"DefinitionState", set<&Lpar::setVirtualSystemType>},
+    {"Curr_prof", set<&Lpar::setCurrentProfileName>},
+    {"Default_prof", set<&Lpar::setDefaultProfileName>},
+    {"BootMode", set<&Lpar::setBootMode>},
+    {"MigrationState",
+     [](Lpar& lpar, const zemApiProp& object, const char* key) {
+         lpar.setMigrationState(zemWholeNumberOf(object.getProperty(key)), true);
+     }},
+    {"ActualProcCompatMode", set<&Lpar::setCurrLparProcCompatMode>},
+    {"ProcCompatMode", set<&Lpar::setDesiredLparProcCompatMode>},
+    {"Keylock", set<&Lpar::setKeyLock>},
+    {"RedundantPath", set<&Lpar::setRedundantErrPathReporting>},
+    {"PowerOnWithHypervisor", set<&Lpar::setAutoStart>},
+};
+
+constexpr Field<Profile> kProfile[] = {
+    {"AltConsoleDRCIndex", set<&Profile::setAltConsoleSlot>},
+    {"AltLoadSourceDRCIndex", set<&Profile::setAltRestartDeviceSlot>},
+    {"AutoIPLEnabled", set<&Profile::setAutoStart>},
+    {"SFPSurveillance", set<&Profile::setConnMonitoring>},
+    {"ConsoleDRCIndex", set<&Profile::setConsoleSlot>},
+    {"EntMem", set<&Profile::setDesiredIoEntitledMem>},
+    {"LoadSourceDRCIndex", set<&Profile::setLoadSourceSlot>},
+    {"lpar_env", set<&Profile::setLparEnv>},
+    {"lpar_name", set<&Profile::setLparName>},
+    {"VRMWeight", set<&Profile::setMemWeight>},
+    {"ECSDRCIndex", set<&Profile::setOpConsoleSlot>},
+    {"UserDefinedName", set<&Profile::setProfileName>},
+    {"RedundantPath", set<&Profile::setRedundantErrPathReporting>},
+    {"UncappedWeight", set<&Profile::setUncapWeight>},
+    {"BootMode", set<&Profile::setBootMode>},
+    {"MaxVirtualSlots", set<&Profile::setMaxVirtualSlots>},
+    {"ProcMode", set<&Profile::setProcMode>},
+    {"SharingMode",
+     [](Profile& profile, const zemApiProp& object, const char* key) {
+         sharing<&Profile::setSharingMode>(profile, object, "ProcMode", "DonorMode", key);
+     }},
+    {"MinimumCPUCount", set<&Profile::setMinProcs>},
+    {"DesiredCPUCount", set<&Profile::setDesiredProcs>},
+    {"MaximumCPUCount", set<&Profile::setMaxProcs>},
+    {"MinProcUnit", set<&Profile::setMinProcsUnits>},
+    {"DesiredProcUnit", set<&Profile::setDesiredProcsUnits>},
+    {"MaxProcUnit", set<&Profile::setMaxProcsUnits>},
+    {"SharedProcPoolId", set<&Profile::setSharedProcPoolID>},
+    {"ProcessorMode", set<&Profile::setLparProcCompatMode>},
+    {"MemMode", set<&Profile::setMemMode>},
+    {"MinimumMemory", set<&Profile::setMinMem>},
+    {"DesiredMemory", set<&Profile::setDesiredMem>},
+    {"MaximumMemory", set<&Profile::setMaxMem>},
+    {"virtual_serial_adapters", set<&Profile::setVirtualSerialAdapters>},
+    {"virtual_scsi_adapters", set<&Profile::setVirtualScsiAdapters>},
+    {"virtual_eth_adapters", set<&Profile::setVirtualEthAdapters>},
+    {"io_slots", set<&Profile::setIoSlots>},
+};
+
+/// The mode stands twice, and behind it the pending one: both setters of modes fill one field, in
+/// which the pending mode stays.
+constexpr Field<Processor> kProcessor[] = {
+    {"UserDefinedName", set<&Processor::setLparName>},
+    {"CurMaxProcs", set<&Processor::setCurrMaxProcs>},
+    {"CurMaxProcUnits", set<&Processor::setCurrMaxProcUnits>},
+    {"CurMinProcs", set<&Processor::setCurrMinProcs>},
+    {"CurMinProcUnits", set<&Processor::setCurrMinProcUnits>},
+    {"CurProcMode", set<&Processor::setCurrProcMode>},
+    {"CurProcMode", set<&Processor::setCurrSharedProcPoolId>},
+    {"CurAllocProcs", set<&Processor::setCurrProcs>},
+    {"CurAllocProcUnits", set<&Processor::setCurrProcUnits>},
+    {"CurSharingMode",
+     [](Processor& record, const zemApiProp& object, const char* key) {
+         sharing<&Processor::setCurrSharingMode>(record, object, "CurProcMode", "CurDonorMode",
+                                                 key);
+     }},
+    {"CurUncappedWeight", set<&Processor::setCurrUncapWeight>},
+    {"PendMaxProcs", set<&Processor::setPendMaxProcs>},
+    {"PendMaxProcUnits", set<&Processor::setPendMaxProcUnits>},
+    {"PendMinProcs", set<&Processor::setPendMinProcs>},
+    {"PendMinProcUnits", set<&Processor::setPendMinProcUnits>},
+    {"PendProcMode", set<&Processor::setPendProcMode>},
+    {"PendProcMode", set<&Processor::setPendSharedProcPoolId>},
+    {"PendAllocProcs", set<&Processor::setPendProcs>},
+    {"PendAllocProcUnits", set<&Processor::setPendProcUnits>},
+    {"PendSharingMode",
+     [](Processor& record, const zemApiProp& object, const char* key) {
+         sharing<&Processor::setPendSharingMode>(record, object, "PendProcMode", "PendDonorMode",
+                                                 key);
+     }},
+    {"PendUncappedWeight", set<&Processor::setPendUncapWeight>},
+    {"RuntimeProcs", set<&Processor::setRunProcs>},
+    {"RuntimeProcUnits", set<&Processor::setRunProcUnits>},
+    {"RuntimeUncappedWeight", set<&Processor::setRunUncapWeight>},
+};
+
+constexpr Field<Memory> kMemory[] = {
+    {"UserDefinedName", set<&Memory::setLparName>},
+    {"CurAllocMem", set<&Memory::setCurrMem>},
+    {"CurMaxMem", set<&Memory::setCurrMaxMem>},
+    {"CurMinMem", set<&Memory::setCurrMinMem>},
+    {"PendAllocMem", set<&Memory::setPendMem>},
+    {"PendMaxMem", set<&Memory::setPendMaxMem>},
+    {"PendMinMem", set<&Memory::setPendMinMem>},
+    {"RuntimeEntMem", set<&Memory::setRunIoEntitledMem>},
+    {"RuntimeMem", set<&Memory::setRunMem>},
+    {"RuntimeVRMWeight", set<&Memory::setRunMemWeight>},
+    {"RuntimeMinMem", set<&Memory::setRunMinMem>},
+    {"EntUsage", set<&Memory::setAutoIoEntitledMem>},
+    {"CurrMemMode", set<&Memory::setMemMode>},
+};
+
+constexpr Field<Slot> kSlot[] = {
+    {"bus_grouping", set<&Slot::setBusGrouping>},
+    {"bus_id", set<&Slot::setBusId>},
+    {"description", set<&Slot::setDescription>},
+    {"drc_index", set<&Slot::setDrcIndex>},
+    {"drc_name", set<&Slot::setDrcName>},
+    {"feature_codes", set<&Slot::setFeatureCodes>},
+    {"iop", set<&Slot::setIop>},
+    {"parent_slot_drc_index", set<&Slot::setParentSlotDrcIndex>},
+    {"pci_class", set<&Slot::setPciClass>},
+    {"pci_device_id", set<&Slot::setPciDeviceId>},
+    {"pci_revision_id", set<&Slot::setPciRevisionId>},
+    {"pci_subs_device_id", set<&Slot::setPciSubsDeviceId>},
+    {"pci_subs_vendor_id", set<&Slot::setPciSubsVendorId>},
+    {"pci_vendor_id", set<&Slot::setPciVendorId>},
+    {"slot_io_pool_id", set<&Slot::setSlotIoPoolId>},
+    {"unit_phys_loc", set<&Slot::setUnitPhysLoc>},
+};
+
+constexpr Field<Serial> kSerial[] = {
+    {"adapter_type", set<&Serial::setAdapterType>},
+    {"connect_status", set<&Serial::setConnectStatus>},
+    {"is_required", set<&Serial::setIsRequired>},
+    {"lpar_name", set<&Serial::setLparName>},
+    {"remote_lpar_id", set<&Serial::setRemoteLparId>},
+    {"remote_lpar_name", set<&Serial::setRemoteLparName>},
+    {"remote_slot_num", set<&Serial::setRemoteSlotNum>},
+    {"slot_num", set<&Serial::setSlotNum>},
+    {"state", set<&Serial::setState>},
+    {"supports_dnx", set<&Serial::setSupportsDnx>},
+};
+
+constexpr Field<Scsi> kScsi[] = {
+    {"adapter_type", set<&Scsi::setAdapterType>},
+    {"backing_devices", set<&Scsi::setBackingDevices>},
+    {"lpar_name", set<&Scsi::setLparName>},
+    {"remote_lpar_id", set<&Scsi::setRemoteLparId>},
+    {"remote_lpar_name", set<&Scsi::setRemoteLparName>},
+    {"remote_slot_num", set<&Scsi::setRemoteSlotNum>},
+    {"slot_num", set<&Scsi::setSlotNum>},
+    {"state", set<&Scsi::setState>},
+    {"is_required", set<&Scsi::setIsRequired>},
+};
+
+constexpr Field<Ethernet> kEthernet[] = {
+    {"mac_addr", set<&Ethernet::setMacAddr>},
+    {"slot_num", set<&Ethernet::setSlotNum>},
+    {"lpar_name", set<&Ethernet::setLparName>},
+    {"state", set<&Ethernet::setState>},
+    {"ieee_virtual_eth", set<&Ethernet::setIeeeVirtualEth>},
+    {"port_vlan_id", set<&Ethernet::setPortVlanID>},
+    {"addl_vlan_ids", set<&Ethernet::setAddlVlanIds>},
+    {"is_required", set<&Ethernet::setIsRequired>},
+    {"is_trunk", set<&Ethernet::setIsTrunk>},
+    {"trunk_priority", set<&Ethernet::setTruukPriority>},
+    {"vswitch", set<&Ethernet::setVSwitch>},
+};
+
+constexpr Field<SysProcessor> kSysProcessor[] = {
+    {"ConfigurableProcUnits", set<&SysProcessor::setConfigurableSysProcUnits>},
+    {"CurAvailProcUnits", set<&SysProcessor::setCurrAvailSysProcUnits>},
+    {"InstalledProcessors", set<&SysProcessor::setInstalledSysProcUnits>},
+    {"MaxProcPools", set<&SysProcessor::setMaxSharedProcPools>},
+    {"MinProcUnit", set<&SysProcessor::setMinProcUnitsPerVirtualProc>},
+    {"PendAvailProcUnits", set<&SysProcessor::setPendAvailSysProcUnits>},
+};
+
+constexpr Field<PoolProcessor> kPoolProcessor[] = {
+    {"ConfigurableProcUnits", set<&PoolProcessor::setConfigurablePoolProcUnits>},
+    {"PendAvailProcUnits", set<&PoolProcessor::setPendAvailPoolProcUnits>},
+};
+
+constexpr Field<ProcessorPool> kProcessorPool[] = {
+    {"SharedProcPoolId", set<&ProcessorPool::setSharedProcPoolId>},
+    {"MaxPoolCapacity", set<&ProcessorPool::setMaxPoolCapacity>},
+    {"PendReservedPoolCapacity", set<&ProcessorPool::setPendReservedPoolProcUnits>},
+    {"lpar_ids", set<&ProcessorPool::setLparIds>},
+};
+
+constexpr Field<SysMemory> kSysMemory[] = {
+    {"ConfigurableMem", set<&SysMemory::setConfigurableSysMem>},
+    {"InstalledMemory", set<&SysMemory::setInstalledSysMem>},
+    {"MaxMemPools", set<&SysMemory::setMaxMemPools>},
+    {"PendAvailMem", set<&SysMemory::setPendAvailSysMem>},
+    {"LMBSize", set<&SysMemory::setMemRegionSize>},
+};
+
+/// A host tells of its pool when it has one.
+constexpr Field<MemoryPool> kMemoryPool[] = {
+    {"curr_pool_mem", set<&MemoryPool::setCurrPoolMem>},
+    {"pend_avail_pool_mem", set<&MemoryPool::setPendAvailPoolMem>},
+    {"pend_pool_mem", set<&MemoryPool::setPendPoolMem>},
+    {"SystemName", [](MemoryPool& pool, const zemApiProp& object,
+                      const char* key) { pool.setSupport(!object.getProperty(key).isEmpty()); }},
+};
+
+/// The library's operations that give a collection: of all hosts, of one, and of one partition.
+using All = apiProp* (zemApiCaller::*)(const char* user, int level);
+using Keyed = apiProp* (zemApiCaller::*)(const char* user, const char* key, int level);
+struct Calls {
+    All all;
+    Keyed host;
+    Keyed partition;
+};
+
+/// Whose records are wanted, and who asks.
+struct Wanted {
+    const zemString& user;
+    const zemString& mtms;
+    const zemString& lparid;
+};
+
+apiProp* answerOf(const Calls& calls, const Wanted& wanted) {
+    constexpr int everything = 2;
+    zemApiCaller library;
+    if (wanted.mtms.isEmpty()) {
+        return (library.*calls.all)(wanted.user, everything);
+    }
+    if (wanted.lparid.isEmpty()) {
+        return (library.*calls.host)(wanted.user, wanted.mtms, everything);
+    }
+    const zemString key = wanted.lparid + "*" + wanted.mtms;
+    return (library.*calls.partition)(wanted.user, key, everything);
+}
+
+/// A new record of an object, made from the property that tells whose it is; null: nobody's.
+template <class Record>
+std::unique_ptr<Record> recordOf(const zemApiProp& object, const char* key) {
+    return std::make_unique<Record>(object.getProperty(key));
+}
+
+template <>
+std::unique_ptr<zemCEC> recordOf(const zemApiProp& /*object*/, const char* /*key*/) {
+    return std::make_unique<zemCEC>();
+}
+
+template <>
+std::unique_ptr<Lpar> recordOf(const zemApiProp& object, const char* key) {
+    const zemString name = object.getProperty(key);
+    const int star = name.find('*');
+    if (star < 0) {
+        return std::make_unique<Lpar>("", "");
+    }
+    const auto length = static_cast<unsigned>(star);
+    return std::make_unique<Lpar>(name.extractSubstring(length + 1),
+                                  name.extractSubstring(0, length));
+}
+
+template <>
+std::unique_ptr<Slot> recordOf(const zemApiProp& object, const char* key) {
+    const zemString lparid = object.getProperty("lpar_id");
+    const zemString mtms = object.getProperty(key);
+    if (lparid.isEmpty() || mtms.isEmpty()) {
+        return nullptr;
+    }
+    return std::make_unique<Slot>(mtms, lparid);
+}
+
+template <class Record>
+void fill(Record& record, const zemApiProp& object, const Field<Record>* fields,
+          std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+        fields[i].set(record, object, fields[i].key);
+    }
+}
+
+/// The records of a collection, filled from the first @p count rows of @p fields.
+template <class Record>
+zemDynamicArray<Record> recordsOf(const char* operation, const Calls& calls, const char* key,
+                                  const Field<Record>* fields, std::size_t count,
+                                  const Wanted& wanted) {
+    const zemApiReader reader = {"zemCECVisitor", operation, operation, nullptr, true};
+    const zemApiObjects objects(reader, answerOf(calls, wanted));
+    zemDynamicArray<Record> records;
+    for (apiProp& each : objects) {
+        const zemApiProp object(&each);
+        std::unique_ptr<Record> record = recordOf<Record>(object, key);
+        if (record != nullptr) {
+            fill(*record, object, fields, count);
+            records.addElement(std::move(record));
+        }
+    }
+    return records;
+}
+
+}  // namespace
+
+zemDynamicArray<zemLPAR> zemCECVisitor::getAllPartitionObjectsByKeys(
+    const zemString& userName, int level, const zemString& mtms, const zemString& lparid) const {
+    constexpr Calls calls = {&zemApiCaller::getAllLpars, &zemApiCaller::getAllLparsFromCec,
+                             &zemApiCaller::getLparObj};
+    return recordsOf("getAllPartitionObjectsByKeys", calls, "Name", kLpar,
+                     level < Level_All ? 1 : std::size(kLpar), {actor(userName), mtms, lparid});
+}
+
+zemDynamicArray<zemLPAR> zemCECVisitor::getAllPartitionObjectsByKeys(
+    const zemString& userName, int* /*mask*/, const zemString& mtms,
+    const zemString& lparid) const {
+    return getAllPartitionObjectsByKeys(userName, Level_All, mtms, lparid);
+}
+
+zemDynamicArray<zemPartitionProfileConfiguration> zemCECVisitor::getAllProfileLevelLparByKeys(
+    const zemString& userName, int* /*mask*/, const zemString& mtms,
+    const zemString& lparid) const {
+    return getAllProfileLevelLparByKeys(userName, Level_All, mtms, lparid);
+}
+
+// A collection: its operation, the library's calls, the property that tells whose a record is, and
+// the table of the others.
+#define OF_PARTITIONS(NAME, RECORD, ALL, HOST, PARTITION, KEY, TABLE)                           \
+    zemDynamicArray<RECORD> zemCECVisitor::NAME(                                                \
+        const zemString& userName, int, const zemString& mtms, const zemString& lparid) const { \
+        constexpr Calls calls = {&zemApiCaller::ALL, &zemApiCaller::HOST,                       \
+                                 &zemApiCaller::PARTITION};                                     \
+        return recordsOf(#NAME, calls, KEY, TABLE, std::size(TABLE),                            \
+                         {actor(userName), mtms, lparid});                                      \
+    }
+#define OF_HOSTS(NAME, RECORD, ALL, HOST, KEY, TABLE)                               \
+    zemDynamicArray<RECORD> zemCECVisitor::NAME(const zemString& userName, int,     \
+                                                const zemString& mtms) const {      \
+        constexpr Calls calls = {&zemApiCaller::ALL, &zemApiCaller::HOST, nullptr}; \
+        return recordsOf(#NAME, calls, KEY, TABLE, std::size(TABLE),                \
+                         {actor(userName), mtms, zemString()});                     \
+    }
+
+// clang-format off
+OF_PARTITIONS(getAllProfileLevelLparByKeys, Profile,
+              getAllLparProfiles, getAllLparProfilesFromCec, getAllLparProfilesFromLpar,
+              "PartitionName", kProfile)
+OF_PARTITIONS(getAllProcessorLevelLparByKeys, Processor,
+              getAllLparProcessorCfgs, getAllLparProcessorCfg, getLparProcessorCfg,
+              "Name", kProcessor)
+OF_PARTITIONS(getAllMemoryLevelLparByKeys, Memory,
+              getAllLparMemoryCfgs, getAllLparMemoryCfg, getLparMemoryCfg,
+              "Name", kMemory)
+OF_PARTITIONS(getAllIOSlotLevelLparByKeys, Slot,
+              getAllIoSlots, getIoSlots, getLparIoSlots,
+              "SystemName", kSlot)
+OF_PARTITIONS(getAllSerialAdapterLevelLparByKeys, Serial,
+              getAllLparVirtualSerial, getVirtualSerial, getLparVirtualSerial,
+              "Name", kSerial)
+OF_PARTITIONS(getAllSCSIAdapterLevelLparByKeys, Scsi,
+              getAllLparVirtualScsi, getVirtualScsi, getLparVirtualScsi,
+              "Name", kScsi)
+OF_PARTITIONS(getAllEthernetAdapterLevelLparByKeys, Ethernet,
+              getAllLparVirtualEthernet, getVirtualEthernet, getLparVirtualEthernet,
+              "Name", kEthernet)
+
+OF_HOSTS(getAllCECObjectsByKeys, zemCEC, getAllCecs, getCecObj, nullptr, kHost)
+OF_HOSTS(getAllProcessorLevelSysByKeys, SysProcessor,
+         getAllCecProcessorCfg, getCecProcessorCfg, "Name", kSysProcessor)
+OF_HOSTS(getAllProcessorLevelPoolByKeys, PoolProcessor,
+         getAllCecs, getCecObj, "Name", kPoolProcessor)
+OF_HOSTS(getAllProcessorPoolByKeys, ProcessorPool,
+         getAllCecProcessorPoolCfg, getCecProcessorPoolCfg, "SystemName", kProcessorPool)
+OF_HOSTS(getAllMemoryLevelSysByKeys, SysMemory,
+         getAllCecMemoryCfg, getCecMemoryCfg, "Name", kSysMemory)
+OF_HOSTS(getAllMemoryPoolByKeys, MemoryPool,
+         getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, "SystemName", kMemoryPool)
+// clang-format on
+
+#undef OF_PARTITIONS
+#undef OF_HOSTS

@@ -6,6 +6,7 @@
 #include "DNXApiCaller.h"
 #include "NumberText.h"
 #include "VirtualSystemVisitorCEC.h"
+#include "VirtualSystemVisitorReaders.h"
 
 namespace {
 
@@ -427,3 +428,7 @@ OF_HOSTS(getAllMemoryPoolByKeys, MemoryPool,
 
 #undef OF_PARTITIONS
 #undef OF_HOSTS
+
+void zemReadProfile(apiProp& object, zemPartitionProfileConfiguration& profile) {
+    fill(profile, zemApiProp(&object), kProfile, std::size(kProfile));
+}

@@ -26,13 +26,14 @@
     KEYED(getAllLparMemoryCfg) KEYED(getAllLparProcessorCfg)
 // clang-format on
 
-/// The last call, as "getCecObj(user,key,1)", what it gave, the results not given back yet, and the
-/// names of all calls.
+/// The last call, as "getCecObj(user,key,1)", what it gave, the results not given back yet, the
+/// names of all calls, and what they give in place of the library's answers, if anything.
 struct LibrarySpy {
     std::string call;
     std::vector<std::string> names;
     apiProp* result = nullptr;
     int held = 0;
+    apiProp* answer = nullptr;
 };
 inline LibrarySpy librarySpy;
 
@@ -51,7 +52,9 @@ apiProp* watchedCall(const char* name, Arguments... arguments) {
     const char* separator = "(";
     ((librarySpy.call += separator + textOf(arguments), separator = ","), ...);
     librarySpy.call += ')';
-    librarySpy.result = libraryFunction<apiProp*(Arguments...)>(name)(arguments...);
+    librarySpy.result = librarySpy.answer != nullptr
+                            ? librarySpy.answer
+                            : libraryFunction<apiProp*(Arguments...)>(name)(arguments...);
     librarySpy.held += librarySpy.result != nullptr;
     return librarySpy.result;
 }
@@ -71,6 +74,8 @@ apiProp* getLparProfile(const char* user, const char* key, const char* profile, 
 
 void freeApi(apiProp* result) {
     librarySpy.held -= result != nullptr;
-    libraryFunction<void(apiProp*)>("freeApi")(result);
+    if (result != librarySpy.answer) {
+        libraryFunction<void(apiProp*)>("freeApi")(result);
+    }
 }
 }

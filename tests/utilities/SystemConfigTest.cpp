@@ -11,6 +11,7 @@
 #include "EdpowerCaller.h"
 #include "EdsuspCaller.h"
 #include "LibraryFaults.h"
+#include "LibraryRecords.h"
 #include "LibrarySpy.h"
 #include "NwplatCmdCaller.h"
 #include "QyplatCmdCaller.h"
@@ -24,18 +25,6 @@ using Partition = zemVirtualSystem;
 using Profile = zemVirtualSystemProfile;
 
 constexpr char kHost[] = "1111-AAA*0000001";
-
-/// A record as the management library would give it, of "name=value" with ";" between them.
-std::unique_ptr<apiProp> object(const std::string& properties) {
-    auto prop = std::make_unique<apiProp>();
-    std::istringstream all(properties);
-    for (std::string one; std::getline(all, one, ';');) {
-        const size_t equals = one.find('=');
-        one.copy(prop->name[prop->propertyCount], equals);
-        one.copy(prop->value[prop->propertyCount++], one.size(), equals + 1);
-    }
-    return prop;
-}
 
 template <class... Values>
 std::string joined(const Values&... values) {

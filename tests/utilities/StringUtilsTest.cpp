@@ -143,6 +143,7 @@ TEST(StringPairsTest, KeepsOrderAndDuplicates) {
     expectRows({{key, "4"},
                 {value, "124"},
                 {pairs.getValue("3"), "103"},  // the first of two
+                {pairs.getValue("0") + pairs.getKey("100"), "1000"},
                 {pairs.getKey("123"), "3"},
                 {pairs.removePair("3"), "103"},
                 {pairs.getValue("3"), "123"},

@@ -101,12 +101,6 @@ const SystemClass& partitionClass() {
     return partition;
 }
 
-/// Whether the library failed because it knows no such host or partition.
-bool isUnknownSystem(const zemException& failure) {
-    return isUnknownObject(failure) ||
-           zemString(failure.getExceptionId()) == errorCodeToString(API_UNKNOWN_SYSTEM);
-}
-
 class ApiSystemProvider : public zemBaseZemInstanceProvider {
 protected:
     ApiSystemProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name,
@@ -134,7 +128,7 @@ protected:
                 (zemApiCaller().*m_system.one)(getUserContext(context), name.c_str(), kLevel));
             out = makeInstance(path, properties, systems.only(name.c_str()));
         } catch (const zemException& e) {
-            if (!isUnknownSystem(e)) {
+            if (!isUnknownObject(e)) {
                 throw;
             }
             return -1;

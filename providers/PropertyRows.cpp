@@ -9,6 +9,7 @@
 #include <map>
 
 #include "BaseProvider.h"
+#include "DNXApiCaller.h"
 #include "QyplatCmdCaller.h"
 
 namespace {
@@ -231,7 +232,7 @@ bool isHostName(const std::string& text) {
 bool isUnknownObject(const zemException& failure) {
     const zemString id(failure.getExceptionId());
     return failure.getExceptionType() == zemObjectNotFoundException::kind || id == kNoSuchHost ||
-           id == kNoSuchPartition;
+           id == kNoSuchPartition || id == errorCodeToString(API_UNKNOWN_SYSTEM);
 }
 
 std::string hostName(const zemRecordType& host) {

@@ -55,7 +55,7 @@ std::string hundredthsText(unsigned long hundredths);
 /// and go into command lines, so nothing else may pass.
 bool isHostName(const std::string& text);
 
-/// Whether a tool failed because it knows no such host or partition.
+/// Whether a tool or the management library failed because it knows no such host or partition.
 bool isUnknownObject(const zemException& failure);
 
 /// The key of the host that a qyplat host record describes.

@@ -1,7 +1,8 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds, and shows a CIM request from end to end: an appliance, its
-# tool asked by hand, the same asked through CIM, a partition made, started, renamed, moved to another
-# host, stopped and deleted, and what a client reads when a thing is not there.
+# tool asked by hand, the same asked through CIM, what a partition runs with beside what its profile
+# says, a partition made, started, renamed, moved to another host, stopped and deleted, and what a
+# client reads when a thing is not there.
 #
 #   scripts/demo.sh
 #
@@ -43,6 +44,17 @@ show() {
     [ "$status" -eq "$expected" ] || die "expected exit status $expected"
 }
 
+# beside <class> <InstanceID> <InstanceID>: shows two of a class next to each other.
+beside() {
+    local side line=
+    for side in 2 3; do
+        cimom gi "$1.InstanceID=\"${!side}\"" >"$folder/side$side" || die "no ${!side}"
+        line+=" <($(quoted cimom gi "$1.InstanceID=\"${!side}\""))"
+    done
+    printf '\n$ pr -mt -w 130%s\n' "$line"
+    pr -mt -w 130 "$folder/side2" "$folder/side3"
+}
+
 # set_up <variable> <value>: exports it, and prints how.
 set_up() {
     printf '$ export %s=%s\n' "$1" "$(quoted "$2")"
@@ -81,6 +93,20 @@ show 0 cimom gi "$host\"$mtms\""
 say "its partitions, by way of an association"
 show 0 cimom ain "$host\"$mtms\"" --assoc-class ORXC_HostedPartition
 
+say "what a partition runs with, beside what its profile says"
+partition="ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"4*$mtms\""
+show 0 edalloc -r mem -o a --id 4 -q 256 -m "$mtms"     # not in the profile
+show 0 cimom ain "$partition" --assoc-class ORXC_SettingsDefineState
+running=$(sed -n 's/.*InstanceID="\(.*\)"/\1/p' "$said")
+show 0 cimom ri "$partition" --result-class ORXC_ElementSettingData
+show 0 cimom ain "$partition" --assoc-class ORXC_ElementSettingData
+defined=$(sed -n '1s/.*InstanceID="\(.*\)"/\1/p' "$said")
+for class in VirtualSystemSettingData ProcessorRASettingData MemoryRASettingData; do
+    beside ORXC_$class "$running" "$defined"
+done
+show 0 cimom ain "ORXC_VirtualSystemSettingData.InstanceID=\"$running\"" \
+    --assoc-class ORXC_VSSDComponent
+
 say "a partition made through CIM, with the first number that is free"
 show 0 cimom ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS "Name=*$mtms" \
     'ElementName=made "by hand", 1' LparEnvironment=tmxlinux ProcessorMode=shared SharingMode=cap \
@@ -115,5 +141,5 @@ show 5 cimom gi 'ORXC_Unknown.Name="1"'
 show 6 cimom gi "$host\"9999-ZZZ*0000000\""
 show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
-printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions by\nassociation, the life of a partition, a move between hosts, two failures by name, one of them\nin German too.\n' \
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions by\nassociation, what one runs with beside its profile, the life of a partition, a move between hosts,\ntwo failures by name, one of them in German too.\n' \
     "$hosts" "$partitions"

@@ -165,6 +165,12 @@ struct Association {
 
 // One provider for each way in which the library can find the two sides.
 TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
+    const std::string partition =
+        R"('ORXC_LPAR_CS.CreationClassName="ORXC_LPAR_CS",Name="4*1111-AAA*0000001"')";
+    const std::string profile =
+        R"('ORXC_VirtualSystemSettingData.InstanceID="ORX:2*normal-4*1111-AAA*0000001"')";
+    const std::string adapter =
+        R"('ORXC_SCSIAdapterRASettingData.InstanceID="ORX:4*3*4*1111-AAA*0000001"')";
     const std::string link = R"('ORXC_HostConnection.InstanceID="ORX:1111-AAA*0000001:primary"')";
     const Association rows[] = {
         {"ORXC_HostedPartition", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
@@ -177,6 +183,16 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
          "ORXC_HostConnection", 2, 8},
         {"ORXC_PartitionConnection", "CIM_Dependency", "Antecedent", "Dependent", link,
          "ORXC_LPAR_CS", 7, 28},
+        {"ORXC_ElementSettingData", "CIM_ElementSettingData", "ManagedElement", "SettingData",
+         partition, "CIM_SettingData", 2, 15},
+        {"ORXC_ElementSettingData", "CIM_ElementSettingData", "SettingData", "ManagedElement",
+         profile, "ORXC_LPAR_CS", 1, 15},
+        {"ORXC_SettingsDefineState", "CIM_SettingsDefineState", "ManagedElement", "SettingData",
+         partition, "CIM_VirtualSystemSettingData", 1, 14},
+        {"ORXC_VSSDComponent", "CIM_Component", "GroupComponent", "PartComponent", profile,
+         "CIM_ResourceAllocationSettingData", 8, 187},
+        {"ORXC_VSSDComponent", "CIM_VirtualSystemSettingDataComponent", "PartComponent",
+         "GroupComponent", adapter, "CIM_SettingData", 1, 187},
     };
     std::map<std::string, std::vector<std::string>> known;
     const auto answers = [&](const std::string& arguments) {

@@ -5,15 +5,14 @@
 
 #include <regex>
 
-#include "Server.h"
-#include "TestAppliance.h"
+#include "ServedProviders.h"
 
 namespace {
 
 using namespace cimom;
 using testing_support::lines;
 using testing_support::ScopedEnvironment;
-using testing_support::TestAppliance;
+using testing_support::ServedProviders;
 
 constexpr const char* kHostClass = "ORXC_CEC_CS";
 constexpr const char* kPartitionClass = "ORXC_LPAR_CS";
@@ -43,21 +42,7 @@ std::string textOf(const Instance& instance, const char* properties, char separa
     return record;
 }
 
-class ProvidersTest : public ::testing::TestWithParam<Character> {
-protected:
-    void SetUp() override {
-        ASSERT_EQ(m_appliance.run("appliance init").exit, 0);
-        Options options;
-        options.character = GetParam();
-        options.classes = ClassRepository::load(ZEM_SCHEMA);
-        m_server = std::make_unique<Server>(options);
-        m_server->loadRegistration(ZEM_REGISTRATION);
-    }
-
-    TestAppliance m_appliance{ZEM_PROGRAMS};
-    std::unique_ptr<Server> m_server;
-    Request m_request;
-};
+using ProvidersTest = ServedProviders;
 
 TEST_P(ProvidersTest, InstancesAreTheRecordsOfTheTool) {
     const struct {
@@ -217,10 +202,7 @@ TEST_P(ProvidersTest, ObjectsWithoutAHostHaveNoneInCommon) {
         << reply.message;
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, ProvidersTest,
-                         ::testing::Values(Character::Full, Character::Lean),
-                         [](const auto& broker) {
-                             return broker.param == Character::Full ? "full" : "lean";
-                         });
+INSTANTIATE_TEST_SUITE_P(Brokers, ProvidersTest, ServedProviders::brokers(),
+                         ServedProviders::nameOf);
 
 }  // namespace

@@ -1,0 +1,94 @@
+/// ORXC_VirtualSystemSettingData and the six ORXC_...RASettingData: what partitions have now, and
+/// what their profiles give them. InstanceIDs tell side, profile, slot, partition and host.
+///
+/// All are one provider with a table: which collections a class is read from, and which property
+/// shows which datum of the model. An enumeration reads a collection with one call of the
+/// management library, whatever the number of partitions; a get reads those of one partition. What
+/// the library's model makes of them, and all rules, stand in VirtualSystemVisitorVSSD.h.
+///
+/// Thread-safety: constant tables and no state; any number of operations at once.
+#ifndef SETTING_PROVIDER_H
+#define SETTING_PROVIDER_H
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "BaseZemInstanceProvider.h"
+#include "VirtualSystemVisitor.h"
+
+struct Setting;
+struct SettingClass;
+
+/// A partition, or all of them while both texts are empty.
+struct SettingOwner {
+    std::string host;       ///< key of its host
+    std::string partition;  ///< its ID
+
+    std::string name() const { return partition + "*" + host; }
+};
+
+/// What an InstanceID tells.
+struct SettingId {
+    SettingOwner owner;
+    bool isState = false;
+    std::string profile;  ///< of the defined side
+    std::string system;   ///< InstanceID of the settings of the partition itself
+};
+
+/// Takes the InstanceID apart that is the key of @p path; none for a path of another class or
+/// without such a key, and when the text has not the form of one of its class. Clients may send
+/// any text.
+std::optional<SettingId> settingIdOf(const CmpiObjectPath& path);
+
+/// The partition that an object is, or whose settings it is.
+std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path);
+
+/// Reads hosts with their partitions into @p manager, which must outlive the result; null when
+/// there is no such host.
+/// @throws what zemCECVisitor throws
+std::unique_ptr<zemCECVisitor> readPartitions(zemVirtualizationManager& manager,
+                                              const CmpiContext& context,
+                                              const SettingOwner& whose);
+
+class SettingProvider : public zemBaseZemInstanceProvider {
+public:
+    /// @param name  the class to be served, with "Provider" behind it
+    SettingProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name);
+
+    using zemBaseZemInstanceProvider::enumInstanceNames;
+    using zemBaseZemInstanceProvider::enumInstances;
+    using zemBaseZemInstanceProvider::getInstance;
+
+    int getInstance(const CmpiContext& context, const CmpiObjectPath& path, const char** properties,
+                    CmpiInstance& out) override;
+
+    /// @param asked  where it is a partition, or settings of another class, only those of that
+    ///        partition are read: an association asks for what could belong to it
+    void enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
+                           zemDynamicArray<CmpiObjectPath>& out,
+                           const CmpiObjectPath& asked) override;
+    void enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
+                       const char** properties, zemDynamicArray<CmpiInstance>& out,
+                       const CmpiObjectPath& asked) override;
+    CMPIBoolean isValidInstanceClass(const char* className) override;
+
+protected:
+    void populateEssentialKeys(const char* className, CmpiArray& keys) override;
+
+private:
+    using Sink = std::function<void(const Setting& setting)>;
+
+    /// Hands the settings of @p whose to @p sink, those of a partition's state first.
+    void read(const CmpiContext& context, const SettingOwner& whose, const Sink& sink) const;
+    void tell(zemVSSD& system, const Sink& sink) const;
+    SettingOwner scopeOf(const CmpiObjectPath& asked) const;
+    CmpiObjectPath pathOf(const CmpiObjectPath& near, const Setting& setting) const;
+    CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
+                              const Setting& setting) const;
+
+    const SettingClass& m_class;
+};
+
+#endif

@@ -1,0 +1,278 @@
+// The settings of partitions as a server sees them, beside what the tools print of the same
+// partitions, and what they cost in calls of the management library.
+#include <cmath>
+#include <map>
+#include <regex>
+
+#include "LibrarySpy.h"
+#include "PathText.h"
+#include "ServedProviders.h"
+#include "ToolRecords.h"
+
+namespace {
+
+using namespace cimom;
+using testing_support::lines;
+using testing_support::ServedProviders;
+
+constexpr char kSystem[] = "ORXC_VirtualSystemSettingData";
+constexpr const char* kClasses[] = {kSystem,
+                                    "ORXC_ProcessorRASettingData",
+                                    "ORXC_MemoryRASettingData",
+                                    "ORXC_IOSlotAdapterRASettingData",
+                                    "ORXC_EthernetAdapterRASettingData",
+                                    "ORXC_SCSIAdapterRASettingData",
+                                    "ORXC_SerialAdapterRASettingData"};
+
+ObjectPath settings(const char* className, const std::string& id) {
+    return {"root/cimv2", className, {{"InstanceID", id}}};
+}
+
+/// The value without quotes, lists as "{1,2}"; empty when there is none.
+std::string textOf(const Instance& instance, const std::string& property) {
+    const Value* value = instance.properties.find(property);
+    const std::string text = value == nullptr || value->isNull() ? "" : plainText(*value);
+    return text[0] == '{' ? std::regex_replace(text, std::regex(" "), "") : text;
+}
+
+/// What a property shows of a tool's value, which is a number where it is scaled.
+std::string shown(const std::string& value, const std::string& scale) {
+    static const std::map<std::string, std::string> words = {
+        {"server", "0"}, {"client", "1"}, {"any", ""}, {"none", ""}, {"20,30", "{20,30}"}};
+    if (!scale.empty()) {
+        return std::to_string(std::llround(std::stod(value) * std::stod(scale)));
+    }
+    const auto word = words.find(value);
+    return word == words.end() ? value : word->second;
+}
+
+class SettingProvidersTest : public ServedProviders {
+protected:
+    std::deque<Instance> all(const char* className) {
+        const Reply reply = m_server->enumInstances(m_request, {"root/cimv2", className});
+        EXPECT_EQ(reply.rc, CMPI_RC_OK) << className << reply.message;
+        return reply.instances;
+    }
+
+    /// Those whose InstanceIDs begin and end with these.
+    std::vector<Instance> some(const char* className, const std::string& front,
+                               const std::string& back) {
+        std::vector<Instance> found;
+        for (const Instance& each : all(className)) {
+            const std::string id = textOf(each, "InstanceID");
+            if (id.rfind(front, 0) == 0 && id.size() > back.size() &&
+                id.compare(id.size() - back.size(), back.size(), back) == 0) {
+                found.push_back(each);
+            }
+        }
+        return found;
+    }
+};
+
+// Of partition 4 but where it is said; "Property=attribute*scale", or what all have.
+TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
+    const std::string here = " -m '1111-AAA*0000001' --filter lpar_ids=";
+    const struct {
+        const char* className;
+        const char* front;
+        const char* partition;
+        const char* query;
+        std::string properties;
+    } rows[] = {
+        {kSystem, "ORX:4*", "4", "qyplat -r lpar",
+         "ElementName=name LparName=name LparID=lpar_id VirtualSystemType=lpar_env "
+         "BootMode=boot_mode "
+         "Keylock=lpar_keylock ProfileName=curr_profile DefaultProfileName=default_profile "
+         "IsDefault:true HostName:1111-AAA*0000001 AutomaticStartupAction:2 MaxVirtualSlots:11"},
+        {kSystem, "ORX:2*small", "4", "qyplat -r prof",
+         "ElementName=name ProfileName=name LparName=lpar_name IsDefault:false BootMode=boot_mode "
+         "MaxVirtualSlots=max_virtual_slots DefaultProfileName:normal"},
+        {kSystem, "ORX:4*", "2", "qyplat -r lpar", "AutomaticStartupAction=auto_start*4"},
+        {kClasses[1], "ORX:4*", "4", "qyalloc -r proc --level lpar",
+         "VirtualMinimum=curr_min_procs*100 VirtualQuantity=run_procs*100 "
+         "VirtualMaximum=curr_max_procs*100 Minimum=curr_min_proc_units*100 "
+         "Reservation=run_proc_units*100 Limit=curr_max_proc_units*100 "
+         "SharingMode=curr_sharing_mode "
+         "PoolID=curr_shared_proc_pool_id ConsumerVisibility:3 MappingBehavior:1 Weight: "
+         "ElementName:3-Processor ResourceType:3 AllocationUnits:Percent ProcCompatMode:CORAL6+"},
+        {kClasses[1], "ORX:2*small", "4", "qyplat -r prof",
+         "VirtualMinimum=min_procs*100 VirtualQuantity=desired_procs*100 Limit=max_proc_units*100 "
+         "Reservation=desired_proc_units*100 SharingMode=sharing_mode PoolID=shared_proc_pool_id "
+         "ProcCompatMode=lpar_proc_compat_mode"},
+        {kClasses[2], "ORX:4*", "4", "qyalloc -r mem --level lpar",
+         "Minimum=curr_min_mem*1024 Reservation=run_mem*1024 Limit=curr_max_mem*1024 "
+         "VirtualQuantity=run_mem*1024 PoolID:Primordial AutomaticAllocation:true IsRequired:"},
+        {kClasses[2], "ORX:4*", "3", "qyalloc -r mem --level lpar",
+         "VirtualQuantity=run_mem*1024 Reservation=run_io_entitled_mem*1024 Weight=run_mem_weight "
+         "ConsumerVisibility:3 PoolID:0 Limit:"},
+        {kClasses[3], "ORX:4*", "6", "qyalloc -r io --rsubtype slot",
+         "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} AllocationUnits:Slot"},
+        {kClasses[4], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype eth --level lpar",
+         "SlotID=slot_num Address=mac_addr PortVLANID=port_vlan_id AddVLANIDs=addl_vlan_ids "
+         "IEEECompatible=ieee_virtual_eth TrunkPriority=trunk_priority IsRequired=is_required"},
+        {kClasses[5], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype scsi --level lpar",
+         "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id "
+         "RemoteSlotID=remote_slot_num IsRequired=is_required"},
+        {kClasses[6], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype serial --level lpar",
+         "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id "
+         "RemoteSlotID=remote_slot_num IsRequired=is_required AutomaticDeallocation:false"},
+    };
+    for (const auto& row : rows) {
+        std::string query = row.query + here + row.partition;
+        if (std::string(row.front) == "ORX:2*small") {
+            query += R"(',"profile_names=small, ""safe"""')";
+        }
+        const std::vector<std::string> records = lines(m_appliance.run(query).out);
+        const std::vector<Instance> found =
+            some(row.className, row.front, row.partition + std::string("*1111-AAA*0000001"));
+        ASSERT_EQ(found.size(), records.size()) << row.className << row.front << query;
+        for (std::size_t i = 0; i < found.size(); ++i) {
+            std::map<std::string, std::string> fields;
+            for (const std::string& field : fieldsOf(records[i])) {
+                const std::size_t equals = field.find('=');
+                fields[field.substr(0, equals)] = field.substr(equals + 1);
+            }
+            std::istringstream properties(row.properties);
+            for (std::string property; properties >> property;) {
+                const std::size_t end = property.find_first_of("=:");
+                const std::size_t star = property.find('*', end);
+                std::string expected = property.substr(end + 1);
+                if (property[end] == '=') {
+                    const auto value = fields.find(property.substr(end + 1, star - end - 1));
+                    ASSERT_NE(value, fields.end()) << property;
+                    expected = shown(value->second,
+                                     star == property.npos ? "" : property.substr(star + 1));
+                }
+                EXPECT_EQ(textOf(found[i], property.substr(0, end)), expected)
+                    << row.className << ' ' << row.front << ' ' << property;
+            }
+        }
+    }
+}
+
+TEST_P(SettingProvidersTest, EverySettingIsFoundByItsNameAndHasOnlyWantedProperties) {
+    for (const char* name : kClasses) {
+        const std::deque<Instance> found = all(name);
+        ASSERT_GT(found.size(), 14u) << name;
+        std::deque<ObjectPath> paths;
+        for (const Instance& each : found) {
+            EXPECT_TRUE(m_server->getInstance(m_request, each.path).instances.at(0) == each)
+                << textOf(each, "InstanceID");
+            paths.push_back(each.path);
+        }
+        EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", name}).paths, paths);
+
+        m_request.properties = {{"ElementName"}};
+        const Instance one = m_server->getInstance(m_request, paths.back()).instances.at(0);
+        EXPECT_EQ(textOf(one, "ElementName"), textOf(found.back(), "ElementName"));
+        for (const char* other : {"HostName", "ResourceType", "VirtualQuantityUnits", "SlotID"}) {
+            EXPECT_EQ(textOf(one, other), "") << name << other;
+        }
+        m_request.properties.reset();
+    }
+}
+
+// The library is asked for nothing whose name has not the form of one.
+TEST_P(SettingProvidersTest, NamesOfNothingAreNotFound) {
+    const struct {
+        const char* id;
+        bool isAsked;
+    } rows[] = {
+        {"", false},
+        {"*", false},
+        {"**", false},
+        {"ORX:4*", false},
+        {"ORX:4*1111-AAA*0000001", false},
+        {"ORX:4**1111-AAA*0000001", false},
+        {"ORX:3*4*1111-AAA*0000001", false},
+        {"ORX:4*4*1111-AAA*", false},
+        {"ORX:4*x*1111-AAA*0000001", false},
+        {"ORX:4*1*x*1111-AAA*0000001", false},
+        {"ORX:4*4444444*1111-AAA*0000001", false},
+        {"ORX:2*4*1111-AAA*0000001", false},
+        {"ORX:2*normal-*1111-AAA*0000001", false},
+        {"ORX:2*normal-3*\" -m *0000001", false},
+        {"ORX:4*99*1111-AAA*0000001", true},
+        {"ORX:4*99*99*1111-AAA*0000001", true},
+        {"ORX:4*1*9999-ZZZ*0000009", true},
+        {"ORX:2*other-4*1111-AAA*0000001", true},
+        {"ORX:2*normal-99*4*1111-AAA*0000001", true},
+        {"ORX:4*04*1111-AAA*0000001", true},
+    };
+    for (const auto& row : rows) {
+        librarySpy.names.clear();
+        for (const char* name : kClasses) {
+            EXPECT_EQ(m_server->getInstance(m_request, settings(name, row.id)).rc,
+                      CMPI_RC_ERR_NOT_FOUND)
+                << name << ' ' << row.id;
+        }
+        EXPECT_EQ(!librarySpy.names.empty(), row.isAsked) << row.id;
+    }
+    // of a partition that is not activated, the adapters alone
+    for (const char* name : kClasses) {
+        const bool isHeld = name == kClasses[1] || name == kClasses[2] || name == kClasses[3];
+        EXPECT_EQ(some(name, "ORX:4*", "1*1111-AAB*0000002").empty(), isHeld) << name;
+        EXPECT_FALSE(some(name, "ORX:2*normal-", "1*1111-AAB*0000002").empty()) << name;
+    }
+    const ObjectPath stopped = settings(kClasses[1], "ORX:4*1*1111-AAB*0000002");
+    EXPECT_EQ(m_server->getInstance(m_request, stopped).rc, CMPI_RC_ERR_NOT_FOUND);
+}
+
+// An enumeration, and a get of the last one that it found.
+TEST_P(SettingProvidersTest, CollectionsAreAskedForOnceWhateverTheNumberOfPartitions) {
+    const struct {
+        const char* all;
+        const char* one;
+    } rows[] = {
+        // as the classes
+        {"", ""},
+        {"getAllCecProcessorCfg getAllLparProcessorCfgs ",
+         "getCecProcessorCfg getLparProcessorCfg "},
+        {"getAllCecMemoryCfg getAllLparMemoryCfgs ", "getCecMemoryCfg getLparMemoryCfg "},
+        {"getAllIoSlots ", "getLparIoSlots "},
+        {"getAllLparVirtualEthernet ", "getLparVirtualEthernet "},
+        {"getAllLparVirtualScsi ", "getLparVirtualScsi "},
+        {"getAllLparVirtualSerial ", "getLparVirtualSerial "},
+    };
+    const auto calls = [] {
+        std::string names;
+        for (const std::string& name : std::exchange(librarySpy.names, {})) {
+            names += name + ' ';
+        }
+        return names;
+    };
+    calls();
+    for (const char* size : {"true", "appliance generate --hosts 2 --lpars 40 --force"}) {
+        ASSERT_EQ(m_appliance.run(size).exit, 0);
+        for (std::size_t i = 0; i < std::size(kClasses); ++i) {
+            const std::deque<Instance> found = all(kClasses[i]);
+            EXPECT_EQ(calls(),
+                      std::string("getAllCecs getAllLpars getAllLparProfiles ") + rows[i].all);
+            m_server->getInstance(m_request, found.back().path);
+            EXPECT_EQ(calls(), std::string("getCecObj getLparObj getAllLparProfilesFromLpar ") +
+                                   rows[i].one);
+        }
+    }
+    // associations look for what could belong to their source
+    const ObjectPath system = settings(kSystem, "ORX:4*1*1111-AAA*0000001");
+    EXPECT_FALSE(m_server->associatorNames(m_request, system, {}).paths.empty());
+    EXPECT_EQ(calls().find("getAllLpars "), std::string::npos);
+    EXPECT_EQ(librarySpy.held, 0);
+}
+
+TEST_P(SettingProvidersTest, ProfilesTellWhichIsTheDefaultAndWhichRuns) {
+    std::vector<std::string> told, expected;
+    for (const Instance& each : all("ORXC_ElementSettingData")) {
+        told.push_back(textOf(each, "IsDefault") + textOf(each, "IsCurrent"));
+    }
+    for (const std::string& state : lines(m_appliance.run("qyplat -r lpar -F state").out)) {
+        expected.push_back(state == "Not Activated" ? "12" : "11");
+    }
+    expected.insert(expected.begin() + 4, "22");  // the second profile of the fourth partition
+    EXPECT_EQ(told, expected);
+}
+
+INSTANTIATE_TEST_SUITE_P(Brokers, SettingProvidersTest, ServedProviders::brokers(),
+                         ServedProviders::nameOf);
+
+}  // namespace

@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <cstring>
 
+#include "LogLines.h"
 #include "LogText.h"
 #include "SigpipeHeld.h"
 
@@ -20,17 +21,24 @@ public:
     OutputHold& operator=(const OutputHold&) = delete;
 };
 
-// Takes no memory: lines are written in destructors, and when there is none.
-void writeLine(const char* prefix, const char* text) {
+void put(const char* piece, size_t size) { fwrite_unlocked(piece, 1, size, stdout); }
+
+/// Runs @p body, which puts whole lines.
+template <class Body>
+void writeLines(Body body) {
     const OutputHold hold;
     const zemSigpipeHeld held;
-    const auto put = [](const char* piece, size_t size) {
-        fwrite_unlocked(piece, 1, size, stdout);
-    };
-    put(prefix, strlen(prefix));
-    zemPutLogText(text != nullptr ? text : "", put);
-    put("\n", 1);
+    body();
     fflush_unlocked(stdout);
+}
+
+// Takes no memory: lines are written in destructors, and when there is none.
+void writeLine(const char* prefix, const char* text) {
+    writeLines([=] {
+        put(prefix, strlen(prefix));
+        zemPutLogText(text != nullptr ? text : "", put);
+        put("\n", 1);
+    });
 }
 
 }  // namespace
@@ -40,3 +48,12 @@ void zemLog::Log(const char* text) { writeLine(kPrefix, text); }
 void zemLog::LogSysOut(const char* text) { writeLine(kPrefix, text); }
 
 void zemLog::LogPlain(const char* text) { writeLine("", text); }
+
+void zemLogLines::add(const char* text) {
+    zemPutLogText(text, [this](const char* piece, size_t size) { m_lines.append(piece, size); });
+    m_lines += '\n';
+}
+
+zemLogLines::~zemLogLines() {
+    writeLines([this] { put(m_lines.data(), m_lines.size()); });
+}

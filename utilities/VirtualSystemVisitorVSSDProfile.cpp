@@ -7,6 +7,7 @@
 
 #include "Exception.h"
 #include "Log.h"
+#include "LogLines.h"
 #include "NumberText.h"
 #include "VirtualSystemVisitorAttributes.h"
 #include "VirtualSystemVisitorRules.h"
@@ -21,15 +22,16 @@ bool isWord(const zemString& text, const char* word) {
     return zemString::equalsIgnoreCase(text, word);
 }
 
-void print(const zemString& name, const zemString& value) {
-    zemLog::LogPlain("=======getProfileVSSD:" + name + ":" + value);
+zemString lineOf(const char* name, const zemString& value) {
+    return zemString("=======getProfileVSSD:") + name + ":" + value;
 }
 
 std::unique_ptr<zemVSSD> makeVSSD(const zemCEC& host, const zemAttributes& lpar,
                                   const zemAttributes& profile) {
-    const auto told = [](const char* name, const zemAttributes& attributes, int attribute) {
+    zemLogLines lines;
+    const auto told = [&lines](const char* name, const zemAttributes& attributes, int attribute) {
         zemString value = attributes[attribute];
-        print(name, value);
+        lines.add(lineOf(name, value));
         return value;
     };
     const zemString lparID = told("lparId", profile, Profile::ATTR_LPAR_ID);
@@ -110,7 +112,7 @@ void tagSlots(const zemAttributes& profile, Tagging tagging, zemVSSD& vssd) {
             }
         }
         if (tagging == TAG_NAMED && tagged == 0) {
-            print("no slot RASD", key);
+            zemLog::LogPlain(lineOf("no slot RASD", key));
         }
     }
 }

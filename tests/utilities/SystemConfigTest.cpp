@@ -222,6 +222,9 @@ TEST_F(SystemConfigTest, ParsesProperties) {
     // clang-format on
 }
 
+static_assert(Profile::IORSC_TYPE_SERIALADAPTER == 1 && Profile::IORSC_TYPE_ETHERNETADAPTER == 2 &&
+              Profile::IORSC_TYPE_IOSLOTADAPTER == 3);
+
 /// All that a profile tells: flags, texts, numbers, and its lists in their elements.
 std::string shown(Profile p) {
     // clang-format off

@@ -73,7 +73,7 @@ zemString sharingText(const zemString& procMode, const zemString& donorMode,
     };
     static constexpr Words kShared = {{{"0", "cap"}, {"1", "uncap"}}, "unknown"};
     if (procMode != "255") {
-        return translated(kShared, zemString(zemNumberOf(sharingMode)));
+        return translated(kShared, zemString(zemWholeNumberOf(sharingMode)));
     }
     const std::int64_t code = std::int64_t{zemNumberOf(sharingMode)} * 10 + zemNumberOf(donorMode);
     for (const auto& row : kDedicated) {
@@ -184,12 +184,12 @@ ZEM_TRANSLATED_SETTER(zemPartitionEthernetAdapterResource, IsRequired, translate
 
 #define ZEM_STORES(NAME, TEXT) ZEM_TRANSLATED_SETTER(zemPartitionProfileConfiguration, NAME, TEXT)
 ZEM_STORES(DesiredIoEntitledMem, translated(kEntitled, value))
-ZEM_STORES(BootMode, zemBootModeText(zemNumberOf(value)))
+ZEM_STORES(BootMode, zemBootModeText(zemWholeNumberOf(value)))
 ZEM_STORES(ProcMode, translated(kModes, value))
 ZEM_STORES(MinProcsUnits, getCLIUnits(value))
 ZEM_STORES(DesiredProcsUnits, getCLIUnits(value))
 ZEM_STORES(MaxProcsUnits, getCLIUnits(value))
-ZEM_STORES(LparProcCompatMode, zemCompatModeText(zemNumberOf(value)))
+ZEM_STORES(LparProcCompatMode, zemCompatModeText(zemWholeNumberOf(value)))
 ZEM_STORES(MemMode, translated(kModes, value))
 #undef ZEM_STORES
 

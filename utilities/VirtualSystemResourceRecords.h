@@ -5,7 +5,8 @@
 /// codes; a setter turns them into the words of the tools at once, so that a field reads the same
 /// whoever filled it. The comment of a field tells its meaning, the property that it is filled
 /// from, and, where the setter translates, what it takes and what it stores. Numbers in a setter's
-/// text are read as strtol() does.
+/// text are read as strtol() does; but a boot mode, a compatibility mode and the sharing mode of
+/// shared processors are "unknown" for a text that is no number.
 ///
 ///     zemPartitionIOSlotResource slot("3*1111-AAA*0000001");
 ///     slot.setPciClass("512");

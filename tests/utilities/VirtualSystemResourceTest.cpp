@@ -82,7 +82,8 @@ TEST(VirtualSystemResourceTest, SettersTranslate) {
         {STORED(Serial, SupportsDnx), "0>0;1>1;null>1;>1"},
         {STORED(Profile, DesiredIoEntitledMem), "0>auto;null>null;64>64"},
         {STORED(Profile, BootMode), "1>norm;2>ds;3>sms;4>of;5>dd;0>unknown;6>unknown"},
-        {STORED(Profile, LparProcCompatMode), "0>CORAL5;63>default;11>unknown"},
+        {STORED(Profile, LparProcCompatMode),
+         "0>CORAL5;63>default;11>unknown;null>unknown;>unknown"},
     };
     for (const auto& row : rows) {
         std::istringstream values(row.values);
@@ -111,6 +112,7 @@ TEST(VirtualSystemResourceTest, SharingModes) {
         {"0", "0", "0", "cap"},
         {"0", "255", "1", "uncap"},
         {"0", "0", "2", "unknown"},
+        {"0", "0", "null", "unknown"},
         {"255", "0", "0", "share_idle_procs"},
         {"255", "1", "0", "share_idle_procs_always"},
         {"255", "0", "1", "keep_idle_procs"},

@@ -161,7 +161,9 @@ void zemLPAR::setMigrationState(int state, bool isApiNumber) {
     m_migrationState = isApiNumber ? zemMigrationStateOf(state) : state;
 }
 
-void zemLPAR::setMigrationState(const char* text) { m_migrationState = zemMigrationStateOf(text); }
+void zemLPAR::setMigrationState(const char* text) {
+    m_migrationState = text == nullptr ? MIGRATION_UNKNOWN : zemMigrationStateOf(text);
+}
 
 void zemLPAR::setStateVSSD(zemVSSD& vssd) { m_stateVSSD = vssd; }
 

@@ -273,7 +273,7 @@ public:
     /// @param isApiNumber  @p state is the library's "MigrationState" rather than such a number
     void setMigrationState(int state, bool isApiNumber);
 
-    /// Takes the tool's text, in any case of letters.
+    /// Takes the tool's text, in any case of letters; null is unknown.
     void setMigrationState(const char* text);
 
     zemLPARCapability& getCapability() { return m_capability; }

@@ -67,6 +67,8 @@ TEST(VirtualSystemRepTest, SettersTakeWhatTheLibraryTells) {
     EXPECT_EQ(4, l.getMigrationState());
     l.setMigrationState("to x: LOST CONNECTION");
     EXPECT_EQ(5, l.getMigrationState());
+    l.setMigrationState(nullptr);
+    EXPECT_EQ(0, l.getMigrationState());
 
     zemCEC host;
     const Answers states = {{"17", "Standby"}, {"240", "Failed Authentication"}, {"255", ""}};

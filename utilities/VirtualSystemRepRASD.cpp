@@ -94,6 +94,8 @@ zemRASDCommData::zemRASDCommData(const zemRASDCommData* source) : zemRASDCommDat
 
 zemRASDCommData::~zemRASDCommData() = default;
 
+zemString zemRASDCommData::getKey() const { return zemString(); }
+
 bool zemRASDCommData::equals(const zemRASDCommData* other) const {
     return m_ResourceType == other->m_ResourceType && haveSame(zemCommonFields(), *this, *other);
 }

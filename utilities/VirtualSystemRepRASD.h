@@ -47,15 +47,16 @@ struct ZEM_EXPORT zemRASDKinds {
     // clang-format on
 };
 
-/// The data common to all kinds. Each kind derives its own data from it.
+/// The data common to all kinds. Each kind derives its own data from it; alone, it is of no kind.
 struct ZEM_EXPORT zemRASDCommData {
     zemRASDCommData() = default;
 
     /// Copies all of @p source, which must not be null, but its address: a copied RASD has none.
     explicit zemRASDCommData(const zemRASDCommData* source);
 
-    /// What tells the resource from others of the same partition, as "3-Processor".
-    virtual zemString getKey() const = 0;
+    /// What tells the resource from others of the same partition, as "3-Processor"; empty for data
+    /// of no kind.
+    virtual zemString getKey() const;
     virtual ~zemRASDCommData();
 
     /// Whether all fields, the address too, are those of @p other, which must not be null.

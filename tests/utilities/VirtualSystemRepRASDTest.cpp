@@ -80,6 +80,9 @@ TEST(VirtualSystemRepRASDTest, CopiesHaveNoAddress) {
     EXPECT_STREQ("net", copy.m_vswitch);
     EXPECT_EQ(20, copy.m_AddVLANIDs[0]);
     EXPECT_FALSE(adapter.equals(clone.get()));
+    const zemRASDCommData common(&adapter.m_Data);
+    EXPECT_TRUE(common.m_Address.isEmpty() && common.getKey().isEmpty());
+    EXPECT_EQ(5, common.m_ResourceType);
 
     zemProcessorRASD processor("");
     processor.setMTMS(kHost);

@@ -56,9 +56,8 @@ public:
 
     /// The VSSD with this instance ID: among those of a host's partitions, null if there is none;
     /// or built anew, null for an ID of neither side.
-    /// @throws zemInvalidParameterException @p id is not of the visitor's host; and what the
-    /// entries
-    ///         by keys throw
+    /// @throws zemInvalidParameterException @p id is not of the visitor's host
+    /// @throws what the entries by keys throw
     zemVSSD* getData(const zemString& id, zemCEC* cec);
     zemVSSD* getData(const zemString& id, int type);
 
@@ -143,8 +142,7 @@ public:
     /// Adds a RASD to @p vssd for each element of a list of slots or adapters, in the form of
     /// VirtualSystemResourceAdapters.h. An element may stand in double quotes.
     /// @throws zemOperationFailedException id "INVALID_RECORD": quotes are not closed; the words
-    /// are
-    ///         what is left of the list, and what stood before it has been added
+    ///         are what is left of the list, and what stood before it has been added
     static void createIORASDs(const zemString& setting, int resourcetype, zemVSSD* vssd);
 
     /// A RASD of one element; null for an empty one, and for a type that is neither slot nor

@@ -9,6 +9,7 @@
 #include "NumberText.h"
 #include "QyplatCmdCaller.h"
 #include "VirtualSystemVisitorLPAR.h"
+#include "VirtualSystemVisitorReaders.h"
 
 namespace {
 
@@ -67,8 +68,10 @@ zemCEC* zemCECVisitor::getData(const zemString& mtms) {
                     Host::ATTR_LPAR_PROC_COMPAT_MODES,
                     Host::ATTR_OSQ00_CAPABLE,
                     Host::ATTR_END};
-    const zemRecordSetsType records = zemQyplatCmdCaller(m_Env.m_userName, m_Env.m_locale)
-                                          .getManagedSystemInformation(wanted, mtms);
+    const zemRecordSetsType records = zemRecordsOf([&] {
+        return zemQyplatCmdCaller(m_Env.m_userName, m_Env.m_locale)
+            .getManagedSystemInformation(wanted, mtms);
+    });
     if (records.size() == 0) {
         return nullptr;
     }

@@ -14,6 +14,7 @@
 #include "SystemConfigSupport.h"
 #include "SystemStateText.h"
 #include "VirtualSystemVisitorAttributes.h"
+#include "VirtualSystemVisitorReaders.h"
 #include "VirtualSystemVisitorRules.h"
 
 namespace {
@@ -202,10 +203,14 @@ zemRecordSetsType zemLPARVisitor::getLparRecords(const zemString& filter, int /*
                        Migration::ATTR_END};
     const zemString mtms = m_CEC->getMTMS();
     const zemString option = filter.isEmpty() ? filter : zemCommandCaller::quoted(filter);
-    zemRecordSetsType partitions = zemQyplatCmdCaller(m_Env.m_userName, m_Env.m_locale)
-                                       .getPartitionsInformation(wanted, mtms, option);
-    const zemRecordSetsType migrations = zemQymoveCmdCaller(m_Env.m_userName, m_Env.m_locale)
-                                             .getPartitionsMigrationState(migration, mtms, option);
+    zemRecordSetsType partitions = zemRecordsOf([&] {
+        return zemQyplatCmdCaller(m_Env.m_userName, m_Env.m_locale)
+            .getPartitionsInformation(wanted, mtms, option);
+    });
+    const zemRecordSetsType migrations = zemRecordsOf([&] {
+        return zemQymoveCmdCaller(m_Env.m_userName, m_Env.m_locale)
+            .getPartitionsMigrationState(migration, mtms, option);
+    });
     for (int i = 0; i < partitions.size(); ++i) {
         zemRecordType& partition = *partitions.getElementAt(i);
         int state = MIGRATION_NOT_MIGRATING;

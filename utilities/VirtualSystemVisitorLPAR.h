@@ -12,7 +12,8 @@
 ///
 /// Whoever is handed a partition by one of the reading forms deletes it; those of the array are the
 /// host's. Operations throw what tools (CommandCaller.h) and the management library raise; the
-/// library's failures bear the class "zemVSSDVisitor", by which clients know them.
+/// library's failures bear the class "zemVSSDVisitor", by which clients know them. That either
+/// finds nothing gives no records.
 ///
 /// Thread-safety: none; a visitor belongs to one operation.
 #ifndef VIRTUAL_SYSTEM_VISITOR_LPAR_H

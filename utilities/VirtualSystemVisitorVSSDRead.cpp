@@ -4,7 +4,6 @@
 #include <memory>
 #include <vector>
 
-#include "Exception.h"
 #include "VirtualSystemVisitorAttributes.h"
 #include "VirtualSystemVisitorCEC.h"
 #include "VirtualSystemVisitorLPAR.h"
@@ -28,11 +27,7 @@ zemRecordSetsType allocated(const zemOperEnv& env, const zemCEC& host, const zem
     std::vector<int> wanted = zemAttributesOf<Resource>();
     const zemString option = filter.isEmpty() ? filter : zemCommandCaller::quoted(filter);
     zemQyallocCmdCaller caller(env.m_userName, env.m_locale);
-    try {
-        return (caller.*query)(wanted.data(), host.getMTMS(), option);
-    } catch (const zemObjectNotFoundException&) {
-        return zemRecordSetsType();
-    }
+    return zemRecordsOf([&] { return (caller.*query)(wanted.data(), host.getMTMS(), option); });
 }
 
 zemLPARVisitor partitionsOf(zemCEC* host, const zemString& type, const zemOperEnv& env) {

@@ -612,7 +612,7 @@ TEST_F(VirtualSystemVisitorTest, ItemsOfAllHostsStandInOneRow) {
     EXPECT_EQ(items.getData(1), items.getData("2*1*2"));
     EXPECT_EQ(nullptr, items.getData(-1));
     EXPECT_EQ(nullptr, items.getData("3*1*3"));
-    m_tools.recorder("qyplat");
+    m_tools.recorder("qyplat", "No results were found.\n");
     items.setOperEnv("", "l");
     EXPECT_EQ(-1, items.initialize("unknown", VISITOR_TYPE_LPAR));
 

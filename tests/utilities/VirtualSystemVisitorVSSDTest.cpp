@@ -526,7 +526,9 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTools) {
     zemCECCapability capability;
     capability.m_lparProcCompatModes = "0";
     m_host.setCapability(&capability);
-    m_partitions.getLparRecords("", 0);
+    m_tools.script("qymove", "echo No results were found.");
+    const Lpar first(m_partitions.getLPAR(m_partitions.getLparRecords("", 0).getElementAt(0)));
+    EXPECT_EQ("3|1|", joined(first->getLparID(), first->getMigrationState()));
     EXPECT_EQ("-r|lpar|-m|1111-AAA*0000001|-F|" + asked + ",desired_lpar_proc_compat_mode|",
               m_tools.read("argv"));
 
@@ -535,6 +537,9 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTools) {
     EXPECT_NE(std::string::npos,
               m_tools.read("argv").find("|lpar_names=\"x,lpar_ids=\"\"1\"\" --all\"|"))
         << m_tools.read("argv");
+    m_tools.script("qyplat", "echo No results were found.");
+    EXPECT_EQ("3/zemLPARVisitor/getData//The lpar() does not exist on host 1111-AAA*0000001",
+              failureText([&] { m_partitions.getData(kHost, "", "a", 0); }));
     EXPECT_EQ(nullptr, m_partitions.getData(kHost, "", "", 1));
     EXPECT_EQ(nullptr, m_partitions.getLPAR(nullptr));
 }

@@ -188,10 +188,8 @@ ZEM_MIGRATION_NUMBER(getMaxActiveMigrationNum, NUM_ACTIVE_MIGRATIONS_SUPPORTED)
 ZEM_MIGRATION_NUMBER(getCurrentActiveMigrationNum, NUM_ACTIVE_MIGRATIONS_IN_PROGRESS)
 
 int zemHostSystem::destoryVirtualSystem(const char* lparId) {
-    const std::string line =
-        "dlplat -r lpar -m " + zemQuoted(getMTMS()) + " --id " + zemQuoted(lparId);
     return zemCommandCaller(m_requestUserContext, nullptr)
-        .callGenericCommand(line.c_str(), nullptr, false);
+        .callGenericCommand(zemRemovalLine(getMTMS(), lparId).c_str(), nullptr, false);
 }
 
 int zemHostSystem::createVirtualSystem(const zemDynamicArray<tagAttributePair>& attrPairs) {

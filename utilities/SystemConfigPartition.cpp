@@ -251,8 +251,7 @@ int zemVirtualSystem::setName(const zemString& systemName) {
 
 int zemVirtualSystem::setKeylock(const zemString& keylockPos) {
     return zemWithNotFound(kUnknownToChanges, kClass, "setKeylock", [&] {
-        const std::string line = "edpower -r lpar -o chkey -k " + zemQuoted(keylockPos) + " --id " +
-                                 zemQuoted(m_lparId) + " -m " + zemQuoted(getMTMS());
+        const std::string line = zemKeylockLine(getMTMS(), m_lparId, keylockPos);
         return zemCommandCaller(m_requestUserContext, m_locale)
             .callGenericCommand(line.c_str(), nullptr, false);
     });

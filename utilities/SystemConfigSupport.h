@@ -7,7 +7,9 @@
 
 #include <cstddef>
 #include <cstring>
+#include <string>
 
+#include "CommandLine.h"
 #include "DNXApiCaller.h"
 #include "Exception.h"
 #include "NumberText.h"
@@ -59,6 +61,15 @@ void zemSetFlag(Object& object, const zemString& value) {
         need(OP_LEVEL_##LEVEL);                            \
         return VALUE;                                      \
     }
+
+/// Lines that several classes run: deleting a partition, and turning its keylock.
+inline std::string zemRemovalLine(const char* mtms, const char* lparId) {
+    return "dlplat -r lpar -m " + zemQuoted(mtms) + " --id " + zemQuoted(lparId);
+}
+inline std::string zemKeylockLine(const char* mtms, const char* lparId, const char* position) {
+    return "edpower -r lpar -o chkey -k " + zemQuoted(position) + " --id " + zemQuoted(lparId) +
+           " -m " + zemQuoted(mtms);
+}
 
 /// Ids by which the query tool and the change tools say that there is no such object.
 constexpr const char* kUnknownToQueries[] = {"WRTL8018", "WRTL8011"};

@@ -81,3 +81,27 @@ zemString zemResourceOfInstanceId(const zemString& id, const zemString& mtms) {
     const int dash = zemIsInstanceIdOf(SIDE_DEFINED, id) ? middle.reverseFind('-') : -1;
     return middle.extractSubstring(static_cast<unsigned>(dash + 1));
 }
+
+zemString zemSystemInstanceIdOf(const zemString& id, const zemString& mtms, bool namesResource) {
+    const std::string text = static_cast<const char*>(id);
+    const std::string end = static_cast<const char*>("*" + mtms);
+    const std::size_t at = text.rfind(end);
+    if (at == text.npos || at + end.size() != text.size()) {
+        return zemString();
+    }
+    if (!namesResource) {
+        return id;
+    }
+    const std::size_t begin = text.find('*') + 1;
+    const std::string rest = begin > at ? "" : text.substr(begin, at - begin);
+    const std::size_t star = rest.rfind('*');
+    const std::string lpar = rest.substr(star + 1) + end;
+    if (zemIsInstanceIdOf(SIDE_STATE, id)) {
+        return (text.substr(0, begin) + lpar).c_str();
+    }
+    const std::size_t dash = star == rest.npos ? star : rest.rfind('-', star);
+    if (dash == rest.npos) {
+        return zemString();
+    }
+    return (text.substr(0, begin + dash + 1) + lpar).c_str();
+}

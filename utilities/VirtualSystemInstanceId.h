@@ -44,4 +44,8 @@ void zemSplitInstanceId(const zemString& id, const zemString& mtms, zemString& p
 /// it; empty when @p id is too short. That it ends with @p mtms is the caller's word.
 zemString zemResourceOfInstanceId(const zemString& id, const zemString& mtms);
 
+/// The ID of the system whose resource @p id is: @p id itself unless it names a resource; empty
+/// when it does not end with @p mtms, or is of another form.
+zemString zemSystemInstanceIdOf(const zemString& id, const zemString& mtms, bool namesResource);
+
 #endif

@@ -19,6 +19,7 @@
 #ifndef VIRTUAL_SYSTEM_REP_VSSD_H
 #define VIRTUAL_SYSTEM_REP_VSSD_H
 
+#include "AutoRelease.h"
 #include "DynamicArray.h"
 #include "RecordSets.h"
 #include "ResourcePoolManagerSettingData.h"
@@ -157,6 +158,10 @@ public:
     bool equals(const zemVSSD* vssd) const;
     bool equalvssd(const zemVSSD* vssd) const;
 
+    /// Whether @p vssd has the same in all that clients set: all fields but the mark of the default
+    /// profile and the lists of slots and adapters, for which the RASDs stand, pairwise.
+    bool hasSettingsOf(const zemVSSD& vssd) const;
+
 private:
     struct Fields;
 
@@ -188,5 +193,11 @@ private:
     zemDynamicArray<zemResourceRASettingData> m_RASDSet;
     zemDynamicArray<zemRASD> m_RASDs;
 };
+
+/// Owns a VSSD to the end of its scope.
+struct ZEM_EXPORT zemVSSDFree {
+    void operator()(zemVSSD* vssd) const { delete vssd; }
+};
+using zemVSSDAutoRelease = zemAutoRelease<zemVSSD, zemVSSDFree>;
 
 #endif

@@ -2,6 +2,8 @@
 
 #include <cstdint>
 #include <string>
+#include <string_view>
+#include <tuple>
 
 #include "Log.h"
 #include "VirtualSystemRepRASDFields.h"
@@ -29,6 +31,11 @@ struct zemVSSD::Fields {
                           ZEM_NAMED_FIELD(m_virtualSCSIAdaptersInfo),
                           ZEM_NAMED_FIELD(m_virtualEthetnetAdaptersInfo),
                           ZEM_NAMED_FIELD(m_memoryPoolNum)};
+    }
+
+    /// Whether @p name is of a field that follows from others, or from the RASDs.
+    static bool follows(std::string_view name) {
+        return name == "m_isDefault" || name.find("Info") != name.npos;
     }
 };
 
@@ -101,6 +108,25 @@ bool zemVSSD::equalvssd(const zemVSSD* vssd) const {
                    return ((this->*field.member == vssd->*field.member) && ...);
                },
                Fields::all());
+}
+
+bool zemVSSD::hasSettingsOf(const zemVSSD& vssd) const {
+    // A RASD compares only as many elements of its lists as it has: both are asked.
+    const auto haveSame = [](zemRASD* mine, zemRASD* other) {
+        return mine->equals(other) && other->equals(mine);
+    };
+    bool same = m_InstanceID == vssd.m_InstanceID && m_RASDs.size() == vssd.m_RASDs.size() &&
+                std::apply(
+                    [&](const auto&... field) {
+                        return ((Fields::follows(field.name) ||
+                                 this->*field.member == vssd.*field.member) &&
+                                ...);
+                    },
+                    Fields::all());
+    for (int i = 0; same && i < m_RASDs.size(); ++i) {
+        same = haveSame(m_RASDs[i], vssd.m_RASDs[i]);
+    }
+    return same;
 }
 
 bool zemVSSD::equals(const zemVSSD* vssd) const {

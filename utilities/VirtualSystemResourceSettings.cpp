@@ -1,5 +1,8 @@
 #include "VirtualSystemResourceSettings.h"
 
+#include <cstdint>
+#include <cstdlib>
+
 #include "SystemStateText.h"
 
 namespace {
@@ -28,9 +31,12 @@ zemString zemSettingText::unsignedLong(std::int64_t value) {
 }
 
 zemString zemSettingText::hundredths(std::int64_t value) {
-    constexpr double kWhole = 100.0;
+    // Digit by digit: the decimal point of a printed float is the process locale's.
+    constexpr std::int64_t kWhole = 100;
     zemString text;
-    text.format("%.2f", static_cast<double>(value) / kWhole);
+    text.format("%s%lld.%02lld", value < 0 ? "-" : "",
+                static_cast<long long>(std::abs(value / kWhole)),
+                static_cast<long long>(std::abs(value % kWhole)));
     return text;
 }
 

@@ -62,6 +62,20 @@ public:
     /// @throws what queries throw (CommandCaller.h)
     int initilaizeCECSuspendRR(const zemString& userName, int level);
 
+    /// Makes a partition of @p cec, with its first profile, by one line of the tool "nwplat"; the
+    /// model stays as it is. The tool chooses the partition's number.
+    /// @param vssd  the settings, and the RASDs of one processor and one memory, of slots and
+    ///        adapters, which stay the caller's. What is empty or not set is left to the tool, but
+    ///        virtual slots, of which a type has a usual number. Dedicated processors are set to
+    ///        share what is idle, and to be as many as their units, in the RASD itself.
+    /// @param isOSQ00  the slots that are tagged as load source, console and the like are told too
+    /// @return 0
+    /// @throws zemInvalidParameterException there are several RASDs of processors or memory, or
+    ///         shared processors are from no pool although the host has several
+    /// @throws zemObjectNotFoundException id "Processor" or "Memory": there is none
+    /// @throws what the tool's failures raise (CommandCaller.h); it has made nothing then
+    int createLPAR(zemCEC* cec, zemVSSD* vssd, bool isOSQ00);
+
     /// Adds @p cec, which becomes the manager's, after its partitions have been read. Returns 0.
     /// @throws what zemLPARVisitor::initialize() throws; @p cec has been deleted then
     int addCEC(zemCEC* cec, const zemString& userName);

@@ -1,4 +1,4 @@
-/// zemLPARVisitor: reads the partitions of one host.
+/// zemLPARVisitor: reads and changes the partitions of one host.
 ///
 /// initialize() fills the host's array with all of them; getData() with keys reads a single one
 /// anew, with what it can change while it runs. Records are keyed by
@@ -19,6 +19,11 @@
 #ifndef VIRTUAL_SYSTEM_VISITOR_LPAR_H
 #define VIRTUAL_SYSTEM_VISITOR_LPAR_H
 
+#include <sys/types.h>
+
+#include <cstdio>
+
+#include "CommandCaller.h"
 #include "DNXApiCaller.h"
 #include "RecordSets.h"
 #include "StringUtils.h"
@@ -86,6 +91,40 @@ public:
     int addData(zemLPAR* lpar, const zemString& userName);
     int removeData(const zemString& idmtms);
     int modifyData(zemLPAR* lpar);
+
+    // --- Changes of the appliance, each by one line of a tool; the model stays as it is
+    //
+    // throws: what the tools' failures raise (CommandCaller.h).
+
+    /// Deletes a partition with its profiles. Returns 0.
+    int deleteLpar(const zemString& mtms, const zemString& lparId);
+
+    /// Gives the partition of @p vssd its default profile and its name, by one line, and the
+    /// position of its keylock, by another; each that is invalid stays as it is. Returns 0.
+    /// @throws zemObjectNotFoundException of "zemVirtualSystem" and "setDefaultProfile": there is
+    ///         no such host or partition
+    int ModifyLparProperties(zemVSSD* vssd);
+
+    /// Turns the keylock of the partition of @p vssd to "norm" or "manual". Returns 0.
+    int ChangeKeyLock(zemVSSD* vssd, const zemString& keylock);
+
+    // The resources of a partition that runs. With both of pid and fpOutput the tool works in the
+    // background, and child and stream are the caller's (EdallocCmdCaller.h); with nulls it has
+    // ended.
+
+    /// Adds (CH_OP_ADD) or removes (CH_OP_REMOVE) the slot or adapter of @p rasd.
+    /// @return 0; -1, and no tool runs, for other changes and other RASDs
+    int ChangeRunningIOResource(const zemString& mtms, const zemString& lparid, zemRASD* rasd,
+                                pid_t* pid, FILE** fpOutput, zemCommandCaller::CH_OP_TYPE op);
+
+    /// Changes processors or memory from what @p rasdold says to what @p rasd says: their size, or
+    /// if that stays their weight and the way of sharing. Quantities that are not set do not
+    /// change.
+    /// @return 0; -1, and no tool runs, when nothing is to change, and for other RASDs
+    /// @throws zemOperationFailedException @p rasdold is neither shared nor dedicated
+    /// @throws zemInvalidParameterException as removing processors does (EdallocCmdCaller.h)
+    int ChangeRunningMemProcResource(const zemString& mtms, const zemString& lparid,
+                                     zemRASD* rasdold, zemRASD* rasd, pid_t* pid, FILE** fpOutput);
 
     /// The management library's numbers as words for a user; "unknown", or for types "", for a
     /// number without one.

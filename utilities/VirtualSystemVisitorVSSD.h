@@ -1,5 +1,6 @@
 /// zemVSSDVisitor: builds the settings of one partition of one host, with their RASDs: those that
 /// the partition runs with (the state side), and those of one of its profiles (the defined side).
+/// Profiles are changed here too, by VSSDs and RASDs of the same form.
 ///
 /// Here a record of the back end becomes quantities: processors in hundredths, memory in kilobytes.
 /// Each side has three entries that give the same RASDs but where it is said: by keys, which reads
@@ -26,6 +27,7 @@
 #ifndef VIRTUAL_SYSTEM_VISITOR_VSSD_H
 #define VIRTUAL_SYSTEM_VISITOR_VSSD_H
 
+#include "CommandCaller.h"
 #include "DNXApiCaller.h"
 #include "RecordSets.h"
 #include "StringUtils.h"
@@ -152,6 +154,56 @@ public:
 
     /// How shared processors are shared: "cap", "uncap", or "unknown" for another number.
     static zemString getSharingModeString(int sharingMode);
+
+    /// What createIORASDs() takes apart: the slots or the adapters of @p vssd as a list, escaped to
+    /// be a value of a change tool's line. An element with additional VLANs stands in quotes, and
+    /// so does one with a comma or a quote. A RASD's mark that it is required becomes 0 unless it
+    /// is 1. Empty if there are none, and for a type that is neither slot nor adapter.
+    static zemString getIOSettingString(zemVSSD* vssd, int resourcetype);
+
+    /// The instance ID of the VSSD to which the RASD with the ID @p id belongs; empty unless it
+    /// ends with the key of @p cec and has the form of its type.
+    static zemString ConstructVSSDInstanceIDFromRASDInstanceID(zemCEC* cec, const zemString& id,
+                                                               int resourceType);
+
+    /// The resource type of a class of setting data, as 3 for "ORXC_ProcessorRASettingData",
+    /// ignoring case.
+    /// @throws zemInvalidParameterException there is no such class
+    static int getResourceType(const zemString& className);
+
+    // --- Changes of the model alone
+
+    /// Appends @p vssd to the profiles' VSSDs of its partition, which owns it from there on; if the
+    /// host has no such partition it stays the caller's. Returns 0.
+    int addData(zemVSSD* vssd);
+
+    /// Puts @p data in the place of the VSSD with its instance ID, if that has other settings
+    /// (zemVSSD::hasSettingsOf()), and prints what it returns.
+    /// @return 0: a profile's belongs to the partition now, and of the one that runs @p data has
+    ///         handed its RASDs over; -1: there is none to change, and @p data is the caller's
+    int modifyData(zemVSSD* data);
+
+    /// Deletes the VSSD of a profile with this instance ID. Returns 0.
+    int removeData(const zemString& id);
+
+    // --- Changes of a profile, each by one line of a tool; the model stays as it is
+    //
+    // return: 0. throws: what the tool's failures raise (CommandCaller.h); it has changed nothing
+    // then.
+
+    /// Changes the resources of the profile that @p vssd names as its RASDs say: lists of slots and
+    /// adapters get or lose elements or are set, and so are tagged slots; processors and memory are
+    /// only set (CH_OP_MODIFY). What has no RASD, and what is empty or not set, stays.
+    /// @throws zemInvalidParameterException there are several RASDs of processors or of memory
+    int ModifyResourcesOfProfile(zemVSSD* vssd, zemCommandCaller::CH_OP_TYPE opType);
+    int AddIOResources(zemVSSD* vssd);     ///< with CH_OP_ADD
+    int RemoveIOResources(zemVSSD* vssd);  ///< with CH_OP_REMOVE
+
+    /// Gives the profile @p name of the partition of @p vssd the settings and the name of @p vssd.
+    int ModifySystemSetting(zemVSSD* vssd, const zemString& name);
+
+    /// Deletes a profile, which is neither the partition's default nor its current one.
+    int deleteLparProfile(const zemString& mtms, const zemString& lparId, const zemString& profile);
 
 private:
     zemOperEnv m_Env;

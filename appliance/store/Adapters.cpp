@@ -196,7 +196,8 @@ Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std:
     } else if (form.kind == Kind::Serial && adapter.get("adapter_type") == "client") {
         adapter.set("supports_dnx", "0");
     }
-    if (!isWhole(adapter)) {
+    // A client finds its server when the partition starts.
+    if (form.kind == Kind::Ethernet && !isWhole(adapter)) {
         throw malformed;
     }
     return adapter;

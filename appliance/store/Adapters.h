@@ -63,8 +63,8 @@ std::map<std::int64_t, Object> adaptersOf(const Object& profile);
 /// value. Empty stands for the usual value.
 std::optional<std::string> adapterValue(const std::string& name, const std::string& value);
 
-/// Whether the values of an adapter go together: a client must name its server's slot, and only
-/// IEEE adapters have additional VLANs.
+/// Whether the values of an adapter that exists go together: a client must name its server's slot,
+/// which in a profile it may leave open, and only IEEE adapters have additional VLANs.
 bool isWhole(const Object& adapter);
 
 /// A virtual slot of a host: the ID of its partition, and its number there.

@@ -162,21 +162,58 @@ void Activation::setProcessors(const Object& before, const Object& profile, Obje
     setQuantity(lpar, profile, "proc_units", units(given));
 }
 
-void Activation::requireServer(const Object& client) const {
-    const VirtualSlot slot = *serverOf(client);
+bool Activation::isFreeFor(const Object& client, const VirtualSlot& slot) const {
     const auto server = m_adapters.find(slot);
     const auto other = m_clients.find(slot);
     const std::int64_t id = client.place().lpar;
     const bool isFree = other == m_clients.end() || other->second.first == id;
-    refuseIf(slot.first == id || !isFree || server == m_adapters.end() ||
-                 !serves(server->second, client),
-             Fault::NoServerAdapter, {text(client.place().number)});
+    return slot.first != id && isFree && server != m_adapters.end() &&
+           serves(server->second, client);
+}
+
+void Activation::join(Object& client, std::set<VirtualSlot>& taken) const {
+    const Failure notFound(Fault::NoServerAdapter, {text(client.place().number)});
+    std::optional<VirtualSlot> found = serverOf(client);
+    if (found && !isFreeFor(client, *found)) {
+        throw notFound;
+    }
+    const auto admits = [&](const char* attribute, std::int64_t value) {
+        const std::string wanted = client.get(attribute);
+        return wanted == "any" || wanted == text(value);
+    };
+    const auto fits = [&](const VirtualSlot& slot) {
+        return admits("remote_lpar_id", slot.first) && admits("remote_slot_num", slot.second) &&
+               taken.count(slot) == 0 && isFreeFor(client, slot);
+    };
+    const auto old = m_adapters.find(slotOf(client));
+    const auto before = old == m_adapters.end() ? std::nullopt : serverOf(old->second);
+    if (!found && before && fits(*before)) {
+        found = before;
+    }
+    for (auto other = m_adapters.begin(); !found && other != m_adapters.end(); ++other) {
+        if (fits(other->first)) {
+            found = other->first;
+        }
+    }
+    if (!found) {
+        throw notFound;
+    }
+    client.set("remote_lpar_id", text(found->first));
+    client.set("remote_slot_num", text(found->second));
+    taken.insert(*found);
 }
 
 std::map<VirtualSlot, Object> Activation::adaptersFor(const Object& lpar,
                                                       const Object& profile) const {
     std::map<VirtualSlot, Object> adapters;
-    for (const auto& [number, wanted] : adaptersOf(profile)) {
+    const std::map<std::int64_t, Object> asked = adaptersOf(profile);
+    std::set<VirtualSlot> servers;
+    for (const auto& [number, wanted] : asked) {
+        if (const auto server = serverOf(wanted)) {
+            servers.insert(*server);
+        }
+    }
+    for (const auto& [number, wanted] : asked) {
         // What the profile does not say of an adapter that was there before stays: its MAC
         // address, the devices behind it.
         const auto old = m_adapters.find(slotOf(wanted));
@@ -188,8 +225,8 @@ std::map<VirtualSlot, Object> Activation::adaptersFor(const Object& lpar,
         if (wanted.kind() == Kind::Ethernet && !stays) {
             adapter.set("mac_addr", newMac(m_host, wanted.place()));
         }
-        if (serverOf(adapter)) {
-            requireServer(adapter);
+        if (adapter.kind() != Kind::Ethernet && adapter.get("adapter_type") == "client") {
+            join(adapter, servers);
         }
         adapters.emplace(slotOf(adapter), std::move(adapter));
     }

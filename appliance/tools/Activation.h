@@ -10,6 +10,7 @@
 #define APPLIANCE_ACTIVATION_H
 
 #include <map>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -53,8 +54,12 @@ private:
     void setProcessors(const Object& before, const Object& profile, Object& lpar) const;
     Object withResources(const Object& before, const Object& profile) const;
     std::map<VirtualSlot, Object> adaptersFor(const Object& lpar, const Object& profile) const;
+    /// Whether the adapter in @p slot is a server for @p client, and free for it.
+    bool isFreeFor(const Object& client, const VirtualSlot& slot) const;
+    /// Joins a client to its server: if the profile leaves open which, to the one that it had
+    /// before, or else the first that is free, and not among @p taken, to which it is added then.
     /// @throws Failure NoServerAdapter
-    void requireServer(const Object& client) const;
+    void join(Object& client, std::set<VirtualSlot>& taken) const;
     std::map<std::string, Object> slotsFor(const Object& lpar, const Object& profile) const;
     void account(const Object& lpar, int sign);
 

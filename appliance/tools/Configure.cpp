@@ -145,6 +145,18 @@ void removeLpar(Change& change, const Operation&) {
     eraseLpar(change, change.host(), lpar);
 }
 
+/// The partition's default profile and the one that it runs with stay: it would name none.
+void removeProfile(Change& change, const Operation&) {
+    requireConnection(change.host());
+    const Object lpar = change.lpar();
+    requireStill(lpar);
+    refuseIf(!change.request().has("-n"), Fault::MissingOption, {"-n"});
+    const std::string name = change.request().value("-n");
+    const Object* profile = change.host().profile(lpar.place().lpar, name);
+    refuseIf(profile == nullptr, Fault::ProfileNotFound, {name});
+    change.remove(*profile);
+}
+
 const std::string kHostNames = namesOf(hostRules(), "");
 const std::string kLparNames = namesOf(lparRules(), "name,lpar_id");
 const std::string kProfileNames = namesOf(profileRules(), "name,lpar_id,lpar_name,new_name");
@@ -157,6 +169,7 @@ const std::vector<Operation> kConfigureOperations = {
     {{kEdplat, "prof", nullptr, nullptr, kProfileNames.c_str()}, editProfile},
     {{kNwplat, "lpar", nullptr, nullptr, newLparNames()}, makeLpar},
     {{kDlplat, "lpar", nullptr, nullptr}, removeLpar},
+    {{kDlplat, "prof", nullptr, nullptr}, removeProfile},
 };
 
 }  // namespace appliance

@@ -185,6 +185,19 @@ std::string merged(const std::string& key, Setting::Operator op, const std::stri
     return adapterList(elements);
 }
 
+/// A tag names one slot: one that is added takes the place, and the one that is removed leaves it.
+/// None, or @p word in place of a slot, is nothing to add or remove.
+std::string retagged(Setting::Operator op, const std::string& held, const std::string& slot,
+                     const std::string& word) {
+    if (isNone(slot) || slot == word) {
+        return held;
+    }
+    if (op == Setting::Operator::Remove) {
+        return held == slot ? kNone : held;
+    }
+    return slot;
+}
+
 const AttributeRule& ruleFor(const AttributeRules& rules, const std::string& name) {
     return *std::find_if(rules.begin(), rules.end(),
                          [&](const AttributeRule& rule) { return isListed(rule.names, name); });
@@ -283,9 +296,9 @@ std::string checkedValue(const HostView& host, const AttributeRules& rules,
                          const Setting& setting) {
     const AttributeRule& rule = ruleFor(rules, setting.name);
     const bool replaces = setting.op == Setting::Operator::Set;
-    refuseIf(!replaces && !rule.isList, Fault::NotAList, {setting.name});
+    refuseIf(!replaces && !rule.isList && rule.rule != taggedSlot, Fault::NotAList, {setting.name});
     // What is removed from a list need not be written in full.
-    if (setting.op == Setting::Operator::Remove && rule.stored == nullptr) {
+    if (setting.op == Setting::Operator::Remove && rule.isList && rule.stored == nullptr) {
         return setting.value;
     }
     Value value = rule.rule(host, setting.value, rule.argument);
@@ -304,10 +317,11 @@ void apply(const HostView& host, const AttributeRules& rules, const Setting& set
         return;
     }
     const std::string name = rule.stored == nullptr ? setting.name : rule.stored;
-    if (!rule.isList) {
-        return object.set(name, value);
-    }
     const bool replaces = setting.op == Setting::Operator::Set;
+    if (!rule.isList) {
+        return object.set(
+            name, replaces ? value : retagged(setting.op, object.get(name), value, rule.argument));
+    }
     object.set(name, merged(name, setting.op, replaces ? kNone : object.get(name), value));
 }
 

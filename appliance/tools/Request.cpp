@@ -62,6 +62,7 @@ constexpr Option kOptions[] = {
     {"-b", kEdpower, "norm|dd|ds|of|sms", "boot mode; that of the profile when absent"},
     {"-k", kEdpower, "norm|manual", "position of the keylock"},
     {"-n", kEdpower, "<system profile>", "the system profile"},
+    {"-n", kDlplat, "<profile>", "the profile"},
     {"--immed", kEdpower, nullptr, "end at once what runs"},
     {"--restart", kEdpower, nullptr, "start again afterwards"},
     {"--continue", kEdpower, nullptr, "pass over partitions that cannot start"},

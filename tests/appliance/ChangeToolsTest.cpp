@@ -62,6 +62,9 @@ TEST_F(ChangeToolsTest, ResourcesMove) {
     EXPECT_EQ("v", adapters.value(1, "vswitch"));
 }
 
+#define TAGGED "edplat -r prof -m alpha -i '\"name=normal\",\"lpar_id=6\","
+#define TAGS "qyplat -r prof -m alpha --filter lpar_ids=6 -F io_slots,load_source_slot,alt_restart_device_slot,console_slot,op_console_slot"
+
 TEST_F(ChangeToolsTest, StoredSettingsChange) {
     expectRows({
         // Hosts.
@@ -84,6 +87,14 @@ TEST_F(ChangeToolsTest, StoredSettingsChange) {
         {"qyplat -r prof -m alpha --filter lpar_ids=3 -F virtual_scsi_adapters,virtual_serial_adapters,io_slots", "\"3/client/1/xbrg1/13/1,7/client/1/xbrg1/20/1\",\"0/server/1/any//any/1,1/server/1/any//any/1,8/server/1/any//any/0\",30000006/none/1\n"},
         {"edplat -r prof -m alpha -i '\"name=day\",\"lpar_id=3\",\"virtual_eth_adapters-=\"\"6/1/1/5,7/2/1/sw\"\",2\",\"virtual_serial_adapters-=8/server//any//any/0\",\"io_slots-=30000006//1\",\"virtual_scsi_adapters=none\"'"},
         {"qyplat -r prof -m alpha --filter lpar_ids=3 -F virtual_eth_adapters,virtual_scsi_adapters,virtual_serial_adapters,io_slots", "\"\"\"5/1/7/20,30/0/0/default\"\"\",none,\"0/server/1/any//any/1,1/server/1/any//any/1\",none\n"},
+        // Tags beside lists: none takes nothing away.
+        {TAGGED "\"io_slots+=30000006//0\",\"load_source_slot+=none\",\"alt_restart_device_slot+=30000006\",\"console_slot+=dnx\",\"op_console_slot+=30000006\"'"},
+        {TAGS, "\"30000005/none/1,30000006/none/0\",30000005,30000006,dnx,30000006\n"},
+        {TAGGED "\"io_slots-=30000006//0\",\"load_source_slot-=none\",\"alt_restart_device_slot-=30000005\",\"console_slot-=dnx\",\"op_console_slot-=30000006\"'"},
+        {TAGS, "30000005/none/1,30000005,30000006,dnx,none\n"},
+        {"edplat -r lpar -m alpha -i '\"lpar_id=4\",\"default_profile=normal\"'"},
+        {"dlplat -r prof -m alpha --id 4 -n 'small, \"safe\"'"},
+        {"qyplat -r prof -m alpha --filter lpar_ids=4 -F name", "normal\n"},
         {"appliance check"},
     });
     const Answer profile(getLparProfile("", "3*1111-AAA*0000001", "day", 2)), host(getCecObj("", "1111-AAC*0000003", 1));
@@ -192,7 +203,7 @@ TEST_F(ChangeToolsTest, WhatIsRefusedChangesNothing) {
         {PROF "\"virtual_eth_adapters+=10/0/1//0/0\"'", "WRTL1011 The attribute virtual_eth_adapters cannot have the value \"10/0/1//0/0/default\"."},
         {PROF "\"virtual_eth_adapters=4/0/1/\"\"5,6\"\"/0/0\"'", "WRTL1011 "},
         {PROF "\"virtual_eth_adapters=4/0/4095//0/0\"'", "WRTL1011 "},
-        {PROF "\"virtual_scsi_adapters=4/client/any//any/0\"'", "WRTL1011 "},
+        {PROF "\"console_slot+=x\"'", "WRTL1011 "},
         {PROF "\"virtual_serial_adapters-=0\"'", "WRTL8046 "},
         {PROF "\"virtual_eth_adapters-=6/0/1//0/0\"'", "WRTL8040 The list virtual_eth_adapters does not have \"6\"."},
         {PROF "\"io_slots=999//1\"'", "WRTL8041 The managed system has no physical slot 999."},
@@ -229,6 +240,9 @@ TEST_F(ChangeToolsTest, WhatIsRefusedChangesNothing) {
         {"dlplat -r lpar -m alpha --id 3", "WRTL8049 "},
         {"dlplat -r lpar -m 'beta lab' --id 1", "WRTL8047 "},
         {"dlplat -r lpar -m 'beta lab' --id 2", "WRTL8050 "},
+        {"dlplat -r prof -m alpha --id 3 -n normal", "WRTL8030 "},
+        {"dlplat -r prof -m alpha --id 3 -n x", "WRTL8031 "},
+        {"dlplat -r prof -m alpha --id 3", "WRTL1003 The option -n is missing."},
     });
 }
 // clang-format on

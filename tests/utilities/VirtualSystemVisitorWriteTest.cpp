@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
 
+#include <cstring>
+#include <filesystem>
 #include <functional>
 #include <memory>
 
@@ -342,7 +344,7 @@ TEST_F(VirtualSystemVisitorWriteTest, TakesIdsAndClassesApart) {
 }
 
 TEST_F(VirtualSystemVisitorWriteTest, ChangesPartitions) {
-    zemVSSD none(kHost, "3", ""), name(kHost, "3", ""), all(Given().lparID, kHost, "", 0, "a\"b", "", "", 0, 0, 0, 0, "manual", "day");
+    zemVSSD none(kHost, "3", ""), all("3", kHost, "", 0, "a\"b", "", "", 0, 0, 0, 0, "manual", "day");
     const auto rasd = [](int type, const char* element) { return std::unique_ptr<zemRASD>(zemVSSDVisitor::createIORASD(element, type)); };
     const auto io = [&](zemRASD* r, Caller::CH_OP_TYPE op, const char* host = kHost) { return m_partitions.ChangeRunningIOResource(host, "3", r, nullptr, nullptr, op); };
     const auto trunk = rasd(10, "5/1/7/\"20,30\"/2/1/s w"), plain = rasd(10, "6/0/1//0/0"), slot = rasd(12, "210//1"), scsi = rasd(6, "3/client/1//13/1"), open = rasd(6, "4/server/any//any/0"), serial = rasd(21, "9/server/1/4//any/0");

@@ -61,7 +61,7 @@ ROWS = [
     ("MultiNtoN_EnumNames", "Rows_EnumNames", None, 0),
     ("ExecuteCommand/real_time", "SpawnReadWait/real_time", 1.5, 0),
     ("ExecuteCommandInServerAsUser/real_time", "ExecuteCommandInServer/real_time", 2.0, 0),
-    ("Qyalloc/1000/manual_time", "QyallocSpawn/1000/manual_time", 1.2, 0),
+    ("Qyalloc/1000/manual_time", "QyallocSpawn/1000/manual_time", 1.35, 0),
     ("GetAllLpars/1000", "SqliteWalkLpars/1000", 10.0, 0),
     ("GetAllLpars/10000", "SqliteWalkLpars/10000", 10.0, 0),
     ("GetAllLpars/10000", "GetAllLpars/1000", 15.0, 0),

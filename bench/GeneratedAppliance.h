@@ -2,10 +2,20 @@
 #ifndef GENERATED_APPLIANCE_H
 #define GENERATED_APPLIANCE_H
 
+#include <chrono>
 #include <stdexcept>
 #include <string>
 
 #include "TestAppliance.h"
+
+/// How long @p call takes.
+template <typename Call>
+double seconds(Call call) {
+    using Clock = std::chrono::steady_clock;
+    const auto begin = Clock::now();
+    call();
+    return std::chrono::duration<double>(Clock::now() - begin).count();
+}
 
 constexpr std::int64_t kLparsPerHost = 1000;
 

@@ -7,7 +7,6 @@
 
 #include <benchmark/benchmark.h>
 
-#include <chrono>
 #include <string>
 
 #include "DNXApiCaller.h"
@@ -16,14 +15,6 @@
 #include "VirtualSystemRep.h"
 
 namespace {
-
-template <typename Call>
-double seconds(Call call) {
-    using Clock = std::chrono::steady_clock;
-    const auto begin = Clock::now();
-    call();
-    return std::chrono::duration<double>(Clock::now() - begin).count();
-}
 
 /// What filling a partition asks of the platform.
 void askPlainly(const std::string& mtms, const std::string& id) {

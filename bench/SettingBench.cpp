@@ -8,7 +8,6 @@
 
 #include <benchmark/benchmark.h>
 
-#include <chrono>
 #include <fstream>
 #include <string>
 
@@ -33,14 +32,6 @@ constexpr struct {
     {"ORXC_SCSIAdapterRASettingData", {getAllLparVirtualScsi, nullptr}},
     {"ORXC_SerialAdapterRASettingData", {getAllLparVirtualSerial, nullptr}},
 };
-
-template <typename Call>
-double seconds(Call call) {
-    using Clock = std::chrono::steady_clock;
-    const auto begin = Clock::now();
-    call();
-    return std::chrono::duration<double>(Clock::now() - begin).count();
-}
 
 void askPlainly(const All (&calls)[2]) {
     constexpr int kEverything = 2;

@@ -2,10 +2,10 @@
 /// getter and its setter, and behind which stand the field's meaning, source and unit.
 ///
 ///     class zemExample {
-///         ZEM_TEXT_FIELD(LparName);           ///< user's name of the partition; "UserDefinedName"
-///         ZEM_TRANSLATED_FIELD(CurrProcMode); ///< "ded" or "shared"; "CurProcMode", 255 dedicated
-///         ZEM_READ_FIELD(CurrSharingMode);    ///< the class declares how this one is set
-///         ZEM_FIELD(int, m_slots, Slots);     ///< a member that is named otherwise, and no text
+///         ZEM_TEXT_FIELD(m_LparName, LparName);  ///< user's name; "UserDefinedName"
+///         ZEM_TRANSLATED_FIELD(m_CurrProcMode, CurrProcMode);  ///< "ded" or "shared"
+///         ZEM_READ_FIELD(m_CurrSharingMode, CurrSharingMode);  ///< the class says how it is set
+///         ZEM_FIELD(int, m_slots, Slots);  ///< no text
 ///
 ///     public:
 ///         void setCurrSharingMode(const zemString& procMode, const zemString& sharingMode);
@@ -53,16 +53,16 @@ public:                                                                    \
     ZEM_READ_FIELD_OF(TYPE, MEMBER, NAME)
 
 /// A text kept as it comes.
-#define ZEM_TEXT_FIELD(NAME) ZEM_FIELD(zemString, m_##NAME, NAME)
+#define ZEM_TEXT_FIELD(MEMBER, NAME) ZEM_FIELD(zemString, MEMBER, NAME)
 
 /// A text that can be read; its setter is declared and defined by the class.
-#define ZEM_READ_FIELD(NAME) ZEM_READ_FIELD_OF(zemString, m_##NAME, NAME)
+#define ZEM_READ_FIELD(MEMBER, NAME) ZEM_READ_FIELD_OF(zemString, MEMBER, NAME)
 
 /// A text made from what the management library tells; ZEM_TRANSLATED_SETTER says how.
-#define ZEM_TRANSLATED_FIELD(NAME)          \
+#define ZEM_TRANSLATED_FIELD(MEMBER, NAME)  \
 public:                                     \
     void set##NAME(const zemString& value); \
-    ZEM_READ_FIELD(NAME)
+    ZEM_READ_FIELD(MEMBER, NAME)
 
 /// The setter of a translated field, in the source: TEXT is what is stored for "value".
 #define ZEM_TRANSLATED_SETTER(CLASS, NAME, TEXT) \

@@ -60,12 +60,18 @@ class ZEM_EXPORT zemSystemProcessorResource : public zemHardwareResource {
 public:
     using zemHardwareResource::zemHardwareResource;
 
-    ZEM_TEXT_FIELD(ConfigurableSysProcUnits);    ///< can be given out; "ConfigurableProcUnits"
-    ZEM_TEXT_FIELD(CurrAvailSysProcUnits);       ///< are free; "CurAvailProcUnits"
-    ZEM_TEXT_FIELD(PendAvailSysProcUnits);       ///< free then; "PendAvailProcUnits"
-    ZEM_TEXT_FIELD(InstalledSysProcUnits);       ///< are built in; "InstalledProcessors"
-    ZEM_TEXT_FIELD(MaxSharedProcPools);          ///< most shared pools; "MaxProcPools"
-    ZEM_TEXT_FIELD(MinProcUnitsPerVirtualProc);  ///< least for a virtual processor; "MinProcUnit"
+    /// can be given out; "ConfigurableProcUnits"
+    ZEM_TEXT_FIELD(m_ConfigurableSysProcUnits, ConfigurableSysProcUnits);
+    /// are free; "CurAvailProcUnits"
+    ZEM_TEXT_FIELD(m_CurrAvailSysProcUnits, CurrAvailSysProcUnits);
+    /// free then; "PendAvailProcUnits"
+    ZEM_TEXT_FIELD(m_PendAvailSysProcUnits, PendAvailSysProcUnits);
+    /// are built in; "InstalledProcessors"
+    ZEM_TEXT_FIELD(m_InstalledSysProcUnits, InstalledSysProcUnits);
+    /// most shared pools; "MaxProcPools"
+    ZEM_TEXT_FIELD(m_MaxSharedProcPools, MaxSharedProcPools);
+    /// least for a virtual processor; "MinProcUnit"
+    ZEM_TEXT_FIELD(m_MinProcUnitsPerVirtualProc, MinProcUnitsPerVirtualProc);
 };
 
 /// The processors that a host's shared pools are made of, in such units.
@@ -73,8 +79,10 @@ class ZEM_EXPORT zemPoolProcessorResource : public zemHardwareResource {
 public:
     using zemHardwareResource::zemHardwareResource;
 
-    ZEM_TEXT_FIELD(PendAvailPoolProcUnits);     ///< free then; "PendAvailProcUnits"
-    ZEM_TEXT_FIELD(ConfigurablePoolProcUnits);  ///< can be given out; "ConfigurableProcUnits"
+    /// free then; "PendAvailProcUnits"
+    ZEM_TEXT_FIELD(m_PendAvailPoolProcUnits, PendAvailPoolProcUnits);
+    /// can be given out; "ConfigurableProcUnits"
+    ZEM_TEXT_FIELD(m_ConfigurablePoolProcUnits, ConfigurablePoolProcUnits);
 };
 
 /// One shared processor pool of a host.
@@ -82,11 +90,14 @@ class ZEM_EXPORT zemProcessorPoolResource : public zemHardwareResource {
 public:
     using zemHardwareResource::zemHardwareResource;
 
-    ZEM_TEXT_FIELD(SharedProcPoolId);           ///< number of the pool; "SharedProcPoolId"
-    ZEM_TEXT_FIELD(LparIds);                    ///< partitions in it, with commas; "lpar_ids"
-    ZEM_TEXT_FIELD(MaxPoolProcUnits);           ///< the most units in it
-    ZEM_TEXT_FIELD(PendReservedPoolProcUnits);  ///< units kept; "PendReservedPoolCapacity"
-    ZEM_TEXT_FIELD(MaxPoolCapacity);            ///< the most that it may hold; "MaxPoolCapacity"
+    /// number of the pool; "SharedProcPoolId"
+    ZEM_TEXT_FIELD(m_SharedProcPoolId, SharedProcPoolId);
+    ZEM_TEXT_FIELD(m_LparIds, LparIds);  ///< partitions in it, with commas; "lpar_ids"
+    ZEM_TEXT_FIELD(m_MaxPoolProcUnits, MaxPoolProcUnits);  ///< the most units in it
+    /// units kept; "PendReservedPoolCapacity"
+    ZEM_TEXT_FIELD(m_PendReservedPoolProcUnits, PendReservedPoolProcUnits);
+    /// the most that it may hold; "MaxPoolCapacity"
+    ZEM_TEXT_FIELD(m_MaxPoolCapacity, MaxPoolCapacity);
 };
 
 /// The memory of a host, in megabytes.
@@ -94,11 +105,14 @@ class ZEM_EXPORT zemSystemMemoryResource : public zemHardwareResource {
 public:
     using zemHardwareResource::zemHardwareResource;
 
-    ZEM_TEXT_FIELD(ConfigurableSysMem);  ///< can be given out; "ConfigurableMem"
-    ZEM_TEXT_FIELD(InstalledSysMem);     ///< is built in; "InstalledMemory"
-    ZEM_TEXT_FIELD(MaxMemPools);         ///< most shared memory pools; "MaxMemPools"
-    ZEM_TEXT_FIELD(PendAvailSysMem);     ///< free after pending changes; "PendAvailMem"
-    ZEM_TEXT_FIELD(MemRegionSize);       ///< step in which memory is given out; "LMBSize"
+    /// can be given out; "ConfigurableMem"
+    ZEM_TEXT_FIELD(m_ConfigurableSysMem, ConfigurableSysMem);
+    ZEM_TEXT_FIELD(m_InstalledSysMem, InstalledSysMem);  ///< is built in; "InstalledMemory"
+    ZEM_TEXT_FIELD(m_MaxMemPools, MaxMemPools);  ///< most shared memory pools; "MaxMemPools"
+    /// free after pending changes; "PendAvailMem"
+    ZEM_TEXT_FIELD(m_PendAvailSysMem, PendAvailSysMem);
+    /// step in which memory is given out; "LMBSize"
+    ZEM_TEXT_FIELD(m_MemRegionSize, MemRegionSize);
 };
 
 /// The shared memory pool of a host, in megabytes.
@@ -106,9 +120,9 @@ class ZEM_EXPORT zemMemoryPoolResource : public zemHardwareResource {
 public:
     using zemHardwareResource::zemHardwareResource;
 
-    ZEM_FIELD(zemString, m_curr_pool_mem, CurrPoolMem);             ///< size; "curr_pool_mem"
-    ZEM_FIELD(zemString, m_pend_avail_pool_mem, PendAvailPoolMem);  ///< free after pending changes;
-                                                                    ///< "pend_avail_pool_mem"
+    ZEM_FIELD(zemString, m_curr_pool_mem, CurrPoolMem);  ///< size; "curr_pool_mem"
+    /// free after pending changes; "pend_avail_pool_mem"
+    ZEM_FIELD(zemString, m_pend_avail_pool_mem, PendAvailPoolMem);
     ZEM_FIELD(zemString, m_pend_pool_mem, PendPoolMem);  ///< size aimed at; "pend_pool_mem"
 
 public:
@@ -125,31 +139,44 @@ class ZEM_EXPORT zemPartitionProcessorResource : public zemPartitionHardwareReso
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(LparName);                    ///< name of the partition; "UserDefinedName"
-    ZEM_TRANSLATED_FIELD(CurrSharedProcPoolId);  ///< "CurProcMode", "null" for 255
-    ZEM_TRANSLATED_FIELD(CurrProcMode);          ///< "ded" for 255, or "shared"; "CurProcMode"
-    ZEM_TRANSLATED_FIELD(CurrMinProcUnits);      ///< least units; "CurMinProcUnits", hundredths
-    ZEM_TRANSLATED_FIELD(CurrProcUnits);         ///< units; "CurAllocProcUnits", hundredths
-    ZEM_TRANSLATED_FIELD(CurrMaxProcUnits);      ///< most units; "CurMaxProcUnits", hundredths
-    ZEM_TEXT_FIELD(CurrMinProcs);                ///< least processors; "CurMinProcs"
-    ZEM_TEXT_FIELD(CurrProcs);                   ///< processors; "CurAllocProcs"
-    ZEM_TEXT_FIELD(CurrMaxProcs);                ///< most processors; "CurMaxProcs"
-    ZEM_READ_FIELD(CurrSharingMode);             ///< how processors are shared; see the setter
-    ZEM_TEXT_FIELD(CurrUncapWeight);             ///< share of idle processors; "CurUncappedWeight"
-    ZEM_TEXT_FIELD(PendSharedProcPoolId);        ///< "PendProcMode"
-    ZEM_TRANSLATED_FIELD(PendProcMode);      ///< stays empty: the setter stores "ded" or "shared"
-                                             ///< in CurrProcMode; "PendProcMode"
-    ZEM_TRANSLATED_FIELD(PendMinProcUnits);  ///< least units; "PendMinProcUnits", hundredths
-    ZEM_TRANSLATED_FIELD(PendProcUnits);     ///< units; "PendAllocProcUnits", hundredths
-    ZEM_TRANSLATED_FIELD(PendMaxProcUnits);  ///< most units; "PendMaxProcUnits", hundredths
-    ZEM_TEXT_FIELD(PendMinProcs);            ///< least processors; "PendMinProcs"
-    ZEM_TEXT_FIELD(PendProcs);               ///< processors; "PendAllocProcs"
-    ZEM_TEXT_FIELD(PendMaxProcs);            ///< most processors; "PendMaxProcs"
-    ZEM_READ_FIELD(PendSharingMode);         ///< how processors are shared; see the setter
-    ZEM_TEXT_FIELD(PendUncapWeight);         ///< share of idle processors; "PendUncappedWeight"
-    ZEM_TRANSLATED_FIELD(RunProcUnits);      ///< units; "RuntimeProcUnits", hundredths
-    ZEM_TEXT_FIELD(RunProcs);                ///< processors; "RuntimeProcs"
-    ZEM_TEXT_FIELD(RunUncapWeight);          ///< share of idle ones; "RuntimeUncappedWeight"
+    ZEM_TEXT_FIELD(m_LparName, LparName);  ///< name of the partition; "UserDefinedName"
+    /// "CurProcMode", "null" for 255
+    ZEM_TRANSLATED_FIELD(m_CurrSharedProcPoolId, CurrSharedProcPoolId);
+    /// "ded" for 255, or "shared"; "CurProcMode"
+    ZEM_TRANSLATED_FIELD(m_CurrProcMode, CurrProcMode);
+    /// least units; "CurMinProcUnits", hundredths
+    ZEM_TRANSLATED_FIELD(m_CurrMinProcUnits, CurrMinProcUnits);
+    /// units; "CurAllocProcUnits", hundredths
+    ZEM_TRANSLATED_FIELD(m_CurrProcUnits, CurrProcUnits);
+    /// most units; "CurMaxProcUnits", hundredths
+    ZEM_TRANSLATED_FIELD(m_CurrMaxProcUnits, CurrMaxProcUnits);
+    ZEM_TEXT_FIELD(m_CurrMinProcs, CurrMinProcs);  ///< least processors; "CurMinProcs"
+    ZEM_TEXT_FIELD(m_CurrProcs, CurrProcs);        ///< processors; "CurAllocProcs"
+    ZEM_TEXT_FIELD(m_CurrMaxProcs, CurrMaxProcs);  ///< most processors; "CurMaxProcs"
+    /// how processors are shared; see the setter
+    ZEM_READ_FIELD(m_CurrSharingMode, CurrSharingMode);
+    /// share of idle processors; "CurUncappedWeight"
+    ZEM_TEXT_FIELD(m_CurrUncapWeight, CurrUncapWeight);
+    ZEM_TEXT_FIELD(m_PendSharedProcPoolId, PendSharedProcPoolId);  ///< "PendProcMode"
+    /// stays empty: the setter stores "ded" or "shared" in CurrProcMode; "PendProcMode"
+    ZEM_TRANSLATED_FIELD(m_PendProcMode, PendProcMode);
+    /// least units; "PendMinProcUnits", hundredths
+    ZEM_TRANSLATED_FIELD(m_PendMinProcUnits, PendMinProcUnits);
+    /// units; "PendAllocProcUnits", hundredths
+    ZEM_TRANSLATED_FIELD(m_PendProcUnits, PendProcUnits);
+    /// most units; "PendMaxProcUnits", hundredths
+    ZEM_TRANSLATED_FIELD(m_PendMaxProcUnits, PendMaxProcUnits);
+    ZEM_TEXT_FIELD(m_PendMinProcs, PendMinProcs);  ///< least processors; "PendMinProcs"
+    ZEM_TEXT_FIELD(m_PendProcs, PendProcs);        ///< processors; "PendAllocProcs"
+    ZEM_TEXT_FIELD(m_PendMaxProcs, PendMaxProcs);  ///< most processors; "PendMaxProcs"
+    /// how processors are shared; see the setter
+    ZEM_READ_FIELD(m_PendSharingMode, PendSharingMode);
+    /// share of idle processors; "PendUncappedWeight"
+    ZEM_TEXT_FIELD(m_PendUncapWeight, PendUncapWeight);
+    ZEM_TRANSLATED_FIELD(m_RunProcUnits, RunProcUnits);  ///< units; "RuntimeProcUnits", hundredths
+    ZEM_TEXT_FIELD(m_RunProcs, RunProcs);                ///< processors; "RuntimeProcs"
+    /// share of idle ones; "RuntimeUncappedWeight"
+    ZEM_TEXT_FIELD(m_RunUncapWeight, RunUncapWeight);
 
 public:
     /// How processors are shared, from "CurProcMode" (255: dedicated), "CurDonorMode" and
@@ -167,19 +194,20 @@ class ZEM_EXPORT zemPartitionMemoryResource : public zemPartitionHardwareResourc
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(CurrMem);            ///< "CurAllocMem"
-    ZEM_TEXT_FIELD(PendMem);            ///< "PendAllocMem"
-    ZEM_TEXT_FIELD(LparName);           ///< name of the partition; "UserDefinedName"
-    ZEM_TEXT_FIELD(CurrMinMem);         ///< least; "CurMinMem"
-    ZEM_TEXT_FIELD(CurrMaxMem);         ///< most; "CurMaxMem"
-    ZEM_TEXT_FIELD(PendMinMem);         ///< least; "PendMinMem"
-    ZEM_TEXT_FIELD(PendMaxMem);         ///< most; "PendMaxMem"
-    ZEM_TEXT_FIELD(RunMinMem);          ///< least; "RuntimeMinMem"
-    ZEM_TEXT_FIELD(RunMem);             ///< "RuntimeMem"
-    ZEM_TRANSLATED_FIELD(MemMode);      ///< "ded" for 255, or "shared"; "CurrMemMode"
-    ZEM_TEXT_FIELD(RunMemWeight);       ///< share of the memory pool; "RuntimeVRMWeight"
-    ZEM_TEXT_FIELD(AutoIoEntitledMem);  ///< whether memory for I/O is set by itself; "EntUsage"
-    ZEM_TEXT_FIELD(RunIoEntitledMem);   ///< memory kept for I/O; "RuntimeEntMem"
+    ZEM_TEXT_FIELD(m_CurrMem, CurrMem);            ///< "CurAllocMem"
+    ZEM_TEXT_FIELD(m_PendMem, PendMem);            ///< "PendAllocMem"
+    ZEM_TEXT_FIELD(m_LparName, LparName);          ///< name of the partition; "UserDefinedName"
+    ZEM_TEXT_FIELD(m_CurrMinMem, CurrMinMem);      ///< least; "CurMinMem"
+    ZEM_TEXT_FIELD(m_CurrMaxMem, CurrMaxMem);      ///< most; "CurMaxMem"
+    ZEM_TEXT_FIELD(m_PendMinMem, PendMinMem);      ///< least; "PendMinMem"
+    ZEM_TEXT_FIELD(m_PendMaxMem, PendMaxMem);      ///< most; "PendMaxMem"
+    ZEM_TEXT_FIELD(m_RunMinMem, RunMinMem);        ///< least; "RuntimeMinMem"
+    ZEM_TEXT_FIELD(m_RunMem, RunMem);              ///< "RuntimeMem"
+    ZEM_TRANSLATED_FIELD(m_MemMode, MemMode);      ///< "ded" for 255, or "shared"; "CurrMemMode"
+    ZEM_TEXT_FIELD(m_RunMemWeight, RunMemWeight);  ///< share of the memory pool; "RuntimeVRMWeight"
+    /// whether memory for I/O is set by itself; "EntUsage"
+    ZEM_TEXT_FIELD(m_AutoIoEntitledMem, AutoIoEntitledMem);
+    ZEM_TEXT_FIELD(m_RunIoEntitledMem, RunIoEntitledMem);  ///< memory kept for I/O; "RuntimeEntMem"
 };
 
 /// A slot for a physical adapter.
@@ -187,22 +215,29 @@ class ZEM_EXPORT zemPartitionIOSlotResource : public zemPartitionHardwareResourc
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(DrcIndex);                  ///< key of the slot on its host; "drc_index"
-    ZEM_TEXT_FIELD(Description);               ///< what is plugged in; "description"
-    ZEM_TRANSLATED_FIELD(PciClass);            ///< hexadecimal; "pci_class", decimal
-    ZEM_TEXT_FIELD(BusId);                     ///< "bus_id"
-    ZEM_TRANSLATED_FIELD(PciDeviceId);         ///< hexadecimal; "pci_device_id", decimal
-    ZEM_TRANSLATED_FIELD(PciRevisionId);       ///< hexadecimal; "pci_revision_id", decimal
-    ZEM_TRANSLATED_FIELD(PciSubsDeviceId);     ///< hexadecimal; "pci_subs_device_id", decimal
-    ZEM_TRANSLATED_FIELD(PciSubsVendorId);     ///< hexadecimal; "pci_subs_vendor_id", decimal
-    ZEM_TRANSLATED_FIELD(PciVendorId);         ///< hexadecimal; "pci_vendor_id", decimal
-    ZEM_TEXT_FIELD(DrcName);                   ///< location code of the slot; "drc_name"
-    ZEM_TRANSLATED_FIELD(ParentSlotDrcIndex);  ///< "none" for "null"; "parent_slot_drc_index"
-    ZEM_TEXT_FIELD(BusGrouping);               ///< whether the bus must stay whole; "bus_grouping"
-    ZEM_TRANSLATED_FIELD(Iop);                 ///< an I/O processor: "0" for "false", or "1"; "iop"
-    ZEM_TEXT_FIELD(UnitPhysLoc);               ///< location code of the unit; "unit_phys_loc"
-    ZEM_TRANSLATED_FIELD(SlotIoPoolId);        ///< "none" for 65535 and "null"; "slot_io_pool_id"
-    ZEM_TRANSLATED_FIELD(FeatureCodes);        ///< without the brackets; "feature_codes", "[2201]"
+    ZEM_TEXT_FIELD(m_DrcIndex, DrcIndex);              ///< key of the slot on its host; "drc_index"
+    ZEM_TEXT_FIELD(m_Description, Description);        ///< what is plugged in; "description"
+    ZEM_TRANSLATED_FIELD(m_PciClass, PciClass);        ///< hexadecimal; "pci_class", decimal
+    ZEM_TEXT_FIELD(m_BusId, BusId);                    ///< "bus_id"
+    ZEM_TRANSLATED_FIELD(m_PciDeviceId, PciDeviceId);  ///< hexadecimal; "pci_device_id", decimal
+    /// hexadecimal; "pci_revision_id", decimal
+    ZEM_TRANSLATED_FIELD(m_PciRevisionId, PciRevisionId);
+    /// hexadecimal; "pci_subs_device_id", decimal
+    ZEM_TRANSLATED_FIELD(m_PciSubsDeviceId, PciSubsDeviceId);
+    /// hexadecimal; "pci_subs_vendor_id", decimal
+    ZEM_TRANSLATED_FIELD(m_PciSubsVendorId, PciSubsVendorId);
+    ZEM_TRANSLATED_FIELD(m_PciVendorId, PciVendorId);  ///< hexadecimal; "pci_vendor_id", decimal
+    ZEM_TEXT_FIELD(m_DrcName, DrcName);                ///< location code of the slot; "drc_name"
+    /// "none" for "null"; "parent_slot_drc_index"
+    ZEM_TRANSLATED_FIELD(m_ParentSlotDrcIndex, ParentSlotDrcIndex);
+    /// whether the bus must stay whole; "bus_grouping"
+    ZEM_TEXT_FIELD(m_BusGrouping, BusGrouping);
+    ZEM_TRANSLATED_FIELD(m_Iop, Iop);  ///< an I/O processor: "0" for "false", or "1"; "iop"
+    ZEM_TEXT_FIELD(m_UnitPhysLoc, UnitPhysLoc);  ///< location code of the unit; "unit_phys_loc"
+    /// "none" for 65535 and "null"; "slot_io_pool_id"
+    ZEM_TRANSLATED_FIELD(m_SlotIoPoolId, SlotIoPoolId);
+    /// without the brackets; "feature_codes", "[2201]"
+    ZEM_TRANSLATED_FIELD(m_FeatureCodes, FeatureCodes);
 };
 
 /// A virtual serial adapter.
@@ -210,19 +245,21 @@ class ZEM_EXPORT zemPartitionSerialAdapterResource : public zemPartitionHardware
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(LparName);             ///< name of the partition; "lpar_name"
-    ZEM_TEXT_FIELD(SlotNum);              ///< virtual slot; "slot_num"
-    ZEM_TEXT_FIELD(State);                ///< "1" while it works; "state"
-    ZEM_TRANSLATED_FIELD(IsRequired);     ///< "1" for "true", or "0"; "is_required"
-    ZEM_TRANSLATED_FIELD(ConnectStatus);  ///< "unavailable" for "null", "none" for 0, "active" for
-                                          ///< 1, or "unknown"; "connect_status"
-    ZEM_TRANSLATED_FIELD(AdapterType);    ///< "client" for 0, or "server"; "adapter_type"
-    ZEM_TRANSLATED_FIELD(SupportsDnx);   ///< whether the appliance's console reaches it: "0" for 0,
-                                         ///< or "1"; "supports_dnx"
-    ZEM_TRANSLATED_FIELD(RemoteLparId);  ///< partition at the other end, "any" for 65535;
-                                         ///< "remote_lpar_id"
-    ZEM_TEXT_FIELD(RemoteLparName);      ///< its name; "remote_lpar_name"
-    ZEM_TRANSLATED_FIELD(RemoteSlotNum);  ///< slot there, "any" for 65535; "remote_slot_num"
+    ZEM_TEXT_FIELD(m_LparName, LparName);            ///< name of the partition; "lpar_name"
+    ZEM_TEXT_FIELD(m_SlotNum, SlotNum);              ///< virtual slot; "slot_num"
+    ZEM_TEXT_FIELD(m_State, State);                  ///< "1" while it works; "state"
+    ZEM_TRANSLATED_FIELD(m_IsRequired, IsRequired);  ///< "1" for "true", or "0"; "is_required"
+    /// "unavailable" for "null", "none" for 0, "active" for 1, or "unknown"; "connect_status"
+    ZEM_TRANSLATED_FIELD(m_ConnectStatus, ConnectStatus);
+    /// "client" for 0, or "server"; "adapter_type"
+    ZEM_TRANSLATED_FIELD(m_AdapterType, AdapterType);
+    /// whether the appliance's console reaches it: "0" for 0, or "1"; "supports_dnx"
+    ZEM_TRANSLATED_FIELD(m_SupportsDnx, SupportsDnx);
+    /// partition at the other end, "any" for 65535; "remote_lpar_id"
+    ZEM_TRANSLATED_FIELD(m_RemoteLparId, RemoteLparId);
+    ZEM_TEXT_FIELD(m_RemoteLparName, RemoteLparName);  ///< its name; "remote_lpar_name"
+    /// slot there, "any" for 65535; "remote_slot_num"
+    ZEM_TRANSLATED_FIELD(m_RemoteSlotNum, RemoteSlotNum);
 };
 
 /// A virtual SCSI adapter.
@@ -230,16 +267,17 @@ class ZEM_EXPORT zemPartitionSCSIAdapterResource : public zemPartitionHardwareRe
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(LparName);            ///< name of the partition; "lpar_name"
-    ZEM_TEXT_FIELD(SlotNum);             ///< virtual slot; "slot_num"
-    ZEM_TEXT_FIELD(State);               ///< "1" while it works; "state"
-    ZEM_TRANSLATED_FIELD(AdapterType);   ///< "client" for 0, or "server"; "adapter_type"
-    ZEM_TRANSLATED_FIELD(RemoteLparId);  ///< partition at the other end, "any" for 65535;
-                                         ///< "remote_lpar_id"
-    ZEM_TEXT_FIELD(RemoteLparName);      ///< its name; "remote_lpar_name"
-    ZEM_TEXT_FIELD(RemoteSlotNum);       ///< slot there; "remote_slot_num"
-    ZEM_TEXT_FIELD(BackingDevices);      ///< what it serves; "backing_devices"
-    ZEM_TRANSLATED_FIELD(IsRequired);    ///< "1" for "true", or "0"; "is_required"
+    ZEM_TEXT_FIELD(m_LparName, LparName);  ///< name of the partition; "lpar_name"
+    ZEM_TEXT_FIELD(m_SlotNum, SlotNum);    ///< virtual slot; "slot_num"
+    ZEM_TEXT_FIELD(m_State, State);        ///< "1" while it works; "state"
+    /// "client" for 0, or "server"; "adapter_type"
+    ZEM_TRANSLATED_FIELD(m_AdapterType, AdapterType);
+    /// partition at the other end, "any" for 65535; "remote_lpar_id"
+    ZEM_TRANSLATED_FIELD(m_RemoteLparId, RemoteLparId);
+    ZEM_TEXT_FIELD(m_RemoteLparName, RemoteLparName);  ///< its name; "remote_lpar_name"
+    ZEM_TEXT_FIELD(m_RemoteSlotNum, RemoteSlotNum);    ///< slot there; "remote_slot_num"
+    ZEM_TEXT_FIELD(m_BackingDevices, BackingDevices);  ///< what it serves; "backing_devices"
+    ZEM_TRANSLATED_FIELD(m_IsRequired, IsRequired);    ///< "1" for "true", or "0"; "is_required"
 };
 
 /// A virtual Ethernet adapter.
@@ -247,17 +285,19 @@ class ZEM_EXPORT zemPartitionEthernetAdapterResource : public zemPartitionHardwa
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(SlotNum);           ///< virtual slot; "slot_num"
-    ZEM_TEXT_FIELD(State);             ///< "1" while it works; "state"
-    ZEM_TEXT_FIELD(MacAddr);           ///< "mac_addr"
-    ZEM_TEXT_FIELD(LparName);          ///< name of the partition; "lpar_name"
-    ZEM_TEXT_FIELD(IeeeVirtualEth);    ///< "1" if it tells VLANs apart; "ieee_virtual_eth"
-    ZEM_TEXT_FIELD(PortVlanID);        ///< its VLAN; "port_vlan_id"
-    ZEM_TEXT_FIELD(AddlVlanIds);       ///< further VLANs, with commas; "addl_vlan_ids"
-    ZEM_TRANSLATED_FIELD(IsRequired);  ///< "1" for "true", or "0"; "is_required"
-    ZEM_TEXT_FIELD(IsTrunk);           ///< whether it leads outside; "is_trunk"
-    ZEM_TEXT_FIELD(TruukPriority);     ///< rank among those that lead outside; "trunk_priority"
-    ZEM_TEXT_FIELD(VSwitch);           ///< name of the virtual switch; "vswitch"
+    ZEM_TEXT_FIELD(m_SlotNum, SlotNum);    ///< virtual slot; "slot_num"
+    ZEM_TEXT_FIELD(m_State, State);        ///< "1" while it works; "state"
+    ZEM_TEXT_FIELD(m_MacAddr, MacAddr);    ///< "mac_addr"
+    ZEM_TEXT_FIELD(m_LparName, LparName);  ///< name of the partition; "lpar_name"
+    /// "1" if it tells VLANs apart; "ieee_virtual_eth"
+    ZEM_TEXT_FIELD(m_IeeeVirtualEth, IeeeVirtualEth);
+    ZEM_TEXT_FIELD(m_PortVlanID, PortVlanID);    ///< its VLAN; "port_vlan_id"
+    ZEM_TEXT_FIELD(m_AddlVlanIds, AddlVlanIds);  ///< further VLANs, with commas; "addl_vlan_ids"
+    ZEM_TRANSLATED_FIELD(m_IsRequired, IsRequired);  ///< "1" for "true", or "0"; "is_required"
+    ZEM_TEXT_FIELD(m_IsTrunk, IsTrunk);              ///< whether it leads outside; "is_trunk"
+    /// rank among those that lead outside; "trunk_priority"
+    ZEM_TEXT_FIELD(m_TruukPriority, TruukPriority);
+    ZEM_TEXT_FIELD(m_VSwitch, VSwitch);  ///< name of the virtual switch; "vswitch"
 };
 
 /// One stored profile of a partition. Tagged slots are DRC indexes, "none" if there is none.
@@ -265,43 +305,54 @@ class ZEM_EXPORT zemPartitionProfileConfiguration : public zemPartitionHardwareR
 public:
     using zemPartitionHardwareResource::zemPartitionHardwareResource;
 
-    ZEM_TEXT_FIELD(ProfileName);                 ///< "UserDefinedName"
-    ZEM_TEXT_FIELD(LparName);                    ///< name of the partition; "lpar_name"
-    ZEM_TEXT_FIELD(LparEnv);                     ///< what runs there, as "tmxlinux"; "lpar_env"
-    ZEM_TEXT_FIELD(LoadSourceSlot);              ///< slot to start from; "LoadSourceDRCIndex"
-    ZEM_TEXT_FIELD(AltRestartDeviceSlot);        ///< to start from else; "AltLoadSourceDRCIndex"
-    ZEM_TEXT_FIELD(ConsoleSlot);                 ///< of the console; "ConsoleDRCIndex"
-    ZEM_TEXT_FIELD(AltConsoleSlot);              ///< of the other console; "AltConsoleDRCIndex"
-    ZEM_TEXT_FIELD(OpConsoleSlot);               ///< of the operator's console; "ECSDRCIndex"
-    ZEM_TEXT_FIELD(AutoStart);                   ///< "1" if started with the host; "AutoIPLEnabled"
-    ZEM_TEXT_FIELD(ConnMonitoring);              ///< "1" if connections are watched;
-                                                 ///< "SFPSurveillance"
-    ZEM_TRANSLATED_FIELD(DesiredIoEntitledMem);  ///< megabytes kept for I/O, "auto" for 0; "EntMem"
-    ZEM_TEXT_FIELD(MemWeight);                   ///< share of the memory pool; "VRMWeight"
-    ZEM_TEXT_FIELD(RedundantErrPathReporting);   ///< "RedundantPath"
-    ZEM_TEXT_FIELD(UncapWeight);                 ///< share of idle processors; "UncappedWeight"
-    ZEM_TRANSLATED_FIELD(BootMode);              ///< "norm", "ds", "sms", "of", "dd" for 1 to 5, or
-                                                 ///< "unknown"; "BootMode"
-    ZEM_TEXT_FIELD(MaxVirtualSlots);             ///< how many virtual slots; "MaxVirtualSlots"
-    ZEM_TRANSLATED_FIELD(ProcMode);              ///< "ded" for 255, or "shared"; "ProcMode"
-    ZEM_READ_FIELD(SharingMode);                 ///< how processors are shared; see the setter
-    ZEM_TEXT_FIELD(MinProcs);                    ///< least processors; "MinimumCPUCount"
-    ZEM_TEXT_FIELD(DesiredProcs);                ///< processors; "DesiredCPUCount"
-    ZEM_TEXT_FIELD(MaxProcs);                    ///< most processors; "MaximumCPUCount"
-    ZEM_TRANSLATED_FIELD(MinProcsUnits);         ///< least units; "MinProcUnit", hundredths
-    ZEM_TRANSLATED_FIELD(DesiredProcsUnits);     ///< units; "DesiredProcUnit", hundredths
-    ZEM_TRANSLATED_FIELD(MaxProcsUnits);         ///< most units; "MaxProcUnit", hundredths
-    ZEM_TEXT_FIELD(SharedProcPoolID);            ///< shared processor pool; "SharedProcPoolId"
-    ZEM_TRANSLATED_FIELD(LparProcCompatMode);    ///< processor generation, as "CORAL7", or
-                                                 ///< "unknown"; "ProcessorMode", a number
-    ZEM_TRANSLATED_FIELD(MemMode);               ///< "ded" for 255, or "shared"; "MemMode"
-    ZEM_TEXT_FIELD(MinMem);                      ///< least memory; "MinimumMemory"
-    ZEM_TEXT_FIELD(DesiredMem);                  ///< memory; "DesiredMemory"
-    ZEM_TEXT_FIELD(MaxMem);                      ///< most memory; "MaximumMemory"
-    ZEM_TEXT_FIELD(VirtualSerialAdapters);       ///< adapter strings; "virtual_serial_adapters"
-    ZEM_TEXT_FIELD(VirtualScsiAdapters);         ///< adapter strings; "virtual_scsi_adapters"
-    ZEM_TEXT_FIELD(VirtualEthAdapters);          ///< adapter strings; "virtual_eth_adapters"
-    ZEM_TEXT_FIELD(IoSlots);                     ///< slots' strings; "io_slots"
+    ZEM_TEXT_FIELD(m_ProfileName, ProfileName);  ///< "UserDefinedName"
+    ZEM_TEXT_FIELD(m_LparName, LparName);        ///< name of the partition; "lpar_name"
+    ZEM_TEXT_FIELD(m_LparEnv, LparEnv);          ///< what runs there, as "tmxlinux"; "lpar_env"
+    ZEM_TEXT_FIELD(m_LoadSourceSlot, LoadSourceSlot);  ///< slot to start from; "LoadSourceDRCIndex"
+    /// to start from else; "AltLoadSourceDRCIndex"
+    ZEM_TEXT_FIELD(m_AltRestartDeviceSlot, AltRestartDeviceSlot);
+    ZEM_TEXT_FIELD(m_ConsoleSlot, ConsoleSlot);  ///< of the console; "ConsoleDRCIndex"
+    /// of the other console; "AltConsoleDRCIndex"
+    ZEM_TEXT_FIELD(m_AltConsoleSlot, AltConsoleSlot);
+    ZEM_TEXT_FIELD(m_OpConsoleSlot, OpConsoleSlot);  ///< of the operator's console; "ECSDRCIndex"
+    ZEM_TEXT_FIELD(m_AutoStart, AutoStart);  ///< "1" if started with the host; "AutoIPLEnabled"
+    /// "1" if connections are watched; "SFPSurveillance"
+    ZEM_TEXT_FIELD(m_ConnMonitoring, ConnMonitoring);
+    /// megabytes kept for I/O, "auto" for 0; "EntMem"
+    ZEM_TRANSLATED_FIELD(m_DesiredIoEntitledMem, DesiredIoEntitledMem);
+    ZEM_TEXT_FIELD(m_MemWeight, MemWeight);  ///< share of the memory pool; "VRMWeight"
+    ZEM_TEXT_FIELD(m_RedundantErrPathReporting, RedundantErrPathReporting);  ///< "RedundantPath"
+    ZEM_TEXT_FIELD(m_UncapWeight, UncapWeight);  ///< share of idle processors; "UncappedWeight"
+    /// "norm", "ds", "sms", "of", "dd" for 1 to 5, or "unknown"; "BootMode"
+    ZEM_TRANSLATED_FIELD(m_BootMode, BootMode);
+    /// how many virtual slots; "MaxVirtualSlots"
+    ZEM_TEXT_FIELD(m_MaxVirtualSlots, MaxVirtualSlots);
+    ZEM_TRANSLATED_FIELD(m_ProcMode, ProcMode);    ///< "ded" for 255, or "shared"; "ProcMode"
+    ZEM_READ_FIELD(m_SharingMode, SharingMode);    ///< how processors are shared; see the setter
+    ZEM_TEXT_FIELD(m_MinProcs, MinProcs);          ///< least processors; "MinimumCPUCount"
+    ZEM_TEXT_FIELD(m_DesiredProcs, DesiredProcs);  ///< processors; "DesiredCPUCount"
+    ZEM_TEXT_FIELD(m_MaxProcs, MaxProcs);          ///< most processors; "MaximumCPUCount"
+    /// least units; "MinProcUnit", hundredths
+    ZEM_TRANSLATED_FIELD(m_MinProcsUnits, MinProcsUnits);
+    /// units; "DesiredProcUnit", hundredths
+    ZEM_TRANSLATED_FIELD(m_DesiredProcsUnits, DesiredProcsUnits);
+    /// most units; "MaxProcUnit", hundredths
+    ZEM_TRANSLATED_FIELD(m_MaxProcsUnits, MaxProcsUnits);
+    /// shared processor pool; "SharedProcPoolId"
+    ZEM_TEXT_FIELD(m_SharedProcPoolID, SharedProcPoolID);
+    /// processor generation, as "CORAL7", or "unknown"; "ProcessorMode", a number
+    ZEM_TRANSLATED_FIELD(m_LparProcCompatMode, LparProcCompatMode);
+    ZEM_TRANSLATED_FIELD(m_MemMode, MemMode);  ///< "ded" for 255, or "shared"; "MemMode"
+    ZEM_TEXT_FIELD(m_MinMem, MinMem);          ///< least memory; "MinimumMemory"
+    ZEM_TEXT_FIELD(m_DesiredMem, DesiredMem);  ///< memory; "DesiredMemory"
+    ZEM_TEXT_FIELD(m_MaxMem, MaxMem);          ///< most memory; "MaximumMemory"
+    /// adapter strings; "virtual_serial_adapters"
+    ZEM_TEXT_FIELD(m_VirtualSerialAdapters, VirtualSerialAdapters);
+    /// adapter strings; "virtual_scsi_adapters"
+    ZEM_TEXT_FIELD(m_VirtualScsiAdapters, VirtualScsiAdapters);
+    /// adapter strings; "virtual_eth_adapters"
+    ZEM_TEXT_FIELD(m_VirtualEthAdapters, VirtualEthAdapters);
+    ZEM_TEXT_FIELD(m_IoSlots, IoSlots);  ///< slots' strings; "io_slots"
 
 public:
     /// As zemPartitionProcessorResource::setCurrSharingMode(), from "ProcMode", "DonorMode" and

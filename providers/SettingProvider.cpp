@@ -11,6 +11,7 @@
 #include "DataTypeConvertUtils.h"
 #include "PropertyRows.h"
 #include "ProviderFactories.h"
+#include "ResourcePoolManager.h"
 
 /// One instance to be: the settings of a partition, or one of their resources.
 struct Setting {
@@ -31,13 +32,12 @@ struct Row {
 struct Rows {
     template <std::size_t count>
     constexpr Rows(const Row (&table)[count]) : first(table), last(table + count) {}
-    constexpr Rows() = default;
 
     const Row* begin() const { return first; }
     const Row* end() const { return last; }
 
-    const Row* first = nullptr;
-    const Row* last = nullptr;
+    const Row* first;
+    const Row* last;
 };
 
 // How a datum becomes a value. It is a getter of the system, or a field of the resource. Empty
@@ -84,20 +84,6 @@ bool flag(const Setting& setting, CmpiData& value) {
     return told >= 0;
 }
 
-template <auto datum>
-bool numbers(const Setting& setting, CmpiData& value) {
-    const zemArray<int>& told = datumOf(datum, setting);
-    CmpiArray list(static_cast<CMPICount>(told.size()), CMPI_uint16);
-    for (int i = 0; i < told.size(); ++i) {
-        if (!isOf<CMPIUint16>(told[i])) {
-            return false;
-        }
-        list[i] = CmpiData(static_cast<CMPIUint16>(told[i]));
-    }
-    value = CmpiData(list);
-    return told.size() > 0;
-}
-
 bool systemName(const Setting& setting, CmpiData& value) {
     const zemVSSD& system = setting.system;
     return setText(system.isState() ? system.getLparName() : system.getProfileName(), value);
@@ -139,56 +125,12 @@ constexpr Row kSystemRows[] = {
 };
 
 using Resource = zemRASDCommData;
+// Besides those that the library shows of a resource.
 constexpr Row kResourceRows[] = {
     {"ElementName", resourceName},
     {"ResourceType", number<CMPIUint16, &Resource::m_ResourceType>},
-    {"PoolID", text<&Resource::m_PoolID>},
-    {"ConsumerVisibility", number<CMPIUint16, &Resource::m_ConsumerVisibility>},
-    {"MappingBehavior", number<CMPIUint16, &Resource::m_MappingBehavior>},
     {"AllocationUnits", text<&Resource::m_AllocationUnits>},
     {"VirtualQuantityUnits", text<&Resource::m_AllocationUnits>},
-    {"VirtualMinimum", number<CMPIUint64, &Resource::m_VirtualMinimum>},
-    {"VirtualQuantity", number<CMPIUint64, &Resource::m_VirtualQuantity>},
-    {"VirtualMaximum", number<CMPIUint64, &Resource::m_VirtualMaximum>},
-    {"Minimum", number<CMPIUint64, &Resource::m_Minimum>},
-    {"Reservation", number<CMPIUint64, &Resource::m_Reservation>},
-    {"Limit", number<CMPIUint64, &Resource::m_Limit>},
-    {"Weight", number<CMPIUint32, &Resource::m_Weight>},
-    {"Address", text<&Resource::m_Address>},
-    {"AutomaticAllocation", flag<&Resource::m_AutomaticAllocation>},
-    {"AutomaticDeallocation", flag<&Resource::m_AutomaticDeallocation>},
-    {"IsRequired", number<CMPIUint8, &Resource::m_IsRequired>},
-};
-
-constexpr Row kProcessorRows[] = {
-    {"SharingMode", text<&Resource::m_SharingMode>},
-    {"ProcCompatMode", text<&zemProcessorRASD::zemProcessorRASDData::m_ProcCompatMode>},
-};
-
-using Slot = zemIOSlotRASD::zemIOSlotRASDData;
-constexpr Row kSlotRows[] = {
-    {"DRCIndex", text<&Slot::m_DRCIndex>},
-    {"TaggedIOType", numbers<&Slot::m_TaggedIOType>},
-};
-
-using Ethernet = zemVETHRASD::zemVETHRASDData;
-constexpr Row kEthernetRows[] = {
-    {"SlotID", number<CMPIUint16, &Ethernet::m_SlotID>},
-    {"IEEECompatible", number<CMPIUint8, &Ethernet::m_IEEECompatible>},
-    {"PortVLANID", number<CMPIUint16, &Ethernet::m_PortVLANID>},
-    {"AddVLANIDs", numbers<&Ethernet::m_AddVLANIDs>},
-    {"TrunkPriority", number<CMPIUint8, &Ethernet::m_TrunkPriority>},
-    {"VSwitch", text<&Ethernet::m_vswitch>},
-};
-
-using Remote = zemRemoteAdapterRASDData;
-constexpr Row kRemoteRows[] = {
-    {"SlotID", number<CMPIUint16, &Remote::m_SlotID>},
-    {"VirtualAdapterType", number<CMPIUint8, &Remote::m_VirtualAdapterType>},
-    {"RemoteClientFlag", number<CMPIUint8, &Remote::m_RemoteClientFlag>},
-    {"RemoteClientSlotFlag", number<CMPIUint8, &Remote::m_RemoteClientSlotFlag>},
-    {"RemoteVirtualSystemID", text<&Remote::m_RemoteVirtualSystemID>},
-    {"RemoteSlotID", number<CMPIUint16, &Remote::m_RemoteSlotID>},
 };
 
 }  // namespace
@@ -205,7 +147,7 @@ struct SettingClass {
     int (zemCECVisitor::*ofPartitions)(const zemString& userName, const zemString& lparid,
                                        int level);
 
-    Rows rows, ownRows;
+    Rows rows;
 };
 
 namespace {
@@ -215,19 +157,19 @@ using Kinds = zemRASDKinds;
 
 // clang-format off
 constexpr SettingClass kClasses[] = {
-    {"ORXC_VirtualSystemSettingData", 0, VISITOR_TYPE_VSSD, false, nullptr, nullptr, kSystemRows, {}},
+    {"ORXC_VirtualSystemSettingData", 0, VISITOR_TYPE_VSSD, false, nullptr, nullptr, kSystemRows},
     {Kinds::processor.settingClass, Kinds::processor.resourceType, VISITOR_TYPE_RASD_PROC, false,
-     &Hosts::initializeProcessorLevelSys, &Hosts::initializeProcessorLevelLpar, kResourceRows, kProcessorRows},
+     &Hosts::initializeProcessorLevelSys, &Hosts::initializeProcessorLevelLpar, kResourceRows},
     {Kinds::memory.settingClass, Kinds::memory.resourceType, VISITOR_TYPE_RASD_MEM, false,
-     &Hosts::initializeMemoryLevelSys, &Hosts::initializeMemoryLevelLpar, kResourceRows, {}},
+     &Hosts::initializeMemoryLevelSys, &Hosts::initializeMemoryLevelLpar, kResourceRows},
     {Kinds::ioSlot.settingClass, Kinds::ioSlot.resourceType, VISITOR_TYPE_RASD_IOSLOT, true,
-     nullptr, &Hosts::initializeIOSlotLevelLpar, kResourceRows, kSlotRows},
+     nullptr, &Hosts::initializeIOSlotLevelLpar, kResourceRows},
     {Kinds::ethernet.settingClass, Kinds::ethernet.resourceType, VISITOR_TYPE_RASD_VETH, true,
-     nullptr, &Hosts::initializeEthernetAdapterLevelLpar, kResourceRows, kEthernetRows},
+     nullptr, &Hosts::initializeEthernetAdapterLevelLpar, kResourceRows},
     {Kinds::scsi.settingClass, Kinds::scsi.resourceType, VISITOR_TYPE_RASD_VSCSI, true,
-     nullptr, &Hosts::initializeSCSIAdapterLevelLpar, kResourceRows, kRemoteRows},
+     nullptr, &Hosts::initializeSCSIAdapterLevelLpar, kResourceRows},
     {Kinds::serial.settingClass, Kinds::serial.resourceType, VISITOR_TYPE_RASD_VSERIAL, true,
-     nullptr, &Hosts::initializeSerialAdapterLevelLpar, kResourceRows, kRemoteRows},
+     nullptr, &Hosts::initializeSerialAdapterLevelLpar, kResourceRows},
 };
 // clang-format on
 
@@ -465,13 +407,14 @@ CmpiObjectPath SettingProvider::pathOf(const CmpiObjectPath& near, const Setting
 CmpiInstance SettingProvider::makeInstance(const CmpiObjectPath& near, const char** properties,
                                            const Setting& setting) const {
     CmpiInstance instance = newInstance(pathOf(near, setting), properties);
-    for (const Rows& rows : {m_class.rows, m_class.ownRows}) {
-        for (const Row& row : rows) {
-            CmpiData value;
-            if (containsProperty(properties, row.property) && row.read(setting, value)) {
-                instance.setProperty(row.property, value);
-            }
+    for (const Row& row : m_class.rows) {
+        CmpiData value;
+        if (containsProperty(properties, row.property) && row.read(setting, value)) {
+            instance.setProperty(row.property, value);
         }
+    }
+    if (setting.resource != nullptr) {
+        zemAddRASDProperties(instance, properties, *setting.resource);
     }
     return instance;
 }

@@ -206,6 +206,7 @@ private:
     ZEM_FIELD(zemString, m_PrimaryFSPIP, PrimaryFSPIP);  ///< service processor; "PrimaryFSP_IP"
     ZEM_FIELD(zemString, m_BackupFSPIP, BackupFSPIP);    ///< the second one; "BackupFSP_IP"
     zemCECCapability m_capability;
+    ZEM_FIELD(int, m_IOSlotCount, IOSlotCount);  ///< slots, free ones too; -1: not read
 };
 
 // A text of a partition: its getter, the member, and a setter that stores the text as it is, or one

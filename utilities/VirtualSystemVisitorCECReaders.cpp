@@ -261,6 +261,10 @@ constexpr Field<MemoryPool> kMemoryPool[] = {
                       const char* key) { pool.setSupport(!object.getProperty(key).isEmpty()); }},
 };
 
+constexpr Field<zemHardwareResource> kAnySlot[] = {
+    {"SystemName", set<&zemHardwareResource::setMTMS>},
+};
+
 /// The library's operations that give a collection: of all hosts, of one, and of one partition.
 using All = apiProp* (zemApiCaller::*)(const char* user, int level);
 using Keyed = apiProp* (zemApiCaller::*)(const char* user, const char* key, int level);
@@ -424,6 +428,8 @@ OF_HOSTS(getAllMemoryLevelSysByKeys, SysMemory,
          getAllCecMemoryCfg, getCecMemoryCfg, "Name", kSysMemory)
 OF_HOSTS(getAllMemoryPoolByKeys, MemoryPool,
          getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, "SystemName", kMemoryPool)
+OF_HOSTS(getAllIOSlotLevelSysByKeys, zemHardwareResource,
+         getAllIoSlots, getIoSlots, "SystemName", kAnySlot)
 // clang-format on
 
 #undef OF_PARTITIONS

@@ -220,6 +220,17 @@ ON_HOSTS(initializeMemoryPool, getAllMemoryPoolByKeys, setMemoryPool)
 #undef ON_PARTITIONS
 #undef ON_HOSTS
 
+int zemCECVisitor::initializeIOSlotLevelSys(const zemString& userName, int level) {
+    for (int i = 0; i < size(); ++i) {
+        getData(i)->setIOSlotCount(0);
+    }
+    return hang<zemCEC>({"initializeIOSlotLevelSys", this, userName, zemString(), level},
+                        &zemCECVisitor::getAllIOSlotLevelSysByKeys,
+                        [](zemCEC& host, const zemHardwareResource& /*slot*/) {
+                            host.setIOSlotCount(host.getIOSlotCount() + 1);
+                        });
+}
+
 int zemCECVisitor::initializeLparSuspendRR(const zemString& userName, const zemString& lparid,
                                            int* /*mask*/) {
     tellBegin("initializeLparSuspendRR");

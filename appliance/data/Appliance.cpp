@@ -29,6 +29,7 @@ constexpr const char* kFooter =
 
 constexpr std::int64_t kMostHosts = 65535;  ///< MAC addresses number hosts and partitions
 constexpr std::int64_t kMostLpars = 65000;
+constexpr std::int64_t kMostPools = 64;  ///< of which a host can have no more
 
 /// Tells a watching person how far a long work is; says nothing before two seconds are over.
 class Progress {
@@ -128,6 +129,9 @@ void addMakers(CLI::App& app, Options& options) {
         ->capture_default_str();
     generate->add_option("--lpars", size.lpars, "How many partitions each host has")
         ->check(CLI::Range(std::int64_t{0}, kMostLpars))
+        ->capture_default_str();
+    generate->add_option("--pools", size.pools, "How many shared processor pools each host has")
+        ->check(CLI::Range(std::int64_t{1}, kMostPools))
         ->capture_default_str();
     generate->add_option("--seed", size.seed, "Start of the random choices")->capture_default_str();
 }

@@ -20,8 +20,10 @@ namespace {
 constexpr const char kHost[] = "ORXC_CEC_CS";
 constexpr const char kPartition[] = "ORXC_LPAR_CS";
 constexpr const char kConnection[] = "ORXC_HostConnection";
+constexpr const char kService[] = "CIM_Service";
 
 constexpr const char kHostedPartition[] = "ORXC_HostedPartition";
+constexpr const char kHostedService[] = "ORXC_HostedService";
 constexpr const char kConnectedHost[] = "ORXC_ConnectedHost";
 constexpr const char kHostComponent[] = "ORXC_HostComponent";
 constexpr const char kReachedHost[] = "ORXC_ReachedHost";
@@ -90,7 +92,23 @@ public:
 protected:
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
                                const CmpiObjectPath& part) override {
-        return !isOfClass(part, kHost) && onOneHost(host, part);
+        return !isOfClass(part, kHost) && onOneHost(host, part) && !part.classPathIsA(kService);
+    }
+};
+
+/// Which services a host has: of whatever class, by their base.
+class HostedService : public OneAssociation<zemMultiNtoNAssociationProvider> {
+public:
+    HostedService(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          OneAssociation(kHostedService, mb, ctx, name, kHostedService,
+                         "ORXC_CEC_CS\0CIM_Service\0", "Antecedent", "Dependent", OP_ALLOps, "", "",
+                         "") {}
+
+protected:
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& service) override {
+        return onOneHost(host, service);
     }
 };
 
@@ -152,5 +170,6 @@ private:
 ZEM_PROVIDER(ORXC_HostedPartitionProvider, HostedPartition)
 ZEM_PROVIDER(ORXC_ConnectedHostProvider, ConnectedHost)
 ZEM_PROVIDER(ORXC_HostComponentProvider, HostComponent)
+ZEM_PROVIDER(ORXC_HostedServiceProvider, HostedService)
 ZEM_PROVIDER(ORXC_ReachedHostProvider, ReachedHost)
 ZEM_PROVIDER(ORXC_PartitionConnectionProvider, PartitionConnection)

@@ -240,6 +240,11 @@ std::string hostName(const zemRecordType& host) {
            static_cast<const char*>(host[Host::ATTR_SERIAL_NUM]);
 }
 
+std::string keyOf(const CmpiObjectPath& path, const char* name) {
+    const CmpiData key = zemBaseProvider::getKeyBinding(path, name);
+    return key.isNotFound() || key.isNullValue() ? "" : key.getString().charPtr();
+}
+
 void listSystemKeys(CmpiArray& keys) {
     zemBaseProvider::setText(keys, 0, "CreationClassName");
     zemBaseProvider::setText(keys, 1, "Name");

@@ -61,6 +61,9 @@ bool isUnknownObject(const zemException& failure);
 /// The key of the host that a qyplat host record describes.
 std::string hostName(const zemRecordType& host);
 
+/// The text of a key; empty without it.
+std::string keyOf(const CmpiObjectPath& path, const char* name);
+
 /// Hosts and partitions have the keys CreationClassName, which is their class, and Name: their
 /// list, and a path with both, in the namespace of @p near.
 void listSystemKeys(CmpiArray& keys);

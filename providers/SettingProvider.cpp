@@ -240,12 +240,6 @@ std::optional<SettingId> settingIdOf(const SettingClass& row, const std::string&
     return parts;
 }
 
-/// The text of a key; empty without it.
-std::string keyOf(const CmpiObjectPath& path, const char* name) {
-    const CmpiData key = zemBaseProvider::getKeyBinding(path, name);
-    return key.isNotFound() || key.isNullValue() ? "" : key.getString().charPtr();
-}
-
 /// The profile of this name; null without it.
 zemPartitionProfileConfiguration* profileOf(zemLPAR& lpar, const zemString& name) {
     for (int i = 0; i < lpar.getLparProfile().size(); ++i) {
@@ -420,9 +414,3 @@ CmpiInstance SettingProvider::makeInstance(const CmpiObjectPath& near, const cha
 }
 
 ZEM_PROVIDER(ORXC_VirtualSystemSettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_ProcessorRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_MemoryRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_IOSlotAdapterRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_EthernetAdapterRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_SCSIAdapterRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_SerialAdapterRASettingDataProvider, SettingProvider)

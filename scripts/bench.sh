@@ -76,6 +76,10 @@ ROWS = [
     ("Adapters", "PlainFields", 3.0, 0),
     ("Settings/10000/iterations:1/repeats:1/manual_time",
      "Settings/100/iterations:1/repeats:1/manual_time", 120.0, 0),
+    ("Pools/64/1000/iterations:1/repeats:1/manual_time",
+     "Pools/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
+    ("PoolTies/64/1000/iterations:1/repeats:1/manual_time",
+     "PoolTies/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
 ]
 # Counters: benchmark, counter, the most that it may be.
 COUNTERS = [

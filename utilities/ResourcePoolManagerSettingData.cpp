@@ -6,7 +6,6 @@
 #include <limits>
 #include <optional>
 #include <string_view>
-#include <utility>
 
 #include "Exception.h"
 #include "ListedProperties.h"
@@ -57,7 +56,7 @@ struct Asked {
 
 /// What was told of it: by an object of the model, or by records that were asked for.
 struct Told {
-    explicit Told(zemRecordSetsType answer) : records(std::move(answer)) {
+    explicit Told(const zemRecordSetsType& answer) : records(answer) {
         if (records.size() > 0) {
             attributes.emplace(*records.getElementAt(0));
         }
@@ -91,9 +90,10 @@ zemString compatModeOf(const Asked& asked) {
         return asked.lpar.getDesiredLparProcCompatMode();
     }
     const Told profile = profileOf(asked);
-    return profile.attributes
-               ? (*profile.attributes)[zemProfileAttribute::ATTR_LPAR_PROC_COMPAT_MODE]
-               : zemString();
+    const zemString mode =
+        profile.attributes ? (*profile.attributes)[zemProfileAttribute::ATTR_LPAR_PROC_COMPAT_MODE]
+                           : zemString();
+    return mode.isEmpty() ? zemString("default") : mode;
 }
 
 std::unique_ptr<zemRASD> makeProcessor(const Asked& asked) {
@@ -214,13 +214,13 @@ int fill(const zemRASDKind& kind, const Asked& asked, const zemString& id, int t
     if (!formId(kind, owner, id, data.m_InstanceID)) {
         return -1;
     }
-    data.m_ResourceType = kind.resourceType;
-    data.m_AllocationUnits = kind.units;
     try {
         data.m_RASD = type == VISITOR_TYPE_RASD_INIT_NI ? nullptr : makeRASD(kind, asked);
     } catch (const zemInvalidParameterException&) {
         return -1;  // the element has quotes that nothing closes
     }
+    data.m_ResourceType = kind.resourceType;
+    data.m_AllocationUnits = kind.units;
     return 0;
 }
 

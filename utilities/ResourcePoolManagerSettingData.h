@@ -78,6 +78,7 @@ public:
     /// @param info  the resource as it stands in the list of its kind, else "none"
     /// @param type  VISITOR_TYPE_RASD_INIT_NI tells which resource it is, any other value all
     /// @return 0, or -1: the object is of no use
+    /// @throws what reading records raises (VirtualSystemVisitorVSSD.h)
     virtual int initialize(const zemString& userName, zemLPAR* lpar, zemCEC* cec,
                            const zemString& profileName, const zemString& id, const zemString& info,
                            int type) = 0;

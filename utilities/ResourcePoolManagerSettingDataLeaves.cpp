@@ -9,6 +9,7 @@
 #include "ListedProperties.h"
 #include "NumberText.h"
 #include "ResourcePoolManagerPool.h"
+#include "ResourcePoolManagerRows.h"
 #include "ResourcePoolManagerSettingData.h"
 #include "VirtualSystemRepSystem.h"
 #include "VirtualSystemVisitorRules.h"
@@ -18,7 +19,6 @@ namespace {
 using Kinds = zemRASDKinds;
 using Members = zemProcessorPoolMembers;
 
-constexpr char kPrimordial[] = "Primordial";
 constexpr int kAnyAdapter = 0;
 
 /// A pool, and the host of which it is one.
@@ -88,7 +88,7 @@ void countMembers(zemCEC& cec, std::unordered_map<std::string, Members>& pools) 
             }
         }
     }
-    pools[kPrimordial] = all;
+    pools[zemPrimordialPoolID] = all;
 }
 
 /// Hundredths that one partition may have: what is free, and what it holds if it does not run, in
@@ -110,7 +110,7 @@ CMPIUint64 freeUnits(const Source& source) {
     const std::int64_t ofHost = unitsOf(source.cec.getProcessor().getPendAvailSysProcUnits());
     const std::int64_t ofPool = members.most - std::max(members.now, members.then);
     return unsignedOf(std::max(std::min(ofHost, ofPool) + members.mostIdle,
-                               std::min(ofHost + pools[kPrimordial].mostIdle, ofPool)));
+                               std::min(ofHost + pools[zemPrimordialPoolID].mostIdle, ofPool)));
 }
 
 /// As many virtual processors as these units are shares of.

@@ -120,7 +120,7 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
          "VirtualQuantity=run_mem*1024 Reservation=run_io_entitled_mem*1024 Weight=run_mem_weight "
          "ConsumerVisibility:3 PoolID:0 Limit:"},
         {kClasses[3], "ORX:4*", "6", "qyalloc -r io --rsubtype slot",
-         "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} AllocationUnits:Slot"},
+         "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} IsVirtualized:false"},
         {kClasses[4], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype eth --level lpar",
          "SlotID=slot_num Address=mac_addr PortVLANID=port_vlan_id AddVLANIDs=addl_vlan_ids "
          "IEEECompatible=ieee_virtual_eth TrunkPriority=trunk_priority IsRequired=is_required"},
@@ -129,7 +129,7 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
          "RemoteSlotID=remote_slot_num IsRequired=is_required"},
         {kClasses[6], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype serial --level lpar",
          "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id "
-         "RemoteSlotID=remote_slot_num IsRequired=is_required AutomaticDeallocation:false"},
+         "RemoteSlotID=remote_slot_num IsRequired=is_required IsVirtualized:true"},
         {"ORXC_ProcessorPool", "ORX:3-Primordial", "", "qyalloc -r proc --level sys",
          "Capacity=configurable_sys_proc_units*100 InstalledCapacity=installed_sys_proc_units*100 "
          "Reserved:1050 Primordial:true PoolID:Primordial ResourceType:3 AllocationUnits:Percent "

@@ -9,13 +9,14 @@
 /// The classes that the VM loads come from CLASSPATH.
 ///
 /// What the VM does to the signals of the process:
-/// - SIGSEGV, SIGBUS, SIGILL, SIGFPE: the VM needs them, and hands what is not its own to the
-///   handlers that were there before it.
-/// - SIGPIPE and SIGXFSZ: ignored from then on, unless the server handles them, whose handlers then
-///   stand.
-/// - SIGHUP, SIGINT, SIGTERM: the VM would end the process in a way of its own; the server's way is
-///   put back.
-/// - SIGQUIT: prints the VM's threads, unless the server handles it.
+/// - SIGSEGV, SIGBUS, SIGILL, SIGFPE: it needs them, and hands what is not its own to the handlers
+///   that were there before it.
+/// - SIGPIPE, SIGXFSZ: no longer end the process; handlers that were there before are called on.
+/// - SIGHUP, SIGINT, SIGTERM: stay the server's. Left to itself the VM would take them and end the
+///   process in a way of its own, so they are ignored for the moment in which it starts.
+/// - SIGQUIT, SIGUSR2: stay the server's where it handles or ignores them; else the first prints
+/// what
+///   the VM's threads do, and the second is the VM's own.
 ///
 /// Thread-safety: any thread may call anything; a JNIEnv* belongs to the thread that got it.
 #ifndef JVM_H
@@ -104,11 +105,15 @@ public:
     /// Attaches the calling thread, and starts the VM for that; null when there is none.
     JNIEnv* attachThread();
     void detachThread();
+    bool isAttached();
 
     JavaVM* getJavaVm();
     /// The environment of the thread that started the VM; null where it was there before.
     JNIEnv* getEnv();
     static const char* getJvmErrorString(int code) { return zemJavaVM::getJvmErrorString(code); }
+
+    /// Why initJVM() failed last.
+    zemString getFailure();
 
 private:
     zemJvm() : zemJvmServices("zemJvm") {}
@@ -119,7 +124,7 @@ private:
     zemSynchronizerContext m_initMutex;
     JavaVM* m_jvm = nullptr;
     JNIEnv* m_env = nullptr;
-    zemAtomicType<int> m_refs;
+    zemString m_failure;
 };
 
 #endif

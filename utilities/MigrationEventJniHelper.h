@@ -14,8 +14,7 @@
 #include "StringUtils.h"
 #include "ZemExport.h"
 
-/// One step of a move, as one of its two hosts tells it. What the console does not tell is 0 or
-/// empty.
+/// One step of a move. What the console does not tell is 0 or empty.
 struct ZEM_EXPORT zemMigrationEvent {
     int migrationSide = 0;
     zemString destLparName;
@@ -39,14 +38,14 @@ public:
     /// @return what Java's "register" returns: 0
     /// @throws zemOperationFailedException there is no Java VM, or Java refused; nothing is
     ///         registered then
-    int registerSubscription(zemString user, pfnMigrationEventOcurrCallBack callback);
+    int registerSubscription(const zemString& user, pfnMigrationEventOcurrCallBack callback);
 
     /// Takes one registration of @p callback out and ends the subscription on Java's side. Once it
     /// returns, no call of the listener is under way on another thread.
     /// @return what Java's "deregister" returns: 0; -1 when @p callback was not registered
     /// @throws zemOperationFailedException as registerSubscription(); the listener is out all the
     ///         same
-    int unregisterSubscription(zemString user, pfnMigrationEventOcurrCallBack callback);
+    int unregisterSubscription(const zemString& user, pfnMigrationEventOcurrCallBack callback);
 
 private:
     int callJava(const char* method, const zemString& user);

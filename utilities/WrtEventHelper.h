@@ -31,7 +31,6 @@
 #include <mutex>
 #include <string>
 #include <thread>
-#include <vector>
 
 #include "StringUtils.h"
 #include "Synchronizer.h"
@@ -130,10 +129,8 @@ public:
     int eventOccured(const zemWRTEvent& event);
 
 private:
-    struct Call {
-        std::thread::id thread;
-        zemWrtEventCallBack* callBack;
-    };
+    class CallUnderWay;
+    using Calls = std::multimap<std::thread::id, const zemWrtEventCallBack*>;
 
     zemWrtEventManager() = default;
     ~zemWrtEventManager() = delete;
@@ -142,18 +139,16 @@ private:
                   const zemString& objType);
     int registerEvent(int eventType, const zemString& objType, zemWrtEventCallBack* callBack);
     int unregisterEvent(int eventType, const zemString& objType, zemWrtEventCallBack* callBack);
-    bool isRegistered(int eventType, const zemString& objType);
     static zemString getKey(int eventType, const zemString& objType);
-    void dumpHandlers();
-    bool beginCall(const zemString& key, zemWrtEventCallBack* callBack);
-    void endCall();
+    static void noteSubscription(const char* method, const zemString& user, int eventType,
+                                 const zemString& objType, const zemWrtEventCallBack* callBack);
     void awaitCalls(const zemWrtEventCallBack* callBack);
 
     zemSynchronizerContext m_regMutex;  ///< held across the calls into Java
     std::mutex m_tableMutex;            ///< of what follows; never held while others are called
     std::condition_variable m_callEnded;
     std::map<std::string, std::unique_ptr<zemWrtEventHandler>> m_WrtEventContainer;
-    std::vector<Call> m_calls;  ///< that are under way; those of one thread, innermost last
+    Calls m_calls;  ///< that are under way
 };
 
 #endif

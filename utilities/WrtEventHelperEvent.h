@@ -49,6 +49,7 @@ public:
 private:
     JNIEnv* env() const { return m_jvm->getEnv(); }
     jobject object(const char* getter) const;
+    jobject object(const char* getter, const char* signature) const;
     jobject objectOf(const char* getter, const char* className) const;
 
     zemJvmHelper* m_jvm;
@@ -59,11 +60,16 @@ private:
 /// What else the console's Java side is asked for. Any thread may call.
 class ZEM_EXPORT zemDnxPegasusApi {
 public:
+    /// @param helper  of a zemJvmHelperRef, which is held meanwhile
+    explicit zemDnxPegasusApi(zemJvmHelper* helper) : m_jvm(helper) {}
+
     /// The last reference code of a partition, through com.orx.wrt.api.DnxPegasusApi.
-    /// @param helper  of a zemJvmHelperRef
     /// @param mtms,lparId  the host's key and the partition's number
     /// @throws zemOperationFailedException no VM; whatever Java refuses
-    static zemString getLparRefCode(zemJvmHelper* helper, const char* mtms, const char* lparId);
+    zemString getLparRefCode(const char* mtms, const char* lparId) const;
+
+private:
+    zemJvmHelper* m_jvm;
 };
 
 #endif

@@ -15,6 +15,7 @@ namespace {
 
 constexpr useconds_t kStartPoll = 1000;
 constexpr useconds_t kPause = 10000;
+constexpr int kEndPolls = 100;
 
 std::string environment(const char* name, const char* fallback) {
     const char* const value = std::getenv(name);
@@ -109,7 +110,12 @@ void zemJavaVM::start() {
         m_running = true;
         return;
     }
-    if (m_running) {  // what the last reference ended is still on its way out
+    // What the last reference ended may be on its way out yet, and stays while threads are
+    // attached.
+    for (int i = 0; m_running && i < kEndPolls; ++i) {
+        usleep(kPause);
+    }
+    if (m_running) {
         const zemSynchronizer hold(m_initJvmMutex);
         m_failure = "it is about to end";
         return;
@@ -189,11 +195,16 @@ zemString zemJavaVM::getFailure() {
 // -- zemJvm -------------------------------------------------------------------------------------
 
 zemJvm& zemJvm::getJvm() {
-    static zemJvm jvm;
-    return jvm;
+    static auto* const jvm = new zemJvm;
+    return *jvm;
 }
 
-zemJvm::~zemJvm() { destroyJVM(); }
+// Made once the VM's library is loaded, it goes before that takes its own things down at the end of
+// the process.
+class zemJvm::AtEnd {
+public:
+    ~AtEnd() { getJvm().destroyJVM(); }
+};
 
 int zemJvm::initJVM() {
     const zemSynchronizer hold(m_initMutex);
@@ -211,6 +222,7 @@ int zemJvm::initJVM() {
     }
     m_jvm = part.vm;
     m_env = part.env;
+    static const AtEnd atEnd;
     return 0;
 }
 
@@ -230,9 +242,11 @@ JNIEnv* zemJvm::attachThread() {
 }
 
 void zemJvm::detachThread() {
-    JavaVM* const vm = getJavaVm();
-    if (vm != nullptr) {
-        vm->DetachCurrentThread();
+    const zemSynchronizer hold(m_initMutex);
+    void* env = nullptr;
+    if (m_jvm != nullptr && m_jvm->GetEnv(&env, kZemJniVersion) == JNI_OK) {
+        m_env = m_env == env ? nullptr : m_env;
+        m_jvm->DetachCurrentThread();
     }
 }
 

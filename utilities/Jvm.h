@@ -108,7 +108,8 @@ public:
     bool isAttached();
 
     JavaVM* getJavaVm();
-    /// The environment of the thread that started the VM; null where it was there before.
+    /// The environment of the thread that started the VM, until that is detached; null where the VM
+    /// was there before. That thread keeps the VM from ending, as every one does that is attached.
     JNIEnv* getEnv();
     static const char* getJvmErrorString(int code) { return zemJavaVM::getJvmErrorString(code); }
 
@@ -116,10 +117,10 @@ public:
     zemString getFailure();
 
 private:
+    class AtEnd;
+
     zemJvm() : zemJvmServices("zemJvm") {}
-    ~zemJvm();
-    zemJvm(const zemJvm&) = delete;
-    zemJvm& operator=(const zemJvm&) = delete;
+    ~zemJvm() = delete;
 
     zemSynchronizerContext m_initMutex;
     JavaVM* m_jvm = nullptr;

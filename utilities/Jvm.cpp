@@ -4,11 +4,11 @@
 #include <unistd.h>
 
 #include <cstdlib>
-#include <cstring>
 #include <string>
 #include <vector>
 
 #include "JvmLibrary.h"
+#include "LetUnwind.h"
 #include "Log.h"
 
 namespace {
@@ -90,7 +90,7 @@ void* zemJavaVM::run(void* javaVM) {
     auto& self = *static_cast<zemJavaVM*>(javaVM);
     {
         const zemSynchronizer hold(self.m_initJvmMutex);
-        self.initJVM();
+        zemQuietly([&] { self.initJVM(); });
         self.m_running = true;
     }
     while (!self.m_stop) {
@@ -188,8 +188,7 @@ const char* zemJavaVM::getJvmErrorString(int code) { return zemVmResultText(code
 
 zemString zemJavaVM::getFailure() {
     const zemSynchronizer hold(m_initJvmMutex);
-    return m_jvm == nullptr && m_failure.isEmpty() ? zemString("it has not been started")
-                                                   : m_failure;
+    return m_jvm == nullptr && m_failure.isEmpty() ? zemString("it does not run") : m_failure;
 }
 
 // -- zemJvm -------------------------------------------------------------------------------------

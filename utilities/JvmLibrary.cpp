@@ -2,7 +2,6 @@
 
 #include <dlfcn.h>
 #include <glob.h>
-#include <unistd.h>
 
 #include <csignal>
 #include <cstdlib>
@@ -149,6 +148,7 @@ JavaVM* existing(const Library& library) {
 
 void start(const Library& library, const std::vector<std::string>& options, zemVmPart& part) {
     std::vector<JavaVMOption> rows;
+    rows.reserve(options.size());
     for (const std::string& option : options) {
         rows.push_back({const_cast<char*>(option.c_str()), nullptr});
     }

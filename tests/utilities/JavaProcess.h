@@ -1,15 +1,21 @@
-/// Tests with a real Java VM: each case has a process of its own, for none starts a second VM.
+/// Tests with a real Java VM and listeners to events: each case has a process of its own, for none
+/// starts a second VM.
 #pragma once
 
 #include <gtest/gtest.h>
 #include <jni.h>
+#include <unistd.h>
 
+#include <atomic>
 #include <cstdlib>
 #include <functional>
 #include <map>
+#include <mutex>
 #include <string>
+#include <vector>
 
-#include "JvmHelper.h"
+#include "../support/TestAppliance.h"
+#include "WrtEventHelper.h"
 
 using Environment = std::map<std::string, std::string>;
 
@@ -79,4 +85,63 @@ public:
 private:
     zemJvmHelper m_helper;
     zemAutoDetachThread m_env;
+};
+
+inline std::mutex g_linesLock;
+inline std::vector<std::string> g_lines;  ///< what listeners wrote down
+
+inline void hear(const std::string& line) {
+    const std::lock_guard<std::mutex> hold(g_linesLock);
+    g_lines.push_back(line);
+}
+
+/// What was heard since the last call, once there are so many lines or ten seconds are over.
+inline std::vector<std::string> heard(std::size_t count) {
+    for (int i = 0;; ++i) {
+        {
+            const std::lock_guard<std::mutex> hold(g_linesLock);
+            if (g_lines.size() >= count || i == 1000) {
+                return std::exchange(g_lines, {});
+            }
+        }
+        usleep(10000);
+    }
+}
+
+/// Counts its calls, and does with each event what it was made for.
+class Listener : public zemWrtEventCallBack {
+public:
+    explicit Listener(std::function<void(const zemWRTEvent&)> body = [](const zemWRTEvent&) {})
+        : m_body(std::move(body)) {}
+    zemEventData* eventOccured(const zemWRTEvent& event) override {
+        ++calls;
+        m_body(event);
+        return isDull ? nullptr : new zemEventData;
+    }
+    std::atomic<int> calls{0};
+    bool isDull = false;  ///< makes no data
+
+private:
+    const std::function<void(const zemWRTEvent&)> m_body;
+};
+
+/// Subscribes, and holds the VM.
+class Subscriber {
+public:
+    int add(int type, const char* object, zemWrtEventCallBack& callBack) {
+        return m_manager.registerSubscription(helper(), "user", type, object, &callBack);
+    }
+    int remove(int type, const char* object, zemWrtEventCallBack& callBack, bool all = false) {
+        return m_manager.unregisterSubscription(helper(), "user", type, object, &callBack, all);
+    }
+    zemJvmHelper* helper() { return m_java.getJvmHelper(); }
+
+private:
+    zemWrtEventManager& m_manager = zemWrtEventManager::getWrtEventManager();
+    zemJvmHelperRef m_java;
+};
+
+class DemoAppliance : public testing_support::TestAppliance {
+public:
+    DemoAppliance() : TestAppliance(ZEM_PROGRAMS) { EXPECT_EQ(run("appliance init").exit, 0); }
 };

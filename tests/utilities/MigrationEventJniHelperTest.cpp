@@ -2,7 +2,7 @@
 
 #include <stdexcept>
 
-#include "EventHarness.h"
+#include "JavaProcess.h"
 #include "MigrationEventJniHelper.h"
 
 namespace {
@@ -10,15 +10,11 @@ namespace {
 zemMigrationEventJniHelper* g_helper = nullptr;
 
 void first(const zemMigrationEvent& event) {
-    zemString line;
-    line.format("%d/%s/%llu/%llu/%llu/%llu/%s/%d", event.migrationSide,
-                static_cast<const char*>(event.destLparName),
-                static_cast<unsigned long long>(event.totalBytes),
-                static_cast<unsigned long long>(event.leftBytes),
-                static_cast<unsigned long long>(event.sentBytes),
-                static_cast<unsigned long long>(event.recvBytes),
-                static_cast<const char*>(event.state), event.portNum);
-    hear(static_cast<const char*>(line));
+    std::ostringstream line;
+    line << event.migrationSide << '/' << event.destLparName << '/' << event.totalBytes << '/'
+         << event.leftBytes << '/' << event.sentBytes << '/' << event.recvBytes << '/'
+         << event.state << '/' << event.portNum;
+    hear(line.str());
 }
 void failing(const zemMigrationEvent&) {
     hear("failing");

@@ -21,26 +21,6 @@ public final class Probe {
         return WRTEventHelper.getWRTEventHelper().consumeWRTEvent(event);
     }
 
-    /** An event that cannot be read. */
-    public static int sendBad() {
-        return sendObject(new Object() {
-            public int getEventType() {
-                throw new IllegalStateException("no type");
-            }
-        });
-    }
-
-    /** Events on threads of their own, until the returned thread is interrupted. */
-    public static Thread storm(int type, String objectType) {
-        Thread storm = new Thread(() -> {
-            while (!Thread.interrupted()) {
-                send(type, objectType);
-            }
-        });
-        storm.start();
-        return storm;
-    }
-
     public static int move(Object table) {
         return new MigrationEventJniHelper().consumeMigrationEvent(table);
     }

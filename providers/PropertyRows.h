@@ -76,6 +76,10 @@ CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
 /// @param properties  as for attributesFor()
 CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties);
 
+/// The same for who has the keys at hand, and need not have them read from the path.
+using Keys = std::vector<std::pair<const char*, CmpiData>>;
+CmpiInstance newInstance(const CmpiObjectPath& path, const Keys& keys, const char** properties);
+
 /// What a client asks for with an instance that it sends: the wanted properties that have a value,
 /// but for those at the default of @p className. Servers fill defaults in for what a client leaves
 /// out, so a default asks for nothing.

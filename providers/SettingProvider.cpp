@@ -7,6 +7,7 @@
 #include <limits>
 #include <stdexcept>
 #include <type_traits>
+#include <vector>
 
 #include "DataTypeConvertUtils.h"
 #include "PropertyRows.h"
@@ -15,7 +16,7 @@
 
 /// One instance to be: the settings of a partition, or one of their resources.
 struct Setting {
-    zemString id;
+    const zemString& id;
     zemVSSD& system;
     const zemRASDCommData* resource;  ///< null: the system itself
 };
@@ -240,15 +241,12 @@ std::optional<SettingId> settingIdOf(const SettingClass& row, const std::string&
     return parts;
 }
 
-/// The profile of this name; null without it.
-zemPartitionProfileConfiguration* profileOf(zemLPAR& lpar, const zemString& name) {
-    for (int i = 0; i < lpar.getLparProfile().size(); ++i) {
-        zemPartitionProfileConfiguration* const profile = lpar.getLparProfile().getElementAt(i);
-        if (profile->getProfileName() == name) {
-            return profile;
-        }
-    }
-    return nullptr;
+/// The settings of the profile of this name; null without it.
+zemVSSD* systemOf(const std::vector<std::unique_ptr<zemVSSD>>& stored, const zemString& name) {
+    const auto found = std::find_if(stored.begin(), stored.end(), [&](const auto& system) {
+        return system->getProfileName() == name;
+    });
+    return found == stored.end() ? nullptr : found->get();
 }
 
 }  // namespace
@@ -359,18 +357,19 @@ void SettingProvider::read(const CmpiContext& context, const SettingOwner& whose
         zemVSSDVisitor systems(&host, m_class.name);
         for (int j = 0; j < host.getLPARs().size(); ++j) {
             zemLPAR& lpar = *host.getLPARs().getElementAt(j);
-            // one that was never activated has no current profile, and starts with its default
-            const zemString current = lpar.getCurrentProfileName();
-            zemPartitionProfileConfiguration* const profile =
-                profileOf(lpar, current.isEmpty() ? lpar.getDefaultProfileName() : current);
-            if (profile != nullptr) {
-                tell(*std::unique_ptr<zemVSSD>(systems.getStateVSSD(&lpar, profile, m_class.type)),
-                     sink);
-            }
+            std::vector<std::unique_ptr<zemVSSD>> stored;
             for (int k = 0; k < lpar.getLparProfile().size(); ++k) {
-                tell(*std::unique_ptr<zemVSSD>(systems.getProfileVSSD(
-                         &lpar, lpar.getLparProfile().getElementAt(k), m_class.type)),
-                     sink);
+                stored.emplace_back(systems.getProfileVSSD(
+                    &lpar, lpar.getLparProfile().getElementAt(k), m_class.type));
+            }
+            // one that was never activated has no current profile, and starts with its default
+            const zemString& current = lpar.getCurrentProfileName();
+            if (zemVSSD* const running =
+                    systemOf(stored, current.isEmpty() ? lpar.getDefaultProfileName() : current)) {
+                tell(*std::unique_ptr<zemVSSD>(systems.getStateVSSD(&lpar, *running)), sink);
+            }
+            for (const auto& system : stored) {
+                tell(*system, sink);
             }
         }
     }
@@ -383,7 +382,8 @@ void SettingProvider::tell(zemVSSD& system, const Sink& sink) const {
     }
     const zemDynamicArray<zemRASD> resources = system.getRASD(m_class.resourceType);
     for (int i = 0; i < resources.size(); ++i) {
-        sink({resources[i]->getInstanceID(true, &system), system, resources[i]->getData()});
+        const zemRASDCommData* const data = resources[i]->getData();
+        sink({data->m_InstanceID, system, data});
     }
 }
 
@@ -400,7 +400,8 @@ CmpiObjectPath SettingProvider::pathOf(const CmpiObjectPath& near, const Setting
 
 CmpiInstance SettingProvider::makeInstance(const CmpiObjectPath& near, const char** properties,
                                            const Setting& setting) const {
-    CmpiInstance instance = newInstance(pathOf(near, setting), properties);
+    const Keys keys = {{kKey, CmpiData(static_cast<const char*>(setting.id))}};
+    CmpiInstance instance = newInstance(pathOf(near, setting), keys, properties);
     for (const Row& row : m_class.rows) {
         CmpiData value;
         if (containsProperty(properties, row.property) && row.read(setting, value)) {

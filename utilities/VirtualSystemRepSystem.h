@@ -211,9 +211,9 @@ private:
 
 // A text of a partition: its getter, the member, and a setter that stores the text as it is, or one
 // that the class defines.
-#define ZEM_LPAR_TEXT(MEMBER, NAME)                                  \
-public:                                                              \
-    void set##NAME(const zemString& value) { this->MEMBER = value; } \
+#define ZEM_LPAR_TEXT(MEMBER, NAME)                                      \
+public:                                                                  \
+    void set##NAME(zemString value) { this->MEMBER = std::move(value); } \
     ZEM_LPAR_GETTER(MEMBER, NAME)
 #define ZEM_LPAR_TRANSLATED(MEMBER, NAME)   \
 public:                                     \
@@ -294,10 +294,10 @@ public:
 
     /// Processors and memory, and whether there has been a record of each.
     const zemPartitionProcessorResource& getLparProcessor() const { return m_LparProcessor; }
-    void setLparProcessor(const zemPartitionProcessorResource& record);
+    void setLparProcessor(zemPartitionProcessorResource record);
     bool isLparProcessorAvailable() const { return m_isLparProcAvailable; }
     const zemPartitionMemoryResource& getLparMemory() const { return m_LparMemory; }
-    void setLparMemory(const zemPartitionMemoryResource& record);
+    void setLparMemory(zemPartitionMemoryResource record);
     bool isLparMemoryAvailable() const { return m_isLparMemAvailable; }
 
     /// Records of the profiles, of slots and of virtual adapters.

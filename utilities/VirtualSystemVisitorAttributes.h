@@ -56,12 +56,12 @@ public:
     template <class Object>
     explicit zemAttributes(const Object& object);
 
-    /// The value of an attribute; empty when the object does not tell it.
-    zemString operator[](int attribute) const { return m_read(m_object, attribute); }
+    /// The value of an attribute, which is the object's; empty when it does not tell it.
+    const zemString& operator[](int attribute) const { return m_read(m_object, attribute); }
 
 private:
     const void* m_object;
-    zemString (*m_read)(const void* object, int attribute);
+    const zemString& (*m_read)(const void* object, int attribute);
 };
 
 /// What an object of the model tells, as a record.

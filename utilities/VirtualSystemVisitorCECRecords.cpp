@@ -107,7 +107,7 @@ void tellBegin(const char* operation) {
     zemLog::LogPlain("++++cec number");
 }
 
-/// Hands each record of @p records to @p store of its owner: the record itself, or a copy.
+/// Hands each record of @p records to @p store of its owner: the object, or what it holds.
 template <class Owner, class Record, class Store>
 void hangAll(zemDynamicArray<Record> records, zemCECVisitor& visitor, Store store) {
     Owners owners(visitor);
@@ -119,7 +119,7 @@ void hangAll(zemDynamicArray<Record> records, zemCECVisitor& visitor, Store stor
         if constexpr (std::is_invocable_v<Store, Owner&, Record*>) {
             std::invoke(store, *owner, std::exchange(records[i], nullptr));
         } else {
-            std::invoke(store, *owner, *records.getElementAt(i));
+            std::invoke(store, *owner, std::move(*records.getElementAt(i)));
         }
     }
 }

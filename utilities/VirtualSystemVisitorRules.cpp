@@ -74,7 +74,7 @@ zemRemoteValues runningRemote(const zemAttributes& adapter, const RemoteAttribut
     values.slot = zemNumberOf(adapter[attributes.slot]);
     values.adapterType =
         is(adapter[attributes.adapterType], "server") ? ADAPTER_SERVER : ADAPTER_CLIENT;
-    const zemString partition = adapter[attributes.partition];
+    const zemString& partition = adapter[attributes.partition];
     // The partition decides for the slot, too, whatever stands there.
     if (is(partition, "any")) {
         values.anyPartition = PARTNER_ANY;
@@ -137,7 +137,7 @@ zemProcessorValues zemRunningProcessor(const zemAttributes& processor) {
 
 zemProcessorValues zemProfileProcessor(const zemAttributes& profile, int pools) {
     using Of = zemProfileAttribute;
-    const zemString poolID = profile[Of::ATTR_SHARED_PROC_POOL_ID];
+    const zemString& poolID = profile[Of::ATTR_SHARED_PROC_POOL_ID];
     zemProcessorValues values;
     values.isShared = is(profile[Of::ATTR_PROC_MODE], "shared");
     values.sharingMode = profile[Of::ATTR_SHARING_MODE];
@@ -185,7 +185,7 @@ zemMemoryValues zemProfileMemory(const zemAttributes& profile, int pools) {
     values.isShared = pools > 0 && is(profile[Of::ATTR_MEM_MODE], "shared");
     values.memory =
         quantities(profile, kilobytes, Of::ATTR_MIN_MEM, Of::ATTR_DESIRED_MEM, Of::ATTR_MAX_MEM);
-    const zemString entitled = profile[Of::ATTR_DESIRED_IO_ENTITLED_MEM];
+    const zemString& entitled = profile[Of::ATTR_DESIRED_IO_ENTITLED_MEM];
     if (!entitled.isEmpty() && !is(entitled, "null") && !is(entitled, "auto")) {
         values.entitled = kilobytes(entitled);
     }

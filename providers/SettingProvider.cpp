@@ -92,7 +92,7 @@ bool numbers(const Setting& setting, CmpiData& value) {
         if (!isOf<CMPIUint16>(told[i])) {
             return false;
         }
-        list[i] = CmpiData(static_cast<CMPIUint16>(told[i]));
+        list[static_cast<CMPICount>(i)] = CmpiData(static_cast<CMPIUint16>(told[i]));
     }
     value = CmpiData(list);
     return told.size() > 0;

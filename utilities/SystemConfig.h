@@ -394,7 +394,8 @@ private:
     zemString m_profileName;
     bool m_connMonitoring = false;
     int m_bootMode = 0;
-    bool m_redundantPath = false;  ///< stays unset: the library has no such datum of profiles
+    /// stays unset: the library has no such datum of profiles
+    [[maybe_unused]] bool m_redundantPath = false;
     zemString m_virtualSerialAdapters;
     zemString m_virtualScsiAdapters;
     zemString m_virtualEthAdapters;

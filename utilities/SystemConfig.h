@@ -315,7 +315,7 @@ private:
 /// One stored profile of a partition.
 class ZEM_EXPORT zemVirtualSystemProfile : public zemConfigObject {
 public:
-    enum IOResourceType {
+    enum IOResourceType : int {
         IORSC_TYPE_SCSIADAPTER = 0,
         IORSC_TYPE_SERIALADAPTER = 1,
         IORSC_TYPE_ETHERNETADAPTER = 2,

@@ -47,5 +47,6 @@ check_pie_supported()
 function(zem_target target)
   target_compile_options(${target} PRIVATE
     -Wall -Wextra -Wpedantic -Wshadow
-    $<$<COMPILE_LANGUAGE:CXX>:-Wconversion -Wnon-virtual-dtor>)
+    $<$<COMPILE_LANGUAGE:CXX>:-Wconversion -Wnon-virtual-dtor>
+    $<$<COMPILE_LANG_AND_ID:CXX,Clang>:-Wno-gnu-zero-variadic-macro-arguments>)
 endfunction()

@@ -13,7 +13,8 @@ packages_build="g++ cmake ninja-build ccache pkg-config flex bison openjdk-17-jd
   libsqlite3-dev nlohmann-json3-dev libcli11-dev"
 packages_test="libgtest-dev"
 packages_bench="libbenchmark-dev libcsv-dev python3"
-packages_style="clang clang-format-16 clang-tidy libclang-rt-14-dev"
+packages_sanitize="clang libclang-rt-14-dev"
+packages_style="clang-format-16 clang-tidy"
 
 # install_missing <package>...: installs through apt what dpkg does not know yet.
 install_missing() {

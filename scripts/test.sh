@@ -23,7 +23,10 @@ while [ $# -gt 0 ]; do
     esac
 done
 
-install_missing $packages_build $packages_test
+case $preset in
+    asan | tsan) install_missing $packages_build $packages_test $packages_sanitize ;;
+    *) install_missing $packages_build $packages_test ;;
+esac
 
 build_targets=("${programs[@]}")
 build "$preset" -DZEM_BUILD_TESTS=ON -DZEM_BUILD_BENCH=OFF

@@ -7,7 +7,7 @@
 #include "LetUnwind.h"
 #include "Log.h"
 #include "LogText.h"
-#include "ServerCall.h"
+#include "cmpift.h"
 
 namespace {
 
@@ -104,8 +104,12 @@ void zemProviderTracer::_trace(CMPIBroker* broker, int level, const char* compon
     if (broker == nullptr) {
         return;
     }
-    zemQuietly([&] {
-        zemCallServer(broker->eft, &CMPIBrokerEncFT::trace, kZemNotServed, broker,
-                      static_cast<CMPILevel>(level), component, message, nullptr);
-    });
+    // Level 4 is one that servers know and CMPILevel does not name: it is handed on as it is made,
+    // and never read as one of that type.
+    const auto* const services = broker->eft;
+    if (services != nullptr && services->trace != nullptr) {
+        zemQuietly([&] {
+            services->trace(broker, static_cast<CMPILevel>(level), component, message, nullptr);
+        });
+    }
 }

@@ -315,7 +315,7 @@ private:
 /// One stored profile of a partition.
 class ZEM_EXPORT zemVirtualSystemProfile : public zemConfigObject {
 public:
-    enum IOResourceType {
+    enum IOResourceType : int {
         IORSC_TYPE_SCSIADAPTER = 0,
         IORSC_TYPE_SERIALADAPTER = 1,
         IORSC_TYPE_ETHERNETADAPTER = 2,
@@ -394,7 +394,8 @@ private:
     zemString m_profileName;
     bool m_connMonitoring = false;
     int m_bootMode = 0;
-    bool m_redundantPath = false;  ///< stays unset: the library has no such datum of profiles
+    /// stays unset: the library has no such datum of profiles
+    [[maybe_unused]] bool m_redundantPath = false;
     zemString m_virtualSerialAdapters;
     zemString m_virtualScsiAdapters;
     zemString m_virtualEthAdapters;

@@ -95,7 +95,8 @@ TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
     std::string before = with;
     std::int64_t changes = 1;
     for (int i = rounds(40); i > 0; --i) {
-        runKilled(before == with ? remove : make, engine() % (usual.count() * 3 / 2));
+        const auto moment = engine() % static_cast<std::uint64_t>(usual.count() * 3 / 2);
+        runKilled(before == with ? remove : make, static_cast<std::int64_t>(moment));
         ASSERT_EQ("", out("appliance check"));
         const std::string after = shown();
         ASSERT_TRUE(after == with || after == without) << after;

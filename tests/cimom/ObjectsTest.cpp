@@ -204,7 +204,7 @@ TEST_P(Objects, ManyObjectsEndInAnyOrder) {
         EXPECT_EQ(CMRelease(own).rc, CMPI_RC_OK);
     }
     for (int step = 0; step < 300; ++step) {
-        CMPIString* clone = clones[step * 7U % 300];
+        CMPIString* clone = clones[static_cast<unsigned>(step) * 7U % 300];
         EXPECT_EQ(textOf(clone), std::to_string(step * 7 % 300));
         EXPECT_EQ(CMRelease(clone).rc, CMPI_RC_OK);
         EXPECT_EQ(CMRelease(clone).rc, CMPI_RC_ERR_INVALID_HANDLE);

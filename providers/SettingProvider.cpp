@@ -357,10 +357,12 @@ void SettingProvider::read(const CmpiContext& context, const SettingOwner& whose
         zemVSSDVisitor systems(&host, m_class.name);
         for (int j = 0; j < host.getLPARs().size(); ++j) {
             zemLPAR& lpar = *host.getLPARs().getElementAt(j);
-            std::vector<std::unique_ptr<zemVSSD>> stored;
-            for (int k = 0; k < lpar.getLparProfile().size(); ++k) {
-                stored.emplace_back(systems.getProfileVSSD(
-                    &lpar, lpar.getLparProfile().getElementAt(k), m_class.type));
+            const zemDynamicArray<zemPartitionProfileConfiguration>& profiles =
+                lpar.getLparProfile();
+            std::vector<std::unique_ptr<zemVSSD>> stored(static_cast<std::size_t>(profiles.size()));
+            for (int k = 0; k < profiles.size(); ++k) {
+                stored[static_cast<std::size_t>(k)].reset(
+                    systems.getProfileVSSD(&lpar, profiles[k], m_class.type));
             }
             // one that was never activated has no current profile, and starts with its default
             const zemString& current = lpar.getCurrentProfileName();

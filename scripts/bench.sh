@@ -87,7 +87,9 @@ COUNTERS = [
     ("GetAllLpars/1000", "resident_MB", 100),
     ("QyallocSplit/1000/manual_time", "ours_percent", 10),
     ("Initialize/1000/iterations:1/repeats:1/manual_time", "ours_percent", 10),
-    ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 60),
+    ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 45),
+    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "model_percent", 35),
+    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "broker_percent", 22),
     ("EventDelay/manual_time", "median_ms", 25),
     ("Settings/10000/iterations:1/repeats:1/manual_time", "resident_KB", 8),
 ]

@@ -302,7 +302,7 @@ zemVSSD* zemVSSDVisitor::getStateVSSD(
     const zemRecordSetsType& scsiRecords, const zemRecordSetsType& ethRecords, int type) {
     const std::unique_ptr<zemVSSD> stored(getProfileVSSD(lparRecord, profileRecord, type));
     const zemAttributes lpar(lparRecord);
-    const zemString lparID = lpar[Partition::ATTR_LPAR_ID];
+    const zemString& lparID = lpar[Partition::ATTR_LPAR_ID];
     const zemString mtms = m_CEC->getMTMS();
     const Running running = {lpar,
                              false,

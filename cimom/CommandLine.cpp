@@ -102,6 +102,17 @@ constexpr TextArgument kTextArguments[] = {
      false},
     {kAssociationEnds, "--result-role", &Arguments::resultRole,
      "Only where the result stands in this role", false},
+    {kServing, "--address", &Arguments::address,
+     "Address to serve at [127.0.0.1]; others than those of the loopback interface only with the "
+     "three options below",
+     false},
+    {kServing, "--certificate", &Arguments::certificate,
+     "File with the certificate, and those above it, in PEM; serves HTTPS", false},
+    {kServing, "--key", &Arguments::key, "File with the key of the certificate, in PEM", false},
+    {kServing, "--passwords", &Arguments::passwords,
+     "File with a line name:hash for each who may sign in, the hash by crypt(3); without it all "
+     "users of this machine are served",
+     false},
 };
 
 CLI::App* addVerb(CLI::App& app, const Verb& row, CommandLine& line) {
@@ -124,6 +135,11 @@ CLI::App* addVerb(CLI::App& app, const Verb& row, CommandLine& line) {
     }
     if (row.takes & kFilter) {
         verb->add_option("--count", line.arguments.count, "End after this many indications");
+    }
+    if (row.takes & kServing) {
+        verb->add_option("--port", line.arguments.port,
+                         "Port to serve at, 0 for any [5988, with a certificate 5989]");
+        verb->add_flag("--log", line.arguments.log, "Print a line for each request");
     }
     if (row.takes & (kPropertyValues | kInputValues)) {
         verb->add_option("values", line.arguments.assignments,

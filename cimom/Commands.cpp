@@ -1,14 +1,11 @@
 #include "Commands.h"
 
-#include <fcntl.h>
-#include <unistd.h>
-
 #include <algorithm>
-#include <cerrno>
-#include <csignal>
 
+#include "EndSignals.h"
 #include "Failure.h"
 #include "PathText.h"
+#include "Serve.h"
 
 namespace cimom {
 
@@ -107,13 +104,7 @@ Instance readInstance(const Session& session, const Arguments& arguments) {
 }
 Reply createInstance(Session& session, const Arguments& arguments) {
     Instance instance = readInstance(session, arguments);
-    if (const CimClass* cls = classOf(session, instance.path)) {
-        for (const CimProperty* key : cls->keys) {
-            if (const Value* value = instance.properties.find(key->name)) {
-                instance.path.keys.set(key->name, *value);
-            }
-        }
-    }
+    takeKeys(instance, session.classes);
     return printed(session, session.server.createInstance(session.request, instance), false);
 }
 Reply modifyInstance(Session& session, const Arguments& arguments) {
@@ -210,32 +201,12 @@ Reply enumClasses(Session& session, const Arguments& arguments) {
 
 // -- indications ------------------------------------------------------------------------------
 
-int wakePipe[2] = {-1, -1};
-
-void wake(int) {
-    const char byte = 0;
-    if (::write(wakePipe[1], &byte, 1) < 0) {
-        return;  // a full pipe wakes as well
-    }
-}
-// Handlers and no blocked signals: the tools that providers start must be free of both.
-void wakeAtSignals() {
-    struct sigaction action = {};
-    action.sa_handler = wake;
-    for (int signal : {SIGINT, SIGTERM}) {
-        sigaction(signal, &action, nullptr);
-    }
-}
-
 // Until a signal asks to end, or enough indications have come, or nobody reads them.
 Reply watch(Session& session, const Arguments& arguments) {
     const std::string query = arguments.query.find(' ') == std::string::npos
                                   ? "SELECT * FROM " + arguments.query
                                   : arguments.query;
-    if (pipe2(wakePipe, O_CLOEXEC) != 0) {
-        throw Failure(CMPI_RC_ERROR_SYSTEM, "no pipe");
-    }
-    wakeAtSignals();
+    EndSignals signals;
     std::size_t seen = 0;  // the handler runs one indication at a time
     Server::SubscriptionId id = 0;
     Reply reply = session.server.subscribe(
@@ -247,16 +218,14 @@ Reply watch(Session& session, const Arguments& arguments) {
             ++seen;
             const bool read = session.out.write(renderEvent(indication, session.format));
             if (!read || seen == arguments.count) {
-                wake(0);
+                EndSignals::wake();
             }
         },
         id);
     if (!reply.ok()) {
         return reply;
     }
-    wakeAtSignals();  // once more: a Java VM of the providers takes them over
-    char byte = 0;
-    while (::read(wakePipe[0], &byte, 1) < 0 && errno == EINTR) {
+    while (!signals.wait(std::chrono::seconds(1))) {
         continue;
     }
     return session.server.unsubscribe(session.request, id);
@@ -289,6 +258,7 @@ const std::vector<Verb>& verbs() {
         {"gc", "Print the declaration of a class", kClass | kNoProvider, getClass},
         {"ec", "List all classes, or those below one", kOptionalClass | kNoProvider, enumClasses},
         {"watch", "Print indications until interrupted", kFilter, watch},
+        {"serve", "Serve clients of CIM-XML over HTTP until interrupted", kServing, serve},
     };
     return rows;
 }

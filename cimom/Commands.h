@@ -3,6 +3,8 @@
 #define CIMOM_COMMANDS_H
 
 #include <cstddef>
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -21,6 +23,12 @@ struct Arguments : AssociationFilter {
     std::string query;
     std::string queryLanguage = "WQL";
     std::size_t count = 0;  ///< indications to wait for; 0 for any number
+    std::string address = "127.0.0.1";
+    std::optional<std::uint16_t> port;  ///< 0 for any that is free
+    std::string certificate;            ///< files in PEM
+    std::string key;
+    std::string passwords;
+    bool log = false;
 };
 
 /// Everything that a verb works with.
@@ -49,6 +57,7 @@ enum Takes : unsigned {
     kNavigation = 1024,      ///< --result-class and --role
     kFilter = 2048,
     kNoProvider = 4096,  ///< nothing of a registration
+    kServing = 8192,
 };
 
 struct Verb {

@@ -114,7 +114,7 @@ int run(cimom::CommandLine& line) {
                            line.format,
                            out};
     const std::string what = line.arguments.name.empty() ? verb.name : line.arguments.name;
-    Waiting waiting(verb.takes == cimom::kFilter ? "" : what);
+    Waiting waiting(verb.takes & (cimom::kFilter | cimom::kServing) ? "" : what);
     out.beforeFirstWrite([&] { waiting.end(); });
     try {
         const cimom::Reply reply = verb.run(session, line.arguments);

@@ -600,4 +600,16 @@ ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes, Unf
     return typed;
 }
 
+void takeKeys(Instance& instance, const ClassRepository* classes) {
+    const CimClass* cls = classes ? classes->findClass(instance.path.className) : nullptr;
+    if (!cls) {
+        return;
+    }
+    for (const CimProperty* key : cls->keys) {
+        if (const Value* value = instance.properties.find(key->name)) {
+            instance.path.keys.set(key->name, *value);
+        }
+    }
+}
+
 }  // namespace cimom

@@ -49,6 +49,10 @@ std::string printInstance(const Instance& instance);
 ObjectPath typedKeys(const ObjectPath& path, const ClassRepository& classes,
                      Unfit unfit = Unfit::Refused);
 
+/// Puts the key properties of an instance into its path, as its class says which they are.
+/// @param classes  null when none are known; then nothing is done
+void takeKeys(Instance& instance, const ClassRepository* classes);
+
 }  // namespace cimom
 
 #endif

@@ -61,6 +61,13 @@ std::vector<std::string> Server::unloadProviders(bool terminating) {
     return stayed;
 }
 
+bool Server::hasNamespace(const std::string& nameSpace) const {
+    const auto& routes = m_impl->routes;
+    return routes.empty() || std::any_of(routes.begin(), routes.end(), [&](const auto& route) {
+               return route.serves(nameSpace, ~0U);
+           });
+}
+
 // -- instances --------------------------------------------------------------------------------
 
 namespace {

@@ -187,6 +187,9 @@ public:
     /// @return names of the providers that stayed
     std::vector<std::string> unloadProviders(bool terminating);
 
+    /// Whether a provider serves anything in that namespace. Without providers all are the same.
+    bool hasNamespace(const std::string& nameSpace) const;
+
     // -- operations -----------------------------------------------------------------------
     // Failures come back in the reply: CMPI_RC_ERR_NOT_SUPPORTED when no provider serves the
     // class, CMPI_RC_ERR_INVALID_CLASS when the classes are known and it is not among them,

@@ -1,0 +1,161 @@
+// A stock client's tour through `cimom serve`, over HTTP and over HTTPS with a password.
+#include <gtest/gtest.h>
+#include <signal.h>
+
+#include <thread>
+
+#include "TestAppliance.h"
+
+namespace {
+
+using testing_support::contents;
+using testing_support::Outcome;
+using testing_support::ScopedEnvironment;
+using testing_support::TestAppliance;
+
+struct Row {
+    std::string arguments;  ///< of wbemcli; $U is where the classes are
+    std::vector<std::string> parts;
+    std::string absent = "(nothing)";
+};
+
+class ServeTest : public ::testing::Test {
+protected:
+    void SetUp() override {
+        ASSERT_EQ(m_appliance.run("appliance init").exit, 0);
+        ASSERT_EQ(m_appliance.run("command -v wbemcli").exit, 0) << "needs sblim-wbemcli";
+    }
+    ~ServeTest() override { stop(); }
+
+    std::string file(const char* name) const { return (m_appliance.folder() / name).string(); }
+    /// Starts to serve; the base of its addresses is in $U of what is run from now on.
+    void serve(const std::string& options, const std::string& credentials = "") {
+        m_appliance.run("cd " + m_appliance.folder().string() + "; (cimom serve --log --port 0 " +
+                        options + " >log 2>fault & echo $! >pid; wait $!; echo $? >status) &");
+        for (int i = 0; i < 500 && contents(file("log")).find('\n') == std::string::npos; ++i) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        }
+        const std::string log = contents(file("log"));
+        const std::size_t scheme = log.find("http"), host = log.find("127.0.0.1");
+        ASSERT_NE(host, std::string::npos) << contents(file("fault"));
+        m_url = log.substr(scheme, host - scheme) + credentials +
+                log.substr(host, log.find('\n') - host) + "/root/cimv2";
+    }
+    /// @return the exit status of what was started
+    std::string stop() {
+        const std::string pid = contents(file("pid"));
+        if (pid.empty() || !contents(file("status")).empty()) {
+            return contents(file("status"));
+        }
+        kill(std::stoi(pid), SIGTERM);
+        for (int i = 0; i < 500 && contents(file("status")).empty(); ++i) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        }
+        return contents(file("status"));
+    }
+    std::string client(const std::string& arguments) {
+        const Outcome got =
+            m_appliance.run("U='" + m_url + "'; wbemcli -noverify " + arguments + " 2>&1");
+        return got.out;
+    }
+    void expectRows(const std::vector<Row>& rows) {
+        for (const Row& row : rows) {
+            const std::string answer = client(row.arguments);
+            for (const std::string& part : row.parts) {
+                EXPECT_NE(answer.find(part), std::string::npos) << row.arguments << ":\n" << answer;
+            }
+            EXPECT_EQ(answer.find(row.absent), std::string::npos) << row.arguments;
+        }
+    }
+
+    TestAppliance m_appliance{ZEM_PROGRAMS};
+    ScopedEnvironment m_registration{"CIMOM_REGISTRATION", ZEM_REGISTRATION};
+    ScopedEnvironment m_schema{"CIMOM_SCHEMA", ZEM_SCHEMA};
+    std::string m_url;
+};
+
+TEST_F(ServeTest, AStockClientReachesTheWholeModel) {
+    serve("");
+    const std::string host =
+        R"("$U:ORXC_CEC_CS.CreationClassName=\"ORXC_CEC_CS\",Name=\"1111-AAA*0000001\"")";
+    const std::string web =
+        R"("$U:ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"3*1111-AAA*0000001\"")";
+    const std::string made =
+        R"("$U:ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"8*1111-AAA*0000001\"")";
+    const std::string partition = "ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"3*1111-";
+    const std::string connection = "ORXC_HostConnection.InstanceID";
+    const std::string properties =
+        "CreationClassName=ORXC_LPAR_CS,Name=8*1111-AAA*0000001,ElementName=new,"
+        "LparEnvironment=tmxlinux,DefaultProfile=p,MinMemory=256,DesiredMemory=512,MaxMemory=1024,"
+        "ProcessorMode=shared,SharingMode=cap,MinProcessors=1,DesiredProcessors=1,MaxProcessors=2,"
+        "MinProcessingUnits=10,DesiredProcessingUnits=55,MaxProcessingUnits=100";
+    const std::vector<Row> rows = {
+        {"ecn \"$U:\"", {"CIM_ManagedElement\n", "ORXC_LPAR_CS\n"}},
+        {"gc \"$U:ORXC_LPAR_CS\"", {"LparID=", "EnabledState="}},
+        {"ein \"$U:ORXC_LPAR_CS\"", {partition}},
+        {"ei \"$U:CIM_System\"", {"ElementName=\"web server\"", "ORXC_CEC_CS", "B\xC3\xBCro-Pr"}},
+        {"gi " + web + " ElementName,OperationalStatus", {"\"web server\"", "OperationalStatus=2"}},
+        {"ain " + host, {partition, connection}},
+        {"ain -ac ORXC_HostedPartition " + host, {partition}, connection},
+        {"ai -arc ORXC_HostConnection " + host, {connection}},
+        {"ain -ar Antecedent -arr Dependent " + host, {partition, connection}},
+        {"ain -ar Dependent -arr Antecedent " + host, {connection}, partition},
+        {"ri -arc ORXC_HostedPartition " + host,
+         {"ORXC_HostedPartition.Ante"},
+         "ORXC_HostComponent"},
+        {"rin -ar GroupComponent " + host, {"ORXC_HostComponent.Group"}, "ORXC_HostedPartition"},
+        {"mi " + web + " ElementName='a > b'", {}, "wbemcli:"},
+        {"gp " + web + " ElementName", {"a > b"}},
+        {"sp " + web + " ElementName=www", {}, "wbemcli:"},
+        {"cm " + web + " RequestStateChange.RequestedState=4", {"RequestStateChange: 0"}},
+        {"ci " + made + " " + properties, {"8*1111-AAA*0000001"}, "wbemcli:"},
+        {"gi " + made + " ElementName,DesiredProcessingUnits", {"\"new\"", "=55"}},
+        {"di " + made, {}, "wbemcli:"},
+        {"gi " + made, {"(6) CIM_ERR_NOT_FOUND: The requested object root/cimv2:ORXC_LPAR_CS."}},
+        {"ei \"$U:ORXC_Nix\"", {"(5) CIM_ERR_INVALID_CLASS: no class ORXC_Nix"}},
+    };
+    expectRows(rows);
+    EXPECT_EQ(stop(), "0\n");
+    const std::string log = contents(file("log"));
+    EXPECT_NE(log.find(" ms root/cimv2 DeleteInstance\n"), std::string::npos) << log;
+    EXPECT_NE(log.find(" GetInstance CIM_ERR_NOT_FOUND The requested"), std::string::npos) << log;
+    EXPECT_EQ(contents(file("fault")), "");
+}
+
+TEST_F(ServeTest, WhoSignsInIsWhoToolsRunAs) {
+    ASSERT_EQ(m_appliance
+                  .run("cd " + m_appliance.folder().string() +
+                       "; umask 077; openssl req -x509 -newkey rsa:2048 -nodes -keyout key "
+                       "-out certificate -days 2 -subj /CN=localhost; printf '%s:%s\\n' "
+                       "'no user' \"$(openssl passwd -6 secret)\" >passwords")
+                  .exit,
+              0);
+    serve("--certificate certificate --key key --passwords passwords", "no user:secret@");
+    const std::string all = "ein \"$U:ORXC_LPAR_CS\"";
+    expectRows({{all, {"The given user name \"no user\" was not found."}}});
+    m_url.replace(m_url.find("secret"), 6, "sekret");
+    expectRows({{all, {"Invalid username/password"}}});
+    EXPECT_EQ(stop(), "0\n");
+}
+
+TEST_F(ServeTest, StrangersAreNotServedByMistake) {
+    const struct {
+        const char* options;
+        const char* error;
+    } rows[] = {
+        {"--address 0.0.0.0", "only addresses of the loopback interface"},
+        {"--address :: --passwords x", "only addresses of the loopback interface"},
+        {"--address example.invalid", "only addresses of the loopback interface"},
+        {"--certificate x", "--certificate and --key go together"},
+        {"--passwords /etc/passwd", "others may read or change it"},
+        {"--certificate none --key none", "none: cannot be read"},
+        {"--certificate /etc/hosts --key /etc/hosts", "cannot be served"},
+    };
+    for (const auto& row : rows) {
+        const Outcome got = m_appliance.run(std::string("cimom serve --port 0 ") + row.options);
+        EXPECT_NE(got.exit, 0) << row.options;
+        EXPECT_NE(got.err.find(row.error), std::string::npos) << got.err;
+    }
+}
+
+}  // namespace

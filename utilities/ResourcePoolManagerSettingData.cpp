@@ -272,7 +272,7 @@ bool numbers(const zemRASDCommData& data, CmpiData& value) {
         if (!isOf<CMPIUint16>((*told)[i])) {
             return false;
         }
-        list[i] = CmpiData(static_cast<CMPIUint16>((*told)[i]));
+        list[static_cast<CMPICount>(i)] = CmpiData(static_cast<CMPIUint16>((*told)[i]));
     }
     value = CmpiData(list);
     return true;

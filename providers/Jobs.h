@@ -27,8 +27,9 @@
 #include <sys/time.h>
 #include <sys/types.h>
 
+#include <chrono>
+#include <cstddef>
 #include <cstdio>
-#include <ctime>
 #include <functional>
 #include <list>
 #include <optional>
@@ -63,10 +64,14 @@ public:
     };
     /// What RequestStateChange answers.
     enum Answer : unsigned {
-        Done = 0,
         NotSupported = 1,
-        InvalidTransition = 4097,
+        Failed = 4,
+        Started = 4096,
+        InvalidTransition = 4097
     };
+
+    /// How long a job that has ended is shown.
+    static constexpr long kSecondsBeforeRemoval = 300;
 
     /// What is known of a job at one moment.
     struct Status {
@@ -79,8 +84,8 @@ public:
         int exitCode = 0;                       ///< of the tool that failed; 0 without one
         std::string error;                      ///< what the tool said, or why there is none
         timeval submitted = {};
-        timeval changed = {};  ///< when the state last did; zero when it never did
-        long elapsed = 0;      ///< seconds, to now or to the end
+        timeval changed = {};                 ///< when the state last did; zero when it never did
+        std::chrono::microseconds elapsed{};  ///< to now or to the end
         bool deleteOnCompletion = true;
 
         bool ended() const { return state >= Completed; }
@@ -103,7 +108,8 @@ public:
 
     /// Asks the tool that runs to end (Terminated), or ends it (Killed). The job has the new state
     /// as soon as the tool has ended, and Completed if that had done its work by then.
-    /// @return InvalidTransition for a job that has ended, NotSupported for any other state
+    /// @return Started; InvalidTransition for a job that has ended, NotSupported for any other
+    ///         state, Failed when the tool cannot be reached
     Answer requestState(const std::string& id, State state);
 
     /// @return false for a job that there is not, remove() also for one that runs
@@ -117,6 +123,19 @@ private:
     ~JobTable();
     JobTable(const JobTable&) = delete;
     JobTable& operator=(const JobTable&) = delete;
+
+    static void follow(void* job);
+    static Status statusOf(const Job& job);
+
+    bool startNext(Job& job);
+    bool reap(Job& job, const std::string& words);
+    void end(Job& job, State state, const std::string& error);
+    static Answer ask(Job& job, State state);
+    void askAll(State state);
+    std::ptrdiff_t running();
+    void makeRoom();
+    void dropOld();
+    Job* jobOf(const std::string& id);
 
     zemSynchronizerContext m_lock;
     std::list<Job> m_jobs;

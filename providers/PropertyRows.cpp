@@ -303,3 +303,16 @@ std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& insta
     }
     return asked;
 }
+
+bool hasTimeout(const CmpiArgs& in) {
+    CmpiData limit;
+    try {
+        limit = in.getArg("TimeoutPeriod");
+    } catch (const CmpiStatus&) {
+        return false;  // it was not given, in the way of some servers
+    }
+    if (limit.isNotFound() || limit.isNullValue()) {
+        return false;
+    }
+    return limit.getDateTime().getDateTime() != 0;
+}

@@ -12,6 +12,7 @@
 #include <utility>
 #include <vector>
 
+#include "CmpiArgs.h"
 #include "CmpiInstance.h"
 #include "CommandCaller.h"
 #include "Exception.h"
@@ -81,5 +82,8 @@ std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& insta
                                                        const CmpiObjectPath& near,
                                                        const char* className,
                                                        const char** properties);
+
+/// Whether the client limits the time that a change of state may take, by TimeoutPeriod.
+bool hasTimeout(const CmpiArgs& in);
 
 #endif

@@ -1,13 +1,8 @@
 #include "Commands.h"
 
-#include <fcntl.h>
-#include <unistd.h>
-
-#include <algorithm>
-#include <cerrno>
-#include <csignal>
-
 #include "Failure.h"
+#include "Interrupt.h"
+#include "JobProgress.h"
 #include "PathText.h"
 
 namespace cimom {
@@ -153,7 +148,8 @@ Reply invokeMethod(Session& session, const Arguments& arguments) {
     if (reply.ok()) {
         session.out.write(renderMethod(reply, session.format));
     }
-    return reply;
+    ObjectPath job;
+    return reply.ok() && hasStartedJob(reply, job) ? awaitJob(session, job) : reply;
 }
 Reply getProperty(Session& session, const Arguments& arguments) {
     Reply reply = session.server.getProperty(session.request, readPath(session, arguments.object),
@@ -210,31 +206,11 @@ Reply enumClasses(Session& session, const Arguments& arguments) {
 
 // -- indications ------------------------------------------------------------------------------
 
-int wakePipe[2] = {-1, -1};
-
-void wake(int) {
-    const char byte = 0;
-    if (::write(wakePipe[1], &byte, 1) < 0) {
-        return;  // a full pipe wakes as well
-    }
-}
-// Handlers and no blocked signals: the tools that providers start must be free of both.
-void wakeAtSignals() {
-    struct sigaction action = {};
-    action.sa_handler = wake;
-    for (int signal : {SIGINT, SIGTERM}) {
-        sigaction(signal, &action, nullptr);
-    }
-}
-
 // Until a signal asks to end, or enough indications have come, or nobody reads them.
 Reply watch(Session& session, const Arguments& arguments) {
     const std::string query = arguments.query.find(' ') == std::string::npos
                                   ? "SELECT * FROM " + arguments.query
                                   : arguments.query;
-    if (pipe2(wakePipe, O_CLOEXEC) != 0) {
-        throw Failure(CMPI_RC_ERROR_SYSTEM, "no pipe");
-    }
     wakeAtSignals();
     std::size_t seen = 0;  // the handler runs one indication at a time
     Server::SubscriptionId id = 0;
@@ -247,7 +223,7 @@ Reply watch(Session& session, const Arguments& arguments) {
             ++seen;
             const bool read = session.out.write(renderEvent(indication, session.format));
             if (!read || seen == arguments.count) {
-                wake(0);
+                wake();
             }
         },
         id);
@@ -255,10 +231,7 @@ Reply watch(Session& session, const Arguments& arguments) {
         return reply;
     }
     wakeAtSignals();  // once more: a Java VM of the providers takes them over
-    char byte = 0;
-    while (::read(wakePipe[0], &byte, 1) < 0 && errno == EINTR) {
-        continue;
-    }
+    waitForWake(-1);
     return session.server.unsubscribe(session.request, id);
 }
 

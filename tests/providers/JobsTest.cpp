@@ -114,6 +114,15 @@ TEST(JobTableTest, JobsEndAsTheirToolsDo) {
         EXPECT_EQ(job.error, row.error);
         EXPECT_EQ(JobTable::instance().requestState(id, kKill), JobTable::InvalidTransition);
     }
+    // A client whose thread the server cancels as soon as it can.
+    std::thread([] {
+        pthread_cancel(pthread_self());
+        start({"exit 0"});
+        pthread_testcancel();
+    }).join();
+    for (const JobTable::Status& job : JobTable::instance().all()) {
+        EXPECT_GT(endOf(job.id).state, JobTable::ShuttingDown);
+    }
     errno = 0;
     EXPECT_TRUE(waitpid(-1, nullptr, WNOHANG) < 0 && errno == ECHILD) << "a child is left";
 }

@@ -169,7 +169,7 @@ Status JobProvider::jobAt(const CmpiObjectPath& path, const char* operation) con
 
 Status JobProvider::ownJobAt(const CmpiContext& context, const CmpiObjectPath& path,
                              const char* operation) const {
-    const Status job = jobAt(path, operation);
+    Status job = jobAt(path, operation);
     const zemString user = getUserContext(context);
     if (job.owner != static_cast<const char*>(user) && !(user == "root")) {
         throwUserAccessDeniedExc(operation, kJobClass, user);

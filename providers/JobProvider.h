@@ -46,6 +46,8 @@ private:
     /// As jobAt(), for its owner. @throws zemAccessDeniedException for others
     JobTable::Status ownJobAt(const CmpiContext& context, const CmpiObjectPath& path,
                               const char* operation) const;
+
+    JobTable::Use m_jobs;
 };
 
 #endif

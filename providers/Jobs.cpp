@@ -117,16 +117,41 @@ struct JobTable::Job {
     zemThread thread;
 };
 
+JobTable::Use::Use() {
+    JobTable& table = instance();
+    const zemSynchronizer hold(table.m_lock);
+    ++table.m_uses;
+}
+
+JobTable::Use::~Use() {
+    JobTable& table = instance();
+    bool last = false;
+    {
+        const zemSynchronizer hold(table.m_lock);
+        last = --table.m_uses == 0;
+    }
+    if (last) {
+        table.endAll();
+    }
+}
+
 JobTable::JobTable() = default;
 
-// The threads run code of this library and must have ended when it goes.
-JobTable::~JobTable() {
+JobTable::~JobTable() { endAll(); }
+
+/// Ends all jobs and forgets them. Their threads run code of this library, and must have ended
+/// before it goes.
+void JobTable::endAll() {
+    const auto awaitEnds = [this](Clock::time_point limit) {
+        while (running() > 0 && Clock::now() < limit) {
+            usleep(10 * 1000);
+        }
+    };
     askAll(Terminated);
-    const auto limit = Clock::now() + kTimeToEnd;
-    while (running() > 0 && Clock::now() < limit) {
-        usleep(10 * 1000);
-    }
+    awaitEnds(Clock::now() + kTimeToEnd);
     askAll(Killed);
+    awaitEnds(Clock::time_point::max());
+    const zemSynchronizer hold(m_lock);
     m_jobs.clear();
 }
 
@@ -139,7 +164,7 @@ std::string JobTable::start(Work work) {
     std::list<Job> place;
     place.emplace_back(*this, std::move(work));
     Job& job = place.front();
-    const std::string id = job.status.id;
+    std::string id = job.status.id;
     makeRoom();
     if (!startNext(job)) {
         return "";

@@ -16,9 +16,10 @@
 ///
 /// The table is one for the process, and so are its jobs: the provider that starts them and the one
 /// that shows them must be loaded into the same process, and both must stay loaded while the server
-/// runs (zemBaseZemProvider). When the library is unloaded or the process exits in good order, the
-/// tools that still run are asked to end, after five seconds made to, and waited for. A process
-/// that is killed leaves its tools to themselves; no other process ever knows of its jobs.
+/// runs (zemBaseZemProvider). Each has a JobTable::Use as a member: with the last of them, or at
+/// the exit of the process, the tools that still run are asked to end, after five seconds made to,
+/// and waited for. A process that is killed leaves its tools to themselves; no other process ever
+/// knows of its jobs.
 ///
 /// Thread-safety: all operations may be called from any thread.
 #ifndef JOBS_H
@@ -91,6 +92,15 @@ public:
         bool ended() const { return state >= Completed; }
     };
 
+    /// Keeps the jobs running while it lives.
+    class Use {
+    public:
+        Use();
+        ~Use();
+        Use(const Use&) = delete;
+        Use& operator=(const Use&) = delete;
+    };
+
     /// The table of this process.
     static JobTable& instance();
 
@@ -133,12 +143,14 @@ private:
     static Answer ask(Job& job, State state);
     void askAll(State state);
     std::ptrdiff_t running();
+    void endAll();
     void makeRoom();
     void dropOld();
     Job* jobOf(const std::string& id);
 
     zemSynchronizerContext m_lock;
     std::list<Job> m_jobs;
+    int m_uses = 0;
 };
 
 /// Class and path of a job, in the namespace of @p near.

@@ -21,7 +21,10 @@ constexpr const char kHost[] = "ORXC_CEC_CS";
 constexpr const char kPartition[] = "ORXC_LPAR_CS";
 constexpr const char kConnection[] = "ORXC_HostConnection";
 
+constexpr const char kService[] = "ORXC_VirtualSystemManagementService";
+
 constexpr const char kHostedPartition[] = "ORXC_HostedPartition";
+constexpr const char kHostedService[] = "ORXC_HostedService";
 constexpr const char kConnectedHost[] = "ORXC_ConnectedHost";
 constexpr const char kHostComponent[] = "ORXC_HostComponent";
 constexpr const char kReachedHost[] = "ORXC_ReachedHost";
@@ -35,6 +38,9 @@ zemString hostOf(const CmpiObjectPath& path) {
     if (isOfClass(path, kConnection)) {
         return ConnectionProvider::hostOf(path.getKey("InstanceID").getString().charPtr()).c_str();
     }
+    if (isOfClass(path, kService)) {
+        return path.getKey("SystemName").getString().charPtr();
+    }
     return zemDataTypeConvertManager::getMTMSByOP(path);
 }
 
@@ -43,19 +49,31 @@ bool onOneHost(const CmpiObjectPath& a, const CmpiObjectPath& b) {
     return !host.isEmpty() && host == hostOf(b);
 }
 
-/// Which host a partition runs on: one class on each side, both asked of the server.
-class HostedPartition : public OneAssociation<zemNtoNAssociationProvider> {
+/// What there is of one class on a host: one class on each side, both asked of the server.
+class OnHost : public OneAssociation<zemNtoNAssociationProvider> {
+protected:
+    OnHost(const CmpiBroker& mb, const CmpiContext& ctx, const char* name, const char* association,
+           const char* dependent)
+        : CmpiBaseMI(mb, ctx),
+          OneAssociation(association, mb, ctx, name, association, kHost, dependent, "Antecedent",
+                         "Dependent", OP_ALLOps, "", "", "") {}
+
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& dependent) override {
+        return onOneHost(host, dependent);
+    }
+};
+
+class HostedPartition : public OnHost {
 public:
     HostedPartition(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx),
-          OneAssociation(kHostedPartition, mb, ctx, name, kHostedPartition, kHost, kPartition,
-                         "Antecedent", "Dependent", OP_ALLOps, "", "", "") {}
+        : CmpiBaseMI(mb, ctx), OnHost(mb, ctx, name, kHostedPartition, kPartition) {}
+};
 
-protected:
-    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
-                               const CmpiObjectPath& partition) override {
-        return onOneHost(host, partition);
-    }
+class HostedService : public OnHost {
+public:
+    HostedService(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), OnHost(mb, ctx, name, kHostedService, kService) {}
 };
 
 /// Which connections lead to a host: a row, to which further pairs of classes can be added. Paths
@@ -90,7 +108,7 @@ public:
 protected:
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
                                const CmpiObjectPath& part) override {
-        return !isOfClass(part, kHost) && onOneHost(host, part);
+        return !isOfClass(part, kHost) && !isOfClass(part, kService) && onOneHost(host, part);
     }
 };
 
@@ -150,6 +168,7 @@ private:
 }  // namespace
 
 ZEM_PROVIDER(ORXC_HostedPartitionProvider, HostedPartition)
+ZEM_PROVIDER(ORXC_HostedServiceProvider, HostedService)
 ZEM_PROVIDER(ORXC_ConnectedHostProvider, ConnectedHost)
 ZEM_PROVIDER(ORXC_HostComponentProvider, HostComponent)
 ZEM_PROVIDER(ORXC_ReachedHostProvider, ReachedHost)

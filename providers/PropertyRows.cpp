@@ -280,6 +280,14 @@ CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties) {
     return instance;
 }
 
+CmpiData argumentOf(const CmpiArgs& in, const char* name) {
+    try {
+        return in.getArg(name);
+    } catch (const CmpiStatus&) {
+        return CmpiData();
+    }
+}
+
 std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& instance,
                                                        const CmpiObjectPath& near,
                                                        const char* className,
@@ -305,12 +313,7 @@ std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& insta
 }
 
 bool hasTimeout(const CmpiArgs& in) {
-    CmpiData limit;
-    try {
-        limit = in.getArg("TimeoutPeriod");
-    } catch (const CmpiStatus&) {
-        return false;  // it was not given, in the way of some servers
-    }
+    const CmpiData limit = argumentOf(in, "TimeoutPeriod");
     if (limit.isNotFound() || limit.isNullValue()) {
         return false;
     }

@@ -74,6 +74,9 @@ CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
 /// @param properties  as for attributesFor()
 CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties);
 
+/// An argument of a method; null when it was not given, in whichever way the server says so.
+CmpiData argumentOf(const CmpiArgs& in, const char* name);
+
 /// What a client asks for with an instance that it sends: the wanted properties that have a value,
 /// but for those at the default of @p className. Servers fill defaults in for what a client leaves
 /// out, so a default asks for nothing.

@@ -3,7 +3,10 @@
 #include <algorithm>
 #include <memory>
 #include <optional>
+#include <set>
+#include <vector>
 
+#include "Exception.h"
 #include "ManagementService.h"
 
 namespace {
@@ -22,16 +25,47 @@ JobTable::Step stepFor(const zemOperEnv& client, const SettingOwner& owner, zemR
 }
 
 /// The same for a change of processors or memory.
-JobTable::Step stepFor(const zemOperEnv& client, const SettingOwner& owner, zemRASD& before,
-                       zemRASD& now) {
-    const std::shared_ptr<zemRASD> from(before.clone()), to(now.clone());
-    return [client, owner, from, to](pid_t* pid, FILE** output) {
+JobTable::Step stepFor(const zemOperEnv& client, const SettingOwner& owner,
+                       const std::shared_ptr<zemRASD>& before,
+                       const std::shared_ptr<zemRASD>& now) {
+    return [client, owner, before, now](pid_t* pid, FILE** output) {
         zemCEC host(owner.host.c_str(), "");
         zemLPARVisitor partitions(&host, "");
         partitions.setOperEnv(client);
         return partitions.ChangeRunningMemProcResource(owner.host.c_str(), owner.partition.c_str(),
-                                                       from.get(), to.get(), pid, output);
+                                                       before.get(), now.get(), pid, output);
     };
+}
+
+/// A tool changes amounts, in one direction, or how they are shared: as many steps as that takes.
+void addSteps(const zemOperEnv& client, const SettingOwner& owner, zemRASD& shown, zemRASD& wanted,
+              std::vector<JobTable::Step>& steps) {
+    enum Part : unsigned { Held = 1, Seen = 2, Sharing = 4 };
+    const zemRASDCommData& before = *shown.getData();
+    const zemRASDCommData& after = *wanted.getData();
+    const auto add = [&](unsigned parts) {
+        std::shared_ptr<zemRASD> now(shown.clone());
+        zemRASDCommData& data = *now->getData();
+        data.m_Reservation = (parts & Held) != 0 ? after.m_Reservation : before.m_Reservation;
+        data.m_VirtualQuantity =
+            (parts & Seen) != 0 ? after.m_VirtualQuantity : before.m_VirtualQuantity;
+        data.m_Weight = (parts & Sharing) != 0 ? after.m_Weight : before.m_Weight;
+        data.m_SharingMode = (parts & Sharing) != 0 ? after.m_SharingMode : before.m_SharingMode;
+        if (!data.equals(&before)) {
+            steps.push_back(stepFor(client, owner, std::shared_ptr<zemRASD>(shown.clone()), now));
+        }
+    };
+    const bool areOpposite = (after.m_Reservation < before.m_Reservation &&
+                              after.m_VirtualQuantity > before.m_VirtualQuantity) ||
+                             (after.m_Reservation > before.m_Reservation &&
+                              after.m_VirtualQuantity < before.m_VirtualQuantity);
+    if (areOpposite) {
+        add(Held);
+        add(Seen);
+    } else {
+        add(Held | Seen);
+    }
+    add(Sharing);
 }
 
 /// Tags of slots are set with whatever is set of a profile: slots that have some must be there.
@@ -45,6 +79,22 @@ void keepTaggedSlots(zemVSSD& system) {
     for (int i = 0; i < slots.size(); ++i) {
         system.removeRASD(slots[i]->getKey());
     }
+}
+
+/// The tags that a change of a profile can give to a slot, but not take away: the tools have no
+/// word for none of them.
+std::set<int> lastingTags(const zemVSSD& system) {
+    std::set<int> tags;
+    const zemDynamicArray<zemRASD> slots = system.getRASD(zemRASDKinds::ioSlot.resourceType);
+    for (int i = 0; i < slots.size(); ++i) {
+        for (int tag : {2, 5, 6}) {
+            const auto& slot = dynamic_cast<const zemIOSlotRASD&>(*slots[i]);
+            if (slot.m_Data.m_TaggedIOType.find(tag) >= 0) {
+                tags.insert(tag);
+            }
+        }
+    }
+    return tags;
 }
 
 /// Tells the client the paths of settings.
@@ -107,6 +157,7 @@ ManagementService::Answer ManagementService::addResources(const Call& call) cons
     profiles.setOperEnv(call.client);
     profiles.AddIOResources(&system);
     std::vector<CmpiObjectPath> paths;
+    paths.reserve(resources.size());
     for (std::size_t i = 0; i < resources.size(); ++i) {
         zemRASD& resource = *system.getRASDs().getElementAt(static_cast<int>(i));
         paths.push_back(
@@ -143,6 +194,7 @@ ManagementService::Answer ManagementService::modifyProfile(const Call& call,
         return InvalidParameter;
     }
     zemVSSD& system = *present.stored;
+    const std::set<int> tags = lastingTags(system);
     std::vector<CmpiObjectPath> paths;
     bool isAsked = false;
     for (const MeantResources::One& one : meant.all) {
@@ -155,6 +207,12 @@ ManagementService::Answer ManagementService::modifyProfile(const Call& call,
         isAsked |= changeResource(
             {SettingUse::ChangeProfile, *one.said, one.row, call.path, setting}, system, *stored);
         paths.push_back(settingPath(call.path, one.row, one.id.c_str()));
+    }
+    const std::set<int> now = lastingTags(system);
+    if (!std::includes(now.begin(), now.end(), tags.begin(), tags.end())) {
+        throw zemInvalidParameterException(
+            "ManagementService", "modifyProfile",
+            "The tags 2, 5 and 6 go to another slot, or with their slot; they are not dropped.");
     }
     if (!areSlotsMeant) {
         keepTaggedSlots(system);
@@ -190,7 +248,7 @@ ManagementService::Answer ManagementService::modifyState(const Call& call,
         const Setting setting = {one.id.c_str(), *present.shown, shown->getData()};
         if (changeResource({SettingUse::ChangeState, *one.said, one.row, call.path, setting},
                            *present.shown, *now)) {
-            steps.push_back(stepFor(call.client, meant.system.owner, *shown, *now));
+            addSteps(call.client, meant.system.owner, *shown, *now, steps);
         }
     }
     return startJob(call, meant.system.owner, "Modify resources", std::move(steps));

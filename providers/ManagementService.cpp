@@ -40,6 +40,7 @@ std::vector<zemString> hostsNamed(const CmpiContext& context, const std::string&
     const std::unique_ptr<zemCECVisitor> hosts(manager.createCECVisitor(clientOf(context)));
     hosts->initialize(zemBaseProvider::getUserContext(context), false, host.c_str(),
                       zemCECVisitor::Level_Basic);
+    names.reserve(static_cast<std::size_t>(hosts->size()));
     for (int i = 0; i < hosts->size(); ++i) {
         names.push_back(hosts->getData(i)->getMTMS());
     }

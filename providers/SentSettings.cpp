@@ -25,28 +25,34 @@ bool isAmount(const zemRASD& resource) {
 
 constexpr int kDedicated = 2;  ///< ConsumerVisibility of processors and memory that are one's own
 
+[[noreturn]] void refuse(const char* why) {
+    throw zemInvalidParameterException("SentSettings", "settleAmounts", why);
+}
+
 /// Of a dedicated resource a partition sees all that it has: what is said of one is meant of both.
+/// Shared memory has its limits as it is seen, and none of what is held.
 /// @param before  what the client did not say
-void settleDedicated(const zemRASDCommData& before, zemRASD& resource) {
+void settleAmounts(const zemRASDCommData& before, zemRASD& resource) {
     using Data = zemRASDCommData;
     static constexpr std::int64_t Data::*kPairs[][2] = {
         {&Data::m_VirtualMinimum, &Data::m_Minimum},
         {&Data::m_VirtualQuantity, &Data::m_Reservation},
         {&Data::m_VirtualMaximum, &Data::m_Limit}};
     Data& now = *resource.getData();
-    if (!isAmount(resource) || now.m_ConsumerVisibility != kDedicated) {
-        return;
-    }
-    for (const auto& [seen, held] : kPairs) {
-        if (now.*held == before.*held) {
-            now.*held = now.*seen;
-        } else if (now.*seen == before.*seen) {
-            now.*seen = now.*held;
+    if (isAmount(resource) && now.m_ConsumerVisibility == kDedicated) {
+        for (const auto& [seen, held] : kPairs) {
+            if (now.*held == before.*held) {
+                now.*held = now.*seen;
+            } else if (now.*seen == before.*seen) {
+                now.*seen = now.*held;
+            }
+            if (now.*seen != now.*held) {
+                refuse("A dedicated resource is as much as it is seen.");
+            }
         }
-        if (now.*seen != now.*held) {
-            throw zemInvalidParameterException("SentSettings", "settleDedicated",
-                                               "A dedicated resource is as much as it is seen.");
-        }
+    } else if (dynamic_cast<const zemMemoryRASD*>(&resource) != nullptr &&
+               (now.m_Minimum != before.m_Minimum || now.m_Limit != before.m_Limit)) {
+        refuse("Shared memory has no Minimum and no Limit but VirtualMinimum and VirtualMaximum.");
     }
 }
 
@@ -152,7 +158,7 @@ void addResource(const Sent& sent, SettingUse use, const CmpiObjectPath& near, z
     std::unique_ptr<zemRASD> resource(newResource(sent.row));
     const Setting shown = {"", system, blank->getData()};
     takeSetting({use, sent.instance, sent.row, near, shown}, system, resource->getData());
-    settleDedicated(*blank->getData(), *resource);
+    settleAmounts(*blank->getData(), *resource);
     system.addRASD(resource.release());
 }
 
@@ -161,13 +167,13 @@ bool changeResource(const SentSetting& sent, zemVSSD& system, zemRASD& resource)
     const bool isAsked = takeSetting(sent, system, resource.getData());
     if (!isAmount(resource) ||
         resource.getData()->m_ConsumerVisibility == before->getData()->m_ConsumerVisibility) {
-        settleDedicated(*before->getData(), resource);
+        settleAmounts(*before->getData(), resource);
         return isAsked;
     }
     const std::unique_ptr<zemRASD> blank(newResource(sent.row));
     std::unique_ptr<zemRASD> fresh(newResource(sent.row));
     takeSetting(sent, system, fresh->getData());
-    settleDedicated(*blank->getData(), *fresh);
+    settleAmounts(*blank->getData(), *fresh);
     system.removeRASD(resource.getKey());
     system.addRASD(fresh.release());
     return true;

@@ -226,6 +226,7 @@ TEST_P(ManagementServiceTest, RefusalsChangeNothing) {
         {"DefineSystem", {"SystemSettings", system("Caption = \"c\";"), "ResourceSettings", both}, "property Caption"},
         {"DefineSystem", {"SystemSettings", web, "ResourceSettings", "{instance of ORXC_MemoryRASettingData { AllocationUnits = \"byte*2^20\" }}"}, "property AllocationUnits"},
         {"DefineSystem", {"SystemSettings", web, "ResourceSettings", "{instance of ORXC_MemoryRASettingData { ConsumerVisibility = 2; Reservation = 1024; VirtualQuantity = 2048 }}"}, "as much as it is seen"},
+        {"DefineSystem", {"SystemSettings", web, "ResourceSettings", "{instance of ORXC_MemoryRASettingData { ConsumerVisibility = 3; Limit = 2048 }}"}, "Shared memory has no"},
         {"DefineSystem", {"SystemSettings", web, "ResourceSettings", "{instance of ORXC_SCSIAdapterRASettingData { RemoteVirtualSystemID = \"1/2\" }}"}, "property RemoteVirtualSystemID"},
         {"DestroySystem", {"AffectedSystem", partition("1*1111-AAB*0000002")}, "4"},
         {"DestroySystem", {"AffectedSystem", partition("99*1111-AAA*0000001")}, "WRTL8011"},

@@ -146,6 +146,7 @@ ManagementService::Answer ManagementService::addResources(const Call& call) cons
     }
     if (id->isState) {
         std::vector<JobTable::Step> steps;
+        steps.reserve(resources.size());
         for (int i = 0; i < system.getRASDs().size(); ++i) {
             steps.push_back(stepFor(call.client, id->owner, *system.getRASDs().getElementAt(i),
                                     zemCommandCaller::CH_OP_ADD));

@@ -22,10 +22,12 @@ constexpr std::int64_t kLparsPerHost = 1000;
 /// Full hosts, or one host that is not full.
 class GeneratedAppliance : public testing_support::TestAppliance {
 public:
-    explicit GeneratedAppliance(std::int64_t lpars) : TestAppliance(ZEM_PROGRAMS) {
+    explicit GeneratedAppliance(std::int64_t lpars, std::int64_t pools = 1)
+        : TestAppliance(ZEM_PROGRAMS) {
         const std::int64_t hosts = lpars < kLparsPerHost ? 1 : lpars / kLparsPerHost;
-        const auto outcome = run("appliance generate --hosts " + std::to_string(hosts) +
-                                 " --lpars " + std::to_string(lpars / hosts));
+        const auto outcome =
+            run("appliance generate --hosts " + std::to_string(hosts) + " --lpars " +
+                std::to_string(lpars / hosts) + " --pools " + std::to_string(pools));
         if (outcome.exit != 0) {
             throw std::runtime_error(outcome.err);
         }

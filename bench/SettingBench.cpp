@@ -5,33 +5,55 @@
 // made plainly in between, so that what else the machine does weighs on both. The counter
 // ours_percent is what visitors, model, provider and broker take of the whole, per_instance_us
 // the whole for one instance, and resident_KB what the process grew by for one while it worked.
+//
+// SettingsSplit does two parts of it again, alone: model_percent is what visitors and model take,
+// reading what the calls gave and building settings of it, and broker_percent what the object
+// manager takes to make the same instances. The rest is the provider's and the binding's.
 
 #include <benchmark/benchmark.h>
 
 #include <fstream>
+#include <memory>
 #include <string>
 
+#include "Broker.h"
 #include "DNXApiCaller.h"
 #include "GeneratedAppliance.h"
 #include "ProviderInBench.h"
+#include "VirtualSystemVisitor.h"
 
 namespace {
 
 using All = apiProp* (*)(const char* user, int level);
+using Hosts = zemCECVisitor;
 
-/// The classes, and what their enumeration asks besides hosts, partitions and profiles.
-constexpr struct {
+/// A class, and what its enumeration asks besides hosts, partitions and profiles: of the library,
+/// and of the visitor of hosts.
+struct Class {
     const char* name;
     All calls[2];
-} kClasses[] = {
-    {"ORXC_VirtualSystemSettingData", {nullptr, nullptr}},
-    {"ORXC_ProcessorRASettingData", {getAllCecProcessorCfg, getAllLparProcessorCfgs}},
-    {"ORXC_MemoryRASettingData", {getAllCecMemoryCfg, getAllLparMemoryCfgs}},
-    {"ORXC_IOSlotAdapterRASettingData", {getAllIoSlots, nullptr}},
-    {"ORXC_EthernetAdapterRASettingData", {getAllLparVirtualEthernet, nullptr}},
-    {"ORXC_SCSIAdapterRASettingData", {getAllLparVirtualScsi, nullptr}},
-    {"ORXC_SerialAdapterRASettingData", {getAllLparVirtualSerial, nullptr}},
+    int type;
+    int (Hosts::*ofHosts)(const zemString& userName, int level);
+    int (Hosts::*ofPartitions)(const zemString& userName, const zemString& lparid, int level);
 };
+
+// clang-format off
+constexpr Class kClasses[] = {
+    {"ORXC_VirtualSystemSettingData", {nullptr, nullptr}, VISITOR_TYPE_VSSD, nullptr, nullptr},
+    {"ORXC_ProcessorRASettingData", {getAllCecProcessorCfg, getAllLparProcessorCfgs}, VISITOR_TYPE_RASD_PROC,
+     &Hosts::initializeProcessorLevelSys, &Hosts::initializeProcessorLevelLpar},
+    {"ORXC_MemoryRASettingData", {getAllCecMemoryCfg, getAllLparMemoryCfgs}, VISITOR_TYPE_RASD_MEM,
+     &Hosts::initializeMemoryLevelSys, &Hosts::initializeMemoryLevelLpar},
+    {"ORXC_IOSlotAdapterRASettingData", {getAllIoSlots, nullptr}, VISITOR_TYPE_RASD_IOSLOT,
+     nullptr, &Hosts::initializeIOSlotLevelLpar},
+    {"ORXC_EthernetAdapterRASettingData", {getAllLparVirtualEthernet, nullptr}, VISITOR_TYPE_RASD_VETH,
+     nullptr, &Hosts::initializeEthernetAdapterLevelLpar},
+    {"ORXC_SCSIAdapterRASettingData", {getAllLparVirtualScsi, nullptr}, VISITOR_TYPE_RASD_VSCSI,
+     nullptr, &Hosts::initializeSCSIAdapterLevelLpar},
+    {"ORXC_SerialAdapterRASettingData", {getAllLparVirtualSerial, nullptr}, VISITOR_TYPE_RASD_VSERIAL,
+     nullptr, &Hosts::initializeSerialAdapterLevelLpar},
+};
+// clang-format on
 
 void askPlainly(const All (&calls)[2]) {
     constexpr int kEverything = 2;
@@ -39,6 +61,63 @@ void askPlainly(const All (&calls)[2]) {
         if (call != nullptr) {
             zemAutoReleaseApiProp(call("", kEverything));
         }
+    }
+}
+
+/// Reads and builds the settings of a class as its provider does, and drops them.
+void buildAlone(const Class& row) {
+    constexpr int kLevel = Hosts::Level_All;
+    zemVirtualizationManager manager;
+    const std::unique_ptr<Hosts> hosts(manager.createCECVisitor());
+    hosts->initialize("", false, kLevel);
+    hosts->initializeLparResource("", "", kLevel, VISITOR_TYPE_LPAR);
+    hosts->initializeLparProfile("", "", kLevel);
+    if (row.ofHosts != nullptr) {
+        (*hosts.*row.ofHosts)("", kLevel);
+    }
+    if (row.ofPartitions != nullptr) {
+        (*hosts.*row.ofPartitions)("", "", kLevel);
+    }
+    for (int i = 0; i < hosts->size(); ++i) {
+        zemCEC& host = *hosts->getData(i);
+        zemVSSDVisitor systems(&host, row.name);
+        for (int j = 0; j < host.getLPARs().size(); ++j) {
+            zemLPAR& lpar = *host.getLPARs().getElementAt(j);
+            for (int k = 0; k < lpar.getLparProfile().size(); ++k) {
+                const std::unique_ptr<zemVSSD> stored(
+                    systems.getProfileVSSD(&lpar, lpar.getLparProfile().getElementAt(k), row.type));
+                if (k == 0) {
+                    std::unique_ptr<zemVSSD>(systems.getStateVSSD(&lpar, *stored));
+                }
+            }
+        }
+    }
+}
+
+/// Has the broker make the instances of an answer, value by value, and return them.
+void makeAlone(cimom::Server& server, const cimom::Reply& reply) {
+    const cimom::RequestScope scope(server);
+    const CMPIBroker* const mb = server.broker();
+    cimom::Broker& broker = cimom::Broker::of(mb);
+    cimom::Reply again;
+    CMPIResult* const result = scope.result(again);
+    const auto hand = [&](auto* object, auto entry, const cimom::NamedValues& values) {
+        for (const auto& [name, value] : values) {
+            const bool isText = value.type() == CMPI_string && !value.isNull();
+            const CMPIData data = isText ? CMPIData() : cimom::makeData(broker, value);
+            const void* const text = isText ? value.text().c_str() : nullptr;
+            (object->ft->*entry)(object, name.c_str(),
+                                 isText ? static_cast<const CMPIValue*>(text) : &data.value,
+                                 isText ? CMPIType{CMPI_chars} : data.type);
+        }
+    };
+    for (const cimom::Instance& each : reply.instances) {
+        CMPIObjectPath* const path = mb->eft->newObjectPath(mb, each.path.nameSpace.c_str(),
+                                                            each.path.className.c_str(), nullptr);
+        hand(path, &CMPIObjectPathFT::addKey, each.path.keys);
+        CMPIInstance* const instance = mb->eft->newInstance(mb, path, nullptr);
+        hand(instance, &CMPIInstanceFT::setProperty, each.properties);
+        result->ft->returnInstance(result, instance);
     }
 }
 
@@ -56,7 +135,36 @@ double mostResident(bool forget) {
     return 0;
 }
 
-void Settings(benchmark::State& state) {
+/// What the settings of all classes take together, in seconds.
+struct Times {
+    double whole = 0;
+    double platform = 0;  ///< the library's calls
+    double model = 0;     ///< these with visitors and model
+    double broker = 0;
+};
+
+/// Enumerates all classes once, and does parts of it again for @p isSplit.
+/// @return how many instances there are
+std::size_t enumerate(cimom::Server& server, bool isSplit, Times& times) {
+    std::size_t instances = 0;
+    for (const Class& row : kClasses) {
+        cimom::Reply reply;
+        times.whole += seconds([&] {
+            reply = server.enumInstances({}, {"root/cimv2", row.name, {}});
+        });
+        instances += reply.instances.size();
+        times.platform += seconds([&] { askPlainly(row.calls); });
+        if (isSplit) {
+            times.model += seconds([&] { buildAlone(row); });
+            times.broker += seconds([&] { makeAlone(server, reply); });
+        }
+        times.whole += seconds([&] { reply = {}; });
+    }
+    return instances;
+}
+
+template <bool isSplit>
+void settings(benchmark::State& state) {
     const GeneratedAppliance appliance(state.range(0));
     const OutputTo quiet("/dev/null");
     cimom::Options options;
@@ -64,38 +172,44 @@ void Settings(benchmark::State& state) {
     cimom::Server server(options);
     server.loadRegistration(ZEM_REGISTRATION);
     const double before = mostResident(true);
-    double wholeInAll = 0;
-    double platformInAll = 0;
+    Times all;
     std::size_t instances = 0;
     for (auto _ : state) {
-        double whole = 0;
-        for (const auto& row : kClasses) {
-            whole += seconds([&] {
-                cimom::Request request;
-                const cimom::Reply reply =
-                    server.enumInstances(request, {"root/cimv2", row.name, {}});
-                instances += reply.instances.size();
-            });
-            platformInAll += seconds([&] { askPlainly(row.calls); });
-        }
-        state.SetIterationTime(whole);
-        wholeInAll += whole;
+        const double earlier = all.whole;
+        instances += enumerate(server, isSplit, all);
+        state.SetIterationTime(all.whole - earlier);
     }
     if (instances < static_cast<std::size_t>(state.range(0))) {
         state.SkipWithError("not all are there");
         return;
     }
     const auto each = static_cast<double>(instances);
-    state.counters["ours_percent"] = 100 * (wholeInAll - platformInAll) / wholeInAll;
-    state.counters["per_instance_us"] = 1e6 * wholeInAll / each;
+    const auto percent = [&all](double time) { return 100 * time / all.whole; };
+    state.counters["ours_percent"] = percent(all.whole - all.platform);
+    if (isSplit) {
+        state.counters["model_percent"] = percent(all.model - all.platform);
+        state.counters["broker_percent"] = percent(all.broker);
+        return;
+    }
+    state.counters["per_instance_us"] = 1e6 * all.whole / each;
     state.counters["resident_KB"] =
         (mostResident(false) - before) * static_cast<double>(state.iterations()) / each;
 }
+
+void Settings(benchmark::State& state) { settings<false>(state); }
+void SettingsSplit(benchmark::State& state) { settings<true>(state); }
 
 BENCHMARK(Settings)
     ->Arg(100)
     ->Arg(1000)
     ->Arg(10000)
+    ->Iterations(1)
+    ->Repetitions(1)
+    ->UseManualTime()
+    ->Unit(benchmark::kMillisecond);
+
+BENCHMARK(SettingsSplit)
+    ->Arg(1000)
     ->Iterations(1)
     ->Repetitions(1)
     ->UseManualTime()

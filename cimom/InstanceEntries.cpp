@@ -7,12 +7,17 @@ namespace cimom {
 
 namespace {
 
-const CimProperty* declared(const InstanceBody& body, const std::string& name) {
+const CimProperty* declared(const InstanceBody& body, std::string_view name) {
     return body.cls ? body.cls->properties.find(name) : nullptr;
 }
 
-bool passesFilter(const InstanceBody& body, const std::string& name) {
-    return !body.filter || body.filter->count(name) != 0;
+bool passesFilter(const InstanceBody& body, std::string_view name) {
+    return !body.filter || body.filter->count(std::string(name)) != 0;
+}
+
+// Without its class, an instance has the keys of its path.
+bool isKey(const InstanceBody& body, const CimProperty* element, std::string_view name) {
+    return body.cls ? element && element->isKey : body.value.path.keys.find(name) != nullptr;
 }
 
 // An embedded instance may also come as a text that shows it.
@@ -22,27 +27,26 @@ bool typeAgrees(const CimProperty& element, const Value& value) {
            (wanted == CMPI_instanceA && value.type() == CMPI_stringA);
 }
 
-// The value as the class declares it; @p element is null when it has no such property.
-Value checked(bool lean, const InstanceBody& body, const CimProperty* element,
-              const std::string& name, Value value) {
+// Makes the value one that the class declares; @p element is null when it has no such property.
+void check(bool lean, const CimClass& cls, const CimProperty* element, std::string_view name,
+           Value& value) {
     if (!element) {
         if (lean) {
-            return value;
+            return;
         }
         throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY,
-                      "class " + body.cls->name + " has no property " + name);
+                      "class " + cls.name + " has no property " + std::string(name));
     }
     value.retypeNull(typeOf(*element));
-    if (lean || typeAgrees(*element, value)) {
-        return value;
+    if (!lean && !typeAgrees(*element, value)) {
+        throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, "property " + cls.name + "." + std::string(name) +
+                                                     " is " + typeName(typeOf(*element)) +
+                                                     ", not " + typeName(value.type()));
     }
-    throw Failure(CMPI_RC_ERR_TYPE_MISMATCH, "property " + body.cls->name + "." + name + " is " +
-                                                 typeName(typeOf(*element)) + ", not " +
-                                                 typeName(value.type()));
 }
 
 // Keys that are as they were stay shared with the path that they came from.
-void setKey(InstanceBody& body, const std::string& name, const Value& value) {
+void setKey(InstanceBody& body, std::string_view name, const Value& value) {
     const Value* present = body.value.path.keys.find(name);
     if (!present || *present != value) {
         body.value.path.keys.set(name, value);
@@ -103,8 +107,8 @@ void setObjectPath(InstanceBody& body, Broker& broker, const CMPIObjectPath* pat
 
 // Keys stay by the class, as the standard has come to say, and the key list means nothing. In small
 // brokers they stay by that list, and what it lacks is missing in the path too.
-bool stays(const InstanceBody& body, const Broker& broker, const std::string& name) {
-    return passesFilter(body, name) || (!broker.lean() && isKey(body, name));
+bool stays(const InstanceBody& body, const Broker& broker, std::string_view name, bool isKey) {
+    return passesFilter(body, name) || (!broker.lean() && isKey);
 }
 void setPropertyFilter(InstanceBody& body, Broker& broker, const char** properties,
                        const char** keys) {
@@ -124,7 +128,7 @@ void setPropertyFilter(InstanceBody& body, Broker& broker, const char** properti
     const auto keep = [&](NamedValues& values) {
         NamedValues kept;
         for (const auto& [name, value] : values) {
-            if (stays(body, broker, name)) {
+            if (stays(body, broker, name, isKey(body, name))) {
                 kept.set(name, value);
             }
         }
@@ -138,13 +142,8 @@ void setPropertyFilter(InstanceBody& body, Broker& broker, const char** properti
 
 }  // namespace
 
-// Without its class, an instance has the keys of its path.
-bool isKey(const InstanceBody& body, const std::string& name) {
-    if (!body.cls) {
-        return body.value.path.keys.find(name) != nullptr;
-    }
-    const CimProperty* element = declared(body, name);
-    return element && element->isKey;
+bool isKey(const InstanceBody& body, std::string_view name) {
+    return isKey(body, declared(body, name), name);
 }
 
 InstanceBody instanceBody(Broker& broker, Instance value) {
@@ -159,21 +158,23 @@ InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path) {
     }
     if (body.cls) {
         body.value.properties = broker.lean() ? body.cls->blank() : body.cls->defaults();
+        body.value.properties.reserve(body.cls->properties.size() / 2);  // what most are given
     }
     takeKeys(body);
     return body;
 }
 
-void setInstanceProperty(Broker& broker, InstanceBody& body, const std::string& name, Value value) {
+void setInstanceProperty(Broker& broker, InstanceBody& body, std::string_view name, Value value) {
     const CimProperty* element = declared(body, name);
     if (body.cls) {
-        value = checked(broker.lean(), body, element, name, std::move(value));
+        check(broker.lean(), *body.cls, element, name, value);
     }
     // The path of an instance is made of its key properties.
-    if (!stays(body, broker, name)) {
+    const bool key = isKey(body, element, name);
+    if (!stays(body, broker, name, key)) {
         return;
     }
-    if (!value.isNull() && isKey(body, name)) {
+    if (!value.isNull() && key) {
         setKey(body, name, value);
     }
     body.value.properties.set(name, std::move(value));

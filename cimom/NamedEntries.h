@@ -11,9 +11,9 @@ inline NamedValues& namedIn(NamedValues& body) { return body; }
 inline NamedValues& namedIn(ObjectPath& body) { return body.keys; }
 inline NamedValues& namedIn(InstanceBody& body) { return body.value.properties; }
 
-inline bool isKey(const NamedValues&, const std::string&) { return false; }
-inline bool isKey(const ObjectPath&, const std::string&) { return true; }
-bool isKey(const InstanceBody& body, const std::string& name);  // InstanceEntries.cpp
+inline bool isKey(const NamedValues&, std::string_view) { return false; }
+inline bool isKey(const ObjectPath&, std::string_view) { return true; }
+bool isKey(const InstanceBody& body, std::string_view name);  // InstanceEntries.cpp
 
 /// The C form of an entry of a C object.
 template <class C>

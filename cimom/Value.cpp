@@ -6,6 +6,7 @@
 #include <cctype>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <ctime>
 #include <limits>
 #include <new>
@@ -112,14 +113,22 @@ bool isReal(CMPIType type) { return type == CMPI_real32 || type == CMPI_real64; 
 // -- names ----------------------------------------------------------------------------------
 
 bool sameName(std::string_view a, std::string_view b) {
-    return std::equal(a.begin(), a.end(), b.begin(), b.end(),
-                      [](char x, char y) { return x == y || lower(x) == lower(y); });
+    return a == b || std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                                [](char x, char y) { return x == y || lower(x) == lower(y); });
 }
 
 std::size_t NameHash::operator()(std::string_view name) const {
-    std::uint64_t hash = 14695981039346656037u;  // FNV-1a
-    for (char c : name) {
-        hash = (hash ^ static_cast<unsigned char>(lower(c))) * 1099511628211u;
+    // Eight letters at a time, without the bit in which the two cases differ: every property that a
+    // provider sets is looked up in its class.
+    constexpr std::uint64_t kCases = 0x2020202020202020, kSpread = 0x9E3779B97F4A7C15;
+    std::uint64_t hash = name.size();
+    while (!name.empty()) {
+        std::uint64_t letters = 0;
+        const std::size_t count = std::min(name.size(), sizeof letters);
+        std::memcpy(&letters, name.data(), count);
+        hash = (hash ^ (letters | kCases)) * kSpread;
+        hash ^= hash >> 32;
+        name.remove_prefix(count);
     }
     return static_cast<std::size_t>(hash);
 }
@@ -251,7 +260,7 @@ Value Value::array(CMPIType elementType, Array elements) {
 
 Value::Value(const char* text) : m_type(CMPI_string) {
     if (text) {
-        m_data = std::string(text);
+        m_data.emplace<std::string>(text);
     }
 }
 Value::Value(std::string text) : m_data(std::move(text)), m_type(CMPI_string) {}
@@ -381,15 +390,14 @@ NamedValues::~NamedValues() {
     ::operator delete(m_block);
 }
 
-// Makes sure that nobody else has the block and that so many entries fit.
+// Whether nobody else has the block and so many entries fit.
+bool NamedValues::owns(std::size_t room) const {
+    return m_block && m_block->users.load(std::memory_order_acquire) == 1 && room <= m_block->room;
+}
+
+// Makes a block with room for so many, not less than there are.
 void NamedValues::makeOwn(std::size_t room) {
-    const bool own = m_block && m_block->users.load(std::memory_order_acquire) == 1;
-    if (own && room <= m_block->room) {
-        return;
-    }
-    if (room > size()) {
-        room *= 2;
-    }
+    const bool own = owns(0);
     NamedValues other;
     other.m_block = new (::operator new(sizeof(Block) + room * sizeof(Entry))) Block;
     other.m_block->room = static_cast<std::uint32_t>(room);
@@ -410,20 +418,33 @@ void NamedValues::makeOwn(std::size_t room) {
     std::swap(m_block, other.m_block);
 }
 
-void NamedValues::set(const std::string& name, Value value) {
+void NamedValues::reserve(std::size_t count) {
+    if (count > size() && !owns(count)) {
+        makeOwn(count);
+    }
+}
+
+void NamedValues::set(std::string_view name, Value value) {
     const std::size_t at = indexOf(name);
     if (at == size()) {
-        return add(name, std::move(value));
+        return append(name, value);
     }
-    makeOwn(size());
+    if (!owns(size())) {
+        makeOwn(size());
+    }
     m_block->nesting = std::max(m_block->nesting, value.nesting());
     m_block->entries()[at].value = std::move(value);
 }
 
-void NamedValues::add(const std::string& name, Value value) {
-    makeOwn(size() + 1);
+void NamedValues::add(std::string_view name, Value value) { append(name, value); }
+
+void NamedValues::append(std::string_view name, Value& value) {
+    if (!owns(size() + 1)) {
+        makeOwn(2 * (size() + 1));
+    }
     const unsigned nesting = value.nesting();
-    Entry* const entry = new (m_block->entries() + m_block->size) Entry{name, std::move(value)};
+    Entry* const entry =
+        new (m_block->entries() + m_block->size) Entry{std::string(name), std::move(value)};
     ++m_block->size;
     m_block->nesting = std::max(m_block->nesting, nesting);
     if (m_block->index) {
@@ -431,13 +452,13 @@ void NamedValues::add(const std::string& name, Value value) {
     }
 }
 
-const Value* NamedValues::find(const std::string& name) const {
+const Value* NamedValues::find(std::string_view name) const {
     const std::size_t at = indexOf(name);
     return at == size() ? nullptr : &begin()[at].value;
 }
 
 // The number of entries when there is none of that name.
-std::size_t NamedValues::indexOf(const std::string& name) const {
+std::size_t NamedValues::indexOf(std::string_view name) const {
     if (m_block && m_block->index) {
         const auto found = m_block->index->find(name);
         return found == m_block->index->end() ? size() : found->second;

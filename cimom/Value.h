@@ -184,13 +184,15 @@ public:
     }
     ~NamedValues();
 
+    /// Makes room for so many values in all.
+    void reserve(std::size_t count);
     /// Replaces the value of that name, or appends.
-    void set(const std::string& name, Value value);
+    void set(std::string_view name, Value value);
     /// Appends, even to a value of that name: what a client sends may be wrong, and small servers
     /// leave it to the provider to say so. find() and set() know the first.
-    void add(const std::string& name, Value value);
+    void add(std::string_view name, Value value);
     /// @return null when there is none; valid until the next change
-    const Value* find(const std::string& name) const;
+    const Value* find(std::string_view name) const;
 
     std::size_t size() const { return m_block ? m_block->size : 0; }
     /// The most that a value here has, or had before it was replaced.
@@ -216,8 +218,10 @@ private:
         std::uint32_t nesting = 0;
         std::unique_ptr<Index> index;
     };
+    bool owns(std::size_t room) const;
     void makeOwn(std::size_t room);
-    std::size_t indexOf(const std::string& name) const;
+    void append(std::string_view name, Value& value);
+    std::size_t indexOf(std::string_view name) const;
 
     Block* m_block = nullptr;
 };

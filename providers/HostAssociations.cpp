@@ -20,8 +20,8 @@ namespace {
 constexpr const char kHost[] = "ORXC_CEC_CS";
 constexpr const char kPartition[] = "ORXC_LPAR_CS";
 constexpr const char kConnection[] = "ORXC_HostConnection";
-
-constexpr const char kService[] = "ORXC_VirtualSystemManagementService";
+constexpr const char kService[] = "CIM_Service";
+constexpr const char kManagementService[] = "ORXC_VirtualSystemManagementService";
 
 constexpr const char kHostedPartition[] = "ORXC_HostedPartition";
 constexpr const char kHostedService[] = "ORXC_HostedService";
@@ -38,7 +38,7 @@ zemString hostOf(const CmpiObjectPath& path) {
     if (isOfClass(path, kConnection)) {
         return ConnectionProvider::hostOf(path.getKey("InstanceID").getString().charPtr()).c_str();
     }
-    if (isOfClass(path, kService)) {
+    if (isOfClass(path, kManagementService)) {
         return path.getKey("SystemName").getString().charPtr();
     }
     return zemDataTypeConvertManager::getMTMSByOP(path);
@@ -49,31 +49,19 @@ bool onOneHost(const CmpiObjectPath& a, const CmpiObjectPath& b) {
     return !host.isEmpty() && host == hostOf(b);
 }
 
-/// What there is of one class on a host: one class on each side, both asked of the server.
-class OnHost : public OneAssociation<zemNtoNAssociationProvider> {
-protected:
-    OnHost(const CmpiBroker& mb, const CmpiContext& ctx, const char* name, const char* association,
-           const char* dependent)
-        : CmpiBaseMI(mb, ctx),
-          OneAssociation(association, mb, ctx, name, association, kHost, dependent, "Antecedent",
-                         "Dependent", OP_ALLOps, "", "", "") {}
-
-    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
-                               const CmpiObjectPath& dependent) override {
-        return onOneHost(host, dependent);
-    }
-};
-
-class HostedPartition : public OnHost {
+/// Which host a partition runs on: one class on each side, both asked of the server.
+class HostedPartition : public OneAssociation<zemNtoNAssociationProvider> {
 public:
     HostedPartition(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), OnHost(mb, ctx, name, kHostedPartition, kPartition) {}
-};
+        : CmpiBaseMI(mb, ctx),
+          OneAssociation(kHostedPartition, mb, ctx, name, kHostedPartition, kHost, kPartition,
+                         "Antecedent", "Dependent", OP_ALLOps, "", "", "") {}
 
-class HostedService : public OnHost {
-public:
-    HostedService(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), OnHost(mb, ctx, name, kHostedService, kService) {}
+protected:
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& partition) override {
+        return onOneHost(host, partition);
+    }
 };
 
 /// Which connections lead to a host: a row, to which further pairs of classes can be added. Paths
@@ -108,7 +96,23 @@ public:
 protected:
     bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
                                const CmpiObjectPath& part) override {
-        return !isOfClass(part, kHost) && !isOfClass(part, kService) && onOneHost(host, part);
+        return !isOfClass(part, kHost) && onOneHost(host, part) && !part.classPathIsA(kService);
+    }
+};
+
+/// Which services a host has: of whatever class, by their base.
+class HostedService : public OneAssociation<zemMultiNtoNAssociationProvider> {
+public:
+    HostedService(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx),
+          OneAssociation(kHostedService, mb, ctx, name, kHostedService,
+                         "ORXC_CEC_CS\0CIM_Service\0", "Antecedent", "Dependent", OP_ALLOps, "", "",
+                         "") {}
+
+protected:
+    bool isValidateAssociation(const CmpiContext&, const CmpiObjectPath& host,
+                               const CmpiObjectPath& service) override {
+        return onOneHost(host, service);
     }
 };
 
@@ -168,8 +172,8 @@ private:
 }  // namespace
 
 ZEM_PROVIDER(ORXC_HostedPartitionProvider, HostedPartition)
-ZEM_PROVIDER(ORXC_HostedServiceProvider, HostedService)
 ZEM_PROVIDER(ORXC_ConnectedHostProvider, ConnectedHost)
 ZEM_PROVIDER(ORXC_HostComponentProvider, HostComponent)
+ZEM_PROVIDER(ORXC_HostedServiceProvider, HostedService)
 ZEM_PROVIDER(ORXC_ReachedHostProvider, ReachedHost)
 ZEM_PROVIDER(ORXC_PartitionConnectionProvider, PartitionConnection)

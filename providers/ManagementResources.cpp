@@ -204,7 +204,7 @@ ManagementService::Answer ManagementService::modifyProfile(const Call& call,
         if (shown == nullptr || stored == nullptr) {
             return InvalidParameter;
         }
-        const Setting setting = {one.id.c_str(), *present.shown, shown->getData()};
+        const Setting setting = {shown->getData()->m_InstanceID, *present.shown, shown->getData()};
         isAsked |= changeResource(
             {SettingUse::ChangeProfile, *one.said, one.row, call.path, setting}, system, *stored);
         paths.push_back(settingPath(call.path, one.row, one.id.c_str()));
@@ -246,7 +246,7 @@ ManagementService::Answer ManagementService::modifyState(const Call& call,
             return InvalidState;  // it is not activated
         }
         const std::unique_ptr<zemRASD> now(shown->clone());
-        const Setting setting = {one.id.c_str(), *present.shown, shown->getData()};
+        const Setting setting = {shown->getData()->m_InstanceID, *present.shown, shown->getData()};
         if (changeResource({SettingUse::ChangeState, *one.said, one.row, call.path, setting},
                            *present.shown, *now)) {
             addSteps(call.client, meant.system.owner, *shown, *now, steps);

@@ -181,9 +181,12 @@ ManagementService::Answer ManagementService::defineSystem(const Call& call) cons
     };
     const zemVSSD usual = blank();
     zemVSSD system = blank();
-    takeSetting(
-        {SettingUse::Define, systems[0].instance, systems[0].row, call.path, {"", usual, nullptr}},
-        system, nullptr);
+    takeSetting({SettingUse::Define,
+                 systems[0].instance,
+                 systems[0].row,
+                 call.path,
+                 {usual.getInstanceID(), usual, nullptr}},
+                system, nullptr);
     for (const Sent& each : resources) {
         addResource(each, SettingUse::Define, call.path, system);
     }
@@ -232,7 +235,7 @@ ManagementService::Answer ManagementService::modifySystem(const Call& call) cons
     // of a partition only what is asked for goes to the tool; of a profile all goes
     const SettingUse use = id.isState ? SettingUse::ChangeState : SettingUse::ChangeProfile;
     zemVSSD changed = id.isState ? zemVSSD(call.host.c_str(), id.system.c_str()) : *present.shown;
-    const Setting shown = {id.system.c_str(), *present.shown, nullptr};
+    const Setting shown = {present.shown->getInstanceID(), *present.shown, nullptr};
     if (!takeSetting({use, systems[0].instance, systems[0].row, call.path, shown}, changed,
                      nullptr)) {
         return Done;

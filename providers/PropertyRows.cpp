@@ -240,6 +240,11 @@ std::string hostName(const zemRecordType& host) {
            static_cast<const char*>(host[Host::ATTR_SERIAL_NUM]);
 }
 
+std::string keyOf(const CmpiObjectPath& path, const char* name) {
+    const CmpiData key = zemBaseProvider::getKeyBinding(path, name);
+    return key.isNotFound() || key.isNullValue() ? "" : key.getString().charPtr();
+}
+
 void listSystemKeys(CmpiArray& keys) {
     zemBaseProvider::setText(keys, 0, "CreationClassName");
     zemBaseProvider::setText(keys, 1, "Name");
@@ -254,19 +259,26 @@ CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
 }
 
 CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties) {
-    CmpiInstance instance(path);
     const unsigned count = path.getKeyCount();
     std::vector<CmpiString> names(count);
-    std::vector<CmpiData> values;
-    std::vector<const char*> keys;
+    Keys keys;
     for (unsigned i = 0; i < count; ++i) {
-        values.push_back(path.getKey(static_cast<int>(i), &names[i]));
-        keys.push_back(names[i].charPtr());
+        const CmpiData value = path.getKey(static_cast<int>(i), &names[i]);
+        keys.emplace_back(names[i].charPtr(), value);
     }
-    keys.push_back(nullptr);
+    return newInstance(path, keys, properties);
+}
+
+CmpiInstance newInstance(const CmpiObjectPath& path, const Keys& keys, const char** properties) {
+    CmpiInstance instance(path);
     if (properties != nullptr && *properties != nullptr) {
+        std::vector<const char*> names;
+        for (const auto& key : keys) {
+            names.push_back(key.first);
+        }
+        names.push_back(nullptr);
         try {
-            instance.setPropertyFilter(properties, keys.data());
+            instance.setPropertyFilter(properties, names.data());
         } catch (const CmpiStatus& status) {
             // a server without filters leaves the choice to its clients
             if (status.rc() != CMPI_RC_ERR_NOT_SUPPORTED) {
@@ -274,8 +286,8 @@ CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties) {
             }
         }
     }
-    for (unsigned i = 0; i < count; ++i) {
-        instance.setProperty(keys[i], values[i]);
+    for (const auto& [name, value] : keys) {
+        instance.setProperty(name, value);
     }
     return instance;
 }

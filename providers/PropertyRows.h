@@ -62,6 +62,9 @@ bool isUnknownObject(const zemException& failure);
 /// The key of the host that a qyplat host record describes.
 std::string hostName(const zemRecordType& host);
 
+/// The text of a key; empty without it.
+std::string keyOf(const CmpiObjectPath& path, const char* name);
+
 /// Hosts and partitions have the keys CreationClassName, which is their class, and Name: their
 /// list, and a path with both, in the namespace of @p near.
 void listSystemKeys(CmpiArray& keys);
@@ -73,6 +76,10 @@ CmpiObjectPath systemPath(const CmpiObjectPath& near, const char* className,
 /// told of a property that nobody read.
 /// @param properties  as for attributesFor()
 CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties);
+
+/// The same for who has the keys at hand, and need not have them read from the path.
+using Keys = std::vector<std::pair<const char*, CmpiData>>;
+CmpiInstance newInstance(const CmpiObjectPath& path, const Keys& keys, const char** properties);
 
 /// An argument of a method; null when it was not given, in whichever way the server says so.
 CmpiData argumentOf(const CmpiArgs& in, const char* name);

@@ -156,7 +156,8 @@ zemRASD* resourceOf(zemVSSD& system, const SettingClass& row, const std::string&
 void addResource(const Sent& sent, SettingUse use, const CmpiObjectPath& near, zemVSSD& system) {
     const std::unique_ptr<zemRASD> blank(newResource(sent.row));
     std::unique_ptr<zemRASD> resource(newResource(sent.row));
-    const Setting shown = {"", system, blank->getData()};
+    const zemString none;
+    const Setting shown = {none, system, blank->getData()};
     takeSetting({use, sent.instance, sent.row, near, shown}, system, resource->getData());
     settleAmounts(*blank->getData(), *resource);
     system.addRASD(resource.release());

@@ -2,6 +2,8 @@
 
 #include <algorithm>
 #include <stdexcept>
+#include <utility>
+#include <vector>
 
 #include "DataTypeConvertUtils.h"
 #include "PropertyRows.h"
@@ -70,21 +72,12 @@ std::optional<SettingId> settingIdOf(const SettingClass& row, const std::string&
 
 namespace {
 
-/// The text of a key; empty without it.
-std::string keyOf(const CmpiObjectPath& path, const char* name) {
-    const CmpiData key = zemBaseProvider::getKeyBinding(path, name);
-    return key.isNotFound() || key.isNullValue() ? "" : key.getString().charPtr();
-}
-
-/// The profile of this name; null without it.
-zemPartitionProfileConfiguration* profileOf(zemLPAR& lpar, const zemString& name) {
-    for (int i = 0; i < lpar.getLparProfile().size(); ++i) {
-        zemPartitionProfileConfiguration* const profile = lpar.getLparProfile().getElementAt(i);
-        if (profile->getProfileName() == name) {
-            return profile;
-        }
-    }
-    return nullptr;
+/// The settings of the profile of this name; null without it.
+zemVSSD* systemOf(const std::vector<std::unique_ptr<zemVSSD>>& stored, const zemString& name) {
+    const auto found = std::find_if(stored.begin(), stored.end(), [&](const auto& system) {
+        return system->getProfileName() == name;
+    });
+    return found == stored.end() ? nullptr : found->get();
 }
 
 }  // namespace
@@ -156,16 +149,21 @@ void readSettings(const CmpiContext& context, const SettingOwner& whose,
         zemVSSDVisitor systems(&host, classes.front()->name);
         for (int j = 0; j < host.getLPARs().size(); ++j) {
             zemLPAR& lpar = *host.getLPARs().getElementAt(j);
-            // one that was never activated has no current profile, and starts with its default
-            const zemString current = lpar.getCurrentProfileName();
-            zemPartitionProfileConfiguration* const profile =
-                profileOf(lpar, current.isEmpty() ? lpar.getDefaultProfileName() : current);
-            if (profile != nullptr) {
-                sink(host, std::unique_ptr<zemVSSD>(systems.getStateVSSD(&lpar, profile, type)));
+            const zemDynamicArray<zemPartitionProfileConfiguration>& profiles =
+                lpar.getLparProfile();
+            std::vector<std::unique_ptr<zemVSSD>> stored(static_cast<std::size_t>(profiles.size()));
+            for (int k = 0; k < profiles.size(); ++k) {
+                stored[static_cast<std::size_t>(k)].reset(
+                    systems.getProfileVSSD(&lpar, profiles[k], type));
             }
-            for (int k = 0; k < lpar.getLparProfile().size(); ++k) {
-                sink(host, std::unique_ptr<zemVSSD>(systems.getProfileVSSD(
-                               &lpar, lpar.getLparProfile().getElementAt(k), type)));
+            // one that was never activated has no current profile, and starts with its default
+            const zemString& current = lpar.getCurrentProfileName();
+            if (zemVSSD* const running =
+                    systemOf(stored, current.isEmpty() ? lpar.getDefaultProfileName() : current)) {
+                sink(host, std::unique_ptr<zemVSSD>(systems.getStateVSSD(&lpar, *running)));
+            }
+            for (auto& system : stored) {
+                sink(host, std::move(system));
             }
         }
     }
@@ -236,7 +234,8 @@ void SettingProvider::tell(zemVSSD& system, const Sink& sink) const {
     }
     const zemDynamicArray<zemRASD> resources = system.getRASD(m_class.resourceType);
     for (int i = 0; i < resources.size(); ++i) {
-        sink({resources[i]->getInstanceID(true, &system), system, resources[i]->getData()});
+        const zemRASDCommData* const data = resources[i]->getData();
+        sink({data->m_InstanceID, system, data});
     }
 }
 
@@ -247,15 +246,10 @@ SettingOwner SettingProvider::scopeOf(const CmpiObjectPath& asked) const {
 
 CmpiInstance SettingProvider::makeInstance(const CmpiObjectPath& near, const char** properties,
                                            const Setting& setting) const {
-    CmpiInstance instance = newInstance(settingPath(near, m_class, setting.id), properties);
+    const Keys keys = {{kKey, CmpiData(static_cast<const char*>(setting.id))}};
+    CmpiInstance instance = newInstance(settingPath(near, m_class, setting.id), keys, properties);
     showSetting(instance, m_class, properties, setting);
     return instance;
 }
 
 ZEM_PROVIDER(ORXC_VirtualSystemSettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_ProcessorRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_MemoryRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_IOSlotAdapterRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_EthernetAdapterRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_SCSIAdapterRASettingDataProvider, SettingProvider)
-ZEM_PROVIDER(ORXC_SerialAdapterRASettingDataProvider, SettingProvider)

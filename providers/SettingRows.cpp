@@ -13,6 +13,7 @@
 
 #include "BaseProvider.h"
 #include "PropertyRows.h"
+#include "ResourcePoolManager.h"
 
 /// What is set by a client's value.
 struct SettingTarget {
@@ -35,7 +36,8 @@ struct SettingRow {
     };
 
     const char* property;
-    bool (*read)(const Setting& setting, CmpiData& value);              ///< false: null
+    /// False: null. None where the library shows the property.
+    bool (*read)(const Setting& setting, CmpiData& value);
     bool (*write)(const CmpiData& value, const SettingTarget& target);  ///< false: unfit value
     unsigned when = Never;
 };
@@ -47,15 +49,6 @@ using Row = SettingRow;
 // How a datum becomes a value, and a value a datum. A datum is a getter of the system with its
 // setter, or a field of the resource. Empty texts and numbers beyond the property's type, as -1,
 // are null.
-
-template <class Owner, class Datum>
-decltype(auto) datumOf(Datum Owner::*datum, const Setting& setting) {
-    if constexpr (std::is_same_v<Owner, zemVSSD>) {
-        return std::invoke(datum, setting.system);
-    } else {
-        return std::invoke(datum, static_cast<const Owner&>(*setting.resource));
-    }
-}
 
 void setDatum(void (zemVSSD::*setter)(const zemString&), const SettingTarget& target,
               const zemString& value) {
@@ -153,53 +146,35 @@ std::optional<zemArray<int>> numbersIn(const CmpiData& value) {
     return numbers;
 }
 
-template <auto datum, auto set = datum, auto in = textIn>
+template <auto datum, auto set>
 constexpr Row text(const char* property, unsigned when) {
     return {property,
             [](const Setting& setting, CmpiData& value) {
-                return setText(datumOf(datum, setting), value);
+                return setText(std::invoke(datum, setting.system), value);
             },
-            taker<set, in>(), when};
+            taker<set, textIn>(), when};
 }
 
-template <class Number, auto datum, auto set = datum>
+template <class Number, auto datum, auto set>
 constexpr Row number(const char* property, unsigned when) {
     return {property,
             [](const Setting& setting, CmpiData& value) {
-                const std::int64_t told = datumOf(datum, setting);
+                const std::int64_t told = std::invoke(datum, setting.system);
                 value = CmpiData(static_cast<Number>(told));
                 return isOf<Number>(told);
             },
             taker<set, numberIn<Number>>(), when};
 }
 
-template <auto datum, auto set = datum>
+template <auto datum, auto set>
 constexpr Row flag(const char* property, unsigned when) {
     return {property,
             [](const Setting& setting, CmpiData& value) {
-                const int told = datumOf(datum, setting);
+                const int told = std::invoke(datum, setting.system);
                 value.setBoolean(static_cast<CMPIBoolean>(told > 0));
                 return told >= 0;
             },
             taker<set, flagIn>(), when};
-}
-
-template <auto datum>
-constexpr Row numbers(const char* property, unsigned when) {
-    return {property,
-            [](const Setting& setting, CmpiData& value) {
-                const zemArray<int>& told = datumOf(datum, setting);
-                CmpiArray list(static_cast<CMPICount>(told.size()), CMPI_uint16);
-                for (int i = 0; i < told.size(); ++i) {
-                    if (!isOf<CMPIUint16>(told[i])) {
-                        return false;
-                    }
-                    list[i] = CmpiData(static_cast<CMPIUint16>(told[i]));
-                }
-                value = CmpiData(list);
-                return told.size() > 0;
-            },
-            take<datum, numbersIn>, when};
 }
 
 bool showName(const Setting& setting, CmpiData& value) {
@@ -212,11 +187,6 @@ bool takeName(const CmpiData& value, const SettingTarget& target) {
     return target.use == SettingUse::ChangeProfile
                ? take<&zemVSSD::setProfileName, textIn>(value, target)
                : take<&zemVSSD::setLparName, textIn>(value, target);
-}
-
-bool showKey(const Setting& setting, CmpiData& value) {
-    value = CmpiData(CmpiString(setting.resource->getKey()));
-    return true;
 }
 
 bool showPartitionNumber(const Setting& setting, CmpiData& value) {
@@ -268,6 +238,9 @@ constexpr Row kSystemRows[] = {
 
 using Resource = zemRASDCommData;
 
+/// Units in which the tools count processors that a partition sees, and memory.
+constexpr int kWholeProcessor = 100, kMegabyte = 1024;
+
 /// What only processors and memory have in any amount, and from any pool.
 template <auto datum, auto in>
 bool takeAmount(const CmpiData& value, const SettingTarget& target) {
@@ -277,33 +250,29 @@ bool takeAmount(const CmpiData& value, const SettingTarget& target) {
            take<datum, in>(value, target);
 }
 
-template <auto datum, class Number>
-constexpr Row amount(const char* property, unsigned when) {
-    Row row = number<Number, datum>(property, when);
-    row.write = takeAmount<datum, numberIn<Number>>;
-    return row;
-}
-
-/// A quantity of memory, in the kilobytes of whole megabytes, or of processors, in hundredths: what
-/// the tools cannot take is refused, for it would read otherwise than it was written.
+/// A quantity of memory or processors: what the tools cannot take is refused, for it would read
+/// otherwise than it was written.
 /// @tparam unit  of processors
-template <auto datum, int unit>
-constexpr Row quantity(const char* property, unsigned when) {
-    Row row = number<CMPIUint64, datum>(property, when);
-    row.write = [](const CmpiData& value, const SettingTarget& target) {
-        constexpr int kMegabyte = 1024;
-        const bool isMemory = target.resource->m_ResourceType == zemRASDKinds::memory.resourceType;
-        const std::int64_t size = numberIn<CMPIUint64>(value).value_or(0);
-        return size % (isMemory ? kMegabyte : unit) == 0 &&
-               takeAmount<datum, numberIn<CMPIUint64>>(value, target);
-    };
-    return row;
+template <auto datum, int unit = 1>
+bool takeQuantity(const CmpiData& value, const SettingTarget& target) {
+    const bool isMemory = target.resource->m_ResourceType == zemRASDKinds::memory.resourceType;
+    const std::int64_t size = numberIn<CMPIUint64>(value).value_or(0);
+    return size % (isMemory ? kMegabyte : unit) == 0 &&
+           takeAmount<datum, numberIn<CMPIUint64>>(value, target);
 }
 
-constexpr Row poolId(const char* property, unsigned when) {
-    Row row = text<&Resource::m_PoolID>(property, when);
-    row.write = takeAmount<&Resource::m_PoolID, textIn>;
-    return row;
+bool showKey(const Setting& setting, CmpiData& value) {
+    value = CmpiData(CmpiString(setting.resource->getKey()));
+    return true;
+}
+
+bool showType(const Setting& setting, CmpiData& value) {
+    value = CmpiData(static_cast<CMPIUint16>(setting.resource->m_ResourceType));
+    return isOf<CMPIUint16>(setting.resource->m_ResourceType);
+}
+
+bool showUnits(const Setting& setting, CmpiData& value) {
+    return setText(setting.resource->m_AllocationUnits, value);
 }
 
 constexpr unsigned kNew = Row::Defining | Row::AddingToProfile | Row::AddingToState;
@@ -311,59 +280,62 @@ constexpr unsigned kOfProfile = Row::Defining | Row::AddingToProfile | Row::Chan
 constexpr unsigned kWhole = kNew | Row::ChangingProfile;
 constexpr unsigned kAnywhere = kWhole | Row::ChangingState;
 
-constexpr int kWholeProcessor = 100;
-
+using Data = zemRASDCommData;
 constexpr Row kResourceRows[] = {
     {"ElementName", showKey, nullptr, Row::Follows},
-    number<CMPIUint16, &Resource::m_ResourceType>("ResourceType", Row::Never),
-    poolId("PoolID", kWhole),
-    amount<&Resource::m_ConsumerVisibility, CMPIUint16>("ConsumerVisibility", kWhole),
-    number<CMPIUint16, &Resource::m_MappingBehavior>("MappingBehavior", Row::Follows),
-    text<&Resource::m_AllocationUnits>("AllocationUnits", Row::Never),
-    text<&Resource::m_AllocationUnits>("VirtualQuantityUnits", Row::Never),
-    quantity<&Resource::m_VirtualMinimum, kWholeProcessor>("VirtualMinimum", kWhole),
-    quantity<&Resource::m_VirtualQuantity, kWholeProcessor>("VirtualQuantity", kAnywhere),
-    quantity<&Resource::m_VirtualMaximum, kWholeProcessor>("VirtualMaximum", kWhole),
-    quantity<&Resource::m_Minimum, 1>("Minimum", kWhole),
-    quantity<&Resource::m_Reservation, 1>("Reservation", kAnywhere),
-    quantity<&Resource::m_Limit, 1>("Limit", kWhole),
-    amount<&Resource::m_Weight, CMPIUint32>("Weight", kAnywhere),
-    text<&Resource::m_Address>("Address", Row::Never),
-    flag<&Resource::m_AutomaticAllocation>("AutomaticAllocation", Row::Follows),
-    flag<&Resource::m_AutomaticDeallocation>("AutomaticDeallocation", Row::Follows),
-    number<CMPIUint8, &Resource::m_IsRequired>("IsRequired", kOfProfile),
+    {"ResourceType", showType, nullptr, Row::Never},
+    {"PoolID", nullptr, takeAmount<&Data::m_PoolID, textIn>, kWhole},
+    {"ConsumerVisibility", nullptr, takeAmount<&Data::m_ConsumerVisibility, numberIn<CMPIUint16>>,
+     kWhole},
+    {"MappingBehavior", nullptr, nullptr, Row::Follows},
+    {"IsVirtualized", nullptr, nullptr, Row::Follows},
+    {"AllocationUnits", showUnits, nullptr, Row::Never},
+    {"VirtualQuantityUnits", showUnits, nullptr, Row::Never},
+    {"VirtualMinimum", nullptr, takeQuantity<&Data::m_VirtualMinimum, kWholeProcessor>, kWhole},
+    {"VirtualQuantity", nullptr, takeQuantity<&Data::m_VirtualQuantity, kWholeProcessor>,
+     kAnywhere},
+    {"VirtualMaximum", nullptr, takeQuantity<&Data::m_VirtualMaximum, kWholeProcessor>, kWhole},
+    {"Minimum", nullptr, takeQuantity<&Data::m_Minimum>, kWhole},
+    {"Reservation", nullptr, takeQuantity<&Data::m_Reservation>, kAnywhere},
+    {"Limit", nullptr, takeQuantity<&Data::m_Limit>, kWhole},
+    {"Weight", nullptr, takeAmount<&Data::m_Weight, numberIn<CMPIUint32>>, kAnywhere},
+    {"Address", nullptr, nullptr, Row::Never},
+    {"AutomaticAllocation", nullptr, nullptr, Row::Follows},
+    {"AutomaticDeallocation", nullptr, nullptr, Row::Follows},
+    {"IsRequired", nullptr, take<&Data::m_IsRequired, numberIn<CMPIUint8>>, kOfProfile},
 };
 
 constexpr Row kProcessorRows[] = {
-    text<&Resource::m_SharingMode>("SharingMode", kAnywhere),
-    text<&zemProcessorRASD::zemProcessorRASDData::m_ProcCompatMode>("ProcCompatMode", kWhole),
+    {"SharingMode", nullptr, take<&Data::m_SharingMode, textIn>, kAnywhere},
+    {"ProcCompatMode", nullptr,
+     take<&zemProcessorRASD::zemProcessorRASDData::m_ProcCompatMode, textIn>, kWhole},
 };
 
 using Slot = zemIOSlotRASD::zemIOSlotRASDData;
 constexpr Row kSlotRows[] = {
-    text<&Slot::m_DRCIndex, &Slot::m_DRCIndex, wordIn>("DRCIndex", kNew),
-    numbers<&Slot::m_TaggedIOType>("TaggedIOType", kOfProfile),
+    {"DRCIndex", nullptr, take<&Slot::m_DRCIndex, wordIn>, kNew},
+    {"TaggedIOType", nullptr, take<&Slot::m_TaggedIOType, numbersIn>, kOfProfile},
 };
 
 using Ethernet = zemVETHRASD::zemVETHRASDData;
 constexpr Row kEthernetRows[] = {
-    number<CMPIUint16, &Ethernet::m_SlotID>("SlotID", kNew),
-    number<CMPIUint8, &Ethernet::m_IEEECompatible>("IEEECompatible", kWhole),
-    number<CMPIUint16, &Ethernet::m_PortVLANID>("PortVLANID", kWhole),
-    numbers<&Ethernet::m_AddVLANIDs>("AddVLANIDs", kWhole),
-    number<CMPIUint8, &Ethernet::m_TrunkPriority>("TrunkPriority", kWhole),
-    text<&Ethernet::m_vswitch>("VSwitch", kWhole),
+    {"SlotID", nullptr, take<&Ethernet::m_SlotID, numberIn<CMPIUint16>>, kNew},
+    {"IEEECompatible", nullptr, take<&Ethernet::m_IEEECompatible, numberIn<CMPIUint8>>, kWhole},
+    {"PortVLANID", nullptr, take<&Ethernet::m_PortVLANID, numberIn<CMPIUint16>>, kWhole},
+    {"AddVLANIDs", nullptr, take<&Ethernet::m_AddVLANIDs, numbersIn>, kWhole},
+    {"TrunkPriority", nullptr, take<&Ethernet::m_TrunkPriority, numberIn<CMPIUint8>>, kWhole},
+    {"VSwitch", nullptr, take<&Ethernet::m_vswitch, textIn>, kWhole},
 };
 
 using Remote = zemRemoteAdapterRASDData;
 constexpr Row kRemoteRows[] = {
-    number<CMPIUint16, &Remote::m_SlotID>("SlotID", kNew),
-    number<CMPIUint8, &Remote::m_VirtualAdapterType>("VirtualAdapterType", kWhole),
-    number<CMPIUint8, &Remote::m_RemoteClientFlag>("RemoteClientFlag", Row::Follows),
-    number<CMPIUint8, &Remote::m_RemoteClientSlotFlag>("RemoteClientSlotFlag", Row::Follows),
-    text<&Remote::m_RemoteVirtualSystemID, &Remote::m_RemoteVirtualSystemID, wordIn>(
-        "RemoteVirtualSystemID", kWhole),
-    number<CMPIUint16, &Remote::m_RemoteSlotID>("RemoteSlotID", kWhole),
+    {"SlotID", nullptr, take<&Remote::m_SlotID, numberIn<CMPIUint16>>, kNew},
+    {"VirtualAdapterType", nullptr, take<&Remote::m_VirtualAdapterType, numberIn<CMPIUint8>>,
+     kWhole},
+    {"RemoteClientFlag", nullptr, nullptr, Row::Follows},
+    {"RemoteClientSlotFlag", nullptr, nullptr, Row::Follows},
+    {"RemoteVirtualSystemID", nullptr, take<&Remote::m_RemoteVirtualSystemID, wordIn>, kWhole},
+    {"RemoteSlotID", nullptr, take<&Remote::m_RemoteSlotID, numberIn<CMPIUint16>>, kWhole},
 };
 
 using Hosts = zemCECVisitor;
@@ -405,14 +377,23 @@ std::string textOf(const CmpiData& value) {
     throw zemInvalidParameterException("SettingRows", "takeSetting", text.c_str());
 }
 
-/// Takes one property.
+/// The properties that have a value and are not at the default of their class.
+Said valuesOf(const CmpiInstance& instance, const SentSetting& sent) {
+    const auto asked = askedFor(instance, sent.near, sent.row.name, nullptr);
+    return Said(asked.begin(), asked.end());
+}
+
+/// What a client reads now.
+Said shownTo(const SentSetting& sent) {
+    CmpiInstance shown(zemBaseProvider::createObjectPath(sent.near, sent.row.name));
+    showSetting(shown, sent.row, nullptr, sent.shown);
+    return valuesOf(shown, sent);
+}
+
+/// Takes one property, which says something new.
 /// @return whether it asks for anything
 bool takeProperty(const SentSetting& sent, const SettingTarget& target, const Row& row,
                   const CmpiData& value) {
-    CmpiData shown;
-    if (row.read(sent.shown, shown) && textOf(shown) == textOf(value)) {
-        return false;
-    }
     const bool isNew = sent.use < SettingUse::ChangeProfile;
     if (isNew && (row.when & Row::Follows) != 0) {
         return false;
@@ -440,18 +421,27 @@ void showSetting(CmpiInstance& instance, const SettingClass& row, const char** p
     for (const SettingRows& rows : {row.rows, row.ownRows}) {
         for (const Row& each : rows) {
             CmpiData value;
-            if (zemBaseProvider::containsProperty(properties, each.property) &&
+            if (each.read != nullptr &&
+                zemBaseProvider::containsProperty(properties, each.property) &&
                 each.read(setting, value)) {
                 instance.setProperty(each.property, value);
             }
         }
     }
+    if (setting.resource != nullptr) {
+        zemAddRASDProperties(instance, properties, *setting.resource);
+    }
 }
 
 bool takeSetting(const SentSetting& sent, zemVSSD& system, zemRASDCommData* resource) {
-    const auto asked = askedFor(sent.said, sent.near, sent.row.name, nullptr);
-    Said said(asked.begin(), asked.end());
+    Said said = valuesOf(sent.said, sent);
     said.erase("InstanceID");  // says which settings these are, and nothing of new ones
+    for (const auto& [property, value] : shownTo(sent)) {
+        const auto found = said.find(property);
+        if (found != said.end() && textOf(found->second) == textOf(value)) {
+            said.erase(found);
+        }
+    }
     const SettingTarget target = {sent.use, system, resource};
     bool isAsked = false;
     for (const SettingRows& rows : {sent.row.rows, sent.row.ownRows}) {

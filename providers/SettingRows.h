@@ -1,6 +1,6 @@
-/// The properties of ORXC_VirtualSystemSettingData and of the six ORXC_...RASettingData, each with
-/// the datum of the model that it shows, and how a client sets that datum with an instance that it
-/// sends. One table serves both directions.
+/// The properties of ORXC_VirtualSystemSettingData and of the six ORXC_...RASettingData: how a
+/// client sets the datum of the model with an instance that it sends, and which datum each shows,
+/// but for those of resources that the library shows itself (zemAddRASDProperties).
 ///
 ///     const SettingClass* const row = settingClassNamed("ORXC_MemoryRASettingData");
 ///     showSetting(instance, *row, properties, {id, system, &rasd.m_Data});   // to a client
@@ -18,7 +18,7 @@
 
 /// One instance: the settings of a partition, or one of their resources.
 struct Setting {
-    zemString id;
+    const zemString& id;
     const zemVSSD& system;
     const zemRASDCommData* resource;  ///< null: the system itself
 };

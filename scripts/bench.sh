@@ -74,8 +74,13 @@ ROWS = [
     ("LookUp/100", "LookUpInMap/100", None, 0),
     ("LookUp/1000", "LookUpInMap/1000", None, 0),
     ("Adapters", "PlainFields", 3.0, 0),
+    ("EventDelay/manual_time", "AskATool/real_time", None, 0),
     ("Settings/10000/iterations:1/repeats:1/manual_time",
      "Settings/100/iterations:1/repeats:1/manual_time", 120.0, 0),
+    ("Pools/64/1000/iterations:1/repeats:1/manual_time",
+     "Pools/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
+    ("PoolTies/64/1000/iterations:1/repeats:1/manual_time",
+     "PoolTies/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
 ]
 # Counters: benchmark, counter, the most that it may be.
 COUNTERS = [
@@ -83,6 +88,7 @@ COUNTERS = [
     ("QyallocSplit/1000/manual_time", "ours_percent", 10),
     ("Initialize/1000/iterations:1/repeats:1/manual_time", "ours_percent", 10),
     ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 60),
+    ("EventDelay/manual_time", "median_ms", 25),
     ("Settings/10000/iterations:1/repeats:1/manual_time", "resident_KB", 8),
 ]
 TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}

@@ -9,7 +9,7 @@ say() { printf '== %s\n' "$*" >&2; }
 die() { printf 'error: %s\n' "$*" >&2; exit 1; }
 
 # what each group of work needs, by Debian package
-packages_build="g++ cmake ninja-build ccache pkg-config flex bison
+packages_build="g++ cmake ninja-build ccache pkg-config flex bison openjdk-17-jdk-headless
   libsqlite3-dev nlohmann-json3-dev libcli11-dev"
 packages_test="libgtest-dev"
 packages_bench="libbenchmark-dev libcsv-dev python3"

@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds, and shows a CIM request from end to end: an appliance, its
-# tool asked by hand, the same asked through CIM, what a partition runs with beside what its profile
-# says, a partition defined, its profile changed, started, changed by a job, moved to another host,
-# stopped and destroyed, and what a client reads when a thing is not there.
+# tool asked by hand, the same asked through CIM, the pools of a host, what a partition runs with
+# beside what its profile says, a partition defined, its profile changed, started, changed by a job,
+# moved to another host, stopped and destroyed, and what a client reads when a thing is not there.
 #
 #   scripts/demo.sh
 #
@@ -93,6 +93,16 @@ show 0 cimom gi "$host\"$mtms\""
 say "its partitions, by way of an association"
 show 0 cimom ain "$host\"$mtms\"" --assoc-class ORXC_HostedPartition
 
+say "its pools; who has processors from one of them, and how much may be asked for"
+show 0 cimom ain "$host\"$mtms\"" --assoc-class ORXC_HostedResourcePool
+pools=$(wc -l <"$said")
+pool="ORXC_ProcessorPool.InstanceID=\"ORX:3-1*$mtms\""
+show 0 cimom gi "$pool"
+show 0 cimom ain "$pool" --assoc-class ORXC_ResourceAllocationFromPool
+show 0 cimom ain "$pool" --assoc-class ORXC_ElementCapabilities
+show 0 cimom ai "$(cat "$said")" --assoc-class ORXC_SettingsDefineCapabilities \
+    --properties ElementName,VirtualQuantity,Reservation,Limit
+
 say "what a partition runs with, beside what its profile says"
 partition="ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"4*$mtms\""
 show 0 edalloc -r mem -o a --id 4 -q 256 -m "$mtms"     # not in the profile
@@ -171,5 +181,5 @@ show 5 cimom gi 'ORXC_Unknown.Name="1"'
 show 6 cimom gi "$host\"9999-ZZZ*0000000\""
 show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
-printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions by\nassociation, what one runs with beside its profile, the life of a partition, a move between hosts,\ntwo failures by name, one of them in German too.\n' \
-    "$hosts" "$partitions"
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions and\n%s pools by association, what a partition runs with beside its profile,\nthe life of a partition, a move between hosts, two failures by name, one of them in German too.\n' \
+    "$hosts" "$partitions" "$pools"

@@ -49,7 +49,10 @@ void zemLog::LogSysOut(const char* text) { writeLine(kPrefix, text); }
 
 void zemLog::LogPlain(const char* text) { writeLine("", text); }
 
-void zemLogLines::add(const char* text) {
+void zemLogLines::add(std::initializer_list<const char*> words, const char* text) {
+    for (const char* const word : words) {
+        m_lines += word;
+    }
     zemPutLogText(text, [this](const char* piece, size_t size) { m_lines.append(piece, size); });
     m_lines += '\n';
 }

@@ -1,4 +1,5 @@
-/// The number with which a text begins, read as strtol() does and held to the range of an int.
+/// The number with which a text begins, read as strtol() does and held to the range of an int; and
+/// the same with a point, whatever the locale.
 ///
 /// For numbers from outside: whatever stands there, the result is defined, and 0 says that there is
 /// no number. Functions without state; any thread may call them.
@@ -6,7 +7,9 @@
 #define NUMBER_TEXT_H
 
 #include <cctype>
+#include <charconv>
 #include <climits>
+#include <cmath>
 #include <cstdint>
 #include <string_view>
 
@@ -33,6 +36,16 @@ inline int zemNumberOf(std::string_view text) {
 
 /// The same of a text that ends with a NUL.
 inline int zemNumberOf(const char* text) { return zemNumberOf(std::string_view(text)); }
+
+/// Not NaN; infinite for "inf".
+inline double zemRealOf(std::string_view text) {
+    const std::size_t begin = text.find_first_not_of(" \t+");
+    double value = 0;
+    if (begin != std::string_view::npos) {
+        std::from_chars(text.data() + begin, text.data() + text.size(), value);
+    }
+    return std::isnan(value) ? 0 : value;
+}
 
 /// The number that a text is which consists of digits; -1, which no table lists, for any other.
 inline int zemWholeNumberOf(std::string_view text) {

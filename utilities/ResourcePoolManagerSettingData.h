@@ -1,20 +1,28 @@
 /// Setting data of resources, as CIM shows them in the class of each kind of resource.
 ///
-/// zemResourceRASettingData is the root, one class a kind stands below it, and two leaves a kind
-/// tell of one resource of a partition: what a profile defines, and what is running. A VSSD makes
-/// the leaves and owns them.
+/// zemResourceRASettingData is the root, one class a kind stands below it, and the leaves below
+/// those tell of two things:
 ///
-/// A leaf tells which resource it is: resource type, allocation units and instance ID. It holds no
-/// quantities.
+/// - what a partition may take from a pool: the least, the most, what it takes by default and the
+///   step, of dedicated and of shared resources (...DedicatedMIN to ...SharedINC). The capability
+///   of a pool makes these and owns them (ResourcePoolManagerCapabilities.h);
+/// - what a partition has of one resource: what a profile defines, and what is running
+///   (...Defined, ...State, below the kind's ...OnLPAR). A VSSD makes these and owns them.
+///
+/// The leaves of each of the two are one template. Processors are told in hundredths of a
+/// processing unit, memory in kilobytes, slots and adapters by count.
 ///
 /// Thread-safety: none; an object belongs to the operation that made it.
 ///
-///     zemMemoryRASettingDataState memory;
-///     if (memory.initialize(userName, lpar, cec, profileName, "none", "none", type) != -1)
-///         memory.addSpecificProperties(instance, properties, className);
+///     zemMemoryRASettingDataSharedDEF share;
+///     if (share.initialize(pool, cec, "", VISITOR_TYPE_RASD_INIT) != -1)
+///         share.addSpecificProperties(instance, properties, className);
 #ifndef RESOURCE_POOL_MANAGER_SETTING_DATA_H
 #define RESOURCE_POOL_MANAGER_SETTING_DATA_H
 
+#include <memory>
+
+#include "CmpiData.h"
 #include "StringUtils.h"
 #include "VirtualSystemRepRASD.h"
 #include "ZemExport.h"
@@ -29,7 +37,7 @@ struct ZEM_EXPORT zemResourceRASettingDataCommData {
     virtual ~zemResourceRASettingDataCommData();
 
     int m_ResourceType = -1;      ///< zemRASDKind::resourceType
-    zemString m_InstanceID;       ///< as RASDs of the same resource have it
+    zemString m_InstanceID;       ///< as told at the leaves; empty in an object that was not filled
     zemString m_AllocationUnits;  ///< zemRASDKind::units
 };
 
@@ -51,7 +59,14 @@ public:
     /// The CIM class, as "ORXC_MemoryRASettingData".
     const zemString& getType() const { return m_Type; }
 
-    /// Fills the object from a pool of @p cec. Returns 0, or -1: it cannot be told.
+    /// Fills the object from a pool.
+    /// @param pool  its data name it
+    /// @param cec  the pool's host, with the records that the kind needs: of processors or memory,
+    ///        of the host, its pools and its partitions; of slots, of partitions
+    /// @param filter  has no effect
+    /// @param mode  VISITOR_TYPE_RASD_INIT_NI tells the instance ID alone, any other value all
+    /// @return 0, or -1: it cannot be told
+    /// @throws zemInvalidParameterException a partition names a pool that the host does not have
     virtual int initialize(zemResourcePool* pool, zemCEC* cec, const zemString& filter,
                            int mode) = 0;
 
@@ -61,8 +76,9 @@ public:
     /// @param profileName  the profile of a defined side
     /// @param id  the DRC index of a slot, the slot number of an adapter, else "none"
     /// @param info  the resource as it stands in the list of its kind, else "none"
-    /// @param type  how much is asked for, a VMVisitorType
+    /// @param type  VISITOR_TYPE_RASD_INIT_NI tells which resource it is, any other value all
     /// @return 0, or -1: the object is of no use
+    /// @throws what reading records raises (VirtualSystemVisitorVSSD.h)
     virtual int initialize(const zemString& userName, zemLPAR* lpar, zemCEC* cec,
                            const zemString& profileName, const zemString& id, const zemString& info,
                            int type) = 0;
@@ -80,14 +96,19 @@ protected:
     zemString m_Type;
 };
 
-/// Setting data of one kind.
+/// Setting data of one kind. Each leaf is filled from a pool or from a partition; the other gives
+/// -1.
 template <const zemRASDKind& kind>
 class ZEM_EXPORT zemRASettingDataOf : public zemResourceRASettingData {
-protected:
-    zemRASettingDataOf() : zemResourceRASettingData(&m_CommData, kind.settingClass) {}
+public:
+    int initialize(zemResourcePool* pool, zemCEC* cec, const zemString& filter, int mode) override;
+    int initialize(const zemString& userName, zemLPAR* lpar, zemCEC* cec,
+                   const zemString& profileName, const zemString& id, const zemString& info,
+                   int type) override;
 
-private:
-    zemResourceRASettingDataCommData m_CommData;
+protected:
+    explicit zemRASettingDataOf(zemResourceRASettingDataCommData* data)
+        : zemResourceRASettingData(data, kind.settingClass) {}
 };
 
 using zemProcessorRASettingData = zemRASettingDataOf<zemRASDKinds::processor>;
@@ -97,34 +118,138 @@ using zemEthernetAdapterRASettingData = zemRASettingDataOf<zemRASDKinds::etherne
 using zemSCSIAdapterRASettingData = zemRASettingDataOf<zemRASDKinds::scsi>;
 using zemSerialAdapterRASettingData = zemRASettingDataOf<zemRASDKinds::serial>;
 
-/// Setting data of one resource of a partition. It is filled from a partition alone: from a pool,
-/// initialize() gives -1, and so it does for an adapter whose @p id is no slot number.
-template <const zemRASDKind& kind, zemSettingSide side>
-class ZEM_EXPORT zemRASettingDataOnLPAR : public zemRASettingDataOf<kind> {
+// --- What a partition may take from a pool
+
+enum ZEM_EXPORT zemPoolSharing { SHARING_DEDICATED, SHARING_SHARED };
+enum ZEM_EXPORT zemPoolRole { ROLE_MIN, ROLE_MAX, ROLE_DEF, ROLE_INC };
+
+/// The quantities of a leaf; those that it does not hold are 0.
+struct ZEM_EXPORT zemPoolRASettingDataCommData : zemResourceRASettingDataCommData {
+    zemString m_PoolID;  ///< as the pool's data have it
+    CMPIUint64 m_VirtualQuantity = 0;
+    CMPIUint64 m_VirtualMinimum = 0;
+    CMPIUint64 m_VirtualMaximum = 0;
+    CMPIUint64 m_Minimum = 0;
+    CMPIUint64 m_Reservation = 0;
+    CMPIUint64 m_Limit = 0;
+};
+
+/// Where a leaf has its data, by the name that its kind has for them.
+template <const zemRASDKind& kind>
+struct ZEM_EXPORT zemPoolRASettingDataBlock {
+    zemPoolRASettingDataCommData m_RASettingData;
+
+protected:
+    zemPoolRASettingDataCommData* block() { return &m_RASettingData; }
+};
+template <>
+struct ZEM_EXPORT zemPoolRASettingDataBlock<zemRASDKinds::processor> {
+    zemPoolRASettingDataCommData m_ProcRASettingData;
+
+protected:
+    zemPoolRASettingDataCommData* block() { return &m_ProcRASettingData; }
+};
+
+/// Its instance ID is "ORX:<D or S><role>:<resource type>-<pool>*<MTMS>"; with a D for slots and
+/// adapters, though those are shared: clients know them so.
+template <const zemRASDKind& kind, zemPoolSharing sharing, zemPoolRole role>
+class ZEM_EXPORT zemRASettingDataOfPool : public zemPoolRASettingDataBlock<kind>,
+                                          public zemRASettingDataOf<kind> {
 public:
+    using RASettingDataCommData = zemPoolRASettingDataCommData;
+    using zemRASettingDataOf<kind>::initialize;
+
+    zemRASettingDataOfPool() : zemRASettingDataOf<kind>(this->block()) {}
     int initialize(zemResourcePool* pool, zemCEC* cec, const zemString& filter, int mode) override;
-    int initialize(const zemString& userName, zemLPAR* lpar, zemCEC* cec,
-                   const zemString& profileName, const zemString& id, const zemString& info,
-                   int type) override;
     void addSpecificProperties(CmpiInstance& instance, const char** properties,
                                const char* className) override;
 };
 
-using zemProcessorRASettingDataDefined =
-    zemRASettingDataOnLPAR<zemRASDKinds::processor, SIDE_DEFINED>;
-using zemProcessorRASettingDataState = zemRASettingDataOnLPAR<zemRASDKinds::processor, SIDE_STATE>;
-using zemMemoryRASettingDataDefined = zemRASettingDataOnLPAR<zemRASDKinds::memory, SIDE_DEFINED>;
-using zemMemoryRASettingDataState = zemRASettingDataOnLPAR<zemRASDKinds::memory, SIDE_STATE>;
-using zemIOSlotRASettingDataDefined = zemRASettingDataOnLPAR<zemRASDKinds::ioSlot, SIDE_DEFINED>;
-using zemIOSlotRASettingDataState = zemRASettingDataOnLPAR<zemRASDKinds::ioSlot, SIDE_STATE>;
-using zemEthernetAdapterRASettingDataDefined =
-    zemRASettingDataOnLPAR<zemRASDKinds::ethernet, SIDE_DEFINED>;
-using zemEthernetAdapterRASettingDataState =
-    zemRASettingDataOnLPAR<zemRASDKinds::ethernet, SIDE_STATE>;
-using zemSCSIAdapterRASettingDataDefined = zemRASettingDataOnLPAR<zemRASDKinds::scsi, SIDE_DEFINED>;
-using zemSCSIAdapterRASettingDataState = zemRASettingDataOnLPAR<zemRASDKinds::scsi, SIDE_STATE>;
-using zemSerialAdapterRASettingDataDefined =
-    zemRASettingDataOnLPAR<zemRASDKinds::serial, SIDE_DEFINED>;
-using zemSerialAdapterRASettingDataState = zemRASettingDataOnLPAR<zemRASDKinds::serial, SIDE_STATE>;
+// clang-format off
+#define ZEM_POOL_LEAVES(NAME, KIND, WORD, SHARING)                                                     \
+    using zem##NAME##RASettingData##WORD##MIN = zemRASettingDataOfPool<KIND, SHARING, ROLE_MIN>; \
+    using zem##NAME##RASettingData##WORD##MAX = zemRASettingDataOfPool<KIND, SHARING, ROLE_MAX>; \
+    using zem##NAME##RASettingData##WORD##DEF = zemRASettingDataOfPool<KIND, SHARING, ROLE_DEF>; \
+    using zem##NAME##RASettingData##WORD##INC = zemRASettingDataOfPool<KIND, SHARING, ROLE_INC>;
+ZEM_POOL_LEAVES(Processor,       zemRASDKinds::processor, Dedicated, SHARING_DEDICATED)
+ZEM_POOL_LEAVES(Processor,       zemRASDKinds::processor, Shared,    SHARING_SHARED)
+ZEM_POOL_LEAVES(Memory,          zemRASDKinds::memory,    Dedicated, SHARING_DEDICATED)
+ZEM_POOL_LEAVES(Memory,          zemRASDKinds::memory,    Shared,    SHARING_SHARED)
+ZEM_POOL_LEAVES(IOSlot,          zemRASDKinds::ioSlot,    Shared,    SHARING_SHARED)
+ZEM_POOL_LEAVES(EthernetAdapter, zemRASDKinds::ethernet,  Shared,    SHARING_SHARED)
+ZEM_POOL_LEAVES(SCSIAdapter,     zemRASDKinds::scsi,      Shared,    SHARING_SHARED)
+ZEM_POOL_LEAVES(SerialAdapter,   zemRASDKinds::serial,    Shared,    SHARING_SHARED)
+#undef ZEM_POOL_LEAVES
+// clang-format on
+
+// --- What a partition has
+
+struct ZEM_EXPORT zemOnLPARRASettingDataCommData : zemResourceRASettingDataCommData {
+    ~zemOnLPARRASettingDataCommData() override;
+
+    std::unique_ptr<zemRASD> m_RASD;  ///< what is told of the resource; null: only which it is
+};
+
+/// Setting data of one resource of a partition. Its instance ID is that of the resource's RASD. An
+/// adapter whose @p id is no slot number, and one whose @p info is none of its kind, gives -1.
+///
+/// Slots and adapters are told by @p info. Processors and memory are told by the records that hang
+/// on the partition, as visitors hang them; where there are none, initialize() asks for those of
+/// that partition.
+template <const zemRASDKind& kind>
+class ZEM_EXPORT zemRASettingDataOnLPAR : public zemRASettingDataOf<kind> {
+public:
+    using RASettingDataCommData = zemOnLPARRASettingDataCommData;
+
+    void addSpecificProperties(CmpiInstance& instance, const char** properties,
+                               const char* className) override;
+
+    RASettingDataCommData m_RASettingData;
+
+protected:
+    zemRASettingDataOnLPAR() : zemRASettingDataOf<kind>(&m_RASettingData) {}
+};
+
+using zemProcessorRASettingDataOnLPAR = zemRASettingDataOnLPAR<zemRASDKinds::processor>;
+using zemMemoryRASettingDataOnLPAR = zemRASettingDataOnLPAR<zemRASDKinds::memory>;
+using zemIOSlotRASettingDataOnLPAR = zemRASettingDataOnLPAR<zemRASDKinds::ioSlot>;
+using zemEthernetAdapterRASettingDataOnLPAR = zemRASettingDataOnLPAR<zemRASDKinds::ethernet>;
+using zemSCSIAdapterRASettingDataOnLPAR = zemRASettingDataOnLPAR<zemRASDKinds::scsi>;
+using zemSerialAdapterRASettingDataOnLPAR = zemRASettingDataOnLPAR<zemRASDKinds::serial>;
+
+/// One side of it.
+template <const zemRASDKind& kind, zemSettingSide side>
+class ZEM_EXPORT zemRASettingDataOnSide : public zemRASettingDataOnLPAR<kind> {
+public:
+    using zemRASettingDataOnLPAR<kind>::initialize;
+
+    int initialize(const zemString& userName, zemLPAR* lpar, zemCEC* cec,
+                   const zemString& profileName, const zemString& id, const zemString& info,
+                   int type) override;
+};
+
+// clang-format off
+#define ZEM_LPAR_LEAVES(NAME, KIND)                                                        \
+    using zem##NAME##RASettingDataDefined = zemRASettingDataOnSide<KIND, SIDE_DEFINED>; \
+    using zem##NAME##RASettingDataState = zemRASettingDataOnSide<KIND, SIDE_STATE>;
+ZEM_LPAR_LEAVES(Processor,       zemRASDKinds::processor)
+ZEM_LPAR_LEAVES(Memory,          zemRASDKinds::memory)
+ZEM_LPAR_LEAVES(IOSlot,          zemRASDKinds::ioSlot)
+ZEM_LPAR_LEAVES(EthernetAdapter, zemRASDKinds::ethernet)
+ZEM_LPAR_LEAVES(SCSIAdapter,     zemRASDKinds::scsi)
+ZEM_LPAR_LEAVES(SerialAdapter,   zemRASDKinds::serial)
+#undef ZEM_LPAR_LEAVES
+// clang-format on
+
+// --- How they are shown; @p properties as for addSpecificProperties()
+
+/// Sets the properties that tell which resource it is; nothing for data that were not filled.
+ZEM_EXPORT void zemAddIdentity(CmpiInstance& instance, const char** properties,
+                               const zemResourceRASettingDataCommData& data);
+
+/// Sets the properties that @p data tell of a resource of a partition. Numbers that were not set,
+/// or do not fit the property, and empty texts stay null.
+ZEM_EXPORT void zemAddRASDProperties(CmpiInstance& instance, const char** properties,
+                                     const zemRASDCommData& data);
 
 #endif

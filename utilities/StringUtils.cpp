@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <charconv>
 #include <climits>
 #include <cstdarg>
 #include <cstdio>
@@ -52,8 +53,8 @@ bool sameText(const char* a, const char* b, unsigned lengthA, unsigned lengthB, 
 
 zemString::zemString(int value) : zemString() {
     char digits[16];
-    const int n = std::snprintf(digits, sizeof digits, "%d", value);
-    assign(digits, static_cast<std::size_t>(n));
+    char* const end = std::to_chars(digits, digits + sizeof digits, value).ptr;
+    assign(digits, static_cast<std::size_t>(end - digits));
 }
 
 zemString::zemString(const char* text) : zemString() {

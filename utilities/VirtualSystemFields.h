@@ -20,6 +20,7 @@
 #define VIRTUAL_SYSTEM_FIELDS_H
 
 #include <type_traits>
+#include <utility>
 
 #include "StringUtils.h"
 
@@ -33,23 +34,24 @@ Value zemUnsetField() {
     }
 }
 
-/// The type by which a field's value goes in and out: a number as itself, all else by reference.
+/// The type by which a field's value goes out: a number as itself, all else by reference.
 template <class Value>
-using zemFieldArgument =
+using zemFieldResult =
     std::conditional_t<std::is_arithmetic_v<Value> || std::is_enum_v<Value>, Value, const Value&>;
 
 /// The member and its getter.
-#define ZEM_READ_FIELD_OF(TYPE, MEMBER, NAME)                   \
-public:                                                         \
-    zemFieldArgument<TYPE> get##NAME() const { return MEMBER; } \
-                                                                \
-private:                                                        \
+#define ZEM_READ_FIELD_OF(TYPE, MEMBER, NAME)                 \
+public:                                                       \
+    zemFieldResult<TYPE> get##NAME() const { return MEMBER; } \
+                                                              \
+private:                                                      \
     TYPE MEMBER = zemUnsetField<TYPE>()
 
-/// A field of any type: member, getter, and a setter that stores what it gets.
-#define ZEM_FIELD(TYPE, MEMBER, NAME)                                      \
-public:                                                                    \
-    void set##NAME(zemFieldArgument<TYPE> value) { this->MEMBER = value; } \
+/// A field of any type: member, getter, and a setter that stores what it gets. It takes the value
+/// itself: what readers hand over is fresh, and there are thirty fields to a record.
+#define ZEM_FIELD(TYPE, MEMBER, NAME)                               \
+public:                                                             \
+    void set##NAME(TYPE value) { this->MEMBER = std::move(value); } \
     ZEM_READ_FIELD_OF(TYPE, MEMBER, NAME)
 
 /// A text kept as it comes.

@@ -10,7 +10,10 @@ constexpr unsigned kPrefixLength = 6;
 
 /// @param what  null: not in the ID
 zemString form(const zemInstanceIdOwner& owner, const char* what) {
-    std::string id = kPrefixes[owner.side];
+    constexpr std::size_t kUsual = 80;
+    std::string id;
+    id.reserve(kUsual);
+    id = kPrefixes[owner.side];
     if (owner.side == SIDE_DEFINED) {
         id += owner.profileName;
         id += '-';

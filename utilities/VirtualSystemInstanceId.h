@@ -16,12 +16,12 @@
 #include "StringUtils.h"
 #include "VirtualSystemRepRASD.h"
 
-/// Whose ID it is. The state side does not look at the profile.
+/// Whose ID it is, for the length of a call. The state side does not look at the profile.
 struct zemInstanceIdOwner {
     zemSettingSide side;
-    zemString profileName;
-    zemString lparID;
-    zemString mtms;
+    const zemString& profileName;
+    const zemString& lparID;
+    const zemString& mtms;
 };
 
 /// The ID of a system, its processor or memory; of a slot; of an adapter.

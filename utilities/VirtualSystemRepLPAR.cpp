@@ -167,12 +167,12 @@ void zemLPAR::setMigrationState(const char* text) {
 
 void zemLPAR::setStateVSSD(zemVSSD& vssd) { m_stateVSSD = vssd; }
 
-void zemLPAR::setLparProcessor(const zemPartitionProcessorResource& record) {
-    m_LparProcessor = record;
+void zemLPAR::setLparProcessor(zemPartitionProcessorResource record) {
+    m_LparProcessor = std::move(record);
     m_isLparProcAvailable = true;
 }
 
-void zemLPAR::setLparMemory(const zemPartitionMemoryResource& record) {
-    m_LparMemory = record;
+void zemLPAR::setLparMemory(zemPartitionMemoryResource record) {
+    m_LparMemory = std::move(record);
     m_isLparMemAvailable = true;
 }

@@ -1,6 +1,7 @@
 #include "VirtualSystemRepRASD.h"
 
 #include <cstddef>
+#include <string>
 
 #include "Exception.h"
 #include "NumberText.h"
@@ -43,11 +44,8 @@ void readKey(Data& data, const zemString& key) {
     }
 }
 
-zemString keyOf(int type, const char* what) {
-    zemString key;
-    key.format("%d-%s", type, what);
-    return key;
-}
+zemString keyOf(int type, const char* what) { return (std::to_string(type) + "-" + what).c_str(); }
+zemString keyOf(int type, int slot) { return keyOf(type, std::to_string(slot).c_str()); }
 
 template <class Value>
 bool isSame(const Value& mine, const Value& other) {
@@ -165,10 +163,8 @@ zemRemoteAdapterRASDData::zemRemoteAdapterRASDData(const zemRASDKind& kind)
 zemString ProcessorData::getKey() const { return keyOf(m_ResourceType, "Processor"); }
 zemString MemoryData::getKey() const { return keyOf(m_ResourceType, "Memory"); }
 zemString SlotData::getKey() const { return keyOf(m_ResourceType, m_DRCIndex); }
-zemString zemRemoteAdapterRASDData::getKey() const {
-    return keyOf(m_ResourceType, zemString(m_SlotID));
-}
-zemString EthernetData::getKey() const { return keyOf(m_ResourceType, zemString(m_SlotID)); }
+zemString zemRemoteAdapterRASDData::getKey() const { return keyOf(m_ResourceType, m_SlotID); }
+zemString EthernetData::getKey() const { return keyOf(m_ResourceType, m_SlotID); }
 
 // What each kind is made of: its constants, a key, data.
 #define ZEM_RASD(NAME, BASE, KIND)                               \

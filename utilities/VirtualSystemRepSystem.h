@@ -206,13 +206,14 @@ private:
     ZEM_FIELD(zemString, m_PrimaryFSPIP, PrimaryFSPIP);  ///< service processor; "PrimaryFSP_IP"
     ZEM_FIELD(zemString, m_BackupFSPIP, BackupFSPIP);    ///< the second one; "BackupFSP_IP"
     zemCECCapability m_capability;
+    ZEM_FIELD(int, m_IOSlotCount, IOSlotCount);  ///< slots, free ones too; -1: not read
 };
 
 // A text of a partition: its getter, the member, and a setter that stores the text as it is, or one
 // that the class defines.
-#define ZEM_LPAR_TEXT(MEMBER, NAME)                                  \
-public:                                                              \
-    void set##NAME(const zemString& value) { this->MEMBER = value; } \
+#define ZEM_LPAR_TEXT(MEMBER, NAME)                                      \
+public:                                                                  \
+    void set##NAME(zemString value) { this->MEMBER = std::move(value); } \
     ZEM_LPAR_GETTER(MEMBER, NAME)
 #define ZEM_LPAR_TRANSLATED(MEMBER, NAME)   \
 public:                                     \
@@ -252,7 +253,8 @@ public:
     ///        VISITOR_TYPE_VSSD_INIT: VSSDs in full, and the partition's name, type and keylock.
     ///        VISITOR_TYPE_VSSD_INIT_NI: VSSDs of which only the names are told.
     ///        VISITOR_TYPE_RASD_INIT, VISITOR_TYPE_RASD_INIT_NI: VSSDs with the setting data of
-    ///        the class, for which lists of adapters are asked for once a list.
+    ///        the class, for which lists of adapters are asked for once a list, and, for the former,
+    ///        records of processors or memory that do not hang here (zemRASettingDataOnLPAR).
     /// @return 0
     /// @throws what the objects of SystemConfig.h and the query of profiles throw; what was filled
     ///         up to then stays
@@ -292,10 +294,10 @@ public:
 
     /// Processors and memory, and whether there has been a record of each.
     const zemPartitionProcessorResource& getLparProcessor() const { return m_LparProcessor; }
-    void setLparProcessor(const zemPartitionProcessorResource& record);
+    void setLparProcessor(zemPartitionProcessorResource record);
     bool isLparProcessorAvailable() const { return m_isLparProcAvailable; }
     const zemPartitionMemoryResource& getLparMemory() const { return m_LparMemory; }
-    void setLparMemory(const zemPartitionMemoryResource& record);
+    void setLparMemory(zemPartitionMemoryResource record);
     bool isLparMemoryAvailable() const { return m_isLparMemAvailable; }
 
     /// Records of the profiles, of slots and of virtual adapters.

@@ -17,6 +17,7 @@
 #include "VirtualSystemInstanceId.h"
 #include "VirtualSystemRepSystem.h"
 #include "VirtualSystemRepVSSD.h"
+#include "VirtualSystemVisitorAttributes.h"
 
 namespace {
 
@@ -31,17 +32,33 @@ zemString stringOf(std::string_view text) {
     return zemString(text.data(), static_cast<unsigned>(text.size()));
 }
 
+/// Whether @p text begins with a running serial or SCSI adapter.
+bool isRunningAdapter(std::string_view text) {
+    const std::size_t slash = text.find_first_not_of("0123456789");
+    if (slash == 0 || slash == std::string_view::npos) {
+        return false;
+    }
+    const std::string_view type = text.substr(slash, std::string_view("/server/").size());
+    return type == "/server/" || type == "/client/";
+}
+
 /// Hands @p visit each element of @p list that has more than one field: its first field, and the
 /// element. Elements end at commas. One that holds commas itself begins with a quote and ends with
 /// one; or with an empty field, as running adapters do that their profile does not know.
+/// @param holdsNames  the elements are running adapters with names of partitions, commas and all,
+///        in front of the last fields
 template <class Visit>
-void walkList(std::string_view list, Visit visit) {
+void walkList(std::string_view list, bool holdsNames, Visit visit) {
     while (!list.empty()) {
         const bool quoted = list.front() == '"';
         list.remove_prefix(quoted ? 1 : 0);
         std::size_t comma = list.find(',');
         while (quoted && comma != std::string_view::npos &&
                (comma == 0 || (list[comma - 1] != '"' && list[comma - 1] != '/'))) {
+            comma = list.find(',', comma + 1);
+        }
+        while (holdsNames && comma != std::string_view::npos && comma + 1 < list.size() &&
+               !isRunningAdapter(list.substr(comma + 1))) {
             comma = list.find(',', comma + 1);
         }
         std::string_view element = list.substr(0, comma);
@@ -57,23 +74,6 @@ void walkList(std::string_view list, Visit visit) {
 }
 
 constexpr char kNoAdapters[] = "none,";
-
-using VirtualIO = zemQyallocCmdCaller::VirtualIOResourceAttribute;
-using Serial = VirtualIO::SerialLparLevelAttribute;
-using Scsi = VirtualIO::SCSILparLevelAttribute;
-
-// What is asked of an adapter, in the order of an element's fields.
-constexpr int kSerialFields[] = {Serial::ATTR_SLOT_NUM,         Serial::ATTR_ADAPTER_TYPE,
-                                 Serial::ATTR_SUPPORTS_DNX,     Serial::ATTR_REMOTE_LPAR_ID,
-                                 Serial::ATTR_REMOTE_LPAR_NAME, Serial::ATTR_REMOTE_SLOT_NUM,
-                                 Serial::ATTR_IS_REQUIRED,      Serial::ATTR_END};
-constexpr int kScsiFields[] = {Scsi::ATTR_SLOT_NUM,
-                               Scsi::ATTR_ADAPTER_TYPE,
-                               Scsi::ATTR_REMOTE_LPAR_ID,
-                               Scsi::ATTR_REMOTE_LPAR_NAME,
-                               Scsi::ATTR_REMOTE_SLOT_NUM,
-                               Scsi::ATTR_IS_REQUIRED,
-                               Scsi::ATTR_END};
 
 /// The adapters that @p query finds for a partition, each as its @p fields and a comma.
 template <class Query, std::size_t N>
@@ -104,7 +104,7 @@ using StoredSwitches = std::unordered_map<std::string_view, std::optional<std::s
 
 StoredSwitches storedSwitches(std::string_view list) {
     StoredSwitches switches;
-    walkList(list, [&](std::string_view, std::string_view element) {
+    walkList(list, false, [&](std::string_view, std::string_view element) {
         constexpr int kFields = 6;
         std::size_t end = 0;
         for (int field = 0; field < kFields && end != std::string_view::npos; ++field) {
@@ -144,7 +144,7 @@ std::string ethernetElement(apiProp& object, const StoredSwitches& stored) {
 
 template <const zemRASDKind& kind, zemSettingSide side>
 std::unique_ptr<zemResourceRASettingData> make() {
-    return std::make_unique<zemRASettingDataOnLPAR<kind, side>>();
+    return std::make_unique<zemRASettingDataOnSide<kind, side>>();
 }
 
 /// Where the setting data of one class come from.
@@ -245,14 +245,14 @@ int zemVSSD::initialize(zemLPAR* lpar, zemVirtualSystemProfile& profile) {
 
 zemString zemVSSD::getSerialAdapterInfo(const zemString& userName, const zemString& mtms,
                                         const zemString& lparId) const {
-    return adaptersOf(&zemQyallocCmdCaller::getPartitionVirtualSerialResources, kSerialFields,
+    return adaptersOf(&zemQyallocCmdCaller::getPartitionVirtualSerialResources, zemSerialFields,
                       userName, mtms, lparId);
 }
 
 zemString zemVSSD::getSCSIAdapterInfo(const zemString& userName, const zemString& mtms,
                                       const zemString& lparId) const {
-    return adaptersOf(&zemQyallocCmdCaller::getPartitionVirtualSCSIResources, kScsiFields, userName,
-                      mtms, lparId);
+    return adaptersOf(&zemQyallocCmdCaller::getPartitionVirtualSCSIResources, zemScsiFields,
+                      userName, mtms, lparId);
 }
 
 zemString zemVSSD::getEthernetAdapterInfo(const zemString& userName, const zemString& mtms,
@@ -312,8 +312,10 @@ int zemVSSD::initializeSide(zemSettingSide side, const zemString& userName,
     const bool asks = side == SIDE_STATE && wanted->live != nullptr;
     zemString list =
         asks ? (this->*wanted->live)(userName, mtms, lparID) : (this->*wanted->stored)();
-    walkList(static_cast<const char*>(list), [&](std::string_view id, std::string_view element) {
-        add(stringOf(id), stringOf(element));
-    });
+    walkList(static_cast<const char*>(list),
+             asks && wanted->kind.resourceType != zemRASDKinds::ethernet.resourceType,
+             [&](std::string_view id, std::string_view element) {
+                 add(stringOf(id), stringOf(element));
+             });
     return 0;
 }

@@ -1,7 +1,9 @@
 #include "VirtualSystemResourceRecords.h"
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
+#include <string>
 
 #include "Exception.h"
 #include "NumberText.h"
@@ -90,12 +92,10 @@ zemString zemHardwareResource::getCLIUnits(const zemString& units) {
     if (units.isEmpty() || units == "0") {
         return "0.0";
     }
-    if (units.length() == 1) {
-        return "0.0" + units;
-    }
-    const auto point = static_cast<unsigned>(units.length() - 2);
-    const zemString whole = point == 0 ? zemString("0") : units.extractSubstring(0, point);
-    return whole + "." + units.extractSubstring(point);
+    std::string text(units);
+    text.insert(0, std::string(std::max<std::size_t>(text.size(), 3) - text.size(), '0'));
+    text.insert(text.size() - 2, ".");
+    return text.c_str();
 }
 
 zemString zemHardwareResource::getHexValueByDecValue(const zemString& value) {

@@ -170,20 +170,22 @@ struct Told<zemPartitionEthernetAdapterResource> : zemEthernetAttribute {
 };
 // clang-format on
 
-zemString fromRecord(const void* object, int attribute) {
+const zemString kNotTold;
+
+const zemString& fromRecord(const void* object, int attribute) {
+    const auto& record = *static_cast<const zemRecordType*>(object);
     zemString value;
-    static_cast<const zemRecordType*>(object)->lookup(attribute, value);
-    return value;
+    return record.lookup(attribute, value) == 0 ? record[attribute] : kNotTold;
 }
 
 template <class Object>
-zemString fromModel(const void* object, int attribute) {
+const zemString& fromModel(const void* object, int attribute) {
     for (const Field<Object>& field : Told<Object>::kFields) {
         if (field.attribute == attribute) {
             return (static_cast<const Object*>(object)->*field.get)();
         }
     }
-    return {};
+    return kNotTold;
 }
 
 }  // namespace

@@ -35,6 +35,20 @@ using zemEthernetAttribute = zemQyallocCmdCaller::VirtualIOResourceAttribute::Et
 /// The virtual switch of an Ethernet adapter, of which the tool has no attribute.
 constexpr int zemEthernetSwitch = std::size(zemEthernetAttribute::m_attributeName);
 
+// The attributes that the fields of an element are in the lists of what runs, in their order.
+constexpr int zemSerialFields[] = {
+    zemSerialAttribute::ATTR_SLOT_NUM,         zemSerialAttribute::ATTR_ADAPTER_TYPE,
+    zemSerialAttribute::ATTR_SUPPORTS_DNX,     zemSerialAttribute::ATTR_REMOTE_LPAR_ID,
+    zemSerialAttribute::ATTR_REMOTE_LPAR_NAME, zemSerialAttribute::ATTR_REMOTE_SLOT_NUM,
+    zemSerialAttribute::ATTR_IS_REQUIRED,      zemSerialAttribute::ATTR_END};
+constexpr int zemScsiFields[] = {zemScsiAttribute::ATTR_SLOT_NUM,
+                                 zemScsiAttribute::ATTR_ADAPTER_TYPE,
+                                 zemScsiAttribute::ATTR_REMOTE_LPAR_ID,
+                                 zemScsiAttribute::ATTR_REMOTE_LPAR_NAME,
+                                 zemScsiAttribute::ATTR_REMOTE_SLOT_NUM,
+                                 zemScsiAttribute::ATTR_IS_REQUIRED,
+                                 zemScsiAttribute::ATTR_END};
+
 /// A view of an object, which outlives it.
 class zemAttributes {
 public:
@@ -42,12 +56,12 @@ public:
     template <class Object>
     explicit zemAttributes(const Object& object);
 
-    /// The value of an attribute; empty when the object does not tell it.
-    zemString operator[](int attribute) const { return m_read(m_object, attribute); }
+    /// The value of an attribute, which is the object's; empty when it does not tell it.
+    const zemString& operator[](int attribute) const { return m_read(m_object, attribute); }
 
 private:
     const void* m_object;
-    zemString (*m_read)(const void* object, int attribute);
+    const zemString& (*m_read)(const void* object, int attribute);
 };
 
 /// What an object of the model tells, as a record.

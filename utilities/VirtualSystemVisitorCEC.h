@@ -129,6 +129,7 @@ public:
     int initializeProcessorPool(const zemString& userName, int level);
     int initializeMemoryLevelSys(const zemString& userName, int level);
     int initializeMemoryPool(const zemString& userName, int level);
+    int initializeIOSlotLevelSys(const zemString& userName, int level);
 
     /// Whether partitions can be suspended and restarted elsewhere. The tool's answers do not name
     /// hosts: it is asked twice for each host that has partitions.
@@ -179,6 +180,11 @@ public:
     /// Only slots that belong to a partition.
     zemDynamicArray<zemPartitionIOSlotResource> getAllIOSlotLevelLparByKeys(
         const zemString& userName, int level, const zemString& mtms, const zemString& lparid) const;
+
+    /// A record for each slot of a host, free ones too, that tells no more than whose it is.
+    zemDynamicArray<zemHardwareResource> getAllIOSlotLevelSysByKeys(const zemString& userName,
+                                                                    int level,
+                                                                    const zemString& mtms) const;
 
     zemDynamicArray<zemSystemProcessorResource> getAllProcessorLevelSysByKeys(
         const zemString& userName, int level, const zemString& mtms) const;

@@ -25,7 +25,8 @@ using SysMemory = zemSystemMemoryResource;
 using MemoryPool = zemMemoryPoolResource;
 
 /// One row of a reader's table: a property, and what of the record it fills. Few take other
-/// properties besides.
+/// properties besides. Rows stand in the order in which the library tells the properties, which it
+/// finds fastest so.
 template <class Record>
 using Field = zemApiField<void (*)(Record&, const zemApiProp& object, const char* key)>;
 
@@ -42,11 +43,11 @@ void sharing(Record& record, const zemApiProp& object, const char* mode, const c
 }
 
 constexpr Field<zemCEC> kHost[] = {
+    {"Name", set<&zemCEC::setMTMS>},
+    {"UserDefinedName", set<&zemCEC::setSystemName>},
+    {"State", set<&zemCEC::setStatePlus>},
     {"PrimaryFSP_IP", set<&zemCEC::setPrimaryFSPIP>},
     {"BackupFSP_IP", set<&zemCEC::setBackupFSPIP>},
-    {"Name", set<&zemCEC::setMTMS>},
-    {"State", set<&zemCEC::setStatePlus>},
-    {"UserDefinedName", set<&zemCEC::setSystemName>},
     {"GlvExCaps",
      [](zemCEC& host, const zemApiProp& object, const char* key) {
          host.setCapability(object.getProperty(key), object.getProperty("RuntimeCapability"));
@@ -58,54 +59,54 @@ constexpr Field<Lpar> kLpar[] = {
     {"PartitionState", set<&Lpar::setStatePlus>},
     {"UserDefinedName", set<&Lpar::setLparName>},
     {"DefinitionState", set<&Lpar::setVirtualSystemType>},
-    {"Curr_prof", set<&Lpar::setCurrentProfileName>},
-    {"Default_prof", set<&Lpar::setDefaultProfileName>},
     {"BootMode", set<&Lpar::setBootMode>},
     {"MigrationState",
      [](Lpar& lpar, const zemApiProp& object, const char* key) {
          lpar.setMigrationState(zemWholeNumberOf(object.getProperty(key)), true);
      }},
-    {"ActualProcCompatMode", set<&Lpar::setCurrLparProcCompatMode>},
-    {"ProcCompatMode", set<&Lpar::setDesiredLparProcCompatMode>},
+    {"Default_prof", set<&Lpar::setDefaultProfileName>},
+    {"Curr_prof", set<&Lpar::setCurrentProfileName>},
     {"Keylock", set<&Lpar::setKeyLock>},
     {"RedundantPath", set<&Lpar::setRedundantErrPathReporting>},
+    {"ProcCompatMode", set<&Lpar::setDesiredLparProcCompatMode>},
+    {"ActualProcCompatMode", set<&Lpar::setCurrLparProcCompatMode>},
     {"PowerOnWithHypervisor", set<&Lpar::setAutoStart>},
 };
 
 constexpr Field<Profile> kProfile[] = {
-    {"AltConsoleDRCIndex", set<&Profile::setAltConsoleSlot>},
-    {"AltLoadSourceDRCIndex", set<&Profile::setAltRestartDeviceSlot>},
-    {"AutoIPLEnabled", set<&Profile::setAutoStart>},
+    {"UserDefinedName", set<&Profile::setProfileName>},
     {"SFPSurveillance", set<&Profile::setConnMonitoring>},
-    {"ConsoleDRCIndex", set<&Profile::setConsoleSlot>},
-    {"EntMem", set<&Profile::setDesiredIoEntitledMem>},
-    {"LoadSourceDRCIndex", set<&Profile::setLoadSourceSlot>},
     {"lpar_env", set<&Profile::setLparEnv>},
     {"lpar_name", set<&Profile::setLparName>},
-    {"VRMWeight", set<&Profile::setMemWeight>},
-    {"ECSDRCIndex", set<&Profile::setOpConsoleSlot>},
-    {"UserDefinedName", set<&Profile::setProfileName>},
-    {"RedundantPath", set<&Profile::setRedundantErrPathReporting>},
-    {"UncappedWeight", set<&Profile::setUncapWeight>},
-    {"BootMode", set<&Profile::setBootMode>},
+    {"AutoIPLEnabled", set<&Profile::setAutoStart>},
     {"MaxVirtualSlots", set<&Profile::setMaxVirtualSlots>},
+    {"BootMode", set<&Profile::setBootMode>},
+    {"RedundantPath", set<&Profile::setRedundantErrPathReporting>},
     {"ProcMode", set<&Profile::setProcMode>},
+    {"ProcessorMode", set<&Profile::setLparProcCompatMode>},
     {"SharingMode",
      [](Profile& profile, const zemApiProp& object, const char* key) {
          sharing<&Profile::setSharingMode>(profile, object, "ProcMode", "DonorMode", key);
      }},
-    {"MinimumCPUCount", set<&Profile::setMinProcs>},
-    {"DesiredCPUCount", set<&Profile::setDesiredProcs>},
-    {"MaximumCPUCount", set<&Profile::setMaxProcs>},
+    {"UncappedWeight", set<&Profile::setUncapWeight>},
     {"MinProcUnit", set<&Profile::setMinProcsUnits>},
     {"DesiredProcUnit", set<&Profile::setDesiredProcsUnits>},
     {"MaxProcUnit", set<&Profile::setMaxProcsUnits>},
+    {"MinimumCPUCount", set<&Profile::setMinProcs>},
+    {"DesiredCPUCount", set<&Profile::setDesiredProcs>},
+    {"MaximumCPUCount", set<&Profile::setMaxProcs>},
     {"SharedProcPoolId", set<&Profile::setSharedProcPoolID>},
-    {"ProcessorMode", set<&Profile::setLparProcCompatMode>},
-    {"MemMode", set<&Profile::setMemMode>},
     {"MinimumMemory", set<&Profile::setMinMem>},
     {"DesiredMemory", set<&Profile::setDesiredMem>},
     {"MaximumMemory", set<&Profile::setMaxMem>},
+    {"MemMode", set<&Profile::setMemMode>},
+    {"VRMWeight", set<&Profile::setMemWeight>},
+    {"EntMem", set<&Profile::setDesiredIoEntitledMem>},
+    {"AltConsoleDRCIndex", set<&Profile::setAltConsoleSlot>},
+    {"AltLoadSourceDRCIndex", set<&Profile::setAltRestartDeviceSlot>},
+    {"ConsoleDRCIndex", set<&Profile::setConsoleSlot>},
+    {"LoadSourceDRCIndex", set<&Profile::setLoadSourceSlot>},
+    {"ECSDRCIndex", set<&Profile::setOpConsoleSlot>},
     {"virtual_serial_adapters", set<&Profile::setVirtualSerialAdapters>},
     {"virtual_scsi_adapters", set<&Profile::setVirtualScsiAdapters>},
     {"virtual_eth_adapters", set<&Profile::setVirtualEthAdapters>},
@@ -166,11 +167,11 @@ constexpr Field<Memory> kMemory[] = {
 };
 
 constexpr Field<Slot> kSlot[] = {
+    {"drc_index", set<&Slot::setDrcIndex>},
+    {"drc_name", set<&Slot::setDrcName>},
     {"bus_grouping", set<&Slot::setBusGrouping>},
     {"bus_id", set<&Slot::setBusId>},
     {"description", set<&Slot::setDescription>},
-    {"drc_index", set<&Slot::setDrcIndex>},
-    {"drc_name", set<&Slot::setDrcName>},
     {"feature_codes", set<&Slot::setFeatureCodes>},
     {"iop", set<&Slot::setIop>},
     {"parent_slot_drc_index", set<&Slot::setParentSlotDrcIndex>},
@@ -185,35 +186,35 @@ constexpr Field<Slot> kSlot[] = {
 };
 
 constexpr Field<Serial> kSerial[] = {
+    {"lpar_name", set<&Serial::setLparName>},
+    {"slot_num", set<&Serial::setSlotNum>},
+    {"state", set<&Serial::setState>},
     {"adapter_type", set<&Serial::setAdapterType>},
     {"connect_status", set<&Serial::setConnectStatus>},
     {"is_required", set<&Serial::setIsRequired>},
-    {"lpar_name", set<&Serial::setLparName>},
     {"remote_lpar_id", set<&Serial::setRemoteLparId>},
     {"remote_lpar_name", set<&Serial::setRemoteLparName>},
     {"remote_slot_num", set<&Serial::setRemoteSlotNum>},
-    {"slot_num", set<&Serial::setSlotNum>},
-    {"state", set<&Serial::setState>},
     {"supports_dnx", set<&Serial::setSupportsDnx>},
 };
 
 constexpr Field<Scsi> kScsi[] = {
+    {"lpar_name", set<&Scsi::setLparName>},
+    {"slot_num", set<&Scsi::setSlotNum>},
+    {"state", set<&Scsi::setState>},
     {"adapter_type", set<&Scsi::setAdapterType>},
     {"backing_devices", set<&Scsi::setBackingDevices>},
-    {"lpar_name", set<&Scsi::setLparName>},
     {"remote_lpar_id", set<&Scsi::setRemoteLparId>},
     {"remote_lpar_name", set<&Scsi::setRemoteLparName>},
     {"remote_slot_num", set<&Scsi::setRemoteSlotNum>},
-    {"slot_num", set<&Scsi::setSlotNum>},
-    {"state", set<&Scsi::setState>},
     {"is_required", set<&Scsi::setIsRequired>},
 };
 
 constexpr Field<Ethernet> kEthernet[] = {
-    {"mac_addr", set<&Ethernet::setMacAddr>},
-    {"slot_num", set<&Ethernet::setSlotNum>},
     {"lpar_name", set<&Ethernet::setLparName>},
+    {"slot_num", set<&Ethernet::setSlotNum>},
     {"state", set<&Ethernet::setState>},
+    {"mac_addr", set<&Ethernet::setMacAddr>},
     {"ieee_virtual_eth", set<&Ethernet::setIeeeVirtualEth>},
     {"port_vlan_id", set<&Ethernet::setPortVlanID>},
     {"addl_vlan_ids", set<&Ethernet::setAddlVlanIds>},
@@ -259,6 +260,10 @@ constexpr Field<MemoryPool> kMemoryPool[] = {
     {"pend_pool_mem", set<&MemoryPool::setPendPoolMem>},
     {"SystemName", [](MemoryPool& pool, const zemApiProp& object,
                       const char* key) { pool.setSupport(!object.getProperty(key).isEmpty()); }},
+};
+
+constexpr Field<zemHardwareResource> kAnySlot[] = {
+    {"SystemName", set<&zemHardwareResource::setMTMS>},
 };
 
 /// The library's operations that give a collection: of all hosts, of one, and of one partition.
@@ -424,6 +429,8 @@ OF_HOSTS(getAllMemoryLevelSysByKeys, SysMemory,
          getAllCecMemoryCfg, getCecMemoryCfg, "Name", kSysMemory)
 OF_HOSTS(getAllMemoryPoolByKeys, MemoryPool,
          getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, "SystemName", kMemoryPool)
+OF_HOSTS(getAllIOSlotLevelSysByKeys, zemHardwareResource,
+         getAllIoSlots, getIoSlots, "SystemName", kAnySlot)
 // clang-format on
 
 #undef OF_PARTITIONS

@@ -107,7 +107,7 @@ void tellBegin(const char* operation) {
     zemLog::LogPlain("++++cec number");
 }
 
-/// Hands each record of @p records to @p store of its owner: the record itself, or a copy.
+/// Hands each record of @p records to @p store of its owner: the object, or what it holds.
 template <class Owner, class Record, class Store>
 void hangAll(zemDynamicArray<Record> records, zemCECVisitor& visitor, Store store) {
     Owners owners(visitor);
@@ -119,7 +119,7 @@ void hangAll(zemDynamicArray<Record> records, zemCECVisitor& visitor, Store stor
         if constexpr (std::is_invocable_v<Store, Owner&, Record*>) {
             std::invoke(store, *owner, std::exchange(records[i], nullptr));
         } else {
-            std::invoke(store, *owner, *records.getElementAt(i));
+            std::invoke(store, *owner, std::move(*records.getElementAt(i)));
         }
     }
 }
@@ -219,6 +219,17 @@ ON_HOSTS(initializeMemoryPool, getAllMemoryPoolByKeys, setMemoryPool)
 
 #undef ON_PARTITIONS
 #undef ON_HOSTS
+
+int zemCECVisitor::initializeIOSlotLevelSys(const zemString& userName, int level) {
+    for (int i = 0; i < size(); ++i) {
+        getData(i)->setIOSlotCount(0);
+    }
+    return hang<zemCEC>({"initializeIOSlotLevelSys", this, userName, zemString(), level},
+                        &zemCECVisitor::getAllIOSlotLevelSysByKeys,
+                        [](zemCEC& host, const zemHardwareResource& /*slot*/) {
+                            host.setIOSlotCount(host.getIOSlotCount() + 1);
+                        });
+}
 
 int zemCECVisitor::initializeLparSuspendRR(const zemString& userName, const zemString& lparid,
                                            int* /*mask*/) {

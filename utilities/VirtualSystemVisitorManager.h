@@ -17,6 +17,7 @@
 #define VIRTUAL_SYSTEM_VISITOR_MANAGER_H
 
 #include <memory>
+#include <type_traits>
 
 #include "DynamicArray.h"
 #include "StringUtils.h"
@@ -70,13 +71,15 @@ public:
     zemDynamicArray<zemCEC> m_CECs;  ///< the hosts, owned
 };
 
-/// What items are found by: partitions by "<number>*<key of the host>", settings by instance ID.
+/// What items are found by: partitions by "<number>*<key of the host>", settings by instance ID, as
+/// are pools (ResourcePoolManagerVisitor.h).
 inline zemString zemItemKey(const zemLPAR& lpar) { return lpar.getLparIDAndMTMS(); }
 inline zemString zemItemKey(const zemVSSD& vssd) { return vssd.getInstanceID(); }
 
 /// All items of one kind of a manager's hosts. Each operation is done by a Visitor of the host: a
 /// class with a constructor (zemCEC*, class name), setOperEnv(), initialize(user, type), size() and
-/// getData(index), which is included where this template's operations are used.
+/// getData(index), which is included where this template's operations are used. That of pools takes
+/// the class name in place of the user, and a mode in place of the type.
 template <class Item, class Visitor>
 class ZEM_EXPORT zemVMVisitor {
 public:
@@ -93,7 +96,11 @@ public:
     int initialize(const zemString& mtms, const zemString& className, int level) {
         start();
         zemCEC* const cec = m_VM->getCEC(mtms, m_Env);
-        return cec == nullptr ? -1 : on(cec, className).initialize(m_Env.m_userName, level);
+        if (cec == nullptr) {
+            return -1;
+        }
+        constexpr bool isOfPools = std::is_same_v<Visitor, zemRPVisitor>;
+        return on(cec, className).initialize(isOfPools ? className : m_Env.m_userName, level);
     }
     int initialize(const zemString& mtms, int level) { return initialize(mtms, m_Type, level); }
 

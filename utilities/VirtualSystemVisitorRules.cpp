@@ -1,7 +1,6 @@
 #include "VirtualSystemVisitorRules.h"
 
 #include <algorithm>
-#include <charconv>
 #include <cmath>
 #include <limits>
 #include <string_view>
@@ -29,24 +28,6 @@ std::int64_t processors(const zemString& text) { return kHundredths * zemNumberO
 
 /// Megabytes as kilobytes.
 std::int64_t kilobytes(const zemString& text) { return kKilobytes * zemNumberOf(text); }
-
-/// Processing units, a number with a point whatever the locale, as hundredths; halves go up.
-std::int64_t units(const zemString& text) {
-    const std::string_view number(text);
-    const std::size_t begin = std::min(number.find_first_not_of(" \t+"), number.size());
-    double value = 0;
-    std::from_chars(number.data() + begin, number.data() + number.size(), value);
-    constexpr double kHalf = 0.5;
-    value = value * static_cast<double>(kHundredths) + kHalf;
-    using Limits = std::numeric_limits<std::int64_t>;
-    if (std::isnan(value)) {
-        return 0;
-    }
-    if (std::abs(value) < static_cast<double>(Limits::max())) {
-        return static_cast<std::int64_t>(value);
-    }
-    return value < 0 ? Limits::min() : Limits::max();
-}
 
 template <class Unit>
 zemQuantities quantities(const zemAttributes& object, Unit unit, int minimum, int quantity,
@@ -93,7 +74,7 @@ zemRemoteValues runningRemote(const zemAttributes& adapter, const RemoteAttribut
     values.slot = zemNumberOf(adapter[attributes.slot]);
     values.adapterType =
         is(adapter[attributes.adapterType], "server") ? ADAPTER_SERVER : ADAPTER_CLIENT;
-    const zemString partition = adapter[attributes.partition];
+    const zemString& partition = adapter[attributes.partition];
     // The partition decides for the slot, too, whatever stands there.
     if (is(partition, "any")) {
         values.anyPartition = PARTNER_ANY;
@@ -128,6 +109,16 @@ void appendVlans(const zemString& text, zemArray<int>& vlans) {
 
 }  // namespace
 
+std::int64_t zemHundredths(const zemString& units) {
+    constexpr double kHalf = 0.5;
+    const double value = zemRealOf(std::string_view(units)) * kHundredths + kHalf;
+    using Limits = std::numeric_limits<std::int64_t>;
+    if (std::abs(value) < static_cast<double>(Limits::max())) {
+        return static_cast<std::int64_t>(value);
+    }
+    return value < 0 ? Limits::min() : Limits::max();
+}
+
 zemProcessorValues zemRunningProcessor(const zemAttributes& processor) {
     using Of = zemProcessorAttribute;
     zemProcessorValues values;
@@ -139,14 +130,14 @@ zemProcessorValues zemRunningProcessor(const zemAttributes& processor) {
         effective(processor, processors, {Of::ATTR_PEND_MIN_PROCS, Of::ATTR_CURR_MIN_PROCS},
                   Of::ATTR_RUN_PROCS, {Of::ATTR_PEND_MAX_PROCS, Of::ATTR_CURR_MAX_PROCS});
     values.units = effective(
-        processor, units, {Of::ATTR_PEND_MIN_PROC_UNITS, Of::ATTR_CURR_MIN_PROC_UNITS},
+        processor, zemHundredths, {Of::ATTR_PEND_MIN_PROC_UNITS, Of::ATTR_CURR_MIN_PROC_UNITS},
         Of::ATTR_RUN_PROC_UNITS, {Of::ATTR_PEND_MAX_PROC_UNITS, Of::ATTR_CURR_MAX_PROC_UNITS});
     return values;
 }
 
 zemProcessorValues zemProfileProcessor(const zemAttributes& profile, int pools) {
     using Of = zemProfileAttribute;
-    const zemString poolID = profile[Of::ATTR_SHARED_PROC_POOL_ID];
+    const zemString& poolID = profile[Of::ATTR_SHARED_PROC_POOL_ID];
     zemProcessorValues values;
     values.isShared = is(profile[Of::ATTR_PROC_MODE], "shared");
     values.sharingMode = profile[Of::ATTR_SHARING_MODE];
@@ -155,8 +146,8 @@ zemProcessorValues zemProfileProcessor(const zemAttributes& profile, int pools) 
     values.poolID = isTold ? poolID : zemString("0");
     values.virtuals = quantities(profile, processors, Of::ATTR_MIN_PROCS, Of::ATTR_DESIRED_PROCS,
                                  Of::ATTR_MAX_PROCS);
-    values.units = quantities(profile, units, Of::ATTR_MIN_PROC_UNITS, Of::ATTR_DESIRED_PROC_UNITS,
-                              Of::ATTR_MAX_PROC_UNITS);
+    values.units = quantities(profile, zemHundredths, Of::ATTR_MIN_PROC_UNITS,
+                              Of::ATTR_DESIRED_PROC_UNITS, Of::ATTR_MAX_PROC_UNITS);
     return values;
 }
 
@@ -194,7 +185,7 @@ zemMemoryValues zemProfileMemory(const zemAttributes& profile, int pools) {
     values.isShared = pools > 0 && is(profile[Of::ATTR_MEM_MODE], "shared");
     values.memory =
         quantities(profile, kilobytes, Of::ATTR_MIN_MEM, Of::ATTR_DESIRED_MEM, Of::ATTR_MAX_MEM);
-    const zemString entitled = profile[Of::ATTR_DESIRED_IO_ENTITLED_MEM];
+    const zemString& entitled = profile[Of::ATTR_DESIRED_IO_ENTITLED_MEM];
     if (!entitled.isEmpty() && !is(entitled, "null") && !is(entitled, "auto")) {
         values.entitled = kilobytes(entitled);
     }

@@ -28,6 +28,9 @@ struct zemQuantities {
     std::int64_t maximum = 0;
 };
 
+/// Processing units, a number with a point whatever the locale, as hundredths; halves go up.
+std::int64_t zemHundredths(const zemString& units);
+
 /// Hundredths of processors.
 struct zemProcessorValues {
     bool isShared = false;

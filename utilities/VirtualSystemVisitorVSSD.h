@@ -83,6 +83,11 @@ public:
     ///         and @p type does not ask for them
     zemVSSD* getStateVSSD(zemLPAR* lpar, zemPartitionProfileConfiguration* profile, int type);
 
+    /// The same for who has built the VSSD of the current profile anyhow, which stays as it is.
+    /// @param lpar  not null
+    /// @throws zemInvalidParameterException there is a record of processors and @p stored has none
+    zemVSSD* getStateVSSD(zemLPAR* lpar, zemVSSD& stored);
+
     // --- From records
 
     /// @param lparRecord  as getLparRecords() gives it

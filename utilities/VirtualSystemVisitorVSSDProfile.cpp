@@ -22,30 +22,29 @@ bool isWord(const zemString& text, const char* word) {
     return zemString::equalsIgnoreCase(text, word);
 }
 
-zemString lineOf(const char* name, const zemString& value) {
-    return zemString("=======getProfileVSSD:") + name + ":" + value;
-}
+constexpr char kLine[] = "=======getProfileVSSD:";
 
 std::unique_ptr<zemVSSD> makeVSSD(const zemCEC& host, const zemAttributes& lpar,
                                   const zemAttributes& profile) {
     zemLogLines lines;
-    const auto told = [&lines](const char* name, const zemAttributes& attributes, int attribute) {
-        zemString value = attributes[attribute];
-        lines.add(lineOf(name, value));
+    const auto told = [&lines](const char* name, const zemAttributes& attributes,
+                               int attribute) -> const zemString& {
+        const zemString& value = attributes[attribute];
+        lines.add({kLine, name, ":"}, value);
         return value;
     };
-    const zemString lparID = told("lparId", profile, Profile::ATTR_LPAR_ID);
-    const zemString autoStart = told("autoStart", profile, Profile::ATTR_AUTO_START);
-    const zemString lparName = told("lparName", profile, Profile::ATTR_LPAR_NAME);
-    const zemString name = told("profileName", profile, Profile::ATTR_NAME);
-    const zemString bootMode = told("bootMode", profile, Profile::ATTR_BOOT_MODE);
-    const zemString monitoring = told("connMonitoring", profile, Profile::ATTR_CONN_MONITORING);
-    const zemString slots = told("maxVirtualSlots", profile, Profile::ATTR_MAX_VIRTUAL_SLOTS);
-    const zemString lparEnv = told("lparEnv", profile, Profile::ATTR_LPAR_ENV);
-    const zemString redundant =
+    const zemString& lparID = told("lparId", profile, Profile::ATTR_LPAR_ID);
+    const zemString& autoStart = told("autoStart", profile, Profile::ATTR_AUTO_START);
+    const zemString& lparName = told("lparName", profile, Profile::ATTR_LPAR_NAME);
+    const zemString& name = told("profileName", profile, Profile::ATTR_NAME);
+    const zemString& bootMode = told("bootMode", profile, Profile::ATTR_BOOT_MODE);
+    const zemString& monitoring = told("connMonitoring", profile, Profile::ATTR_CONN_MONITORING);
+    const zemString& slots = told("maxVirtualSlots", profile, Profile::ATTR_MAX_VIRTUAL_SLOTS);
+    const zemString& lparEnv = told("lparEnv", profile, Profile::ATTR_LPAR_ENV);
+    const zemString& redundant =
         told("redundantErrPathReporting", profile, Profile::ATTR_REDUNDANT_ERR_PATH_REPORTING);
-    const zemString defaultName = told("defaultProfile", lpar, Partition::ATTR_DEFAULT_PROFILE);
-    const zemString keylock = told("keylock", lpar, Partition::ATTR_LPAR_KEYLOCK);
+    const zemString& defaultName = told("defaultProfile", lpar, Partition::ATTR_DEFAULT_PROFILE);
+    const zemString& keylock = told("keylock", lpar, Partition::ATTR_LPAR_KEYLOCK);
     auto vssd = std::make_unique<zemVSSD>(
         lparID, host.getMTMS(), lparEnv, zemNumberOf(autoStart), lparName, name, bootMode,
         zemNumberOf(monitoring), zemString::equalsIgnoreCase(defaultName, name) ? 1 : 0,
@@ -98,7 +97,7 @@ void tagSlots(const zemAttributes& profile, Tagging tagging, zemVSSD& vssd) {
     };
     const int type = zemRASDKinds::ioSlot.resourceType;
     for (const auto& row : kTags) {
-        const zemString slot = profile[row.attribute];
+        const zemString& slot = profile[row.attribute];
         if (slot.isEmpty() || isWord(slot, "null") || isWord(slot, "none") || slot == "0") {
             continue;
         }
@@ -112,7 +111,7 @@ void tagSlots(const zemAttributes& profile, Tagging tagging, zemVSSD& vssd) {
             }
         }
         if (tagging == TAG_NAMED && tagged == 0) {
-            zemLog::LogPlain(lineOf("no slot RASD", key));
+            zemLog::LogPlain(kLine + ("no slot RASD:" + key));
         }
     }
 }

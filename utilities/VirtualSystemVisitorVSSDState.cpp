@@ -21,19 +21,19 @@ using Partition = zemPartitionAttribute;
 constexpr char kClass[] = "zemVSSDVisitor";
 constexpr char kMethod[] = "getStateVSSD";
 
-/// The RASDs of a VSSD by key, in any case of letters; of two with one key the first counts.
+/// The RASDs of a VSSD by key, in any case of letters; of two with one key the first counts. Most
+/// classes look up none, for which no table is made.
 class RasdsByKey {
 public:
-    explicit RasdsByKey(zemVSSD& vssd) {
-        for (int i = 0; i < vssd.getRASDs().size(); ++i) {
-            zemRASD* const rasd = vssd.getRASDs().getElementAt(i);
-            m_rasds.emplace(lower(rasd->getKey()), rasd);
-        }
-    }
+    explicit RasdsByKey(zemVSSD& vssd) : m_vssd(vssd) {}
 
     /// Null: there is none, or it is of another kind.
     template <class Rasd>
-    const Rasd* find(const Rasd& like) const {
+    const Rasd* find(const Rasd& like) {
+        const zemDynamicArray<zemRASD>& rasds = m_vssd.getRASDs();
+        for (; m_known < rasds.size(); ++m_known) {
+            m_rasds.emplace(lower(rasds[m_known]->getKey()), rasds[m_known]);
+        }
         const auto found = m_rasds.find(lower(like.m_Data.getKey()));
         return found == m_rasds.end() ? nullptr : dynamic_cast<const Rasd*>(found->second);
     }
@@ -47,6 +47,8 @@ private:
         return text;
     }
 
+    zemVSSD& m_vssd;
+    int m_known = 0;
     std::unordered_map<std::string, const zemRASD*> m_rasds;
 };
 
@@ -108,8 +110,8 @@ public:
 private:
     void makeVSSD() {
         const zemAttributes& lpar = m_running.lpar;
-        const zemString current = lpar[Partition::ATTR_CURR_PROFILE];
-        const zemString defaultName = lpar[Partition::ATTR_DEFAULT_PROFILE];
+        const zemString& current = lpar[Partition::ATTR_CURR_PROFILE];
+        const zemString& defaultName = lpar[Partition::ATTR_DEFAULT_PROFILE];
         m_vssd = std::make_unique<zemVSSD>(
             lpar[Partition::ATTR_LPAR_ID], m_host.getMTMS(), lpar[Partition::ATTR_LPAR_ENV],
             zemNumberOf(lpar[Partition::ATTR_AUTO_START]), lpar[Partition::ATTR_NAME], current,
@@ -123,7 +125,7 @@ private:
 
     /// The mode with which processors are compatible: what is asked of the partition, or, as
     /// records do not tell that in the words of profiles, what the profile has.
-    zemString compatMode(const zemProcessorRASD& running) const {
+    zemString compatMode(const zemProcessorRASD& running) {
         const zemProcessorRASD* const stored = m_stored.find(running);
         if (m_running.isModel) {
             if (stored == nullptr) {
@@ -275,6 +277,10 @@ zemVSSD* zemVSSDVisitor::getStateVSSD(zemLPAR* lpar, zemPartitionProfileConfigur
                                                lpar->getLparID() + ") on host(" + m_CEC->getMTMS() +
                                                ").");
     }
+    return getStateVSSD(lpar, *stored);
+}
+
+zemVSSD* zemVSSDVisitor::getStateVSSD(zemLPAR* lpar, zemVSSD& stored) {
     Running running = {zemAttributes(*lpar), true, {}, {}, {}, {}, {}, {}};
     if (lpar->isLparProcessorAvailable()) {
         running.processors.emplace_back(lpar->getLparProcessor());
@@ -286,7 +292,7 @@ zemVSSD* zemVSSDVisitor::getStateVSSD(zemLPAR* lpar, zemPartitionProfileConfigur
     running.serial = attributesOf(lpar->getLparSerialAdapters());
     running.scsi = attributesOf(lpar->getLparSCSIAdapters());
     running.ethernet = attributesOf(lpar->getLparEthernetAdapters());
-    return StateBuilder(*m_CEC, running, *stored).build().release();
+    return StateBuilder(*m_CEC, running, stored).build().release();
 }
 
 zemVSSD* zemVSSDVisitor::getStateVSSD(

@@ -183,17 +183,23 @@ API char* getProperty(apiProp* record, const char* key) {
         return nullptr;
     }
     const int count = std::min<int>(record->propertyCount, API_MAX_PROPERTIES);
-    for (int i = 0; i < count; ++i) {
-        if (std::strncmp(record->name[i], key, API_TEXT_SIZE) != 0) {
+    // Readers mostly ask for the next key next, of one record after the other: the search begins
+    // behind the entry that this thread found last.
+    static thread_local int next = 0;
+    const int first = next < count ? next : 0;
+    for (int i = first, end = first + count; i < end; ++i) {
+        const int at = i < count ? i : i - count;
+        if (std::strncmp(record->name[at], key, API_TEXT_SIZE) != 0) {
             continue;
         }
-        // Entries lie far apart, and readers mostly ask for the next key next: what a record fills
-        // comes into the cache while its caller works on the value before.
-        if (i + 1 < count) {
-            __builtin_prefetch(record->name[i + 1]);
-            __builtin_prefetch(record->value[i + 1]);
+        // Entries lie far apart: what a record fills comes into the cache while its caller works
+        // on the value before.
+        next = at + 1;
+        if (next < count) {
+            __builtin_prefetch(record->name[next]);
+            __builtin_prefetch(record->value[next]);
         }
-        return record->value[i];
+        return record->value[at];
     }
     return nullptr;
 }

@@ -1,5 +1,6 @@
 // The program "appliance": makes an appliance's state, shows it and checks it, and lets tools fail.
 
+#include <poll.h>
 #include <unistd.h>
 
 #include <CLI/CLI.hpp>
@@ -8,6 +9,7 @@
 #include <cstdio>
 #include <iostream>
 #include <limits>
+#include <optional>
 
 #include "Appliances.h"
 #include "Check.h"
@@ -29,6 +31,7 @@ constexpr const char* kFooter =
 
 constexpr std::int64_t kMostHosts = 65535;  ///< MAC addresses number hosts and partitions
 constexpr std::int64_t kMostLpars = 65000;
+constexpr std::int64_t kMostPools = 64;  ///< of which a host can have no more
 
 /// Tells a watching person how far a long work is; says nothing before two seconds are over.
 class Progress {
@@ -77,9 +80,9 @@ void showState(const std::string& format) {
     std::cout << (format == "json" ? showJson(store) : showText(store));
 }
 
-void showJournal(std::int64_t after, bool asJson) {
+/// Prints the lines behind the one with the number @p after; gives the number of the last one.
+std::int64_t printJournal(Store& store, std::int64_t after, bool asJson) {
     constexpr std::int64_t kAtOnce = 1000;
-    Store store = Store::open(Database::Access::Read);
     const Transaction picture = store.read();
     for (auto lines = store.journal(after, kAtOnce); !lines.empty();
          lines = store.journal(after, kAtOnce)) {
@@ -88,6 +91,36 @@ void showJournal(std::int64_t after, bool asJson) {
         }
         after = lines.back().first;
     }
+    return after;
+}
+
+/// Whether whoever read standard output has gone; takes @p milliseconds to find that it has not.
+bool isReaderGone(int milliseconds) {
+    pollfd out = {STDOUT_FILENO, 0, 0};
+    return poll(&out, 1, milliseconds) > 0 && (out.revents & (POLLERR | POLLHUP)) != 0;
+}
+
+/// Prints where the journal ends, which tells the reader that nothing is missed from here on, and
+/// then each line that comes, until nobody reads it.
+void followJournal(std::optional<std::int64_t> after, bool asJson) {
+    constexpr int kPause = 10;
+    Store store = Store::open(Database::Access::Read);
+    std::int64_t last = after ? *after : store.journalEnd();
+    std::cout << (asJson ? "{\"number\":" + std::to_string(last) + "}\n"
+                         : std::to_string(last) + '\n');
+    do {
+        last = printJournal(store, last, asJson);
+        std::cout.flush();
+    } while (std::cout && !isReaderGone(kPause));
+}
+
+void showJournal(std::optional<std::int64_t> after, bool asJson, bool follow) {
+    if (follow) {
+        followJournal(after, asJson);
+        return;
+    }
+    Store store = Store::open(Database::Access::Read);
+    printJournal(store, after.value_or(0), asJson);
 }
 
 int checkState() {
@@ -101,10 +134,10 @@ int checkState() {
 }
 
 struct Options {
-    bool force = false, asJson = false;
+    bool force = false, asJson = false, follow = false;
     Size size{3, 10, 1};
     std::string format = "text";
-    std::int64_t after = 0;
+    std::optional<std::int64_t> after;
     FaultOptions fault;
     int status = 0;  ///< what a verb that did its work ends with
 };
@@ -129,6 +162,9 @@ void addMakers(CLI::App& app, Options& options) {
     generate->add_option("--lpars", size.lpars, "How many partitions each host has")
         ->check(CLI::Range(std::int64_t{0}, kMostLpars))
         ->capture_default_str();
+    generate->add_option("--pools", size.pools, "How many shared processor pools each host has")
+        ->check(CLI::Range(std::int64_t{1}, kMostPools))
+        ->capture_default_str();
     generate->add_option("--seed", size.seed, "Start of the random choices")->capture_default_str();
 }
 
@@ -140,11 +176,14 @@ void addReaders(CLI::App& app, Options& options) {
         ->capture_default_str();
     CLI::App* journal = app.add_subcommand(
         "journal", "Show the journal of changes, each with its number: oldest first.");
-    journal->callback([&options] { showJournal(options.after, options.asJson); });
+    journal->callback([&options] { showJournal(options.after, options.asJson, options.follow); });
     journal->add_option("--after", options.after, "Only changes behind the one with this number")
-        ->check(CLI::NonNegativeNumber)
-        ->capture_default_str();
+        ->check(CLI::NonNegativeNumber);
     journal->add_flag("--json", options.asJson, "A JSON object in a line for each change");
+    journal->add_flag(
+        "--follow", options.follow,
+        "Wait for further changes until nobody reads them; without --after, only those "
+        "from now on. The first line is the number behind which they begin");
     app.add_subcommand("check",
                        "Check that the state obeys the rules of hosts, and print those that it "
                        "breaks.")

@@ -17,6 +17,7 @@ struct Size {
     std::int64_t hosts;
     std::int64_t lpars;  ///< of each host
     std::uint64_t seed;
+    std::int64_t pools = 1;  ///< shared processor pools of each host
 };
 
 /// Any number of hosts and partitions; the same for the same Size on every machine.

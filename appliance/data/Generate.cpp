@@ -3,6 +3,7 @@
 
 #include "Appliances.h"
 #include "Builder.h"
+#include "Text.h"
 
 namespace appliance {
 
@@ -69,16 +70,25 @@ void addHost(Store& store, Dice& dice, const Size& size, std::int64_t number) {
     host.mem = kFirmwareMem + 4 * kMemRegion;
     host.procUnits = 400;
     std::vector<LparPlan> lpars;
+    std::vector<std::int64_t> pools(static_cast<std::size_t>(size.pools));  // units of each
     for (std::int64_t id = 1; id <= size.lpars; ++id) {
         lpars.push_back(lparPlan(dice, id, servers, state, host.name + "-lpar-"));
-        host.mem += lpars.back().mem;
-        host.procUnits += lpars.back().procUnits;
+        LparPlan& plan = lpars.back();
+        plan.procPool = id % size.pools;
+        pools[static_cast<std::size_t>(plan.procPool)] += plan.procUnits;
+        host.mem += plan.mem;
+        host.procUnits += plan.procUnits;
     }
     host.procUnits = (host.procUnits + 99) / 100 * 100;
 
     HostBuilder builder(store, number, host);
     for (const LparPlan& lpar : lpars) {
         builder.add(lpar);
+    }
+    for (std::int64_t pool = 1; pool < size.pools; ++pool) {
+        Object& object = builder.add(Kind::ProcPool, {number, 0, pool});
+        object.set("name", "pool-" + padded(pool, 2));
+        object.set("max_pool_proc_units", units(pools[static_cast<std::size_t>(pool)] + 100));
     }
     builder.host().set("max_lpars", std::to_string(std::max<std::int64_t>(1000, size.lpars)));
     builder.finish();

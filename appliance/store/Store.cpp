@@ -164,6 +164,11 @@ std::vector<std::pair<std::int64_t, std::string>> Store::journal(std::int64_t af
     return lines;
 }
 
+std::int64_t Store::journalEnd() {
+    Statement query(*m_database, "SELECT ifnull(max(number), 0) FROM journal");
+    return query.step() ? query.integer(0) : 0;
+}
+
 std::vector<Object> Store::all(Kind kind) { return select(*m_database, kind, ""); }
 
 std::vector<Object> Store::all(Kind kind, std::int64_t host) {

@@ -55,6 +55,8 @@ public:
     /// numbers start from 1 and are never used again. At most @p most lines.
     std::vector<std::pair<std::int64_t, std::string>> journal(std::int64_t after,
                                                               std::int64_t most);
+    /// The number of the last line; 0 when there is none.
+    std::int64_t journalEnd();
 
     /// All objects of @p kind, by host, partition and number.
     std::vector<Object> all(Kind kind);

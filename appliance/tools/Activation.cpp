@@ -128,7 +128,11 @@ void Activation::setMemory(const Object& before, const Object& profile, Object& 
         share = region;
     }
     granted("pend_avail_pool_mem", room(kEntitlement, before), 1, share, share);
-    setQuantity(lpar, profile, "mem", text(wanted));
+    // However much of it others use: a partition sees no more memory than the host has.
+    const char* const all = "configurable_sys_mem";
+    const std::int64_t most = number(valueOf({&m_host, &m_host.host()}, all));
+    const std::int64_t given = granted(all, most, region, number(profile.get("min_mem")), wanted);
+    setQuantity(lpar, profile, "mem", text(given));
     lpar.set("pend_io_entitled_mem", text(share));
     lpar.set("auto_io_entitled_mem", entitled == "auto" ? "1" : "0");
 }

@@ -100,6 +100,8 @@ void changeMemory(Change& change, const Operation& operation) {
                     sign * size * 100);
     } else {
         // The memory itself comes from the pool as it is used; what I/O may hold is promised.
+        requireFree({&host, &host.host()}, "configurable_sys_mem",
+                    hundredths(lpar.get("pend_mem")));
         add(lpar, "io_entitled_mem", sign * entitled * 100, 0, hundredths(lpar.get("pend_mem")));
         if (entitled != 0) {
             lpar.set("auto_io_entitled_mem", "0");

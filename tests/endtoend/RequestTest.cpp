@@ -171,11 +171,18 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
     const std::string adapter =
         R"('ORXC_SCSIAdapterRASettingData.InstanceID="ORX:4*3*4*1111-AAA*0000001"')";
     const std::string link = R"('ORXC_HostConnection.InstanceID="ORX:1111-AAA*0000001:primary"')";
+    const std::string whole =
+        R"('ORXC_ProcessorPool.InstanceID="ORX:3-Primordial*1111-AAA*0000001"')";
+    const std::string pool = R"('ORXC_ProcessorPool.InstanceID="ORX:3-1*1111-AAA*0000001"')";
+    const std::string most =
+        R"('ORXC_MemoryRASettingData.InstanceID="ORX:DMAX:4-Primordial*1111-AAA*0000001"')";
+    const std::string service =
+        R"('ORXC_SerialAdapterPoolConfigurationService.SystemCreationClassName="ORXC_CEC_CS",)"
+        R"(SystemName="1111-AAA*0000001",Name="ORX:SerialAdapterPoolService:1111-AAA*0000001",)"
+        R"(CreationClassName="ORXC_SerialAdapterPoolConfigurationService"')";
     const Association rows[] = {
         {"ORXC_HostedPartition", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
          "ORXC_LPAR_CS", 7, 14},
-        {"ORXC_HostedService", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
-         "ORXC_VirtualSystemManagementService", 1, 4},
         {"ORXC_ConnectedHost", "CIM_Dependency", "Antecedent", "Dependent", kHost,
          "ORXC_HostConnection", 2, 8},
         {"ORXC_HostComponent", "CIM_Component", "GroupComponent", "PartComponent", kHost,
@@ -194,6 +201,26 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
          "CIM_ResourceAllocationSettingData", 8, 187},
         {"ORXC_VSSDComponent", "CIM_VirtualSystemSettingDataComponent", "PartComponent",
          "GroupComponent", adapter, "CIM_SettingData", 1, 187},
+        {"ORXC_HostedResourcePool", "CIM_Component", "GroupComponent", "PartComponent", kHost,
+         "CIM_ResourcePool", 9, 30},
+        {"ORXC_HostedService", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
+         "CIM_Service", 7, 28},
+        {"ORXC_ServiceAffectsElement", "CIM_ServiceAffectsElement", "AffectedElement",
+         "AffectingElement", pool, "CIM_EnabledLogicalElement", 1, 30},
+        {"ORXC_ElementCapabilities", "CIM_ElementCapabilities", "ManagedElement", "Capabilities",
+         pool, "CIM_AllocationCapabilities", 1, 54},
+        {"ORXC_ElementCapabilities", "CIM_ElementCapabilities", "ManagedElement", "Capabilities",
+         service, "CIM_ResourcePoolConfigurationCapabilities", 1, 54},
+        {"ORXC_SettingsDefineCapabilities", "CIM_Component", "PartComponent", "GroupComponent",
+         most, "CIM_Capabilities", 1, 120},
+        {"ORXC_ElementAllocatedFromPool", "CIM_Dependency", "Antecedent", "Dependent", whole,
+         "ORXC_ProcessorPool", 2, 6},
+        {"ORXC_ElementAllocatedFromPool", "CIM_Dependency", "Dependent", "Antecedent", pool,
+         "CIM_ResourcePool", 1, 6},
+        {"ORXC_ResourceAllocationFromPool", "CIM_Dependency", "Antecedent", "Dependent", pool,
+         "CIM_ResourceAllocationSettingData", 2, 80},
+        {"ORXC_ResourceAllocationFromPool", "CIM_Dependency", "Dependent", "Antecedent", adapter,
+         "CIM_ResourcePool", 1, 80},
     };
     std::map<std::string, std::vector<std::string>> known;
     const auto answers = [&](const std::string& arguments) {

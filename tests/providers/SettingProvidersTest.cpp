@@ -1,5 +1,6 @@
-// The settings of partitions as a server sees them, beside what the tools print of the same
-// partitions, and what they cost in calls of the management library.
+// The settings of partitions, and the pools from which these take their resources, as a server sees
+// them, beside what the tools print of the same, and what they cost in calls of the management
+// library.
 #include <cmath>
 #include <map>
 #include <regex>
@@ -24,7 +25,20 @@ constexpr const char* kClasses[] = {kSystem,
                                     "ORXC_SCSIAdapterRASettingData",
                                     "ORXC_SerialAdapterRASettingData"};
 
-ObjectPath settings(const char* className, const std::string& id) {
+/// The classes of pools, of one kind of resource after the other, in the order of kClasses.
+const std::vector<std::string> kPoolClasses = [] {
+    std::vector<std::string> names;
+    for (const char* kind :
+         {"Processor", "Memory", "IOSlot", "EthernetAdapter", "SCSIAdapter", "SerialAdapter"}) {
+        for (const char* role : {"Pool", "AllocationCapabilities", "PoolConfigurationCapabilities",
+                                 "PoolConfigurationService"}) {
+            names.push_back(std::string("ORXC_") + kind + role);
+        }
+    }
+    return names;
+}();
+
+ObjectPath settings(const std::string& className, const std::string& id) {
     return {"root/cimv2", className, {{"InstanceID", id}}};
 }
 
@@ -48,18 +62,18 @@ std::string shown(const std::string& value, const std::string& scale) {
 
 class SettingProvidersTest : public ServedProviders {
 protected:
-    std::deque<Instance> all(const char* className) {
+    std::deque<Instance> all(const std::string& className) {
         const Reply reply = m_server->enumInstances(m_request, {"root/cimv2", className});
         EXPECT_EQ(reply.rc, CMPI_RC_OK) << className << reply.message;
         return reply.instances;
     }
 
-    /// Those whose InstanceIDs begin and end with these.
-    std::vector<Instance> some(const char* className, const std::string& front,
+    /// Those whose InstanceIDs, or Names, begin and end with these.
+    std::vector<Instance> some(const std::string& className, const std::string& front,
                                const std::string& back) {
         std::vector<Instance> found;
         for (const Instance& each : all(className)) {
-            const std::string id = textOf(each, "InstanceID");
+            const std::string id = textOf(each, "InstanceID") + textOf(each, "Name");
             if (id.rfind(front, 0) == 0 && id.size() > back.size() &&
                 id.compare(id.size() - back.size(), back.size(), back) == 0) {
                 found.push_back(each);
@@ -69,13 +83,13 @@ protected:
     }
 };
 
-// Of partition 4 but where it is said; "Property=attribute*scale", or what all have.
+// Of partition 4 but where it is said, or of pools; "Property=attribute*scale", or what all have.
 TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
     const std::string here = " -m '1111-AAA*0000001' --filter lpar_ids=";
     const struct {
         const char* className;
         const char* front;
-        const char* partition;
+        std::string partition;
         const char* query;
         std::string properties;
     } rows[] = {
@@ -106,7 +120,7 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
          "VirtualQuantity=run_mem*1024 Reservation=run_io_entitled_mem*1024 Weight=run_mem_weight "
          "ConsumerVisibility:3 PoolID:0 Limit:"},
         {kClasses[3], "ORX:4*", "6", "qyalloc -r io --rsubtype slot",
-         "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} AllocationUnits:Slot"},
+         "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} IsVirtualized:false"},
         {kClasses[4], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype eth --level lpar",
          "SlotID=slot_num Address=mac_addr PortVLANID=port_vlan_id AddVLANIDs=addl_vlan_ids "
          "IEEECompatible=ieee_virtual_eth TrunkPriority=trunk_priority IsRequired=is_required"},
@@ -115,16 +129,45 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
          "RemoteSlotID=remote_slot_num IsRequired=is_required"},
         {kClasses[6], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype serial --level lpar",
          "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id "
-         "RemoteSlotID=remote_slot_num IsRequired=is_required AutomaticDeallocation:false"},
+         "RemoteSlotID=remote_slot_num IsRequired=is_required IsVirtualized:true"},
+        {"ORXC_ProcessorPool", "ORX:3-Primordial", "", "qyalloc -r proc --level sys",
+         "Capacity=configurable_sys_proc_units*100 InstalledCapacity=installed_sys_proc_units*100 "
+         "Reserved:1050 Primordial:true PoolID:Primordial ResourceType:3 AllocationUnits:Percent "
+         "ConsumedResourceUnits:Percent"},
+        {"ORXC_ProcessorPool", "ORX:3-1", "", "qyalloc -r procpool --filter pool_ids=1",
+         "Capacity=max_pool_proc_units*100 Reserved:375 InstalledCapacity: Primordial:false "
+         "PoolID=shared_proc_pool_id ElementName=shared_proc_pool_id"},
+        {"ORXC_MemoryPool", "ORX:4-Primordial", "", "qyalloc -r mem --level sys",
+         "Capacity=configurable_sys_mem*1024 InstalledCapacity=installed_sys_mem*1024"},
+        {"ORXC_MemoryPool", "ORX:4-0", "", "qyalloc -r mempool",
+         "Capacity=pend_pool_mem*1024 InstalledCapacity=curr_pool_mem*1024 Reserved:524288"},
+        {"ORXC_IOSlotPool", "ORX:12-", "", "qyalloc -r mem --level sys",
+         "Capacity:7 Reserved:5 InstalledCapacity: AllocationUnits:Slot"},
+        {"ORXC_MemoryAllocationCapabilities", "ORX:Shared:4-0", "", "qyalloc -r mempool",
+         "ResourceType:4 RequestTypesSupported:3 SharingMode:3"},
+        {"ORXC_MemoryPoolConfigurationService", "ORX:MemoryPoolService:", "",
+         "qyalloc -r mem --level sys",
+         "SystemName:1111-AAA*0000001 SystemCreationClassName:ORXC_CEC_CS Started:true"},
+        {"ORXC_ProcessorPoolConfigurationService", "ORXCORAL:ProcessorPoolService:", "",
+         "qyalloc -r mem --level sys", "CreationClassName:ORXC_ProcessorPoolConfigurationService"},
+        {kClasses[1], "ORX:SMIN:3-1", "", "qyalloc -r proc --level sys",
+         "Reservation=min_proc_units_per_virtual_proc*100 VirtualQuantity:100 Limit: PoolID:1 "
+         "ElementName:SMIN:3-1 VirtualQuantityUnits:Percent"},
+        {kClasses[2], "ORX:DDEF:4-Primordial", "", "qyalloc -r mem --level sys",
+         "Reservation=mem_region_size*1024 Minimum=mem_region_size*1024 Limit=mem_region_size*2048 "
+         "VirtualQuantity: PoolID:Primordial ResourceType:4 AllocationUnits:byte*2^10"},
+        {kClasses[4], "ORX:DMAX:10-", "", "qyalloc -r mem --level sys", "VirtualQuantity:65534"},
     };
     for (const auto& row : rows) {
-        std::string query = row.query + here + row.partition;
+        std::string query =
+            row.query + (row.partition.empty() ? " -m 1111-AAA*0000001" : here + row.partition);
         if (std::string(row.front) == "ORX:2*small") {
             query += R"(',"profile_names=small, ""safe"""')";
         }
         const std::vector<std::string> records = lines(m_appliance.run(query).out);
         const std::vector<Instance> found =
-            some(row.className, row.front, row.partition + std::string("*1111-AAA*0000001"));
+            some(row.className, row.front,
+                 row.partition.empty() ? "1111-AAA*0000001" : row.partition + "*1111-AAA*0000001");
         ASSERT_EQ(found.size(), records.size()) << row.className << row.front << query;
         for (std::size_t i = 0; i < found.size(); ++i) {
             std::map<std::string, std::string> fields;
@@ -151,21 +194,28 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
 }
 
 TEST_P(SettingProvidersTest, EverySettingIsFoundByItsNameAndHasOnlyWantedProperties) {
-    for (const char* name : kClasses) {
+    std::vector<std::string> classes = kPoolClasses;
+    classes.insert(classes.end(), std::begin(kClasses), std::end(kClasses));
+    for (const std::string& name : classes) {
         const std::deque<Instance> found = all(name);
-        ASSERT_GT(found.size(), 14u) << name;
+        ASSERT_GE(found.size(), 4u) << name;
         std::deque<ObjectPath> paths;
         for (const Instance& each : found) {
             EXPECT_TRUE(m_server->getInstance(m_request, each.path).instances.at(0) == each)
-                << textOf(each, "InstanceID");
+                << plainText(Value(each.path));
             paths.push_back(each.path);
         }
         EXPECT_EQ(m_server->enumInstanceNames(m_request, {"root/cimv2", name}).paths, paths);
 
+        ObjectPath wrong = paths.back();
+        wrong.keys.set(wrong.keys.begin()->name, std::string("ORXC_LPAR_CS"));
+        EXPECT_EQ(m_server->getInstance(m_request, wrong).rc, CMPI_RC_ERR_NOT_FOUND) << name;
+
         m_request.properties = {{"ElementName"}};
         const Instance one = m_server->getInstance(m_request, paths.back()).instances.at(0);
         EXPECT_EQ(textOf(one, "ElementName"), textOf(found.back(), "ElementName"));
-        for (const char* other : {"HostName", "ResourceType", "VirtualQuantityUnits", "SlotID"}) {
+        for (const char* other : {"HostName", "ResourceType", "VirtualQuantityUnits", "SlotID",
+                                  "Capacity", "Caption"}) {
             EXPECT_EQ(textOf(one, other), "") << name << other;
         }
         m_request.properties.reset();
@@ -198,10 +248,19 @@ TEST_P(SettingProvidersTest, NamesOfNothingAreNotFound) {
         {"ORX:2*other-4*1111-AAA*0000001", true},
         {"ORX:2*normal-99*4*1111-AAA*0000001", true},
         {"ORX:4*04*1111-AAA*0000001", true},
+        {"ORX:3-Primordial", false},
+        {"ORX:3-Primordial*\" -m *0000001", false},
+        {"ORX:5-Primordial*1111-AAA*0000001", false},
+        {"ORX:3-Primordial*9999-ZZZ*0000009", true},
+        {"ORX:3-64*1111-AAA*0000001", true},
+        {"ORX:DMIN:3-0*1111-AAA*0000001", true},
+        {"ORX:SMIN:10-Primordial*1111-AAA*0000001", true},
     };
+    std::vector<std::string> classes = {kPoolClasses[0], kPoolClasses[5], kPoolClasses[10]};
+    classes.insert(classes.end(), std::begin(kClasses), std::end(kClasses));
     for (const auto& row : rows) {
         librarySpy.names.clear();
-        for (const char* name : kClasses) {
+        for (const std::string& name : classes) {
             EXPECT_EQ(m_server->getInstance(m_request, settings(name, row.id)).rc,
                       CMPI_RC_ERR_NOT_FOUND)
                 << name << ' ' << row.id;
@@ -218,21 +277,33 @@ TEST_P(SettingProvidersTest, NamesOfNothingAreNotFound) {
     EXPECT_EQ(m_server->getInstance(m_request, stopped).rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-// An enumeration, and a get of the last one that it found.
+// An enumeration, and a get of the last one that it found: of the settings of partitions, and,
+// behind those, of the pools of the same kind.
 TEST_P(SettingProvidersTest, CollectionsAreAskedForOnceWhateverTheNumberOfPartitions) {
     const struct {
-        const char* all;
-        const char* one;
+        std::string all, one;           // of partitions
+        std::string pools, quantities;  // of pools: what is read for names, and what besides
+        std::string pool, ofOne;        // of those of one host
     } rows[] = {
         // as the classes
-        {"", ""},
+        {},
         {"getAllCecProcessorCfg getAllLparProcessorCfgs ",
-         "getCecProcessorCfg getLparProcessorCfg "},
-        {"getAllCecMemoryCfg getAllLparMemoryCfgs ", "getCecMemoryCfg getLparMemoryCfg "},
-        {"getAllIoSlots ", "getLparIoSlots "},
-        {"getAllLparVirtualEthernet ", "getLparVirtualEthernet "},
-        {"getAllLparVirtualScsi ", "getLparVirtualScsi "},
-        {"getAllLparVirtualSerial ", "getLparVirtualSerial "},
+         "getCecProcessorCfg getLparProcessorCfg ",
+         "getAllCecProcessorCfg getAllCecProcessorPoolCfg ",
+         "getAllCecs getAllLpars getAllLparProcessorCfgs ",
+         "getCecProcessorCfg getCecProcessorPoolCfg ",
+         "getCecObj getAllLparsFromCec getAllLparProcessorCfg "},
+        {"getAllCecMemoryCfg getAllLparMemoryCfgs ", "getCecMemoryCfg getLparMemoryCfg ",
+         "getAllCecMemoryCfg getAllCecMemoryPoolCfgs ", "getAllLpars getAllLparMemoryCfgs ",
+         "getCecMemoryCfg getCecMemoryPoolCfg ", "getAllLparsFromCec getAllLparMemoryCfg "},
+        {"getAllIoSlots ", "getLparIoSlots ", "", "getAllLpars getAllIoSlots getAllIoSlots ", "",
+         "getAllLparsFromCec getIoSlots getIoSlots "},
+        {"getAllLparVirtualEthernet ", "getLparVirtualEthernet ", "",
+         "getAllLpars getAllLparVirtualEthernet ", "", "getAllLparsFromCec getVirtualEthernet "},
+        {"getAllLparVirtualScsi ", "getLparVirtualScsi ", "", "getAllLpars getAllLparVirtualScsi ",
+         "", "getAllLparsFromCec getVirtualScsi "},
+        {"getAllLparVirtualSerial ", "getLparVirtualSerial ", "",
+         "getAllLpars getAllLparVirtualSerial ", "", "getAllLparsFromCec getVirtualSerial "},
     };
     const auto calls = [] {
         std::string names;
@@ -242,15 +313,23 @@ TEST_P(SettingProvidersTest, CollectionsAreAskedForOnceWhateverTheNumberOfPartit
         return names;
     };
     calls();
-    for (const char* size : {"true", "appliance generate --hosts 2 --lpars 40 --force"}) {
+    for (const char* size :
+         {"true", "appliance generate --hosts 2 --lpars 40 --pools 64 --force"}) {
         ASSERT_EQ(m_appliance.run(size).exit, 0);
         for (std::size_t i = 0; i < std::size(kClasses); ++i) {
-            const std::deque<Instance> found = all(kClasses[i]);
-            EXPECT_EQ(calls(),
-                      std::string("getAllCecs getAllLpars getAllLparProfiles ") + rows[i].all);
+            const auto& row = rows[i];
+            const std::string ofPools = i == 0 ? "" : "getAllCecs " + row.pools + row.quantities;
+            std::vector<Instance> found = some(kClasses[i], "ORX:2*", "");
+            EXPECT_EQ(calls(), "getAllCecs getAllLpars getAllLparProfiles " + row.all + ofPools);
             m_server->getInstance(m_request, found.back().path);
-            EXPECT_EQ(calls(), std::string("getCecObj getLparObj getAllLparProfilesFromLpar ") +
-                                   rows[i].one);
+            EXPECT_EQ(calls(), "getCecObj getLparObj getAllLparProfilesFromLpar " + row.one);
+            for (std::size_t role = 0; i > 0 && role < 4; ++role) {
+                const std::string& name = kPoolClasses[4 * (i - 1) + role];
+                found = some(name, "", "");
+                EXPECT_EQ(calls(), role == 0 ? ofPools : "getAllCecs " + row.pools) << name;
+                m_server->getInstance(m_request, found.back().path);
+                EXPECT_EQ(calls(), "getCecObj " + row.pool + (role == 0 ? row.ofOne : "")) << name;
+            }
         }
     }
     // associations look for what could belong to their source
@@ -258,6 +337,38 @@ TEST_P(SettingProvidersTest, CollectionsAreAskedForOnceWhateverTheNumberOfPartit
     EXPECT_FALSE(m_server->associatorNames(m_request, system, {}).paths.empty());
     EXPECT_EQ(calls().find("getAllLpars "), std::string::npos);
     EXPECT_EQ(librarySpy.held, 0);
+}
+
+// Through an association that is read at once; the primordial pool counts what its parts have
+// given.
+TEST_P(SettingProvidersTest, PoolsOfProcessorsHaveGivenWhatPartitionsHave) {
+    ASSERT_EQ(m_appliance.run("appliance generate --hosts 3 --lpars 40 --pools 9 --force").exit, 0);
+    std::map<std::string, long> held, given;
+    std::map<std::string, std::string> quantities;
+    for (const Instance& each : all(kClasses[1])) {
+        quantities[textOf(each, "InstanceID")] = textOf(each, "Reservation");
+    }
+    librarySpy.names.clear();
+    for (const Instance& each : all("ORXC_ResourceAllocationFromPool")) {
+        const auto idOf = [&](const char* end) {
+            return each.properties.find(end)->reference().keys.begin()->value.text();
+        };
+        const std::string pool = idOf("Antecedent");
+        if (pool.rfind("ORX:3-", 0) == 0) {
+            const long units = std::stol(quantities.at(idOf("Dependent")));
+            held[pool] += units;
+            held["ORX:3-Primordial" + pool.substr(pool.find('*'))] +=
+                pool.find("Primordial") == pool.npos ? units : 0;
+        }
+    }
+    EXPECT_LT(librarySpy.names.size(), 70u);
+    for (const Instance& each : all("ORXC_ProcessorPool")) {
+        const std::string pool = textOf(each, "InstanceID");
+        given[pool] = std::stol(textOf(each, "Reserved"));
+        held[pool] += 0;
+    }
+    EXPECT_EQ(given.size(), 30u);
+    EXPECT_EQ(held, given);
 }
 
 TEST_P(SettingProvidersTest, ProfilesTellWhichIsTheDefaultAndWhichRuns) {

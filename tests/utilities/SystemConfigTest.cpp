@@ -2,7 +2,6 @@
 #include <sched.h>
 #include <sys/mount.h>
 
-#include <sstream>
 #include <tuple>
 
 #include "DNXApiCaller.h"
@@ -10,6 +9,7 @@
 #include "EdplatCmdCaller.h"
 #include "EdpowerCaller.h"
 #include "EdsuspCaller.h"
+#include "Joined.h"
 #include "LibraryFaults.h"
 #include "LibraryRecords.h"
 #include "LibrarySpy.h"
@@ -25,13 +25,6 @@ using Partition = zemVirtualSystem;
 using Profile = zemVirtualSystemProfile;
 
 constexpr char kHost[] = "1111-AAA*0000001";
-
-template <class... Values>
-std::string joined(const Values&... values) {
-    std::ostringstream text;
-    ((text << values << '|'), ...);
-    return text.str();
-}
 
 class SystemConfigTest : public testing::Test {
 protected:

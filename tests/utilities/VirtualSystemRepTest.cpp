@@ -1,9 +1,9 @@
 #include <gtest/gtest.h>
 
-#include <sstream>
 #include <tuple>
 
 #include "FailingAllocation.h"
+#include "Joined.h"
 #include "LibraryFaults.h"
 #include "LibrarySpy.h"
 #include "QyplatCmdCaller.h"
@@ -22,13 +22,6 @@ static_assert(VISITOR_TYPE_LPAR_KEY == 0x100 && VISITOR_TYPE_VSSD_KEY == 0x400 &
               VISITOR_TYPE_RASD_PROC_KEY == 0x1000 && VISITOR_TYPE_RASD_MEM == 0x8000 &&
               VISITOR_TYPE_RASD_IOSLOT == 0x20000 && VISITOR_TYPE_RASD_VSCSI == 0x80000 &&
               VISITOR_TYPE_RASD_VSERIAL == 0x200000 && VISITOR_TYPE_RASD_VETH == 0x800000);
-
-template <class... Values>
-std::string joined(const Values&... values) {
-    std::ostringstream text;
-    ((text << values << '|'), ...);
-    return text.str();
-}
 
 TEST(VirtualSystemRepTest, SettersTakeWhatTheLibraryTells) {
     zemLPAR l("7");
@@ -229,7 +222,7 @@ void buildAndDrop(int partitions) {
         host.addLpar(lpar.release());
     }
     host.getLparHashMapping();
-    host.getRPs().addElement(new zemResourcePool);
+    host.getRPs().addElement(new zemMemoryPool);
     host.buildupVirtualLpar();
     host.buildupVirtualLpar();
     host.releaseVirtualLpar();
@@ -344,8 +337,10 @@ TEST_F(InitializeTest, AsksOnceForEachListOfAdapters) {
     const std::tuple<int, const char*, std::string> rows[] = {
         {VISITOR_TYPE_VSSD_INIT, "Serial", both + profiles},
         {VISITOR_TYPE_VSSD_INIT_NI, "Serial", partition},
-        {VISITOR_TYPE_RASD_INIT, "Processor", both},
-        {VISITOR_TYPE_RASD_INIT, "Memory", both},
+        {VISITOR_TYPE_RASD_INIT, "Processor", both + profile + profile + profile + "qyalloc -r proc --level lpar" + system + "-F lpar_id,curr_proc_mode,curr_min_proc_units,curr_max_proc_units,curr_min_procs,"
+            "curr_max_procs,curr_sharing_mode,pend_shared_proc_pool_id,pend_min_proc_units,pend_max_proc_units,pend_min_procs,pend_max_procs,run_proc_units,run_procs,run_uncap_weight\n"},
+        {VISITOR_TYPE_RASD_INIT, "Memory", both + profile + profile + "qyalloc -r mem --level lpar" + system + "-F lpar_id,curr_min_mem,curr_max_mem,pend_min_mem,pend_max_mem,run_mem,mem_mode,run_mem_weight,run_io_entitled_mem\n"},
+        {VISITOR_TYPE_RASD_INIT_NI, "Processor", both},
         {VISITOR_TYPE_RASD_INIT, "IOSlotAdapter", both},
         {VISITOR_TYPE_RASD_INIT, "Other", both},
         {VISITOR_TYPE_RASD_INIT, "EthernetAdapter", partition + profile + "getLparVirtualEthernet " + profile},

@@ -4,6 +4,7 @@
 #include <sstream>
 
 #include "FailureText.h"
+#include "Joined.h"
 #include "SystemStateText.h"
 #include "VirtualSystemResource.h"
 
@@ -16,13 +17,6 @@ using Serial = zemPartitionSerialAdapterResource;
 using Scsi = zemPartitionSCSIAdapterResource;
 using Ethernet = zemPartitionEthernetAdapterResource;
 using Profile = zemPartitionProfileConfiguration;
-
-template <class... Values>
-std::string joined(const Values&... values) {
-    std::ostringstream text;
-    ((text << values << '|'), ...);
-    return text.str();
-}
 
 /// What a field holds after it was set.
 #define STORED(CLASS, FIELD)                     \

@@ -5,6 +5,7 @@
 #include <optional>
 #include <sstream>
 
+#include "Joined.h"
 #include "LibraryFaults.h"
 #include "LibraryRecords.h"
 #include "LibrarySpy.h"
@@ -17,13 +18,6 @@ namespace {
 using Visitor = zemCECVisitor;
 
 constexpr char kHost[] = "1111-AAA*0000001";
-
-template <class... Values>
-std::string joined(const Values&... values) {
-    std::ostringstream text;
-    ((text << values << '|'), ...);
-    return text.str();
-}
 
 /// A collection's operation, whether its records hang on partitions or on hosts.
 template <class Record>
@@ -136,6 +130,7 @@ const Reader kReaders[] = {
     {READER(getAllProcessorPoolByKeys, zemProcessorPoolResource, OfHosts), {"getAllCecProcessorPoolCfg", "getCecProcessorPoolCfg"}, "1", ON_HOSTS(initializeProcessorPool, getProcessorPool)},
     {READER(getAllMemoryLevelSysByKeys, zemSystemMemoryResource, OfHosts), {"getAllCecMemoryCfg", "getCecMemoryCfg"}, "1", ON_HOSTS(initializeMemoryLevelSys, getMemoy)},
     {READER(getAllMemoryPoolByKeys, zemMemoryPoolResource, OfHosts), {"getAllCecMemoryPoolCfgs", "getCecMemoryPoolCfg"}, "1", ON_HOSTS(initializeMemoryPool, getMemoyPool)},
+    {READER(getAllIOSlotLevelSysByKeys, zemHardwareResource, OfHosts), {"getAllIoSlots", "getIoSlots"}, "1", [](Visitor& v) { return v.initializeIOSlotLevelSys("u", Visitor::Level_All); }, [](zemCEC& host) { return host.getIOSlotCount(); }},
 };
 // clang-format on
 

@@ -5,6 +5,7 @@
 #include <memory>
 #include <sstream>
 
+#include "Joined.h"
 #include "LibraryFaults.h"
 #include "LibraryRecords.h"
 #include "LibrarySpy.h"
@@ -26,13 +27,6 @@ constexpr char kHost[] = "1111-AAA*0000001";
 constexpr int kAllKinds = VISITOR_TYPE_RASD_PROC | VISITOR_TYPE_RASD_MEM |
                           VISITOR_TYPE_RASD_IOSLOT | VISITOR_TYPE_RASD_VSCSI |
                           VISITOR_TYPE_RASD_VSERIAL | VISITOR_TYPE_RASD_VETH;
-
-template <class... Values>
-std::string joined(const Values&... values) {
-    std::ostringstream text;
-    ((text << values << '|'), ...);
-    return text.str();
-}
 
 /// A record of a tool, of "attribute=value" with ";" between them; of two the last counts.
 template <class Table>

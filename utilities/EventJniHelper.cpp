@@ -1,0 +1,3 @@
+#include "EventJniHelper.h"
+
+zemEventJniHelper::~zemEventJniHelper() = default;

@@ -30,6 +30,11 @@ const char* const kFooter =
     "What providers write to their standard output goes where --provider-output says, and never\n"
     "among the results.\n"
     "\n"
+    "A method that answers 4096 and names a job is followed until the job has ended, as that "
+    "lives\n"
+    "in this process; its exit code is 0 when the job has done its work. SIGINT asks the job to "
+    "end.\n"
+    "\n"
     "A failure prints the name, number and message of its CIM status on standard error; the exit\n"
     "code is that number. Exit code 64 is a wrong command line, 74 an output that cannot be\n"
     "written, 78 a registration or schema that cannot be used.";

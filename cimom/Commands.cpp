@@ -1,9 +1,8 @@
 #include "Commands.h"
 
-#include <algorithm>
-
 #include "EndSignals.h"
 #include "Failure.h"
+#include "JobProgress.h"
 #include "PathText.h"
 #include "Serve.h"
 
@@ -144,7 +143,8 @@ Reply invokeMethod(Session& session, const Arguments& arguments) {
     if (reply.ok()) {
         session.out.write(renderMethod(reply, session.format));
     }
-    return reply;
+    ObjectPath job;
+    return reply.ok() && hasStartedJob(reply, job) ? awaitJob(session, job) : reply;
 }
 Reply getProperty(Session& session, const Arguments& arguments) {
     Reply reply = session.server.getProperty(session.request, readPath(session, arguments.object),

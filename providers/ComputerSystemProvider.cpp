@@ -9,20 +9,6 @@ namespace {
 
 constexpr const char kStateChange[] = "RequestStateChange";
 
-/// Whether the client limits the time that a change may take.
-bool hasTimeout(const CmpiArgs& in) {
-    CmpiData limit;
-    try {
-        limit = in.getArg("TimeoutPeriod");
-    } catch (const CmpiStatus&) {
-        return false;  // it was not given, in the way of some servers
-    }
-    if (limit.isNotFound() || limit.isNullValue()) {
-        return false;
-    }
-    return limit.getDateTime().getDateTime() != 0;
-}
-
 }  // namespace
 
 ComputerSystemProvider::ComputerSystemProvider(const CmpiBroker& mb, const CmpiContext& ctx,

@@ -21,6 +21,7 @@ constexpr const char kHost[] = "ORXC_CEC_CS";
 constexpr const char kPartition[] = "ORXC_LPAR_CS";
 constexpr const char kConnection[] = "ORXC_HostConnection";
 constexpr const char kService[] = "CIM_Service";
+constexpr const char kManagementService[] = "ORXC_VirtualSystemManagementService";
 
 constexpr const char kHostedPartition[] = "ORXC_HostedPartition";
 constexpr const char kHostedService[] = "ORXC_HostedService";
@@ -36,6 +37,9 @@ bool isOfClass(const CmpiObjectPath& path, const char* className) {
 zemString hostOf(const CmpiObjectPath& path) {
     if (isOfClass(path, kConnection)) {
         return ConnectionProvider::hostOf(path.getKey("InstanceID").getString().charPtr()).c_str();
+    }
+    if (isOfClass(path, kManagementService)) {
+        return path.getKey("SystemName").getString().charPtr();
     }
     return zemDataTypeConvertManager::getMTMSByOP(path);
 }

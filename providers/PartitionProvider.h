@@ -2,9 +2,8 @@
 ///
 /// What a partition has when it is activated is read from its default profile.
 ///
-/// A client makes a partition with an instance whose Name is that of the new partition, or "*" and
-/// the Name of the host for the host's first free number. It starts and stops partitions by
-/// RequestStateChange, which has done its work when it answers:
+/// Partitions are made by the host's ORXC_VirtualSystemManagementService. A client starts and stops
+/// them by RequestStateChange, which has done its work when it answers, so that there is no job:
 ///
 ///     2 Enabled    activates with the default profile, or resumes
 ///     3 Disabled   switches off at once; a suspended partition loses what it kept
@@ -35,8 +34,6 @@ protected:
                                    RequestedState state) override;
 
     // the frame's hooks
-    void performCreateInstance(const CmpiContext& context, CmpiResult& result,
-                               const CmpiObjectPath& path, const CmpiInstance& instance) override;
     void performDeleteInstance(const CmpiContext& context, CmpiResult& result,
                                const CmpiObjectPath& path) override;
 
@@ -48,10 +45,6 @@ private:
     };
     /// @return false when @p name has not the form of one
     static bool split(const std::string& name, Key& key);
-
-    /// What the creation tool is told of the new partition.
-    void addCreationPairs(const CmpiInstance& instance, const CmpiObjectPath& path,
-                          zemDynamicArray<tagAttributePair>& pairs);
 };
 
 #endif

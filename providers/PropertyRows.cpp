@@ -292,6 +292,14 @@ CmpiInstance newInstance(const CmpiObjectPath& path, const Keys& keys, const cha
     return instance;
 }
 
+CmpiData argumentOf(const CmpiArgs& in, const char* name) {
+    try {
+        return in.getArg(name);
+    } catch (const CmpiStatus&) {
+        return CmpiData();
+    }
+}
+
 std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& instance,
                                                        const CmpiObjectPath& near,
                                                        const char* className,
@@ -314,4 +322,12 @@ std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& insta
         }
     }
     return asked;
+}
+
+bool hasTimeout(const CmpiArgs& in) {
+    const CmpiData limit = argumentOf(in, "TimeoutPeriod");
+    if (limit.isNotFound() || limit.isNullValue()) {
+        return false;
+    }
+    return limit.getDateTime().getDateTime() != 0;
 }

@@ -12,6 +12,7 @@
 #include <utility>
 #include <vector>
 
+#include "CmpiArgs.h"
 #include "CmpiInstance.h"
 #include "CommandCaller.h"
 #include "Exception.h"
@@ -80,6 +81,9 @@ CmpiInstance newInstance(const CmpiObjectPath& path, const char** properties);
 using Keys = std::vector<std::pair<const char*, CmpiData>>;
 CmpiInstance newInstance(const CmpiObjectPath& path, const Keys& keys, const char** properties);
 
+/// An argument of a method; null when it was not given, in whichever way the server says so.
+CmpiData argumentOf(const CmpiArgs& in, const char* name);
+
 /// What a client asks for with an instance that it sends: the wanted properties that have a value,
 /// but for those at the default of @p className. Servers fill defaults in for what a client leaves
 /// out, so a default asks for nothing.
@@ -88,5 +92,8 @@ std::vector<std::pair<std::string, CmpiData>> askedFor(const CmpiInstance& insta
                                                        const CmpiObjectPath& near,
                                                        const char* className,
                                                        const char** properties);
+
+/// Whether the client limits the time that a change of state may take, by TimeoutPeriod.
+bool hasTimeout(const CmpiArgs& in);
 
 #endif

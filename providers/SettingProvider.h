@@ -1,10 +1,11 @@
 /// ORXC_VirtualSystemSettingData and the six ORXC_...RASettingData: what partitions have now, and
 /// what their profiles give them. InstanceIDs tell side, profile, slot, partition and host.
 ///
-/// All are one provider with a table: which collections a class is read from, and which property
-/// shows which datum of the model. An enumeration reads a collection with one call of the
-/// management library, whatever the number of partitions; a get reads those of one partition. What
-/// the library's model makes of them, and all rules, stand in VirtualSystemVisitorVSSD.h.
+/// All are one provider with the table of SettingRows.h: which collections a class is read from,
+/// and which property shows which datum of the model. An enumeration reads a collection with one
+/// call of the management library, whatever the number of partitions; a get reads those of one
+/// partition. What the library's model makes of them, and all rules, stand in
+/// VirtualSystemVisitorVSSD.h.
 ///
 /// Thread-safety: constant tables and no state; any number of operations at once.
 #ifndef SETTING_PROVIDER_H
@@ -14,12 +15,10 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "BaseZemInstanceProvider.h"
-#include "VirtualSystemVisitor.h"
-
-struct Setting;
-struct SettingClass;
+#include "SettingRows.h"
 
 /// A partition, or all of them while both texts are empty.
 struct SettingOwner {
@@ -42,6 +41,16 @@ struct SettingId {
 /// any text.
 std::optional<SettingId> settingIdOf(const CmpiObjectPath& path);
 
+/// The same for an InstanceID of the class @p row.
+std::optional<SettingId> settingIdOf(const SettingClass& row, const std::string& id);
+
+/// The InstanceID that is the key of a path; empty without it.
+std::string settingKeyOf(const CmpiObjectPath& path);
+
+/// The path of settings, in the namespace of @p near.
+CmpiObjectPath settingPath(const CmpiObjectPath& near, const SettingClass& row,
+                           const zemString& id);
+
 /// The partition that an object is, or whose settings it is.
 std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path);
 
@@ -51,6 +60,15 @@ std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path);
 std::unique_ptr<zemCECVisitor> readPartitions(zemVirtualizationManager& manager,
                                               const CmpiContext& context,
                                               const SettingOwner& whose);
+
+/// Receives the settings of a system with its RASDs; the host lives as long as the call.
+using SystemSink = std::function<void(zemCEC& host, std::unique_ptr<zemVSSD> system)>;
+
+/// Hands the settings of @p whose to @p sink, those of a partition's state in front of those of its
+/// profiles, with the resources of @p classes, of which there is one at least.
+/// @throws what zemCECVisitor and zemVSSDVisitor throw
+void readSettings(const CmpiContext& context, const SettingOwner& whose,
+                  const std::vector<const SettingClass*>& classes, const SystemSink& sink);
 
 class SettingProvider : public zemBaseZemInstanceProvider {
 public:
@@ -84,7 +102,6 @@ private:
     void read(const CmpiContext& context, const SettingOwner& whose, const Sink& sink) const;
     void tell(zemVSSD& system, const Sink& sink) const;
     SettingOwner scopeOf(const CmpiObjectPath& asked) const;
-    CmpiObjectPath pathOf(const CmpiObjectPath& near, const Setting& setting) const;
     CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
                               const Setting& setting) const;
 

@@ -1,8 +1,8 @@
 #!/usr/bin/env bash
 # Installs what is missing, builds, and shows a CIM request from end to end: an appliance, its
 # tool asked by hand, the same asked through CIM, the pools of a host, what a partition runs with
-# beside what its profile says, a partition made, started, renamed, moved to another host, stopped and deleted, and what a
-# client reads when a thing is not there.
+# beside what its profile says, a partition defined, its profile changed, started, changed by a job,
+# moved to another host, stopped and destroyed, and what a client reads when a thing is not there.
 #
 #   scripts/demo.sh
 #
@@ -117,18 +117,48 @@ done
 show 0 cimom ain "ORXC_VirtualSystemSettingData.InstanceID=\"$running\"" \
     --assoc-class ORXC_VSSDComponent
 
-say "a partition made through CIM, with the first number that is free"
-show 0 cimom ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS "Name=*$mtms" \
-    'ElementName=made "by hand", 1' LparEnvironment=tmxlinux ProcessorMode=shared SharingMode=cap \
-    MinProcessors=1 DesiredProcessors=1 MaxProcessors=2 MinProcessingUnits=10 \
-    DesiredProcessingUnits=50 MaxProcessingUnits=100 MinMemory=256 DesiredMemory=512 MaxMemory=1024
-made=$(cat "$said")
+say "a partition defined by the host's service, with its first profile"
+# service <host>: the path of what makes, changes and removes the host's partitions.
+service() {
+    local class=ORXC_VirtualSystemManagementService
+    printf '%s.SystemCreationClassName="ORXC_CEC_CS",SystemName="%s",' $class "$1"
+    printf 'CreationClassName="%s",Name="VirtualSystemManagement"' $class
+}
+show 0 cimom im "$(service "$mtms")" DefineSystem \
+    'SystemSettings=instance of ORXC_VirtualSystemSettingData {
+        LparName = "made \"by hand\", 1"; ProfileName = "normal"; VirtualSystemType = "tmxlinux" }' \
+    'ResourceSettings={instance of ORXC_ProcessorRASettingData {
+        ConsumerVisibility = 3; SharingMode = "cap"; Minimum = 10; Reservation = 50; Limit = 100;
+        VirtualMinimum = 100; VirtualQuantity = 100; VirtualMaximum = 200 },
+    instance of ORXC_MemoryRASettingData { ConsumerVisibility = 2;
+        VirtualMinimum = 262144; VirtualQuantity = 524288; VirtualMaximum = 1048576 },
+    instance of ORXC_EthernetAdapterRASettingData { SlotID = 4; PortVLANID = 7;
+        IEEECompatible = 1; AddVLANIDs = {20, 30} }}'
+made=$(sed -n 's/^ResultingSystem = "\(.*\)";$/\1/p' "$said" | sed 's/\\"/"/g')
+id=${made##*=\"} id=${id%%\**}
+
+say "its profile changed: of what is not sent, nothing"
+profile="ORX:2*normal-$id*$mtms"
+show 0 cimom im "$(service "$mtms")" ModifyResourceSettings \
+    "ResourceSettings={instance of ORXC_MemoryRASettingData {
+        InstanceID = \"$profile\"; VirtualQuantity = 786432 }}"
+show 0 qyplat -r prof -m "$mtms" --filter "lpar_ids=$id" \
+    -F min_mem,desired_mem,max_mem,virtual_eth_adapters
+
+say "started, and changed while it runs: by a job, which cimom follows"
 show 0 cimom im "$made" RequestStateChange RequestedState=2
+show 0 cimom im "$(service "$mtms")" AddResourceSettings \
+    "AffectedConfiguration=ORXC_VirtualSystemSettingData.InstanceID=\"ORX:4*$id*$mtms\"" \
+    'ResourceSettings={instance of ORXC_EthernetAdapterRASettingData { SlotID = 5; PortVLANID = 3 }}'
+show 0 qyalloc -r virtualio --rsubtype eth --level lpar -m "$mtms" --filter "lpar_ids=$id" \
+    -F slot_num,port_vlan_id,mac_addr
+show 1 cimom im "$(service "$mtms")" ModifyResourceSettings \
+    "ResourceSettings={instance of ORXC_MemoryRASettingData {
+        InstanceID = \"ORX:4*$id*$mtms\"; VirtualQuantity = 2097152 }}"
 show 0 cimom mi "$made" 'ElementName=renamed while it runs'
 show 1 cimom di "$made"
 
 say "moved to another host, and seen half way"
-id=${made##*=\"} id=${id%%\**}
 show 0 edpower -r lpar --id 1 -o on -f normal -m "beta lab"     # serves its disks there
 printf '\n$ APPLIANCE_MOVE_SECONDS=2 %s &\n' "$(quoted domove -o m -m "$mtms" -t "beta lab" --id "$id")"
 APPLIANCE_MOVE_SECONDS=2 domove -o m -m "$mtms" -t "beta lab" --id "$id" &
@@ -143,7 +173,7 @@ id=$(sed -n 's/,renamed.*//p' "$said")
 say "stopped and deleted there"
 there="ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"$id*1111-AAB*0000002\""
 show 0 cimom im "$there" RequestStateChange RequestedState=3
-show 0 cimom di "$there"
+show 0 cimom im "$(service '1111-AAB*0000002')" DestroySystem "AffectedSystem=$there"
 show 0 appliance check
 
 say "what a client reads when a thing is not there"

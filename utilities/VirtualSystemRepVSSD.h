@@ -90,6 +90,20 @@ public:
     int getMemoryPoolNum() const { return m_memoryPoolNum; }
     void setMemoryPoolNum(int count) { m_memoryPoolNum = count; }
 
+    /// What clients set. Partition ID, host and instance ID stay.
+    void setVirtualSystemType(const zemString& type) { m_virtualSystemType = type; }
+    void setLparName(const zemString& name) { m_lparName = name; }
+    void setProfileName(const zemString& name) { m_profileName = name; }
+    void setDefaultProfileName(const zemString& name) { m_defaultProfileName = name; }
+    void setBootMode(const zemString& mode) { m_bootMode = mode; }
+    void setKeylock(const zemString& position) { m_keylock = position; }
+    void setMaxVirtualSlots(int count) { m_maxVirtualSlots = count; }
+    void setAutoActivate(int flag) { m_autoActivate = flag; }
+    void setEnableConnectionMonitoring(int flag) { m_enableConnectionMonitoring = flag; }
+    void setEnableRedundantErrorPathReporting(int flag) {
+        m_enableRedundantErrorPathReporting = flag;
+    }
+
     /// Flags; one that is not known reads true.
     bool getAutoActivate() const { return m_autoActivate != 0; }
     bool getEnableConnectionMonitoring() const { return m_enableConnectionMonitoring != 0; }

@@ -158,12 +158,8 @@ std::optional<std::string> adapterValue(const std::string& name, const std::stri
     return std::nullopt;
 }
 
-bool isWhole(const Object& adapter) {
-    if (adapter.kind() == Kind::Ethernet) {
-        return adapter.get("addl_vlan_ids").empty() || adapter.get("ieee_virtual_eth") == "1";
-    }
-    return adapter.get("adapter_type") == "server" ||
-           (adapter.get("remote_lpar_id") != "any" && adapter.get("remote_slot_num") != "any");
+bool isWhole(const Object& ethernet) {
+    return ethernet.get("addl_vlan_ids").empty() || ethernet.get("ieee_virtual_eth") == "1";
 }
 
 Object adapterFromElement(const AdapterForm& form, const Place& lpar, const std::string& element) {
@@ -230,14 +226,17 @@ std::optional<VirtualSlot> serverOf(const Object& adapter) {
     return server;
 }
 
-bool serves(const Object& other, const Object& client) {
-    const auto admits = [&](const char* attribute, std::int64_t own) {
-        const std::string wanted = other.get(attribute);
-        return wanted == "any" || wanted == std::to_string(own);
+bool admits(const Object& adapter, const VirtualSlot& slot) {
+    const auto fits = [&](const char* attribute, std::int64_t value) {
+        const std::string wanted = adapter.get(attribute);
+        return wanted == "any" || wanted == std::to_string(value);
     };
+    return fits("remote_lpar_id", slot.first) && fits("remote_slot_num", slot.second);
+}
+
+bool serves(const Object& other, const Object& client) {
     return other.kind() == client.kind() && other.get("adapter_type") == "server" &&
-           admits("remote_lpar_id", client.place().lpar) &&
-           admits("remote_slot_num", client.place().number);
+           admits(other, slotOf(client));
 }
 
 std::string newMac(const HostView& view, const Place& place) {

@@ -63,9 +63,8 @@ std::map<std::int64_t, Object> adaptersOf(const Object& profile);
 /// value. Empty stands for the usual value.
 std::optional<std::string> adapterValue(const std::string& name, const std::string& value);
 
-/// Whether the values of an adapter that exists go together: a client must name its server's slot,
-/// which in a profile it may leave open, and only IEEE adapters have additional VLANs.
-bool isWhole(const Object& adapter);
+/// Whether the values of an Ethernet adapter go together: only IEEE ones have additional VLANs.
+bool isWhole(const Object& ethernet);
 
 /// A virtual slot of a host: the ID of its partition, and its number there.
 using VirtualSlot = std::pair<std::int64_t, std::int64_t>;
@@ -74,6 +73,9 @@ VirtualSlot slotOf(const Object& adapter);
 
 /// Where the server of a client adapter would be; nothing for other adapters.
 std::optional<VirtualSlot> serverOf(const Object& adapter);
+
+/// Whether the other end of @p adapter may be in @p slot. Either end may leave open which it is.
+bool admits(const Object& adapter, const VirtualSlot& slot);
 
 /// Whether @p other, which is where @p client has its server, is one, and lets the client in. A
 /// server may name a client that is not there yet, or leave open who comes.

@@ -181,13 +181,8 @@ void Activation::join(Object& client, std::set<VirtualSlot>& taken) const {
     if (found && !isFreeFor(client, *found)) {
         throw notFound;
     }
-    const auto admits = [&](const char* attribute, std::int64_t value) {
-        const std::string wanted = client.get(attribute);
-        return wanted == "any" || wanted == text(value);
-    };
     const auto fits = [&](const VirtualSlot& slot) {
-        return admits("remote_lpar_id", slot.first) && admits("remote_slot_num", slot.second) &&
-               taken.count(slot) == 0 && isFreeFor(client, slot);
+        return admits(client, slot) && taken.count(slot) == 0 && isFreeFor(client, slot);
     };
     const auto old = m_adapters.find(slotOf(client));
     const auto before = old == m_adapters.end() ? std::nullopt : serverOf(old->second);

@@ -1,5 +1,7 @@
 // edalloc: what a partition has now.
 
+#include <algorithm>
+#include <map>
 #include <set>
 
 #include "Adapters.h"
@@ -267,28 +269,35 @@ void setAdapter(const HostView& host, const Setting& setting, Object& adapter) {
     adapter.set(setting.name, *value);
 }
 
-/// Whether the adapter's values go together, and a client finds its server free.
-void requireWhole(const HostView& host, const Object& adapter) {
-    const bool isEthernet = adapter.kind() == Kind::Ethernet;
-    if (!isWhole(adapter)) {
-        throw isEthernet ? Failure(Fault::Disagree, {"addl_vlan_ids", "ieee_virtual_eth"})
-                         : Failure(Fault::Disagree, {"adapter_type", "remote_slot_num"});
-    }
-    refuseIf(
-        isEthernet && (adapter.get("is_trunk") == "1") != (adapter.get("trunk_priority") != "0"),
-        Fault::Disagree, {"is_trunk", "trunk_priority"});
-    const auto server = serverOf(adapter);
-    if (!server) {
-        return;
-    }
-    bool found = false;
-    for (const Object& other : host.all(adapter.kind())) {
-        if (slotOf(other) == *server) {
-            found = serves(other, adapter);
+void requireWhole(const Object& ethernet) {
+    refuseIf(!isWhole(ethernet), Fault::Disagree, {"addl_vlan_ids", "ieee_virtual_eth"});
+    refuseIf((ethernet.get("is_trunk") == "1") != (ethernet.get("trunk_priority") != "0"),
+             Fault::Disagree, {"is_trunk", "trunk_priority"});
+}
+
+/// Joins a client to the server that it names or, where it leaves that open, to the first that is
+/// free.
+void join(const HostView& host, Object& client) {
+    std::map<VirtualSlot, const Object*> servers;
+    std::map<VirtualSlot, std::int64_t> users;
+    for (const Object& other : host.all(client.kind())) {
+        if (serves(other, client) && admits(client, slotOf(other)) &&
+            other.place().lpar != client.place().lpar) {
+            servers.emplace(slotOf(other), &other);
         }
-        refuseIf(serverOf(other) == server, Fault::InUse, {std::to_string(other.place().lpar)});
+        if (const auto server = serverOf(other)) {
+            users.emplace(*server, other.place().lpar);
+        }
     }
-    refuseIf(!found, Fault::NoServerAdapter, {adapter.get("slot_num")});
+    if (const auto named = serverOf(client); named && users.count(*named) != 0) {
+        throw Failure(Fault::InUse, {std::to_string(users[*named])});
+    }
+    const auto found = std::find_if(servers.begin(), servers.end(), [&](const auto& server) {
+        return users.count(server.first) == 0;
+    });
+    refuseIf(found == servers.end(), Fault::NoServerAdapter, {client.get("slot_num")});
+    client.set("remote_lpar_id", std::to_string(found->first.first));
+    client.set("remote_slot_num", std::to_string(found->first.second));
 }
 
 void addAdapter(Change& change, const Operation& operation) {
@@ -306,10 +315,13 @@ void addAdapter(Change& change, const Operation& operation) {
     needed(settings, kind == Kind::Ethernet ? "port_vlan_id" : "adapter_type");
     if (kind == Kind::Ethernet) {
         adapter.set("mac_addr", newMac(host, adapter.place()));
-    } else if (kind == Kind::Serial && adapter.get("adapter_type") == "client") {
-        adapter.set("supports_dnx", "0");
+        requireWhole(adapter);
+    } else if (adapter.get("adapter_type") == "client") {
+        if (kind == Kind::Serial) {
+            adapter.set("supports_dnx", "0");
+        }
+        join(host, adapter);
     }
-    requireWhole(host, adapter);
     change.put(adapter);
 }
 

@@ -44,7 +44,7 @@ TEST_F(ChangeToolsTest, ResourcesMove) {
         {"edalloc -r virtualio --rsubtype eth -o a -m alpha --id 3  -s 8 -a '\"port_vlan_id=3\",\"is_trunk=1\",\"trunk_priority=1\"'"},
         {"qyalloc -r virtualio --rsubtype eth -m alpha --level lpar --filter lpar_ids=3,slots=4,8 -F slot_num,state,ieee_virtual_eth,addl_vlan_ids,trunk_priority,mac_addr", "4,1,1,\"5,7\",0,A20001000304\n8,1,0,none,1,A20001000308\n"},
         {"edalloc -r virtualio --rsubtype scsi -o a -m alpha --id 1 -s 9 -a '\"adapter_type=server\"'"},
-        {"edalloc -r virtualio --rsubtype scsi -o a -m alpha --id 4 -a '\"adapter_type=client\",\"remote_lpar_name=xbrg1\",\"remote_slot_num=9\"'"},
+        {"edalloc -r virtualio --rsubtype scsi -o a -m alpha --id 4 -a '\"adapter_type=client\",\"remote_lpar_name=xbrg1\",\"remote_slot_num=any\"'"},
         {"edalloc -r virtualio --rsubtype serial -o a -m alpha --id 4 -s 7 -a '\"adapter_type=server\",\"supports_dnx=0\"'"},
         {"qyalloc -r virtualio --rsubtype scsi -m alpha --level lpar --filter slots=4,9 -F lpar_id,slot_num,adapter_type,remote_lpar_name,remote_slot_num", "1,9,server,,any\n4,4,client,xbrg1,9\n"},
         {"xbrgcli -m alpha --id 1 -c mappings -F slot_num,remote_lpar_id 2>/dev/null || xbrgcli -m alpha --id 1 -c mappings | head -1", "9,any,,any,none\n"},
@@ -234,6 +234,7 @@ TEST_F(ChangeToolsTest, WhatIsRefusedChangesNothing) {
         {VETH "-o r --id 3 -s 3", "WRTL8045 "},
         {VSCSI "-o a --id 4 -a '\"adapter_type=client\",\"remote_lpar_id=1\",\"remote_slot_num=9\"'", "WRTL8062 "},
         {VSCSI "-o a --id 4 -a '\"adapter_type=client\",\"remote_lpar_id=1\",\"remote_slot_num=13\"'", "WRTL8047 "},
+        {VSCSI "-o a --id 4 -a '\"adapter_type=client\"'", "WRTL8062 "},
         {VSCSI "-o r --id 1 -s 13", "WRTL8047 This is in use by the partition with the ID 3."},
         {VSCSI "-o r --id 3 -s 3", "WRTL8046 "},
         // Partitions that are needed, or at work.

@@ -97,16 +97,24 @@ TEST_P(RequestTest, PartitionsAreMadeChangedStartedStoppedAndDeleted) {
     const std::string path =
         R"(root/cimv2:ORXC_LPAR_CS.CreationClassName="ORXC_LPAR_CS",Name="8*1111-AAA*0000001")";
     const std::string made = "'" + path + "'";
-    const std::string create = "ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS ";
-    const std::string like =
-        " LparEnvironment=tmxlinux 'DefaultProfile=p, \"q\"' MinMemory=256 DesiredMemory=512"
-        " MaxMemory=1024 ProcessorMode=shared SharingMode=cap MinProcessors=1 DesiredProcessors=1"
-        " MaxProcessors=2 MinProcessingUnits=10 DesiredProcessingUnits=55 MaxProcessingUnits=100";
+    const std::string define =
+        R"(im 'ORXC_VirtualSystemManagementService.SystemCreationClassName="ORXC_CEC_CS",)"
+        R"(SystemName="1111-AAA*0000001",CreationClassName="ORXC_VirtualSystemManagementService",)"
+        R"(Name="VirtualSystemManagement"' DefineSystem )"
+        R"('SystemSettings=instance of ORXC_VirtualSystemSettingData { VirtualSystemType = "tmxlinux";)"
+        R"( ProfileName = "p, \"q\""; ElementName = "a $HOME, \"b\" \\c" }' )"
+        "'ResourceSettings={instance of ORXC_MemoryRASettingData { ConsumerVisibility = 2;"
+        " Minimum = 262144; Reservation = 524288; Limit = 1048576 }, instance of"
+        " ORXC_ProcessorRASettingData { ConsumerVisibility = 3; SharingMode = \"cap\";"
+        " VirtualMinimum = 100; VirtualQuantity = 100; VirtualMaximum = 200; Minimum = 10;"
+        " Reservation = 55; Limit = 100 }}'";
     const std::string state = "im " + made + " RequestStateChange RequestedState=";
     const std::string done = "returnValue = 0;\n", impossible = "returnValue = 4097;\n";
     expectRows({
-        {create + "'Name=*1111-AAA*0000001' 'ElementName=a $HOME, \"b\" \\c'" + like, 0,
-         path + "\n"},
+        {define, 0,
+         "returnValue = 0;\nResultingSystem = \"root/cimv2:ORXC_LPAR_CS.CreationClassName="
+         R"(\"ORXC_LPAR_CS\",Name=\"8*1111-AAA*0000001\"";)"
+         "\n"},
         {"gp " + made + " ElementName", 0, "\"a $HOME, \\\"b\\\" \\\\c\"\n"},
         {"gp " + made + " DesiredProcessingUnits", 0, "55\n"},
         {"mi " + made + " 'ElementName=ü, \"x\"' Keylock=manual", 0, ""},
@@ -131,18 +139,9 @@ TEST_P(RequestTest, PartitionsAreMadeChangedStartedStoppedAndDeleted) {
         {state + "11", 0, done},
         {state + "4", 0, done},
         {"gp " + made + " EnabledState", 0, "3\n"},
-        {create + "'Name=8*1111-AAA*0000001' ElementName=other" + like, 11,
-         "CIM_ERR_ALREADY_EXISTS (11): An exception occurred during executing method "
-         "createInstance on provider ORXC_LPAR_CSProvider. The exception was thrown from method "
-         "performCreateInstance on class PartitionProvider with an exception id of CIM_ERROR and "
-         "an exception string of \"There is a partition 8*1111-AAA*0000001 already.\".\n"},
-        {create + "Name=8 ElementName=other", 4,
-         "CIM_ERR_INVALID_PARAMETER (4): Invalid key name Name for class ORXC_LPAR_CS is provided "
-         "to method createInstance on provider ORXC_LPAR_CSProvider.\n"},
-        {create + "Name=9*1111-AAA*0000001 Caption=c", 4,
-         "CIM_ERR_INVALID_PARAMETER (4): Attempt to set property \"Caption\" of class "
-         "ORXC_LPAR_CS to \"c\". Can not specify this property \"Caption\", when execute this "
-         "operation.\n"},
+        {"ci ORXC_LPAR_CS CreationClassName=ORXC_LPAR_CS Name=9*1111-AAA*0000001", 7,
+         "CIM_ERR_NOT_SUPPORTED (7): Method createInstance on provider ORXC_LPAR_CSProvider is not "
+         "supported for class ORXC_LPAR_CS.\n"},
         {"di " + made, 0, ""},
         {"gi " + made, 6,
          "CIM_ERR_NOT_FOUND (6): The requested object " + path +
@@ -205,7 +204,7 @@ TEST_P(RequestTest, EveryAssociationAnswersAllOperationsAndFilters) {
         {"ORXC_HostedResourcePool", "CIM_Component", "GroupComponent", "PartComponent", kHost,
          "CIM_ResourcePool", 9, 30},
         {"ORXC_HostedService", "CIM_HostedDependency", "Antecedent", "Dependent", kHost,
-         "CIM_Service", 6, 24},
+         "CIM_Service", 7, 28},
         {"ORXC_ServiceAffectsElement", "CIM_ServiceAffectsElement", "AffectedElement",
          "AffectingElement", pool, "CIM_EnabledLogicalElement", 1, 30},
         {"ORXC_ElementCapabilities", "CIM_ElementCapabilities", "ManagedElement", "Capabilities",

@@ -211,10 +211,13 @@ TEST_F(VirtualSystemRepVSSDTest, SettingsComeFromRecordOrProfile) {
     EXPECT_EQ(0, vssd.initialize(&m_lpar, record));
     EXPECT_EQ("n|NORMAL|sms|1|2|30|1|4|" + ofPartition + "||||", fieldsOf(vssd, names));
 
+    m_tools.run(std::string(ZEM_PROGRAMS) +
+                "/edplat -r prof -m alpha -i "
+                "name=normal,lpar_id=4,auto_start=1,conn_monitoring=1");
     const zemHostSystem host(kHost, "", "");
     zemVirtualSystemProfile profile("normal", zemVirtualSystem("4", host, "", ""), "", "");
     zemVSSD ofProfile(&m_lpar, profile);
-    EXPECT_EQ("db|normal|sms|0|0|11|1|1|" + ofPartition +
+    EXPECT_EQ("db|normal|sms|1|1|11|1|1|" + ofPartition +
                   "|0/server/1/any//any/1,1/server/1/any//any/1,6/client/0/2/xbrg2/7/0|"
                   "3/client/2/xbrg2/14/1|2/0/1//0/0/default,\"5/1/7/20,30/0/0/storage\"|",
               fieldsOf(ofProfile, names));

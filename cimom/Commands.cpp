@@ -1,7 +1,7 @@
 #include "Commands.h"
 
+#include "EndSignals.h"
 #include "Failure.h"
-#include "Interrupt.h"
 #include "JobProgress.h"
 #include "PathText.h"
 
@@ -211,7 +211,7 @@ Reply watch(Session& session, const Arguments& arguments) {
     const std::string query = arguments.query.find(' ') == std::string::npos
                                   ? "SELECT * FROM " + arguments.query
                                   : arguments.query;
-    wakeAtSignals();
+    EndSignals signals;
     std::size_t seen = 0;  // the handler runs one indication at a time
     Server::SubscriptionId id = 0;
     Reply reply = session.server.subscribe(
@@ -223,15 +223,16 @@ Reply watch(Session& session, const Arguments& arguments) {
             ++seen;
             const bool read = session.out.write(renderEvent(indication, session.format));
             if (!read || seen == arguments.count) {
-                wake();
+                EndSignals::wake();
             }
         },
         id);
     if (!reply.ok()) {
         return reply;
     }
-    wakeAtSignals();  // once more: a Java VM of the providers takes them over
-    waitForWake(-1);
+    while (!signals.wait(std::chrono::seconds(1))) {
+        continue;
+    }
     return session.server.unsubscribe(session.request, id);
 }
 

@@ -48,7 +48,9 @@ EndSignals::EndSignals() {
 bool EndSignals::wait(std::chrono::milliseconds time) {
     takeSignals();
     pollfd waited = {wakePipe[0], POLLIN, 0};
-    return poll(&waited, 1, static_cast<int>(time.count())) > 0;
+    char bytes[64];
+    return poll(&waited, 1, static_cast<int>(time.count())) > 0 &&
+           ::read(wakePipe[0], bytes, sizeof bytes) > 0;
 }
 
 }  // namespace cimom

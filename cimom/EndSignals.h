@@ -15,7 +15,7 @@ public:
     /// @throws Failure CMPI_RC_ERROR_SYSTEM
     EndSignals();
 
-    /// Waits until a signal came, or wake() was called.
+    /// Waits until a signal came, or wake() was called, and forgets it.
     /// @return false when the time was over first
     bool wait(std::chrono::milliseconds time);
     /// May be called from a handler, and on any thread.

@@ -6,7 +6,7 @@
 #include <chrono>
 #include <cstdio>
 
-#include "Interrupt.h"
+#include "EndSignals.h"
 
 namespace cimom {
 
@@ -88,7 +88,7 @@ bool hasStartedJob(const Reply& method, ObjectPath& job) {
 }
 
 Reply awaitJob(Session& session, const ObjectPath& job) {
-    wakeAtSignals();
+    EndSignals signals;
     Request request = session.request;
     request.properties = {"Name", "JobState", "PercentComplete", "ErrorDescription"};
     ProgressLine progress;
@@ -109,7 +109,7 @@ Reply awaitJob(Session& session, const ObjectPath& job) {
             return reply;
         }
         progress.show(found);
-        if (waitForWake(pause)) {
+        if (signals.wait(std::chrono::milliseconds(pause))) {
             askToEnd(session, job, ending);
             ending = kKill;
         }

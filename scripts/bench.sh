@@ -81,9 +81,15 @@ ROWS = [
      "Pools/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
     ("PoolTies/64/1000/iterations:1/repeats:1/manual_time",
      "PoolTies/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
+    ("Served/1/real_time", "Direct/1/real_time", None, 0),
+    ("Served/100/real_time", "Direct/100/real_time", None, 0),
+    ("Served/1000/real_time", "Direct/1000/real_time", None, 0),
+    ("Served/10000/real_time", "Direct/10000/real_time", None, 0),
+    ("Served/100000/real_time", "Served/10000/real_time", 15.0, 0),
 ]
 # Counters: benchmark, counter, the most that it may be.
 COUNTERS = [
+    ("Served/100000/real_time", "grown_KB", 5000),
     ("GetAllLpars/1000", "resident_MB", 100),
     ("QyallocSplit/1000/manual_time", "ours_percent", 10),
     ("Initialize/1000/iterations:1/repeats:1/manual_time", "ours_percent", 10),

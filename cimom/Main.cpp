@@ -102,7 +102,8 @@ int run(cimom::CommandLine& line) {
     for (const std::string& file : line.registrations) {
         server.loadRegistration(file);
     }
-    if (line.traceLevel >= 0) {
+    // A provider of indications can say what is wrong in its log alone.
+    if (line.traceLevel >= 0 || verb.takes == cimom::kFilter) {
         server.setLogHook(
             [level = line.traceLevel](const cimom::LogLine& each) { printLine(each, level); });
     }

@@ -4,6 +4,7 @@
 
 #include <algorithm>
 #include <cctype>
+#include <climits>
 #include <cstdlib>
 #include <ctime>
 #include <map>
@@ -143,6 +144,12 @@ bool convert(ValueKind kind, const char* text, CmpiData& data) {
                 return false;
             }
             data.setUint32(static_cast<CMPIUint32>(value));
+            return true;
+        case ValueKind::Uint64:
+            if (!parseNumber(text, ULONG_MAX, value)) {
+                return false;
+            }
+            data.setUint64(value);
             return true;
         case ValueKind::Hundredths:
             if (!parseHundredths(text, value)) {

@@ -23,6 +23,7 @@ enum class ValueKind {
     TextList,      ///< "a,b" as an array of texts
     Uint16,        ///< decimal; anything else is null
     Uint32,        ///< likewise
+    Uint64,        ///< likewise
     Hundredths,    ///< "1.25" as the 32-bit number 125
     Flag,          ///< "1" true, "0" false
     Timestamp,     ///< "MM/DD/YYYY HH:MM:SS" as a date-time

@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "../support/TestAppliance.h"
+#include "Store.h"
 #include "WrtEventHelper.h"
 
 using Environment = std::map<std::string, std::string>;
@@ -86,6 +87,24 @@ private:
     zemJvmHelper m_helper;
     zemAutoDetachThread m_env;
 };
+
+/// A line of the journal: a name or a state was changed.
+inline std::string changed(const std::string& kind, const std::string& place,
+                           const std::string& attribute, const std::string& before,
+                           const std::string& after) {
+    return R"({"tool":"x","time":1,"objects":[{"event":"modify","kind":")" + kind + R"(",)" +
+           place + R"(,"number":0,"old":{")" + attribute + R"(":")" + before + R"("},"new":{")" +
+           attribute + R"(":")" + after + R"("}}]})";
+}
+
+inline void appendToJournal(const std::vector<std::string>& lines) {
+    appliance::Store store = appliance::Store::open(appliance::Database::Access::Write);
+    appliance::Transaction change = store.write();
+    for (const std::string& line : lines) {
+        store.append(line);
+    }
+    change.commit();
+}
 
 inline std::mutex g_linesLock;
 inline std::vector<std::string> g_lines;  ///< what listeners wrote down

@@ -8,7 +8,6 @@
 #include "JavaProcess.h"
 #include "MigrationEventJniHelper.h"
 #include "OnThreads.h"
-#include "Store.h"
 #include "WrtEventHelper.h"
 
 namespace {
@@ -170,23 +169,6 @@ TEST(WrtEventHelperTest, CallBacksMayGoWhileEventsArrive) {
 }
 
 // -- from the appliance ---------------------------------------------------------------------------
-
-/// A line of the journal: a name or a state was changed.
-std::string changed(const std::string& kind, const std::string& place, const std::string& attribute,
-                    const std::string& before, const std::string& after) {
-    return R"({"tool":"x","time":1,"objects":[{"event":"modify","kind":")" + kind + R"(",)" +
-           place + R"(,"number":0,"old":{")" + attribute + R"(":")" + before + R"("},"new":{")" +
-           attribute + R"(":")" + after + R"("}}]})";
-}
-
-void appendToJournal(const std::vector<std::string>& lines) {
-    appliance::Store store = appliance::Store::open(appliance::Database::Access::Write);
-    appliance::Transaction change = store.write();
-    for (const std::string& line : lines) {
-        store.append(line);
-    }
-    change.commit();
-}
 
 /// Writes an event down, with some of the properties.
 void tell(const zemWRTEvent& event) {

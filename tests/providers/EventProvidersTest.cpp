@@ -1,0 +1,226 @@
+// Indications of the built provider library, with a real Java VM, the stand-in's tools and its
+// journal.
+
+#include <csignal>
+#include <map>
+
+#include "JavaProcess.h"
+#include "PathText.h"
+#include "ServedProviders.h"
+
+namespace {
+
+/// A line of the values there are, by name.
+std::string told(const cimom::NamedValues& values) {
+    std::map<std::string, std::string> texts;
+    for (const auto& [name, value] : values) {
+        if (!value.isNull() && name != "CreationClassName" && name != "IndicationTime") {
+            texts[name] = value.type() == CMPI_instance ? told(value.instance().properties)
+                                                        : cimom::plainText(value);
+        }
+    }
+    std::string line;
+    for (const auto& [name, text] : texts) {
+        line += (line.empty() ? "" : " ") + name + "=" + text;
+    }
+    return "[" + line + "]";
+}
+
+class EventProvidersTest : public testing_support::ServedProviders {
+protected:
+    using Handler = cimom::Server::IndicationHandler;
+    using Id = cimom::Server::SubscriptionId;
+
+    /// As "Class: [values]".
+    static void write(const cimom::Indication& indication) {
+        const cimom::Instance& instance = indication.instance;
+        const cimom::Value* time = instance.properties.find("IndicationTime");
+        EXPECT_LT(std::abs(static_cast<long>(time->dateTime().binary() / 1'000'000) -
+                           static_cast<long>(std::time(nullptr))),
+                  60);
+        hear(instance.path.className + ": " + told(instance.properties));
+    }
+    Id subscribe(const std::string& query, const Handler& handler = &write) {
+        Id id = 0;
+        const cimom::Reply reply =
+            m_server->subscribe(m_request, "SELECT * FROM " + query, "WQL", handler, id);
+        EXPECT_TRUE(reply.ok()) << query << reply.message;
+        return id;
+    }
+    void unsubscribe(Id id) { EXPECT_TRUE(m_server->unsubscribe(m_request, id).ok()); }
+    void change(const std::string& line) { EXPECT_EQ(m_appliance.run(line).err, ""); }
+
+    /// The process numbers of those who read the journal for Java, first to last.
+    std::vector<std::string> followers() const {
+        return testing_support::lines(testing_support::contents(m_appliance.folder() / "pids"));
+    }
+    void noteFollowers() {
+        m_appliance.replaceTool("appliance", "echo $$ >>" + m_appliance.folder().string() +
+                                                 "/pids; exec " ZEM_PROGRAMS "/appliance \"$@\"");
+    }
+};
+
+TEST_P(EventProvidersTest, EachClassTellsWhatIsItsOwn) {
+    const std::string web = "Name=3*1111-AAA*0000001", path =
+                                                           "root/cimv2:ORXC_LPAR_CS."
+                                                           "CreationClassName=\"ORXC_LPAR_CS\",";
+    const std::string webPath = " SourceInstanceModelPath=" + path + "Name=\"3*1111-AAA*0000001\"";
+    const std::string more =
+        "ORXC_PartitionResourceChange: [PreviousInstance=[" + web + "] PreviousValues=";
+    const struct {
+        std::string query;
+        std::string change;
+        std::vector<std::string> expected;  ///< the first ones
+        std::size_t count;
+    } cases[] = {
+        {"ORXC_PartitionStateChange",
+         "edalloc -r mem -m alpha --id 3 -o a -q 256 && "
+         "edplat -r lpar -m alpha -i 'lpar_id=3,new_name=B\xC3\xBCro \"1\"'",
+         {"ORXC_PartitionStateChange: [PreviousInstance=[ElementName=web server " + web +
+          "] PreviousValues=[] SourceInstance=[ElementName=B\xC3\xBCro \"1\" " + web + "]" +
+          webPath + " Values=[]]"},
+         1},
+        {"CIM_InstModification",
+         "edalloc -r mem -m alpha --id 3 -o r -q 256",
+         {more + "[CurrentMemory=8448 PendingMemory=8448 RuntimeMemory=8448] SourceInstance=[" +
+          web + "]" + webPath +
+          " Values=[CurrentMemory=8192 PendingMemory=8192 RuntimeMemory=8192]]"},
+         1},
+        {"ORXC_PartitionStateChange",
+         "edpower -r lpar -m alpha --id 3 -o shutdown --immed",
+         {"ORXC_PartitionStateChange: [PreviousInstance=[EnabledState=2 " + web +
+          " State=Running] PreviousValues=[RuntimeEntitledMemory=256 RuntimeMemory=8192 "
+          "RuntimeMemoryWeight=128] SourceInstance=[EnabledState=3 " +
+          web + " State=Not Activated]" + webPath +
+          " Values=[RuntimeEntitledMemory=0 RuntimeMemory=0 RuntimeMemoryWeight=0]]"},
+         1},
+        {"CIM_InstDeletion",
+         "dlplat -r lpar -m alpha --id 3",
+         {"ORXC_PartitionDeletion: [SourceInstance=[ElementName=B\xC3\xBCro \"1\" EnabledState=3 "
+          "LparEnvironment=tmxlinux " +
+          web + " State=Not Activated]" + webPath +
+          " Values=[CurrentEntitledMemory=256 CurrentMemory=8192 PendingEntitledMemory=256 "
+          "PendingMemory=8192 PendingMemoryWeight=128 PendingProcessingUnits=150 "
+          "PendingProcessors=2 PendingSharingMode=uncap PendingUncappedWeight=128 "
+          "ReferenceCode=A1000042 RuntimeEntitledMemory=0 RuntimeMemory=0 "
+          "RuntimeMemoryWeight=0]]"},
+         1},
+        {"ORXC_PartitionCreation",
+         "nwplat -r lpar -m alpha -i name=new,profile_name=n,lpar_env=tmxlinux,all_resources=1",
+         {"ORXC_PartitionCreation: [SourceInstance=[ElementName=new EnabledState=3 "
+          "LparEnvironment=tmxlinux " +
+          web + " State=Not Activated]" + webPath +
+          " Values=[PendingMemory=0 PendingMemoryWeight=0 PendingProcessingUnits=0 "
+          "PendingProcessors=0 PendingSharingMode=cap PendingUncappedWeight=0]]"},
+         1},
+        {"CIM_ProcessIndication",
+         "edpower -r lpar --id 1 -o on -f normal -m 'beta lab' && domove -o s -m alpha --id 7 && "
+         "APPLIANCE_MOVE_SECONDS=0 domove -o m -m alpha -t 'beta lab' --id 7",
+         {"ORXC_PartitionMove: [DestinationHostName=1111-AAB*0000002 LeftBytes=1073741824 "
+          "PartitionName=traveller PartitionPath=" +
+          path +
+          "Name=\"7*1111-AAA*0000001\" PercentComplete=50 SentBytes=1073741824 "
+          "State=Migration Stopped TotalBytes=2147483648]"},
+         13},
+    };
+    noteFollowers();
+    inProcess([&] {
+        std::size_t all = 0;
+        for (const auto& row : cases) {
+            const Id first = subscribe(row.query), second = subscribe(row.query);
+            unsubscribe(first);
+            change(row.change);
+            std::vector<std::string> lines = heard(row.count);
+            EXPECT_EQ(lines.size(), row.count) << row.query;
+            lines.resize(row.expected.size());
+            EXPECT_EQ(lines, row.expected);
+            unsubscribe(second);
+            // The last one has ended it: nobody reads the journal any more.
+            ASSERT_EQ(followers().size(), ++all);
+            const int reader = std::stoi(followers().back());
+            for (int i = 0; i < 500 && kill(reader, 0) == 0; ++i) {
+                usleep(10000);
+            }
+            EXPECT_NE(kill(reader, 0), 0);
+        }
+    });
+}
+
+TEST_P(EventProvidersTest, WhoIsSlowOrGoneHoldsUpHisOwnClassAlone) {
+    constexpr int kAll = 10'000, kPartitions = 50;
+    inProcess([&] {
+        std::atomic<bool> isHeldUp{true};
+        std::map<std::string, int> next;
+        std::atomic<int> count{0};
+        subscribe("ORXC_PartitionStateChange", [&](const cimom::Indication& indication) {
+            while (isHeldUp) {
+                usleep(1000);
+            }
+            const cimom::Instance& source =
+                indication.instance.properties.find("SourceInstance")->instance();
+            EXPECT_EQ(source.properties.find("ElementName")->text(),
+                      std::to_string(next[source.properties.find("Name")->text()]++));
+            ++count;
+        });
+        std::atomic<int> gone{0};
+        Id leaving = 0;
+        const Id failing = subscribe("ORXC_PartitionResourceChange", [&](const auto&) {
+            ++gone;
+            throw std::runtime_error("gone");
+        });
+        std::vector<std::string> lines;
+        for (int i = 0; i < kAll; ++i) {
+            lines.push_back(changed("lpar",
+                                    R"("host":"H","lpar":)" + std::to_string(i % kPartitions + 1),
+                                    "name", "x", std::to_string(i / kPartitions)));
+        }
+        appendToJournal(lines);
+        const std::string resources =
+            changed("lpar", R"("host":"H","lpar":1)", "curr_mem", "1", "2");
+        appendToJournal({resources, resources});
+        for (int i = 0; i < 1000 && gone < 2; ++i) {
+            usleep(10000);
+        }
+        EXPECT_EQ(gone, 2);
+        unsubscribe(failing);
+        leaving = subscribe("ORXC_PartitionResourceChange", [&](const auto&) {
+            unsubscribe(leaving);
+            hear("left");
+        });
+        appendToJournal({resources});
+        EXPECT_EQ(heard(1).size(), 1U);
+        EXPECT_EQ(count, 0);
+        isHeldUp = false;
+        for (int i = 0; i < 3000 && count < kAll; ++i) {
+            usleep(10000);
+        }
+        EXPECT_EQ(count, kAll);
+    });
+}
+
+// Indication operations hand no message on: who watches reads the reason in the provider's log.
+TEST_P(EventProvidersTest, WithoutJavaOnlyIndicationsFail) {
+    inProcess(
+        [&] {
+            Id id = 0;
+            for (const char* name : {"ORXC_PartitionMove", "CIM_Indication"}) {
+                const std::string query = std::string("SELECT * FROM ") + name;
+                EXPECT_EQ(m_server->subscribe(m_request, query, "WQL", &write, id).rc,
+                          CMPI_RC_ERR_FAILED);
+            }
+            EXPECT_EQ(m_server->enumInstanceNames(m_request, {"", "ORXC_CEC_CS"}).paths.size(), 4U);
+            const auto outcome =
+                m_appliance.run("cimom --registration " ZEM_REGISTRATION " --schema " ZEM_SCHEMA
+                                " watch ORXC_PartitionMove");
+            EXPECT_EQ(outcome.exit, CMPI_RC_ERR_FAILED);
+            EXPECT_NE(outcome.err.find("ORXC_PartitionMove: No Java VM: no Java where"),
+                      std::string::npos)
+                << outcome.err;
+        },
+        {{"JAVA_HOME", "/no"}});
+}
+
+INSTANTIATE_TEST_SUITE_P(Brokers, EventProvidersTest, EventProvidersTest::brokers(),
+                         EventProvidersTest::nameOf);
+
+}  // namespace

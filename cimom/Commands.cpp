@@ -1,5 +1,7 @@
 #include "Commands.h"
 
+#include <cstdio>
+
 #include "EndSignals.h"
 #include "Failure.h"
 #include "JobProgress.h"
@@ -225,6 +227,7 @@ Reply watch(Session& session, const Arguments& arguments) {
     if (!reply.ok()) {
         return reply;
     }
+    std::fputs("watching\n", stderr);  // what changes from now on will be told
     while (!signals.wait(std::chrono::seconds(1))) {
         continue;
     }

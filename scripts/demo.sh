@@ -2,7 +2,8 @@
 # Installs what is missing, builds, and shows a CIM request from end to end: an appliance, its
 # tool asked by hand, the same asked through CIM, the pools of a host, what a partition runs with
 # beside what its profile says, a partition defined, its profile changed, started, changed by a job,
-# moved to another host, stopped and destroyed, and what a client reads when a thing is not there.
+# moved to another host while a client watches, stopped and destroyed, and what a client reads when
+# a thing is not there.
 #
 #   scripts/demo.sh
 #
@@ -67,6 +68,7 @@ export PATH="$top/build/release/bin:$PATH"
 set_up APPLIANCE_HOME "$folder/appliance"
 set_up CIMOM_REGISTRATION "$top/build/release/lib/zemproviders.json"
 set_up CIMOM_SCHEMA "$top/providers/mof/zem.mof"
+set_up CLASSPATH "$top/build/release/lib/appliance-events.jar"     # for indications
 
 host='ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name='
 
@@ -158,15 +160,24 @@ show 1 cimom im "$(service "$mtms")" ModifyResourceSettings \
 show 0 cimom mi "$made" 'ElementName=renamed while it runs'
 show 1 cimom di "$made"
 
-say "moved to another host, and seen half way"
+say "moved to another host, while a client watches"
 show 0 edpower -r lpar --id 1 -o on -f normal -m "beta lab"     # serves its disks there
+steps=$folder/steps
+printf '\n$ cimom watch --count 12 ORXC_PartitionMove >%s &\n' "$steps"
+timeout 120 cimom watch --count 12 ORXC_PartitionMove >"$steps" 2>"$steps.err" &
+watcher=$!
+until grep -qs watching "$steps.err" || ! kill -0 $watcher 2>/dev/null; do sleep 0.1; done
+cat "$steps.err"
 printf '\n$ APPLIANCE_MOVE_SECONDS=2 %s &\n' "$(quoted domove -o m -m "$mtms" -t "beta lab" --id "$id")"
 APPLIANCE_MOVE_SECONDS=2 domove -o m -m "$mtms" -t "beta lab" --id "$id" &
+mover=$!
 show 0 sleep 1
 show 0 qymove -r lpar -m "$mtms" --filter "lpar_ids=$id" \
     -F name,migration_state,dest_sys_name,bytes_transmitted,bytes_remaining
 printf '\n$ wait\n'
-wait $!
+wait $mover
+wait $watcher || die "not all steps of the move were told"
+show 0 grep -E ' (State|PercentComplete) =' "$steps"
 show 0 qyplat -r lpar -m "beta lab" -F lpar_id,name,state
 id=$(sed -n 's/,renamed.*//p' "$said")
 
@@ -181,5 +192,5 @@ show 5 cimom gi 'ORXC_Unknown.Name="1"'
 show 6 cimom gi "$host\"9999-ZZZ*0000000\""
 show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
-printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions and\n%s pools by association, what a partition runs with beside its profile,\nthe life of a partition, a move between hosts, two failures by name, one of them in German too.\n' \
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions and\n%s pools by association, what a partition runs with beside its profile,\nthe life of a partition, a move between hosts by its indications,\ntwo failures by name, one of them in German too.\n' \
     "$hosts" "$partitions" "$pools"

@@ -199,7 +199,7 @@ TEST_F(CommandLine, VerbsThatChange) {
 // Nothing fires in that process, and so it watches until it is told to end.
 TEST_F(CommandLine, WatchingEndsWithASignal) {
     const pid_t child = start({"--trace", "1", "watch", "Fix_Event"});
-    for (int i = 0; i < 500 && read("err").find("enable") == std::string::npos; ++i) {
+    for (int i = 0; i < 500 && read("err").find("\nwatching\n") == std::string::npos; ++i) {
         usleep(20000);
     }
     kill(child, SIGTERM);

@@ -26,6 +26,14 @@ std::string told(const cimom::NamedValues& values) {
     return "[" + line + "]";
 }
 
+/// Within a minute.
+bool comesTrue(const std::function<bool()>& condition) {
+    for (int i = 0; i < 6000 && !condition(); ++i) {
+        usleep(10000);
+    }
+    return condition();
+}
+
 class EventProvidersTest : public testing_support::ServedProviders {
 protected:
     using Handler = cimom::Server::IndicationHandler;
@@ -138,10 +146,7 @@ TEST_P(EventProvidersTest, EachClassTellsWhatIsItsOwn) {
             // The last one has ended it: nobody reads the journal any more.
             ASSERT_EQ(followers().size(), ++all);
             const int reader = std::stoi(followers().back());
-            for (int i = 0; i < 500 && kill(reader, 0) == 0; ++i) {
-                usleep(10000);
-            }
-            EXPECT_NE(kill(reader, 0), 0);
+            EXPECT_TRUE(comesTrue([&] { return kill(reader, 0) != 0; }));
         }
     });
 }
@@ -178,10 +183,7 @@ TEST_P(EventProvidersTest, WhoIsSlowOrGoneHoldsUpHisOwnClassAlone) {
         const std::string resources =
             changed("lpar", R"("host":"H","lpar":1)", "curr_mem", "1", "2");
         appendToJournal({resources, resources});
-        for (int i = 0; i < 1000 && gone < 2; ++i) {
-            usleep(10000);
-        }
-        EXPECT_EQ(gone, 2);
+        EXPECT_TRUE(comesTrue([&] { return gone == 2; }));
         unsubscribe(failing);
         leaving = subscribe("ORXC_PartitionResourceChange", [&](const auto&) {
             unsubscribe(leaving);
@@ -191,10 +193,7 @@ TEST_P(EventProvidersTest, WhoIsSlowOrGoneHoldsUpHisOwnClassAlone) {
         EXPECT_EQ(heard(1).size(), 1U);
         EXPECT_EQ(count, 0);
         isHeldUp = false;
-        for (int i = 0; i < 3000 && count < kAll; ++i) {
-            usleep(10000);
-        }
-        EXPECT_EQ(count, kAll);
+        EXPECT_TRUE(comesTrue([&] { return count == kAll; }));
     });
 }
 

@@ -96,6 +96,27 @@ inline void whilePairing(const std::function<void()>& other) {
     };
 }
 
+/// Lets a hook, or "valid" for the look at a pair, throw; "refuse" lets the hooks answer no.
+inline void failIn(const std::string& failing) {
+    const auto act = [failing](const std::string& hook) {
+        if (hook == failing) {
+            throw zemOperationFailedException("hook failed");
+        }
+        return failing != "refuse";
+    };
+    world->onHook = act;
+    world->valid = [act](const std::string&, const std::string&) { return act("valid"); };
+}
+
+/// All that was noted, with a blank behind each.
+inline std::string noted() {
+    std::string all;
+    for (const std::string& call : world->calls) {
+        all += call + " ";
+    }
+    return all;
+}
+
 /// Name of an object, whatever its class.
 inline std::string nameOf(const CmpiObjectPath& path) {
     return path.getKey("Name").getString().charPtr();

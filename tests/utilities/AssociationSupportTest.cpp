@@ -164,14 +164,7 @@ TYPED_TEST(AssociationFamily, HooksThatRefuseOrThrow) {
         for (const std::string hook : {"refuse", "before", "valid", "addKeys", "after"}) {
             SCOPED_TRACE(op.letters + (" " + hook));
             World<TypeParam> w;
-            const auto act = [&](const std::string& name) {
-                if (name == hook) {
-                    throw zemOperationFailedException("hook failed");
-                }
-                return hook != "refuse";
-            };
-            world->onHook = act;
-            world->valid = [&](const std::string&, const std::string&) { return act("valid"); };
+            failIn(hook);
             const bool paired = Family::byRows || (Family::byPair && op.bit != 1);
             const bool associators = op.bit == 8 || op.bit == 16;
             const bool called = hook == "valid"     ? true
@@ -185,8 +178,7 @@ TYPED_TEST(AssociationFamily, HooksThatRefuseOrThrow) {
             EXPECT_EQ(rc, w.run(op.letters, op.object).rc);
             EXPECT_EQ(paired && (hook == "after" || (!called && hook == "addKeys")) ? 1 : 0,
                       world->count("after"));
-            world->onHook = [](const std::string&) { return true; };
-            world->valid = [](const std::string&, const std::string&) { return true; };
+            failIn("none");
             std::thread([&] { EXPECT_EQ("s1-d1 s1-d2", show(w.run("rn", "s1"))); }).join();
         }
     }

@@ -175,36 +175,6 @@ TEST_F(BaseProviderManager, CountsExactlyInAnyOrderAndFromManyThreads) {
     EXPECT_EQ(1000, cleaned);
 }
 
-/// Does something of its own in each operation, and refuses those of associations and deletion.
-class WorkingProvider : public PlainProvider {
-public:
-    WorkingProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
-        : CmpiBaseMI(mb, ctx), PlainProvider(mb, ctx, name) {}
-    CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
-                                    const char**) override {
-        CmpiInstance found(path);
-        found.setProperty("Name", getKeyBinding(path, "Name"));
-        return found;
-    }
-    void performEnumInstances(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
-                              const char**) override {
-        result.returnData(CmpiInstance(path));
-        throwObjectNotFoundExc("enumInstances", "Test_Disk", "second");
-    }
-    void performCreateInstance(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
-                               const CmpiInstance&) override {
-        result.returnData(path);
-    }
-    void performSetInstance(const CmpiContext& ctx, CmpiResult&, const CmpiObjectPath&,
-                            const CmpiInstance&, const char**) override {
-        logICUMessage(ctx, 1, "Id", "bundle", "Key", "text");
-    }
-    void performInvokeMethod(const CmpiContext&, CmpiResult&, const CmpiObjectPath&, const char*,
-                             const CmpiArgs& in, CmpiArgs& out) override {
-        out.setArg("Reason", getParmVal(in, "Reason"));
-    }
-};
-
 // Each allocation in turn fails: of each operation, then of the factory and of the last cleanup.
 // The server gets an answer and goes on, and nothing is left behind.
 TEST(OutOfMemory, EachAllocationMayFail) {

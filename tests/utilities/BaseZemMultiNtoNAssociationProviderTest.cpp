@@ -189,11 +189,7 @@ TEST(ProviderPairsOneByOne, OrderOfCalls) {
         World<Plain> w;
         world->rows = {{"Test_Link", "", "Test_Disk", "Left", "", "Test_Port", "Right", ""}};
         w.run(operation, object);
-        std::string made;
-        for (const std::string& call : world->calls) {
-            made += call + " ";
-        }
-        EXPECT_EQ(calls, made) << operation;
+        EXPECT_EQ(calls, noted()) << operation;
     }
 }
 
@@ -204,14 +200,7 @@ TYPED_TEST(ProviderPairs, HooksThatThrow) {
         for (const std::string hook : {"before", "valid", "after"}) {
             SCOPED_TRACE(op.letters + (" " + hook));
             World<TypeParam> w;
-            const auto act = [&](const std::string& name) {
-                if (name == hook) {
-                    throw zemOperationFailedException("hook failed");
-                }
-                return true;
-            };
-            world->onHook = act;
-            world->valid = [&](const std::string&, const std::string&) { return act("valid"); };
+            failIn(hook);
             const cimom::Reply reply = w.run(op.letters, op.object);
             EXPECT_EQ(hook == "after" ? CMPI_RC_OK : CMPI_RC_ERR_FAILED, reply.rc);
             EXPECT_EQ(plain && hook == "before" ? 0 : 1, world->count("after"));

@@ -95,11 +95,7 @@ TEST(NtoNAssociation, OrderOfCalls) {
             return true;
         };
         w.run(operation, object);
-        std::string made;
-        for (const std::string& call : world->calls) {
-            made += call + " ";
-        }
-        EXPECT_EQ(calls, made) << operation;
+        EXPECT_EQ(calls, noted()) << operation;
     }
 }
 

@@ -109,6 +109,49 @@ private:
     }
 };
 
+/// Does something of its own in each operation, fails where its object has the name "missing", and
+/// refuses associations and deletion.
+class WorkingProvider : public PlainProvider {
+public:
+    WorkingProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
+        : CmpiBaseMI(mb, ctx), PlainProvider(mb, ctx, name) {}
+    CmpiInstance performGetInstance(const CmpiContext&, const CmpiObjectPath& path,
+                                    const char**) override {
+        const CmpiData name = getKeyBinding(path, "Name");
+        if (std::string(name.getString().charPtr()) == "missing") {
+            throwObjectNotFoundExc("getInstance", "Test_Disk", "missing");
+        }
+        CmpiInstance found(path);
+        found.setProperty("Name", name);
+        return found;
+    }
+    void performEnumInstances(const CmpiContext& ctx, CmpiResult& result,
+                              const CmpiObjectPath& path, const char** properties) override {
+        for (const char* name : {"a", "b", "missing"}) {
+            CmpiObjectPath one = createObjectPath(path);
+            one.setKey("Name", CmpiData(name));
+            result.returnData(performGetInstance(ctx, one, properties));
+        }
+    }
+    void performEnumInstanceNames(const CmpiContext&, CmpiResult& result,
+                                  const CmpiObjectPath& path) override {
+        result.returnData(path);
+    }
+    void performCreateInstance(const CmpiContext&, CmpiResult& result, const CmpiObjectPath& path,
+                               const CmpiInstance&) override {
+        result.returnData(path);
+    }
+    void performSetInstance(const CmpiContext& ctx, CmpiResult&, const CmpiObjectPath&,
+                            const CmpiInstance&, const char**) override {
+        logICUMessage(ctx, 1, "Id", "bundle", "Key", "text");
+    }
+    void performInvokeMethod(const CmpiContext&, CmpiResult& result, const CmpiObjectPath&,
+                             const char*, const CmpiArgs& in, CmpiArgs& out) override {
+        out.setArg("Reason", getParmVal(in, "Reason"));
+        result.returnData(CmpiData(CMPIUint32{0}));
+    }
+};
+
 /// What came back from one call through a function table.
 struct Answer {
     CMPIrc rc = CMPI_RC_OK;

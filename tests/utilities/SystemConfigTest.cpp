@@ -286,48 +286,35 @@ TEST_F(SystemConfigTest, NumbersHaveWords) {
 TEST_F(SystemConfigTest, WordsSurviveTheLibrary) {
     using appliance::Kind;
     makeAppliance();
-    Partition partition;
-    const struct {
-        Kind kind;
-        const char* attribute;
-        std::function<zemString(int)> word;
-        std::function<zemString()> read;
-    } rows[] = {
-        {Kind::Host, "state", zemHostSystem::getStateByID,
-         [&] { return zemHostSystem::getStateByID(m_host.getState()); }},
-        {Kind::Lpar, "state", Partition::getStateByID,
-         [&] { return Partition::getStateByID(partition.getState()); }},
-        {Kind::Lpar, "boot_mode", Partition::getBootModeByID,
-         [&] { return Partition::getBootModeByID(partition.getBootMode()); }},
-        {Kind::Lpar, "lpar_keylock", Partition::getKeyLockByID,
-         [&] { return Partition::getKeyLockByID(partition.getKeyLock()); }},
-        {Kind::Lpar, "migration_state",
-         [](int n) {
-             const char* const words[] = {"Not Migrating",     "Migration Starting",
-                                          "Migration Stopped", "Migration In Progress",
-                                          "Lost Connection",   "Migration Complete"};
-             return zemString(n < 6 ? words[n] : "");
-         },
-         [&] { return partition.getMigrationStateString(); }},
-    };
-    for (const auto& row : rows) {
-        for (int number = 0; number < 256; ++number) {
-            const zemString word = row.word(number);
-            if (word.isEmpty() || word == "unknown") {
-                continue;
-            }
-            {
-                auto store = appliance::Store::open(appliance::Database::Access::Write);
-                appliance::Transaction change = store.write();
-                appliance::Object object = store.all(row.kind).at(row.kind == Kind::Host ? 0 : 2);
-                object.set(row.attribute, static_cast<const char*>(word));
-                store.put(object);
-                change.commit();
-            }
-            makeObjects("", "");
-            partition = m_partition;
-            EXPECT_STREQ(word, row.read()) << row.attribute;
+    const auto check = [this](Kind kind, const char* attribute, const zemString& word, auto read) {
+        if (word.isEmpty() || word == "unknown") {
+            return;
         }
+        {
+            auto store = appliance::Store::open(appliance::Database::Access::Write);
+            appliance::Transaction change = store.write();
+            appliance::Object object = store.all(kind).at(kind == Kind::Host ? 0 : 2);
+            object.set(attribute, static_cast<const char*>(word));
+            store.put(object);
+            change.commit();
+        }
+        makeObjects("", "");
+        EXPECT_STREQ(word, read()) << attribute;
+    };
+    for (int number = 0; number < 256; ++number) {
+        check(Kind::Host, "state", zemHostSystem::getStateByID(number),
+              [this] { return zemHostSystem::getStateByID(m_host.getState()); });
+        check(Kind::Lpar, "state", Partition::getStateByID(number),
+              [this] { return Partition::getStateByID(m_partition.getState()); });
+        check(Kind::Lpar, "boot_mode", Partition::getBootModeByID(number),
+              [this] { return Partition::getBootModeByID(m_partition.getBootMode()); });
+        check(Kind::Lpar, "lpar_keylock", Partition::getKeyLockByID(number),
+              [this] { return Partition::getKeyLockByID(m_partition.getKeyLock()); });
+    }
+    for (const char* word : {"Not Migrating", "Migration Starting", "Migration Stopped",
+                             "Migration In Progress", "Lost Connection", "Migration Complete"}) {
+        check(Kind::Lpar, "migration_state", word,
+              [this] { return m_partition.getMigrationStateString(); });
     }
 }
 

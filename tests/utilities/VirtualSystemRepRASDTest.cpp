@@ -91,58 +91,44 @@ TEST(VirtualSystemRepRASDTest, CopiesHaveNoAddress) {
     EXPECT_STREQ("", static_cast<zemProcessorRASD&>(*other).getMTMS());
 }
 
-template <class Rasd>
-void expectChangesSeen(
-    const std::vector<void (*)(typename std::decay_t<decltype(Rasd::m_Data)>&)>& changes) {
+/// One with a changed field is another.
+template <class Rasd, class Data, class Value, class... Field>
+void expectChangesSeen(const Value& value, Field Data::*... fields) {
     Rasd mine("0-1");
     EXPECT_FALSE(mine.equals(nullptr));
-    for (const auto& change : changes) {
+    const auto check = [&](auto field) {
         Rasd other("0-1");
         EXPECT_TRUE(mine.equals(&other));
-        change(other.m_Data);
+        other.m_Data.*field = value;
         EXPECT_FALSE(mine.equals(&other)) << mine.getKey();
         EXPECT_TRUE(other.equals(&other));
-    }
+    };
+    (check(fields), ...);
 }
 
 TEST(VirtualSystemRepRASDTest, EqualsComparesAllFields) {
-    expectChangesSeen<zemMemoryRASD>({
-        [](auto& d) { d.m_InstanceID = "x"; },
-        [](auto& d) { d.m_PoolID = "x"; },
-        [](auto& d) { d.m_SharingMode = "x"; },
-        [](auto& d) { d.m_AllocationUnits = "x"; },
-        [](auto& d) { d.m_Address = "x"; },
-        [](auto& d) { d.m_Weight = 0; },
-        [](auto& d) { d.m_ConsumerVisibility = 0; },
-        [](auto& d) { d.m_MappingBehavior = 0; },
-        [](auto& d) { d.m_ResourceType = 0; },
-        [](auto& d) { d.m_VirtualMinimum = 0; },
-        [](auto& d) { d.m_VirtualQuantity = 0; },
-        [](auto& d) { d.m_VirtualMaximum = 0; },
-        [](auto& d) { d.m_Minimum = 0; },
-        [](auto& d) { d.m_Reservation = 0; },
-        [](auto& d) { d.m_Limit = std::int64_t{1} << 32; },
-        [](auto& d) { d.m_AutomaticAllocation = 0; },
-        [](auto& d) { d.m_AutomaticDeallocation = 0; },
-        [](auto& d) { d.m_IsRequired = 0; },
-    });
-    expectChangesSeen<zemProcessorRASD>({[](auto& d) { d.m_ProcCompatMode = "x"; }});
-    expectChangesSeen<zemIOSlotRASD>({[](auto& d) { d.m_DRCIndex = "x"; }});
-    expectChangesSeen<zemVSCSIRASD>({
-        [](auto& d) { d.m_VirtualAdapterType = 0; },
-        [](auto& d) { d.m_SlotID = 0; },
-        [](auto& d) { d.m_RemoteClientFlag = 0; },
-        [](auto& d) { d.m_RemoteClientSlotFlag = 0; },
-        [](auto& d) { d.m_RemoteVirtualSystemID = "x"; },
-        [](auto& d) { d.m_RemoteSlotID = 0; },
-    });
-    expectChangesSeen<zemVETHRASD>({
-        [](auto& d) { d.m_SlotID = 0; },
-        [](auto& d) { d.m_IEEECompatible = 0; },
-        [](auto& d) { d.m_PortVLANID = 0; },
-        [](auto& d) { d.m_TrunkPriority = 0; },
-        [](auto& d) { d.m_vswitch = "x"; },
-    });
+    using Common = zemRASDCommData;
+    expectChangesSeen<zemMemoryRASD>("x", &Common::m_InstanceID, &Common::m_PoolID,
+                                     &Common::m_SharingMode, &Common::m_AllocationUnits,
+                                     &Common::m_Address);
+    expectChangesSeen<zemMemoryRASD>(
+        0, &Common::m_Weight, &Common::m_ConsumerVisibility, &Common::m_MappingBehavior,
+        &Common::m_ResourceType, &Common::m_VirtualMinimum, &Common::m_VirtualQuantity,
+        &Common::m_VirtualMaximum, &Common::m_Minimum, &Common::m_Reservation,
+        &Common::m_AutomaticAllocation, &Common::m_AutomaticDeallocation, &Common::m_IsRequired);
+    expectChangesSeen<zemMemoryRASD>(std::int64_t{1} << 32, &Common::m_Limit);
+    expectChangesSeen<zemProcessorRASD>("x",
+                                        &zemProcessorRASD::zemProcessorRASDData::m_ProcCompatMode);
+    expectChangesSeen<zemIOSlotRASD>("x", &zemIOSlotRASD::zemIOSlotRASDData::m_DRCIndex);
+    using Remote = zemRemoteAdapterRASDData;
+    expectChangesSeen<zemVSCSIRASD>(0, &Remote::m_VirtualAdapterType, &Remote::m_SlotID,
+                                    &Remote::m_RemoteClientFlag, &Remote::m_RemoteClientSlotFlag,
+                                    &Remote::m_RemoteSlotID);
+    expectChangesSeen<zemVSCSIRASD>("x", &Remote::m_RemoteVirtualSystemID);
+    using Ethernet = zemVETHRASD::zemVETHRASDData;
+    expectChangesSeen<zemVETHRASD>(0, &Ethernet::m_SlotID, &Ethernet::m_IEEECompatible,
+                                   &Ethernet::m_PortVLANID, &Ethernet::m_TrunkPriority);
+    expectChangesSeen<zemVETHRASD>("x", &Ethernet::m_vswitch);
     zemVSCSIRASD scsi;
     zemVSERIALRASD serial;
     serial.m_Data.m_ResourceType = scsi.m_Data.m_ResourceType;

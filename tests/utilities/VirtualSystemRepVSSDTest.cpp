@@ -2,6 +2,7 @@
 
 #include <chrono>
 #include <memory>
+#include <sstream>
 #include <string>
 #include <tuple>
 #include <vector>
@@ -21,13 +22,14 @@ using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
 
 constexpr char kHost[] = "1111-AAA*0000001";
 
-/// What dumpVSSD() prints of the fields named, "|" behind each.
-std::string fieldsOf(zemVSSD& vssd, const std::vector<std::string>& names) {
+/// What dumpVSSD() prints of the fields named, with blanks between them; "|" behind each.
+std::string fieldsOf(zemVSSD& vssd, const std::string& names) {
     testing::internal::CaptureStdout();
     zemVSSD::dumpVSSD(&vssd);
     const std::string dump = testing::internal::GetCapturedStdout();
     std::string values;
-    for (const std::string& name : names) {
+    std::istringstream all(names);
+    for (std::string name; all >> name;) {
         const size_t begin = dump.find("\n\t" + name + ':') + name.size() + 3;
         values += dump.substr(begin, dump.find('\n', begin) - begin) + '|';
     }
@@ -177,22 +179,12 @@ TEST_F(VirtualSystemRepVSSDTest, DumpsPrintALineAField) {
 }
 
 TEST_F(VirtualSystemRepVSSDTest, SettingsComeFromRecordOrProfile) {
-    const std::vector<std::string> names = {"m_lparName",
-                                            "m_profileName",
-                                            "m_bootMode",
-                                            "m_autoActivate",
-                                            "m_enableConnectionMonitoring",
-                                            "m_maxVirtualSlots",
-                                            "m_isDefault",
-                                            "m_enableRedundantErrorPathReporting",
-                                            "m_virtualSystemIdentifier",
-                                            "m_keylock",
-                                            "m_virtualSystemType",
-                                            "m_defaultProfileName",
-                                            "m_IOSlotsInfo",
-                                            "m_virtualSerialAdaptersInfo",
-                                            "m_virtualSCSIAdaptersInfo",
-                                            "m_virtualEthetnetAdaptersInfo"};
+    const std::string names =
+        "m_lparName m_profileName m_bootMode m_autoActivate m_enableConnectionMonitoring "
+        "m_maxVirtualSlots m_isDefault m_enableRedundantErrorPathReporting "
+        "m_virtualSystemIdentifier m_keylock m_virtualSystemType m_defaultProfileName "
+        "m_IOSlotsInfo m_virtualSerialAdaptersInfo m_virtualSCSIAdaptersInfo "
+        "m_virtualEthetnetAdaptersInfo";
     const std::string ofPartition = "4*1111-AAA*0000001|manual|tmxlinux|Normal|";
     zemVSSD vssd = withLists("s", "v", "c", "e");
     EXPECT_EQ("|||0|0|0|0|0|" + ofPartition + "s|v|c|e|", fieldsOf(vssd, names));

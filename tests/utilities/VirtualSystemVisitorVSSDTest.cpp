@@ -333,6 +333,18 @@ TEST_F(VirtualSystemVisitorVSSDTest, DecidesRunningAdapters) {
         "4|0|0|2|0|0|0 2|1|9|20,30|3|inside|A2|1",
         rasdsOf(*vssd));
 
+    // A profile's tags go to the slots that it names.
+    const Vssd tagged(m_visitor.getProfileVSSD(
+        record<Partition>("default_profile=P;lpar_keylock=manual"),
+        record<Profile>("name=p;auto_start=1;redundant_err_path_reporting=1;io_slots=A//1,B//0;"
+                        "load_source_slot=A;alt_restart_device_slot=A;console_slot=A;"
+                        "alt_console_slot=A;op_console_slot=B"),
+        VISITOR_TYPE_RASD_IOSLOT));
+    EXPECT_EQ("A|1,2,4,5|1 B|6|0", rasdsOf(*tagged));
+    EXPECT_EQ("1|1|1|P|manual|", joined(tagged->getIsDefault(), tagged->getAutoActivate(),
+                                        tagged->getEnableRedundantErrorPathReporting(),
+                                        tagged->getDefaultProfileName(), tagged->getKeylock()));
+
     // The model tells adapters by itself, and gives all slots all tags.
     zemLPAR lpar(kHost, "3");
     zemPartitionProfileConfiguration stored(kHost, "3");
@@ -411,7 +423,7 @@ TEST_F(VirtualSystemVisitorVSSDTest, BothWaysGiveTheSame) {
 }
 
 TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
-    const zemRecordType one = record<Partition>("lpar_id=3;state=Running");
+    const zemRecordType active = record<Partition>("lpar_id=3;state=Running");
     const zemRecordType profile = record<Profile>("name=p");
     const zemRecordSetsType none;
     const zemRecordSetsType two = records<Processor>({"", ""});
@@ -421,7 +433,11 @@ TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
     stored.setProfileName("p");
     zemLPAR* const noLpar = nullptr;
     zemPartitionProfileConfiguration* const noProfile = nullptr;
-    const std::string partition = "Name=3*1111-AAA*0000001;Curr_prof=0,p";
+    const std::string state = "3/zemVSSDVisitor/getStateVSSD//";
+    const std::string one = "The output result should only have one record when executing ";
+    const std::string nothing = "There is no output result when executing ";
+    const std::string host = " 1111-AAA*0000001",
+                      of7 = "qyplat -r lpar --filter lpar_ids=7 -m" + host;
     const struct {
         std::vector<std::string> answer;  ///< the library's objects
         std::function<void()> operation;
@@ -429,46 +445,37 @@ TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
     } rows[] = {
         {{},
          [&] { m_visitor.getStateVSSD(noLpar, &stored, 0); },
-         "3/zemVSSDVisitor/getStateVSSD//The lpar which lpar_id is 3 does not existed"},
+         state + "The lpar which lpar_id is 3 does not existed"},
         {{},
          [&] { m_visitor.getStateVSSD(&lpar, noProfile, 0); },
-         "3/zemVSSDVisitor/getStateVSSD//Error occurred when get the profile data of lpar(3) on "
-         "host(1111-AAA*0000001)."},
+         state + "Error occurred when get the profile data of lpar(3) on host(1111-AAA*0000001)."},
         {{},
          [&] { m_visitor.getStateVSSD(&lpar, &stored, VISITOR_TYPE_RASD_MEM); },
-         "3/zemVSSDVisitor/getStateVSSD//Error occured when retrieving processor configuration "
-         "information from profile p for lpar 3 on host 1111-AAA*0000001"},
+         state +
+             "Error occured when retrieving processor configuration information from profile p for "
+             "lpar 3 on host" +
+             host},
         {{},
-         [&] { m_visitor.getStateVSSD(one, profile, two, none, none, none, none, none, 0); },
-         "3/zemVSSDVisitor/getStateVSSD//The output result should only have one record when "
-         "executing qyalloc -r proc for lpar(3) -m 1111-AAA*0000001"},
+         [&] { m_visitor.getStateVSSD(active, profile, two, none, none, none, none, none, 0); },
+         state + one + "qyalloc -r proc for lpar(3) -m" + host},
         {{},
-         [&] { m_visitor.getStateVSSD(one, profile, none, two, none, none, none, none, 0); },
-         "3/zemVSSDVisitor/getStateVSSD//The output result should only have one record when "
-         "executing qyalloc -r mem for lpar(3) -m 1111-AAA*0000001"},
-        {{},
-         [&] { m_visitor.getStateVSSD("7", 0); },
-         "5/zemVSSDVisitor/getStateVSSD//There is no output result when executing qyplat -r lpar "
-         "--filter lpar_ids=7 -m 1111-AAA*0000001"},
-        {{"", ""},
-         [&] { m_visitor.getStateVSSD("7", 0); },
-         "3/zemVSSDVisitor/getStateVSSD//The output result should only have one record when "
-         "executing qyplat -r lpar --filter lpar_ids=7 -m 1111-AAA*0000001"},
+         [&] { m_visitor.getStateVSSD(active, profile, none, two, none, none, none, none, 0); },
+         state + one + "qyalloc -r mem for lpar(3) -m" + host},
+        {{}, [&] { m_visitor.getStateVSSD("7", 0); }, "5" + state.substr(1) + nothing + of7},
+        {{"", ""}, [&] { m_visitor.getStateVSSD("7", 0); }, state + one + of7},
         {{"", ""},
          [&] { m_visitor.getProfileVSSD("7", "p", 0); },
-         "3/zemVSSDVisitor/getProfileVSSD//The output result should only have one record when "
-         "executing getLparObj with lpar id 7 on 1111-AAA*0000001"},
+         "3/zemVSSDVisitor/getProfileVSSD//" + one + "getLparObj with lpar id 7 on" + host},
         {{},
          [&] { m_visitor.getProfileVSSD("7", "p", 0); },
-         "5/zemVSSDVisitor/getProfileVSSD//There is no output result when executing "
-         "getLparProfile for profile name p of lpar 7 on 1111-AAA*0000001"},
+         "5/zemVSSDVisitor/getProfileVSSD//" + nothing +
+             "getLparProfile for profile name p of lpar 7 on" + host},
         {{},
          [&] { m_partitions.getData(&m_host, "7", ""); },
-         "3/zemLPARVisitor/getData//The lpar(7) does not exist on host 1111-AAA*0000001"},
+         "3/zemLPARVisitor/getData//The lpar(7) does not exist on host" + host},
         {{"", ""},
          [&] { m_partitions.getData(&m_host, "7", ""); },
-         "3/zemLPARVisitor/getData//The output result should only have one record when executing "
-         "qyplat -r lpar --filter lpar_ids=7 -m 1111-AAA*0000001"},
+         "3/zemLPARVisitor/getData//" + one + of7},
     };
     for (const auto& row : rows) {
         const LibraryAnswer answer(row.answer);

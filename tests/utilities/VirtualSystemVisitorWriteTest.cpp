@@ -12,9 +12,6 @@
 namespace {
 
 constexpr char kHost[] = "1111-AAA*0000001";
-constexpr int kAllKinds = VISITOR_TYPE_RASD_PROC | VISITOR_TYPE_RASD_MEM |
-                          VISITOR_TYPE_RASD_IOSLOT | VISITOR_TYPE_RASD_VSCSI |
-                          VISITOR_TYPE_RASD_VSERIAL | VISITOR_TYPE_RASD_VETH;
 using Caller = zemCommandCaller;
 
 /// What a VSSD is made of.
@@ -445,99 +442,5 @@ TEST_F(VirtualSystemVisitorWriteTest, ChangesRunningQuantities) {
     }
 }
 // clang-format on
-
-/// A partition that a tool made of settings has these, and changed ones after a change.
-TEST_F(VirtualSystemVisitorWriteTest, WhatIsWrittenIsRead) {
-    for (const char* tool : {"nwplat", "edplat", "dlplat"}) {
-        m_tools.restoreTool(tool);
-    }
-    ASSERT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance init").exit);
-    setenv("PATH", (m_tools.file("bin") + ":" + ZEM_PROGRAMS + ":" + getenv("PATH")).c_str(), 1);
-    zemSystemMemoryResource memory(kHost);
-    memory.setMaxMemPools(1);
-    m_host.setMemory(memory);
-    zemSystemProcessorResource processor(kHost);
-    processor.setMaxSharedProcPools(64);
-    m_host.setProcessor(processor);
-
-    Given g;
-    g.lparID = "";
-    g.name = "new, \"one\"";
-    g.profile = "first-day";
-    g.type = "osq00";
-    g.isOSQ00 = true;
-    g.host.m_lparProcCompatModes = "default,CORAL7";
-    g.host.m_maxProcPools = 64;
-    g.host.m_maxMemPools = 1;
-    g.processor.m_Data.m_ProcCompatMode = "CORAL7";
-    g.memory.m_Data.m_ConsumerVisibility = 3;
-    g.memory.m_Data.m_Weight = 9;
-    g.memory.m_Data.m_Reservation = 262144;
-    g.lists = {
-        {12, "30000005//1,30000006//0"},
-        {10, "2/0/1//0/1/default,3/1/1/\"5,7\"/0/0/s w"},
-        {21, "0/server/1/any//any/1,1/server/1/any//any/1,4/server/1/any//any/0"},
-        {6, "5/client/1//13/1,6/server/any//any/0,7/client/any//any/0"},
-    };
-    g.tags = {1, 2, 4};
-    const auto read = [&] {
-        return std::unique_ptr<zemVSSD>(m_settings.getProfileVSSD("8", g.profile, kAllKinds));
-    };
-    /// What would make the partition.
-    const auto line = [&](zemVSSD& vssd) {
-        m_tools.recorder("nwplat");
-        const std::string all = received([&] { create(g, vssd); });
-        m_tools.restoreTool("nwplat");
-        return all;
-    };
-    ASSERT_EQ("", failureText([&] { create(g, *g.make()); }, "kiat"));
-    EXPECT_EQ(line(*g.make()), line(*read()));
-
-    // What is added is there, and gone when it is removed.
-    zemVSSD more(kHost, "8", g.profile);
-    zemVSSDVisitor::createIORASDs("8/1/1/\"5,7\"/2/0/other,9/0/1//0/0/other", 10, &more);
-    zemVSSDVisitor::createIORASDs("30000002//1", 12, &more);
-    EXPECT_EQ(0, m_settings.AddIOResources(&more));
-    const auto listed = [&](int type) {
-        return std::string(zemVSSDVisitor::getIOSettingString(read().get(), type));
-    };
-    EXPECT_EQ(R"(2/0/1///1/default,\"\"3/1/1/5,7//0/s w\"\",\"\"8/1/1/5,7/2/0/other\"\",)"
-              "9/0/1///0/other",
-              listed(10));
-    EXPECT_EQ("30000005//1,30000006//0,30000002//1", listed(12));
-    EXPECT_EQ(0, m_settings.RemoveIOResources(&more));
-    EXPECT_EQ(line(*g.make()), line(*read()));
-
-    g.lparID = "8";
-    g.memory.m_Data.m_ConsumerVisibility = 2;
-    g.memory.m_Data.m_Reservation = 2097152;
-    g.processor.m_Data.m_VirtualQuantity = 300;
-    g.memoryPools = 1;
-    g.lists.erase(g.lists.begin() + 3);
-    g.lists.emplace_back(6, "5/client/1//13/0");
-    EXPECT_EQ("", failureText([&] {
-                  m_settings.ModifyResourcesOfProfile(g.make().get(), Caller::CH_OP_MODIFY);
-              }));
-    g.profile = "night";
-    g.bootMode = "sms";
-    g.slots = 30;
-    EXPECT_EQ(0, m_settings.ModifySystemSetting(g.make().get(), "first-day"));
-    g.memory.m_Data.m_Weight = -1;  // does not count without a pool
-    EXPECT_EQ(line(*g.make()), line(*read()));
-    EXPECT_EQ(0, m_partitions.deleteLpar(kHost, "8"));
-
-    // A gigabyte more is one.
-    m_tools.restoreTool("edalloc");
-    zemMemoryRASD before, now;
-    before.m_Data.m_ConsumerVisibility = 2;
-    before.m_Data.m_Reservation = 16777216;
-    now.m_Data.m_Reservation = 17825792;
-    EXPECT_EQ(
-        0, m_partitions.ChangeRunningMemProcResource(kHost, "4", &before, &now, nullptr, nullptr));
-    EXPECT_EQ(
-        "17408\n",
-        m_tools.run("qyalloc -r mem --level lpar -m alpha --filter lpar_ids=4 -F curr_mem").out);
-    EXPECT_EQ(0, m_tools.run("appliance check").exit);
-}
 
 }  // namespace

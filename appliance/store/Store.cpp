@@ -128,12 +128,11 @@ void Store::put(const Object& object) {
     m_put->step();
 }
 
-bool Store::remove(Kind kind, const Place& place) {
+void Store::remove(Kind kind, const Place& place) {
     Statement query(*m_database,
                     "DELETE FROM object WHERE kind = ? AND host = ? AND lpar = ? AND number = ?");
     query.bind(kindName(kind), place.host, place.lpar, place.number);
     query.step();
-    return sqlite3_changes(m_database->handle()) != 0;
 }
 
 std::optional<Object> Store::find(Kind kind, const Place& place) {

@@ -43,8 +43,8 @@ public:
 
     /// Adds @p object, or replaces the one in its place.
     void put(const Object& object);
-    /// Whether there was such an object.
-    bool remove(Kind kind, const Place& place);
+    /// Removes the object in this place, if there is one.
+    void remove(Kind kind, const Place& place);
 
     /// The object in this place, if there is one.
     std::optional<Object> find(Kind kind, const Place& place);

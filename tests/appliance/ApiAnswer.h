@@ -34,6 +34,6 @@ private:
     apiProp* m_result;
 };
 
-class ApiTest : public ToolTest {};
+using ApiTest = DemoTest;
 
 #endif

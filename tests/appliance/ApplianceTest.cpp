@@ -3,6 +3,8 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include <map>
+
 #include "Store.h"
 #include "ToolRecords.h"
 
@@ -63,6 +65,13 @@ TEST_F(ApplianceTest, WhatOthersLeaveInItsFolderNeitherStopsNorMisleadsIt) {
     };
     damage("UPDATE object SET attributes = 'stray' || rtrim(attributes, char(10))");
     EXPECT_EQ(before, shown());
+    for (const auto& [version, answer] : std::map<std::string, const char*>{
+             {"99", "WRTL2003 The appliance's state has version 99; this program reads version 2."},
+             {"0", "WRTL2002 "}}) {
+        damage(("PRAGMA user_version = " + version).c_str());
+        EXPECT_EQ(0U, run("appliance show").err.find(answer)) << version;
+    }
+    damage("PRAGMA user_version = 2");
     damage("UPDATE object SET lpar = 1 WHERE kind = 'host'");
     const struct {
         const char* command;  ///< in the appliance's folder

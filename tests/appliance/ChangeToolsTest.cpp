@@ -7,10 +7,7 @@
 
 namespace {
 
-class ChangeToolsTest : public ApiTest {
-protected:
-    ChangeToolsTest() { make("init"); }
-};
+using ChangeToolsTest = DemoTest;
 
 // clang-format off
 TEST_F(ChangeToolsTest, ResourcesMove) {
@@ -109,13 +106,13 @@ TEST_F(ChangeToolsTest, StoredSettingsChange) {
 
 TEST_F(ChangeToolsTest, PartitionsComeAndGo) {
     expectRows({
-        {NEW SHARED "\"name=new, one\",\"profile_name=first\",\"auto_start=0\",\"boot_mode=norm\",\"max_virtual_slots=20\",\"conn_monitoring=0\",\"redundant_err_path_reporting=0\",\"proc_mode=shared\",\"sharing_mode=uncap\",\"uncap_weight=100\",\"lpar_proc_compat_mode=default\",\"virtual_scsi_adapters=3/client/1//12/1\",\"virtual_serial_adapters=4/server//any//any/0\",\"virtual_eth_adapters=2/0/1///0,\"\"5/1/7/20,30//0/vs\"\"\",\"io_slots=30000001//0\",\"lhea_capabilities =0\"'"},
+        {NEW SHARED "\"name=new, one\",\"profile_name=first\",\"auto_start=1\",\"boot_mode=sms\",\"max_virtual_slots=20\",\"conn_monitoring=1\",\"redundant_err_path_reporting=1\",\"proc_mode=shared\",\"sharing_mode=uncap\",\"uncap_weight=100\",\"lpar_proc_compat_mode=default\",\"virtual_scsi_adapters=3/client/1//12/1\",\"virtual_serial_adapters=4/server//any//any/0\",\"virtual_eth_adapters=2/0/1///0,\"\"5/1/7/20,30//0/vs\"\"\",\"io_slots=30000001//0\",\"lhea_capabilities =0\"'"},
         {NEW "\"name=ded\",\"proc_mode=ded\",\"sharing_mode=share_idle_procs\",\"uncap_weight=3\",\"desired_proc_units=2.00\",\"lpar_avail_priority=1\",\"min_num_huge_pages=0\"'"},
         {"nwplat -r lpar -m gamma -i '\"lpar_id=9\",\"name=all\",\"lpar_env=osq00\",\"all_resources=1\",\"load_source_slot=30000001\",\"console_slot=dnx\"'"},
         {"qyplat -r lpar -m gamma --filter lpar_ids=3,4,9 -F lpar_id,name,lpar_env,state,resource_config,default_profile,curr_profile", "3,\"new, one\",tmxlinux,Not Activated,0,first,\n4,ded,tmxlinux,Not Activated,0,normal,\n9,all,osq00,Not Activated,0,normal,\n"},
         {"qyalloc -r proc --level lpar -m gamma --filter lpar_ids=3,4 -F pend_proc_mode,pend_sharing_mode,pend_uncap_weight,pend_shared_proc_pool_id,pend_procs,curr_proc_units", "shared,uncap,100,0,0,0.0\nded,share_idle_procs,0,null,0,0.0\n"},
         {"qyalloc -r virtualio --rsubtype slot --level lpar -m gamma --filter lpar_ids=3,4 -F curr_max_virtual_slots", "20\n10\n"},
-        {"qyplat -r prof -m gamma --filter lpar_ids=3 -F virtual_scsi_adapters,virtual_eth_adapters,io_slots,desired_proc_units", "3/client/1/xbrg/12/1,\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/vs\"\"\",30000001/none/0,1.00\n"},
+        {"qyplat -r prof -m gamma --filter lpar_ids=3 -F virtual_scsi_adapters,virtual_eth_adapters,io_slots,desired_proc_units,boot_mode,conn_monitoring,auto_start,redundant_err_path_reporting", "3/client/1/xbrg/12/1,\"2/0/1//0/0/default,\"\"5/1/7/20,30/0/0/vs\"\"\",30000001/none/0,1.00,sms,1,1,1\n"},
         {"qyplat -r prof -m gamma --filter lpar_ids=4,9 -F lpar_id,virtual_serial_adapters,min_proc_units,max_proc_units,all_resources,console_slot", "4,\"0/server/1/any//any/1,1/server/1/any//any/1\",1.00,4.00,0,none\n9,\"0/server/1/any//any/1,1/server/1/any//any/1\",0.0,0.0,1,dnx\n"},
         {"qyalloc -r virtualio --rsubtype slot --level slot -m gamma --filter lpar_ids=3", "No results were found.\n"},
         // Others forget the one that goes, and its ID is free again.

@@ -2,8 +2,6 @@
 // no space. ZEM_CHANGES is the number of rounds, for a long run.
 
 #include <gtest/gtest.h>
-#include <signal.h>
-#include <unistd.h>
 
 #include <chrono>
 #include <map>
@@ -21,9 +19,8 @@ int rounds(int usual) {
     return wanted == nullptr ? usual : std::atoi(wanted);
 }
 
-class ChangesTogetherTest : public ToolTest {
+class ChangesTogetherTest : public DemoTest {
 protected:
-    ChangesTogetherTest() { make("init"); }
     std::int64_t lineCount(const std::string& command) {
         return static_cast<std::int64_t>(lines(out(command)).size());
     }
@@ -61,33 +58,13 @@ TEST_F(ChangesTogetherTest, WhatSucceedsAddsUp) {
     EXPECT_EQ("", m_appliance.run("cat $APPLIANCE_HOME/err.* | grep -v 'WRTL8036\\|WRTL8032'").out);
 }
 
-/// Starts a tool, and kills it after @p microseconds.
-void runKilled(const std::vector<std::string>& command, std::int64_t microseconds) {
-    std::vector<char*> arguments;
-    arguments.reserve(command.size() + 1);
-    for (const std::string& word : command) {
-        arguments.push_back(const_cast<char*>(word.c_str()));
-    }
-    arguments.push_back(nullptr);
-    const pid_t child = fork();
-    if (child == 0) {
-        execvp(arguments[0], arguments.data());
-        _exit(127);
-    }
-    usleep(static_cast<useconds_t>(microseconds));
-    kill(child, SIGKILL);
-    waitpid(child, nullptr, 0);
-}
+const std::string kMake = "nwplat -r lpar -m gamma -i name=k,lpar_env=tmxlinux,all_resources=1";
 
 TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
-    const std::vector<std::string> make = {
-        "nwplat", "-r", "lpar", "-m", "gamma", "-i", "name=k,lpar_env=tmxlinux,all_resources=1"};
-    const std::vector<std::string> remove = {"dlplat", "-r", "lpar", "-m", "gamma", "--id", "3"};
     const std::string without = shown();
     const auto start = std::chrono::steady_clock::now();
-    out("nwplat -r lpar -m gamma -i name=k,lpar_env=tmxlinux,all_resources=1");
-    const std::chrono::microseconds usual = std::chrono::duration_cast<std::chrono::microseconds>(
-        std::chrono::steady_clock::now() - start);
+    out(kMake);
+    const std::chrono::duration<double> usual = std::chrono::steady_clock::now() - start;
     const std::string with = shown();
     ASSERT_NE(without, with);
 
@@ -95,8 +72,9 @@ TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
     std::string before = with;
     std::int64_t changes = 1;
     for (int i = rounds(40); i > 0; --i) {
-        const auto moment = engine() % static_cast<std::uint64_t>(usual.count() * 3 / 2);
-        runKilled(before == with ? remove : make, static_cast<std::int64_t>(moment));
+        const double moment = usual.count() * 1.5 * std::generate_canonical<double, 32>(engine);
+        run("timeout --foreground -s KILL " + std::to_string(moment) + ' ' +
+            (before == with ? "dlplat -r lpar -m gamma --id 3" : kMake));
         ASSERT_EQ("", out("appliance check"));
         const std::string after = shown();
         ASSERT_TRUE(after == with || after == without) << after;
@@ -110,20 +88,18 @@ TEST_F(ChangesTogetherTest, AKilledToolChangesAllOrNothing) {
 
 TEST_F(ChangesTogetherTest, AFullDiskIsAFailureAndNoChange) {
     const std::string before = shown();
-    const std::string change =
-        "nwplat -r lpar -m gamma -i name=k,lpar_env=tmxlinux,all_resources=1";
     // The limits, in half kilobytes, are met at the first, second and third page of a change.
     for (const char* limit : {"1", "9", "17"}) {
         const Outcome outcome =
-            m_appliance.run(std::string("trap '' XFSZ; ulimit -f ") + limit + "; " + change);
+            m_appliance.run(std::string("trap '' XFSZ; ulimit -f ") + limit + "; " + kMake);
         EXPECT_EQ(3, outcome.exit) << limit << outcome.out;
         EXPECT_EQ(0U, outcome.err.find("WRTL2005 ")) << outcome.err;
         EXPECT_EQ(before, shown());
     }
-    EXPECT_NE(0, m_appliance.run("ulimit -f 9; " + change).exit);
+    EXPECT_NE(0, m_appliance.run("ulimit -f 9; " + kMake).exit);
     EXPECT_EQ(before, shown());
     EXPECT_EQ(0, journalLines());
-    EXPECT_EQ("", out(change));
+    EXPECT_EQ("", out(kMake));
     EXPECT_EQ(1, journalLines());
     EXPECT_EQ("", out("appliance check"));
 }

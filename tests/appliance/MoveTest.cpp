@@ -28,7 +28,6 @@ std::string noted(const std::string& line, const std::string& name) {
 class MoveTest : public ApiTest {
 protected:
     MoveTest() {
-        make("init");
         out("domove -o s -m alpha --id 7");  // the move of the demo, which nobody carries out
         out("edpower -r lpar --id 1 -o on -f normal -m 'beta lab'");
     }

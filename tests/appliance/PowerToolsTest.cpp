@@ -5,10 +5,7 @@
 
 namespace {
 
-class PowerToolsTest : public ApiTest {
-protected:
-    PowerToolsTest() { make("init"); }
-};
+using PowerToolsTest = DemoTest;
 
 #define BETA " -m 1111-AAB*0000002"
 #define LPAR "edpower -r lpar -m gamma "

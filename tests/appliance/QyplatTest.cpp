@@ -9,10 +9,7 @@ namespace {
 
 using testing_support::Outcome;
 
-class QyplatTest : public ToolTest {
-protected:
-    QyplatTest() { make("init"); }
-};
+using QyplatTest = DemoTest;
 
 TEST_F(QyplatTest, AnswersAndFailures) {
     expectRows({

@@ -1,5 +1,7 @@
 #include <gtest/gtest.h>
 
+#include "Failure.h"
+#include "Object.h"
 #include "Text.h"
 
 namespace {
@@ -60,6 +62,17 @@ TEST(TextTest, Numbers) {
     EXPECT_EQ(125, value);
     EXPECT_EQ("000A", hex(10, 4));
     EXPECT_EQ("01/02/2013 03:04:05", timeText(1357095845));
+}
+
+TEST(TextTest, AttributesKeepAllThatALineCanHold) {
+    Object object(Kind::Lpar, {1, 4});
+    object.set("pend_mem", "2048");
+    object.set("name", "name=pend_mem=\"1\"");
+    EXPECT_EQ("name=pend_mem=\"1\"", object.get("name"));
+    EXPECT_EQ("2048", Object(Kind::Lpar, {1, 4}, object.stored()).get("pend_mem"));
+    EXPECT_THROW(object.set("name", "two\nlines"), Failure);
+    EXPECT_THROW(object.set("nmae", "x"), std::logic_error);
+    EXPECT_THROW(object.get("lpar_env"), std::logic_error);  // must be set first
 }
 
 }  // namespace

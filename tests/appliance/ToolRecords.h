@@ -96,4 +96,10 @@ protected:
     testing_support::TestAppliance m_appliance{ZEM_PROGRAMS};
 };
 
+/// The same, on the appliance of the demo.
+class DemoTest : public ToolTest {
+protected:
+    DemoTest() { make("init"); }
+};
+
 #endif

@@ -32,24 +32,22 @@ static int thingCount = 2;
 static pthread_mutex_t storeMutex = PTHREAD_MUTEX_INITIALIZER;
 static const CMPIBroker* broker;
 
-static Text textOf(const CMPIString* string) { return string->ft->getCharPtr(string, NULL); }
-static Text nameSpaceOf(Path path) { return textOf(path->ft->getNameSpace(path, NULL)); }
+static Text nameSpaceOf(Path path) { return CMGetCharPtr(CMGetNameSpace(path, NULL)); }
 static Text keyOf(Path path) {
     CMPIStatus rc;
-    CMPIData key = path->ft->getKey(path, "Name", &rc);
-    return rc.rc == CMPI_RC_OK && key.type == CMPI_string ? textOf(key.value.string) : "";
+    CMPIData key = CMGetKey(path, "Name", &rc);
+    return rc.rc == CMPI_RC_OK && key.type == CMPI_string ? CMGetCharPtr(key.value.string) : "";
 }
 
 static CMPIStatus status(CMPIrc rc, Text text) {
-    CMPIStatus result = {rc, NULL};
-    if (text) {
-        result.msg = broker->eft->newString(broker, text, NULL);
+    if (!text) {
+        CMReturn(rc);
     }
-    return result;
+    CMReturnWithChars(broker, rc, text);
 }
 static CMPIStatus done(Result result) {
-    result->ft->returnDone(result);
-    return status(CMPI_RC_OK, NULL);
+    CMReturnDone(result);
+    CMReturn(CMPI_RC_OK);
 }
 
 static int findThing(Text name) {
@@ -104,9 +102,9 @@ static CMPIStatus enumerate(Result result, Path path, int names, Text* propertie
     pthread_mutex_lock(&storeMutex);
     for (int i = 0; i < thingCount; ++i) {
         if (names) {
-            result->ft->returnObjectPath(result, thingPath(path, &things[i]));
+            CMReturnObjectPath(result, thingPath(path, &things[i]));
         } else {
-            result->ft->returnInstance(result, thingInstance(path, &things[i], properties));
+            CMReturnInstance(result, thingInstance(path, &things[i], properties));
         }
     }
     pthread_mutex_unlock(&storeMutex);
@@ -126,7 +124,7 @@ static CMPIStatus FixtureGetInstance(CMPIInstanceMI* mi, Context ctx, Result res
     pthread_mutex_lock(&storeMutex);
     at = findThing(keyOf(path));
     if (at >= 0) {
-        result->ft->returnInstance(result, thingInstance(path, &things[at], properties));
+        CMReturnInstance(result, thingInstance(path, &things[at], properties));
     }
     pthread_mutex_unlock(&storeMutex);
     return at < 0 ? status(CMPI_RC_ERR_NOT_FOUND, "no such thing") : done(result);
@@ -146,7 +144,7 @@ static CMPIStatus FixtureCreateInstance(CMPIInstanceMI* mi, Context ctx, Result 
     if (!fits) {
         return status(CMPI_RC_ERR_ALREADY_EXISTS, "such a thing is there");
     }
-    result->ft->returnObjectPath(result, path);
+    CMReturnObjectPath(result, path);
     return done(result);
 }
 static CMPIStatus change(Path path, const CMPIInstance* inst, int delete) {
@@ -208,9 +206,9 @@ static CMPIStatus related(Context ctx, Result result, Path from, Text role, int 
             inst = linkInstance(from, path);
         }
         if (what & Paths) {
-            result->ft->returnObjectPath(result, inst->ft->getObjectPath(inst, NULL));
+            CMReturnObjectPath(result, inst->ft->getObjectPath(inst, NULL));
         } else {
-            result->ft->returnInstance(result, inst);
+            CMReturnInstance(result, inst);
         }
     }
     return done(result);
@@ -237,11 +235,10 @@ static CMPIStatus FixtureReferenceNames(CMPIAssociationMI* mi, Context ctx, Resu
 /* -- methods -- */
 
 static void give(CMPIArgs* out, const CMPIString* name, CMPIData data) {
-    const CMPIValue* value = data.state & CMPI_nullValue ? NULL : &data.value;
-    out->ft->addArg(out, textOf(name), value, data.type);
+    CMAddArg(out, CMGetCharPtr(name), CMIsNullValue(data) ? NULL : &data.value, data.type);
 }
 static CMPIStatus fire(Context ctx, Path path, const CMPIArgs* in) {
-    CMPIData severity = in->ft->getArg(in, "Severity", NULL);
+    CMPIData severity = CMGetArg(in, "Severity", NULL);
     CMPIInstance* event = broker->eft->newInstance(broker, newPath(path, "Fix_Event"), NULL);
     event->ft->setProperty(event, "Severity", &severity.value, severity.type);
     return broker->bft->deliverIndication(broker, ctx, nameSpaceOf(path), event);
@@ -250,10 +247,10 @@ static CMPIStatus FixtureInvokeMethod(CMPIMethodMI* mi, Context ctx, Result resu
                                       Text method, const CMPIArgs* in, CMPIArgs* out) {
     CMPIString* name;
     CMPIValue value;
-    value.uint32 = in->ft->getArgCount(in, NULL);
+    value.uint32 = CMGetArgCount(in, NULL);
     if (strcmp(method, "Echo") == 0) {
         for (CMPICount i = 0; i < value.uint32; ++i) {
-            CMPIData data = in->ft->getArgAt(in, i, &name, NULL);
+            CMPIData data = CMGetArgAt(in, i, &name, NULL);
             give(out, name, data);
         }
     } else if (strcmp(method, "Context") == 0) {
@@ -274,7 +271,7 @@ static CMPIStatus FixtureInvokeMethod(CMPIMethodMI* mi, Context ctx, Result resu
     } else {
         return status(CMPI_RC_ERR_METHOD_NOT_FOUND, method);
     }
-    result->ft->returnData(result, &value, CMPI_uint32);
+    CMReturnData(result, &value, CMPI_uint32);
     return done(result);
 }
 
@@ -297,7 +294,7 @@ static CMPIStatus FixtureGetProperty(CMPIPropertyMI* mi, Context ctx, Result res
         return status(CMPI_RC_ERR_NOT_FOUND, "no such thing");
     }
     value.uint32 = things[at].size;
-    result->ft->returnData(result, &value, CMPI_uint32);
+    CMReturnData(result, &value, CMPI_uint32);
     return done(result);
 }
 
@@ -352,8 +349,7 @@ CMInstanceMIStub(Fixture, Fixture, broker, CMNoHook)
                     CMPI_EXTERN_C CMPIInstanceMI* Refuser_Create_InstanceMI(const CMPIBroker* mb,
                                                                             Context ctx,
                                                                             CMPIStatus* rc) {
-    rc->rc = CMPI_RC_ERR_ACCESS_DENIED;
-    rc->msg = mb->eft->newString(mb, "not today", NULL);
+    CMSetStatusWithChars(mb, rc, CMPI_RC_ERR_ACCESS_DENIED, "not today");
     return NULL;
 }
 

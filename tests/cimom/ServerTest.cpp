@@ -325,6 +325,7 @@ struct Probe {
     const char* nameSpace = "root/cimv2";       ///< of the link
     const char* thingNameSpace = "root/cimv2";  ///< of the thing
     std::function<void()> meanwhile = [] {};    ///< done in a modify
+    std::function<void()> ending = [] {};       ///< done when it goes
 };
 Probe probe;
 const CMPIStatus kDone{CMPI_RC_OK, nullptr};
@@ -343,7 +344,10 @@ CMPIStatus returnLink(const CMPIResult* result) {
 CMPIInstanceMI* probeInstances(const CMPIBroker* mb, const CMPIContext*, CMPIStatus*) {
     probe.broker = mb;
     static CMPIInstanceMIFT table = {};
-    table.cleanup = [](CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) { return kDone; };
+    table.cleanup = [](CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+        probe.ending();
+        return kDone;
+    };
     table.createInstance = [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
                               const CMPIObjectPath*, const CMPIInstance* inst) {
         probe.given = RequestScope::read(inst).properties;
@@ -446,30 +450,17 @@ TEST_P(Probed, StaysWhileItWorks) {
     EXPECT_TRUE(m_server.unloadProviders(false).empty());
 }
 
+TEST_P(Probed, IsAnsweredForWhatItThrows) {
+    probe.meanwhile = [] { throw std::runtime_error("lost my mind"); };
+    probe.ending = [] { throw std::runtime_error("again"); };
+    const Reply reply = m_server.modifyInstance({}, Instance(thing("one")));
+    EXPECT_EQ(reply.rc, CMPI_RC_ERR_FAILED);
+    EXPECT_EQ(reply.message, "provider Probe threw: lost my mind");
+}
+
 ON_BOTH_BROKERS(Probed);
 
-// -- providers that fail --------------------------------------------------------------------------
-
-CMPIInstanceMI* throwingFactory(const CMPIBroker*, const CMPIContext*, CMPIStatus*) {
-    static CMPIInstanceMIFT table = {};
-    table.enumerateInstanceNames = [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                                      const CMPIObjectPath*) -> CMPIStatus {
-        throw std::runtime_error("lost my mind");
-    };
-    table.cleanup = [](CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) -> CMPIStatus {
-        throw std::runtime_error("again");
-    };
-    static CMPIInstanceMI mi = {nullptr, &table};
-    return &mi;
-}
-
-TEST(Providers, WhatTheyThrowIsAnswered) {
-    Server server;
-    server.registerProvider("Mad", {"C"}, {throwingFactory, nullptr, nullptr, nullptr, nullptr});
-    const Reply reply = server.enumInstanceNames({}, {"", "C"});
-    EXPECT_EQ(reply.rc, CMPI_RC_ERR_FAILED);
-    EXPECT_EQ(reply.message, "provider Mad threw: lost my mind");
-}
+// -- libraries ------------------------------------------------------------------------------------
 
 class Loader : public testing::Test {
 protected:

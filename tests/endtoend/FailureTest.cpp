@@ -285,10 +285,7 @@ TEST_P(FailureTest, EnumerationsLogWhatTheyDoNotAnswer) {
         {"guest", 0, "",
          logged + "ACCESS_DENIED: " +
              says("UserAccessDenied", {{0, "guest"}, {1, "enumerateInstances"}}).english + '\n'},
-        {"ObjectNotFound", 0, "", logged + "NOT_FOUND: " + says("ObjectNotFound").english + '\n'},
         {"Status", 0, "", logged + "NOT_FOUND: the binding's own\n"},
-        {"ParameterNotFound", 4,
-         "CIM_ERR_INVALID_PARAMETER (4): Parameter a is not found in provided parameters.\n", ""},
         {"OtherKind", 1, "CIM_ERR_FAILED (1): of no kind\n", ""},
     };
     for (const auto& row : rows) {
@@ -472,51 +469,6 @@ TEST_P(FailureTest, DisabledProvidersFindNothing) {
     for (const Row& row : rows) {
         expectFailure(row);
     }
-}
-
-// -- languages ------------------------------------------------------------------------------------
-
-// The client's languages choose the locale of the tools, whose first is taken, and the bundle, of
-// which the first that there is.
-TEST_P(FailureTest, LanguagesChooseTheTextAndTheToolsLocale) {
-    const fs::path messages = m_appliance.folder() / "messages";
-    fs::create_directory(messages);
-    fs::copy(ZEM_MESSAGES "/default_de.json", messages);
-    std::ofstream(messages / "default_fr.json")
-        << R"({"Error.PropertiesAccessException2": "{0} : {6} : {5}"})";
-    m_appliance.replaceTool("qyplat", "echo \"WRTL0001 $LC_ALL\"\nexit 1");
-    const std::string call = "\"qyplat -r sys -F type_model,serial_num\"";
-    const struct {
-        const char* accepted;
-        const char* locale;
-        const char* words;
-    } rows[] = {
-        {"", "", "English"},
-        {"en", "en_US.UTF-8", "English"},
-        {"de-AT", "de_AT.UTF-8", "German"},
-        {"fr-ca", "fr_CA.UTF-8", "French"},
-        {"fr;q=0", "", "English"},
-        {"fr;q=0.5,de", "de_DE.UTF-8", "German"},
-        {"pt-br;q=0.7,de;q=0.5", "pt_BR.UTF-8", "German"},
-    };
-    for (const auto& [accepted, locale, words] : rows) {
-        const std::string told = std::string("WRTL0001 ") + locale;
-        const Texts text = says(kOnBehalf, {{0, "enumInstanceNames"},
-                                            {1, "ORXC_CEC_CSProvider"},
-                                            {2, "callGenericCommand"},
-                                            {3, "zemCommandCaller"},
-                                            {4, "WRTL0001"},
-                                            {5, told},
-                                            {6, call}});
-        expectFailure(
-            "--messages '" + messages.string() + "' --language '" + accepted + "' ein ORXC_CEC_CS",
-            kFailed,
-            !full() || words == std::string("English") ? text.english
-            : words == std::string("German")           ? text.german
-                                             : "enumInstanceNames : " + call + " : " + told);
-    }
-    expectFailure("--language de di " + kDisk, kNotSupported,
-                  says("MethodNotSupported", {{0, "deleteInstance"}}).english);
 }
 
 INSTANTIATE_TEST_SUITE_P(Brokers, FailureTest, ::testing::Values("full", "lean"),

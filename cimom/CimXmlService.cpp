@@ -14,7 +14,6 @@ namespace cimom {
 
 namespace {
 
-constexpr unsigned kOk = 200;
 constexpr unsigned kBadRequest = 400;
 constexpr unsigned kMethodNotAllowed = 405;
 constexpr unsigned kUnsupportedMediaType = 415;

@@ -291,7 +291,7 @@ CMPIBoolean PoolProvider::isValidInstanceClass(const char* className) {
 }
 
 void PoolProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
-    int count = 0;
+    CMPICount count = 0;
     for (const char* const each : keysOf(m_class.role)) {
         zemBaseProvider::setText(keys, count++, each);
     }

@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <map>
+#include <thread>
 
 #include "CimXmlService.h"
 #include "CimXmlWriter.h"

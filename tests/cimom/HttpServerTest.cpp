@@ -7,6 +7,7 @@
 
 #include <atomic>
 #include <csignal>
+#include <thread>
 
 #include "Folder.h"
 #include "HttpServer.h"

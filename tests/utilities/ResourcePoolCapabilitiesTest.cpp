@@ -10,7 +10,7 @@ namespace {
 /// What a pool carries; nothing of what is null.
 std::string told(zemPoolCapability* capability) {
     std::string ids;
-    for (int i = 0; capability != nullptr && i <= ROLE_INC; ++i) {
+    for (std::size_t i = 0; capability != nullptr && i <= ROLE_INC; ++i) {
         const std::string id(capability->m_SettingData[i]->getData()->m_InstanceID);
         ids += i == 0 ? id : ' ' + id.substr(4, 5);
     }

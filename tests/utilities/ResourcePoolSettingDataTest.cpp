@@ -87,7 +87,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatMayBeTaken) {
             visitor.initialize("", mode);
             for (int i = 0; i < visitor.size(); ++i, ++row) {
                 const std::string id = row->id + 2, type = id.substr(0, id.find('-'));
-                for (int role = ROLE_MIN; role <= ROLE_INC; ++role) {
+                for (std::size_t role = ROLE_MIN; role <= ROLE_INC; ++role) {
                     static constexpr const char* kRoles[] = {"MIN:", "MAX:", "DEF:", "INC:"};
                     std::string expected = std::string("InstanceID=ORX:") + *row->id +
                                            kRoles[role] + id + '*' + kHost +

@@ -23,10 +23,8 @@ while [ $# -gt 0 ]; do
     esac
 done
 
-case $preset in
-    asan | tsan) install_missing $packages_build $packages_test $packages_sanitize ;;
-    *) install_missing $packages_build $packages_test ;;
-esac
+install_missing $packages_build $packages_test
+[ "$preset" != asan ] || install_missing $packages_sanitize
 
 build_targets=("${programs[@]}")
 build "$preset" -DZEM_BUILD_TESTS=ON -DZEM_BUILD_BENCH=OFF

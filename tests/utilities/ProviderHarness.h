@@ -43,9 +43,7 @@ public:
             setText(keys, i++, key.c_str());
         }
     }
-    void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
-                            const char* method) override {
-        script.argsOf = std::string(className) + "." + method;
+    void populateMethodArgs(const char*, zemDynamicArray<zemString>& args, const char*) override {
         args.addElement(std::make_unique<zemString>("Reason"));
     }
     const char* getMessageBundlePath() override { return script.bundle.c_str(); }
@@ -55,6 +53,11 @@ class ScriptedProvider : public PlainProvider {
 public:
     ScriptedProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
         : CmpiBaseMI(mb, ctx), PlainProvider(mb, ctx, name) {}
+    void populateMethodArgs(const char* className, zemDynamicArray<zemString>& args,
+                            const char* method) override {
+        script.argsOf = std::string(className) + "." + method;
+        PlainProvider::populateMethodArgs(className, args, method);
+    }
     using Ctx = const CmpiContext&;
     using Path = const CmpiObjectPath&;
     using Instance = const CmpiInstance&;

@@ -220,12 +220,17 @@ int zemResourcePool::initialize(zemCEC* cec, const zemString& userName, int mode
     const initializeLevel level = isQuantified(mode) ? LEVEL_EI : LEVEL_NI;
     initializePrimordial(cec, level);
     if (pools > 1) {
-        for (const zemHardwareResource* const share : shares(*cec)) {
-            initializeShare(cec, share, level);
-        }
+        initializeAllShare(cec, level);
     }
     if (mode != kNames && mode != kEverything) {
         carry(*cec, userName, mode);
+    }
+    return 0;
+}
+
+int zemResourcePool::initializeAllShare(zemCEC* cec, initializeLevel level) {
+    for (const zemHardwareResource* const share : shares(*cec)) {
+        initializeShare(cec, share, level);
     }
     return 0;
 }

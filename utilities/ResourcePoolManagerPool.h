@@ -89,6 +89,9 @@ public:
     virtual int initializeShare(zemCEC* cec, const zemHardwareResource* resource,
                                 initializeLevel level);
 
+    /// The same for each shared pool that @p cec has. Returns 0.
+    int initializeAllShare(zemCEC* cec, initializeLevel level);
+
     virtual ~zemResourcePool();
 
     /// What initialize() has made the pool carry; null what it has not. The capability is the first

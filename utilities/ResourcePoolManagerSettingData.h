@@ -166,20 +166,38 @@ public:
 };
 
 // clang-format off
-#define ZEM_POOL_LEAVES(NAME, KIND, WORD, SHARING)                                                     \
-    using zem##NAME##RASettingData##WORD##MIN = zemRASettingDataOfPool<KIND, SHARING, ROLE_MIN>; \
-    using zem##NAME##RASettingData##WORD##MAX = zemRASettingDataOfPool<KIND, SHARING, ROLE_MAX>; \
-    using zem##NAME##RASettingData##WORD##DEF = zemRASettingDataOfPool<KIND, SHARING, ROLE_DEF>; \
-    using zem##NAME##RASettingData##WORD##INC = zemRASettingDataOfPool<KIND, SHARING, ROLE_INC>;
-ZEM_POOL_LEAVES(Processor,       zemRASDKinds::processor, Dedicated, SHARING_DEDICATED)
-ZEM_POOL_LEAVES(Processor,       zemRASDKinds::processor, Shared,    SHARING_SHARED)
-ZEM_POOL_LEAVES(Memory,          zemRASDKinds::memory,    Dedicated, SHARING_DEDICATED)
-ZEM_POOL_LEAVES(Memory,          zemRASDKinds::memory,    Shared,    SHARING_SHARED)
-ZEM_POOL_LEAVES(IOSlot,          zemRASDKinds::ioSlot,    Shared,    SHARING_SHARED)
-ZEM_POOL_LEAVES(EthernetAdapter, zemRASDKinds::ethernet,  Shared,    SHARING_SHARED)
-ZEM_POOL_LEAVES(SCSIAdapter,     zemRASDKinds::scsi,      Shared,    SHARING_SHARED)
-ZEM_POOL_LEAVES(SerialAdapter,   zemRASDKinds::serial,    Shared,    SHARING_SHARED)
-#undef ZEM_POOL_LEAVES
+using zemProcessorRASettingDataDedicatedMIN = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_DEDICATED, ROLE_MIN>;
+using zemProcessorRASettingDataDedicatedMAX = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_DEDICATED, ROLE_MAX>;
+using zemProcessorRASettingDataDedicatedDEF = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_DEDICATED, ROLE_DEF>;
+using zemProcessorRASettingDataDedicatedINC = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_DEDICATED, ROLE_INC>;
+using zemProcessorRASettingDataSharedMIN = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_SHARED, ROLE_MIN>;
+using zemProcessorRASettingDataSharedMAX = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_SHARED, ROLE_MAX>;
+using zemProcessorRASettingDataSharedDEF = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_SHARED, ROLE_DEF>;
+using zemProcessorRASettingDataSharedINC = zemRASettingDataOfPool<zemRASDKinds::processor, SHARING_SHARED, ROLE_INC>;
+using zemMemoryRASettingDataDedicatedMIN = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_DEDICATED, ROLE_MIN>;
+using zemMemoryRASettingDataDedicatedMAX = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_DEDICATED, ROLE_MAX>;
+using zemMemoryRASettingDataDedicatedDEF = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_DEDICATED, ROLE_DEF>;
+using zemMemoryRASettingDataDedicatedINC = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_DEDICATED, ROLE_INC>;
+using zemMemoryRASettingDataSharedMIN = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_SHARED, ROLE_MIN>;
+using zemMemoryRASettingDataSharedMAX = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_SHARED, ROLE_MAX>;
+using zemMemoryRASettingDataSharedDEF = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_SHARED, ROLE_DEF>;
+using zemMemoryRASettingDataSharedINC = zemRASettingDataOfPool<zemRASDKinds::memory, SHARING_SHARED, ROLE_INC>;
+using zemIOSlotRASettingDataSharedMIN = zemRASettingDataOfPool<zemRASDKinds::ioSlot, SHARING_SHARED, ROLE_MIN>;
+using zemIOSlotRASettingDataSharedMAX = zemRASettingDataOfPool<zemRASDKinds::ioSlot, SHARING_SHARED, ROLE_MAX>;
+using zemIOSlotRASettingDataSharedDEF = zemRASettingDataOfPool<zemRASDKinds::ioSlot, SHARING_SHARED, ROLE_DEF>;
+using zemIOSlotRASettingDataSharedINC = zemRASettingDataOfPool<zemRASDKinds::ioSlot, SHARING_SHARED, ROLE_INC>;
+using zemEthernetAdapterRASettingDataSharedMIN = zemRASettingDataOfPool<zemRASDKinds::ethernet, SHARING_SHARED, ROLE_MIN>;
+using zemEthernetAdapterRASettingDataSharedMAX = zemRASettingDataOfPool<zemRASDKinds::ethernet, SHARING_SHARED, ROLE_MAX>;
+using zemEthernetAdapterRASettingDataSharedDEF = zemRASettingDataOfPool<zemRASDKinds::ethernet, SHARING_SHARED, ROLE_DEF>;
+using zemEthernetAdapterRASettingDataSharedINC = zemRASettingDataOfPool<zemRASDKinds::ethernet, SHARING_SHARED, ROLE_INC>;
+using zemSCSIAdapterRASettingDataSharedMIN = zemRASettingDataOfPool<zemRASDKinds::scsi, SHARING_SHARED, ROLE_MIN>;
+using zemSCSIAdapterRASettingDataSharedMAX = zemRASettingDataOfPool<zemRASDKinds::scsi, SHARING_SHARED, ROLE_MAX>;
+using zemSCSIAdapterRASettingDataSharedDEF = zemRASettingDataOfPool<zemRASDKinds::scsi, SHARING_SHARED, ROLE_DEF>;
+using zemSCSIAdapterRASettingDataSharedINC = zemRASettingDataOfPool<zemRASDKinds::scsi, SHARING_SHARED, ROLE_INC>;
+using zemSerialAdapterRASettingDataSharedMIN = zemRASettingDataOfPool<zemRASDKinds::serial, SHARING_SHARED, ROLE_MIN>;
+using zemSerialAdapterRASettingDataSharedMAX = zemRASettingDataOfPool<zemRASDKinds::serial, SHARING_SHARED, ROLE_MAX>;
+using zemSerialAdapterRASettingDataSharedDEF = zemRASettingDataOfPool<zemRASDKinds::serial, SHARING_SHARED, ROLE_DEF>;
+using zemSerialAdapterRASettingDataSharedINC = zemRASettingDataOfPool<zemRASDKinds::serial, SHARING_SHARED, ROLE_INC>;
 // clang-format on
 
 // --- What a partition has
@@ -229,16 +247,18 @@ public:
 };
 
 // clang-format off
-#define ZEM_LPAR_LEAVES(NAME, KIND)                                                        \
-    using zem##NAME##RASettingDataDefined = zemRASettingDataOnSide<KIND, SIDE_DEFINED>; \
-    using zem##NAME##RASettingDataState = zemRASettingDataOnSide<KIND, SIDE_STATE>;
-ZEM_LPAR_LEAVES(Processor,       zemRASDKinds::processor)
-ZEM_LPAR_LEAVES(Memory,          zemRASDKinds::memory)
-ZEM_LPAR_LEAVES(IOSlot,          zemRASDKinds::ioSlot)
-ZEM_LPAR_LEAVES(EthernetAdapter, zemRASDKinds::ethernet)
-ZEM_LPAR_LEAVES(SCSIAdapter,     zemRASDKinds::scsi)
-ZEM_LPAR_LEAVES(SerialAdapter,   zemRASDKinds::serial)
-#undef ZEM_LPAR_LEAVES
+using zemProcessorRASettingDataDefined = zemRASettingDataOnSide<zemRASDKinds::processor, SIDE_DEFINED>;
+using zemProcessorRASettingDataState = zemRASettingDataOnSide<zemRASDKinds::processor, SIDE_STATE>;
+using zemMemoryRASettingDataDefined = zemRASettingDataOnSide<zemRASDKinds::memory, SIDE_DEFINED>;
+using zemMemoryRASettingDataState = zemRASettingDataOnSide<zemRASDKinds::memory, SIDE_STATE>;
+using zemIOSlotRASettingDataDefined = zemRASettingDataOnSide<zemRASDKinds::ioSlot, SIDE_DEFINED>;
+using zemIOSlotRASettingDataState = zemRASettingDataOnSide<zemRASDKinds::ioSlot, SIDE_STATE>;
+using zemEthernetAdapterRASettingDataDefined = zemRASettingDataOnSide<zemRASDKinds::ethernet, SIDE_DEFINED>;
+using zemEthernetAdapterRASettingDataState = zemRASettingDataOnSide<zemRASDKinds::ethernet, SIDE_STATE>;
+using zemSCSIAdapterRASettingDataDefined = zemRASettingDataOnSide<zemRASDKinds::scsi, SIDE_DEFINED>;
+using zemSCSIAdapterRASettingDataState = zemRASettingDataOnSide<zemRASDKinds::scsi, SIDE_STATE>;
+using zemSerialAdapterRASettingDataDefined = zemRASettingDataOnSide<zemRASDKinds::serial, SIDE_DEFINED>;
+using zemSerialAdapterRASettingDataState = zemRASettingDataOnSide<zemRASDKinds::serial, SIDE_STATE>;
 // clang-format on
 
 // --- How they are shown; @p properties as for addSpecificProperties()

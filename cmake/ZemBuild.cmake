@@ -36,9 +36,8 @@ if(ZEM_SANITIZE)
   add_compile_options(-fsanitize=${ZEM_SANITIZE} -fno-omit-frame-pointer -fno-sanitize-recover=all)
   add_link_options(-fsanitize=${ZEM_SANITIZE})
   # What a library keeps to its end is no leak for having been unmapped before the process looks;
-  # gcc never unmaps one that has templates in it.
-  string(APPEND CMAKE_SHARED_LINKER_FLAGS " -Wl,-z,nodelete")
-  string(APPEND CMAKE_MODULE_LINKER_FLAGS " -Wl,-z,nodelete")
+  # gcc never unmaps one that has templates in it. ZEM_UNMAPPED excepts what tests unload.
+  add_link_options("$<$<NOT:$<BOOL:$<TARGET_PROPERTY:ZEM_UNMAPPED>>>:LINKER:-z,nodelete>")
 else()
   # What is shipped is hardened; a debug build stays as its debugger likes it.
   add_compile_options("$<$<NOT:$<CONFIG:Debug>>:-fstack-protector-strong;-U_FORTIFY_SOURCE;-D_FORTIFY_SOURCE=2>")

@@ -33,6 +33,9 @@ install(TARGETS ${zem_installed} EXPORT zemutilities
   LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR}
   RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
 install(TARGETS cimom appliance appliance_tools RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+if(TARGET zemtrace)
+  install(TARGETS zemtrace RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR})
+endif()
 # A CIM server looks for providers among the libraries, and so does cimom, wherever the registration
 # lies.
 install(TARGETS zemproviders LIBRARY DESTINATION ${CMAKE_INSTALL_LIBDIR})

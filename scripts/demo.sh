@@ -2,12 +2,12 @@
 # Installs what is missing, builds, and shows a CIM request from end to end: an appliance, its
 # tool asked by hand, the same asked through CIM, the pools of a host, what a partition runs with
 # beside what its profile says, a partition defined, its profile changed, started, changed by a job,
-# moved to another host while a client watches, stopped and destroyed, and what a client reads when
-# a thing is not there.
+# moved to another host while a client watches, stopped and destroyed, what a client reads when
+# a thing is not there, and where the time goes when a stock client of CIM-XML asks.
 #
 #   scripts/demo.sh
 #
-# Leaves nothing behind but the build. Exits with 0 when everything shown was as it should be.
+# Leaves nothing behind but the build, with a picture in it. Exits with 0 when everything shown was as it should be.
 . "$(dirname "$0")/common.sh"
 
 case ${1:-} in
@@ -16,11 +16,12 @@ case ${1:-} in
     *) die "unknown argument '$1'; see $0 --help" ;;
 esac
 
-install_missing $packages_build
+install_missing $packages_build sblim-wbemcli
 build release -DZEM_BUILD_TESTS=OFF -DZEM_BUILD_BENCH=OFF
 
 folder=$(mktemp -d)
-trap 'rm -rf "$folder"' EXIT
+server=
+trap '[ -z "$server" ] || kill $server; rm -rf "$folder"' EXIT
 # quoted <word>...: the words as one would type them.
 quoted() {
     local line= word
@@ -192,5 +193,31 @@ show 5 cimom gi 'ORXC_Unknown.Name="1"'
 show 6 cimom gi "$host\"9999-ZZZ*0000000\""
 show 6 cimom --messages "$top/providers/messages" --language de gi "$host\"9999-ZZZ*0000000\""
 
-printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions and\n%s pools by association, what a partition runs with beside its profile,\nthe life of a partition, a move between hosts by its indications,\ntwo failures by name, one of them in German too.\n' \
-    "$hosts" "$partitions" "$pools"
+say "served to a stock client, which knows CIM-XML alone"
+served=$folder/served trace=$folder/trace
+printf '\n$ VM_CIMPROVIDER_TRACE=1 VM_CIMPROVIDER_TRACE_PATH=%s cimom serve --port 0 &\n' "$trace"
+VM_CIMPROVIDER_TRACE=1 VM_CIMPROVIDER_TRACE_PATH=$trace cimom serve --port 0 >"$served" &
+server=$!
+until grep -qs serving "$served" || ! kill -0 $server 2>/dev/null; do sleep 0.1; done
+cat "$served"
+url=$(sed -n 's/^serving //p' "$served")/root/cimv2
+show 0 wbemcli ein "$url:ORXC_CEC_CS"
+show 0 wbemcli -nl gi "$url:$host\"$mtms\""
+for class in ORXC_LPAR_CS ORXC_VirtualSystemSettingData ORXC_ProcessorRASettingData; do
+    printf '\n$ %s | wc -l\n' "$(quoted wbemcli ei "$url:$class")"
+    wbemcli ei "$url:$class" | wc -l
+done
+printf '\n$ %s | wc -l\n' "$(quoted wbemcli ai "$url:$host\"$mtms\"")"
+wbemcli ai "$url:$host\"$mtms\"" | wc -l
+sleep 1     # the trace is written twice a second
+kill $server
+wait $server || die "the server did not end well"
+server=
+
+say "where the time went"
+picture=$top/build/release/timeline.svg
+show 0 zemtrace report "$trace"
+show 0 zemtrace timeline "$trace" -o "$picture"
+
+printf '\nShown: %s hosts and %s partitions through CIM, one object by path, its partitions and\n%s pools by association, what a partition runs with beside its profile,\nthe life of a partition, a move between hosts by its indications,\ntwo failures by name, one of them in German too, a stock client over HTTP,\nand the time of its requests: see the picture %s\n' \
+    "$hosts" "$partitions" "$pools" "$picture"

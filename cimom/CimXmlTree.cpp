@@ -129,6 +129,10 @@ std::string failureOf(const xmlParserCtxt& parser) {
     return "line " + std::to_string(error.line) + ": " + text;
 }
 
+/// Some failures of a text's encoding do not go to the parser's own handlers: clients would write
+/// to our standard error. They end the parse as others do.
+void keepQuiet(void*, const char*, ...) {}
+
 constexpr std::size_t kPiece = 4096;
 constexpr std::ptrdiff_t kLongestTag = 16384;
 
@@ -137,6 +141,7 @@ constexpr std::ptrdiff_t kLongestTag = 16384;
 XmlElement parseXml(std::string_view text) {
     static const bool ready = (xmlInitParser(), true);  // once, before there are many threads
     static_cast<void>(ready);
+    xmlSetGenericErrorFunc(nullptr, keepQuiet);  // of this thread
     XmlElement root;
     Builder builder(root);
     xmlSAXHandler sax = handlers();

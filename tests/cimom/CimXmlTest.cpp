@@ -244,6 +244,7 @@ TEST_F(CimXml, WhatIsNoRequestIsRefusedByHttp) {
         {"", form},
         {fine.substr(0, fine.size() - 9), form},
         {replaced("root", "\xFF"), form},
+        {"<?xml version='1.0' encoding='utf-7'?>" + replaced("root", "\xE2\x82\xAC"), form},
         {deep, form},
         {many, form},
         {replaced("<CIM ", "<CIM " + std::string(30000, ' ')), form},
@@ -278,9 +279,11 @@ TEST_F(CimXml, WhatIsNoRequestIsRefusedByHttp) {
         }
         return all;
     };
+    testing::internal::CaptureStderr();
     for (const auto& row : bodies) {
         EXPECT_EQ(said(row.body, head), row.answer) << row.body.substr(0, 300);
     }
+    EXPECT_EQ(testing::internal::GetCapturedStderr(), "");
     for (const auto& row : heads) {
         EXPECT_EQ(said(fine, with(row.name, row.value)), row.answer) << row.name;
     }

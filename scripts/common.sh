@@ -13,7 +13,7 @@ packages_build="g++ cmake ninja-build ccache pkg-config flex bison openjdk-17-jd
   libsqlite3-dev nlohmann-json3-dev libcli11-dev libmicrohttpd-dev libxml2-dev"
 packages_test="libgtest-dev sblim-wbemcli openssl"
 packages_bench="libbenchmark-dev libcsv-dev python3"
-packages_sanitize="clang libclang-rt-14-dev"
+packages_sanitize="clang libclang-rt-14-dev lld"
 packages_style="clang-format-16 clang-tidy"
 
 # install_missing <package>...: installs through apt what dpkg does not know yet.

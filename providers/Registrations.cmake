@@ -50,7 +50,7 @@ function(zem_registrations json folder)
   ProviderName = \"${provider}\"; ProviderType = { ${types} }; Namespaces = { \"${namespace}\" };
 };\n")
 
-    # sfcb asks one provider of a library whether all of them may be unloaded: they never may.
+    # As they answer themselves; but sfcb asks one provider for all that are of its library.
     list(JOIN interfaces " " types)
     string(APPEND sfcb "[${class}]
    provider: ${provider}

@@ -136,7 +136,8 @@ struct EventSender {
                 context, nameSpace.c_str(),
                 makeIndication(nearby, eventClass.name, eventClass.aspect, event));
         } catch (const CmpiStatus& status) {
-            tellLost(event, status.msg());
+            tellLost(event, status.msg() == nullptr ? zemBaseProvider::cmpiRcToString(status.rc())
+                                                    : status.msg());
         } catch (const zemException& e) {
             tellLost(event, e.getExceptionString());
         }

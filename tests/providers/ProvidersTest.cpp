@@ -3,8 +3,11 @@
 #include <gtest/gtest.h>
 #include <unistd.h>
 
+#include <array>
 #include <regex>
 
+#include "Json.h"
+#include "MofParser.h"
 #include "ServedProviders.h"
 
 namespace {
@@ -200,6 +203,37 @@ TEST_P(ProvidersTest, ObjectsWithoutAHostHaveNoneInCommon) {
     EXPECT_EQ(reply.rc, CMPI_RC_ERR_NOT_FOUND);
     EXPECT_NE(reply.message.find("of class ORXC_HostComponent can not"), std::string::npos)
         << reply.message;
+}
+
+TEST(RegistrationsTest, TellOtherServersWhatCimomReads) {
+    const struct {
+        const char* file;
+        std::array<const char*, 4> stanza;  ///< around class, provider and types
+        std::array<const char*, 5> types;   ///< what the bits of Interface are called there
+    } rows[] = {
+        {"/zemproviders.pegasus.mof",
+         {"; ClassName = \"", "\";\n  ProviderName = \"", "\"; ProviderType = {", " };"},
+         {" 2", ", 3", ", 5", " 4", ""}},
+        {"/zemproviders.sfcb.reg",
+         {"[", "]\n   provider: ", "\n   location: zemproviders\n   type:", "\n"},
+         {" instance", " association", " method", " indication", " property"}},
+    };
+    for (const auto& [file, stanza, names] : rows) {
+        const std::string text = readRegularFile(std::string(ZEM_OTHER_REGISTRATIONS) + file);
+        for (const Registration& served : readRegistration(ZEM_REGISTRATION)) {
+            std::string expected =
+                stanza[0] + served.className + stanza[1] + served.provider + stanza[2];
+            for (std::size_t bit = 0; bit < names.size(); ++bit) {
+                expected += served.interfaces >> bit & 1 ? names[bit] : "";
+            }
+            expected += stanza[3];
+            const std::size_t found = text.find(expected);
+            EXPECT_EQ(found != std::string::npos, ZEM_EVENTS || served.interfaces != kIndication)
+                << expected;
+            EXPECT_EQ(text.find(stanza[0] + served.className + stanza[1], found + 1),
+                      std::string::npos);
+        }
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(Brokers, ProvidersTest, ServedProviders::brokers(),

@@ -20,12 +20,6 @@ constexpr unsigned kUnsupportedMediaType = 415;
 constexpr unsigned kNotImplemented = 501;
 constexpr const char* kDeclaration = "<?xml version=\"1.0\" encoding=\"utf-8\"?>\n";
 
-std::string hostName() {
-    char name[HOST_NAME_MAX + 1] = "localhost";
-    gethostname(name, sizeof name - 1);
-    return name;
-}
-
 // -- the head of a message ------------------------------------------------------------------------
 
 std::string headerText(const HttpRequest& request, const char* name) {
@@ -175,6 +169,12 @@ private:
 };
 
 }  // namespace
+
+std::string hostName() {
+    char name[HOST_NAME_MAX + 1] = "localhost";
+    gethostname(name, sizeof name - 1);
+    return name;
+}
 
 CimXmlService::CimXmlService(Server& server, const ClassRepository* classes, Unfit unfit,
                              std::optional<std::string> nobody)

@@ -12,6 +12,9 @@
 
 namespace cimom {
 
+/// Name of this machine, for paths that name none.
+std::string hostName();
+
 class CimXmlService {
 public:
     /// @param server   outlives the service, as do @p classes

@@ -401,9 +401,29 @@ private:
     std::vector<MofFault> m_faults;
 };
 
+namespace {
+
+/// Puts declarations behind others, except those whose name is taken.
+template <class Declared>
+void addMissing(std::vector<Declared>& all, const std::vector<Declared>& further) {
+    NameSet names;
+    for (const Declared& each : all) {
+        names.insert(each.name);
+    }
+    std::copy_if(further.begin(), further.end(), std::back_inserter(all),
+                 [&](const Declared& each) { return names.count(each.name) == 0; });
+}
+
+}  // namespace
+
 std::shared_ptr<const ClassRepository> ClassRepository::load(const std::string& path,
-                                                             const MofReader& reader) {
+                                                             const MofReader& reader,
+                                                             const std::string& further) {
     MofDeclarations declarations = parseMof(path, reader);
+    const MofDeclarations more =
+        parseMof("(further classes)", [&](const std::string&) { return further; });
+    addMissing(declarations.qualifierTypes, more.qualifierTypes);
+    addMissing(declarations.classes, more.classes);
     std::shared_ptr<ClassRepository> repository(new ClassRepository);
     ClassLinker(declarations, *repository).run();
     return repository;

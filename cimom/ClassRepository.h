@@ -147,9 +147,12 @@ public:
     ///
     /// Superclasses and referenced classes may be declared after their use. Instance
     /// declarations are parsed and dropped: instances come from providers alone.
+    /// @param further  MOF text with classes and qualifiers to have in any case: each is taken
+    ///                 unless the file has one of its name
     /// @throws MofError with the first fault of form, or every fault of meaning (up to a limit)
     static std::shared_ptr<const ClassRepository> load(const std::string& path,
-                                                       const MofReader& reader = readRegularFile);
+                                                       const MofReader& reader = readRegularFile,
+                                                       const std::string& further = {});
 
     /// The class, or null.
     const CimClass* findClass(std::string_view name) const { return m_classes.find(name); }

@@ -118,6 +118,14 @@ constexpr TextArgument kTextArguments[] = {
      "File with a line name:hash for each who may sign in, the hash by crypt(3); without it all "
      "users of this machine are served",
      false},
+    {kServing, "--state", &Arguments::state,
+     "Folder or file in which indication subscriptions are kept; without it they end with the "
+     "process",
+     false},
+    {kServing, "--trusted", &Arguments::trusted,
+     "File with the certificates, in PEM, by which listeners of indications are believed, instead "
+     "of the system's",
+     false},
 };
 
 CLI::App* addVerb(CLI::App& app, const Verb& row, CommandLine& line) {

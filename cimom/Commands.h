@@ -28,6 +28,8 @@ struct Arguments : AssociationFilter {
     std::string certificate;            ///< files in PEM
     std::string key;
     std::string passwords;
+    std::string state;    ///< folder or file
+    std::string trusted;  ///< file in PEM
     bool log = false;
 };
 

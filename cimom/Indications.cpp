@@ -154,6 +154,21 @@ Reply Server::unsubscribe(const Request& request, SubscriptionId id) {
     });
 }
 
+namespace {
+
+/// An indication with the properties that a query selects.
+Indication selected(const Indication& indication, const Query& query) {
+    if (query.projection().empty()) {
+        return indication;
+    }
+    Reply one;
+    one.instances.push_back(indication.instance);
+    Server::Impl::keepProperties(query.projection(), one);
+    return {indication.nameSpace, one.instances.front()};
+}
+
+}  // namespace
+
 Reply Server::deliver(const Request& request, const Instance& indication) {
     Indication delivered{request.nameSpace, indication};
     if (delivered.instance.path.nameSpace.empty()) {
@@ -173,7 +188,7 @@ Reply Server::deliver(const Request& request, const Instance& indication) {
         }
         std::lock_guard<std::recursive_mutex> lock(subscription->mutex);
         if (!subscription->ended && subscription->handler) {
-            subscription->handler(delivered);
+            subscription->handler(selected(delivered, *subscription->query));
         }
     }
     return {};

@@ -14,6 +14,7 @@
 
 #include "CommandLine.h"
 #include "Failure.h"
+#include "InteropMof.h"
 
 namespace {
 
@@ -96,14 +97,16 @@ int run(cimom::CommandLine& line) {
     }
     cimom::ResultStream out(line.providerOutput);
     if (!line.schema.empty()) {
-        line.options.classes = cimom::ClassRepository::load(line.schema);
+        line.options.classes =
+            cimom::ClassRepository::load(line.schema, cimom::readRegularFile,
+                                         verb.takes & cimom::kServing ? cimom::interopMof() : "");
     }
     cimom::Server server(line.options);
     for (const std::string& file : line.registrations) {
         server.loadRegistration(file);
     }
     // A provider of indications can say what is wrong in its log alone.
-    if (line.traceLevel >= 0 || verb.takes == cimom::kFilter) {
+    if (line.traceLevel >= 0 || verb.takes & (cimom::kFilter | cimom::kServing)) {
         server.setLogHook(
             [level = line.traceLevel](const cimom::LogLine& each) { printLine(each, level); });
     }

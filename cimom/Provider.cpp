@@ -63,14 +63,15 @@ CMPIrc cleanUp(MI* mi, const CMPIContext* context, bool terminating) {
 // The factory of the provider's name goes before the generic one of its library.
 template <class MI>
 MI* Provider::create(Broker& broker, const CMPIContext* context, CMPIStatus& status) {
+    using Named = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
     using Generic = MI* (*)(const CMPIBroker*, const CMPIContext*, const char*, CMPIStatus*);
     if (m_file.empty()) {
-        const Factory<MI> factory = m_factories.*kindOfInterface<MI>().factory;
+        const Factory<MI>& factory = m_factories.*kindOfInterface<MI>().factory;
         return factory ? factory(broker.face(), context, &status) : nullptr;
     }
     const std::string suffix = std::string("_Create_") + kindOfInterface<MI>().factoryName;
     if (void* symbol = dlsym(m_library, (m_name + suffix).c_str())) {
-        return reinterpret_cast<Factory<MI>>(symbol)(broker.face(), context, &status);
+        return reinterpret_cast<Named>(symbol)(broker.face(), context, &status);
     }
     if (void* symbol = dlsym(m_library, ("_Generic" + suffix).c_str())) {
         return reinterpret_cast<Generic>(symbol)(broker.face(), context, m_name.c_str(), &status);

@@ -10,6 +10,7 @@
 #include "EndSignals.h"
 #include "Failure.h"
 #include "HttpServer.h"
+#include "Interop.h"
 #include "Passwords.h"
 
 namespace cimom {
@@ -19,6 +20,7 @@ namespace {
 constexpr std::uint16_t kPort = 5988;
 constexpr std::uint16_t kTlsPort = 5989;
 constexpr std::chrono::seconds kGrace{60};
+constexpr std::chrono::seconds kExportGrace{5};
 
 bool isLoopback(const std::string& address) {
     in_addr four = {};
@@ -77,11 +79,31 @@ std::string lineOf(const HttpRecord& record) {
            (record.whole ? "" : "broken off ") + printable(record.note) + "\n";
 }
 
+/// For what nobody asked about: a line on standard error.
+void report(const std::string& line) {
+    std::fprintf(stderr, "cimom: %s\n", printable(line).c_str());
+}
+
+std::shared_ptr<IndicationExport> makeExport(const Arguments& arguments) {
+    ExportOptions options;
+    options.trusted = arguments.trusted;
+    options.log = report;
+    if (!options.trusted.empty()) {
+        contentOf(options.trusted);  // to say now what else each listener would be refused for
+    }
+    return std::make_shared<IndicationExport>(options);
+}
+
 }  // namespace
 
 Reply serve(Session& session, const Arguments& arguments) {
     checkOptions(arguments);
     EndSignals signals;
+    const auto exports = makeExport(arguments);
+    const auto subscriptions = std::make_shared<Subscriptions>(
+        session.server, session.classes, hostName(), arguments.state, exports, report);
+    serveInterop(session.server, CIMOM_VERSION, subscriptions);
+    subscriptions->start();
     CimXmlService service(session.server, session.classes, session.unfit, session.request.user);
     HttpOptions options;
     const bool tls = !arguments.certificate.empty();
@@ -115,8 +137,11 @@ Reply serve(Session& session, const Arguments& arguments) {
     while (!signals.wait(std::chrono::seconds(1))) {
         http.watch();
         service.expire();
+        subscriptions->watch();
     }
     http.stop(kGrace);
+    subscriptions->stop();
+    exports->stop(kExportGrace);
     return {};
 }
 

@@ -68,6 +68,18 @@ bool Server::hasNamespace(const std::string& nameSpace) const {
            });
 }
 
+std::vector<std::string> Server::namespaces() const {
+    std::vector<std::string> names;
+    for (const auto& route : m_impl->routes) {
+        for (const std::string& name : route.nameSpaces) {
+            if (!containsName(names, name)) {
+                names.push_back(name);
+            }
+        }
+    }
+    return names;
+}
+
 // -- instances --------------------------------------------------------------------------------
 
 namespace {

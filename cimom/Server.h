@@ -138,8 +138,9 @@ enum Interface : unsigned {
 };
 
 /// Factories of a provider linked into the process; null for interfaces that it does not have.
+/// What they hold lives as long as the server.
 template <class MI>
-using Factory = MI* (*)(const CMPIBroker*, const CMPIContext*, CMPIStatus*);
+using Factory = std::function<MI*(const CMPIBroker*, const CMPIContext*, CMPIStatus*)>;
 struct Factories {
     Factory<CMPIInstanceMI> instance = nullptr;
     Factory<CMPIAssociationMI> association = nullptr;
@@ -189,6 +190,8 @@ public:
 
     /// Whether a provider serves anything in that namespace. Without providers all are the same.
     bool hasNamespace(const std::string& nameSpace) const;
+    /// The namespaces in which providers serve, without those that serve in all of them.
+    std::vector<std::string> namespaces() const;
 
     // -- operations -----------------------------------------------------------------------
     // Failures come back in the reply: CMPI_RC_ERR_NOT_SUPPORTED when no provider serves the
@@ -231,7 +234,8 @@ public:
 
     /// Authorizes and activates a filter at the providers of its class, enables their indications
     /// with the first filter, and hands each indication that matches to @p handler, on the
-    /// delivering thread. @p id receives the subscription unless the reply is a failure.
+    /// delivering thread, with the properties that the query selects. @p id receives the
+    /// subscription unless the reply is a failure.
     Reply subscribe(const Request& request, const std::string& query, const std::string& language,
                     IndicationHandler handler, SubscriptionId& id);
     /// Deactivates the filter and, with the last one of a provider, disables its indications.

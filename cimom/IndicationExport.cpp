@@ -434,7 +434,8 @@ private:
     }
     void tellLost(Destination& of) {
         m_lines.push_back("listener " + of.url + ": " + std::to_string(of.lost) +
-                          " indications were given up: " + of.lostBy);
+                          (of.lost == 1 ? " indication was" : " indications were") +
+                          " given up: " + of.lostBy);
         of.lost = 0;
     }
 

@@ -2,8 +2,11 @@
 #include <gtest/gtest.h>
 #include <signal.h>
 
+#include <csignal>
+#include <mutex>
 #include <thread>
 
+#include "HttpServer.h"
 #include "TestAppliance.h"
 
 namespace {
@@ -30,8 +33,9 @@ protected:
     std::string file(const char* name) const { return (m_appliance.folder() / name).string(); }
     /// Starts to serve; the base of its addresses is in $U of what is run from now on.
     void serve(const std::string& options, const std::string& credentials = "") {
-        m_appliance.run("cd " + m_appliance.folder().string() + "; (cimom serve --log --port 0 " +
-                        options + " >log 2>fault & echo $! >pid; wait $!; echo $? >status) &");
+        m_appliance.run("cd " + m_appliance.folder().string() +
+                        "; rm -f log status; (cimom serve --log --port 0 " + options +
+                        " >log 2>fault & echo $! >pid; wait $!; echo $? >status) &");
         for (int i = 0; i < 500 && contents(file("log")).find('\n') == std::string::npos; ++i) {
             std::this_thread::sleep_for(std::chrono::milliseconds(20));
         }
@@ -116,6 +120,77 @@ TEST_F(ServeTest, AStockClientReachesTheWholeModel) {
     EXPECT_NE(log.find(" GetInstance CIM_ERR_NOT_FOUND The requested"), std::string::npos) << log;
     EXPECT_EQ(contents(file("fault")), "");
 }
+
+#ifdef ZEM_EVENTS
+TEST_F(ServeTest, ASubscriptionOfAStockClientOutlastsARestart) {
+    // A Java VM lives by SIGSEGV, and its memory is no matter of a leak checker's.
+    const ScopedEnvironment sanitizer("ASAN_OPTIONS", "handle_segv=0:detect_leaks=0");
+    const ScopedEnvironment classes("CLASSPATH", ZEM_EVENTS);
+    std::signal(SIGPIPE, [](int) {});
+    std::mutex mutex;
+    std::string taken;
+    cimom::HttpServer listener({}, [&](const cimom::HttpRequest& request) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        taken += request.header("CIMExportMethod") + request.body;
+        return cimom::HttpAnswer();
+    });
+    const auto arrives = [&](const std::string& change, const std::string& part) {
+        EXPECT_EQ(m_appliance.run(change + " -m '1111-AAA*0000001'").exit, 0);
+        for (int i = 0; i < 500; ++i) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+            const std::lock_guard<std::mutex> lock(mutex);
+            if (taken.find(part) != std::string::npos) {
+                return true;
+            }
+        }
+        return false;
+    };
+    const auto named = [](const std::string& className, const std::string& quote) {
+        std::string keys;
+        for (const char* key : {"SystemCreationClassName", "SystemName", "CreationClassName"}) {
+            keys += key + ("=" + quote) + (*key == 'C' ? className : "here") + quote + ",";
+        }
+        return keys + "Name=" + quote + "a" + quote;
+    };
+    const auto path = [&](const std::string& className) {
+        return className + "." + named(className, "\\\"");
+    };
+    const std::string filter = path("CIM_IndicationFilter");
+    const std::string destination = path("CIM_ListenerDestinationCIMXML");
+    const std::string ends = "Filter=" + filter + ",Handler=" + destination;
+    const std::string subscription = "\"$U:CIM_IndicationSubscription." + ends + "\"";
+    serve("--state .");
+    m_url.replace(m_url.find("cimv2"), 5, "interop");
+    expectRows({
+        {"ci \"$U:" + filter + "\" " + named("CIM_IndicationFilter", "") +
+             ",'Query=\"SELECT * FROM ORXC_PartitionStateChange\"',QueryLanguage=WQL,"
+             "SourceNamespace=root/cimv2",
+         {"CIM_IndicationFilter.System"}},
+        {"ci \"$U:" + destination + "\" " + named("CIM_ListenerDestinationCIMXML", "") +
+             ",Destination=http://127.0.0.1:" + std::to_string(listener.port()),
+         {"CIMXML.System"}},
+        {"ci " + subscription + " \"" + ends + "\"", {"CIM_IndicationSubscription.Filter"}},
+        {"mi " + subscription + " SubscriptionInfo=mine", {}, "wbemcli:"},
+        {"gi " + subscription, {"SubscriptionState=2", "SubscriptionInfo=\"mine\""}},
+        {"rin \"$U:" + filter + "\"", {"CIM_IndicationSubscription.Filter"}},
+        {"ain \"$U:" + destination + "\"", {"CIM_IndicationFilter.System"}},
+        {"di \"$U:" + filter + "\"", {"(1) CIM_ERR_FAILED: it is in use by"}},
+    });
+    EXPECT_TRUE(arrives("edpower -r lpar --id 3 -o shutdown --immed",
+                        "ExportIndication<?xml version=\"1.0\" encoding=\"utf-8\"?>\n<CIM"));
+    EXPECT_NE(taken.find("<INSTANCE CLASSNAME=\"ORXC_PartitionStateChange\">"), std::string::npos);
+    EXPECT_EQ(stop(), "0\n");
+    serve("--state .");
+    m_url.replace(m_url.find("cimv2"), 5, "interop");
+    EXPECT_TRUE(arrives("edpower -r lpar --id 4 -o shutdown --immed", "Name=&quot;4*1111"));
+    expectRows({{"di " + subscription, {}, "wbemcli:"},
+                {"di \"$U:" + filter + "\"", {}, "wbemcli:"},
+                {"di \"$U:" + destination + "\"", {}, "wbemcli:"},
+                {"ein \"$U:CIM_IndicationSubscription\"", {}, "CIM_"}});
+    EXPECT_EQ(stop(), "0\n");
+    EXPECT_EQ(contents(file("fault")), "");
+}
+#endif
 
 TEST_F(ServeTest, WhoSignsInIsWhoToolsRunAs) {
     ASSERT_EQ(m_appliance

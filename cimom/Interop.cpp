@@ -83,7 +83,7 @@ private:
         return own == local;
     }
 
-    Instance make(const char* className, NamedValues keys, NamedValues more) const {
+    Instance make(const char* className, const NamedValues& keys, const NamedValues& more) const {
         const CimClass* cls = m_subscriptions->classes().findClass(className);
         Instance made(ObjectPath(kInteropNamespace, className, keys), cls->defaults());
         for (const NamedValues& values : {keys, more}) {

@@ -337,7 +337,7 @@ void Subscriptions::deactivate(const Active& active) {
 }
 
 /// Puts what is active now in place of what was, which ends.
-void Subscriptions::switchOver(std::map<std::string, Active> fresh) {
+void Subscriptions::switchOver(std::map<std::string, Active>& fresh) {
     for (auto& [id, active] : fresh) {
         {
             const std::lock_guard<std::mutex> lock(m_mutex);
@@ -449,7 +449,7 @@ void Subscriptions::change(Records::iterator at, Instance changed) {
         const std::lock_guard<std::mutex> lock(m_mutex);
         at->second.instance = std::move(changed);
     }
-    switchOver(std::move(fresh));
+    switchOver(fresh);
     if (isOf(before, kDestinationClass)) {
         m_exports->setDestination(id, textOf(at->second.instance, "Destination"));
     }

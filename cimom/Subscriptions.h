@@ -101,7 +101,7 @@ private:
     void keep(const std::string& id, const Record& record);
     void erase(Records::iterator at);
     void change(Records::iterator at, Instance changed);
-    void switchOver(std::map<std::string, Active> fresh);
+    void switchOver(std::map<std::string, Active>& fresh);
     void tend(Records::iterator at);
     void revive(Records::iterator at);
     void applyPolicy(const std::string& id);

@@ -10,7 +10,8 @@ die() { printf 'error: %s\n' "$*" >&2; exit 1; }
 
 # what each group of work needs, by Debian package
 packages_build="g++ cmake ninja-build ccache pkg-config flex bison openjdk-17-jdk-headless
-  libsqlite3-dev nlohmann-json3-dev libcli11-dev libmicrohttpd-dev libxml2-dev"
+  libsqlite3-dev nlohmann-json3-dev libcli11-dev libmicrohttpd-dev libxml2-dev
+  libcurl4-openssl-dev"
 packages_test="libgtest-dev sblim-wbemcli openssl"
 packages_bench="libbenchmark-dev libcsv-dev python3"
 packages_sanitize="clang libclang-rt-14-dev lld"

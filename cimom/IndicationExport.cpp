@@ -2,6 +2,7 @@
 
 #include <curl/curl.h>
 #include <pthread.h>
+#include <sys/socket.h>
 
 #include <algorithm>
 #include <csignal>
@@ -124,6 +125,11 @@ std::size_t takeAnswer(const char* data, std::size_t, std::size_t size, void* to
     }
     answer.append(data, size);
     return size;
+}
+
+/// As curl does it, but so that tools which providers start do not get the connection.
+curl_socket_t openSocket(void*, curlsocktype, curl_sockaddr* to) {
+    return socket(to->family, to->socktype | SOCK_CLOEXEC, to->protocol);
 }
 
 [[noreturn]] void refuseUrl(const std::string& url, const std::string& why) {
@@ -358,6 +364,7 @@ private:
         const auto limit = static_cast<long>(m_options.timeout.count());
         curl_easy_setopt(transfer, CURLOPT_CONNECTTIMEOUT_MS, limit);
         curl_easy_setopt(transfer, CURLOPT_TIMEOUT_MS, limit);
+        curl_easy_setopt(transfer, CURLOPT_OPENSOCKETFUNCTION, openSocket);
         curl_easy_setopt(transfer, CURLOPT_WRITEFUNCTION, takeAnswer);
         curl_easy_setopt(transfer, CURLOPT_WRITEDATA, &to.answer);
         curl_easy_setopt(transfer, CURLOPT_PRIVATE, &to);

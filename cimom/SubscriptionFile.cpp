@@ -54,8 +54,7 @@ SubscriptionFile::SubscriptionFile(const std::string& path) {
     m_path = fileAt(path);
     prepare(m_path);
     sqlite3* handle = nullptr;
-    const int opened = sqlite3_open_v2(m_path.c_str(), &handle,
-                                       SQLITE_OPEN_READWRITE | SQLITE_OPEN_NOFOLLOW, nullptr);
+    const int opened = sqlite3_open_v2(m_path.c_str(), &handle, SQLITE_OPEN_READWRITE, nullptr);
     m_handle.reset(handle);
     if (opened != SQLITE_OK) {
         throw std::runtime_error(m_path + ": " + sqlite3_errstr(opened));

@@ -181,8 +181,28 @@ std::vector<std::string> Subscriptions::subscriptionsOn(const std::string& id) c
     return found;
 }
 
+/// For the log, where paths are too long to be read.
+std::string Subscriptions::labelOf(const Instance& subscription) const {
+    const auto name = [&](const char* role) {
+        return textOf(m_records.at(referred(subscription, role)).instance, "Name");
+    };
+    return "subscription of filter '" + name("Filter") + "' for '" + name("Handler") + "'";
+}
+
+/// @throws Failure CMPI_RC_ERR_NOT_SUPPORTED for other classes than the three
+const CimClass& Subscriptions::madeByClients(const ObjectPath& path) const {
+    const CimClass* cls = m_classes->findClass(path.className);
+    const auto is = [&](const char* name) { return cls && sameName(cls->name, name); };
+    if (!is(kFilterClass) && !is(kDestinationClass) && !is(kSubscriptionClass)) {
+        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED,
+                      "instances of " + path.className + " are not made or changed by clients");
+    }
+    return *cls;
+}
+
 Subscriptions::Records::iterator Subscriptions::changeable(const Request& request,
                                                            const ObjectPath& path) {
+    madeByClients(path);
     const auto at = m_records.find(idOf(path));
     if (at == m_records.end()) {
         throw Failure(CMPI_RC_ERR_NOT_FOUND, "no instance " + printPath(path));
@@ -199,17 +219,12 @@ Subscriptions::Records::iterator Subscriptions::changeable(const Request& reques
 
 /// An instance of one of the classes, with its properties typed and the references spelt as here.
 Instance Subscriptions::typed(const Instance& wanted) const {
-    const CimClass* cls = m_classes->findClass(wanted.path.className);
-    const auto is = [&](const char* name) { return cls && sameName(cls->name, name); };
-    if (!is(kFilterClass) && !is(kDestinationClass) && !is(kSubscriptionClass)) {
-        throw Failure(CMPI_RC_ERR_NOT_SUPPORTED,
-                      "instances of " + wanted.path.className + " are not made by clients");
-    }
-    Instance made(ObjectPath(kInteropNamespace, cls->name), cls->blank());
+    const CimClass& cls = madeByClients(wanted.path);
+    Instance made(ObjectPath(kInteropNamespace, cls.name), cls.blank());
     for (const auto& [name, value] : wanted.properties) {
-        const CimProperty* declared = cls->properties.find(name);
+        const CimProperty* declared = cls.properties.find(name);
         if (!declared) {
-            throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "class " + cls->name + " has no " + name);
+            throw Failure(CMPI_RC_ERR_NO_SUCH_PROPERTY, "class " + cls.name + " has no " + name);
         }
         Value own;
         if (value.isNull()) {
@@ -223,9 +238,9 @@ Instance Subscriptions::typed(const Instance& wanted) const {
     }
     const NamedValues ofSystem = {{"SystemCreationClassName", kSystemClass},
                                   {"SystemName", m_system},
-                                  {"CreationClassName", cls->name}};
+                                  {"CreationClassName", cls.name}};
     for (const auto& [name, value] : ofSystem) {
-        if (cls->properties.find(name) && valueOf(made, name.c_str()).isNull()) {
+        if (cls.properties.find(name) && valueOf(made, name.c_str()).isNull()) {
             made.properties.set(name, value);
         }
     }
@@ -538,7 +553,7 @@ void Subscriptions::tend(Records::iterator at) {
         return;
     }
     if (remaining(record.instance) == 0U) {
-        m_log("the time of " + at->first + " is over");
+        m_log(labelOf(record.instance) + " is removed, its time is over");
         erase(at);
     } else if (record.failing && record.nextAttempt <= std::chrono::steady_clock::now()) {
         revive(at);
@@ -556,7 +571,7 @@ void Subscriptions::revive(Records::iterator at) {
         trouble = failure.what();
     }
     if (!trouble.empty() && !record.failing) {
-        m_log(at->first + ": " + trouble + "; it is tried again");
+        m_log(labelOf(record.instance) + ", tried again: " + trouble);
     }
     const std::lock_guard<std::mutex> lock(m_mutex);
     record.active = std::move(active);
@@ -571,10 +586,10 @@ void Subscriptions::applyPolicy(const std::string& id) {
     }
     const std::uint64_t policy = numberOf(at->second.instance, "OnFatalErrorPolicy");
     if (policy == kRemove) {
-        m_log("its listener has failed " + id + ", which is removed");
+        m_log(labelOf(at->second.instance) + " is removed, its listener fails");
         erase(at);
     } else if (policy == kDisable && isEnabled(at->second.instance)) {
-        m_log("its listener has failed " + id + ", which is disabled");
+        m_log(labelOf(at->second.instance) + " is disabled, its listener fails");
         Instance disabled = at->second.instance;
         disabled.properties.set("SubscriptionState", Value(kDisabled));
         change(at, std::move(disabled));

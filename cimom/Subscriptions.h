@@ -1,10 +1,10 @@
 /// Indication subscriptions as clients make them: filters, destinations of listeners, and the
 /// subscriptions that send the indications of a filter to a destination.
 ///
-/// All three are instances, known by their paths without namespace. A subscription that is enabled
-/// is a filter at the providers, in the name of who made it; what these deliver is exported.
-/// What a subscription refers to stays as long as it does. Only its maker, or root, changes or
-/// deletes what somebody who signed in has made.
+/// All three are instances, known by their paths. A subscription that is enabled is a filter at the
+/// providers, in the name of who made it; what these deliver is exported. What a subscription
+/// refers to stays as long as it does. What somebody has made who signed in is changed and deleted
+/// by nobody else but root: a subscription works in its maker's name.
 ///
 /// Thread-safety: any number of threads at once. Changes take turns, and a provider may take its
 /// time with one; reading waits for none.
@@ -87,9 +87,11 @@ private:
     void load();
     ObjectPath canonical(const ObjectPath& path) const;
     std::string idOf(const ObjectPath& path) const;
+    const CimClass& madeByClients(const ObjectPath& path) const;
     Records::iterator changeable(const Request& request, const ObjectPath& path);
     std::string referred(const Instance& subscription, const char* role) const;
     std::vector<std::string> subscriptionsOn(const std::string& id) const;
+    std::string labelOf(const Instance& subscription) const;
 
     Instance typed(const Instance& wanted) const;
     void check(Instance& instance) const;

@@ -159,7 +159,6 @@ void HttpServer::Impl::start() {
         MHD_OPTION_CONNECTION_LIMIT, m_options.mostConnections, MHD_OPTION_CONNECTION_TIMEOUT,
         static_cast<unsigned>(m_options.idle.count()), MHD_OPTION_NOTIFY_COMPLETED, &Impl::onEnd,
         this, MHD_OPTION_NOTIFY_CONNECTION, &Impl::onConnection, this,
-        MHD_OPTION_LISTENING_ADDRESS_REUSE, 1U,
         // Blocked signals would be inherited by the tools that providers start.
         MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1, MHD_OPTION_ARRAY, items.data(), MHD_OPTION_END));
     if (!m_daemon) {

@@ -124,6 +124,9 @@ void SubscriptionFile::run(const char* sql, const std::vector<std::string>& valu
             }
         }
     }
+    if (code == SQLITE_BUSY) {
+        throw std::runtime_error(m_path + ": in use by another process");
+    }
     if (code != SQLITE_DONE) {
         throw std::runtime_error(m_path + ": " + sqlite3_errmsg(m_handle.get()));
     }

@@ -86,6 +86,16 @@ TEST_F(ServeTest, AStockClientReachesTheWholeModel) {
         R"("$U:ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"3*1111-AAA*0000001\"")";
     const std::string made =
         R"("$U:ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"8*1111-AAA*0000001\"")";
+    const std::string service =
+        R"("$U:ORXC_VirtualSystemManagementService.SystemCreationClassName=\"ORXC_CEC_CS\",)"
+        R"(SystemName=\"1111-AAA*0000001\",Name=\"VirtualSystemManagement\",)"
+        R"(CreationClassName=\"ORXC_VirtualSystemManagementService\"" )";
+    // wbemcli sends what it is given as it stands.
+    const std::string settings =
+        R"('ModifySystemSettings.SystemSettings=<![CDATA[<INSTANCE CLASSNAME=)"
+        R"("ORXC_VirtualSystemSettingData"><PROPERTY NAME="InstanceID" TYPE="string"><VALUE>)"
+        R"(ORX:4*3*1111-AAA*0000001</VALUE></PROPERTY><PROPERTY NAME="ElementName" TYPE="string">)"
+        R"(<VALUE>by settings</VALUE></PROPERTY></INSTANCE>]]>')";
     const std::string partition = "ORXC_LPAR_CS.CreationClassName=\"ORXC_LPAR_CS\",Name=\"3*1111-";
     const std::string connection = "ORXC_HostConnection.InstanceID";
     const std::vector<Row> rows = {
@@ -106,6 +116,8 @@ TEST_F(ServeTest, AStockClientReachesTheWholeModel) {
         {"mi " + web + " ElementName='a > b'", {}, "wbemcli:"},
         {"gp " + web + " ElementName", {"a > b"}},
         {"sp " + web + " ElementName=www", {}, "wbemcli:"},
+        {"cm " + service + settings, {"ModifySystemSettings: 0"}},
+        {"gp " + web + " ElementName", {"by settings"}},
         {"cm " + web + " RequestStateChange.RequestedState=4", {"RequestStateChange: 0"}},
         {"ci " + made + " CreationClassName=ORXC_LPAR_CS,Name=8*1111-AAA*0000001",
          {"(7) CIM_ERR_NOT_SUPPORTED: Method createInstance on provider ORXC_LPAR_CSProvider"}},

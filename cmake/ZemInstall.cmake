@@ -1,6 +1,7 @@
 # What `cmake --install` gives: libraries, headers, programs, a CMake package, a pkg-config file.
 # Each rule names the component, and so the package (ZemPackage), to which its files belong.
 include(CMakePackageConfigHelpers)
+include(ZemManual)
 
 # zem_install_library(<target> <component> <component of what only builds need>)
 function(zem_install_library target component devel)
@@ -39,11 +40,23 @@ else()
   string(PREPEND zem_pc_cmpi_cflags "-I${CMPI_INCLUDE_DIR} ")
 endif()
 
-install(TARGETS cimom RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT manager)
-install(TARGETS appliance appliance_tools
-  RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT appliance)
+# zem_install_program(<target> <component> <name>...): a program by each of its names, the first of
+# which is its own, with their manual pages and completion.
+function(zem_install_program target component own)
+  install(TARGETS ${target} RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT ${component})
+  foreach(link IN LISTS ARGN)
+    # A link is installed as a link, to the program that is installed beside it.
+    install(PROGRAMS ${CMAKE_RUNTIME_OUTPUT_DIRECTORY}/${link}
+      DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT ${component})
+  endforeach()
+  zem_manual(${target} ${component} ${own} ${ARGN})
+endfunction()
+
+zem_install_program(cimom manager cimom)
+zem_install_program(appliance appliance appliance)
+zem_install_program(appliance_tools appliance qyplat ${ZEM_TOOLS})
 if(TARGET zemtrace)
-  install(TARGETS zemtrace RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT trace)
+  zem_install_program(zemtrace trace zemtrace)
 endif()
 
 # The unit names programs and files where they are installed, which may be elsewhere than where

@@ -12,10 +12,11 @@ die() { printf 'error: %s\n' "$*" >&2; exit 1; }
 packages_build="g++ cmake ninja-build ccache pkg-config flex bison openjdk-17-jdk-headless
   libsqlite3-dev nlohmann-json3-dev libcli11-dev libmicrohttpd-dev libxml2-dev
   libcurl4-openssl-dev"
-packages_test="libgtest-dev sblim-wbemcli openssl"
+packages_test="libgtest-dev sblim-wbemcli openssl dpkg-dev file"
 packages_bench="libbenchmark-dev libcsv-dev python3"
 packages_sanitize="clang libclang-rt-14-dev lld"
 packages_style="clang-format-16 clang-tidy"
+packages_package="dpkg-dev file help2man lintian"
 
 # install_missing <package>...: installs through apt what dpkg does not know yet.
 install_missing() {

@@ -26,7 +26,7 @@ std::string wrapped(const char* heading, const char* names) {
     for (const std::string& name : split(names)) {
         if (line.size() + 1 + name.size() > kWidth) {
             text += line + '\n';
-            line = "       ";
+            line = "   ";
         }
         line += ' ' + name;
     }
@@ -80,7 +80,7 @@ std::string help(const ToolName& tool) {
     for (const Operation& operation : operations) {
         text += commandLines(operation);
     }
-    return text + '\n' + (operations.empty() ? kRecords : "") + kEnds;
+    return text + '\n' + (operations.empty() ? kRecords + std::string(1, '\n') : "") + kEnds;
 }
 
 }  // namespace appliance

@@ -94,7 +94,7 @@ ROWS = [
     ("Served/enumerate/100/real_time", "Direct/enumerate/100/real_time", None, 0),
     ("Served/enumerate/1000/real_time", "Direct/enumerate/1000/real_time", None, 0),
     ("Served/enumerate/10000/real_time", "Direct/enumerate/10000/real_time", None, 0),
-    ("Served/enumerate/100000/real_time", "Served/enumerate/10000/real_time", 15.0, 0),
+    ("Served/enumerate/100000/real_time", "Served/enumerate/10000/real_time", 20.0, 0),
     ("Served/connect/1/manual_time", "Served/get/1/manual_time", None, 0),
     ("Served/connect/8/manual_time", "Served/get/8/manual_time", None, 0),
 ]

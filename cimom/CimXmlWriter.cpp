@@ -60,12 +60,20 @@ const char* escapeOf(char c) {
 }  // namespace
 
 void writeXmlText(std::string& out, std::string_view text) {
+    const auto isAscii = [&](std::size_t at) {
+        return static_cast<unsigned char>(text[at]) < 0x80;
+    };
     for (std::size_t at = 0; at < text.size();) {
-        const char c = text[at];
-        if (static_cast<unsigned char>(c) < 0x80) {
-            const char* const escape = escapeOf(c);
-            escape ? out.append(escape) : out.append(1, c);
+        const std::size_t begin = at;
+        while (at < text.size() && isAscii(at) && !escapeOf(text[at])) {
             ++at;
+        }
+        out.append(text, begin, at - begin);
+        if (at == text.size()) {
+            return;
+        }
+        if (isAscii(at)) {
+            out.append(escapeOf(text[at++]));
             continue;
         }
         const std::size_t length = sequenceLength(text.substr(at));
@@ -142,6 +150,8 @@ void writeScalar(std::string& out, const Value& value) {
             writeInstance(xml, value.instance());
             return writeTextElement(out, "VALUE", xml);
         }
+        case CMPI_string:
+            return writeTextElement(out, "VALUE", value.text());
         case CMPI_char16:
             return writeTextElement(out, "VALUE", utf8(static_cast<unsigned>(value.uint())));
         case CMPI_boolean:
@@ -153,10 +163,10 @@ void writeScalar(std::string& out, const Value& value) {
 
 }  // namespace
 
-std::string xmlTypeName(CMPIType type) {
+const char* xmlTypeName(CMPIType type) {
     const CMPIType scalar = scalarType(type);
-    const bool named = scalar == CMPI_ref || declaredTypeNamed(typeName(scalar));
-    return named ? typeName(scalar) : "string";
+    const char* const name = scalar == CMPI_ref ? "reference" : declaredTypeName(scalar);
+    return name ? name : "string";
 }
 
 void writeValue(std::string& out, const Value& value) {

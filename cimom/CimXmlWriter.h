@@ -32,7 +32,7 @@ void writeElement(std::string& out, const char* name, XmlAttributes attributes, 
 void writeTextElement(std::string& out, const char* name, std::string_view text);
 
 /// Name of a type in XML, where instances are strings and arrays are said elsewhere.
-std::string xmlTypeName(CMPIType type);
+const char* xmlTypeName(CMPIType type);
 
 /// VALUE, VALUE.ARRAY, VALUE.REFERENCE or VALUE.REFARRAY; nothing for a null.
 void writeValue(std::string& out, const Value& value);

@@ -1,6 +1,7 @@
 #include "Literal.h"
 
 #include <algorithm>
+#include <cstddef>
 #include <cstdio>
 
 #include "Value.h"
@@ -34,7 +35,7 @@ constexpr TypeName kTypeNames[] = {
     {CMPI_ref, "reference"},
     {CMPI_ptr, "pointer"},
 };
-constexpr std::size_t kDeclaredTypes = 14;
+constexpr std::ptrdiff_t kDeclaredTypes = 14;
 
 const TypeName* rowOf(CMPIType type) {
     const auto* row = std::find_if(std::begin(kTypeNames), std::end(kTypeNames),
@@ -84,8 +85,13 @@ std::string typeName(CMPIType type) {
     return std::string(row->name) + ((type & CMPI_ARRAY) != 0 ? "[]" : "");
 }
 
+const char* declaredTypeName(CMPIType type) {
+    const TypeName* row = rowOf(type);
+    return row && row - kTypeNames < kDeclaredTypes ? row->name : nullptr;
+}
+
 std::optional<CMPIType> declaredTypeNamed(std::string_view word) {
-    for (std::size_t i = 0; i < kDeclaredTypes; ++i) {
+    for (std::ptrdiff_t i = 0; i < kDeclaredTypes; ++i) {
         if (sameName(kTypeNames[i].name, word)) {
             return kTypeNames[i].type;
         }

@@ -15,6 +15,8 @@ namespace cimom {
 /// CIM name of a type, "uint32[]" for arrays.
 std::string typeName(CMPIType type);
 bool isValueType(CMPIType type);
+/// The word by which a declaration of MOF names a type that is no array; null when it has none.
+const char* declaredTypeName(CMPIType type);
 /// The type that a declaration of MOF names by a word, if it is one.
 std::optional<CMPIType> declaredTypeNamed(std::string_view word);
 

@@ -4,16 +4,20 @@
 #   scripts/bench.sh                        release build, every benchmark
 #   scripts/bench.sh --build FOLDER         programs of a build folder that stands already
 #   scripts/bench.sh --only REGEX           only benchmarks (rival included) whose name matches
+#   scripts/bench.sh --server NAME=PORT     another CIM server of this machine as a rival, too; may
+#                                           be given more than once (docs/performance.md)
 #
 # Exits with 0 when every ratio and counter keeps its limit.
 . "$(dirname "$0")/common.sh"
 
 folder=
 only=.
+servers=()
 while [ $# -gt 0 ]; do
     case $1 in
         --build) folder=${2:?--build needs a build folder}; shift 2 ;;
         --only) only=${2:?--only needs a regular expression}; shift 2 ;;
+        --server) servers+=("${2:?--server needs a name and a port}"); shift 2 ;;
         -h | --help) sed -n '2,/^\./{/^\./d;s/^# \{0,1\}//;p}' "$0"; exit 0 ;;
         *) die "unknown argument '$1'; see $0 --help" ;;
     esac
@@ -31,14 +35,17 @@ for program in "$folder"/bench/*; do
     [ -f "$program" ] && [ -x "$program" ] || continue
     name=$(basename "$program")
     say "$name"
+    rivals=()
+    [ "$name" != ServeBench ] || rivals=(${servers[@]+"${servers[@]}"})
     # Rivals take turns, so that what else the machine does weighs on both.
     "$program" --benchmark_filter="$only" --benchmark_repetitions=5 \
         --benchmark_enable_random_interleaving=true \
-        --benchmark_out="$results/$name.json" --benchmark_out_format=json >/dev/null
+        --benchmark_out="$results/$name.json" --benchmark_out_format=json \
+        ${rivals[@]+"${rivals[@]}"} >/dev/null
 done
 
 # The rows: benchmark, rival, how many times the rival's time it may take, milliseconds on top.
-python3 - "$results" <<'PY'
+python3 - "$results" ${servers[@]+"${servers[@]%%=*}"} <<'PY'
 import glob, json, statistics, sys
 
 ROWS = [
@@ -74,29 +81,39 @@ ROWS = [
     ("LookUp/100", "LookUpInMap/100", None, 0),
     ("LookUp/1000", "LookUpInMap/1000", None, 0),
     ("Adapters", "PlainFields", 3.0, 0),
-    ("EventDelay/manual_time", "AskATool/real_time", None, 0),
+    ("EventDelay/iterations:30/manual_time", "JournalDelay/iterations:30/manual_time", 2.0, 0),
+    ("IndicationDelay/iterations:30/manual_time", "EventDelay/iterations:30/manual_time", 1.5, 0),
+    ("IndicationDelay/iterations:30/manual_time", "AskATool/real_time", None, 0),
     ("Settings/10000/iterations:1/repeats:1/manual_time",
      "Settings/100/iterations:1/repeats:1/manual_time", 120.0, 0),
     ("Pools/64/1000/iterations:1/repeats:1/manual_time",
      "Pools/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
     ("PoolTies/64/1000/iterations:1/repeats:1/manual_time",
      "PoolTies/8/125/iterations:1/repeats:1/manual_time", 12.0, 0),
-    ("Served/1/real_time", "Direct/1/real_time", None, 0),
-    ("Served/100/real_time", "Direct/100/real_time", None, 0),
-    ("Served/1000/real_time", "Direct/1000/real_time", None, 0),
-    ("Served/10000/real_time", "Direct/10000/real_time", None, 0),
-    ("Served/100000/real_time", "Served/10000/real_time", 15.0, 0),
+    ("Served/enumerate/1/real_time", "Direct/enumerate/1/real_time", None, 0),
+    ("Served/enumerate/100/real_time", "Direct/enumerate/100/real_time", None, 0),
+    ("Served/enumerate/1000/real_time", "Direct/enumerate/1000/real_time", None, 0),
+    ("Served/enumerate/10000/real_time", "Direct/enumerate/10000/real_time", None, 0),
+    ("Served/enumerate/100000/real_time", "Served/enumerate/10000/real_time", 20.0, 0),
+    ("Served/connect/1/manual_time", "Served/get/1/manual_time", None, 0),
+    ("Served/connect/8/manual_time", "Served/get/8/manual_time", None, 0),
 ]
+# Each of these against every other server.
+SERVED = (["enumerate/%d/real_time" % count for count in (1, 100, 1000, 10000)] +
+          ["%s/%d/manual_time" % (how, clients) for how in ("get", "connect") for clients in (1, 8)])
+ROWS += [("Served/" + row, server + "/" + row, 1.0, 0) for server in sys.argv[2:] for row in SERVED]
 # Counters: benchmark, counter, the most that it may be.
 COUNTERS = [
-    ("Served/100000/real_time", "grown_KB", 5000),
+    ("Served/enumerate/100000/real_time", "grown_KB", 5000),
     ("GetAllLpars/1000", "resident_MB", 100),
     ("QyallocSplit/1000/manual_time", "ours_percent", 10),
     ("Initialize/1000/iterations:1/repeats:1/manual_time", "ours_percent", 10),
-    ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 45),
-    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "model_percent", 35),
-    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "broker_percent", 22),
-    ("EventDelay/manual_time", "median_ms", 25),
+    ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 40),
+    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "model_percent", 22),
+    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "broker_percent", 15),
+    ("EventDelay/iterations:30/manual_time", "median_ms", 25),
+    ("IndicationDelay/iterations:30/manual_time", "median_ms", 25),
+    ("JournalDelay/iterations:30/manual_time", "median_ms", 25),
     ("Settings/10000/iterations:1/repeats:1/manual_time", "resident_KB", 8),
 ]
 TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}
@@ -136,6 +153,10 @@ for name, counter, most in COUNTERS:
     failed = failed or worst > most
     print("%-28s %12.4g   %-50s  at most %g %s"
           % (name, worst, counter, most, "kept" if worst <= most else "BROKEN"))
+for name in sorted(name for name in runs if "items_per_second" in runs[name][0]):
+    print("%-34s %10.0f requests a second, %.0f us for one" % (
+        name, *(statistics.median(run[counter] for run in runs[name])
+                for counter in ("items_per_second", "median_us"))))
 for name in sorted(set(runs) - paired):
     print("%-28s %12.4g" % (name, median(name)))
 sys.exit(failed)

@@ -74,12 +74,15 @@ std::string nameSpaceOf(const XmlElement& local) {
         if (each.name != "NAMESPACE") {
             refuseElement(each);
         }
-        all += (all.empty() ? "" : "/") + neededAttribute(each, "NAME");
+        all += "/" + neededAttribute(each, "NAME");
     }
     if (all.empty()) {
         notValid("a path without a namespace");
     }
-    return all;
+    if ((all + "/").find("//") != std::string::npos) {
+        notValid("a namespace with an empty part");  // which would be read back as another
+    }
+    return all.substr(1);
 }
 
 }  // namespace

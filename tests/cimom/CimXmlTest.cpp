@@ -255,6 +255,7 @@ TEST_F(CimXml, WhatIsNoRequestIsRefusedByHttp) {
         {"<HTML/>", valid},
         {replaced("<NAMESPACE NAME='root'/>", "<ROOT/>"), valid},
         {replaced(placed, placed + odd), valid},
+        {replaced("'root'", "'/root'"), valid},
         {replaced("CIMVERSION='2.0", "CIMVERSION='3.0"), "501 unsupported-cim-version"},
         {replaced("SIMPLEREQ", "MULTIREQ").replace(fine.rfind("SIMPLEREQ") - 1, 9, "MULTIREQ"),
          batches},

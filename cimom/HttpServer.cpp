@@ -4,12 +4,15 @@
 #include <microhttpd.h>
 #include <netdb.h>
 #include <sys/socket.h>
+#include <unistd.h>
 
+#include <algorithm>
 #include <atomic>
+#include <cerrno>
 #include <condition_variable>
 #include <cstring>
 #include <exception>
-#include <map>
+#include <list>
 #include <mutex>
 #include <stdexcept>
 #include <thread>
@@ -23,6 +26,24 @@ using Clock = std::chrono::steady_clock;
 /// Small answers go out with their length; of larger ones so much is held at a time.
 constexpr std::size_t kHeld = std::size_t{64} << 10;
 constexpr unsigned kUnauthorized = MHD_HTTP_UNAUTHORIZED;
+constexpr std::chrono::milliseconds kBreath{100};
+
+class Socket {
+public:
+    explicit Socket(int descriptor = -1) : m_descriptor(descriptor) {}
+    ~Socket() {
+        if (m_descriptor >= 0) {
+            close(m_descriptor);
+        }
+    }
+    Socket(Socket&& other) noexcept : m_descriptor(other.release()) {}
+    Socket& operator=(Socket&&) = delete;
+    int get() const { return m_descriptor; }
+    int release() { return std::exchange(m_descriptor, -1); }
+
+private:
+    int m_descriptor;
+};
 
 /// A connection, as the watch sees it.
 struct Connection {
@@ -89,24 +110,61 @@ struct StopDaemon {
     void operator()(MHD_Daemon* daemon) const { MHD_stop_daemon(daemon); }
 };
 
+/// A thread of the library that talks to one client after another. It stays, because what GnuTLS
+/// notes of a thread that has shaken hands is kept until the process ends.
+struct Talker {
+    HttpServer::Impl& server;
+    std::unique_ptr<Connection> connection;
+    bool taken = false;
+    std::unique_ptr<MHD_Daemon, StopDaemon> daemon;
+
+    explicit Talker(HttpServer::Impl& s) : server(s) {}
+};
+
+bool isFree(const Talker& talker) { return !talker.taken; }
+
+Socket listenAt(const std::string& address, std::uint16_t port) {
+    const Address found = resolve(address, port);
+    const int on = 1;
+    Socket listening(
+        socket(found->ai_family, found->ai_socktype | SOCK_CLOEXEC, found->ai_protocol));
+    setsockopt(listening.get(), SOL_SOCKET, SO_REUSEADDR, &on, sizeof on);
+    if (found->ai_family == AF_INET6) {
+        setsockopt(listening.get(), IPPROTO_IPV6, IPV6_V6ONLY, &on, sizeof on);
+    }
+    if (bind(listening.get(), found->ai_addr, found->ai_addrlen) != 0 ||
+        listen(listening.get(), SOMAXCONN) != 0) {
+        throw std::runtime_error(address + " port " + std::to_string(port) +
+                                 ": cannot be served: " + std::strerror(errno));
+    }
+    return listening;
+}
+
 }  // namespace
 
 class HttpServer::Impl {
 public:
     Impl(const HttpOptions& options, Service service)
-        : m_options(options), m_service(std::move(service)) {
+        : m_options(options),
+          m_service(std::move(service)),
+          m_listening(listenAt(m_options.address, m_options.port)) {
         start();
     }
+    ~Impl() { endAccepting(); }
+    Impl(const Impl&) = delete;
+    Impl& operator=(const Impl&) = delete;
 
-    std::uint16_t port() const {
-        const MHD_DaemonInfo* info = MHD_get_daemon_info(m_daemon.get(), MHD_DAEMON_INFO_BIND_PORT);
-        return info ? info->port : m_options.port;
-    }
+    std::uint16_t port() const;
     void watch();
     void stop(std::chrono::milliseconds grace);
 
 private:
     void start();
+    void startTalking(Talker& talker);
+    void acceptAll();
+    bool waitUntilOneIsFree();
+    void endAccepting();
+    void giveToTalker(Socket client, const sockaddr_storage& from, socklen_t size);
     Exchange* begin(MHD_Connection* handle, const char* target, const char* method);
     unsigned refusal(Exchange& exchange);
     bool believes(Exchange& exchange);
@@ -129,24 +187,28 @@ private:
     const HttpOptions m_options;
     const Service m_service;
     std::mutex m_mutex;
-    std::condition_variable m_idle;
-    std::map<Connection*, std::unique_ptr<Connection>> m_connections;
+    std::condition_variable m_changed;
     unsigned m_running = 0;  // requests that are worked on or answered
     bool m_stopping = false;
-    std::unique_ptr<MHD_Daemon, StopDaemon> m_daemon;  // last: its threads use all of the above
+    const Socket m_listening;
+    std::thread m_accepting;
+    std::list<Talker> m_talkers;  // last: their threads use all of the above
 };
 
 // -- beginning and end ----------------------------------------------------------------------------
 
 void HttpServer::Impl::start() {
-    const Address address = resolve(m_options.address, m_options.port);
-    const bool tls = !m_options.certificate.empty();
-    unsigned flags = MHD_USE_THREAD_PER_CONNECTION | MHD_USE_INTERNAL_POLLING_THREAD |
-                     MHD_USE_POLL | MHD_USE_ITC;
-    flags |= tls ? MHD_USE_TLS : 0;
-    flags |= address->ai_family == AF_INET6 ? MHD_USE_IPv6 : 0;
+    m_talkers.emplace_back(*this);
+    startTalking(m_talkers.front());
+    m_accepting = std::thread([this] { acceptAll(); });
+}
+
+void HttpServer::Impl::startTalking(Talker& talker) {
+    unsigned flags =
+        MHD_USE_NO_LISTEN_SOCKET | MHD_USE_INTERNAL_POLLING_THREAD | MHD_USE_POLL | MHD_USE_ITC;
     std::vector<MHD_OptionItem> items;
-    if (tls) {
+    if (!m_options.certificate.empty()) {
+        flags |= MHD_USE_TLS;
         const auto text = [](const std::string& pem) { return const_cast<char*>(pem.c_str()); };
         items.push_back({MHD_OPTION_HTTPS_MEM_CERT, 0, text(m_options.certificate)});
         items.push_back({MHD_OPTION_HTTPS_MEM_KEY, 0, text(m_options.key)});
@@ -154,38 +216,112 @@ void HttpServer::Impl::start() {
                          const_cast<char*>("NORMAL:-VERS-ALL:+VERS-TLS1.3:+VERS-TLS1.2")});
     }
     items.push_back({MHD_OPTION_END, 0, nullptr});
-    m_daemon.reset(MHD_start_daemon(
-        flags, 0, nullptr, nullptr, &Impl::onRequest, this, MHD_OPTION_SOCK_ADDR, address->ai_addr,
-        MHD_OPTION_CONNECTION_LIMIT, m_options.mostConnections, MHD_OPTION_CONNECTION_TIMEOUT,
+    talker.daemon.reset(MHD_start_daemon(
+        flags, 0, nullptr, nullptr, &Impl::onRequest, this,
+        // One, and one that comes while the library still clears away the last.
+        MHD_OPTION_CONNECTION_LIMIT, 2U, MHD_OPTION_CONNECTION_TIMEOUT,
         static_cast<unsigned>(m_options.idle.count()), MHD_OPTION_NOTIFY_COMPLETED, &Impl::onEnd,
-        this, MHD_OPTION_NOTIFY_CONNECTION, &Impl::onConnection, this,
+        this, MHD_OPTION_NOTIFY_CONNECTION, &Impl::onConnection, &talker,
         // Blocked signals would be inherited by the tools that providers start.
         MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1, MHD_OPTION_ARRAY, items.data(), MHD_OPTION_END));
-    if (!m_daemon) {
+    if (!talker.daemon) {
         throw std::runtime_error(
-            m_options.address + " port " + std::to_string(m_options.port) + ": cannot be served" +
-            (tls ? ", or the certificate and its key are no pair in PEM: " : ": ") +
-            std::strerror(errno));
+            m_options.certificate.empty()
+                ? std::string("no thread for a client: ") + std::strerror(errno)
+                : "TLS cannot be served: the certificate and its key are no pair in PEM");
+    }
+}
+
+std::uint16_t HttpServer::Impl::port() const {
+    sockaddr_storage address = {};
+    socklen_t size = sizeof address;
+    getsockname(m_listening.get(), reinterpret_cast<sockaddr*>(&address), &size);
+    return ntohs(address.ss_family == AF_INET6
+                     ? reinterpret_cast<const sockaddr_in6&>(address).sin6_port
+                     : reinterpret_cast<const sockaddr_in&>(address).sin_port);
+}
+
+void HttpServer::Impl::acceptAll() {
+    while (waitUntilOneIsFree()) {
+        sockaddr_storage from = {};
+        socklen_t size = sizeof from;
+        Socket client(accept4(m_listening.get(), reinterpret_cast<sockaddr*>(&from), &size,
+                              SOCK_CLOEXEC | SOCK_NONBLOCK));
+        if (client.get() < 0) {
+            // No descriptor or memory: others may give back theirs. Or the end: known at once.
+            std::unique_lock<std::mutex> lock(m_mutex);
+            m_changed.wait_for(lock, kBreath, [this] { return m_stopping; });
+            continue;
+        }
+        try {
+            giveToTalker(std::move(client), from, size);
+        } catch (const std::exception&) {
+            // the connection is closed
+        }
+    }
+}
+
+/// False when none will be.
+bool HttpServer::Impl::waitUntilOneIsFree() {
+    std::unique_lock<std::mutex> lock(m_mutex);
+    m_changed.wait(lock, [this] {
+        return m_stopping || m_talkers.size() < m_options.mostConnections ||
+               std::any_of(m_talkers.begin(), m_talkers.end(), isFree);
+    });
+    return !m_stopping;
+}
+
+void HttpServer::Impl::giveToTalker(Socket client, const sockaddr_storage& from, socklen_t size) {
+    std::unique_lock<std::mutex> lock(m_mutex);
+    auto talker = std::find_if(m_talkers.begin(), m_talkers.end(), isFree);
+    if (talker == m_talkers.end()) {
+        lock.unlock();
+        std::list<Talker> one;
+        one.emplace_back(*this);
+        startTalking(one.front());
+        lock.lock();
+        m_talkers.splice(m_talkers.begin(), one);
+        talker = m_talkers.begin();
+    }
+    talker->taken = true;
+    lock.unlock();
+    const auto* address = reinterpret_cast<const sockaddr*>(&from);
+    if (MHD_add_connection(talker->daemon.get(), client.release(), address, size) != MHD_YES) {
+        lock.lock();
+        talker->taken = false;
+    }
+}
+
+void HttpServer::Impl::endAccepting() {
+    {
+        const std::lock_guard<std::mutex> lock(m_mutex);
+        m_stopping = true;
+    }
+    m_changed.notify_all();
+    shutdown(m_listening.get(), SHUT_RDWR);
+    if (m_accepting.joinable()) {
+        m_accepting.join();
     }
 }
 
 void HttpServer::Impl::stop(std::chrono::milliseconds grace) {
-    const MHD_socket listening = MHD_quiesce_daemon(m_daemon.get());
-    if (listening != MHD_INVALID_SOCKET) {
-        close(listening);
-    }
+    endAccepting();
     std::unique_lock<std::mutex> lock(m_mutex);
-    m_stopping = true;
-    m_idle.wait_for(lock, grace, [this] { return m_running == 0; });
+    m_changed.wait_for(lock, grace, [this] { return m_running == 0; });
     lock.unlock();
-    m_daemon.reset();
+    for (Talker& talker : m_talkers) {
+        talker.daemon.reset();
+    }
 }
 
 void HttpServer::Impl::watch() {
     const Clock::time_point now = Clock::now();
     const std::lock_guard<std::mutex> lock(m_mutex);
-    for (const auto& each : m_connections) {
-        const Connection& connection = *each.second;
+    for (const Talker& talker : m_talkers) {
+        if (!talker.connection) {
+            continue;
+        }
+        const Connection& connection = *talker.connection;
         Clock::duration allowed = m_options.sending;
         if (connection.state == Connection::State::Answering) {
             allowed += std::chrono::seconds(connection.sent / m_options.leastBytesPerSecond);
@@ -205,7 +341,8 @@ void HttpServer::Impl::enter(Connection& connection, Connection::State state) {
 
 void HttpServer::Impl::onConnection(void* self, MHD_Connection* handle, void** context,
                                     MHD_ConnectionNotificationCode what) {
-    Impl& impl = *static_cast<Impl*>(self);
+    Talker& talker = *static_cast<Talker*>(self);
+    Impl& impl = talker.server;
     try {
         if (what == MHD_CONNECTION_NOTIFY_STARTED) {
             auto connection = std::make_unique<Connection>();
@@ -213,10 +350,12 @@ void HttpServer::Impl::onConnection(void* self, MHD_Connection* handle, void** c
                 MHD_get_connection_info(handle, MHD_CONNECTION_INFO_CONNECTION_FD)->connect_fd;
             const std::lock_guard<std::mutex> lock(impl.m_mutex);
             *context = connection.get();
-            impl.m_connections.emplace(connection.get(), std::move(connection));
+            talker.connection = std::move(connection);
         } else {
             const std::lock_guard<std::mutex> lock(impl.m_mutex);
-            impl.m_connections.erase(static_cast<Connection*>(*context));
+            talker.connection = nullptr;
+            talker.taken = false;
+            impl.m_changed.notify_all();
         }
     } catch (const std::exception&) {
         *context = nullptr;  // whose requests are refused
@@ -433,7 +572,7 @@ void HttpServer::Impl::ended(Exchange* exchange, bool whole) {
     if (owned->answered) {
         const std::lock_guard<std::mutex> lock(m_mutex);
         --m_running;
-        m_idle.notify_all();
+        m_changed.notify_all();
     }
 }
 

@@ -1,9 +1,9 @@
 /// HTTP for a service that answers requests, each as a whole, with answers of any length.
 ///
-/// The only place of the HTTP library. Each connection has a thread of its own, on which the
-/// service is called. Who has no right is turned away before the service hears of it. Limits hold
-/// on connections, on the size of a request, and on the time that a client takes to send it and to
-/// take the answer: a slow one loses its connection.
+/// The only place of the HTTP library. Each connection has a thread to itself, on which the
+/// service is called, and which stays for others. Who has no right is turned away before the
+/// service hears of it. Limits hold on connections, on the size of a request, and on the time that
+/// a client takes to send it and to take the answer: a slow one loses its connection.
 ///
 ///     HttpServer http(options, [](const HttpRequest& request) { return answerTo(request); });
 ///     while (!ending) wait();

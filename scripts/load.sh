@@ -49,9 +49,7 @@ password=$(openssl rand -hex 8)
 printf '%s:%s\n' "$name" "$(openssl passwd -6 "$password")" >passwords
 openssl req -x509 -newkey ec -pkeyopt ec_paramgen_curve:P-256 -nodes -keyout key -out certificate \
     -days 2 -subj /CN=localhost 2>/dev/null
-# One arena: with one for each few threads it takes hours until each has had its largest request.
-MALLOC_ARENA_MAX=1 \
-    cimom serve --port 0 --certificate certificate --key key --passwords passwords >said &
+cimom serve --port 0 --certificate certificate --key key --passwords passwords >said &
 server=$!
 until port=$(sed -n 's/^serving .*:\([0-9]*\)$/\1/p' said) && [ -n "$port" ]; do
     kill -0 "$server" 2>/dev/null || die "the server does not start"

@@ -7,6 +7,8 @@
 
 #include <atomic>
 #include <csignal>
+#include <mutex>
+#include <set>
 #include <thread>
 
 #include "Folder.h"
@@ -232,6 +234,26 @@ TEST_F(Http, ManyClientsAreServedAtOnceAndTheLastRequestsFinished) {
     }
     EXPECT_EQ(right, kClients);
     EXPECT_FALSE(Client(server->port()).connected);
+}
+
+TEST_F(Http, ThreadsStayForLaterClientsWhichWaitForThem) {
+    m_options.mostConnections = 2;
+    std::mutex mutex;
+    std::set<std::thread::id> threads;
+    const auto server = serve([&](const cimom::HttpRequest& request) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        threads.insert(std::this_thread::get_id());
+        return saying(request.body);
+    });
+    for (int round = 0; round < 10; ++round) {
+        const Client clients[] = {Client(server->port()), Client(server->port()),
+                                  Client(server->port())};
+        for (const Client& client : clients) {
+            client.send(post("hear"));
+            EXPECT_NE(client.take().find("\r\n\r\nhear"), std::string::npos);
+        }
+    }
+    EXPECT_LE(threads.size(), 2U);
 }
 
 TEST(Passwords, OfAFileThatIsNobodyElses) {

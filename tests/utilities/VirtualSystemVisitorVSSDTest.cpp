@@ -577,7 +577,6 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTheLibrary) {
         {"3*1111-AAA*0000001 DCaps:<0x2>", "010"},
         {"13*1111-AAA*0000001,DCaps:<7>\n3*1111-AAA*0000001", "000"},
         {"3*1111-AAA*0000001,DCaps:<ffffffffff", "000"},
-        {"", "000"},
     };
     const LibraryAnswer one({"Name=3*1111-AAA*0000001"});
     for (const Case& each : outputs) {
@@ -590,6 +589,9 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTheLibrary) {
                                      std::to_string(can.m_dlparIOCapable))
             << each.attributes;
     }
+    m_tools.script("qydyn", "exit 1");
+    EXPECT_EQ("\"qydyn -dlpar -c 1111-AAA_0000001\"",
+              failureText([&] { m_partitions.getData(&m_host, "3", ""); }, "a"));
 }
 
 TEST_F(VirtualSystemVisitorVSSDTest, FillsAndChangesTheHost) {

@@ -423,7 +423,8 @@ TEST_F(VirtualSystemVisitorVSSDTest, BothWaysGiveTheSame) {
 }
 
 TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
-    const zemRecordType active = record<Partition>("lpar_id=3;state=Running");
+    const zemRecordType active = record<Partition>("lpar_id=3;state=Running"),
+                        idle = record<Partition>("state=Not Activated");
     const zemRecordType profile = record<Profile>("name=p");
     const zemRecordSetsType none;
     const zemRecordSetsType two = records<Processor>({"", ""});
@@ -461,6 +462,9 @@ TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
         {{},
          [&] { m_visitor.getStateVSSD(active, profile, none, two, none, none, none, none, 0); },
          state + one + "qyalloc -r mem for lpar(3) -m" + host},
+        {{},
+         [&] { delete m_visitor.getStateVSSD(idle, profile, two, two, none, none, none, none, 0); },
+         ""},
         {{}, [&] { m_visitor.getStateVSSD("7", 0); }, "5" + state.substr(1) + nothing + of7},
         {{"", ""}, [&] { m_visitor.getStateVSSD("7", 0); }, state + one + of7},
         {{"", ""},

@@ -52,6 +52,12 @@ std::string zemEscaped(const char* text) {
 
 std::string zemQuoted(const char* text) { return '"' + zemEscaped(text) + '"'; }
 
+std::string zemArgument(const char* text) {
+    const bool isPlain =
+        zemIsGiven(text) && zemTextOf(text).find_first_of(" \"'\\") == std::string::npos;
+    return isPlain ? text : zemQuoted(text);
+}
+
 zemCommandLine zemSplitCommandLine(const char* command) {
     const std::string text = zemTextOf(command);
     zemCommandLine line;

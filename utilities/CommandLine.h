@@ -36,4 +36,8 @@ inline std::string zemTextOf(const char* text) { return text != nullptr ? text :
 std::string zemEscaped(const char* text);
 std::string zemQuoted(const char* text);
 
+/// The same for a line that has no quotes there: only a text that would not be one argument has
+/// them.
+std::string zemArgument(const char* text);
+
 #endif

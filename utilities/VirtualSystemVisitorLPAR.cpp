@@ -4,8 +4,10 @@
 #include <charconv>
 #include <iterator>
 #include <memory>
+#include <string>
 #include <string_view>
 
+#include "CommandLine.h"
 #include "Exception.h"
 #include "Log.h"
 #include "NumberText.h"
@@ -141,10 +143,10 @@ zemLPAR* zemLPARVisitor::getData(const zemString& mtms, const zemString& lparId,
 
 void zemLPARVisitor::readCapability(zemLPAR& lpar, const zemString& mtms) const {
     enum { CAPABLE_MEM = 1, CAPABLE_PROC = 2, CAPABLE_IO = 4 };
-    const zemString host = zemCommandCaller::quoted(zemString::replaceChar(mtms, '*', '_'));
+    const std::string host = zemArgument(zemString::replaceChar(mtms, '*', '_'));
     zemString output;
     zemCommandCaller(m_Env.m_userName, m_Env.m_locale)
-        .callGenericCommand("qydyn -dlpar -c " + host, &output, true);
+        .callGenericCommand(("qydyn -dlpar -c " + host).c_str(), &output, true);
     const zemString key = lpar.getLparID() + "*" + mtms;
     std::string_view told = behind(static_cast<const char*>(output), key);
     constexpr std::string_view kCapabilities = "DCaps:<";

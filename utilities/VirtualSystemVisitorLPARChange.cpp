@@ -5,6 +5,7 @@
 #include <cstdlib>
 #include <string>
 
+#include "CommandLine.h"
 #include "EdallocCmdCaller.h"
 #include "EdplatCmdCaller.h"
 #include "Exception.h"
@@ -26,13 +27,6 @@ struct Running {
     pid_t* pid;
     FILE** fpOutput;
 };
-
-/// These lines have no quotes around what they name: only what would not be one argument has them.
-zemString argument(const zemString& text) {
-    const bool isPlain =
-        !text.isEmpty() && std::string(text).find_first_of(" \"'\\") == std::string::npos;
-    return isPlain ? text : zemCommandCaller::quoted(text);
-}
 
 // Slots and adapters.
 
@@ -84,8 +78,9 @@ struct Adder {
     const Running& to;
 
     int operator()(const zemIOSlotRASD& slot) const {
-        return to.caller.addIOSlot(to.mtms, to.lparid, argument(zemDrcIndexOf(slot).c_str()),
-                                   zemPairs(), to.pid, to.fpOutput);
+        return to.caller.addIOSlot(to.mtms, to.lparid,
+                                   zemArgument(zemDrcIndexOf(slot).c_str()).c_str(), zemPairs(),
+                                   to.pid, to.fpOutput);
     }
     int operator()(const zemVETHRASD& ethernet) const {
         return add(&Edalloc::addVETH, ethernet, ethernetPairs(ethernet.m_Data));
@@ -108,8 +103,9 @@ struct Remover {
     const Running& from;
 
     int operator()(const zemIOSlotRASD& slot) const {
-        return from.caller.removeIOSlot(
-            from.mtms, from.lparid, argument(zemDrcIndexOf(slot).c_str()), from.pid, from.fpOutput);
+        return from.caller.removeIOSlot(from.mtms, from.lparid,
+                                        zemArgument(zemDrcIndexOf(slot).c_str()).c_str(), from.pid,
+                                        from.fpOutput);
     }
     int operator()(const zemVETHRASD& rasd) const { return remove(&Edalloc::removeVETH, rasd); }
     int operator()(const zemVSCSIRASD& rasd) const { return remove(&Edalloc::removeVSCSI, rasd); }
@@ -234,7 +230,7 @@ int zemLPARVisitor::ChangeRunningIOResource(const zemString& mtms, const zemStri
                                             zemRASD* rasd, pid_t* pid, FILE** fpOutput,
                                             zemCommandCaller::CH_OP_TYPE op) {
     Edalloc caller(m_Env.m_userName, m_Env.m_locale);
-    const zemString host = argument(mtms), lpar = argument(lparid);
+    const zemString host = zemArgument(mtms).c_str(), lpar = zemArgument(lparid).c_str();
     const Running running{caller, host, lpar, pid, fpOutput};
     switch (op) {
         case zemCommandCaller::CH_OP_ADD:
@@ -260,7 +256,7 @@ int zemLPARVisitor::ChangeRunningMemProcResource(const zemString& mtms, const ze
         change = MODIFY;
     }
     Edalloc caller(m_Env.m_userName, m_Env.m_locale);
-    const zemString host = argument(mtms), lpar = argument(lparid);
+    const zemString host = zemArgument(mtms).c_str(), lpar = zemArgument(lparid).c_str();
     const Running running{caller, host, lpar, pid, fpOutput};
     switch (now.m_ResourceType) {
         case zemRASDKinds::memory.resourceType:

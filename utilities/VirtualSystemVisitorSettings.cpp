@@ -118,7 +118,8 @@ zemString ioEntitledMem(const zemMemoryRASD& memory, const zemWanted&) {
     if (!isShared(memory)) {
         return zemString();
     }
-    return entitled == 0 ? zemString("auto") : inUnits(entitled, zemKilobytes);
+    const zemString size = inUnits(entitled, zemKilobytes);
+    return size == "0" ? zemString("auto") : size;
 }
 
 /// Shared memory reserves only what I/O may use: its sizes are the virtual ones.

@@ -74,17 +74,22 @@ std::vector<zemAttributes> attributesOf(const zemDynamicArray<Object>& objects) 
     return all;
 }
 
-/// The one record of processors or memory that a partition may have.
-/// @throws zemInvalidParameterException there are several
-std::vector<zemAttributes> onlyOne(const zemRecordSetsType& records, const char* resource,
-                                   const zemString& lparID, const zemString& mtms) {
-    zemExpectNoMore(records, kClass, kMethod,
-                    zemString(resource) + " for lpar(" + lparID + ") -m " + mtms);
-    return attributesOf(records);
-}
-
 bool isActivated(const zemAttributes& lpar) {
     return lpar[Partition::ATTR_STATE].find("Not Activated") < 0;
+}
+
+/// The one record of processors or memory that a partition may have; one that is not activated has
+/// none, whatever is told of it.
+/// @throws zemInvalidParameterException there are several
+std::vector<zemAttributes> onlyOne(const zemRecordSetsType& records, const char* resource,
+                                   const zemAttributes& lpar, const zemString& mtms) {
+    if (!isActivated(lpar)) {
+        return {};
+    }
+    zemExpectNoMore(
+        records, kClass, kMethod,
+        zemString(resource) + " for lpar(" + lpar[Partition::ATTR_LPAR_ID] + ") -m " + mtms);
+    return attributesOf(records);
 }
 
 class StateBuilder {
@@ -302,12 +307,11 @@ zemVSSD* zemVSSDVisitor::getStateVSSD(
     const zemRecordSetsType& scsiRecords, const zemRecordSetsType& ethRecords, int type) {
     const std::unique_ptr<zemVSSD> stored(getProfileVSSD(lparRecord, profileRecord, type));
     const zemAttributes lpar(lparRecord);
-    const zemString& lparID = lpar[Partition::ATTR_LPAR_ID];
     const zemString mtms = m_CEC->getMTMS();
     const Running running = {lpar,
                              false,
-                             onlyOne(procRecords, "qyalloc -r proc", lparID, mtms),
-                             onlyOne(memRecords, "qyalloc -r mem", lparID, mtms),
+                             onlyOne(procRecords, "qyalloc -r proc", lpar, mtms),
+                             onlyOne(memRecords, "qyalloc -r mem", lpar, mtms),
                              attributesOf(ioSlotRecords),
                              attributesOf(serialRecords),
                              attributesOf(scsiRecords),

@@ -423,7 +423,8 @@ TEST_F(VirtualSystemVisitorVSSDTest, BothWaysGiveTheSame) {
 }
 
 TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
-    const zemRecordType active = record<Partition>("lpar_id=3;state=Running");
+    const zemRecordType active = record<Partition>("lpar_id=3;state=Running"),
+                        idle = record<Partition>("state=Not Activated");
     const zemRecordType profile = record<Profile>("name=p");
     const zemRecordSetsType none;
     const zemRecordSetsType two = records<Processor>({"", ""});
@@ -461,6 +462,9 @@ TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
         {{},
          [&] { m_visitor.getStateVSSD(active, profile, none, two, none, none, none, none, 0); },
          state + one + "qyalloc -r mem for lpar(3) -m" + host},
+        {{},
+         [&] { delete m_visitor.getStateVSSD(idle, profile, two, two, none, none, none, none, 0); },
+         ""},
         {{}, [&] { m_visitor.getStateVSSD("7", 0); }, "5" + state.substr(1) + nothing + of7},
         {{"", ""}, [&] { m_visitor.getStateVSSD("7", 0); }, state + one + of7},
         {{"", ""},
@@ -577,7 +581,6 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTheLibrary) {
         {"3*1111-AAA*0000001 DCaps:<0x2>", "010"},
         {"13*1111-AAA*0000001,DCaps:<7>\n3*1111-AAA*0000001", "000"},
         {"3*1111-AAA*0000001,DCaps:<ffffffffff", "000"},
-        {"", "000"},
     };
     const LibraryAnswer one({"Name=3*1111-AAA*0000001"});
     for (const Case& each : outputs) {
@@ -590,6 +593,9 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTheLibrary) {
                                      std::to_string(can.m_dlparIOCapable))
             << each.attributes;
     }
+    m_tools.script("qydyn", "exit 1");
+    EXPECT_EQ("\"qydyn -dlpar -c 1111-AAA_0000001\"",
+              failureText([&] { m_partitions.getData(&m_host, "3", ""); }, "a"));
 }
 
 TEST_F(VirtualSystemVisitorVSSDTest, FillsAndChangesTheHost) {

@@ -143,7 +143,7 @@ TEST_F(VirtualSystemVisitorWriteTest, MakesPartitions) {
         // Memory.
         {[](Given& g) { g.host.m_maxMemPools = 1; g.memory.m_Data.m_Weight = 7; }, R"("min_mem)", R"("mem_mode=ded","mem_weight=7","min_mem)"},
         {[](Given& g) { g.host.m_maxMemPools = 1; g.memory.m_Data.m_ConsumerVisibility = 3; }, R"("min_mem=1024","desired_mem=2048","max_mem=4096)", R"("mem_mode=shared","desired_io_entitled_mem=2048","min_mem=256","desired_mem=512","max_mem=768)"},
-        {[](Given& g) { g.memory.m_Data.m_ConsumerVisibility = 3; g.memory.m_Data.m_Reservation = 0; }, R"("min_mem=1024","desired_mem=2048","max_mem=4096)", R"("desired_io_entitled_mem=auto","min_mem=256","desired_mem=512","max_mem=768)"},
+        {[](Given& g) { g.memory.m_Data.m_ConsumerVisibility = 3; g.memory.m_Data.m_Reservation = 1023; }, R"("min_mem=1024","desired_mem=2048","max_mem=4096)", R"("desired_io_entitled_mem=auto","min_mem=256","desired_mem=512","max_mem=768)"},
         {[](Given& g) { g.memory.m_Data.m_ConsumerVisibility = 3; g.memory.m_Data.m_Reservation = -1; }, R"("min_mem=1024","desired_mem=2048","max_mem=4096)", R"("min_mem=256","desired_mem=512","max_mem=768)"},
         // Lists, and tags of slots.
         {[](Given& g) { g.lists = {{12, "A//1,B//0"}, {10, "2/0/1//0/1,3/1/1/\"5,7\"/0/0"}, {21, "4/server/1/any//any/0"}, {6, "5/client/1//13/1,6/server/any//any/0"}}; g.tags = {1, 2, 4}; },

@@ -79,13 +79,15 @@ void countMembers(zemCEC& cec, std::unordered_map<std::string, Members>& pools) 
             }
         };
         add(all);
-        if (hasPools && held.getCurrProcMode() == "shared") {
-            const auto pool = pools.find(std::string(held.getPendSharedProcPoolId()));
-            if (pool == pools.end()) {
-                cec.getProcessorPool(held.getPendSharedProcPoolId());  // throws in its own words
-            } else {
-                add(pool->second);
-            }
+        const zemString poolID = hasPools ? zemProcessorPool::poolIDOf(held) : zemString();
+        if (poolID.isEmpty()) {
+            continue;
+        }
+        const auto pool = pools.find(std::string(poolID));
+        if (pool == pools.end()) {
+            cec.getProcessorPool(poolID);  // throws in its own words
+        } else {
+            add(pool->second);
         }
     }
     pools[zemPrimordialPoolID] = all;

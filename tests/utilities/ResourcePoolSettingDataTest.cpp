@@ -140,7 +140,6 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsLeave) {
         held.setCurrProcUnits("100");
         held.setPendProcUnits("250");
         held.setPendSharedProcPoolId(row.ofPartition);
-        held.setPendProcMode(row.ofPartition);
         auto lpar = std::make_unique<zemLPAR>(kHost, "3");
         lpar->setState(row.state);
         lpar->setLparProcessor(held);
@@ -155,6 +154,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsLeave) {
             seen = std::to_string(most.m_ProcRASettingData.m_Reservation) + ' ' +
                    std::to_string(least.m_ProcRASettingData.m_Reservation);
         }
+        EXPECT_EQ(zemString("ORX:SMAX:3-") + row.pool + "*" + kHost, most.getData()->m_InstanceID);
         EXPECT_EQ(row.units, seen) << row.free << row.pool << row.state;
     }
 }

@@ -238,7 +238,7 @@ int fill(const zemRASDKind& kind, const Leaf& leaf, zemResourcePool* pool, zemCE
                            leaf.resourceType == Kinds::memory.resourceType;
     const char* const sharing = leaf.sharing == SHARING_SHARED && isDivided ? "S" : "D";
     const zemString prefix = zemString("ORX:") + sharing + kRoles[leaf.role] + ":";
-    data.m_ResourceType = kind.resourceType;
+    data.m_ResourceType = static_cast<CMPIUint16>(kind.resourceType);
     data.m_InstanceID = pool->formInstanceID(prefix, cec->getMTMS());
     if (mode == VISITOR_TYPE_RASD_INIT_NI) {
         return 0;

@@ -180,7 +180,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsHave) {
                 const zemRASDCommData& data = *vssd->getRASDs()[k]->getData();
                 zemResourceRASettingDataCommData identity;
                 identity.m_InstanceID = data.m_InstanceID;
-                identity.m_ResourceType = data.m_ResourceType;
+                identity.m_ResourceType = static_cast<CMPIUint16>(data.m_ResourceType);
                 identity.m_AllocationUnits = data.m_AllocationUnits;
                 expected.insert(shown([&](CmpiInstance& to) {
                     zemAddIdentity(to, nullptr, identity);

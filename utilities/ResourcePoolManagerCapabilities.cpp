@@ -1,5 +1,7 @@
 #include "ResourcePoolManagerCapabilities.h"
 
+#include <memory>
+
 #include "ResourcePoolManagerPool.h"
 #include "ResourcePoolManagerRows.h"
 #include "VirtualSystemRep.h"
@@ -33,13 +35,17 @@ int fillAllocation(zemAllcationCapabilitiesCommData& data, const zemRASDKind& ki
 }
 
 template <const zemRASDKind& kind, zemPoolSharing sharing>
-int fillGroup(zemPoolCapability::SettingData& group, zemResourcePool* pool, zemCEC* cec,
+int fillGroup(zemPoolCapability& group, zemResourcePool* pool, zemCEC* cec,
               const zemString& userName, int mode) {
-    group[ROLE_MIN] = std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_MIN>>();
-    group[ROLE_MAX] = std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_MAX>>();
-    group[ROLE_DEF] = std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_DEF>>();
-    group[ROLE_INC] = std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_INC>>();
-    for (const auto& each : group) {
+    std::unique_ptr<zemResourceRASettingData> made[] = {
+        std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_MIN>>(),
+        std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_MAX>>(),
+        std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_DEF>>(),
+        std::make_unique<zemRASettingDataOfPool<kind, sharing, ROLE_INC>>()};
+    auto* next = made;
+    for (zemResourceRASettingData*& each : group.m_SettingData) {
+        delete each;
+        each = (next++)->release();
         if (each->initialize(pool, cec, userName, mode) == -1) {
             return -1;
         }
@@ -83,20 +89,24 @@ int zemAllocationCapabilitiesOf<kind>::initializeDedicated(zemResourcePool* pool
 
 zemPoolCapability::zemPoolCapability() = default;
 
-zemPoolCapability::~zemPoolCapability() = default;
+zemPoolCapability::~zemPoolCapability() {
+    for (const zemResourceRASettingData* const each : m_SettingData) {
+        delete each;
+    }
+}
 
 template <const zemRASDKind& kind, zemPoolSharing sharing>
 int zemPoolCapabilitiesOf<kind, sharing>::initialize(zemResourcePool* pool, zemCEC* cec,
                                                      const zemString& userName, int mode) {
-    return fillGroup<kind, sharing>(m_SettingData, pool, cec, userName, mode);
+    return fillGroup<kind, sharing>(*this, pool, cec, userName, mode);
 }
 
 template <const zemRASDKind& kind>
 int zemPoolCapabilitiesByPool<kind>::initialize(zemResourcePool* pool, zemCEC* cec,
                                                 const zemString& userName, int mode) {
     return pool->isPrimordial()
-               ? fillGroup<kind, SHARING_DEDICATED>(m_SettingData, pool, cec, userName, mode)
-               : fillGroup<kind, SHARING_SHARED>(m_SettingData, pool, cec, userName, mode);
+               ? fillGroup<kind, SHARING_DEDICATED>(*this, pool, cec, userName, mode)
+               : fillGroup<kind, SHARING_SHARED>(*this, pool, cec, userName, mode);
 }
 
 void zemResourcePoolConfigurationCapabilities::addSpecificProperties(CmpiInstance&, const char**,

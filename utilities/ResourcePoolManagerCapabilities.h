@@ -17,9 +17,6 @@
 #ifndef RESOURCE_POOL_MANAGER_CAPABILITIES_H
 #define RESOURCE_POOL_MANAGER_CAPABILITIES_H
 
-#include <array>
-#include <memory>
-
 #include "ResourcePoolManagerSettingData.h"
 #include "StringUtils.h"
 #include "VirtualSystemRepRASD.h"
@@ -94,8 +91,6 @@ using zemSerialAdapterAllocationCapabilities = zemAllocationCapabilitiesOf<zemRA
 /// is usual, and the step.
 class ZEM_EXPORT zemPoolCapability {
 public:
-    using SettingData = std::array<std::unique_ptr<zemResourceRASettingData>, ROLE_INC + 1>;
-
     zemPoolCapability();
     zemPoolCapability(const zemPoolCapability&) = delete;
     zemPoolCapability& operator=(const zemPoolCapability&) = delete;
@@ -107,7 +102,7 @@ public:
     virtual int initialize(zemResourcePool* pool, zemCEC* cec, const zemString& userName,
                            int mode) = 0;
 
-    SettingData m_SettingData;  ///< by zemPoolRole
+    zemResourceRASettingData* m_SettingData[ROLE_INC + 1] = {};  ///< by zemPoolRole; owned
 };
 
 /// Of one kind, and of what is taken as dedicated or as shared. Slots and adapters are always

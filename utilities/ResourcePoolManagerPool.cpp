@@ -130,18 +130,6 @@ float heldUnits(const zemPartitionProcessorResource& record) {
     return std::max(unitsOf(record.getCurrProcUnits()), unitsOf(record.getPendProcUnits()));
 }
 
-/// The shared pool that a partition names; empty for dedicated processors.
-zemString poolIdOf(const zemPartitionProcessorResource& record) {
-    static constexpr const char* kAbsent[] = {"null", "none",    "none,",
-                                              "255",  "zemNULL", "m_lparID"};
-    const zemString& told = record.getCurrSharedProcPoolId();
-    const zemString id = told.isEmpty() ? record.getPendSharedProcPoolId() : told;
-    const bool isAbsent =
-        std::any_of(std::begin(kAbsent), std::end(kAbsent),
-                    [&](const char* word) { return zemString::equalsIgnoreCase(id, word); });
-    return isAbsent ? zemString() : id;
-}
-
 /// What a shared pool can hold. The first pool, which takes what no other has, tells no limit.
 float unitsOfPool(const zemProcessorPoolResource& pool, const zemCEC& cec) {
     const float units =
@@ -265,8 +253,7 @@ zemDynamicArray<zemPoolCapability>& zemResourcePool::getPoolCapability() {
 bool zemResourcePool::isPrimordial() const { return m_Data->m_PoolID == zemPrimordialPoolID; }
 
 zemString zemResourcePool::formInstanceID(const char* prefix, const zemString& mtms) const {
-    return prefix + zemString(static_cast<int>(m_Data->m_ResourceType)) + "-" + m_Data->m_PoolID +
-           "*" + mtms;
+    return prefix + zemString(m_kind.resourceType) + "-" + m_Data->m_PoolID + "*" + mtms;
 }
 
 void zemResourcePool::tellKey(const zemString& poolID, const zemString& mtms,
@@ -392,6 +379,17 @@ int zemProcessorPool::initializeShare(zemCEC* cec, const zemHardwareResource* re
     return 0;
 }
 
+zemString zemProcessorPool::poolIDOf(const zemPartitionProcessorResource& record) {
+    static constexpr const char* kAbsent[] = {"null", "none",    "none,",
+                                              "255",  "zemNULL", "m_lparID"};
+    const zemString& told = record.getPendSharedProcPoolId();
+    const zemString id = told.isEmpty() ? record.getCurrSharedProcPoolId() : told;
+    const bool isAbsent =
+        std::any_of(std::begin(kAbsent), std::end(kAbsent),
+                    [&](const char* word) { return zemString::equalsIgnoreCase(id, word); });
+    return isAbsent ? zemString() : id;
+}
+
 /// One walk over the partitions for all pools.
 void zemProcessorPool::countActive(zemCEC& cec) {
     if (std::exchange(m_isActiveCounted, true)) {
@@ -404,7 +402,7 @@ void zemProcessorPool::countActive(zemCEC& cec) {
     }
     eachPartition(cec, [&](const zemLPAR& lpar) {
         const zemPartitionProcessorResource& record = lpar.getLparProcessor();
-        const zemString poolID = poolIdOf(record);
+        const zemString poolID = poolIDOf(record);
         if (poolID.isEmpty()) {
             return;
         }

@@ -206,6 +206,10 @@ public:
     /// @throws what queries throw (CommandCaller.h), in the name of this operation
     void initRASDInfo(const zemString& userName, const zemString& mtms);
 
+    /// The shared pool that a partition names: the one that it aims at, which its setting data tell
+    /// too, or else the one in effect; empty for dedicated processors.
+    static zemString poolIDOf(const zemPartitionProcessorResource& record);
+
     zemProcPoolData m_ProcPoolData;
 
     /// Of a sub-pool, that of the pool to which it belongs.

@@ -219,7 +219,7 @@ int fill(const zemRASDKind& kind, const Asked& asked, const zemString& id, int t
     } catch (const zemInvalidParameterException&) {
         return -1;  // the element has quotes that nothing closes
     }
-    data.m_ResourceType = kind.resourceType;
+    data.m_ResourceType = static_cast<CMPIUint16>(kind.resourceType);
     data.m_AllocationUnits = kind.units;
     return 0;
 }
@@ -375,12 +375,12 @@ void zemRASettingDataOnLPAR<kind>::addSpecificProperties(CmpiInstance& instance,
 
 void zemAddIdentity(CmpiInstance& instance, const char** properties,
                     const zemResourceRASettingDataCommData& data) {
-    if (data.m_ResourceType == -1) {
+    if (data.m_ResourceType == 0) {
         return;
     }
     const zemListedProperties listed(instance, properties);
     listed.add("InstanceID", data.m_InstanceID);
-    listed.add("ResourceType", CmpiData(static_cast<CMPIUint16>(data.m_ResourceType)));
+    listed.add("ResourceType", CmpiData(data.m_ResourceType));
     if (!data.m_AllocationUnits.isEmpty()) {
         listed.add("AllocationUnits", data.m_AllocationUnits);
     }

@@ -26,6 +26,7 @@
 #include "StringUtils.h"
 #include "VirtualSystemRepRASD.h"
 #include "ZemExport.h"
+#include "cmpidt.h"
 
 class CmpiInstance;
 class zemCEC;
@@ -36,9 +37,9 @@ class zemResourcePool;
 struct ZEM_EXPORT zemResourceRASettingDataCommData {
     virtual ~zemResourceRASettingDataCommData();
 
-    int m_ResourceType = -1;      ///< zemRASDKind::resourceType
-    zemString m_InstanceID;       ///< as told at the leaves; empty in an object that was not filled
-    zemString m_AllocationUnits;  ///< zemRASDKind::units
+    CMPIUint16 m_ResourceType = 0;  ///< zemRASDKind::resourceType; 0 in one that was not filled
+    zemString m_InstanceID;         ///< as told at the leaves
+    zemString m_AllocationUnits;    ///< zemRASDKind::units
 };
 
 /// Setting data of any kind.

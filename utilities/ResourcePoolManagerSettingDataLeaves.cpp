@@ -79,13 +79,15 @@ void countMembers(zemCEC& cec, std::unordered_map<std::string, Members>& pools) 
             }
         };
         add(all);
-        if (hasPools && held.getCurrProcMode() == "shared") {
-            const auto pool = pools.find(std::string(held.getPendSharedProcPoolId()));
-            if (pool == pools.end()) {
-                cec.getProcessorPool(held.getPendSharedProcPoolId());  // throws in its own words
-            } else {
-                add(pool->second);
-            }
+        const zemString poolID = hasPools ? zemProcessorPool::poolIDOf(held) : zemString();
+        if (poolID.isEmpty()) {
+            continue;
+        }
+        const auto pool = pools.find(std::string(poolID));
+        if (pool == pools.end()) {
+            cec.getProcessorPool(poolID);  // throws in its own words
+        } else {
+            add(pool->second);
         }
     }
     pools[zemPrimordialPoolID] = all;
@@ -236,7 +238,7 @@ int fill(const zemRASDKind& kind, const Leaf& leaf, zemResourcePool* pool, zemCE
                            leaf.resourceType == Kinds::memory.resourceType;
     const char* const sharing = leaf.sharing == SHARING_SHARED && isDivided ? "S" : "D";
     const zemString prefix = zemString("ORX:") + sharing + kRoles[leaf.role] + ":";
-    data.m_ResourceType = kind.resourceType;
+    data.m_ResourceType = static_cast<CMPIUint16>(kind.resourceType);
     data.m_InstanceID = pool->formInstanceID(prefix, cec->getMTMS());
     if (mode == VISITOR_TYPE_RASD_INIT_NI) {
         return 0;

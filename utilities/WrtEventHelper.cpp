@@ -34,16 +34,11 @@ int numberOf(const void* address) {
     return static_cast<int>(reinterpret_cast<std::intptr_t>(address));
 }
 
-bool isPrintable(const zemString& text) {
-    const char* const begin = text;
-    return std::all_of(begin, begin + text.length(), [](char c) { return c > ' ' && c <= '~'; });
-}
-
-/// What events are known under whose object type says nothing.
+/// What events are known under whose object type is Java's null, which is invalid here, or empty.
 zemString typeOrNull(const zemString& objectType) {
-    const char* what = objectType.isEmpty()       ? "object type is empty, set it to null"
-                       : !isPrintable(objectType) ? "object type is invalid, set it to null"
-                                                  : nullptr;
+    const char* what = objectType.isInvalid() ? "object type is invalid, set it to null"
+                       : objectType.isEmpty() ? "object type is empty, set it to null"
+                                              : nullptr;
     note("eventOccured", what == nullptr ? "Normal object type" : what);
     return what == nullptr ? objectType : zemString(kNoObject);
 }

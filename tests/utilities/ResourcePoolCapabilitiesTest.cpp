@@ -11,7 +11,8 @@ namespace {
 std::string told(zemPoolCapability* capability) {
     std::string ids;
     for (std::size_t i = 0; capability != nullptr && i <= ROLE_INC; ++i) {
-        const std::string id(capability->m_SettingData[i]->getData()->m_InstanceID);
+        const zemResourceRASettingData* const leaf = capability->m_SettingData[i];
+        const std::string id(leaf->getData()->m_InstanceID);
         ids += i == 0 ? id : ' ' + id.substr(4, 5);
     }
     return ids;

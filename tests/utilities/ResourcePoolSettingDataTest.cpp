@@ -140,7 +140,6 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsLeave) {
         held.setCurrProcUnits("100");
         held.setPendProcUnits("250");
         held.setPendSharedProcPoolId(row.ofPartition);
-        held.setPendProcMode(row.ofPartition);
         auto lpar = std::make_unique<zemLPAR>(kHost, "3");
         lpar->setState(row.state);
         lpar->setLparProcessor(held);
@@ -155,6 +154,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsLeave) {
             seen = std::to_string(most.m_ProcRASettingData.m_Reservation) + ' ' +
                    std::to_string(least.m_ProcRASettingData.m_Reservation);
         }
+        EXPECT_EQ(zemString("ORX:SMAX:3-") + row.pool + "*" + kHost, most.getData()->m_InstanceID);
         EXPECT_EQ(row.units, seen) << row.free << row.pool << row.state;
     }
 }
@@ -180,7 +180,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsHave) {
                 const zemRASDCommData& data = *vssd->getRASDs()[k]->getData();
                 zemResourceRASettingDataCommData identity;
                 identity.m_InstanceID = data.m_InstanceID;
-                identity.m_ResourceType = data.m_ResourceType;
+                identity.m_ResourceType = static_cast<CMPIUint16>(data.m_ResourceType);
                 identity.m_AllocationUnits = data.m_AllocationUnits;
                 expected.insert(shown([&](CmpiInstance& to) {
                     zemAddIdentity(to, nullptr, identity);

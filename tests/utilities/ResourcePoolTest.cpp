@@ -90,11 +90,11 @@ TEST(ResourcePoolTest, PoolsTellWhatTheirHostHas) {
           "Name=2*1*2;SharedProcPoolId=1;MaxPoolCapacity=8.00;PartitionState=0;CurProcMode=1;"
           "CurAllocProcUnits=200",
           "Name=3*1*2;SharedProcPoolId=2;MaxPoolCapacity=0.5;PartitionState=8;CurProcMode=1;"
-          "CurAllocProcUnits=50",
+          "PendProcMode=2;CurAllocProcUnits=50",
           "Name=4*1*2;SharedProcPoolId=3;MaxPoolCapacity=1;PartitionState=2;CurProcMode=255;"
           "CurAllocProcUnits=300;ConfigurableProcUnits=10;PendAvailProcUnits=2;MaxProcPools=64"},
          processor + "1|Percent|1000|600|0" + processors + shared("0", "1000|0") +
-             shared("1", "800|200") + shared("2", "50|0") + shared("3", "100|0")},
+             shared("1", "800|150") + shared("2", "50|50") + shared("3", "100|0")},
         {{"Name=1*1*2;SharedProcPoolId=0;PartitionState=0;CurProcMode=7;MaxProcPools=2"},
          "zemCEC/getProcessorPool/Pool ID : 7"},
         {{"Name=1*1*2"}, "-1"},

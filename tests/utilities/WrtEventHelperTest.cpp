@@ -81,8 +81,7 @@ TEST(WrtEventHelperTest, EventsFindTheirCallBacksByKey) {
         {4, "ORXWRT_ComputerSystem", "4-ORXWRT_ComputerS", "ORXWRT_ComputerSomething", true},
         {-1, "null", "-1-null", nullptr, true},
         {-2, "null", "-2-null", "", true},
-        {7, "null", "7-null", "\x01 line", true},  // nothing that a class could be called
-        {7, "\x01 line", "7-\x01 line", "\x01 line", false},
+        {7, "\x01 line", "7-\x01 line", "\x01 line", true},
     };
     DemoAppliance appliance;
     inProcess([&] {

@@ -125,6 +125,10 @@ TEST_F(CommandLine, VerbsThatChange) {
         {R"(ain 'Fix_Thing.Name="two, \"quoted\" \\"' --assoc-class Fix_Link)",
          "root/cimv2:Fix_Thing.Name=\"one\"\n"},
         {"rin" + one + "--role Dependent", ""},
+        {"ai" + one + "--result-role Dependent --properties Size",
+         "// root/cimv2:Fix_Thing.Name=\"two, \\\"quoted\\\" \\\\\"\n"
+         "instance of Fix_Thing {\n    Size = 2;\n};\n"},
+        {"ri" + one + "--result-class Fix_Link --role Dependent", ""},
         {"ec Fix_Base", "Fix_Thing\n"},
         {"im" + one + R"(Echo Number=5 'Names={a,"b,c"}' 'Thing=Fix_Base.Name="x"' )" +
              "'Parts={instance of Fix_Thing { Size = 3; }}'",

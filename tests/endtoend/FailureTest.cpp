@@ -1,11 +1,10 @@
 // What a client reads when something is wrong, byte for byte: from the command line through each
 // broker and the frame to a provider and back, with and without a bundle of translated texts.
-#include <gtest/gtest.h>
-
 #include <map>
 #include <regex>
 #include <set>
 
+#include "../cimom/BothBrokers.h"
 #include "Json.h"
 #include "TestAppliance.h"
 
@@ -194,18 +193,16 @@ Texts general(const Texts& text) {
     return {wrapped(text.english), wrapped(text.german)};
 }
 
-class FailureTest : public ::testing::TestWithParam<const char*> {
+class FailureTest : public BothBrokers {
 protected:
     void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
 
-    bool full() const { return std::string(GetParam()) == "full"; }
-
     Outcome cimom(const std::string& arguments) {
-        return m_appliance.run(m_before + "cimom --broker " + GetParam() + " --registration '" +
-                               ZEM_REGISTRATION "' --registration '" ZEM_FAILING
-                                                ".json' --library-folder '" ZEM_FAILING_FOLDER
-                                                "' " +
-                               arguments);
+        return m_appliance.run(
+            m_before + "cimom --broker " + brokerName({GetParam(), 0}) + " --registration '" +
+            ZEM_REGISTRATION "' --registration '" ZEM_FAILING
+                             ".json' --library-folder '" ZEM_FAILING_FOLDER "' " +
+            arguments);
     }
 
     void expectFailure(const std::string& arguments, const Status& status,
@@ -218,20 +215,17 @@ protected:
         EXPECT_EQ(got.out, "") << arguments;
     }
 
-    void expectGerman(const std::string& arguments, const Status& status, const std::string& text) {
-        expectFailure("--messages '" ZEM_MESSAGES "' --language de " + arguments, status, text);
-    }
-
     /// With a bundle under the broker that reads one, without under the other. Where the two
     /// answer differently, without.
     void expectFailure(const Row& row) {
         const bool differ = row.leanStatus.code != 0;
-        if (differ && !full()) {
+        if (differ && lean()) {
             expectFailure(row.arguments, row.leanStatus, row.leanText.english);
-        } else if (full() && !differ && !row.text.german.empty()) {
-            expectGerman(row.arguments, row.status, row.text.german);
-        } else if (!full() || differ) {
+        } else if (lean() || differ) {
             expectFailure(row.arguments, row.status, row.text.english);
+        } else if (!row.text.german.empty()) {
+            expectFailure("--messages '" ZEM_MESSAGES "' --language de " + row.arguments,
+                          row.status, row.text.german);
         }
     }
 
@@ -245,13 +239,8 @@ protected:
 
 TEST_P(FailureTest, ProvidersThrowByName) {
     for (const Sentence& sentence : kSentences) {
-        const std::string name = sentence.name;
-        const std::string arguments = "gi " + disk("Name=\"" + name + "\",Slot=1");
-        const Texts text = says(name);
-        expectFailure(arguments, sentence.status, text.english);
-        if (full() && !text.german.empty()) {
-            expectGerman(arguments, sentence.status, text.german);
-        }
+        expectFailure({"gi " + disk("Name=\"" + std::string(sentence.name) + "\",Slot=1"),
+                       sentence.status, says(sentence.name)});
     }
     expectFailure({"gp " + disk("Name=\"PropertiesAccessException2\",Slot=1") + " Size", kFailed,
                    says(kOnBehalf, {{0, "getProperty"}})});
@@ -291,7 +280,7 @@ TEST_P(FailureTest, EnumerationsLogWhatTheyDoNotAnswer) {
     for (const auto& row : rows) {
         const Outcome got = cimom(std::string("--trace 0 --user ") + row.user + " ei Test_Disk");
         EXPECT_EQ(got.exit, row.exit) << row.user;
-        EXPECT_EQ(got.err, (full() ? row.log : "") + row.err) << row.user;
+        EXPECT_EQ(got.err, (lean() ? "" : row.log) + row.err) << row.user;
         EXPECT_NE(got.out.find("Test_Disk.Name=\"sda\",Slot=1\n"), std::string::npos) << row.user;
     }
     expectFailure({"ein Test_Disk", kNotSupported,
@@ -471,8 +460,7 @@ TEST_P(FailureTest, DisabledProvidersFindNothing) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, FailureTest, ::testing::Values("full", "lean"),
-                         [](const auto& broker) { return std::string(broker.param); });
+ON_BOTH_BROKERS(FailureTest);
 
 // The bundle has a text for every key that the library can look up, and for nothing else.
 TEST(FailureBundle, HasEveryKeyOfTheLibrary) {

@@ -41,14 +41,13 @@ protected:
             lines);
     }
     static std::string cimomAdding(const std::string& adapters) {
-        return "cimom --broker " + nameOf({GetParam(), 0}) +
+        return "cimom --broker " + brokerName({GetParam(), 0}) +
                " --registration " ZEM_REGISTRATION " --schema " ZEM_SCHEMA " im '" + kService +
                "' AddResourceSettings 'AffectedConfiguration=" + kPartition +
                "' 'ResourceSettings={" + adapters + "}' ";
     }
     ObjectPath startJob() {
-        const Value adapters = parseValue('{' + adapter(9) + '}', CMPI_instanceA,
-                                          ClassRepository::load(ZEM_SCHEMA).get());
+        const Value adapters = parseValue('{' + adapter(9) + '}', CMPI_instanceA, m_classes.get());
         const Reply reply = m_server->invokeMethod(
             m_request, parsePath(kService), "AddResourceSettings",
             {{"AffectedConfiguration", parsePath(kPartition)}, {"ResourceSettings", adapters}});
@@ -172,6 +171,6 @@ TEST_P(JobRunsTest, TheServerStopsWhileAJobRuns) {
     EXPECT_EQ(m_server->getInstance(m_request, job).rc, CMPI_RC_ERR_NOT_FOUND);
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, JobRunsTest, ServedProviders::brokers(), ServedProviders::nameOf);
+ON_BOTH_BROKERS(JobRunsTest);
 
 }  // namespace

@@ -205,6 +205,99 @@ TEST_P(ProvidersTest, ObjectsWithoutAHostHaveNoneInCommon) {
         << reply.message;
 }
 
+struct Association {
+    const char* name;
+    const char* base;
+    const char* farRole;
+    ObjectPath source;
+    const char* farClass;
+    std::size_t targets;  ///< of the source
+    std::size_t all;
+};
+
+ObjectPath named(const char* className, const std::string& id) {
+    return {"root/cimv2", className, {{"InstanceID", id}}};
+}
+
+// One provider for each way in which the library can find the two sides.
+TEST_P(ProvidersTest, EveryAssociationAnswersAllOperationsAndFilters) {
+    const std::string ofHost = "*1111-AAA*0000001";
+    const ObjectPath host = system(kHostClass, "1111-AAA*0000001");
+    const ObjectPath partition = system(kPartitionClass, "4" + ofHost);
+    const ObjectPath profile = named("ORXC_VirtualSystemSettingData", "ORX:2*normal-4" + ofHost);
+    const ObjectPath adapter = named("ORXC_SCSIAdapterRASettingData", "ORX:4*3*4" + ofHost);
+    const ObjectPath link = named("ORXC_HostConnection", "ORX:1111-AAA*0000001:primary");
+    const ObjectPath whole = named("ORXC_ProcessorPool", "ORX:3-Primordial" + ofHost);
+    const ObjectPath pool = named("ORXC_ProcessorPool", "ORX:3-1" + ofHost);
+    const ObjectPath most = named("ORXC_MemoryRASettingData", "ORX:DMAX:4-Primordial" + ofHost);
+    ObjectPath service = system("ORXC_SerialAdapterPoolConfigurationService",
+                                "ORX:SerialAdapterPoolService:1111-AAA*0000001");
+    service.keys.set("SystemCreationClassName", kHostClass);
+    service.keys.set("SystemName", "1111-AAA*0000001");
+    // clang-format off
+    const Association rows[] = {
+        {"ORXC_HostedPartition", "CIM_HostedDependency", "Dependent", host, kPartitionClass, 7, 14},
+        {"ORXC_ConnectedHost", "CIM_Dependency", "Dependent", host, "ORXC_HostConnection", 2, 8},
+        {"ORXC_HostComponent", "CIM_Component", "PartComponent", host, "CIM_EnabledLogicalElement", 9, 22},
+        {"ORXC_ReachedHost", "CIM_Dependency", "Dependent", host, "ORXC_HostConnection", 2, 8},
+        {"ORXC_PartitionConnection", "CIM_Dependency", "Dependent", link, kPartitionClass, 7, 28},
+        {"ORXC_ElementSettingData", "CIM_ElementSettingData", "SettingData", partition, "CIM_SettingData", 2, 15},
+        {"ORXC_ElementSettingData", "CIM_ElementSettingData", "ManagedElement", profile, kPartitionClass, 1, 15},
+        {"ORXC_SettingsDefineState", "CIM_SettingsDefineState", "SettingData", partition, "CIM_VirtualSystemSettingData", 1, 14},
+        {"ORXC_VSSDComponent", "CIM_Component", "PartComponent", profile, "CIM_ResourceAllocationSettingData", 8, 187},
+        {"ORXC_VSSDComponent", "CIM_VirtualSystemSettingDataComponent", "GroupComponent", adapter, "CIM_SettingData", 1, 187},
+        {"ORXC_HostedResourcePool", "CIM_Component", "PartComponent", host, "CIM_ResourcePool", 9, 30},
+        {"ORXC_HostedService", "CIM_HostedDependency", "Dependent", host, "CIM_Service", 7, 28},
+        {"ORXC_ServiceAffectsElement", "CIM_ServiceAffectsElement", "AffectingElement", pool, "CIM_EnabledLogicalElement", 1, 30},
+        {"ORXC_ElementCapabilities", "CIM_ElementCapabilities", "Capabilities", pool, "CIM_AllocationCapabilities", 1, 54},
+        {"ORXC_ElementCapabilities", "CIM_ElementCapabilities", "Capabilities", service, "CIM_ResourcePoolConfigurationCapabilities", 1, 54},
+        {"ORXC_SettingsDefineCapabilities", "CIM_Component", "GroupComponent", most, "CIM_Capabilities", 1, 120},
+        {"ORXC_ElementAllocatedFromPool", "CIM_Dependency", "Dependent", whole, "ORXC_ProcessorPool", 2, 6},
+        {"ORXC_ElementAllocatedFromPool", "CIM_Dependency", "Antecedent", pool, "CIM_ResourcePool", 1, 6},
+        {"ORXC_ResourceAllocationFromPool", "CIM_Dependency", "Dependent", pool, "CIM_ResourceAllocationSettingData", 2, 80},
+        {"ORXC_ResourceAllocationFromPool", "CIM_Dependency", "Antecedent", adapter, "CIM_ResourcePool", 1, 80},
+    };
+    // clang-format on
+    for (const Association& row : rows) {
+        SCOPED_TRACE(row.name + std::string(" ") + row.source.className);
+        const auto found = [&](const AssociationFilter& filter) {
+            const Reply reply = m_server->associatorNames(m_request, row.source, filter);
+            EXPECT_EQ(reply.rc, CMPI_RC_OK) << reply.message;
+            return reply.paths;
+        };
+        const auto targets = found({row.name, "", "", ""});
+        EXPECT_EQ(targets.size(), row.targets);
+        EXPECT_EQ(found({row.name, row.farClass, "", ""}), targets);
+        EXPECT_TRUE(found({row.name, "CIM_ConcreteJob", "", ""}).empty());
+        EXPECT_TRUE(found({row.name, "", "Neither", ""}).empty());
+        EXPECT_TRUE(found({row.name, "", "", "Neither"}).empty());
+        for (const char* wider : {"", row.base}) {
+            const auto all = found({wider, "", "", ""});
+            for (const ObjectPath& target : targets) {
+                EXPECT_NE(std::find(all.begin(), all.end(), target), all.end()) << wider;
+            }
+        }
+        const auto pathsOf = [](const Reply& reply) {
+            std::deque<ObjectPath> paths;
+            for (const Instance& each : reply.instances) {
+                paths.push_back(each.path);
+            }
+            return paths;
+        };
+        EXPECT_EQ(pathsOf(m_server->associators(m_request, row.source, {row.name, "", "", ""})),
+                  targets);
+        const AssociationFilter links{"", row.name, "", ""};
+        const auto references = m_server->referenceNames(m_request, row.source, links).paths;
+        EXPECT_EQ(references.size(), row.targets);
+        EXPECT_EQ(pathsOf(m_server->references(m_request, row.source, links)), references);
+        const Reply one = m_server->getInstance(m_request, references.at(0));
+        EXPECT_TRUE(one.instances.at(0).properties.find(row.farRole)) << one.message;
+        const ObjectPath every("root/cimv2", row.name);
+        EXPECT_EQ(m_server->enumInstanceNames(m_request, every).paths.size(), row.all);
+        EXPECT_EQ(m_server->enumInstances(m_request, every).instances.size(), row.all);
+    }
+}
+
 TEST(RegistrationsTest, TellOtherServersWhatCimomReads) {
     const struct {
         const char* file;
@@ -236,7 +329,6 @@ TEST(RegistrationsTest, TellOtherServersWhatCimomReads) {
     }
 }
 
-INSTANTIATE_TEST_SUITE_P(Brokers, ProvidersTest, ServedProviders::brokers(),
-                         ServedProviders::nameOf);
+ON_BOTH_BROKERS(ProvidersTest);
 
 }  // namespace

@@ -179,6 +179,7 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
         {"-t 'beta lab' --id 7", "WRTL8030", Kind::Host, {2}, "mem_region_size", "4096"},
     };
     // clang-format on
+    const std::string before = shown() + out("appliance journal --json");
     for (const auto& row : rows) {
         auto store = appliance::Store::open(appliance::Database::Access::Write);
         const auto usual = store.find(row.kind, row.place);
@@ -193,7 +194,6 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
         if (usual) {
             put(*usual, row.value);
         }
-        const std::string before = shown(), journal = out("appliance journal --json");
         for (const std::string operation : {"v", "m"}) {
             const auto outcome =
                 m_appliance.run("domove -o " + operation + " -m alpha " + row.options);
@@ -201,12 +201,11 @@ TEST_F(MoveTest, WhatIsRefusedChangesNothing) {
             EXPECT_EQ("", outcome.out);
             EXPECT_NE(0, outcome.exit);
         }
-        EXPECT_EQ(before, shown()) << row.options << row.code;
-        EXPECT_EQ(journal, out("appliance journal --json"));
         if (usual) {
             put(*usual, nullptr);
         }
     }
+    EXPECT_EQ(before, shown() + out("appliance journal --json"));
     EXPECT_EQ("WRTL8073", m_appliance.run("domove -o s -m alpha --id 7").err.substr(0, 8));
 }
 

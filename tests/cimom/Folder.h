@@ -20,6 +20,7 @@ public:
     }
     ~Folder() { std::filesystem::remove_all(m_path); }
 
+    const std::filesystem::path& path() const { return m_path; }
     std::string operator/(const std::string& name) const { return (m_path / name).string(); }
     /// Writes a file; returns its path.
     std::string write(const std::string& name, const std::string& text) const {

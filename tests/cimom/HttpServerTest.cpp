@@ -11,6 +11,7 @@
 #include <set>
 #include <thread>
 
+#include "../utilities/OnThreads.h"
 #include "Folder.h"
 #include "HttpServer.h"
 #include "Passwords.h"
@@ -18,7 +19,6 @@
 namespace {
 
 using namespace std::chrono_literals;
-using Clock = std::chrono::steady_clock;
 
 /// A client that sends and takes just what it is told to.
 class Client {
@@ -82,15 +82,6 @@ cimom::HttpAnswer saying(const std::string& text) {
         return !std::exchange(left, "").empty();
     };
     return answer;
-}
-
-template <class F>
-bool within(std::chrono::milliseconds time, F happened) {
-    const auto until = Clock::now() + time;
-    while (!happened() && Clock::now() < until) {
-        std::this_thread::sleep_for(10ms);
-    }
-    return happened();
 }
 
 class Http : public testing::Test {

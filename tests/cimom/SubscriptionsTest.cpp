@@ -5,6 +5,7 @@
 #include <mutex>
 #include <thread>
 
+#include "../utilities/OnThreads.h"
 #include "Failure.h"
 #include "Fixture.h"
 #include "HttpServer.h"
@@ -16,15 +17,6 @@ namespace {
 using namespace cimom;
 using namespace std::chrono_literals;
 using Texts = std::vector<std::string>;
-
-template <class F>
-bool within(std::chrono::milliseconds time, F happened) {
-    const auto until = std::chrono::steady_clock::now() + time;
-    while (!happened() && std::chrono::steady_clock::now() < until) {
-        std::this_thread::sleep_for(10ms);
-    }
-    return happened();
-}
 
 struct Answer {
     unsigned status = 200;

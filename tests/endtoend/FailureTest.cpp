@@ -12,10 +12,10 @@ namespace {
 
 namespace fs = std::filesystem;
 using testing_support::contents;
+using testing_support::DemoAppliance;
 using testing_support::lines;
 using testing_support::Outcome;
 using testing_support::ScopedEnvironment;
-using testing_support::TestAppliance;
 
 struct Status {
     int code;
@@ -195,8 +195,6 @@ Texts general(const Texts& text) {
 
 class FailureTest : public BothBrokers {
 protected:
-    void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
-
     Outcome cimom(const std::string& arguments) {
         return m_appliance.run(
             m_before + "cimom --broker " + brokerName({GetParam(), 0}) + " --registration '" +
@@ -229,7 +227,7 @@ protected:
         }
     }
 
-    TestAppliance m_appliance{ZEM_PROGRAMS};
+    DemoAppliance m_appliance{ZEM_PROGRAMS};
     ScopedEnvironment m_schema{"CIMOM_SCHEMA", ZEM_FAILING ".mof"};
     ScopedEnvironment m_locale{"LC_ALL", ""};
     std::string m_before;  ///< environment of cimom alone

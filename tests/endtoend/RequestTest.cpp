@@ -6,9 +6,9 @@
 
 namespace {
 
+using testing_support::DemoAppliance;
 using testing_support::Outcome;
 using testing_support::ScopedEnvironment;
-using testing_support::TestAppliance;
 
 const std::string kHost =
     R"('ORXC_CEC_CS.CreationClassName="ORXC_CEC_CS",Name="1111-AAA*0000001"')";
@@ -26,8 +26,6 @@ struct Row {
 
 class RequestTest : public ::testing::Test {
 protected:
-    void SetUp() override { ASSERT_EQ(m_appliance.run("appliance init").exit, 0); }
-
     void expectRows(const std::string& broker, const std::vector<Row>& rows) {
         for (const Row& row : rows) {
             const Outcome got = m_appliance.run("cimom --broker " + broker + " " + row.arguments);
@@ -36,7 +34,7 @@ protected:
             EXPECT_EQ(got.err, row.exit == 0 ? "" : row.answer) << row.arguments;
         }
     }
-    TestAppliance m_appliance{ZEM_PROGRAMS};
+    DemoAppliance m_appliance{ZEM_PROGRAMS};
     ScopedEnvironment m_registration{"CIMOM_REGISTRATION", ZEM_REGISTRATION};
     ScopedEnvironment m_schema{"CIMOM_SCHEMA", ZEM_SCHEMA};
 };

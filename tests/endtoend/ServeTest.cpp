@@ -4,17 +4,19 @@
 
 #include <csignal>
 #include <mutex>
-#include <thread>
 
+#include "../utilities/OnThreads.h"
 #include "HttpServer.h"
 #include "TestAppliance.h"
 
 namespace {
 
+using namespace std::chrono_literals;
+
 using testing_support::contents;
+using testing_support::DemoAppliance;
 using testing_support::Outcome;
 using testing_support::ScopedEnvironment;
-using testing_support::TestAppliance;
 
 struct Row {
     std::string arguments;  ///< of wbemcli; $U is where the classes are
@@ -25,7 +27,6 @@ struct Row {
 class ServeTest : public ::testing::Test {
 protected:
     void SetUp() override {
-        ASSERT_EQ(m_appliance.run("appliance init").exit, 0);
         ASSERT_EQ(m_appliance.run("command -v wbemcli").exit, 0) << "needs sblim-wbemcli";
     }
     ~ServeTest() override { stop(); }
@@ -36,9 +37,7 @@ protected:
         m_appliance.run("cd " + m_appliance.folder().string() +
                         "; rm -f log status; (cimom serve --log --port 0 " + options +
                         " >log 2>fault & echo $! >pid; wait $!; echo $? >status) &");
-        for (int i = 0; i < 500 && contents(file("log")).find('\n') == std::string::npos; ++i) {
-            std::this_thread::sleep_for(std::chrono::milliseconds(20));
-        }
+        within(10s, [&] { return contents(file("log")).find('\n') != std::string::npos; });
         const std::string log = contents(file("log"));
         const std::size_t scheme = log.find("http"), host = log.find("127.0.0.1");
         ASSERT_NE(host, std::string::npos) << contents(file("fault"));
@@ -52,9 +51,7 @@ protected:
             return contents(file("status"));
         }
         kill(std::stoi(pid), SIGTERM);
-        for (int i = 0; i < 500 && contents(file("status")).empty(); ++i) {
-            std::this_thread::sleep_for(std::chrono::milliseconds(20));
-        }
+        within(10s, [&] { return !contents(file("status")).empty(); });
         return contents(file("status"));
     }
     std::string client(const std::string& arguments) {
@@ -72,7 +69,7 @@ protected:
         }
     }
 
-    TestAppliance m_appliance{ZEM_PROGRAMS};
+    DemoAppliance m_appliance{ZEM_PROGRAMS};
     ScopedEnvironment m_registration{"CIMOM_REGISTRATION", ZEM_REGISTRATION};
     ScopedEnvironment m_schema{"CIMOM_SCHEMA", ZEM_SCHEMA};
     std::string m_url;
@@ -148,14 +145,10 @@ TEST_F(ServeTest, ASubscriptionOfAStockClientOutlastsARestart) {
     });
     const auto arrives = [&](const std::string& change, const std::string& part) {
         EXPECT_EQ(m_appliance.run(change + " -m '1111-AAA*0000001'").exit, 0);
-        for (int i = 0; i < 500; ++i) {
-            std::this_thread::sleep_for(std::chrono::milliseconds(20));
+        return within(10s, [&] {
             const std::lock_guard<std::mutex> lock(mutex);
-            if (taken.find(part) != std::string::npos) {
-                return true;
-            }
-        }
-        return false;
+            return taken.find(part) != std::string::npos;
+        });
     };
     const auto named = [](const std::string& className, const std::string& quote) {
         std::string keys;

@@ -5,10 +5,12 @@
 #include <map>
 
 #include "JavaProcess.h"
-#include "PathText.h"
+#include "OnThreads.h"
 #include "ServedProviders.h"
 
 namespace {
+
+using namespace std::chrono_literals;
 
 /// A line of the values there are, by name.
 std::string told(const cimom::NamedValues& values) {
@@ -24,14 +26,6 @@ std::string told(const cimom::NamedValues& values) {
         line += (line.empty() ? "" : " ") + name + "=" + text;
     }
     return "[" + line + "]";
-}
-
-/// Within two minutes.
-bool comesTrue(const std::function<bool()>& condition) {
-    for (int i = 0; i < 12000 && !condition(); ++i) {
-        usleep(10000);
-    }
-    return condition();
 }
 
 class EventProvidersTest : public testing_support::ServedProviders {
@@ -121,7 +115,7 @@ TEST_P(EventProvidersTest, EachClassTellsWhatIsItsOwn) {
             // The last one has ended it: nobody reads the journal any more.
             ASSERT_EQ(followers().size(), ++all);
             const int reader = std::stoi(followers().back());
-            EXPECT_TRUE(comesTrue([&] { return kill(reader, 0) != 0; }));
+            EXPECT_TRUE(within(2min, [&] { return kill(reader, 0) != 0; }));
         }
     });
 }
@@ -158,7 +152,7 @@ TEST_P(EventProvidersTest, WhoIsSlowOrGoneHoldsUpHisOwnClassAlone) {
         const std::string resources =
             changed("lpar", R"("host":"H","lpar":1)", "curr_mem", "1", "2");
         appendToJournal({resources, resources});
-        EXPECT_TRUE(comesTrue([&] { return gone == 2; }));
+        EXPECT_TRUE(within(2min, [&] { return gone == 2; }));
         unsubscribe(failing);
         leaving = subscribe("ORXC_PartitionResourceChange", [&](const auto&) {
             unsubscribe(leaving);
@@ -168,7 +162,7 @@ TEST_P(EventProvidersTest, WhoIsSlowOrGoneHoldsUpHisOwnClassAlone) {
         EXPECT_EQ(heard(1).size(), 1U);
         EXPECT_EQ(count, 0);
         isHeldUp = false;
-        EXPECT_TRUE(comesTrue([&] { return count == kAll; }));
+        EXPECT_TRUE(within(2min, [&] { return count == kAll; }));
     });
 }
 

@@ -2,7 +2,6 @@
 // do, and what is left when one of those who take part is killed or leaves.
 #include <pty.h>
 
-#include "PathText.h"
 #include "ServedProviders.h"
 
 namespace {

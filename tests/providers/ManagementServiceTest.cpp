@@ -3,24 +3,19 @@
 #include <random>
 #include <thread>
 
-#include "PathText.h"
 #include "ServedProviders.h"
 
 namespace {
 
 using namespace cimom;
 using testing_support::ServedProviders;
+using testing_support::textOf;
 using Texts = std::vector<std::string>;
 
 constexpr char kService[] =
     R"(root/cimv2:ORXC_VirtualSystemManagementService.SystemCreationClassName="ORXC_CEC_CS",)"
     R"(SystemName="1111-AAA*0000001",CreationClassName="ORXC_VirtualSystemManagementService",)"
     R"(Name="VirtualSystemManagement")";
-
-std::string textOf(const NamedValues& values, const std::string& name) {
-    const Value* value = values.find(name);
-    return value == nullptr || value->isNull() ? "" : plainText(*value);
-}
 
 /// Settings as a client writes them: a semicolon behind each property.
 struct Written {

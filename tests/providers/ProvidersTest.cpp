@@ -16,6 +16,7 @@ using namespace cimom;
 using testing_support::lines;
 using testing_support::ScopedEnvironment;
 using testing_support::ServedProviders;
+using testing_support::textOf;
 
 constexpr const char* kHostClass = "ORXC_CEC_CS";
 constexpr const char* kPartitionClass = "ORXC_LPAR_CS";
@@ -24,19 +25,11 @@ ObjectPath system(const char* className, const std::string& name) {
     return {"root/cimv2", className, {{"CreationClassName", className}, {"Name", name}}};
 }
 
-std::string textOf(const Instance& instance, const char* property) {
-    const Value* value = instance.properties.find(property);
-    if (value == nullptr || value->isNull()) {
-        return "";
-    }
-    return value->type() == CMPI_string ? value->text() : std::to_string(value->uint());
-}
-
 /// The values of properties, with blanks between their names, as a record of the tool.
 std::string textOf(const Instance& instance, const char* properties, char separator) {
     std::string record, property;
     for (std::istringstream names(properties); names >> property;) {
-        std::string value = textOf(instance, property.c_str());
+        std::string value = textOf(instance, property);
         if (value.find_first_of(",\"") != std::string::npos) {
             value = '"' + std::regex_replace(value, std::regex("\""), "\"\"") + '"';
         }

@@ -6,7 +6,6 @@
 #include <regex>
 
 #include "LibrarySpy.h"
-#include "PathText.h"
 #include "ServedProviders.h"
 #include "ToolRecords.h"
 
@@ -15,6 +14,7 @@ namespace {
 using namespace cimom;
 using testing_support::lines;
 using testing_support::ServedProviders;
+using testing_support::textOf;
 
 constexpr char kSystem[] = "ORXC_VirtualSystemSettingData";
 constexpr const char* kClasses[] = {kSystem,
@@ -40,13 +40,6 @@ const std::vector<std::string> kPoolClasses = [] {
 
 ObjectPath settings(const std::string& className, const std::string& id) {
     return {"root/cimv2", className, {{"InstanceID", id}}};
-}
-
-/// The value without quotes, lists as "{1,2}"; empty when there is none.
-std::string textOf(const Instance& instance, const std::string& property) {
-    const Value* value = instance.properties.find(property);
-    const std::string text = value == nullptr || value->isNull() ? "" : plainText(*value);
-    return text[0] == '{' ? std::regex_replace(text, std::regex(" "), "") : text;
 }
 
 /// What a property shows of a tool's value, which is a number where it is scaled.
@@ -186,7 +179,9 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
                     expected = shown(value->second,
                                      star == property.npos ? "" : property.substr(star + 1));
                 }
-                EXPECT_EQ(textOf(found[i], property.substr(0, end)), expected)
+                const std::string text = textOf(found[i], property.substr(0, end));
+                EXPECT_EQ(text[0] == '{' ? std::regex_replace(text, std::regex(" "), "") : text,
+                          expected)
                     << row.className << ' ' << row.front << ' ' << property;
             }
         }

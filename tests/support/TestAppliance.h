@@ -3,15 +3,17 @@
 /// the environment.
 #pragma once
 
+#include <gtest/gtest.h>
 #include <sys/wait.h>
 
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <sstream>
-#include <stdexcept>
 #include <string>
 #include <vector>
+
+#include "../cimom/Folder.h"
 
 namespace testing_support {
 
@@ -68,13 +70,11 @@ class TestAppliance {
 public:
     /// @param programs  folder with the built programs
     explicit TestAppliance(const std::string& programs)
-        : m_folder(makeFolder()),
-          m_home("APPLIANCE_HOME", (m_folder / "appliance").string()),
+        : m_home("APPLIANCE_HOME", (m_folder / "appliance").string()),
           m_path("PATH", (m_folder / "bin").string() + ":" + programs + ":" + std::getenv("PATH")) {
         fs::create_directory(m_folder / "bin");
         fs::permissions(m_folder, fs::perms(0755));  // tools run as other users too
     }
-    ~TestAppliance() { fs::remove_all(m_folder); }
 
     const fs::path& folder() const { return m_folder; }
 
@@ -100,17 +100,18 @@ public:
     }
 
 private:
-    static fs::path makeFolder() {
-        std::string name = (fs::temp_directory_path() / "zemtest.XXXXXX").string();
-        if (mkdtemp(name.data()) == nullptr) {
-            throw std::runtime_error("no temporary folder");
-        }
-        return name;
-    }
-
-    fs::path m_folder;
+    const fixture::Folder m_temporary;
+    const fs::path m_folder = m_temporary.path();
     ScopedEnvironment m_home;
     ScopedEnvironment m_path;
+};
+
+/// The demo's appliance.
+class DemoAppliance : public TestAppliance {
+public:
+    explicit DemoAppliance(const std::string& programs) : TestAppliance(programs) {
+        EXPECT_EQ(run("appliance init").exit, 0);
+    }
 };
 
 }  // namespace testing_support

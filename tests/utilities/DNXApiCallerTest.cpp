@@ -23,9 +23,8 @@ const TimingTrace timing("zemapitrace");
 
 class DNXApiCallerTest : public testing::Test {
 protected:
-    DNXApiCallerTest() { EXPECT_EQ(0, m_appliance.run("appliance init").exit); }
     ~DNXApiCallerTest() override { EXPECT_EQ(0, librarySpy.held); }
-    testing_support::TestAppliance m_appliance{ZEM_PROGRAMS};
+    testing_support::DemoAppliance m_appliance{ZEM_PROGRAMS};
 };
 
 TEST_F(DNXApiCallerTest, WrappersCallTheirOperationTimed) {

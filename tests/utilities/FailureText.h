@@ -1,7 +1,8 @@
-/// What an operation throws, as one text to hold against what is expected.
+/// What an operation throws, and what it gives, as one text to hold against what is expected.
 #pragma once
 
 #include <functional>
+#include <sstream>
 #include <string>
 
 #include "Exception.h"
@@ -33,4 +34,23 @@ inline std::string failureText(const std::function<void()>& operation,
         return fieldsOf(e, letters);
     }
     return "";
+}
+
+/// All @p values, "|" behind each.
+template <class... Values>
+std::string joined(const Values&... values) {
+    std::ostringstream text;
+    ((text << values << '|'), ...);
+    return text.str();
+}
+
+/// "<number> <word>;" of each number around those in use whose word is not @p other.
+template <class WordOf>
+std::string wordsOf(WordOf wordOf, const std::string& other) {
+    std::string words;
+    for (int number = -2; number <= 256; ++number) {
+        const std::string word(wordOf(number));
+        words += word == other ? "" : std::to_string(number) + ' ' + word + ';';
+    }
+    return words;
 }

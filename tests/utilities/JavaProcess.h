@@ -18,6 +18,7 @@
 #include "Store.h"
 #include "WrtEventHelper.h"
 
+using testing_support::DemoAppliance;
 using Environment = std::map<std::string, std::string>;
 
 inline std::string jar(const std::string& name) { return ZEM_LIBRARIES "/" + name + ".jar"; }
@@ -158,9 +159,4 @@ public:
 private:
     zemWrtEventManager& m_manager = zemWrtEventManager::getWrtEventManager();
     zemJvmHelperRef m_java;
-};
-
-class DemoAppliance : public testing_support::TestAppliance {
-public:
-    DemoAppliance() : TestAppliance(ZEM_PROGRAMS) { EXPECT_EQ(run("appliance init").exit, 0); }
 };

@@ -14,10 +14,8 @@ namespace {
 int vms(int expected) {
     JavaVM* first = nullptr;
     jsize count = 0;
-    for (int i = 0; i < 200 && JNI_GetCreatedJavaVMs(&first, 1, &count) == 0 && count > expected;
-         ++i) {
-        usleep(10000);
-    }
+    within(std::chrono::seconds(2),
+           [&] { return JNI_GetCreatedJavaVMs(&first, 1, &count) != 0 || count <= expected; });
     return count;
 }
 

@@ -4,6 +4,7 @@
 
 #include "JavaProcess.h"
 #include "MigrationEventJniHelper.h"
+#include "OnThreads.h"
 
 namespace {
 
@@ -27,7 +28,7 @@ void leaving(const zemMigrationEvent&) {
 
 TEST(MigrationEventJniHelperTest, ListenersHearInOrder) {
     using Lines = std::vector<std::string>;
-    DemoAppliance appliance;
+    DemoAppliance appliance(ZEM_PROGRAMS);
     appliance.run("domove -o s -m alpha --id 7");
     appliance.run("edpower -r lpar --id 1 -o on -f normal -m 'beta lab'");
     inProcess([&] {
@@ -65,10 +66,7 @@ TEST(MigrationEventJniHelperTest, ListenersHearInOrder) {
         ASSERT_EQ(lines.size(), 12U);
         EXPECT_EQ(lines[0], "0/traveller/2147483648/2147483648/0/0/Migration Starting/0");
         EXPECT_EQ(lines[11], "0/traveller/2147483648/0/2147483648/2147483648/Migration Complete/0");
-        for (int i = 0; i < 1000 && steps.calls < 12; ++i) {
-            usleep(1000);
-        }
-        EXPECT_EQ(steps.calls, 12);
+        EXPECT_TRUE(within(std::chrono::seconds(1), [&] { return steps.calls == 12; }));
     });
 }
 

@@ -1,6 +1,7 @@
-/// Work on several threads at once.
+/// Work on several threads at once, and waiting for what others do.
 #pragma once
 
+#include <chrono>
 #include <functional>
 #include <thread>
 #include <vector>
@@ -18,4 +19,14 @@ inline void onThreads(
     for (std::thread& thread : threads) {
         thread.join();
     }
+}
+
+/// Whether @p happened comes true within @p time.
+template <class F>
+bool within(std::chrono::milliseconds time, F happened) {
+    const auto until = std::chrono::steady_clock::now() + time;
+    while (!happened() && std::chrono::steady_clock::now() < until) {
+        std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    return happened();
 }

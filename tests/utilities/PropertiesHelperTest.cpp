@@ -69,9 +69,7 @@ struct Running {
 
 /// The process that a tool wrote to the file "pid"; throws if none does within ten seconds.
 pid_t waitForPid(const ToolFolder& tools) {
-    for (int i = 0; i < 10000 && tools.read("pid").find('\n') == std::string::npos; ++i) {
-        std::this_thread::sleep_for(1ms);
-    }
+    within(10s, [&] { return tools.read("pid").find('\n') != std::string::npos; });
     return std::stoi(tools.read("pid"));
 }
 

@@ -2,7 +2,7 @@
 
 #include <memory>
 
-#include "Joined.h"
+#include "FailureText.h"
 #include "ResourcePoolManager.h"
 
 namespace {

@@ -21,11 +21,6 @@ constexpr const char* kPools[] = {"ORXC_ProcessorPool",   "ORXC_MemoryPool",
 
 class ResourcePoolSettingDataTest : public testing::Test {
 protected:
-    void makeAppliance(const std::string& how) {
-        ASSERT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance " + how).exit);
-        setenv("PATH", (std::string(ZEM_PROGRAMS) + ":" + getenv("PATH")).c_str(), 1);
-    }
-
     /// The properties that @p show sets, as "name=value".
     template <class Show>
     std::string shown(Show show) {
@@ -77,7 +72,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatMayBeTaken) {
         {"D 21-Primordial", "Adapter", {" VirtualQuantity=1", "", " VirtualQuantity=1 VirtualMinimum=1 VirtualMaximum=1", " VirtualQuantity=1"}},
     };
     // clang-format on
-    makeAppliance("init");
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     Hosts hosts;
     zemCEC& host = *hosts.visitor->getData(0);
     for (const int mode : {kFull, 50}) {
@@ -164,7 +159,7 @@ TEST_F(ResourcePoolSettingDataTest, WhatPartitionsHave) {
     constexpr int kKinds = VISITOR_TYPE_RASD_PROC | VISITOR_TYPE_RASD_MEM |
                            VISITOR_TYPE_RASD_IOSLOT | VISITOR_TYPE_RASD_VSCSI |
                            VISITOR_TYPE_RASD_VSERIAL | VISITOR_TYPE_RASD_VETH;
-    makeAppliance("init");
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     Hosts hosts;
     for (const auto& [i, j] : {std::pair(0, 1), {0, 2}, {0, 3}, {0, 4}, {0, 5}, {1, 0}, {1, 3}}) {
         zemCEC& host = *hosts.visitor->getData(i);
@@ -243,7 +238,7 @@ std::string settingsOf(const zemResourcePool& pool, CMPIUint64 quantity, CMPIUin
 TEST_F(ResourcePoolSettingDataTest, TheToolsGiveTheLargestAndNoMore) {
     int count = 0;
     for (const char* how : {"init", "generate --force --hosts 2 --lpars 8 --seed 7"}) {
-        makeAppliance(how);
+        m_tools.makeAppliance(ZEM_PROGRAMS, how);
         const std::string restore =
             "cp " + m_tools.file("before") + " $APPLIANCE_HOME/appliance.db";
         m_tools.run(

@@ -9,9 +9,7 @@
 #include "EdplatCmdCaller.h"
 #include "EdpowerCaller.h"
 #include "EdsuspCaller.h"
-#include "Joined.h"
 #include "LibraryFaults.h"
-#include "LibraryRecords.h"
 #include "LibrarySpy.h"
 #include "NwplatCmdCaller.h"
 #include "QyplatCmdCaller.h"
@@ -30,9 +28,6 @@ class SystemConfigTest : public testing::Test {
 protected:
     SystemConfigTest() { makeObjects("", ""); }
     ~SystemConfigTest() override { EXPECT_EQ(0, librarySpy.held); }
-    void makeAppliance() {
-        ASSERT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance init").exit);
-    }
     /// Objects of which only the keys are known.
     void makeObjects(const char* user, const char* locale) {
         m_host = zemHostSystem(kHost, user, locale);
@@ -106,7 +101,7 @@ TEST_F(SystemConfigTest, ProductData) {
 }
 
 TEST_F(SystemConfigTest, ReadsWhatTheLibraryGives) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const zemDynamicArray<zemHostSystem> hosts = zemManagerSystem::getAllHostSystem("");
     ASSERT_EQ(4, hosts.size());
     EXPECT_STREQ("delta, spare", hosts.getElementAt(3)->getSystemName());
@@ -135,7 +130,7 @@ TEST_F(SystemConfigTest, ReadsWhatTheLibraryGives) {
 }
 
 TEST_F(SystemConfigTest, AnswersOfTheLibraryBecomeFailures) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     makeObjects("u", "");
     // The call, the id if it gives nothing, who fails, the key if one object is read.
     using Row =
@@ -253,25 +248,12 @@ TEST_F(SystemConfigTest, ParsesProfiles) {
 }
 
 TEST_F(SystemConfigTest, NumbersHaveWords) {
-    const auto all = [](zemString (*wordOf)(int), const std::string& other) {
-        std::string words;
-        for (int number = -1; number <= 256; ++number) {
-            const std::string word = std::string(wordOf(number));
-            if (word != other) {
-                words += std::to_string(number) + ' ' + word + ';';
-            }
-        }
-        return words;
-    };
-    const auto migration = [](int number) {
-        return zemString(Partition::getMigrationState(number));
-    };
     // clang-format off
-    EXPECT_EQ("0 Standby;1 Operating;3 Power Off;6 Initializing;12 Error;13 Error - Dump in progress;14 Error - Terminated;15 QCAP Click to Accept;17 Standby;32 Power Off In Progress;33 Service Processor Failover In Progress;240 Failed Authentication;241 Failed Authentication;242 Pending Authentication - Password Updates Required;243 Pending Authentication - Password Updates Required;250 Version Mismatch;251 Recovery;253 Incomplete;254 No Connection;", all(zemHostSystem::getStateByID, ""));
-    EXPECT_EQ("0 Not Activated;1 Starting;2 Running;3 Shutting Down;4 Error;8 Open Firmware;9 Suspended;252 Not Available;255 unknown;", all(Partition::getStateByID, ""));
-    EXPECT_EQ("1 norm;2 ds;3 sms;4 of;5 dd;", all(Partition::getBootModeByID, "unknown"));
-    EXPECT_EQ("0 norm;1 manual;", all(Partition::getKeyLockByID, ""));
-    EXPECT_EQ("9 1;10 2;12 3;13 4;14 4;15 4;16 6;255 5;", all(migration, "0"));
+    EXPECT_EQ("0 Standby;1 Operating;3 Power Off;6 Initializing;12 Error;13 Error - Dump in progress;14 Error - Terminated;15 QCAP Click to Accept;17 Standby;32 Power Off In Progress;33 Service Processor Failover In Progress;240 Failed Authentication;241 Failed Authentication;242 Pending Authentication - Password Updates Required;243 Pending Authentication - Password Updates Required;250 Version Mismatch;251 Recovery;253 Incomplete;254 No Connection;", wordsOf(zemHostSystem::getStateByID, ""));
+    EXPECT_EQ("0 Not Activated;1 Starting;2 Running;3 Shutting Down;4 Error;8 Open Firmware;9 Suspended;252 Not Available;255 unknown;", wordsOf(Partition::getStateByID, ""));
+    EXPECT_EQ("1 norm;2 ds;3 sms;4 of;5 dd;", wordsOf(Partition::getBootModeByID, "unknown"));
+    EXPECT_EQ("0 norm;1 manual;", wordsOf(Partition::getKeyLockByID, ""));
+    EXPECT_EQ("9 1;10 2;12 3;13 4;14 4;15 4;16 6;255 5;", wordsOf([](int number) { return std::to_string(Partition::getMigrationState(number)); }, "0"));
     const std::pair<const char*, int> texts[] = {
         {"not migrating", 1}, {"Migration Starting", 2}, {"MIGRATION STOPPED", 3}, {"Migration In Progress", 4},
         {"to x: LOST connection (1)", 5}, {"Migration Complete", 6}, {"Lost", 0}, {"Migration Complete.", 0},
@@ -285,7 +267,7 @@ TEST_F(SystemConfigTest, NumbersHaveWords) {
 // What the appliance has as a word reaches objects as a number that stands for the same word.
 TEST_F(SystemConfigTest, WordsSurviveTheLibrary) {
     using appliance::Kind;
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const auto check = [this](Kind kind, const char* attribute, const zemString& word, auto read) {
         if (word.isEmpty() || word == "unknown") {
             return;
@@ -428,8 +410,7 @@ TEST_F(SystemConfigTest, NamesStayWholeInEveryLine) {
 }
 
 TEST_F(SystemConfigTest, FindsAnyName) {
-    makeAppliance();
-    const testing_support::ScopedEnvironment path("PATH", ZEM_PROGRAMS ":/usr/bin:/bin");
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const char* const names[] = {"東京, \"本番\"", "small, \"safe\"",
                                  "\"all\"",        "\"a\", b",
                                  "a\" -m \"b",     "back\\",

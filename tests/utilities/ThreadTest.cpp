@@ -11,15 +11,8 @@
 
 namespace {
 
+using namespace std::chrono_literals;
 using Clock = std::chrono::steady_clock;
-using std::chrono::milliseconds;
-
-bool eventually(const std::function<bool()>& holds) {
-    for (int i = 0; i < 20000 && !holds(); ++i) {
-        usleep(1000);
-    }
-    return holds();
-}
 
 TEST(ThreadSynchronizerTest, IsRecursiveAndKeepsOthersOut) {
     zemSynchronizerContext context;
@@ -47,8 +40,8 @@ TEST(ThreadConditionTest, TimedWaitCrossesASecond) {
     const auto start = Clock::now();
     condition.timedWait(400);
     condition.timedWait(-5);
-    EXPECT_GE(Clock::now() - start, milliseconds(390));
-    EXPECT_LT(Clock::now() - start, milliseconds(5000));
+    EXPECT_GE(Clock::now() - start, 390ms);
+    EXPECT_LT(Clock::now() - start, 5s);
 }
 
 TEST(ThreadConditionTest, SignalWakesAllWaiters) {
@@ -61,7 +54,7 @@ TEST(ThreadConditionTest, SignalWakesAllWaiters) {
     onThreads(4, wait, [&] {
         usleep(100000);
         condition.signal();
-        EXPECT_TRUE(eventually([&] { return awake > 1; })) << "a broadcast";
+        EXPECT_TRUE(within(20s, [&] { return awake > 1; })) << "a broadcast";
         while (awake < 4) {
             condition.signal();  // one that came late to its wait
         }
@@ -74,7 +67,7 @@ struct Gate {
     static void pass(void* gate) {
         auto* const self = static_cast<Gate*>(gate);
         self->id = zemThread::getCurrentThreadId();
-        EXPECT_TRUE(eventually([self] { return self->open.load(); }));
+        EXPECT_TRUE(within(20s, [self] { return self->open.load(); }));
     }
 };
 
@@ -86,11 +79,11 @@ TEST(ThreadTest, RunsAndCanRunAgain) {
     for (int round = 0; round < 2; ++round) {
         Gate gate;
         ASSERT_EQ(thread.start(Gate::pass, &gate), 0);
-        EXPECT_TRUE(eventually([&] { return gate.id == thread.getThreadId(); }));
+        EXPECT_TRUE(within(20s, [&] { return gate.id == thread.getThreadId(); }));
         EXPECT_TRUE(thread.isStarted());
         EXPECT_EQ(thread.start(Gate::pass, &gate), EBUSY);
         gate.open = true;
-        EXPECT_TRUE(eventually([&] { return !thread.isStarted(); }));
+        EXPECT_TRUE(within(20s, [&] { return !thread.isStarted(); }));
     }
     thread.waitThreadExit();
     EXPECT_EQ(thread.getThreadId(), 0) << "not to be joined again";
@@ -139,7 +132,7 @@ TEST(ThreadTest, EndsQuietlyHoweverTheMethodEnds) {
         {
             zemThread thread;
             ASSERT_EQ(thread.start(method, &unwound), 0);
-            EXPECT_TRUE(eventually([&] { return thread.isStarted() == (method == methods[2]); }));
+            EXPECT_TRUE(within(20s, [&] { return thread.isStarted() == (method == methods[2]); }));
             EXPECT_EQ(thread.cancel(), 0);
             EXPECT_FALSE(thread.isStarted());
         }

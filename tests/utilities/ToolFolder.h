@@ -24,6 +24,12 @@ public:
         setenv("PATH", (file("bin") + ":/usr/bin:/bin").c_str(), 1);
     }
 
+    /// Makes the demo's appliance, or another, whose tools come behind the scripts.
+    void makeAppliance(const std::string& programs, const std::string& how = "init") {
+        EXPECT_EQ(0, run(programs + "/appliance " + how).exit);
+        setenv("PATH", (file("bin") + ':' + programs + ":/usr/bin:/bin").c_str(), 1);
+    }
+
     /// Makes a shell script, to which $here is the folder of file().
     void script(const std::string& name, const std::string& body) {
         replaceTool(name, "here=" + folder().string() + '\n' + body);

@@ -13,6 +13,7 @@
 
 namespace {
 
+using namespace std::chrono_literals;
 namespace fs = std::filesystem;
 using testing_support::contents;
 using testing_support::lines;
@@ -48,10 +49,8 @@ protected:
     }
 
     bool waitForLines(std::size_t count) const {
-        for (int i = 0; i < 1000 && lines(contents(m_trace)).size() < count; ++i) {
-            usleep(50000);
-        }
-        return lines(contents(m_trace)).size() == count;
+        return within(50s, [&] { return lines(contents(m_trace)).size() >= count; }) &&
+               lines(contents(m_trace)).size() == count;
     }
 
     const std::string m_trace = testing::TempDir() + "timing" + std::to_string(getpid());
@@ -81,7 +80,7 @@ TEST_F(TraceToolTest, SaysWhereTheDefaultFileIsAndEndsWithoutWaitingForThePoll) 
         EXPECT_EQ(run("", nullptr, CTimeLogerManager::getInstance),
                   "env not set for VM_CIMPROVIDER_TRACE_PATH\npath:/tmp/CIMTestPerfData.txt\n");
     }
-    EXPECT_LT(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(2400));
+    EXPECT_LT(std::chrono::steady_clock::now() - start, 2400ms);
     if (!wasThere) {
         fs::remove("/tmp/CIMTestPerfData.txt");
     }

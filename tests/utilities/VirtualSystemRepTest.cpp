@@ -3,7 +3,6 @@
 #include <tuple>
 
 #include "FailingAllocation.h"
-#include "Joined.h"
 #include "LibraryFaults.h"
 #include "LibrarySpy.h"
 #include "QyplatCmdCaller.h"
@@ -243,8 +242,7 @@ TEST(VirtualSystemRepTest, NothingStaysOfManyPartitions) {
 /// Partition 4 of the demo's first host, which has two profiles, and tools that leave their lines.
 class InitializeTest : public testing::Test {
 protected:
-    InitializeTest() : m_appliance(ZEM_PROGRAMS), m_host(kHost, "alpha") {
-        EXPECT_EQ(0, m_appliance.run("appliance init").exit);
+    InitializeTest() {
         for (const std::string tool : {"qyplat", "qyalloc"}) {
             m_appliance.replaceTool(tool, "echo " + tool + " \"$@\" >>" + lines() + "\nexec " +
                                               ZEM_PROGRAMS "/" + tool + " \"$@\"");
@@ -279,8 +277,8 @@ protected:
 
     std::string lines() const { return (m_appliance.folder() / "lines").string(); }
 
-    testing_support::TestAppliance m_appliance;
-    zemCEC m_host;
+    testing_support::DemoAppliance m_appliance{ZEM_PROGRAMS};
+    zemCEC m_host{kHost, "alpha"};
     std::string m_asked;
 };
 

@@ -50,7 +50,7 @@ std::string idsOf(zemVSSD& vssd) {
 class VirtualSystemRepVSSDTest : public testing::Test {
 protected:
     VirtualSystemRepVSSDTest() {
-        EXPECT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance init").exit);
+        m_tools.makeAppliance(ZEM_PROGRAMS);
         librarySpy.call.clear();
     }
     ~VirtualSystemRepVSSDTest() override { EXPECT_EQ(0, librarySpy.held); }
@@ -203,9 +203,9 @@ TEST_F(VirtualSystemRepVSSDTest, SettingsComeFromRecordOrProfile) {
     EXPECT_EQ(0, vssd.initialize(&m_lpar, record));
     EXPECT_EQ("n|NORMAL|sms|1|2|30|1|4|" + ofPartition + "||||", fieldsOf(vssd, names));
 
-    m_tools.run(std::string(ZEM_PROGRAMS) +
-                "/edplat -r prof -m alpha -i "
-                "name=normal,lpar_id=4,auto_start=1,conn_monitoring=1");
+    m_tools.run(
+        "edplat -r prof -m alpha -i "
+        "name=normal,lpar_id=4,auto_start=1,conn_monitoring=1");
     const zemHostSystem host(kHost, "", "");
     zemVirtualSystemProfile profile("normal", zemVirtualSystem("4", host, "", ""), "", "");
     zemVSSD ofProfile(&m_lpar, profile);

@@ -4,7 +4,6 @@
 #include <sstream>
 
 #include "FailureText.h"
-#include "Joined.h"
 #include "SystemStateText.h"
 #include "VirtualSystemResource.h"
 
@@ -100,6 +99,10 @@ TEST(VirtualSystemResourceTest, RecordsTellWhoseTheyAre) {
     EXPECT_EQ("|T|", joined(Slot("*T").getLparID(), Slot("*T").getMTMS()));
     EXPECT_STREQ("4*T*S", Profile("T*S", "4").getLparIDAndMTMS());
     EXPECT_STREQ("T*S", zemMemoryPoolResource("T*S").getMTMS());
+    Profile unread("T*S", "4");
+    unread.setDefaultValue();
+    EXPECT_EQ("4*T*S|zemNULL|zemNULL|",
+              joined(unread.getLparIDAndMTMS(), unread.getProfileName(), unread.getIoSlots()));
     for (void (*make)() : {+[] { Profile("3"); }, +[] { Serial(""); }}) {
         EXPECT_EQ(
             "3////DNX API property \"Name\" with wrong format, it should be the format : "
@@ -108,45 +111,19 @@ TEST(VirtualSystemResourceTest, RecordsTellWhoseTheyAre) {
     }
 }
 
-TEST(VirtualSystemResourceTest, DefaultsOfProfiles) {
-    const zemString& (Profile::*const getters[])() const = {
-        // clang-format off
-        &Profile::getProfileName, &Profile::getLparName, &Profile::getLparEnv, &Profile::getLoadSourceSlot, &Profile::getAltRestartDeviceSlot, &Profile::getConsoleSlot, &Profile::getAltConsoleSlot,
-        &Profile::getOpConsoleSlot, &Profile::getAutoStart, &Profile::getConnMonitoring, &Profile::getDesiredIoEntitledMem, &Profile::getMemWeight, &Profile::getRedundantErrPathReporting,
-        &Profile::getUncapWeight, &Profile::getBootMode, &Profile::getMaxVirtualSlots, &Profile::getProcMode, &Profile::getSharingMode, &Profile::getMinProcs, &Profile::getDesiredProcs,
-        &Profile::getMaxProcs, &Profile::getMinProcsUnits, &Profile::getDesiredProcsUnits, &Profile::getMaxProcsUnits, &Profile::getSharedProcPoolID, &Profile::getLparProcCompatMode, &Profile::getMemMode,
-        &Profile::getMinMem, &Profile::getDesiredMem, &Profile::getMaxMem, &Profile::getVirtualSerialAdapters, &Profile::getVirtualScsiAdapters, &Profile::getVirtualEthAdapters, &Profile::getIoSlots,
-        // clang-format on
-    };
-    Profile profile("T*S", "4");
-    profile.setDefaultValue();
-    for (const auto& getter : getters) {
-        EXPECT_STREQ("zemNULL", (profile.*getter)()) << &getter - getters;
-    }
-    EXPECT_STREQ("4*T*S", profile.getLparIDAndMTMS());
-}
-
 TEST(VirtualSystemResourceTest, NumbersHaveWords) {
-    const auto all = [](const std::function<std::string(int)>& wordOf, const std::string& other) {
-        std::string words;
-        for (int number = -2; number <= 256; ++number) {
-            const std::string word = wordOf(number);
-            words += word == other ? "" : std::to_string(number) + ' ' + word + ';';
-        }
-        return words;
-    };
     // clang-format off
-    EXPECT_EQ("0 CORAL5;1 CORAL6_enhanced;2 CORAL6;3 CORAL6+;4 CORAL7;5 CORAL6+_enhanced;6 CORAL7_enhanced;7 CORAL7+;8 CORAL7+_enhanced;9 CORAL8;10 CORAL8_enhanced;63 default;", all(zemCompatModeText, "unknown"));
-    EXPECT_EQ("0 C5;1 C6 enhanced;2 C6;3 C6+;4 C7;5 C6+ enhanced;6 C7 enhanced;7 C7+;8 C7+ enhanced;9 C8;10 C8 enhanced;63 Default;", all(zemCompatModeShown, "unknown"));
-    EXPECT_EQ("0 Not Activated;1 Starting;2 Running;3 Shutting Down;4 Error;8 Open Firmware;9 Suspended;", all(zemPartitionStateShown, "unknown"));
-    EXPECT_EQ("1 tmxlinux;2 tmxlinux;3 xbrgserver;4 xbrgserver;129 osq00;130 osq00;", all(zemEnvironmentText, ""));
-    EXPECT_EQ("2 manual;4 norm;", all([](int number) { return zemKeylockWord(number, "raw"); }, "raw"));
+    EXPECT_EQ("0 CORAL5;1 CORAL6_enhanced;2 CORAL6;3 CORAL6+;4 CORAL7;5 CORAL6+_enhanced;6 CORAL7_enhanced;7 CORAL7+;8 CORAL7+_enhanced;9 CORAL8;10 CORAL8_enhanced;63 default;", wordsOf(zemCompatModeText, "unknown"));
+    EXPECT_EQ("0 C5;1 C6 enhanced;2 C6;3 C6+;4 C7;5 C6+ enhanced;6 C7 enhanced;7 C7+;8 C7+ enhanced;9 C8;10 C8 enhanced;63 Default;", wordsOf(zemCompatModeShown, "unknown"));
+    EXPECT_EQ("0 Not Activated;1 Starting;2 Running;3 Shutting Down;4 Error;8 Open Firmware;9 Suspended;", wordsOf(zemPartitionStateShown, "unknown"));
+    EXPECT_EQ("1 tmxlinux;2 tmxlinux;3 xbrgserver;4 xbrgserver;129 osq00;130 osq00;", wordsOf(zemEnvironmentText, ""));
+    EXPECT_EQ("2 manual;4 norm;", wordsOf([](int number) { return zemKeylockWord(number, "raw"); }, "raw"));
     // clang-format on
     EXPECT_STREQ("unknow", zemBootModeText(0, "unknow"));
     const auto bootMode = [](int mode) {
         return std::string(zemSystemSetting::getBootModeString(mode));
     };
-    EXPECT_EQ("0 unknown;1 norm;2 ds;3 sms;4 of;5 dd;", all(bootMode, ""));
+    EXPECT_EQ("0 unknown;1 norm;2 ds;3 sms;4 of;5 dd;", wordsOf(bootMode, ""));
     for (int mode = 0; mode <= 5; ++mode) {
         EXPECT_EQ(mode, zemSystemSetting::convertBootModeToInt(bootMode(mode).c_str()));
     }

@@ -4,10 +4,9 @@
 #include <memory>
 #include <optional>
 #include <sstream>
+#include <tuple>
 
-#include "Joined.h"
 #include "LibraryFaults.h"
-#include "LibraryRecords.h"
 #include "LibrarySpy.h"
 #include "QyplatCmdCaller.h"
 #include "ToolFolder.h"
@@ -40,9 +39,6 @@ zemDynamicArray<Record> read(const Visitor& visitor, OfHosts<Record> operation,
 class VirtualSystemVisitorTest : public testing::Test {
 protected:
     ~VirtualSystemVisitorTest() override { EXPECT_EQ(0, librarySpy.held); }
-    void makeAppliance() {
-        ASSERT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance init").exit);
-    }
 
     /// The one record that a collection gives when the library tells of one object.
     template <class Operation>
@@ -135,7 +131,7 @@ const Reader kReaders[] = {
 // clang-format on
 
 TEST_F(VirtualSystemVisitorTest, EachCollectionIsOneCall) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const std::string arguments[] = {"(u,2)", "(u,1111-AAA*0000001,2)", "(u,3*1111-AAA*0000001,2)"};
     for (const Reader& reader : kReaders) {
         int counts[3] = {};
@@ -157,7 +153,7 @@ TEST_F(VirtualSystemVisitorTest, EachCollectionIsOneCall) {
 }
 
 TEST_F(VirtualSystemVisitorTest, AnswersOfTheLibraryBecomeRecordsOrFailures) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const std::pair<std::optional<int>, const char*> codes[] = {
         {0, nullptr}, {7, nullptr}, {6, "1"}, {3, "6"}, {8, "6"}, {-2, "6"}, {{}, "6"}};
     for (const Reader& reader : kReaders) {
@@ -230,112 +226,58 @@ std::string numbered(const std::string& keys) {
     return properties;
 }
 
-TEST_F(VirtualSystemVisitorTest, PropertiesOfRecordsOfHosts) {
-    const auto processor = only(&Visitor::getAllProcessorLevelSysByKeys,
-                                "Name=T*S" + numbered("ConfigurableProcUnits,CurAvailProcUnits,"
-                                                      "InstalledProcessors,MaxProcPools,"
-                                                      "MinProcUnit,PendAvailProcUnits"));
-    EXPECT_EQ("T*S|1|2|3|4|5|6|",
-              joined(processor->getMTMS(), processor->getConfigurableSysProcUnits(),
-                     processor->getCurrAvailSysProcUnits(), processor->getInstalledSysProcUnits(),
-                     processor->getMaxSharedProcPools(), processor->getMinProcUnitsPerVirtualProc(),
-                     processor->getPendAvailSysProcUnits()));
-    const auto units = only(&Visitor::getAllProcessorLevelPoolByKeys,
-                            "Name=T*S" + numbered("ConfigurableProcUnits,PendAvailProcUnits"));
-    EXPECT_EQ("T*S|1|2|", joined(units->getMTMS(), units->getConfigurablePoolProcUnits(),
-                                 units->getPendAvailPoolProcUnits()));
-    const auto pool =
-        only(&Visitor::getAllProcessorPoolByKeys,
-             "SystemName=T*S" +
-                 numbered("SharedProcPoolId,MaxPoolCapacity,PendReservedPoolCapacity,lpar_ids"));
-    EXPECT_EQ("T*S|1|2|3|4|",
-              joined(pool->getMTMS(), pool->getSharedProcPoolId(), pool->getMaxPoolCapacity(),
-                     pool->getPendReservedPoolProcUnits(), pool->getLparIds()));
-    const auto memory = only(
-        &Visitor::getAllMemoryLevelSysByKeys,
-        "Name=T*S" + numbered("ConfigurableMem,InstalledMemory,MaxMemPools,PendAvailMem,LMBSize"));
-    EXPECT_EQ("T*S|1|2|3|4|5|", joined(memory->getMTMS(), memory->getConfigurableSysMem(),
-                                       memory->getInstalledSysMem(), memory->getMaxMemPools(),
-                                       memory->getPendAvailSysMem(), memory->getMemRegionSize()));
-    const auto shared =
-        only(&Visitor::getAllMemoryPoolByKeys,
-             "SystemName=T*S" + numbered("curr_pool_mem,pend_avail_pool_mem,pend_pool_mem"));
-    EXPECT_EQ("T*S|1|2|3|1|",
-              joined(shared->getMTMS(), shared->getCurrPoolMem(), shared->getPendAvailPoolMem(),
-                     shared->getPendPoolMem(), shared->isSupport()));
-}
-
-TEST_F(VirtualSystemVisitorTest, PropertiesOfRecordsOfPartitions) {
-    const std::string name = "Name=3*T*S";
-    const auto p =
-        only(&Visitor::getAllProcessorLevelLparByKeys,
-             name +
-                 numbered("UserDefinedName,CurMaxProcs,CurMaxProcUnits,CurMinProcs,CurMinProcUnits,"
-                          "CurAllocProcs,CurAllocProcUnits,CurUncappedWeight,PendMaxProcs,"
-                          "PendMaxProcUnits,PendMinProcs,PendMinProcUnits,PendAllocProcs,"
-                          "PendAllocProcUnits,PendUncappedWeight,RuntimeProcs,RuntimeProcUnits,"
-                          "RuntimeUncappedWeight") +
-                 ";CurProcMode=255;CurDonorMode=1;CurSharingMode=0;PendProcMode=2;PendDonorMode=0;"
-                 "PendSharingMode=1");
-    EXPECT_EQ("3*T*S|1|2|0.03|4|0.05|6|0.07|8|9|0.10|11|0.12|13|0.14|15|16|0.17|18|",
-              joined(p->getLparIDAndMTMS(), p->getLparName(), p->getCurrMaxProcs(),
-                     p->getCurrMaxProcUnits(), p->getCurrMinProcs(), p->getCurrMinProcUnits(),
-                     p->getCurrProcs(), p->getCurrProcUnits(), p->getCurrUncapWeight(),
-                     p->getPendMaxProcs(), p->getPendMaxProcUnits(), p->getPendMinProcs(),
-                     p->getPendMinProcUnits(), p->getPendProcs(), p->getPendProcUnits(),
-                     p->getPendUncapWeight(), p->getRunProcs(), p->getRunProcUnits(),
-                     p->getRunUncapWeight()));
-    EXPECT_EQ(
-        "shared||null|2|share_idle_procs_always|uncap|",  // the pending mode goes first
-        joined(p->getCurrProcMode(), p->getPendProcMode(), p->getCurrSharedProcPoolId(),
-               p->getPendSharedProcPoolId(), p->getCurrSharingMode(), p->getPendSharingMode()));
-    const auto m = only(&Visitor::getAllMemoryLevelLparByKeys,
-                        name + numbered("UserDefinedName,CurAllocMem,CurMaxMem,CurMinMem,"
-                                        "PendAllocMem,PendMaxMem,PendMinMem,RuntimeEntMem,"
-                                        "RuntimeMem,RuntimeVRMWeight,RuntimeMinMem,EntUsage,"
-                                        "CurrMemMode"));
-    EXPECT_EQ("3*T*S|1|2|3|4|5|6|7|8|9|10|11|12|shared|",
-              joined(m->getLparIDAndMTMS(), m->getLparName(), m->getCurrMem(), m->getCurrMaxMem(),
-                     m->getCurrMinMem(), m->getPendMem(), m->getPendMaxMem(), m->getPendMinMem(),
-                     m->getRunIoEntitledMem(), m->getRunMem(), m->getRunMemWeight(),
-                     m->getRunMinMem(), m->getAutoIoEntitledMem(), m->getMemMode()));
-    const auto s = only(
-        &Visitor::getAllIOSlotLevelLparByKeys,
-        "lpar_id=3;SystemName=T*S" +
-            numbered("bus_grouping,bus_id,description,drc_index,drc_name,parent_slot_drc_index,"
-                     "pci_class,pci_device_id,pci_revision_id,pci_subs_device_id,"
-                     "pci_subs_vendor_id,pci_vendor_id,slot_io_pool_id,unit_phys_loc") +
-            ";feature_codes=[5,6];iop=false");
-    EXPECT_EQ("3*T*S|1|2|3|4|5|6|7|8|9|A|B|C|13|14|5,6|0|",
-              joined(s->getLparIDAndMTMS(), s->getBusGrouping(), s->getBusId(), s->getDescription(),
-                     s->getDrcIndex(), s->getDrcName(), s->getParentSlotDrcIndex(),
-                     s->getPciClass(), s->getPciDeviceId(), s->getPciRevisionId(),
-                     s->getPciSubsDeviceId(), s->getPciSubsVendorId(), s->getPciVendorId(),
-                     s->getSlotIoPoolId(), s->getUnitPhysLoc(), s->getFeatureCodes(), s->getIop()));
+// What each reader takes from which key.
+TEST_F(VirtualSystemVisitorTest, PropertiesOfRecords) {
+#define TOLD(READ, ...)                           \
+    [&](const auto& all) {                        \
+        const auto r = only(&Visitor::READ, all); \
+        return joined(__VA_ARGS__);               \
+    }
+    const std::string host = "Name=T*S", pool = "SystemName=T*S", partition = "Name=3*T*S";
+    const std::string modes =
+        ";CurProcMode=255;CurDonorMode=1;CurSharingMode=0;PendProcMode=2;PendDonorMode=0;"
+        "PendSharingMode=1";
     const std::string adapter =
-        name + ";adapter_type=1;is_required=true" +
+        partition + ";adapter_type=1;is_required=true;connect_status=1" +
         numbered(
-            "lpar_name,remote_lpar_id,remote_lpar_name,remote_slot_num,slot_num,state,"
-            "backing_devices,supports_dnx,mac_addr,ieee_virtual_eth,port_vlan_id,"
-            "addl_vlan_ids,is_trunk,trunk_priority,vswitch") +
-        ";connect_status=1";
-    const auto l = only(&Visitor::getAllSerialAdapterLevelLparByKeys, adapter);
-    EXPECT_EQ(
-        "3*T*S|server|1|1|2|3|4|5|6|1|active|",
-        joined(l->getLparIDAndMTMS(), l->getAdapterType(), l->getIsRequired(), l->getLparName(),
-               l->getRemoteLparId(), l->getRemoteLparName(), l->getRemoteSlotNum(), l->getSlotNum(),
-               l->getState(), l->getSupportsDnx(), l->getConnectStatus()));
-    const auto b = only(&Visitor::getAllSCSIAdapterLevelLparByKeys, adapter);
-    EXPECT_EQ(
-        "3*T*S|server|1|1|2|3|4|5|6|7|",
-        joined(b->getLparIDAndMTMS(), b->getAdapterType(), b->getIsRequired(), b->getLparName(),
-               b->getRemoteLparId(), b->getRemoteLparName(), b->getRemoteSlotNum(), b->getSlotNum(),
-               b->getState(), b->getBackingDevices()));
-    const auto e = only(&Visitor::getAllEthernetAdapterLevelLparByKeys, adapter);
-    EXPECT_EQ("3*T*S|1|1|5|6|9|10|11|12|13|14|15|",
-              joined(e->getLparIDAndMTMS(), e->getIsRequired(), e->getLparName(), e->getSlotNum(),
-                     e->getState(), e->getMacAddr(), e->getIeeeVirtualEth(), e->getPortVlanID(),
-                     e->getAddlVlanIds(), e->getIsTrunk(), e->getTruukPriority(), e->getVSwitch()));
+            "lpar_name,remote_lpar_id,remote_lpar_name,remote_slot_num,slot_num,state,backing_"
+            "devices,supports_dnx,mac_addr,ieee_virtual_eth,port_vlan_id,addl_vlan_ids,is_trunk,"
+            "trunk_priority,vswitch");
+    // clang-format off
+    const std::tuple<std::string, std::string, std::function<std::string(const std::string&)>> rows[] = {
+        {host + numbered("ConfigurableProcUnits,CurAvailProcUnits,InstalledProcessors,MaxProcPools,MinProcUnit,PendAvailProcUnits"), "T*S|1|2|3|4|5|6|",
+         TOLD(getAllProcessorLevelSysByKeys, r->getMTMS(), r->getConfigurableSysProcUnits(), r->getCurrAvailSysProcUnits(), r->getInstalledSysProcUnits(), r->getMaxSharedProcPools(), r->getMinProcUnitsPerVirtualProc(), r->getPendAvailSysProcUnits())},
+        {host + numbered("ConfigurableProcUnits,PendAvailProcUnits"), "T*S|1|2|",
+         TOLD(getAllProcessorLevelPoolByKeys, r->getMTMS(), r->getConfigurablePoolProcUnits(), r->getPendAvailPoolProcUnits())},
+        {pool + numbered("SharedProcPoolId,MaxPoolCapacity,PendReservedPoolCapacity,lpar_ids"), "T*S|1|2|3|4|",
+         TOLD(getAllProcessorPoolByKeys, r->getMTMS(), r->getSharedProcPoolId(), r->getMaxPoolCapacity(), r->getPendReservedPoolProcUnits(), r->getLparIds())},
+        {host + numbered("ConfigurableMem,InstalledMemory,MaxMemPools,PendAvailMem,LMBSize"), "T*S|1|2|3|4|5|",
+         TOLD(getAllMemoryLevelSysByKeys, r->getMTMS(), r->getConfigurableSysMem(), r->getInstalledSysMem(), r->getMaxMemPools(), r->getPendAvailSysMem(), r->getMemRegionSize())},
+        {pool + numbered("curr_pool_mem,pend_avail_pool_mem,pend_pool_mem"), "T*S|1|2|3|1|",
+         TOLD(getAllMemoryPoolByKeys, r->getMTMS(), r->getCurrPoolMem(), r->getPendAvailPoolMem(), r->getPendPoolMem(), r->isSupport())},
+        {partition + modes + numbered("UserDefinedName,CurMaxProcs,CurMaxProcUnits,CurMinProcs,CurMinProcUnits,CurAllocProcs,CurAllocProcUnits,CurUncappedWeight,PendMaxProcs,PendMaxProcUnits,PendMinProcs,PendMinProcUnits,PendAllocProcs,PendAllocProcUnits,PendUncappedWeight,RuntimeProcs,RuntimeProcUnits,RuntimeUncappedWeight"),
+         "3*T*S|1|2|0.03|4|0.05|6|0.07|8|9|0.10|11|0.12|13|0.14|15|16|0.17|18|",
+         TOLD(getAllProcessorLevelLparByKeys, r->getLparIDAndMTMS(), r->getLparName(), r->getCurrMaxProcs(), r->getCurrMaxProcUnits(), r->getCurrMinProcs(), r->getCurrMinProcUnits(), r->getCurrProcs(), r->getCurrProcUnits(), r->getCurrUncapWeight(), r->getPendMaxProcs(), r->getPendMaxProcUnits(), r->getPendMinProcs(),
+              r->getPendMinProcUnits(), r->getPendProcs(), r->getPendProcUnits(), r->getPendUncapWeight(), r->getRunProcs(), r->getRunProcUnits(), r->getRunUncapWeight())},
+        {partition + modes, "shared||null|2|share_idle_procs_always|uncap|",  // the pending mode goes first
+         TOLD(getAllProcessorLevelLparByKeys, r->getCurrProcMode(), r->getPendProcMode(), r->getCurrSharedProcPoolId(), r->getPendSharedProcPoolId(), r->getCurrSharingMode(), r->getPendSharingMode())},
+        {partition + numbered("UserDefinedName,CurAllocMem,CurMaxMem,CurMinMem,PendAllocMem,PendMaxMem,PendMinMem,RuntimeEntMem,RuntimeMem,RuntimeVRMWeight,RuntimeMinMem,EntUsage,CurrMemMode"), "3*T*S|1|2|3|4|5|6|7|8|9|10|11|12|shared|",
+         TOLD(getAllMemoryLevelLparByKeys, r->getLparIDAndMTMS(), r->getLparName(), r->getCurrMem(), r->getCurrMaxMem(), r->getCurrMinMem(), r->getPendMem(), r->getPendMaxMem(), r->getPendMinMem(), r->getRunIoEntitledMem(), r->getRunMem(), r->getRunMemWeight(), r->getRunMinMem(), r->getAutoIoEntitledMem(), r->getMemMode())},
+        {pool + ";lpar_id=3;feature_codes=[5,6];iop=false" + numbered("bus_grouping,bus_id,description,drc_index,drc_name,parent_slot_drc_index,pci_class,pci_device_id,pci_revision_id,pci_subs_device_id,pci_subs_vendor_id,pci_vendor_id,slot_io_pool_id,unit_phys_loc"), "3*T*S|1|2|3|4|5|6|7|8|9|A|B|C|13|14|5,6|0|",
+         TOLD(getAllIOSlotLevelLparByKeys, r->getLparIDAndMTMS(), r->getBusGrouping(), r->getBusId(), r->getDescription(), r->getDrcIndex(), r->getDrcName(), r->getParentSlotDrcIndex(), r->getPciClass(), r->getPciDeviceId(), r->getPciRevisionId(), r->getPciSubsDeviceId(), r->getPciSubsVendorId(), r->getPciVendorId(), r->getSlotIoPoolId(),
+              r->getUnitPhysLoc(), r->getFeatureCodes(), r->getIop())},
+        {adapter, "3*T*S|server|1|1|2|3|4|5|6|1|active|",
+         TOLD(getAllSerialAdapterLevelLparByKeys, r->getLparIDAndMTMS(), r->getAdapterType(), r->getIsRequired(), r->getLparName(), r->getRemoteLparId(), r->getRemoteLparName(), r->getRemoteSlotNum(), r->getSlotNum(), r->getState(), r->getSupportsDnx(), r->getConnectStatus())},
+        {adapter, "3*T*S|server|1|1|2|3|4|5|6|7|",
+         TOLD(getAllSCSIAdapterLevelLparByKeys, r->getLparIDAndMTMS(), r->getAdapterType(), r->getIsRequired(), r->getLparName(), r->getRemoteLparId(), r->getRemoteLparName(), r->getRemoteSlotNum(), r->getSlotNum(), r->getState(), r->getBackingDevices())},
+        {adapter, "3*T*S|1|1|5|6|9|10|11|12|13|14|15|",
+         TOLD(getAllEthernetAdapterLevelLparByKeys, r->getLparIDAndMTMS(), r->getIsRequired(), r->getLparName(), r->getSlotNum(), r->getState(), r->getMacAddr(), r->getIeeeVirtualEth(), r->getPortVlanID(), r->getAddlVlanIds(), r->getIsTrunk(), r->getTruukPriority(), r->getVSwitch())},
+    };
+    // clang-format on
+#undef TOLD
+    for (const auto& [properties, expected, told] : rows) {
+        EXPECT_EQ(expected, told(properties));
+    }
 }
 
 TEST_F(VirtualSystemVisitorTest, PropertiesOfProfiles) {
@@ -379,7 +321,7 @@ zemCEC* hashed(Visitor& visitor, const char* mtms) {
 }
 
 TEST_F(VirtualSystemVisitorTest, HostsAreReadAndDropped) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const char* const off = "1111-AAC*0000003";
     const struct {
         bool onlyOperating;
@@ -411,7 +353,7 @@ TEST_F(VirtualSystemVisitorTest, HostsAreReadAndDropped) {
 }
 
 TEST_F(VirtualSystemVisitorTest, RecordsHangWhereTheyBelong) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     for (const Reader& reader : kReaders) {
         if (reader.hang == nullptr) {
             continue;
@@ -436,7 +378,7 @@ TEST_F(VirtualSystemVisitorTest, RecordsHangWhereTheyBelong) {
 }
 
 TEST_F(VirtualSystemVisitorTest, PartitionsHangOnTheirHosts) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     int mask[] = {-1};
     m_visitor->initialize("", true, Visitor::Level_All);
     testing::internal::CaptureStdout();
@@ -494,7 +436,7 @@ TEST_F(VirtualSystemVisitorTest, HostsTellOfSuspending) {
 }
 
 TEST_F(VirtualSystemVisitorTest, PartitionsTellOfSuspending) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     m_tools.script("qyplat",
                    "echo \"$LC_ALL $*\" >>$here/lines\nexec " ZEM_PROGRAMS "/qyplat \"$@\"");
     const auto lines = [this] { return testing_support::lines(m_tools.read("lines")); };
@@ -553,7 +495,7 @@ TEST_F(VirtualSystemVisitorTest, HostsComeAndGo) {
     EXPECT_EQ(0, m_visitor->removeCEC(kHost));
     EXPECT_EQ(nullptr, hashed(*m_visitor, kHost));
 
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     EXPECT_EQ(0, m_visitor->addCEC(new zemCEC(kHost, "alpha"), ""));
     EXPECT_EQ(7, m_visitor->getData(0)->getLPARs().size());
     planAnswer("getAllLparsFromCec", 6);

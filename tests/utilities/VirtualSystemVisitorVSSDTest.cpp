@@ -5,9 +5,7 @@
 #include <memory>
 #include <sstream>
 
-#include "Joined.h"
 #include "LibraryFaults.h"
-#include "LibraryRecords.h"
 #include "LibrarySpy.h"
 #include "QyallocCmdCaller.h"
 #include "QyplatCmdCaller.h"
@@ -121,11 +119,6 @@ protected:
     using Lpar = std::unique_ptr<zemLPAR>;
 
     ~VirtualSystemVisitorVSSDTest() override { EXPECT_EQ(0, librarySpy.held); }
-    void makeAppliance() {
-        ASSERT_EQ(0, m_tools.run(std::string(ZEM_PROGRAMS) + "/appliance init").exit);
-        const char* path = getenv("PATH");
-        setenv("PATH", (m_tools.file("bin") + ":" + ZEM_PROGRAMS + ":" + path).c_str(), 1);
-    }
     void setPools(int count) {
         zemSystemMemoryResource memory(kHost);
         memory.setMaxMemPools(count);
@@ -377,7 +370,7 @@ TEST_F(VirtualSystemVisitorVSSDTest, DecidesRunningAdapters) {
 
 // All that the back end tells of each partition reads the same by records and by the model.
 TEST_F(VirtualSystemVisitorVSSDTest, BothWaysGiveTheSame) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     zemVirtualizationManager manager;
     const std::unique_ptr<zemCECVisitor> hosts(manager.createCECVisitor());
     constexpr int all = zemCECVisitor::Level_All;
@@ -488,7 +481,7 @@ TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
     EXPECT_EQ(nullptr, m_visitor.getProfileVSSD(noLpar, &stored, 0));
     EXPECT_EQ(nullptr, m_visitor.getProfileVSSD(&lpar, noProfile, 0));
 
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     const std::string throwing = "zemVSSDVisitor/getLparRecords/DNX_API_";
     const std::pair<std::optional<int>, std::string> codes[] = {
         {6, "1/" + throwing + "ACCESS_DENIED"},
@@ -599,7 +592,7 @@ TEST_F(VirtualSystemVisitorVSSDTest, ReadsPartitionsByTheLibrary) {
 }
 
 TEST_F(VirtualSystemVisitorVSSDTest, FillsAndChangesTheHost) {
-    makeAppliance();
+    m_tools.makeAppliance(ZEM_PROGRAMS);
     zemVSSDVisitor visitor(&m_host, "ORXC_MemoryRASettingData");
     EXPECT_EQ(0, visitor.initialize("", VISITOR_TYPE_LPAR));
     EXPECT_EQ(0, visitor.size());

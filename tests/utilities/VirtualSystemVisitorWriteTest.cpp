@@ -5,7 +5,6 @@
 #include <functional>
 #include <memory>
 
-#include "FailureText.h"
 #include "ToolFolder.h"
 #include "VirtualSystemVisitor.h"
 

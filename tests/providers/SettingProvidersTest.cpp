@@ -85,15 +85,10 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
         std::string partition;
         const char* query;
         std::string properties;
+        // clang-format off
     } rows[] = {
-        {kSystem, "ORX:4*", "4", "qyplat -r lpar",
-         "ElementName=name LparName=name LparID=lpar_id VirtualSystemType=lpar_env "
-         "BootMode=boot_mode "
-         "Keylock=lpar_keylock ProfileName=curr_profile DefaultProfileName=default_profile "
-         "IsDefault:true HostName:1111-AAA*0000001 AutomaticStartupAction:2 MaxVirtualSlots:11"},
-        {kSystem, "ORX:2*small", "4", "qyplat -r prof",
-         "ElementName=name ProfileName=name LparName=lpar_name IsDefault:false BootMode=boot_mode "
-         "MaxVirtualSlots=max_virtual_slots DefaultProfileName:normal"},
+        {kSystem, "ORX:4*", "4", "qyplat -r lpar", "ElementName=name LparName=name LparID=lpar_id VirtualSystemType=lpar_env BootMode=boot_mode Keylock=lpar_keylock ProfileName=curr_profile DefaultProfileName=default_profile IsDefault:true HostName:1111-AAA*0000001 AutomaticStartupAction:2 MaxVirtualSlots:11"},
+        {kSystem, "ORX:2*small", "4", "qyplat -r prof", "ElementName=name ProfileName=name LparName=lpar_name IsDefault:false BootMode=boot_mode MaxVirtualSlots=max_virtual_slots DefaultProfileName:normal"},
         {kSystem, "ORX:4*", "2", "qyplat -r lpar", "AutomaticStartupAction=auto_start*4"},
         {kClasses[1], "ORX:4*", "4", "qyalloc -r proc --level lpar",
          "VirtualMinimum=curr_min_procs*100 VirtualQuantity=run_procs*100 "
@@ -102,55 +97,26 @@ TEST_P(SettingProvidersTest, PropertiesAreWhatTheToolsPrint) {
          "SharingMode=curr_sharing_mode "
          "PoolID=curr_shared_proc_pool_id ConsumerVisibility:3 MappingBehavior:1 Weight: "
          "ElementName:3-Processor ResourceType:3 AllocationUnits:Percent ProcCompatMode:CORAL6+"},
-        {kClasses[1], "ORX:2*small", "4", "qyplat -r prof",
-         "VirtualMinimum=min_procs*100 VirtualQuantity=desired_procs*100 Limit=max_proc_units*100 "
-         "Reservation=desired_proc_units*100 SharingMode=sharing_mode PoolID=shared_proc_pool_id "
-         "ProcCompatMode=lpar_proc_compat_mode"},
-        {kClasses[2], "ORX:4*", "4", "qyalloc -r mem --level lpar",
-         "Minimum=curr_min_mem*1024 Reservation=run_mem*1024 Limit=curr_max_mem*1024 "
-         "VirtualQuantity=run_mem*1024 PoolID:Primordial AutomaticAllocation:true IsRequired:"},
-        {kClasses[2], "ORX:4*", "3", "qyalloc -r mem --level lpar",
-         "VirtualQuantity=run_mem*1024 Reservation=run_io_entitled_mem*1024 Weight=run_mem_weight "
-         "ConsumerVisibility:3 PoolID:0 Limit:"},
-        {kClasses[3], "ORX:4*", "6", "qyalloc -r io --rsubtype slot",
-         "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} IsVirtualized:false"},
-        {kClasses[4], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype eth --level lpar",
-         "SlotID=slot_num Address=mac_addr PortVLANID=port_vlan_id AddVLANIDs=addl_vlan_ids "
-         "IEEECompatible=ieee_virtual_eth TrunkPriority=trunk_priority IsRequired=is_required"},
-        {kClasses[5], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype scsi --level lpar",
-         "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id "
-         "RemoteSlotID=remote_slot_num IsRequired=is_required"},
-        {kClasses[6], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype serial --level lpar",
-         "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id "
-         "RemoteSlotID=remote_slot_num IsRequired=is_required IsVirtualized:true"},
-        {"ORXC_ProcessorPool", "ORX:3-Primordial", "", "qyalloc -r proc --level sys",
-         "Capacity=configurable_sys_proc_units*100 InstalledCapacity=installed_sys_proc_units*100 "
-         "Reserved:1050 Primordial:true PoolID:Primordial ResourceType:3 AllocationUnits:Percent "
-         "ConsumedResourceUnits:Percent"},
-        {"ORXC_ProcessorPool", "ORX:3-1", "", "qyalloc -r procpool --filter pool_ids=1",
-         "Capacity=max_pool_proc_units*100 Reserved:375 InstalledCapacity: Primordial:false "
-         "PoolID=shared_proc_pool_id ElementName=shared_proc_pool_id"},
-        {"ORXC_MemoryPool", "ORX:4-Primordial", "", "qyalloc -r mem --level sys",
-         "Capacity=configurable_sys_mem*1024 InstalledCapacity=installed_sys_mem*1024"},
-        {"ORXC_MemoryPool", "ORX:4-0", "", "qyalloc -r mempool",
-         "Capacity=pend_pool_mem*1024 InstalledCapacity=curr_pool_mem*1024 Reserved:524288"},
-        {"ORXC_IOSlotPool", "ORX:12-", "", "qyalloc -r mem --level sys",
-         "Capacity:7 Reserved:5 InstalledCapacity: AllocationUnits:Slot"},
-        {"ORXC_MemoryAllocationCapabilities", "ORX:Shared:4-0", "", "qyalloc -r mempool",
-         "ResourceType:4 RequestTypesSupported:3 SharingMode:3"},
-        {"ORXC_MemoryPoolConfigurationService", "ORX:MemoryPoolService:", "",
-         "qyalloc -r mem --level sys",
-         "SystemName:1111-AAA*0000001 SystemCreationClassName:ORXC_CEC_CS Started:true"},
-        {"ORXC_ProcessorPoolConfigurationService", "ORXCORAL:ProcessorPoolService:", "",
-         "qyalloc -r mem --level sys", "CreationClassName:ORXC_ProcessorPoolConfigurationService"},
-        {kClasses[1], "ORX:SMIN:3-1", "", "qyalloc -r proc --level sys",
-         "Reservation=min_proc_units_per_virtual_proc*100 VirtualQuantity:100 Limit: PoolID:1 "
-         "ElementName:SMIN:3-1 VirtualQuantityUnits:Percent"},
-        {kClasses[2], "ORX:DDEF:4-Primordial", "", "qyalloc -r mem --level sys",
-         "Reservation=mem_region_size*1024 Minimum=mem_region_size*1024 Limit=mem_region_size*2048 "
-         "VirtualQuantity: PoolID:Primordial ResourceType:4 AllocationUnits:byte*2^10"},
+        {kClasses[1], "ORX:2*small", "4", "qyplat -r prof", "VirtualMinimum=min_procs*100 VirtualQuantity=desired_procs*100 Limit=max_proc_units*100 Reservation=desired_proc_units*100 SharingMode=sharing_mode PoolID=shared_proc_pool_id ProcCompatMode=lpar_proc_compat_mode"},
+        {kClasses[2], "ORX:4*", "4", "qyalloc -r mem --level lpar", "Minimum=curr_min_mem*1024 Reservation=run_mem*1024 Limit=curr_max_mem*1024 VirtualQuantity=run_mem*1024 PoolID:Primordial AutomaticAllocation:true IsRequired:"},
+        {kClasses[2], "ORX:4*", "3", "qyalloc -r mem --level lpar", "VirtualQuantity=run_mem*1024 Reservation=run_io_entitled_mem*1024 Weight=run_mem_weight ConsumerVisibility:3 PoolID:0 Limit:"},
+        {kClasses[3], "ORX:4*", "6", "qyalloc -r io --rsubtype slot", "DRCIndex=drc_index IsRequired:1 TaggedIOType:{1,2,4} IsVirtualized:false"},
+        {kClasses[4], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype eth --level lpar", "SlotID=slot_num Address=mac_addr PortVLANID=port_vlan_id AddVLANIDs=addl_vlan_ids IEEECompatible=ieee_virtual_eth TrunkPriority=trunk_priority IsRequired=is_required"},
+        {kClasses[5], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype scsi --level lpar", "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id RemoteSlotID=remote_slot_num IsRequired=is_required"},
+        {kClasses[6], "ORX:4*", "4", "qyalloc -r virtualio --rsubtype serial --level lpar", "SlotID=slot_num VirtualAdapterType=adapter_type RemoteVirtualSystemID=remote_lpar_id RemoteSlotID=remote_slot_num IsRequired=is_required IsVirtualized:true"},
+        {"ORXC_ProcessorPool", "ORX:3-Primordial", "", "qyalloc -r proc --level sys", "Capacity=configurable_sys_proc_units*100 InstalledCapacity=installed_sys_proc_units*100 Reserved:1050 Primordial:true PoolID:Primordial ResourceType:3 AllocationUnits:Percent ConsumedResourceUnits:Percent"},
+        {"ORXC_ProcessorPool", "ORX:3-1", "", "qyalloc -r procpool --filter pool_ids=1", "Capacity=max_pool_proc_units*100 Reserved:375 InstalledCapacity: Primordial:false PoolID=shared_proc_pool_id ElementName=shared_proc_pool_id"},
+        {"ORXC_MemoryPool", "ORX:4-Primordial", "", "qyalloc -r mem --level sys", "Capacity=configurable_sys_mem*1024 InstalledCapacity=installed_sys_mem*1024"},
+        {"ORXC_MemoryPool", "ORX:4-0", "", "qyalloc -r mempool", "Capacity=pend_pool_mem*1024 InstalledCapacity=curr_pool_mem*1024 Reserved:524288"},
+        {"ORXC_IOSlotPool", "ORX:12-", "", "qyalloc -r mem --level sys", "Capacity:7 Reserved:5 InstalledCapacity: AllocationUnits:Slot"},
+        {"ORXC_MemoryAllocationCapabilities", "ORX:Shared:4-0", "", "qyalloc -r mempool", "ResourceType:4 RequestTypesSupported:3 SharingMode:3"},
+        {"ORXC_MemoryPoolConfigurationService", "ORX:MemoryPoolService:", "", "qyalloc -r mem --level sys", "SystemName:1111-AAA*0000001 SystemCreationClassName:ORXC_CEC_CS Started:true"},
+        {"ORXC_ProcessorPoolConfigurationService", "ORXCORAL:ProcessorPoolService:", "", "qyalloc -r mem --level sys", "CreationClassName:ORXC_ProcessorPoolConfigurationService"},
+        {kClasses[1], "ORX:SMIN:3-1", "", "qyalloc -r proc --level sys", "Reservation=min_proc_units_per_virtual_proc*100 VirtualQuantity:100 Limit: PoolID:1 ElementName:SMIN:3-1 VirtualQuantityUnits:Percent"},
+        {kClasses[2], "ORX:DDEF:4-Primordial", "", "qyalloc -r mem --level sys", "Reservation=mem_region_size*1024 Minimum=mem_region_size*1024 Limit=mem_region_size*2048 VirtualQuantity: PoolID:Primordial ResourceType:4 AllocationUnits:byte*2^10"},
         {kClasses[4], "ORX:DMAX:10-", "", "qyalloc -r mem --level sys", "VirtualQuantity:65534"},
     };
+    // clang-format on
     for (const auto& row : rows) {
         std::string query =
             row.query + (row.partition.empty() ? " -m 1111-AAA*0000001" : here + row.partition);

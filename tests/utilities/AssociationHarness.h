@@ -334,25 +334,14 @@ public:
     cimom::Reply run(const std::string& operation, const std::string& object,
                      const cimom::AssociationFilter& filter = kNone) {
         const cimom::ObjectPath path = pathOf(object);
-        if (operation == "ei") {
-            return server.enumInstances({}, path);
-        }
-        if (operation == "ein") {
-            return server.enumInstanceNames({}, path);
-        }
-        if (operation == "gi") {
-            return server.getInstance({}, path);
-        }
-        if (operation == "a") {
-            return server.associators({}, path, filter);
-        }
-        if (operation == "an") {
-            return server.associatorNames({}, path, filter);
-        }
-        cimom::AssociationFilter references = filter;
-        references.resultClass = filter.assocClass;
-        return operation == "r" ? server.references({}, path, references)
-                                : server.referenceNames({}, path, references);
+        const cimom::AssociationFilter links = {"", filter.assocClass, filter.role, ""};
+        return operation == "ei"    ? server.enumInstances({}, path)
+               : operation == "ein" ? server.enumInstanceNames({}, path)
+               : operation == "gi"  ? server.getInstance({}, path)
+               : operation == "a"   ? server.associators({}, path, filter)
+               : operation == "an"  ? server.associatorNames({}, path, filter)
+               : operation == "r"   ? server.references({}, path, links)
+                                    : server.referenceNames({}, path, links);
     }
 
     static std::shared_ptr<const cimom::ClassRepository> classes() {

@@ -7,8 +7,8 @@
 #include <chrono>
 #include <cstring>
 #include <functional>
-#include <thread>
 
+#include "../utilities/OnThreads.h"
 #include "ApiAnswer.h"
 #include "Store.h"
 #include "Text.h"
@@ -254,34 +254,27 @@ TEST_F(ApiTest, EveryCallIsOnePicture) {
     make("generate --force --hosts 2 --lpars 20");
     std::atomic<bool> done{false};
     std::atomic<int> mixed{0}, failed{0};
-    std::vector<std::thread> readers;
-    for (int i = 0; i < 4; ++i) {
-        readers.emplace_back([&] {
-            while (!done) {
-                const Answer lpars(getAllLparMemoryCfgs("", 2));
-                if (lpars.size() != 40) {
-                    ++failed;
-                }
-                for (int j = 1; j < lpars.size(); ++j) {
-                    mixed +=
-                        lpars.value(j, "RuntimeVRMWeight") != lpars.value(0, "RuntimeVRMWeight");
-                }
+    const auto read = [&](int) {
+        while (!done) {
+            const Answer lpars(getAllLparMemoryCfgs("", 2));
+            failed += lpars.size() != 40;
+            for (int j = 1; j < lpars.size(); ++j) {
+                mixed += lpars.value(j, "RuntimeVRMWeight") != lpars.value(0, "RuntimeVRMWeight");
             }
-        });
-    }
-    appliance::Store store = appliance::Store::open(appliance::Database::Access::Write);
-    for (int value = 1; value <= 30; ++value) {
-        appliance::Transaction change = store.write();
-        for (appliance::Object& lpar : store.all(appliance::Kind::Lpar)) {
-            lpar.set("run_mem_weight", std::to_string(value));
-            store.put(lpar);
         }
-        change.commit();
-    }
-    done = true;
-    for (std::thread& reader : readers) {
-        reader.join();
-    }
+    };
+    onThreads(4, read, [&] {
+        appliance::Store store = appliance::Store::open(appliance::Database::Access::Write);
+        for (int value = 1; value <= 30; ++value) {
+            appliance::Transaction change = store.write();
+            for (appliance::Object& lpar : store.all(appliance::Kind::Lpar)) {
+                lpar.set("run_mem_weight", std::to_string(value));
+                store.put(lpar);
+            }
+            change.commit();
+        }
+        done = true;
+    });
     EXPECT_EQ(0, mixed);
     EXPECT_EQ(0, failed);
 }

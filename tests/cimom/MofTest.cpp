@@ -57,28 +57,22 @@ std::string names(const std::vector<const CimClass*>& classes) {
 
 TEST(Mof, TellsPlaceAndReasonOfWhatItRejects) {
     // Faults stand behind "dir/t.mof:".
+    // clang-format off
     const std::pair<std::string, std::string> rows[] = {
         // form
         {"class", "1:6: expected a name, found the end of the file"},
         {"class A { uint8 }", "1:17: expected a name, found '}'"},
         {"class A { uint8 p q; };", "1:19: expected '[', '(', ';' or '=', found 'q'"},
-        {"\n\tint P;",
-         "2:2: expected the end of the file, '#pragma', 'class', 'instance', "
-         "'qualifier' or '[', found 'int'"},
-        {"class A { string \xC3\xA4; /* \xC3\xA4 */ uint8 p = ; };",
-         "1:39: expected a value or '{', found ';'"},
+        {"\n\tint P;", "2:2: expected the end of the file, '#pragma', 'class', 'instance', 'qualifier' or '[', found 'int'"},
+        {"class A { string \xC3\xA4; /* \xC3\xA4 */ uint8 p = ; };", "1:39: expected a value or '{', found ';'"},
         {"class A { uint8 p = $x; };", "1:21: expected a value or '{', found '$x'"},
         {"instance of A { P = }", "1:21: expected a value, an alias or '{', found '}'"},
         {"class A { string P[-1]; };", "1:20: expected an array size from 1 to 4294967295"},
         {"class A { string P[4294967296]; };", "1:20: expected an array size from 1 to 4294967295"},
         {"class A { A ref P[]; };", "1:18: a reference property cannot be an array"},
         {"class A { A ref P(); };", "1:17: a method cannot return a reference"},
-        {"[Key : Bold] class A {};",
-         "1:8: expected one of DisableOverride, EnableOverride, Restricted, ToSubclass, "
-         "Translatable, ToInstance; found 'Bold'"},
-        {"Qualifier Q : boolean, Scope(house);",
-         "1:30: expected one of Class, Association, Indication, Property, Reference, Method, "
-         "Parameter, Any; found 'house'"},
+        {"[Key : Bold] class A {};", "1:8: expected one of DisableOverride, EnableOverride, Restricted, ToSubclass, Translatable, ToInstance; found 'Bold'"},
+        {"Qualifier Q : boolean, Scope(house);", "1:30: expected one of Class, Association, Indication, Property, Reference, Method, Parameter, Any; found 'house'"},
         {"#pragma include (5)", "1:9: expected one path in quotes behind 'include'"},
         // tokens
         {"/* open", "1:1: this comment is not closed"},
@@ -87,17 +81,14 @@ TEST(Mof, TellsPlaceAndReasonOfWhatItRejects) {
         {"[Description(\"\\xD800\")]", "1:14: a \\x escape here names no character"},
         {"[Description(\"\\x0\")]", "1:14: a \\x escape here names no character"},
         {"[Description(\"\xC0\xAF\")]", "1:14: this string has a byte that is not UTF-8"},
-        {"[Description(\"" + std::string(1, '\0') + "\")]",
-         "1:14: this string has a control character"},
+        {"[Description(\"" + std::string(1, '\0') + "\")]", "1:14: this string has a control character"},
         {"class A " + std::string(1, '\0'), "1:9: byte 0x00 has no meaning here"},
         {"class A ?", "1:9: character '?' has no meaning here"},
-        {"class A { uint64 p = 18446744073709551616; };",
-         "1:22: '18446744073709551616' is too large"},
+        {"class A { uint64 p = 18446744073709551616; };", "1:22: '18446744073709551616' is too large"},
         {"class A { real64 p = 1.0e999; };", "1:22: '1.0e999' is out of range"},
         {"class A { uint8 p = 09; };", "1:21: '09' is not a number"},
         {"class A { char16 p = 'ab'; };", "1:22: this is not one character in quotes"},
-        {"class A { char16 p = '\xF0\x9F\x98\x80'; };",
-         "1:22: this character does not fit 16 bits"},
+        {"class A { char16 p = '\xF0\x9F\x98\x80'; };", "1:22: this character does not fit 16 bits"},
         // values
         {"class A { uint8 p = 256; };", "1:21: 256 is out of the range of uint8"},
         {"class A { uint64 p = -1; };", "1:22: -1 is out of the range of uint64"},
@@ -117,38 +108,28 @@ TEST(Mof, TellsPlaceAndReasonOfWhatItRejects) {
         {"class A { string P; uint8 p; };", "1:27: property 'p' is declared twice in this class"},
         {"class A { uint8 M(); uint8 m(); };", "1:28: method 'm' is declared twice in this class"},
         {"class A { uint8 M(uint8 a, uint8 A); };", "1:34: parameter 'A' is declared twice"},
-        {"class A { string P; }; class B : A { uint8 p; };",
-         "1:44: 'p' overrides one of another type, string"},
-        {"class A { string P[2]; }; class B : A { string P[]; };",
-         "1:48: 'P' overrides one of another type, string[2]"},
-        {"class A { uint8 M(); }; class B : A { uint16 M(); };",
-         "1:46: 'M' overrides one of another type, uint8"},
-        {"class A {[EmbeddedInstance(\"B\")] string P;}; class B {};"
-         "class C : A {[EmbeddedInstance(\"C\")] string P;};",
-         "1:101: 'P' overrides one of class 'B', of which its own is no subclass"},
-        {"class A { [Override(\"P\")] string P; };",
-         "1:34: 'P' overrides 'P', which is no feature of that name in a superclass"},
-        {"class A { [Key] string K; }; class B : A { [Key] string L; };",
-         "1:57: 'L' cannot become a key: 'A' has its keys already"},
+        {"class A { string P; }; class B : A { uint8 p; };", "1:44: 'p' overrides one of another type, string"},
+        {"class A { string P[2]; }; class B : A { string P[]; };", "1:48: 'P' overrides one of another type, string[2]"},
+        {"class A { uint8 M(); }; class B : A { uint16 M(); };", "1:46: 'M' overrides one of another type, uint8"},
+        {"class A {[EmbeddedInstance(\"B\")] string P;}; class B {};class C : A {[EmbeddedInstance(\"C\")] string P;};", "1:101: 'P' overrides one of class 'B', of which its own is no subclass"},
+        {"class A { [Override(\"P\")] string P; };", "1:34: 'P' overrides 'P', which is no feature of that name in a superclass"},
+        {"class A { [Key] string K; }; class B : A { [Key] string L; };", "1:57: 'L' cannot become a key: 'A' has its keys already"},
         {"class A { [Key] string K; }; class B : A { [Key(false)] string K; };",
          "1:45: qualifier 'Key' has another value in the superclass and cannot be changed\n"
          "dir/t.mof:1:64: 'K' is a key of the superclass and must stay one"},
-        {"class A { [Key] string K; }; class B : A { [Key(true)] string K; }; class A {};",
-         "1:75: class 'A' is declared already at dir/t.mof:1:7"},  // the same again is none
+        // a key again is no fault, the class is
+        {"class A { [Key] string K; }; class B : A { [Key(true)] string K; }; class A {};", "1:75: class 'A' is declared already at dir/t.mof:1:7"},
         {"class A { [Key] string K[]; };", "1:24: key 'K' cannot be an array or an instance"},
-        {"class A { [EmbeddedInstance(\"X\")] string P; };",
-         "1:42: class 'X' of 'P' is not declared"},
-        {"class A { [EmbeddedInstance(\"A\")] uint8 P; };",
-         "1:41: 'P' carries an instance and so must be a string"},
-        {"[Association] class A { A ref P; };",
-         "1:21: association 'A' has fewer than two references"},
-        {"class A { A ref P; };",
-         "1:7: class 'A' has references and so needs the qualifier 'Association'"},
+        {"class A { [EmbeddedInstance(\"X\")] string P; };", "1:42: class 'X' of 'P' is not declared"},
+        {"class A { [EmbeddedInstance(\"A\")] uint8 P; };", "1:41: 'P' carries an instance and so must be a string"},
+        {"[Association] class A { A ref P; };", "1:21: association 'A' has fewer than two references"},
+        {"class A { A ref P; };", "1:7: class 'A' has references and so needs the qualifier 'Association'"},
         {"[Nothing] class A {};", "1:2: qualifier 'Nothing' is not declared"},
         {"[Key] class A {};", "1:2: qualifier 'Key' is not for this element"},
         {"[Abstract, ABSTRACT] class A {};", "1:12: qualifier 'ABSTRACT' is given twice"},
         {"Qualifier key : boolean, Scope(any);", "1:11: qualifier 'key' is declared already"},
     };
+    // clang-format on
     for (const auto& [text, fault] : rows) {
         EXPECT_EQ("dir/t.mof:" + fault, faultsOf({{"dir/t.mof", text}})) << text;
     }

@@ -344,17 +344,15 @@ CMPIStatus returnLink(const CMPIResult* result) {
 CMPIInstanceMI* probeInstances(const CMPIBroker* mb, const CMPIContext*, CMPIStatus*) {
     probe.broker = mb;
     static CMPIInstanceMIFT table = {};
-    table.cleanup = [](CMPIInstanceMI*, const CMPIContext*, CMPIBoolean) {
+    table.cleanup = [](auto...) {
         probe.ending();
         return kDone;
     };
-    table.createInstance = [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult* result,
-                              const CMPIObjectPath*, const CMPIInstance* inst) {
+    table.createInstance = [](auto, auto, auto result, auto, auto inst) {
         probe.given = RequestScope::read(inst).properties;
         return returnLink(result);
     };
-    table.modifyInstance = [](CMPIInstanceMI*, const CMPIContext*, const CMPIResult*,
-                              const CMPIObjectPath*, const CMPIInstance* inst, const char** names) {
+    table.modifyInstance = [](auto, auto, auto, auto, auto inst, const char** names) {
         probe.given = RequestScope::read(inst).properties;
         if (!names) {
             probe.heard += "all";
@@ -372,9 +370,8 @@ CMPIInstanceMI* probeInstances(const CMPIBroker* mb, const CMPIContext*, CMPISta
 CMPIAssociationMI* probeAssociations(const CMPIBroker* mb, const CMPIContext*, CMPIStatus*) {
     probe.broker = mb;
     static CMPIAssociationMIFT table = {};
-    table.cleanup = [](CMPIAssociationMI*, const CMPIContext*, CMPIBoolean) { return kDone; };
-    table.referenceNames = [](CMPIAssociationMI*, const CMPIContext*, const CMPIResult* result,
-                              const CMPIObjectPath*, const char* className, const char*) {
+    table.cleanup = [](auto...) { return kDone; };
+    table.referenceNames = [](auto, auto, auto result, auto, const char* className, auto) {
         probe.heard += (className ? className : "none") + std::string(" ");
         return returnLink(result);
     };

@@ -22,6 +22,7 @@ struct Failure {
     void (*raise)(Base p);
 };
 
+// clang-format off
 constexpr Failure kFailures[] = {
     {"MethodNotSupported", [](Base p) { p.throwMethodNotSupportedExc(kGet, kClass); }},
     {"MethodNotFound", [](Base p) { p.throwMethodNotFoundExc(kGet, kClass); }},
@@ -29,8 +30,7 @@ constexpr Failure kFailures[] = {
     {"KeyNotFound", [](Base p) { p.throwKeyNotFoundExc(kGet, kClass, "k"); }},
     {"InvalidKey", [](Base p) { p.throwInvalidKeyExc(kGet, kClass, "k"); }},
     {"DuplicateKey", [](Base p) { p.throwDuplicateKeyExc(kGet, kClass, "k"); }},
-    {"KeyValueDoesntMatch",
-     [](Base p) { p.throwKeyValueDoesntMatchExc(kGet, kClass, "k", "1", "2"); }},
+    {"KeyValueDoesntMatch", [](Base p) { p.throwKeyValueDoesntMatchExc(kGet, kClass, "k", "1", "2"); }},
     {"PropertyNotFound", [](Base p) { p.throwPropertyNotFoundExc(kClass, "p"); }},
     {"DuplicateProperty", [](Base p) { p.throwDuplicatePropertyExc(kGet, kClass, "p"); }},
     {"InvalidProperty", [](Base p) { p.throwInvalidPropertyExc(kGet, kClass, "p"); }},
@@ -39,29 +39,22 @@ constexpr Failure kFailures[] = {
     {"DuplicateMethodArg", [](Base p) { p.throwDuplicateMethodArgExc("a", "m"); }},
     {"InvalidMethodArgValue", [](Base p) { p.throwInvalidMethodArgValueExc("a", "v", "m"); }},
     {"ParameterNotFound", [](Base p) { p.throwParameterNotFoundExc("a"); }},
-    {"PropertyValueDoesntMatch",
-     [](Base p) { p.throwPropertyValueDoesntMatchExc(kClass, "p", "1", "2"); }},
+    {"PropertyValueDoesntMatch", [](Base p) { p.throwPropertyValueDoesntMatchExc(kClass, "p", "1", "2"); }},
     {"MultiResource", [](Base p) { p.throwMultiResourceExc("memory", "lp1", "host"); }},
     {"DuplicateResource", [](Base p) { p.throwDuplicateResourceExc("slot", "v", "lp1", "host"); }},
-    {"ResourceHasExisted",
-     [](Base p) { p.throwResourceHasExistedExc("slot", "v", "lp1", "host"); }},
-    {"ResourceNotExisting",
-     [](Base p) { p.throwResourceNotExistingExc("slot", "v", "lp1", "host", "w,x"); }},
-    {"MinGtDesiredValue",
-     [](Base p) { p.throwMinGtDesiredValueExc(kLarge, 1, kClass, "lp1", "host", "memory"); }},
-    {"MinGtMaxValue",
-     [](Base p) { p.throwMinGtMaxValueExc(kLarge, 1, kClass, "lp1", "host", "memory"); }},
-    {"DesiredGtMaxValue",
-     [](Base p) { p.throwDesiredGtMaxValueExc(kLarge, 1, kClass, "lp1", "host", "memory"); }},
+    {"ResourceHasExisted", [](Base p) { p.throwResourceHasExistedExc("slot", "v", "lp1", "host"); }},
+    {"ResourceNotExisting", [](Base p) { p.throwResourceNotExistingExc("slot", "v", "lp1", "host", "w,x"); }},
+    {"MinGtDesiredValue", [](Base p) { p.throwMinGtDesiredValueExc(kLarge, 1, kClass, "lp1", "host", "memory"); }},
+    {"MinGtMaxValue", [](Base p) { p.throwMinGtMaxValueExc(kLarge, 1, kClass, "lp1", "host", "memory"); }},
+    {"DesiredGtMaxValue", [](Base p) { p.throwDesiredGtMaxValueExc(kLarge, 1, kClass, "lp1", "host", "memory"); }},
     {"AlreadyExists", [](Base) { throw zemObjectAlreadyExistsException("there is one"); }},
     {"NoSuchProperty", [](Base) { throw zemPropertyNotFoundException("there is none"); }},
     {"OtherKind", [](Base) { throw zemException(99, "of no kind"); }},
-    {"PropertiesAccessException1",
-     [](Base) { throw zemAccessDeniedException("Tool", "run", "it \"broke\""); }},
-    {"PropertiesAccessException2",
-     [](Base) { throw zemOperationFailedException("Tool", "run", "readDisks", "E7", "broke"); }},
+    {"PropertiesAccessException1", [](Base) { throw zemAccessDeniedException("Tool", "run", "it \"broke\""); }},
+    {"PropertiesAccessException2", [](Base) { throw zemOperationFailedException("Tool", "run", "readDisks", "E7", "broke"); }},
     {"Status", [](Base) { throw CmpiStatus(CMPI_RC_ERR_NOT_FOUND, "the binding's own"); }},
 };
+// clang-format on
 
 CmpiData slotOf(CMPIUint32 slot) {
     CmpiData data;

@@ -5,7 +5,6 @@
 #include <map>
 
 #include "JavaProcess.h"
-#include "OnThreads.h"
 #include "ServedProviders.h"
 
 namespace {

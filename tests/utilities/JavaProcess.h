@@ -15,6 +15,7 @@
 #include <vector>
 
 #include "../support/TestAppliance.h"
+#include "OnThreads.h"
 #include "Store.h"
 #include "WrtEventHelper.h"
 
@@ -117,15 +118,12 @@ inline void hear(const std::string& line) {
 
 /// What was heard since the last call, once there are so many lines or ten seconds are over.
 inline std::vector<std::string> heard(std::size_t count) {
-    for (int i = 0;; ++i) {
-        {
-            const std::lock_guard<std::mutex> hold(g_linesLock);
-            if (g_lines.size() >= count || i == 1000) {
-                return std::exchange(g_lines, {});
-            }
-        }
-        usleep(10000);
-    }
+    within(std::chrono::seconds(10), [count] {
+        const std::lock_guard<std::mutex> hold(g_linesLock);
+        return g_lines.size() >= count;
+    });
+    const std::lock_guard<std::mutex> hold(g_linesLock);
+    return std::exchange(g_lines, {});
 }
 
 /// Counts its calls, and does with each event what it was made for.

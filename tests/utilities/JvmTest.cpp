@@ -6,7 +6,6 @@
 #include <fstream>
 
 #include "JavaProcess.h"
-#include "OnThreads.h"
 
 namespace {
 

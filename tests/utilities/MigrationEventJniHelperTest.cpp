@@ -4,7 +4,6 @@
 
 #include "JavaProcess.h"
 #include "MigrationEventJniHelper.h"
-#include "OnThreads.h"
 
 namespace {
 

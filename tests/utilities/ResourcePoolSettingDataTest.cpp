@@ -255,13 +255,12 @@ TEST_F(ResourcePoolSettingDataTest, TheToolsGiveTheLargestAndNoMore) {
                     const zemLPAR& lpar = *host.getLPARs().getElementAt(j);
                     const std::string id(lpar.getLparID()), name(lpar.getDefaultProfileName());
                     if (!lpar.isActivated() &&
-                        m_tools.run("edplat -r prof" + on + "-i '\"name=" + name +
-                                    "\",lpar_id=" + id + settings + "' && edpower -r lpar" + on +
-                                    "--id " + id + " -o on -f '" + name + '\'')
+                        m_tools.run("edplat -r prof" + on + "-i '\"name=" + name + "\",lpar_id=" +
+                                    id + settings + "' && edpower -r lpar" + on + "--id " + id +
+                                    " -o on -f '" + name + "'; s=$?; " + restore + "; exit $s")
                                 .exit == 0) {
-                        return m_tools.run(restore).exit == 0;
+                        return true;
                     }
-                    m_tools.run(restore);
                 }
                 return false;
             };

@@ -199,6 +199,7 @@ TEST(ResourcePoolTest, ModesAndKindsSayWhatPoolsCarry) {
         const char* type;
         const char* allocation;
         const char* service = "ORX";
+        // clang-format off
         const char* shared[2] = {nullptr};  ///< of the shared pool: allocation, setting data
     } kKinds[] = {
         {"Processor",
@@ -208,21 +209,13 @@ TEST(ResourcePoolTest, ModesAndKindsSayWhatPoolsCarry) {
          "ORXCORAL",
          {"ORX:Shared:3-7*1*2|Allocation Capabilities for Processor Pool 7 of system 1*2|",
           "ORX:SMIN:3-7*1*2 SMAX: SDEF: SINC:"}},
-        {"Memory",
-         "Memory",
-         "4",
-         "Dedicated Memory Pool Allocation Capabilities",
-         "ORX",
-         {"ORX:Shared:4-0*1*2|Shared Memory Pool Allocation Capabilities|",
-          "ORX:SMIN:4-0*1*2 SMAX: SDEF: SINC:"}},
+        {"Memory", "Memory", "4", "Dedicated Memory Pool Allocation Capabilities", "ORX", {"ORX:Shared:4-0*1*2|Shared Memory Pool Allocation Capabilities|", "ORX:SMIN:4-0*1*2 SMAX: SDEF: SINC:"}},
         {"IOSlot", "I/O Slot", "12", "I/O Slot Pool Allocation Capabilities"},
-        {"EthernetAdapter", "Virtual Ethernet Adapter", "10",
-         "Virtual Ethernet Adapter Pool Allocation Capabilities"},
-        {"SCSIAdapter", "Virtual SCSI Adapter", "6",
-         "Virtual SCSI Adapter Pool Allocation Capabilities"},
-        {"SerialAdapter", "Virtual Serial Adapter", "21",
-         "Virtual Serial Adapter Pool Allocation Capabilities"},
+        {"EthernetAdapter", "Virtual Ethernet Adapter", "10", "Virtual Ethernet Adapter Pool Allocation Capabilities"},
+        {"SCSIAdapter", "Virtual SCSI Adapter", "6", "Virtual SCSI Adapter Pool Allocation Capabilities"},
+        {"SerialAdapter", "Virtual Serial Adapter", "21", "Virtual Serial Adapter Pool Allocation Capabilities"},
     };
+    // clang-format on
     const std::unique_ptr<zemCEC> host = made();
     for (const auto& kind : kKinds) {
         const std::string stem = kind.stem, noun = kind.noun;

@@ -280,40 +280,24 @@ TEST_F(VirtualSystemVisitorTest, PropertiesOfRecords) {
     }
 }
 
+// clang-format off
 TEST_F(VirtualSystemVisitorTest, PropertiesOfProfiles) {
-    const std::string properties =
-        "PartitionName=3*T*S;BootMode=2;ProcMode=0;DonorMode=0;SharingMode=0;ProcessorMode=9;"
-        "MemMode=255" +
-        numbered(
-            "AltConsoleDRCIndex,AltLoadSourceDRCIndex,AutoIPLEnabled,SFPSurveillance,"
-            "ConsoleDRCIndex,EntMem,LoadSourceDRCIndex,lpar_env,lpar_name,VRMWeight,"
-            "ECSDRCIndex,UserDefinedName,RedundantPath,UncappedWeight,MaxVirtualSlots,"
-            "MinimumCPUCount,DesiredCPUCount,MaximumCPUCount,MinProcUnit,DesiredProcUnit,"
-            "MaxProcUnit,SharedProcPoolId,MinimumMemory,DesiredMemory,MaximumMemory,"
-            "virtual_serial_adapters,virtual_scsi_adapters,virtual_eth_adapters,io_slots");
-    const LibraryAnswer answer({properties});
+    const LibraryAnswer answer({"PartitionName=3*T*S;BootMode=2;ProcMode=0;DonorMode=0;SharingMode=0;ProcessorMode=9;MemMode=255" +
+        numbered("AltConsoleDRCIndex,AltLoadSourceDRCIndex,AutoIPLEnabled,SFPSurveillance,ConsoleDRCIndex,EntMem,LoadSourceDRCIndex,lpar_env,lpar_name,VRMWeight,ECSDRCIndex,UserDefinedName,RedundantPath,UncappedWeight,MaxVirtualSlots,MinimumCPUCount,DesiredCPUCount,MaximumCPUCount,"
+                 "MinProcUnit,DesiredProcUnit,MaxProcUnit,SharedProcPoolId,MinimumMemory,DesiredMemory,MaximumMemory,virtual_serial_adapters,virtual_scsi_adapters,virtual_eth_adapters,io_slots")});
     int mask[] = {0, -1};
     const auto& v = *m_visitor;
-    for (const auto& profiles : {v.getAllProfileLevelLparByKeys("", Visitor::Level_Basic, "", ""),
-                                 v.getAllProfileLevelLparByKeys("", mask, "", "")}) {
+    for (const auto& profiles : {v.getAllProfileLevelLparByKeys("", Visitor::Level_Basic, "", ""), v.getAllProfileLevelLparByKeys("", mask, "", "")}) {
         ASSERT_EQ(1, profiles.size());
         const auto& p = *profiles.getElementAt(0);
         EXPECT_EQ("3*T*S|ds|shared|cap|CORAL8|ded|1|2|3|4|5|6|7|8|9|10|11|12|13|14|15|",
-                  joined(p.getLparIDAndMTMS(), p.getBootMode(), p.getProcMode(), p.getSharingMode(),
-                         p.getLparProcCompatMode(), p.getMemMode(), p.getAltConsoleSlot(),
-                         p.getAltRestartDeviceSlot(), p.getAutoStart(), p.getConnMonitoring(),
-                         p.getConsoleSlot(), p.getDesiredIoEntitledMem(), p.getLoadSourceSlot(),
-                         p.getLparEnv(), p.getLparName(), p.getMemWeight(), p.getOpConsoleSlot(),
-                         p.getProfileName(), p.getRedundantErrPathReporting(), p.getUncapWeight(),
-                         p.getMaxVirtualSlots()));
-        EXPECT_EQ(
-            "16|17|18|0.19|0.20|0.21|22|23|24|25|26|27|28|29|",
-            joined(p.getMinProcs(), p.getDesiredProcs(), p.getMaxProcs(), p.getMinProcsUnits(),
-                   p.getDesiredProcsUnits(), p.getMaxProcsUnits(), p.getSharedProcPoolID(),
-                   p.getMinMem(), p.getDesiredMem(), p.getMaxMem(), p.getVirtualSerialAdapters(),
-                   p.getVirtualScsiAdapters(), p.getVirtualEthAdapters(), p.getIoSlots()));
+                  joined(p.getLparIDAndMTMS(), p.getBootMode(), p.getProcMode(), p.getSharingMode(), p.getLparProcCompatMode(), p.getMemMode(), p.getAltConsoleSlot(), p.getAltRestartDeviceSlot(), p.getAutoStart(), p.getConnMonitoring(), p.getConsoleSlot(), p.getDesiredIoEntitledMem(), p.getLoadSourceSlot(),
+                         p.getLparEnv(), p.getLparName(), p.getMemWeight(), p.getOpConsoleSlot(), p.getProfileName(), p.getRedundantErrPathReporting(), p.getUncapWeight(), p.getMaxVirtualSlots()));
+        EXPECT_EQ("16|17|18|0.19|0.20|0.21|22|23|24|25|26|27|28|29|",
+                  joined(p.getMinProcs(), p.getDesiredProcs(), p.getMaxProcs(), p.getMinProcsUnits(), p.getDesiredProcsUnits(), p.getMaxProcsUnits(), p.getSharedProcPoolID(), p.getMinMem(), p.getDesiredMem(), p.getMaxMem(), p.getVirtualSerialAdapters(), p.getVirtualScsiAdapters(), p.getVirtualEthAdapters(), p.getIoSlots()));
     }
 }
+// clang-format on
 
 /// The host of this key in the visitor's table.
 zemCEC* hashed(Visitor& visitor, const char* mtms) {

@@ -436,44 +436,22 @@ TEST_F(VirtualSystemVisitorVSSDTest, SaysWhatIsMissing) {
         std::vector<std::string> answer;  ///< the library's objects
         std::function<void()> operation;
         std::string failure;
+        // clang-format off
     } rows[] = {
-        {{},
-         [&] { m_visitor.getStateVSSD(noLpar, &stored, 0); },
-         state + "The lpar which lpar_id is 3 does not existed"},
-        {{},
-         [&] { m_visitor.getStateVSSD(&lpar, noProfile, 0); },
-         state + "Error occurred when get the profile data of lpar(3) on host(1111-AAA*0000001)."},
-        {{},
-         [&] { m_visitor.getStateVSSD(&lpar, &stored, VISITOR_TYPE_RASD_MEM); },
-         state +
-             "Error occured when retrieving processor configuration information from profile p for "
-             "lpar 3 on host" +
-             host},
-        {{},
-         [&] { m_visitor.getStateVSSD(active, profile, two, none, none, none, none, none, 0); },
-         state + one + "qyalloc -r proc for lpar(3) -m" + host},
-        {{},
-         [&] { m_visitor.getStateVSSD(active, profile, none, two, none, none, none, none, 0); },
-         state + one + "qyalloc -r mem for lpar(3) -m" + host},
-        {{},
-         [&] { delete m_visitor.getStateVSSD(idle, profile, two, two, none, none, none, none, 0); },
-         ""},
+        {{}, [&] { m_visitor.getStateVSSD(noLpar, &stored, 0); }, state + "The lpar which lpar_id is 3 does not existed"},
+        {{}, [&] { m_visitor.getStateVSSD(&lpar, noProfile, 0); }, state + "Error occurred when get the profile data of lpar(3) on host(1111-AAA*0000001)."},
+        {{}, [&] { m_visitor.getStateVSSD(&lpar, &stored, VISITOR_TYPE_RASD_MEM); }, state + "Error occured when retrieving processor configuration information from profile p for lpar 3 on host" + host},
+        {{}, [&] { m_visitor.getStateVSSD(active, profile, two, none, none, none, none, none, 0); }, state + one + "qyalloc -r proc for lpar(3) -m" + host},
+        {{}, [&] { m_visitor.getStateVSSD(active, profile, none, two, none, none, none, none, 0); }, state + one + "qyalloc -r mem for lpar(3) -m" + host},
+        {{}, [&] { delete m_visitor.getStateVSSD(idle, profile, two, two, none, none, none, none, 0); }, ""},
         {{}, [&] { m_visitor.getStateVSSD("7", 0); }, "5" + state.substr(1) + nothing + of7},
         {{"", ""}, [&] { m_visitor.getStateVSSD("7", 0); }, state + one + of7},
-        {{"", ""},
-         [&] { m_visitor.getProfileVSSD("7", "p", 0); },
-         "3/zemVSSDVisitor/getProfileVSSD//" + one + "getLparObj with lpar id 7 on" + host},
-        {{},
-         [&] { m_visitor.getProfileVSSD("7", "p", 0); },
-         "5/zemVSSDVisitor/getProfileVSSD//" + nothing +
-             "getLparProfile for profile name p of lpar 7 on" + host},
-        {{},
-         [&] { m_partitions.getData(&m_host, "7", ""); },
-         "3/zemLPARVisitor/getData//The lpar(7) does not exist on host" + host},
-        {{"", ""},
-         [&] { m_partitions.getData(&m_host, "7", ""); },
-         "3/zemLPARVisitor/getData//" + one + of7},
+        {{"", ""}, [&] { m_visitor.getProfileVSSD("7", "p", 0); }, "3/zemVSSDVisitor/getProfileVSSD//" + one + "getLparObj with lpar id 7 on" + host},
+        {{}, [&] { m_visitor.getProfileVSSD("7", "p", 0); }, "5/zemVSSDVisitor/getProfileVSSD//" + nothing + "getLparProfile for profile name p of lpar 7 on" + host},
+        {{}, [&] { m_partitions.getData(&m_host, "7", ""); }, "3/zemLPARVisitor/getData//The lpar(7) does not exist on host" + host},
+        {{"", ""}, [&] { m_partitions.getData(&m_host, "7", ""); }, "3/zemLPARVisitor/getData//" + one + of7},
     };
+    // clang-format on
     for (const auto& row : rows) {
         const LibraryAnswer answer(row.answer);
         EXPECT_EQ(row.failure, failureText(row.operation));

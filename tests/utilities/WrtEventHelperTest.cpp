@@ -7,7 +7,6 @@
 #include "FailureText.h"
 #include "JavaProcess.h"
 #include "MigrationEventJniHelper.h"
-#include "OnThreads.h"
 #include "WrtEventHelper.h"
 
 namespace {

@@ -20,27 +20,16 @@ public:
         DirectResult result(w.scope.result(reply));
         const CmpiObjectPath path = w.path(pathOf(op.object));
         Provider& p = w.provider();
-        if (op.bit == 1) {
-            p.performGetInstance(w.ctx(), path, nullptr);
-        }
-        if (op.bit == 2) {
-            p.performEnumInstances(w.ctx(), result, path, nullptr);
-        }
-        if (op.bit == 4) {
-            p.performEnumInstanceNames(w.ctx(), result, path);
-        }
-        if (op.bit == 8) {
-            p.performAssociators(w.ctx(), result, path, "Test_Link", "", "", "", nullptr);
-        }
-        if (op.bit == 16) {
-            p.performAssociatorNames(w.ctx(), result, path, "Test_Link", "", "", "");
-        }
-        if (op.bit == 32) {
-            p.performReferences(w.ctx(), result, path, "Test_Link", "", nullptr);
-        }
-        if (op.bit == 64) {
-            p.performReferenceNames(w.ctx(), result, path, "Test_Link", "");
-        }
+        const std::function<void()> workers[] = {
+            [&] { p.performGetInstance(w.ctx(), path, nullptr); },
+            [&] { p.performEnumInstances(w.ctx(), result, path, nullptr); },
+            [&] { p.performEnumInstanceNames(w.ctx(), result, path); },
+            [&] { p.performAssociators(w.ctx(), result, path, "Test_Link", "", "", "", nullptr); },
+            [&] { p.performAssociatorNames(w.ctx(), result, path, "Test_Link", "", "", ""); },
+            [&] { p.performReferences(w.ctx(), result, path, "Test_Link", "", nullptr); },
+            [&] { p.performReferenceNames(w.ctx(), result, path, "Test_Link", ""); },
+        };
+        workers[&op - kOperations]();
         return reply;
     }
 };

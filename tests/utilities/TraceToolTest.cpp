@@ -7,8 +7,8 @@
 #include <chrono>
 #include <regex>
 
-#include "../support/TestAppliance.h"
 #include "OnThreads.h"
+#include "ToolFolder.h"
 #include "TraceTool.h"
 
 namespace {
@@ -164,12 +164,9 @@ TEST_F(TraceToolTest, OpensNothingButAFileOfItsOwn) {
             const int fd = std::stoi(entry.path().filename());
             EXPECT_EQ(FD_CLOEXEC, fcntl(fd, F_GETFD));
         }
-        const auto open = [] {
-            return std::distance(fs::directory_iterator("/proc/self/fd"), fs::directory_iterator());
-        };
-        const auto before = open();
+        const long before = openDescriptors();
         { const CFileLoger given("/dev/null"); }
-        EXPECT_EQ(before, open());
+        EXPECT_EQ(before, openDescriptors());
     };
     ASSERT_EQ(0, mkfifo(m_trace.c_str(), 0600));
     run("", m_trace.c_str(), fill);

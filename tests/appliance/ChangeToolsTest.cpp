@@ -153,6 +153,7 @@ TEST_F(ChangeToolsTest, WhatIsRefusedChangesNothing) {
         {PROC "-o s --id 4 -a weight=1", "WRTL1007 The attribute \"weight\" is not known."},
         {"edplat -r sys -m alpha", "WRTL1003 The option -i is missing."},
         {PROF "\"boot_mode\"'", "WRTL1012 "},
+        {"edplat -r lpar -m alpha -i '\"lpar_id=3\"x'", "WRTL1007 The attribute \"\"lpar_id\" is not known."},
         {PROF "\"boot_mode=sms\",\"boot_mode=of\"'", "WRTL1013 "},
         {PROF "\"desired_mem+=256\"'", "WRTL1015 The attribute desired_mem is no list"},
         {"edplat -r lpar -m alpha -i '\"new_name=x\"'", "WRTL1014 The attribute lpar_id is missing."},

@@ -128,7 +128,7 @@ TEST_F(CommandLine, VerbsThatChange) {
         {"ai" + one + "--result-role Dependent --properties Size",
          "// root/cimv2:Fix_Thing.Name=\"two, \\\"quoted\\\" \\\\\"\n"
          "instance of Fix_Thing {\n    Size = 2;\n};\n"},
-        {"ri" + one + "--result-class Fix_Link --role Dependent", ""},
+        {"ri" + one + "--role Dependent", ""},
         {"ec Fix_Base", "Fix_Thing\n"},
         {"im" + one + R"(Echo Number=5 'Names={a,"b,c"}' 'Thing=Fix_Base.Name="x"' )" +
              "'Parts={instance of Fix_Thing { Size = 3; }}'",
@@ -143,6 +143,7 @@ TEST_F(CommandLine, VerbsThatChange) {
         EXPECT_EQ(result.exit, 0) << result.err;
         EXPECT_EQ(result.out, out);
     }
+    EXPECT_NE(runTyped("ri" + one).out.find("instance of Fix_Link {"), std::string::npos);
     EXPECT_NE(runTyped("gc Fix_Thing").out.find("class Fix_Thing : Fix_Base {"), std::string::npos);
 }
 

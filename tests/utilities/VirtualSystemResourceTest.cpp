@@ -262,7 +262,7 @@ TEST(VirtualSystemResourceTest, AdaptersAreReadAndWritten) {
         {serial, "4/Server/1/2", "4|-1|-1|2||-1|-1| > 4///2///"},
         {serial, "", "-1|-1|-1|-1||-1|-1| > //////"},
         {scsi, "3/server/any//any/1", "3|1|-1||-1|1| > 3/server/any//any/1"},
-        {scsi, "3/client/1/io server/11/0", "3|0|1||11|0| > 3/client/1//11/0"},
+        {scsi, "3/client/10/io server/11/0", "3|0|10||11|0| > 3/client/10//11/0"},
         {scsi, " +3x/client", "3|0|-1||-1|-1| > 3/client////"},
         {ethernet, "2/0/1//0/1", "2|0|1||0|1|| > 2/0/1//0/1"},
         // Further VLANs are run together.

@@ -182,15 +182,7 @@ TEST_F(VirtualSystemVisitorTest, AnswersOfTheLibraryBecomeRecordsOrFailures) {
     EXPECT_EQ("||", joined(lpar->getLparID(), lpar->getMTMS()));
 }
 
-TEST_F(VirtualSystemVisitorTest, PropertiesOfHostsAndPartitions) {
-    const auto host = only(&Visitor::getAllCECObjectsByKeys,
-                           "Name=T*S;PrimaryFSP_IP=a;BackupFSP_IP=b;State=3;UserDefinedName=c;"
-                           "RuntimeCapability=1073741824;GlvExCaps=[64,32]");
-    EXPECT_EQ("T*S|a|b|Power Off|c|1|1|",
-              joined(host->getMTMS(), host->getPrimaryFSPIP(), host->getBackupFSPIP(),
-                     host->getState(), host->getSystemName(), host->getCapability().m_osq00Capable,
-                     host->getCapability().m_activeLparMobilityCapable));
-
+TEST_F(VirtualSystemVisitorTest, PropertiesOfPartitions) {
     const LibraryAnswer answer(
         {"Name=3*T*S;PartitionState=2;UserDefinedName=a;DefinitionState=3;Curr_prof=1,b;"
          "Default_prof=2,c;BootMode=3;MigrationState=13;ActualProcCompatMode=4;ProcCompatMode=5;"
@@ -245,6 +237,8 @@ TEST_F(VirtualSystemVisitorTest, PropertiesOfRecords) {
             "trunk_priority,vswitch");
     // clang-format off
     const std::tuple<std::string, std::string, std::function<std::string(const std::string&)>> rows[] = {
+        {host + ";PrimaryFSP_IP=a;BackupFSP_IP=b;State=3;UserDefinedName=c;RuntimeCapability=1073741824;GlvExCaps=[64,32]", "T*S|a|b|Power Off|c|1|1|",
+         TOLD(getAllCECObjectsByKeys, r->getMTMS(), r->getPrimaryFSPIP(), r->getBackupFSPIP(), r->getState(), r->getSystemName(), r->getCapability().m_osq00Capable, r->getCapability().m_activeLparMobilityCapable)},
         {host + numbered("ConfigurableProcUnits,CurAvailProcUnits,InstalledProcessors,MaxProcPools,MinProcUnit,PendAvailProcUnits"), "T*S|1|2|3|4|5|6|",
          TOLD(getAllProcessorLevelSysByKeys, r->getMTMS(), r->getConfigurableSysProcUnits(), r->getCurrAvailSysProcUnits(), r->getInstalledSysProcUnits(), r->getMaxSharedProcPools(), r->getMinProcUnitsPerVirtualProc(), r->getPendAvailSysProcUnits())},
         {host + numbered("ConfigurableProcUnits,PendAvailProcUnits"), "T*S|1|2|",

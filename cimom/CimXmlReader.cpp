@@ -11,9 +11,6 @@ namespace cimom {
 
 namespace {
 
-constexpr unsigned kBadRequest = 400;
-constexpr unsigned kNotImplemented = 501;
-
 [[noreturn]] void notValid(const std::string& why) {
     throw CimXmlFault(kBadRequest, "request-not-valid", why);
 }

@@ -22,6 +22,10 @@
 
 namespace cimom {
 
+// Statuses of HTTP for messages that are no requests, or none that is served.
+constexpr unsigned kBadRequest = 400;
+constexpr unsigned kNotImplemented = 501;
+
 /// A message that HTTP answers: with its status, and a header that says why.
 class CimXmlFault : public std::runtime_error {
 public:

@@ -14,10 +14,8 @@ namespace cimom {
 
 namespace {
 
-constexpr unsigned kBadRequest = 400;
 constexpr unsigned kMethodNotAllowed = 405;
 constexpr unsigned kUnsupportedMediaType = 415;
-constexpr unsigned kNotImplemented = 501;
 constexpr const char* kDeclaration = "<?xml version=\"1.0\" encoding=\"utf-8\"?>\n";
 
 // -- the head of a message ------------------------------------------------------------------------

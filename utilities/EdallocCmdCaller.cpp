@@ -8,7 +8,7 @@
 
 namespace {
 
-constexpr char kClass[] = "zemEdallocCmdCaller";
+constexpr char kEdallocCaller[] = "zemEdallocCmdCaller";
 
 /// Quantities of processors arrive in hundredths.
 constexpr int kHundredths = 100;
@@ -90,7 +90,7 @@ int zemEdallocCmdCaller::removeProcessing(const char* managedSystem, const zemSt
                                           std::int64_t procs, std::int64_t procUnits, pid_t* pid,
                                           FILE** fpOutput) {
     if (procs % kHundredths != 0) {
-        throw zemInvalidParameterException(kClass, "removeProcessing", kNotWhole);
+        throw zemInvalidParameterException(kEdallocCaller, "removeProcessing", kNotWhole);
     }
     return run("removeProcessing", processorLog("removeProcessing", procs, procUnits),
                processorLine(managedSystem, 'r', lparID, procs, procUnits), pid, fpOutput);
@@ -192,7 +192,7 @@ int zemEdallocCmdCaller::run(const char* throwMethod, const std::string& logFron
         zemPropertiesHelper::asynExecuteCommand(line.c_str(), pid, fpOutput, m_auth, m_locale);
     if (rc != 0) {
         const std::string text = "Command:\"" + line + "\" ReturnCode:" + std::to_string(rc);
-        throw zemNotSupportedException(kClass, throwMethod, text.c_str());
+        throw zemNotSupportedException(kEdallocCaller, throwMethod, text.c_str());
     }
     return 0;
 }

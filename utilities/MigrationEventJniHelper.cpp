@@ -9,7 +9,7 @@
 namespace {
 
 constexpr const char* kHelper = "zemMigrationEventJniHelper";
-constexpr const char* kJavaHelper = "com/orx/kel/mvr/event/jni/MigrationEventJniHelper";
+constexpr const char* kMigrationHelper = "com/orx/kel/mvr/event/jni/MigrationEventJniHelper";
 
 /// Those who hear of moves. Lives to the end of the process, as Java's threads do.
 struct Listeners {
@@ -103,7 +103,7 @@ int zemMigrationEventJniHelper::callJava(const char* method, const zemString& us
     const Attached attached(m_jvm);
     JNIEnv* const env = zemRequireVm(attached.get(), kHelper, method, m_jvm.getFailure());
     const zemJniCalls java(m_jvm, env);
-    const zemLocalRef<jclass> type(env, java.classOf(kJavaHelper));
+    const zemLocalRef<jclass> type(env, java.classOf(kMigrationHelper));
     if (m_migrationJniHelper == nullptr) {
         const jmethodID make = java.method(type.get(), "<init>", "()V");
         const zemLocalRef<jobject> made(env, java.checked(env->NewObject(type.get(), make)));

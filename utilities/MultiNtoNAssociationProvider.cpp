@@ -64,7 +64,7 @@ zemArray<zemString> aggregate(const zemDynamicArray<zemString>& names, const cha
     return kept;
 }
 
-using Paths = std::vector<CmpiObjectPath>;
+using ObjectPaths = std::vector<CmpiObjectPath>;
 
 /// The objects that one enumeration of associations has asked for, by class and namespace.
 class ObjectCache {
@@ -72,14 +72,15 @@ public:
     ObjectCache(zemAssociationCall& call, zemSynchronizerContext& lock, int classes)
         : m_call(call), m_lock(lock), m_objects(static_cast<unsigned>(classes)) {}
 
-    std::shared_ptr<const Paths> paths(const zemString& className, const zemString& nameSpace) {
+    std::shared_ptr<const ObjectPaths> paths(const zemString& className,
+                                             const zemString& nameSpace) {
         const zemString key = className + nameSpace;
-        std::shared_ptr<const Paths> objects;
+        std::shared_ptr<const ObjectPaths> objects;
         if (m_objects.lookup(key, objects) == 0) {
             return objects;
         }
         const zemSynchronizer hold(m_lock);
-        objects = std::make_shared<const Paths>(m_call.paths(nameSpace, className));
+        objects = std::make_shared<const ObjectPaths>(m_call.paths(nameSpace, className));
         m_objects.insert(key, objects);
         return objects;
     }
@@ -87,7 +88,7 @@ public:
 private:
     zemAssociationCall& m_call;
     zemSynchronizerContext& m_lock;
-    zemHashTable<zemString, std::shared_ptr<const Paths>, objectCacheHashFunc> m_objects;
+    zemHashTable<zemString, std::shared_ptr<const ObjectPaths>, objectCacheHashFunc> m_objects;
 };
 
 }  // namespace

@@ -2,10 +2,10 @@
 
 namespace {
 
-constexpr zemQuery kSystems = {"qyfault -r sys",
-                               zemQyfaultCmdCaller::ManagedSystemAttribute::m_attributeName};
-constexpr zemQuery kPartitions = {"qyfault -r lpar",
-                                  zemQyfaultCmdCaller::PartitionAttribute::m_attributeName};
+constexpr zemQuery kSystemFaults = {"qyfault -r sys",
+                                    zemQyfaultCmdCaller::ManagedSystemAttribute::m_attributeName};
+constexpr zemQuery kPartitionFaults = {"qyfault -r lpar",
+                                       zemQyfaultCmdCaller::PartitionAttribute::m_attributeName};
 
 }  // namespace
 
@@ -14,11 +14,11 @@ zemQyfaultCmdCaller::zemQyfaultCmdCaller(const char* auth, const char* locale)
 
 zemRecordSetsType zemQyfaultCmdCaller::getManagedSystemInformation(int* paramAttr,
                                                                    const char* managedSystem) {
-    return query(kSystems, paramAttr, managedSystem);
+    return query(kSystemFaults, paramAttr, managedSystem);
 }
 
 zemRecordSetsType zemQyfaultCmdCaller::getPartitionsInformation(int* paramAttr,
                                                                 const char* managedSystem,
                                                                 const char* filter) {
-    return query(kPartitions, paramAttr, managedSystem, filter);
+    return query(kPartitionFaults, paramAttr, managedSystem, filter);
 }

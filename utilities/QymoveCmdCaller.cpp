@@ -4,12 +4,12 @@ namespace {
 
 constexpr zemQuery kManager = {"qymove -r manager",
                                zemQymoveCmdCaller::ManagerSystemAttribute::m_attributeName};
-constexpr zemQuery kSystems = {"qymove -r sys",
-                               zemQymoveCmdCaller::ManagedSystemAttribute::m_attributeName,
-                               zemQuery::WHEN_NOT_NULL};
-constexpr zemQuery kPartitions = {"qymove -r lpar",
-                                  zemQymoveCmdCaller::PartitionAttribute::m_attributeName,
-                                  zemQuery::WHEN_NOT_NULL};
+constexpr zemQuery kSystemMoves = {"qymove -r sys",
+                                   zemQymoveCmdCaller::ManagedSystemAttribute::m_attributeName,
+                                   zemQuery::WHEN_NOT_NULL};
+constexpr zemQuery kPartitionMoves = {"qymove -r lpar",
+                                      zemQymoveCmdCaller::PartitionAttribute::m_attributeName,
+                                      zemQuery::WHEN_NOT_NULL};
 
 }  // namespace
 
@@ -22,11 +22,11 @@ zemRecordSetsType zemQymoveCmdCaller::getManagerSystemCapabilities(int* paramAtt
 
 zemRecordSetsType zemQymoveCmdCaller::getManagedSystemCapabilities(int* paramAttr,
                                                                    const char* managedSystem) {
-    return query(kSystems, paramAttr, managedSystem);
+    return query(kSystemMoves, paramAttr, managedSystem);
 }
 
 zemRecordSetsType zemQymoveCmdCaller::getPartitionsMigrationState(int* paramAttr,
                                                                   const char* managedSystem,
                                                                   const char* filter) {
-    return query(kPartitions, paramAttr, managedSystem, filter);
+    return query(kPartitionMoves, paramAttr, managedSystem, filter);
 }

@@ -10,12 +10,12 @@ namespace {
 constexpr zemQuery kConfiguration = {"qyusage -r config",
                                      zemQyusageCmdCaller::ConfigurationAttribute::m_attributeName,
                                      zemQuery::WHEN_NOT_NULL};
-constexpr zemQuery kPartitions = {"qyusage -r lpar",
-                                  zemQyusageCmdCaller::PartitionAttribute::m_attributeName,
-                                  zemQuery::WHEN_NOT_NULL};
-constexpr zemQuery kSystems = {"qyusage -r sys",
-                               zemQyusageCmdCaller::ManagedSystemAttribute::m_attributeName,
-                               zemQuery::WHEN_NOT_NULL};
+constexpr zemQuery kPartitionUsage = {"qyusage -r lpar",
+                                      zemQyusageCmdCaller::PartitionAttribute::m_attributeName,
+                                      zemQuery::WHEN_NOT_NULL};
+constexpr zemQuery kSystemUsage = {"qyusage -r sys",
+                                   zemQyusageCmdCaller::ManagedSystemAttribute::m_attributeName,
+                                   zemQuery::WHEN_NOT_NULL};
 
 constexpr char kSamples[] = " --filter \"event_types=sample\"";
 constexpr int kNoLimit = -1;
@@ -78,7 +78,7 @@ zemRecordSetsType zemQyusageCmdCaller::getPartitionsMetrics(int* paramAttr,
         options += ',' + zemTextOf(filter);
     }
     options += formatDataTimeFilter(pStartDateTime, pEndDateTime);
-    return query(kPartitions, paramAttr, managedSystem, nullptr, "", options.c_str());
+    return query(kPartitionUsage, paramAttr, managedSystem, nullptr, "", options.c_str());
 }
 
 zemRecordSetsType zemQyusageCmdCaller::getManagedSystemMetrics(int* paramAttr,
@@ -87,7 +87,7 @@ zemRecordSetsType zemQyusageCmdCaller::getManagedSystemMetrics(int* paramAttr,
                                                                const char* additionalOption) {
     const std::string options = additional(additionalOption) + kSamples +
                                 formatDataTimeFilter(pStartDateTime, pEndDateTime);
-    return query(kSystems, paramAttr, managedSystem, nullptr, "", options.c_str());
+    return query(kSystemUsage, paramAttr, managedSystem, nullptr, "", options.c_str());
 }
 
 zemRecordSetsType zemQyusageCmdCaller::getPartitionsMetrics(int* paramAttr,

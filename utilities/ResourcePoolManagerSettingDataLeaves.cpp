@@ -49,7 +49,7 @@ CMPIUint64 share(const Source& source) {
 
 constexpr std::int64_t kMostUnits = 1'000'000'000'000;  ///< hundredths that can be summed
 
-std::int64_t unitsOf(const zemString& text) {
+std::int64_t summableHundredths(const zemString& text) {
     return std::clamp<std::int64_t>(zemHundredths(text), 0, kMostUnits);
 }
 
@@ -63,14 +63,14 @@ void countMembers(zemCEC& cec, std::unordered_map<std::string, Members>& pools) 
         const zemString most = pool.getMaxPoolCapacity();
         // the first pool, which takes what no other has, tells none
         pools[std::string(pool.getSharedProcPoolId())].most =
-            most == "null" ? kMostUnits : unitsOf(most);
+            most == "null" ? kMostUnits : summableHundredths(most);
     }
     const bool hasPools = zemNumberOf(cec.getProcessor().getMaxSharedProcPools()) > 1;
     for (int i = 0; i < cec.getLPARs().size(); ++i) {
         const zemLPAR& lpar = *cec.getLPARs().getElementAt(i);
         const zemPartitionProcessorResource& held = lpar.getLparProcessor();
-        const std::int64_t now = unitsOf(held.getCurrProcUnits());
-        const std::int64_t then = unitsOf(held.getPendProcUnits());
+        const std::int64_t now = summableHundredths(held.getCurrProcUnits());
+        const std::int64_t then = summableHundredths(held.getPendProcUnits());
         const auto add = [&](Members& members) {
             members.now += now;
             members.then += then;
@@ -109,7 +109,8 @@ CMPIUint64 freeUnits(const Source& source) {
         return 0;
     }
     const Members& members = pool->second;
-    const std::int64_t ofHost = unitsOf(source.cec.getProcessor().getPendAvailSysProcUnits());
+    const std::int64_t ofHost =
+        summableHundredths(source.cec.getProcessor().getPendAvailSysProcUnits());
     const std::int64_t ofPool = members.most - std::max(members.now, members.then);
     return unsignedOf(std::max(std::min(ofHost, ofPool) + members.mostIdle,
                                std::min(ofHost + pools[zemPrimordialPoolID].mostIdle, ofPool)));

@@ -10,7 +10,7 @@
 
 namespace {
 
-constexpr char kClass[] = "zemManagerSystem";
+constexpr char kManagerSystem[] = "zemManagerSystem";
 
 constexpr char kProductData[] = "/opt/wrt/data/dnxvpd.properties";
 
@@ -47,12 +47,12 @@ zemString readUUID() {
     if (!opened) {
         const zemString text =
             zemString("open the config file wrong, can not open file : ") + kProductData + ".";
-        throw zemAccessDeniedException(kClass, "getDNXUUID", text);
+        throw zemAccessDeniedException(kManagerSystem, "getDNXUUID", text);
     }
     if (!found) {
         const zemString text =
             zemString("there is no UUID infoamation in the config file : ") + kProductData + ".";
-        throw zemAccessDeniedException(kClass, "getDNXUUID", text);
+        throw zemAccessDeniedException(kManagerSystem, "getDNXUUID", text);
     }
     return uuid.c_str();
 }
@@ -76,7 +76,7 @@ bool zemManagerSystem::isEnableRemoteRelocation(const char* requestUserContext) 
     const zemRecordSetsType records =
         zemQymoveCmdCaller(requestUserContext, nullptr).getManagerSystemCapabilities(wanted);
     if (records.size() == 0) {
-        throw zemOperationFailedException(kClass, "isEnableRemoteRelocation",
+        throw zemOperationFailedException(kManagerSystem, "isEnableRemoteRelocation",
                                           zemString(records.size()));
     }
     return (*records.getElementAt(0))[wanted[0]] == "1";
@@ -84,7 +84,7 @@ bool zemManagerSystem::isEnableRemoteRelocation(const char* requestUserContext) 
 
 zemDynamicArray<zemHostSystem> zemManagerSystem::getAllHostSystem(const char* requestUserContext,
                                                                   const char* locale) {
-    const zemApiReader reader = {kClass, "getAllHostSystem", "getAllCecs", "UNKNOWN"};
+    const zemApiReader reader = {kManagerSystem, "getAllHostSystem", "getAllCecs", "UNKNOWN"};
     zemDynamicArray<zemHostSystem> hosts;
     for (apiProp& host : zemApiObjects(reader, zemApiCaller().getAllCecs(requestUserContext, 1))) {
         hosts.addElement(std::make_unique<zemHostSystem>(host, requestUserContext, locale));
@@ -95,7 +95,7 @@ zemDynamicArray<zemHostSystem> zemManagerSystem::getAllHostSystem(const char* re
 zemHostSystem zemManagerSystem::getHostSystemByName(const zemString& name,
                                                     const char* requestUserContext,
                                                     const char* locale) {
-    const zemApiReader reader = {kClass, "getHostSystemByName", "getCecObj"};
+    const zemApiReader reader = {kManagerSystem, "getHostSystemByName", "getCecObj"};
     const zemApiObjects hosts(reader, zemApiCaller().getCecObj(requestUserContext, name, 1));
     return zemHostSystem(hosts.only(name), requestUserContext, locale);
 }

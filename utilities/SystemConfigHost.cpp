@@ -14,17 +14,15 @@
 
 namespace {
 
-constexpr char kClass[] = "zemHostSystem";
+constexpr char kHostSystem[] = "zemHostSystem";
 
 constexpr int kNoConnection = 254;
 
 /// The bit of "RuntimeCapability" that tells whether the host runs osq00 partitions.
 constexpr int kOsq00Bit = 30;
 
-constexpr int kBase = 10;
-
 using Host = zemQyplatCmdCaller::ManagedSystemAttribute;
-using Migration = zemQymoveCmdCaller::ManagedSystemAttribute;
+using HostMigration = zemQymoveCmdCaller::ManagedSystemAttribute;
 
 }  // namespace
 
@@ -54,7 +52,7 @@ void zemHostSystem::setMTMS(const zemString& mtms) {
 void zemHostSystem::updateData(OP_LEVEL level) {
     // Not getMTMS(), which comes here for a host without a key.
     const zemString mtms = m_typeModel + "*" + m_serialNum;
-    const zemApiReader reader = {kClass, "updateData", "getCecObj"};
+    const zemApiReader reader = {kHostSystem, "updateData", "getCecObj"};
     const zemApiObjects hosts(
         reader, zemApiCaller().getCecObj(m_requestUserContext, mtms, detailOf(level)));
     parseApiProp(hosts.only(mtms));
@@ -70,7 +68,7 @@ void zemHostSystem::parseApiProp(apiProp& prop) {
         {"Name", [](Self& host, const zemString& value) { host.setMTMS(value); }},
         {"RuntimeCapability",
          [](Self& host, const zemString& value) {
-             const auto bits = std::strtoull(value, nullptr, kBase);
+             const auto bits = std::strtoull(value, nullptr, zemNumberBase);
              host.m_osq00Capable = (bits >> kOsq00Bit & 1U) != 0;
          }},
     };
@@ -106,7 +104,7 @@ zemString zemHostSystem::getStateByID(int state) { return zemHostStateText(state
 
 zemDynamicArray<zemVirtualSystem> zemHostSystem::readPartitions(const char* method,
                                                                 const char* environment) {
-    const zemApiReader reader = {kClass, method, "getAllLparsFromCec", "UNKNOWN"};
+    const zemApiReader reader = {kHostSystem, method, "getAllLparsFromCec", "UNKNOWN"};
     const zemApiObjects objects(
         reader, zemApiCaller().getAllLparsFromCec(m_requestUserContext, getMTMS(), 1));
     zemDynamicArray<zemVirtualSystem> partitions;
@@ -132,7 +130,7 @@ zemVirtualSystem zemHostSystem::getVirtualSystemByName(const zemString& lparName
     using Partition = zemQyplatCmdCaller::PartitionAttribute;
     const char* const method = "getVirtualSystemByName";
     const zemString mtms = getMTMS();
-    const zemRecordSetsType records = zemWithNotFound(kUnknownToChanges, kClass, method, [&] {
+    const zemRecordSetsType records = zemWithNotFound(kUnknownToChanges, kHostSystem, method, [&] {
         const zemString filter =
             zemCommandCaller::quoted(zemCommandCaller::filterItem("lpar_names", lparName));
         return zemQyplatCmdCaller(m_requestUserContext, m_locale)
@@ -149,7 +147,7 @@ zemVirtualSystem zemHostSystem::getVirtualSystemByName(const zemString& lparName
         zemString text;
         text.format("The requested patition(name:%s) was not found on managed system %s",
                     static_cast<const char*>(lparName), static_cast<const char*>(mtms));
-        throw zemObjectNotFoundException(kClass, method, text);
+        throw zemObjectNotFoundException(kHostSystem, method, text);
     }
     // State and boot mode stand in the record as words; the object reads their numbers.
     return zemVirtualSystem((*records.getElementAt(found))[Partition::ATTR_LPAR_ID], *this,
@@ -158,26 +156,28 @@ zemVirtualSystem zemHostSystem::getVirtualSystemByName(const zemString& lparName
 
 zemVirtualSystem zemHostSystem::getVirtualSystemById(const zemString& lparId) {
     const zemString key = lparId + "*" + getMTMS();
-    const zemApiReader reader = {kClass, "getVirtualSystemById", "getLparObj"};
+    const zemApiReader reader = {kHostSystem, "getVirtualSystemById", "getLparObj"};
     const zemApiObjects partitions(reader, zemApiCaller().getLparObj(m_requestUserContext, key, 1));
     return zemVirtualSystem(partitions.only(key), *this, m_requestUserContext, m_locale);
 }
 
 zemString zemHostSystem::migrationCapability(int row, const char* method) {
-    int wanted[] = {row, Migration::ATTR_END};
+    int wanted[] = {row, HostMigration::ATTR_END};
     const zemRecordSetsType records = zemQymoveCmdCaller(m_requestUserContext, m_locale)
                                           .getManagedSystemCapabilities(wanted, getMTMS());
     if (records.size() == 0) {
-        throw zemOperationFailedException(kClass, method, zemString(records.size()));
+        throw zemOperationFailedException(kHostSystem, method, zemString(records.size()));
     }
     return (*records.getElementAt(0))[row];
 }
 
-#define ZEM_MIGRATION_FLAG(NAME, ROW) \
-    bool zemHostSystem::NAME() { return migrationCapability(Migration::ATTR_##ROW, #NAME) == "1"; }
-#define ZEM_MIGRATION_NUMBER(NAME, ROW)                                        \
-    int zemHostSystem::NAME() {                                                \
-        return zemNumberOf(migrationCapability(Migration::ATTR_##ROW, #NAME)); \
+#define ZEM_MIGRATION_FLAG(NAME, ROW)                                        \
+    bool zemHostSystem::NAME() {                                             \
+        return migrationCapability(HostMigration::ATTR_##ROW, #NAME) == "1"; \
+    }
+#define ZEM_MIGRATION_NUMBER(NAME, ROW)                                            \
+    int zemHostSystem::NAME() {                                                    \
+        return zemNumberOf(migrationCapability(HostMigration::ATTR_##ROW, #NAME)); \
     }
 
 ZEM_MIGRATION_FLAG(isEnableInactiveMigration, INACTIVE_LPAR_MOBILITY_CAPABLE)
@@ -200,7 +200,7 @@ int zemHostSystem::createVirtualSystem(const zemDynamicArray<tagAttributePair>& 
 bool zemHostSystem::IsUnusedLparId(const zemString& lparId) try {
     const zemString mtms = getMTMS();
     const zemString key = lparId + "*" + mtms;
-    const zemApiReader reader = {kClass, "IsUnusedLparId", "getAllLparsFromCec"};
+    const zemApiReader reader = {kHostSystem, "IsUnusedLparId", "getAllLparsFromCec"};
     for (apiProp& partition :
          zemApiObjects(reader, zemApiCaller().getAllLparsFromCec(m_requestUserContext, mtms, 1))) {
         if (zemApiProp(&partition).getProperty("Name") == key) {

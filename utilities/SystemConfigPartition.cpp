@@ -16,10 +16,9 @@
 
 namespace {
 
-constexpr char kClass[] = "zemVirtualSystem";
+constexpr char kVirtualSystem[] = "zemVirtualSystem";
 
 constexpr int kNotActivated = 0;
-constexpr int kBase = 10;
 
 using Partition = zemQyplatCmdCaller::PartitionAttribute;
 using PartitionChange = zemEdplatCmdCaller::PartitionAttribute;
@@ -72,7 +71,7 @@ zemVirtualSystem::~zemVirtualSystem() = default;
 
 void zemVirtualSystem::updateData(OP_LEVEL level) {
     const zemString key = getLparIDAndMTMS();
-    const zemApiReader reader = {kClass, "updateData", "getLparObj"};
+    const zemApiReader reader = {kVirtualSystem, "updateData", "getLparObj"};
     const zemApiObjects partitions(
         reader, zemApiCaller().getLparObj(m_requestUserContext, key, detailOf(level)));
     parseApiProp(partitions.only(key));
@@ -190,7 +189,7 @@ int zemVirtualSystem::migrateTo(const zemString& targetHost, bool isCrossManager
                                                            m_requestUserContext, m_locale);
     if (rc != 0) {
         const std::string text = "Command:\"" + line + "\" ReturnCode:" + std::to_string(rc);
-        throw zemNotSupportedException(kClass, "validateMigratebility", text.c_str());
+        throw zemNotSupportedException(kVirtualSystem, "validateMigratebility", text.c_str());
     }
     return 0;
 }
@@ -222,8 +221,8 @@ int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
         return -1;
     }
     zemRecordType& record = *records.getElementAt(0);
-    const auto sent = static_cast<double>(std::strtoull(record[wanted[0]], nullptr, kBase));
-    const auto left = static_cast<double>(std::strtoull(record[wanted[1]], nullptr, kBase));
+    const auto sent = static_cast<double>(std::strtoull(record[wanted[0]], nullptr, zemNumberBase));
+    const auto left = static_cast<double>(std::strtoull(record[wanted[1]], nullptr, zemNumberBase));
     constexpr double kSentAll = 90.0;
     return sent + left > 0 ? static_cast<int>(std::lround(sent / (sent + left) * kSentAll)) : 0;
 } catch (...) {
@@ -232,7 +231,7 @@ int zemVirtualSystem::getMigrationPercentComplete(const char* userName) try {
 }
 
 int zemVirtualSystem::change(int attributeIndex, const zemString& value, const char* method) {
-    return zemWithNotFound(kUnknownToChanges, kClass, method, [&] {
+    return zemWithNotFound(kUnknownToChanges, kVirtualSystem, method, [&] {
         zemDynamicArray<tagAttributePair> pairs;
         pairs.addElement(
             std::make_unique<tagAttributePair>(attributeIndex, zemCommandCaller::itemValue(value)));
@@ -250,7 +249,7 @@ int zemVirtualSystem::setName(const zemString& systemName) {
 }
 
 int zemVirtualSystem::setKeylock(const zemString& keylockPos) {
-    return zemWithNotFound(kUnknownToChanges, kClass, "setKeylock", [&] {
+    return zemWithNotFound(kUnknownToChanges, kVirtualSystem, "setKeylock", [&] {
         const std::string line = zemKeylockLine(getMTMS(), m_lparId, keylockPos);
         return zemCommandCaller(m_requestUserContext, m_locale)
             .callGenericCommand(line.c_str(), nullptr, false);
@@ -266,7 +265,7 @@ zemVirtualSystemProfile zemVirtualSystem::getDefaultProfile() {
 }
 
 zemDynamicArray<zemVirtualSystemProfile> zemVirtualSystem::getAllVirtualSystemProfiles() {
-    const zemApiReader reader = {kClass, "getAllVirtualSystemProfiles",
+    const zemApiReader reader = {kVirtualSystem, "getAllVirtualSystemProfiles",
                                  "getAllLparProfilesFromLpar", "UNKNOWN"};
     const zemApiObjects objects(reader, zemApiCaller().getAllLparProfilesFromLpar(
                                             m_requestUserContext, getLparIDAndMTMS(), 1));
@@ -280,7 +279,7 @@ zemDynamicArray<zemVirtualSystemProfile> zemVirtualSystem::getAllVirtualSystemPr
 
 zemVirtualSystemProfile zemVirtualSystem::getVirtualSystemProfileByName(
     const zemString& profileName) {
-    const zemApiReader reader = {kClass, "getVirtualSystemProfileByName", "getLparProfile"};
+    const zemApiReader reader = {kVirtualSystem, "getVirtualSystemProfileByName", "getLparProfile"};
     const zemApiObjects profiles(
         reader,
         zemApiCaller().getLparProfile(m_requestUserContext, getLparIDAndMTMS(), profileName, 1));
@@ -290,15 +289,16 @@ zemVirtualSystemProfile zemVirtualSystem::getVirtualSystemProfileByName(
 
 zemString zemVirtualSystem::getAttributeValue(int attributeIndex) {
     const char* const method = "getAttributeValue";
-    zemExpectAttribute(attributeIndex, kClass, method);
+    zemExpectAttribute(attributeIndex, kVirtualSystem, method);
     int wanted[] = {attributeIndex, Partition::ATTR_END};
     const zemString key = getLparIDAndMTMS();
-    const zemRecordSetsType records = zemWithNotFound(kUnknownToQueries, kClass, method, [&] {
-        return zemQyplatCmdCaller(m_requestUserContext, m_locale)
-            .getPartitionsInformation(wanted, getMTMS(), ownFilter());
-    });
+    const zemRecordSetsType records =
+        zemWithNotFound(kUnknownToQueries, kVirtualSystem, method, [&] {
+            return zemQyplatCmdCaller(m_requestUserContext, m_locale)
+                .getPartitionsInformation(wanted, getMTMS(), ownFilter());
+        });
     if (records.size() == 0) {
-        throw zemObjectNotFoundException(kClass, method, key);
+        throw zemObjectNotFoundException(kVirtualSystem, method, key);
     }
     return (*records.getElementAt(0))[attributeIndex];
 }

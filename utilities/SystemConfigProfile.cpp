@@ -11,7 +11,7 @@
 
 namespace {
 
-constexpr char kClass[] = "zemVirtualSystemProfile";
+constexpr char kVirtualSystemProfile[] = "zemVirtualSystemProfile";
 
 using Profile = zemQyplatCmdCaller::PartitionProfileAttribute;
 
@@ -49,7 +49,7 @@ zemVirtualSystemProfile::zemVirtualSystemProfile(const zemString& profileName,
 zemVirtualSystemProfile::~zemVirtualSystemProfile() = default;
 
 void zemVirtualSystemProfile::updateData(OP_LEVEL level) {
-    const zemApiReader reader = {kClass, "updateData", "getLparProfile"};
+    const zemApiReader reader = {kVirtualSystemProfile, "updateData", "getLparProfile"};
     const zemApiObjects profiles(
         reader,
         zemApiCaller().getLparProfile(m_requestUserContext, m_virtualSystem.getLparIDAndMTMS(),
@@ -129,13 +129,14 @@ zemDynamicArray<zemString> zemVirtualSystemProfile::getVirtualIOResources(IOReso
     need(OP_LEVEL_2);
     const zemString& list = this->*kLists[row];
     if (!list.isEmpty() && !zemParseFields(std::string_view(list), elements)) {
-        throw zemOperationFailedException(kClass, "getVirtualIOResources", "INVALID_RECORD", list);
+        throw zemOperationFailedException(kVirtualSystemProfile, "getVirtualIOResources",
+                                          "INVALID_RECORD", list);
     }
     return elements;
 }
 
 zemRecordSetsType zemVirtualSystemProfile::getAttributeValues(int* attributeIndex) {
-    return zemWithNotFound(kUnknownToQueries, kClass, "getAttributeValues", [&] {
+    return zemWithNotFound(kUnknownToQueries, kVirtualSystemProfile, "getAttributeValues", [&] {
         const zemString items =
             zemCommandCaller::filterItem("lpar_ids", m_virtualSystem.getLparID()) + "," +
             zemCommandCaller::filterItem("profile_names", m_profileName);
@@ -146,11 +147,11 @@ zemRecordSetsType zemVirtualSystemProfile::getAttributeValues(int* attributeInde
 }
 
 zemString zemVirtualSystemProfile::getAttributeValue(int attributeIndex) {
-    zemExpectAttribute(attributeIndex, kClass, "getAttributeValue");
+    zemExpectAttribute(attributeIndex, kVirtualSystemProfile, "getAttributeValue");
     int wanted[] = {attributeIndex, Profile::ATTR_END};
     const zemRecordSetsType records = getAttributeValues(wanted);
     if (records.size() == 0) {
-        throw zemObjectNotFoundException(kClass, "getAttributeValue", m_profileName);
+        throw zemObjectNotFoundException(kVirtualSystemProfile, "getAttributeValue", m_profileName);
     }
     return (*records.getElementAt(0))[attributeIndex];
 }

@@ -15,6 +15,8 @@
 #include "NumberText.h"
 #include "StringUtils.h"
 
+constexpr int zemNumberBase = 10;  ///< of what the tools and the library tell
+
 /// @throws zemInvalidParameterException @p index is the mark that ends a list, and no attribute
 inline void zemExpectAttribute(int index, const char* throwClass, const char* throwMethod) {
     if (index == -1) {

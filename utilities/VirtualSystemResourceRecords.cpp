@@ -48,8 +48,8 @@ zemString adapterType(const zemString& code) {
 
 /// A partition or a slot at the other end of a line.
 zemString remoteEnd(const zemString& number) {
-    constexpr int kAny = 65535;
-    return zemNumberOf(number) == kAny ? zemString("any") : number;
+    constexpr int kAnyNumber = 65535;
+    return zemNumberOf(number) == kAnyNumber ? zemString("any") : number;
 }
 
 zemString isNotFalse(const zemString& word) {

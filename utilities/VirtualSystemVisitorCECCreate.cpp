@@ -8,8 +8,8 @@ namespace {
 
 using Partition = zemNwplatCmdCaller::PartitionAttribute;
 
-constexpr char kClass[] = "zemCECVisitor";
-constexpr char kMethod[] = "createLPAR";
+constexpr char kCecVisitor[] = "zemCECVisitor";
+constexpr char kCreateLpar[] = "createLPAR";
 
 constexpr zemSetting kOrder[] = {
     Partition::ATTR_NAME,
@@ -43,7 +43,7 @@ constexpr zemSetting kOrder[] = {
     zemString text;
     text.format("No %s is specified when creating lpar %s on %s", what,
                 static_cast<const char*>(vssd.getLparID()), static_cast<const char*>(mtms));
-    throw zemObjectNotFoundException(kClass, kMethod, what, text);
+    throw zemObjectNotFoundException(kCecVisitor, kCreateLpar, what, text);
 }
 
 /// Dedicated processors are as many as their units, and lend what is idle.
@@ -63,7 +63,7 @@ void requirePool(const zemProcessorRASD::zemProcessorRASDData& data, zemCEC& cec
             "Shared processing units can only be allocated from a shared pool but not "
             "\"Primordial\" pool on \"%s\".",
             static_cast<const char*>(cec.getMTMS()));
-        throw zemInvalidParameterException(kClass, kMethod, text);
+        throw zemInvalidParameterException(kCecVisitor, kCreateLpar, text);
     }
 }
 
@@ -72,7 +72,7 @@ void requirePool(const zemProcessorRASD::zemProcessorRASDData& data, zemCEC& cec
 int zemCECVisitor::createLPAR(zemCEC* cec, zemVSSD* vssd, bool isOSQ00) {
     zemWanted wanted{zemWanted::PARTITION, *vssd};
     const zemString mtms = cec->getMTMS();
-    zemProcessorRASD* const processor = zemOnlyProcessor(*vssd, mtms, kClass, kMethod);
+    zemProcessorRASD* const processor = zemOnlyProcessor(*vssd, mtms, kCecVisitor, kCreateLpar);
     if (processor == nullptr) {
         throwMissing("Processor", *vssd, mtms);
     }
@@ -82,7 +82,7 @@ int zemCECVisitor::createLPAR(zemCEC* cec, zemVSSD* vssd, bool isOSQ00) {
     requirePool(processor->m_Data, *cec);
     wanted.processor = processor;
     wanted.hasCompatModes = !cec->getCapability().m_lparProcCompatModes.isEmpty();
-    wanted.memory = zemOnlyMemory(*vssd, mtms, kClass, kMethod);
+    wanted.memory = zemOnlyMemory(*vssd, mtms, kCecVisitor, kCreateLpar);
     if (wanted.memory == nullptr) {
         throwMissing("Memory", *vssd, mtms);
     }

@@ -24,7 +24,7 @@ namespace {
 using Partition = zemPartitionAttribute;
 using Migration = zemQymoveCmdCaller::PartitionAttribute;
 
-constexpr char kClass[] = "zemLPARVisitor";
+constexpr char kLparVisitor[] = "zemLPARVisitor";
 
 /// How a value of the management library reads in a record, which has the tools' words.
 using Translation = zemString (*)(const zemString& value);
@@ -130,9 +130,9 @@ zemLPAR* zemLPARVisitor::getData(const zemString& mtms, const zemString& lparId,
         zemString text;
         text.format("The lpar(%s) does not exist on host %s", static_cast<const char*>(lparId),
                     static_cast<const char*>(mtms));
-        throw zemInvalidParameterException(kClass, "getData", text);
+        throw zemInvalidParameterException(kLparVisitor, "getData", text);
     }
-    zemExpectNoMore(records, kClass, "getData",
+    zemExpectNoMore(records, kLparVisitor, "getData",
                     "qyplat -r lpar --filter " + filter + " -m " + mtms);
     std::unique_ptr<zemLPAR> lpar(getLPAR(records.getElementAt(0)));
     if (capability != 0) {

@@ -17,7 +17,7 @@ namespace {
 
 using Edalloc = zemEdallocCmdCaller;
 
-constexpr char kClass[] = "zemLPARVisitor";
+constexpr char kLparVisitor[] = "zemLPARVisitor";
 
 /// Whose resource changes, and how: what stands in every line of the tool, and who follows it.
 struct Running {
@@ -152,7 +152,7 @@ Difference differenceOf(const zemRASDCommData& before, const zemRASDCommData& no
             return {reservation, difference(before.m_VirtualQuantity, now.m_VirtualQuantity)};
         default:
             throw zemOperationFailedException(
-                kClass, "ChangeRunningMemProcResource",
+                kLparVisitor, "ChangeRunningMemProcResource",
                 "ConsumerVisibility is not correct, ConsumerVisibility should be 3 when shared "
                 "mode, ConsumerVisibility should be 2 dedicated mode ");
     }

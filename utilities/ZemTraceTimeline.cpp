@@ -156,14 +156,14 @@ struct KindWords {
     const char* legend;
 };
 /// In the order of zemTraceKind.
-constexpr KindWords kKinds[] = {
+constexpr KindWords kKindWords[] = {
     {"operation", "operation of a provider"},
     {"broker", "call of the server"},
     {"tool", "tool"},
     {"api", "API call"},
 };
 
-const KindWords& wordsOf(zemTraceKind kind) { return kKinds[static_cast<std::size_t>(kind)]; }
+const KindWords& wordsOf(zemTraceKind kind) { return kKindWords[static_cast<std::size_t>(kind)]; }
 
 /// What a piece of work is called in its bar. Associations are told apart by their providers; the
 /// others' are called like their class.
@@ -394,7 +394,7 @@ void Picture::drawHead() {
                   zemMilliseconds(m_api.time).c_str(), zemMilliseconds(own).c_str());
     m_svg.text(kLeft, 54, "dim", made);
     double x = kLeft;
-    for (const KindWords& kind : kKinds) {
+    for (const KindWords& kind : kKindWords) {
         m_svg.box(x, 66, 14, 12, kind.style);
         m_svg.text(x + 20, 76, "", kind.legend);
         x += 20 + 7.4 * static_cast<double>(std::char_traits<char>::length(kind.legend)) + 28;

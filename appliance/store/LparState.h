@@ -6,6 +6,9 @@
 
 namespace appliance {
 
+/// The environment of partitions that serve others with adapters.
+constexpr const char* kIoServer = "xbrgserver";
+
 /// Whether the partition has processors at work: one that is suspended or not activated has none,
 /// though it keeps the resources that it holds.
 bool isActive(const Object& lpar);

@@ -26,7 +26,7 @@ std::string joined(const std::vector<std::string>& values) {
         if (i != 0) {
             line += ',';
         }
-        line += quoted(values[i]);
+        line += appliance::quoted(values[i]);  // not what streams know by this name
     }
     return line;
 }

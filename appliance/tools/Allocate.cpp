@@ -344,10 +344,10 @@ void removeAdapter(Change& change, const Operation& operation) {
     change.remove(*adapter);
 }
 
-constexpr const char* kEthernet =
+constexpr const char* kEthernetGiven =
     "ieee_virtual_eth,port_vlan_id,addl_vlan_ids,is_trunk,trunk_priority,vswitch";
-constexpr const char* kScsi = "adapter_type,remote_lpar_id,remote_lpar_name,remote_slot_num";
-constexpr const char* kSerial =
+constexpr const char* kScsiGiven = "adapter_type,remote_lpar_id,remote_lpar_name,remote_slot_num";
+constexpr const char* kSerialGiven =
     "adapter_type,remote_lpar_id,remote_lpar_name,remote_slot_num,supports_dnx";
 
 }  // namespace
@@ -361,11 +361,11 @@ const std::vector<Operation> kAllocateOperations = {
     {{kEdalloc, "proc", nullptr, "s", "sharing_mode,uncap_weight"}, setProcessors},
     {{kEdalloc, "io", "slot", "a", "slot_io_pool_id"}, addSlot},
     {{kEdalloc, "io", "slot", "r"}, removeSlot},
-    {{kEdalloc, "virtualio", "eth", "a", kEthernet}, addAdapter},
+    {{kEdalloc, "virtualio", "eth", "a", kEthernetGiven}, addAdapter},
     {{kEdalloc, "virtualio", "eth", "r"}, removeAdapter},
-    {{kEdalloc, "virtualio", "scsi", "a", kScsi}, addAdapter},
+    {{kEdalloc, "virtualio", "scsi", "a", kScsiGiven}, addAdapter},
     {{kEdalloc, "virtualio", "scsi", "r"}, removeAdapter},
-    {{kEdalloc, "virtualio", "serial", "a", kSerial}, addAdapter},
+    {{kEdalloc, "virtualio", "serial", "a", kSerialGiven}, addAdapter},
     {{kEdalloc, "virtualio", "serial", "r"}, removeAdapter},
 };
 

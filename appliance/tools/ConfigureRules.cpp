@@ -5,6 +5,7 @@
 
 #include "Adapters.h"
 #include "Failure.h"
+#include "LparState.h"
 #include "Text.h"
 
 namespace appliance {
@@ -204,7 +205,6 @@ const AttributeRule& ruleFor(const AttributeRules& rules, const std::string& nam
 }
 
 constexpr const char* kFlag = "0,1";
-constexpr const char* kIoServer = "xbrgserver";
 
 }  // namespace
 

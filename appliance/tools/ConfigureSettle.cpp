@@ -11,7 +11,7 @@ namespace appliance {
 
 namespace {
 
-constexpr const char* kSerial = "virtual_serial_adapters";
+constexpr const char* kSerialAdapters = "virtual_serial_adapters";
 constexpr const char* kUsualWeight = "128";
 
 constexpr const char* kLeastToMost[] = {"min_", "desired_", "max_"};
@@ -102,7 +102,7 @@ void settleProcessors(const HostView& host, const Settings& settings, Object& pr
 }
 
 void settleSlots(const HostView& host, Object& profile) {
-    std::vector<std::string> serial = elementsOf(kSerial, profile.get(kSerial));
+    std::vector<std::string> serial = elementsOf(kSerialAdapters, profile.get(kSerialAdapters));
     for (std::int64_t console = 0; console < 2; ++console) {
         const std::string key = std::to_string(console) + '/';
         const auto isIt = [&](const std::string& e) { return e.rfind(key, 0) == 0; };
@@ -113,7 +113,7 @@ void settleSlots(const HostView& host, Object& profile) {
         serial.insert(serial.begin() + std::min<std::ptrdiff_t>(console, size),
                       adapterElement(*adapterForm(Kind::Serial), {Kind::Serial, {0, 0, console}}));
     }
-    profile.update(kSerial, adapterList(serial));
+    profile.update(kSerialAdapters, adapterList(serial));
     adaptersOf(profile);
 
     for (const IoSlot& slot : ioSlotsFromList(profile.get("io_slots"))) {

@@ -15,26 +15,26 @@ namespace {
 using Words = std::unordered_set<std::string>;
 
 /// One value as it was written: a quoted one is never joined with its neighbours.
-struct Value {
+struct WrittenValue {
     std::string text;
     bool quoted;
 };
 
 struct Item {
     std::string name;
-    std::vector<Value> values;
+    std::vector<WrittenValue> values;
 };
 
 /// What a filter compares. Of a filter that names partitions, a value that names none is a
 /// failure: callers must learn that a partition is gone, while an empty answer says that it has
 /// nothing of the kind.
-struct Rule {
+struct FilterRule {
     const char* name;
     const char* attribute;
     std::optional<Fault> unknown = {};  ///< of filters that name partitions
 };
 
-constexpr Rule kRules[] = {
+constexpr FilterRule kRules[] = {
     {"lpar_ids", "lpar_id", Fault::LparIdNotFound},
     {"lpar_names", "lpar_name", Fault::LparNameNotFound},
     {"profile_names", "name"},
@@ -126,8 +126,8 @@ Words resolve(const Item& item, const Words& known, std::vector<std::string>& st
 
 /// @param names  of the filters that the resource has
 /// @throws Failure UnknownFilter
-const Rule& ruleFor(const Item& item, const char* names) {
-    for (const Rule& rule : kRules) {
+const FilterRule& ruleFor(const Item& item, const char* names) {
+    for (const FilterRule& rule : kRules) {
         if (item.name == rule.name && isListed(names, item.name)) {
             return rule;
         }
@@ -136,7 +136,7 @@ const Rule& ruleFor(const Item& item, const char* names) {
 }
 
 /// Every value that the filter's attribute has.
-Words valuesOf(const Rule& rule, const Hosts& hosts, const std::vector<Row>& rows) {
+Words valuesOf(const FilterRule& rule, const Hosts& hosts, const std::vector<Row>& rows) {
     Words words;
     if (!rule.unknown) {
         for (const Row& row : rows) {
@@ -159,7 +159,7 @@ void applyFilter(const std::string& text, const char* names, const Hosts& hosts,
     std::vector<Item> items;
     parse(text, true, items);
     for (const Item& item : items) {
-        const Rule& rule = ruleFor(item, names);
+        const FilterRule& rule = ruleFor(item, names);
         std::vector<std::string> strangers;
         const Words chosen = resolve(item, valuesOf(rule, hosts, rows), strangers);
         if (rule.unknown && !strangers.empty()) {

@@ -26,7 +26,6 @@ namespace appliance {
 namespace {
 
 constexpr int kSteps = 10;
-constexpr const char* kIoServer = "xbrgserver";
 
 /// What tells of a move at both of its ends.
 constexpr const char* kTelling =

@@ -27,7 +27,7 @@ constexpr Environment kEnvironments[] = {
 /// Attributes that are handled here, and those that are the partition's own; all others are its
 /// profile's.
 constexpr const char* kOwn = "lpar_id,name,profile_name,lpar_env,all_resources";
-constexpr const char* kLparNames = "allow_perf_collection,lpar_avail_priority";
+constexpr const char* kLparSettings = "allow_perf_collection,lpar_avail_priority";
 
 constexpr const char* kEdges[] = {"min_", "desired_", "max_"};
 
@@ -75,7 +75,7 @@ Object newProfile(const HostView& host, const Settings& settings, const Place& p
         profile.set(edge + "proc_units", "0.0");
     }
     for (const Setting& setting : settings) {
-        if (isListed(kOwn, setting.name) || isListed(kLparNames, setting.name)) {
+        if (isListed(kOwn, setting.name) || isListed(kLparSettings, setting.name)) {
             continue;
         }
         apply(host, profileRules(), setting, profile);
@@ -102,7 +102,7 @@ Object newLpar(const HostView& host, const Settings& settings, const Object& pro
     }
     takeSettings(profile, lpar);
     for (const Setting& setting : settings) {
-        if (isListed(kLparNames, setting.name)) {
+        if (isListed(kLparSettings, setting.name)) {
             apply(host, lparRules(), setting, lpar);
         }
     }
@@ -178,7 +178,8 @@ void requireFreeName(const HostView& host, const std::string& name) {
 }
 
 const char* newLparNames() {
-    static const std::string names = namesOf(profileRules(), std::string(kOwn) + ',' + kLparNames);
+    static const std::string names =
+        namesOf(profileRules(), std::string(kOwn) + ',' + kLparSettings);
     return names.c_str();
 }
 

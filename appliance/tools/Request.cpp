@@ -9,20 +9,20 @@ namespace appliance {
 
 namespace {
 
-constexpr unsigned kByHost = kQyplat | kQyalloc | kQymove | kQyusage | kQyfault | kQylink;
-constexpr unsigned kByAttribute = kByHost | kQylwh;
+constexpr unsigned kHostTools = kQyplat | kQyalloc | kQymove | kQyusage | kQyfault | kQylink;
+constexpr unsigned kAttributeTools = kHostTools | kQylwh;
 constexpr unsigned kChange = kEdalloc | kEdplat | kNwplat | kDlplat | kEdpower | kEdsusp | kDomove;
-constexpr unsigned kAll = kByAttribute | kQydyn | kXbrgcli | kChange;
+constexpr unsigned kAll = kAttributeTools | kQydyn | kXbrgcli | kChange;
 
 constexpr Option kOptions[] = {
-    {"-r", kByHost, "<resource>", "what to list"},
+    {"-r", kHostTools, "<resource>", "what to list"},
     {"--rsubtype", kQyalloc, "<subtype>", "which kind of that resource"},
     {"--level", kQyalloc, "<level>", "whose share of it"},
-    {"-m", kByHost, "<managed system>",
+    {"-m", kHostTools, "<managed system>",
      "by its name or as <type_model>*<serial_num>; all when absent or empty"},
     {"--filter", kQyplat | kQyalloc | kQymove | kQyusage | kQyfault, "\"<name>=<value>,...,...\"",
      "only records that have one of the values; several filters must all hold"},
-    {"-F", kByAttribute, "[<attribute>,...]",
+    {"-F", kAttributeTools, "[<attribute>,...]",
      "print these values without names; all of them when the list is empty"},
     {"--maxmem", kQyalloc, "<megabytes>",
      "memory that a partition may grow to, for the required_min_mem attributes"},

@@ -55,4 +55,9 @@ function(zem_target target)
     -Wall -Wextra -Wpedantic -Wshadow
     $<$<COMPILE_LANGUAGE:CXX>:-Wconversion -Wnon-virtual-dtor>
     $<$<COMPILE_LANG_AND_ID:CXX,Clang>:-Wno-gnu-zero-variadic-macro-arguments>)
+  # What is private to a source gcc takes for a header's when it is compiled with others.
+  if(CMAKE_UNITY_BUILD)
+    target_compile_options(${target} PRIVATE
+      $<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wno-subobject-linkage>)
+  endif()
 endfunction()

@@ -48,6 +48,7 @@ class CallFrame {
 public:
     explicit CallFrame(const zemJvmHelper& helper)
         : m_helper(helper), m_isPushed(helper.getEnv()->PushLocalFrame(kMostReferences) == 0) {}
+    // NOLINTNEXTLINE(bugprone-exception-escape): is asked to throw nothing
     ~CallFrame() {
         m_helper.checkException(m_helper.getEnv(), false);
         if (m_isPushed) {

@@ -61,11 +61,23 @@ std::unique_ptr<zemCECVisitor> readPartitions(zemVirtualizationManager& manager,
                                               const CmpiContext& context,
                                               const SettingOwner& whose);
 
+/// The same with profiles and all that the settings of @p classes are made of.
+std::unique_ptr<zemCECVisitor> readForSettings(zemVirtualizationManager& manager,
+                                               const CmpiContext& context,
+                                               const SettingOwner& whose,
+                                               const std::vector<const SettingClass*>& classes);
+
 /// Receives the settings of a system with its RASDs; the host lives as long as the call.
 using SystemSink = std::function<void(zemCEC& host, std::unique_ptr<zemVSSD> system)>;
 
-/// Hands the settings of @p whose to @p sink, those of a partition's state in front of those of its
-/// profiles, with the resources of @p classes, of which there is one at least.
+/// Hands the settings of all partitions that have been read for them to @p sink, those of a
+/// partition's state in front of those of its profiles, with the resources of @p classes, of which
+/// there is one at least.
+/// @throws what zemVSSDVisitor throws
+void makeSettings(zemCECVisitor& hosts, const std::vector<const SettingClass*>& classes,
+                  const SystemSink& sink);
+
+/// Reads the settings of @p whose for this, and hands them to @p sink.
 /// @throws what zemCECVisitor and zemVSSDVisitor throw
 void readSettings(const CmpiContext& context, const SettingOwner& whose,
                   const std::vector<const SettingClass*>& classes, const SystemSink& sink);
@@ -93,14 +105,26 @@ public:
     CMPIBoolean isValidInstanceClass(const char* className) override;
 
 protected:
-    void populateEssentialKeys(const char* className, CmpiArray& keys) override;
-
-private:
     using Sink = std::function<void(const Setting& setting)>;
 
+    void populateEssentialKeys(const char* className, CmpiArray& keys) override;
+
+    /// Whether all settings are asked for, not those that could belong to @p asked.
+    bool isAll(const CmpiObjectPath& asked) const;
+    const SettingClass& settingClass() const { return m_class; }
+
+    /// What makes of settings that it is handed the paths and the instances of an enumeration,
+    /// whose arguments outlive it.
+    Sink namesInto(const CmpiObjectPath& path, zemDynamicArray<CmpiObjectPath>& out) const;
+    Sink instancesInto(const CmpiObjectPath& path, const char** properties,
+                       zemDynamicArray<CmpiInstance>& out) const;
+
+    /// Hands the settings of hosts that have been read for them to @p sink.
+    void tell(zemCECVisitor& hosts, const Sink& sink) const;
+
+private:
     /// Hands the settings of @p whose to @p sink, those of a partition's state first.
     void read(const CmpiContext& context, const SettingOwner& whose, const Sink& sink) const;
-    void tell(zemVSSD& system, const Sink& sink) const;
     SettingOwner scopeOf(const CmpiObjectPath& asked) const;
     CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
                               const Setting& setting) const;

@@ -42,6 +42,19 @@ void sharing(Record& record, const zemApiProp& object, const char* mode, const c
     (record.*setter)(object.getProperty(mode), object.getProperty(donor), object.getProperty(key));
 }
 
+template <class Record>
+void fill(Record& record, const zemApiProp& object, const Field<Record>* fields,
+          std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+        fields[i].set(record, object, fields[i].key);
+    }
+}
+
+constexpr Field<PoolProcessor> kPoolProcessor[] = {
+    {"ConfigurableProcUnits", set<&PoolProcessor::setConfigurablePoolProcUnits>},
+    {"PendAvailProcUnits", set<&PoolProcessor::setPendAvailPoolProcUnits>},
+};
+
 constexpr Field<zemCEC> kHost[] = {
     {"Name", set<&zemCEC::setMTMS>},
     {"UserDefinedName", set<&zemCEC::setSystemName>},
@@ -51,6 +64,13 @@ constexpr Field<zemCEC> kHost[] = {
     {"GlvExCaps",
      [](zemCEC& host, const zemApiProp& object, const char* key) {
          host.setCapability(object.getProperty(key), object.getProperty("RuntimeCapability"));
+     }},
+    // of the processors that a host's shared pools are made of
+    {"ConfigurableProcUnits",
+     [](zemCEC& host, const zemApiProp& object, const char* /*key*/) {
+         PoolProcessor pools(host.getMTMS());
+         fill(pools, object, kPoolProcessor, std::size(kPoolProcessor));
+         host.setPoolProcessor(pools);
      }},
 };
 
@@ -233,11 +253,6 @@ constexpr Field<SysProcessor> kSysProcessor[] = {
     {"PendAvailProcUnits", set<&SysProcessor::setPendAvailSysProcUnits>},
 };
 
-constexpr Field<PoolProcessor> kPoolProcessor[] = {
-    {"ConfigurableProcUnits", set<&PoolProcessor::setConfigurablePoolProcUnits>},
-    {"PendAvailProcUnits", set<&PoolProcessor::setPendAvailPoolProcUnits>},
-};
-
 constexpr Field<ProcessorPool> kProcessorPool[] = {
     {"SharedProcPoolId", set<&ProcessorPool::setSharedProcPoolId>},
     {"MaxPoolCapacity", set<&ProcessorPool::setMaxPoolCapacity>},
@@ -260,10 +275,6 @@ constexpr Field<MemoryPool> kMemoryPool[] = {
     {"pend_pool_mem", set<&MemoryPool::setPendPoolMem>},
     {"SystemName", [](MemoryPool& pool, const zemApiProp& object,
                       const char* key) { pool.setSupport(!object.getProperty(key).isEmpty()); }},
-};
-
-constexpr Field<zemHardwareResource> kAnySlot[] = {
-    {"SystemName", set<&zemHardwareResource::setMTMS>},
 };
 
 /// The library's operations that give a collection: of all hosts, of one, and of one partition.
@@ -320,21 +331,16 @@ std::unique_ptr<Lpar> recordOf(const zemApiProp& object, const char* key) {
 
 template <>
 std::unique_ptr<Slot> recordOf(const zemApiProp& object, const char* key) {
-    const zemString lparid = object.getProperty("lpar_id");
     const zemString mtms = object.getProperty(key);
-    if (lparid.isEmpty() || mtms.isEmpty()) {
-        return nullptr;
-    }
-    return std::make_unique<Slot>(mtms, lparid);
+    return mtms.isEmpty() ? nullptr : std::make_unique<Slot>(mtms, object.getProperty("lpar_id"));
 }
 
+/// Of a slot that is free, nobody asks what it is.
 template <class Record>
-void fill(Record& record, const zemApiProp& object, const Field<Record>* fields,
-          std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
-        fields[i].set(record, object, fields[i].key);
-    }
+bool isFilled(const Record& /*record*/) {
+    return true;
 }
+bool isFilled(const Slot& slot) { return !slot.getLparID().isEmpty(); }
 
 /// The records of a collection, filled from the first @p count rows of @p fields.
 template <class Record>
@@ -347,10 +353,13 @@ zemDynamicArray<Record> recordsOf(const char* operation, const Calls& calls, con
     for (apiProp& each : objects) {
         const zemApiProp object(&each);
         std::unique_ptr<Record> record = recordOf<Record>(object, key);
-        if (record != nullptr) {
-            fill(*record, object, fields, count);
-            records.addElement(std::move(record));
+        if (record == nullptr) {
+            continue;
         }
+        if (isFilled(*record)) {
+            fill(*record, object, fields, count);
+        }
+        records.addElement(std::move(record));
     }
     return records;
 }
@@ -405,9 +414,6 @@ OF_PARTITIONS(getAllProcessorLevelLparByKeys, Processor,
 OF_PARTITIONS(getAllMemoryLevelLparByKeys, Memory,
               getAllLparMemoryCfgs, getAllLparMemoryCfg, getLparMemoryCfg,
               "Name", kMemory)
-OF_PARTITIONS(getAllIOSlotLevelLparByKeys, Slot,
-              getAllIoSlots, getIoSlots, getLparIoSlots,
-              "SystemName", kSlot)
 OF_PARTITIONS(getAllSerialAdapterLevelLparByKeys, Serial,
               getAllLparVirtualSerial, getVirtualSerial, getLparVirtualSerial,
               "Name", kSerial)
@@ -429,12 +435,31 @@ OF_HOSTS(getAllMemoryLevelSysByKeys, SysMemory,
          getAllCecMemoryCfg, getCecMemoryCfg, "Name", kSysMemory)
 OF_HOSTS(getAllMemoryPoolByKeys, MemoryPool,
          getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, "SystemName", kMemoryPool)
-OF_HOSTS(getAllIOSlotLevelSysByKeys, zemHardwareResource,
-         getAllIoSlots, getIoSlots, "SystemName", kAnySlot)
 // clang-format on
 
 #undef OF_PARTITIONS
 #undef OF_HOSTS
+
+zemDynamicArray<Slot> zemCECVisitor::slots(const zemString& userName, int /*level*/,
+                                           const zemString& mtms, const zemString& lparid) const {
+    constexpr Calls calls = {&zemApiCaller::getAllIoSlots, &zemApiCaller::getIoSlots,
+                             &zemApiCaller::getLparIoSlots};
+    return recordsOf("getAllIOSlotLevelLparByKeys", calls, "SystemName", kSlot, std::size(kSlot),
+                     {actor(userName), mtms, lparid});
+}
+
+zemDynamicArray<Slot> zemCECVisitor::getAllIOSlotLevelLparByKeys(const zemString& userName,
+                                                                 int level, const zemString& mtms,
+                                                                 const zemString& lparid) const {
+    zemDynamicArray<Slot> all = slots(userName, level, mtms, lparid);
+    zemDynamicArray<Slot> owned;
+    for (int i = 0; i < all.size(); ++i) {
+        if (isFilled(*all.getElementAt(i))) {
+            owned.addElement(std::unique_ptr<Slot>(std::exchange(all[i], nullptr)));
+        }
+    }
+    return owned;
+}
 
 void zemReadProfile(apiProp& object, zemPartitionProfileConfiguration& profile) {
     fill(profile, zemApiProp(&object), kProfile, std::size(kProfile));

@@ -35,13 +35,6 @@ void set(Record& record, const zemApiProp& object, const char* key) {
     (record.*setter)(object.getProperty(key));
 }
 
-/// How processors are shared follows from the mode, from donating, and from the row's own property.
-template <auto setter, class Record>
-void sharing(Record& record, const zemApiProp& object, const char* mode, const char* donor,
-             const char* key) {
-    (record.*setter)(object.getProperty(mode), object.getProperty(donor), object.getProperty(key));
-}
-
 template <class Record>
 void fill(Record& record, const zemApiProp& object, const Field<Record>* fields,
           std::size_t count) {
@@ -74,11 +67,13 @@ constexpr Field<zemCEC> kHost[] = {
      }},
 };
 
-/// The first row is all that is read below Level_All.
+/// All that is read below Level_All.
+constexpr Field<Lpar> kLparState[] = {{"PartitionState", set<&Lpar::setStatePlus>}};
+
 constexpr Field<Lpar> kLpar[] = {
-    {"PartitionState", set<&Lpar::setStatePlus>},
     {"UserDefinedName", set<&Lpar::setLparName>},
     {"DefinitionState", set<&Lpar::setVirtualSystemType>},
+    {"PartitionState", set<&Lpar::setStatePlus>},
     {"BootMode", set<&Lpar::setBootMode>},
     {"MigrationState",
      [](Lpar& lpar, const zemApiProp& object, const char* key) {
@@ -102,11 +97,13 @@ constexpr Field<Profile> kProfile[] = {
     {"MaxVirtualSlots", set<&Profile::setMaxVirtualSlots>},
     {"BootMode", set<&Profile::setBootMode>},
     {"RedundantPath", set<&Profile::setRedundantErrPathReporting>},
-    {"ProcMode", set<&Profile::setProcMode>},
-    {"ProcessorMode", set<&Profile::setLparProcCompatMode>},
-    {"SharingMode",
+    {"ProcMode",
      [](Profile& profile, const zemApiProp& object, const char* key) {
-         sharing<&Profile::setSharingMode>(profile, object, "ProcMode", "DonorMode", key);
+         const zemString mode = object.getProperty(key);
+         profile.setProcMode(mode);
+         profile.setLparProcCompatMode(object.getProperty("ProcessorMode"));
+         const zemString sharing = object.getProperty("SharingMode");
+         profile.setSharingMode(mode, object.getProperty("DonorMode"), sharing);
      }},
     {"UncappedWeight", set<&Profile::setUncapWeight>},
     {"MinProcUnit", set<&Profile::setMinProcsUnits>},
@@ -133,36 +130,46 @@ constexpr Field<Profile> kProfile[] = {
     {"io_slots", set<&Profile::setIoSlots>},
 };
 
-/// The mode stands twice, and behind it the pending one: both setters of modes fill one field, in
-/// which the pending mode stays.
+/// Processors in effect, or of the pending change: the mode fills two fields, and says what the
+/// codes of sharing mean, which the library tells behind what is given out.
+template <auto setMode, auto setPool, auto setProcs, auto setUnits, auto setSharing>
+void setShares(Processor& record, const zemApiProp& object, const char* const (&keys)[5]) {
+    const zemString mode = object.getProperty(keys[0]);
+    (record.*setMode)(mode);
+    (record.*setPool)(mode);
+    (record.*setProcs)(object.getProperty(keys[1]));
+    (record.*setUnits)(object.getProperty(keys[2]));
+    const zemString donor = object.getProperty(keys[3]);
+    (record.*setSharing)(mode, donor, object.getProperty(keys[4]));
+}
+
+/// Both setters of modes fill one field, in which the pending mode stays.
 constexpr Field<Processor> kProcessor[] = {
     {"UserDefinedName", set<&Processor::setLparName>},
     {"CurMaxProcs", set<&Processor::setCurrMaxProcs>},
     {"CurMaxProcUnits", set<&Processor::setCurrMaxProcUnits>},
     {"CurMinProcs", set<&Processor::setCurrMinProcs>},
     {"CurMinProcUnits", set<&Processor::setCurrMinProcUnits>},
-    {"CurProcMode", set<&Processor::setCurrProcMode>},
-    {"CurProcMode", set<&Processor::setCurrSharedProcPoolId>},
-    {"CurAllocProcs", set<&Processor::setCurrProcs>},
-    {"CurAllocProcUnits", set<&Processor::setCurrProcUnits>},
-    {"CurSharingMode",
+    {"CurProcMode",
      [](Processor& record, const zemApiProp& object, const char* key) {
-         sharing<&Processor::setCurrSharingMode>(record, object, "CurProcMode", "CurDonorMode",
-                                                 key);
+         setShares<&Processor::setCurrProcMode, &Processor::setCurrSharedProcPoolId,
+                   &Processor::setCurrProcs, &Processor::setCurrProcUnits,
+                   &Processor::setCurrSharingMode>(
+             record, object,
+             {key, "CurAllocProcs", "CurAllocProcUnits", "CurDonorMode", "CurSharingMode"});
      }},
     {"CurUncappedWeight", set<&Processor::setCurrUncapWeight>},
     {"PendMaxProcs", set<&Processor::setPendMaxProcs>},
     {"PendMaxProcUnits", set<&Processor::setPendMaxProcUnits>},
     {"PendMinProcs", set<&Processor::setPendMinProcs>},
     {"PendMinProcUnits", set<&Processor::setPendMinProcUnits>},
-    {"PendProcMode", set<&Processor::setPendProcMode>},
-    {"PendProcMode", set<&Processor::setPendSharedProcPoolId>},
-    {"PendAllocProcs", set<&Processor::setPendProcs>},
-    {"PendAllocProcUnits", set<&Processor::setPendProcUnits>},
-    {"PendSharingMode",
+    {"PendProcMode",
      [](Processor& record, const zemApiProp& object, const char* key) {
-         sharing<&Processor::setPendSharingMode>(record, object, "PendProcMode", "PendDonorMode",
-                                                 key);
+         setShares<&Processor::setPendProcMode, &Processor::setPendSharedProcPoolId,
+                   &Processor::setPendProcs, &Processor::setPendProcUnits,
+                   &Processor::setPendSharingMode>(
+             record, object,
+             {key, "PendAllocProcs", "PendAllocProcUnits", "PendDonorMode", "PendSharingMode"});
      }},
     {"PendUncappedWeight", set<&Processor::setPendUncapWeight>},
     {"RuntimeProcs", set<&Processor::setRunProcs>},
@@ -370,8 +377,10 @@ zemDynamicArray<zemLPAR> zemCECVisitor::getAllPartitionObjectsByKeys(
     const zemString& userName, int level, const zemString& mtms, const zemString& lparid) const {
     constexpr Calls calls = {&zemApiCaller::getAllLpars, &zemApiCaller::getAllLparsFromCec,
                              &zemApiCaller::getLparObj};
-    return recordsOf("getAllPartitionObjectsByKeys", calls, "Name", kLpar,
-                     level < Level_All ? 1 : std::size(kLpar), {actor(userName), mtms, lparid});
+    const bool isAll = level >= Level_All;
+    return recordsOf("getAllPartitionObjectsByKeys", calls, "Name", isAll ? kLpar : kLparState,
+                     isAll ? std::size(kLpar) : std::size(kLparState),
+                     {actor(userName), mtms, lparid});
 }
 
 zemDynamicArray<zemLPAR> zemCECVisitor::getAllPartitionObjectsByKeys(

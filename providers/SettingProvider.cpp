@@ -103,9 +103,16 @@ std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path) {
 
 std::string settingKeyOf(const CmpiObjectPath& path) { return keyOf(path, kKey); }
 
-CmpiObjectPath settingPath(const CmpiObjectPath& near, const SettingClass& row,
-                           const zemString& id) {
-    CmpiObjectPath path = zemBaseProvider::createObjectPath(near, row.name);
+SettingPaths::SettingPaths(const CmpiObjectPath& near, const SettingClass& row)
+    : m_className(row.name),
+      m_nameSpace(near.getNameSpace().charPtr()),
+      m_host(near.getHostname().charPtr()) {}
+
+CmpiObjectPath SettingPaths::operator()(const zemString& id) const {
+    CmpiObjectPath path(static_cast<const char*>(m_nameSpace), m_className);
+    if (!m_host.isEmpty()) {
+        path.setHostname(static_cast<const char*>(m_host));
+    }
     path.setKey(kKey, CmpiData(static_cast<const char*>(id)));
     return path;
 }
@@ -202,7 +209,7 @@ int SettingProvider::getInstance(const CmpiContext& context, const CmpiObjectPat
         read(context, parts->owner, [&](const Setting& setting) {
             if (!isFound && setting.id == id.c_str()) {
                 isFound = true;
-                out = makeInstance(path, properties, setting);
+                out = makeInstance(SettingPaths(path, m_class), properties, setting);
             }
         });
     } catch (const zemException& e) {
@@ -235,16 +242,16 @@ void SettingProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
 
 SettingProvider::Sink SettingProvider::namesInto(const CmpiObjectPath& path,
                                                  zemDynamicArray<CmpiObjectPath>& out) const {
-    return [this, &path, &out](const Setting& setting) {
-        out.addElement(std::make_unique<CmpiObjectPath>(settingPath(path, m_class, setting.id)));
+    return [paths = SettingPaths(path, m_class), &out](const Setting& setting) {
+        out.addElement(std::make_unique<CmpiObjectPath>(paths(setting.id)));
     };
 }
 
 SettingProvider::Sink SettingProvider::instancesInto(const CmpiObjectPath& path,
                                                      const char** properties,
                                                      zemDynamicArray<CmpiInstance>& out) const {
-    return [this, &path, properties, &out](const Setting& setting) {
-        out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, setting)));
+    return [this, paths = SettingPaths(path, m_class), properties, &out](const Setting& setting) {
+        out.addElement(std::make_unique<CmpiInstance>(makeInstance(paths, properties, setting)));
     };
 }
 
@@ -278,10 +285,10 @@ SettingOwner SettingProvider::scopeOf(const CmpiObjectPath& asked) const {
     return isAll(asked) ? SettingOwner() : settingOwnerOf(asked).value_or(SettingOwner());
 }
 
-CmpiInstance SettingProvider::makeInstance(const CmpiObjectPath& near, const char** properties,
+CmpiInstance SettingProvider::makeInstance(const SettingPaths& paths, const char** properties,
                                            const Setting& setting) const {
     const Keys keys = {{kKey, CmpiData(static_cast<const char*>(setting.id))}};
-    CmpiInstance instance = newInstance(settingPath(near, m_class, setting.id), keys, properties);
+    CmpiInstance instance = newInstance(paths(setting.id), keys, properties);
     showSetting(instance, m_class, properties, setting);
     return instance;
 }

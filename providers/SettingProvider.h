@@ -47,9 +47,17 @@ std::optional<SettingId> settingIdOf(const SettingClass& row, const std::string&
 /// The InstanceID that is the key of a path; empty without it.
 std::string settingKeyOf(const CmpiObjectPath& path);
 
-/// The path of settings, in the namespace of @p near.
-CmpiObjectPath settingPath(const CmpiObjectPath& near, const SettingClass& row,
-                           const zemString& id);
+/// Makes paths of settings of a class, in the namespace of another path, of which the server is
+/// asked once for all of them.
+class SettingPaths {
+public:
+    SettingPaths(const CmpiObjectPath& near, const SettingClass& row);
+    CmpiObjectPath operator()(const zemString& id) const;
+
+private:
+    const char* m_className;
+    zemString m_nameSpace, m_host;
+};
 
 /// The partition that an object is, or whose settings it is.
 std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path);
@@ -126,7 +134,7 @@ private:
     /// Hands the settings of @p whose to @p sink, those of a partition's state first.
     void read(const CmpiContext& context, const SettingOwner& whose, const Sink& sink) const;
     SettingOwner scopeOf(const CmpiObjectPath& asked) const;
-    CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
+    CmpiInstance makeInstance(const SettingPaths& paths, const char** properties,
                               const Setting& setting) const;
 
     const SettingClass& m_class;

@@ -160,7 +160,7 @@ void fillErrorTable(ObjectTables& tables);      // ErrorEntries.cpp
 InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path);
 /// Sets a property as a provider does: checked against the class when it is known.
 /// @throws Failure CMPI_RC_ERR_NO_SUCH_PROPERTY, CMPI_RC_ERR_TYPE_MISMATCH
-void setInstanceProperty(Broker& broker, InstanceBody& body, std::string_view name, Value value);
+void setInstanceProperty(Broker& broker, InstanceBody& body, std::string_view name, Value&& value);
 
 /// The names of a null-terminated list.
 std::vector<std::string> namesIn(const char** names);

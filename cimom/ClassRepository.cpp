@@ -52,13 +52,18 @@ std::vector<const CimClass*> CimClass::allSubclasses() const {
 
 const CimClass::InitialValues& CimClass::initialValues() const {
     std::call_once(m_initialValues.made, [this] {
-        for (const auto& property : properties) {
-            Value value = property->defaultValue;
-            value.retypeNull(typeOf(*property));
+        for (std::size_t i = 0; i < properties.size(); ++i) {
+            const CimProperty& property = properties[i];
+            const std::string& lasting = lastingName(property.name);
+            m_initialValues.names.push_back(&lasting);
+            Value value = property.defaultValue;
+            value.retypeNull(typeOf(property));
             if (!value.isNull()) {
-                m_initialValues.ofDefaults.set(property->name, value);
+                m_initialValues.ofDefaults.addLasting(lasting, Value(value));
+            } else if (i < m_initialValues.without.size()) {
+                m_initialValues.without.set(i);
             }
-            m_initialValues.all.set(property->name, std::move(value));
+            m_initialValues.all.addLasting(lasting, std::move(value));
         }
     });
     return m_initialValues;

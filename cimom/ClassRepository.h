@@ -13,6 +13,7 @@
 #ifndef CIMOM_CLASS_REPOSITORY_H
 #define CIMOM_CLASS_REPOSITORY_H
 
+#include <bitset>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
@@ -56,10 +57,15 @@ public:
         m_index.emplace(item->name, position);
         m_items[position] = std::move(item);
     }
+    /// The position of the element of that name; size() when there is none.
+    std::size_t indexOf(std::string_view name) const {
+        auto found = m_index.find(name);
+        return found == m_index.end() ? m_items.size() : found->second;
+    }
     /// The element of that name, or null.
     const T* find(std::string_view name) const {
-        auto found = m_index.find(name);
-        return found == m_index.end() ? nullptr : m_items[found->second].get();
+        const std::size_t at = indexOf(name);
+        return at == m_items.size() ? nullptr : m_items[at].get();
     }
     std::size_t size() const { return m_items.size(); }
     bool empty() const { return m_items.empty(); }
@@ -108,6 +114,9 @@ struct CimMethod : CimElement {
     NamedList<CimParameter> parameters;
 };
 
+/// Some of the properties of a class, by position; those behind the end are never among them.
+using Positions = std::bitset<128>;
+
 /// A class with all that it inherits. Inherited features come first, in the superclass's order.
 struct CimClass : CimQualified {
     std::string name;
@@ -124,8 +133,11 @@ struct CimClass : CimQualified {
     bool isA(const CimClass& base) const;
     /// All classes below this one, parents before children; without this class.
     std::vector<const CimClass*> allSubclasses() const;
-    /// The properties that have a default, with it.
+    /// The properties that have a default, with it, and those that have none.
     const NamedValues& defaults() const { return initialValues().ofDefaults; }
+    const Positions& withoutDefault() const { return initialValues().without; }
+    /// The name of a property, by its position, for the values of instances: it lasts.
+    const std::string& lastingNameAt(std::size_t at) const { return *initialValues().names[at]; }
     /// All properties, with their defaults or null.
     const NamedValues& blank() const { return initialValues().all; }
 
@@ -134,6 +146,8 @@ private:
         std::once_flag made;
         NamedValues ofDefaults;
         NamedValues all;
+        Positions without;
+        std::vector<const std::string*> names;
     };
     const InitialValues& initialValues() const;
 

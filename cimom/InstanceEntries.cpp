@@ -1,5 +1,7 @@
 // Entries of CMPIInstance, and the rules by which the class of an instance checks its properties.
 
+#include <algorithm>
+
 #include "NamedEntries.h"
 #include "PathText.h"
 
@@ -9,6 +11,22 @@ namespace {
 
 const CimProperty* declared(const InstanceBody& body, std::string_view name) {
     return body.cls ? body.cls->properties.find(name) : nullptr;
+}
+
+// Stores the value of a property at a position in the class, or behind it. One that is not there
+// yet need not be looked for among the others.
+void store(InstanceBody& body, std::size_t at, std::string_view name, Value&& value) {
+    if (at >= body.unset.size() || !body.unset[at]) {
+        body.value.properties.set(name, std::move(value));
+        return;
+    }
+    body.unset.reset(at);
+    const std::string& lasting = body.cls->lastingNameAt(at);
+    if (lasting == name) {
+        body.value.properties.addLasting(lasting, std::move(value));
+    } else {  // in other letters
+        body.value.properties.add(name, std::move(value));
+    }
 }
 
 bool passesFilter(const InstanceBody& body, std::string_view name) {
@@ -59,14 +77,16 @@ void takeKeys(InstanceBody& body) {
     const NamedValues keys = body.value.path.keys;
     for (const auto& [name, value] : keys) {
         Value typed = value;
+        std::size_t at = body.unset.size();
         if (body.cls) {
-            const CimProperty* element = declared(body, name);
-            if (!element || !value.convertTo(typeOf(*element), typed)) {
+            const auto& properties = body.cls->properties;
+            at = properties.indexOf(name);
+            if (at == properties.size() || !value.convertTo(typeOf(properties[at]), typed)) {
                 continue;
             }
         }
         setKey(body, name, typed);
-        body.value.properties.set(name, std::move(typed));
+        store(body, at, name, std::move(typed));
     }
 }
 
@@ -102,6 +122,7 @@ CMPIObjectPath* getObjectPath(InstanceBody& body, Broker& broker) {
 void setObjectPath(InstanceBody& body, Broker& broker, const CMPIObjectPath* path) {
     body.value.path = bodyOf(path);
     body.cls = broker.classOf(body.value.path);
+    body.unset.reset();
     takeKeys(body);
 }
 
@@ -158,15 +179,23 @@ InstanceBody newInstanceOf(Broker& broker, const ObjectPath& path) {
     }
     if (body.cls) {
         body.value.properties = broker.lean() ? body.cls->blank() : body.cls->defaults();
-        body.value.properties.reserve(body.cls->properties.size() / 2);  // what most are given
+        body.unset = broker.lean() ? Positions() : body.cls->withoutDefault();
+        // most are given half of the many properties of a class, and nearly all of few
+        constexpr std::size_t kFew = 32;
+        const std::size_t all = body.cls->properties.size();
+        body.value.properties.reserve(std::max(std::min(all, kFew), all / 2));
     }
     takeKeys(body);
     return body;
 }
 
-void setInstanceProperty(Broker& broker, InstanceBody& body, std::string_view name, Value value) {
-    const CimProperty* element = declared(body, name);
+void setInstanceProperty(Broker& broker, InstanceBody& body, std::string_view name, Value&& value) {
+    const CimProperty* element = nullptr;
+    std::size_t at = body.unset.size();
     if (body.cls) {
+        const auto& properties = body.cls->properties;
+        at = properties.indexOf(name);
+        element = at == properties.size() ? nullptr : &properties[at];
         check(broker.lean(), *body.cls, element, name, value);
     }
     // The path of an instance is made of its key properties.
@@ -177,7 +206,7 @@ void setInstanceProperty(Broker& broker, InstanceBody& body, std::string_view na
     if (!value.isNull() && key) {
         setKey(body, name, value);
     }
-    body.value.properties.set(name, std::move(value));
+    store(body, at, name, std::move(value));
 }
 
 void fillInstanceTables(ObjectTables& tables) {

@@ -25,6 +25,7 @@
 #include <type_traits>
 #include <vector>
 
+#include "ClassRepository.h"
 #include "Failure.h"
 #include "Value.h"
 #include "cmpidt.h"
@@ -35,7 +36,6 @@ namespace cimom {
 class Broker;
 class Pool;
 class Query;
-struct CimClass;
 struct Reply;
 struct Condition;
 struct SubCondition;
@@ -51,6 +51,7 @@ struct InstanceBody {
     Instance value;
     std::shared_ptr<const NameSet> filter;  ///< what setPropertyFilter lets through; null for all
     const CimClass* cls = nullptr;          ///< null when the class is not known
+    Positions unset = {};  ///< properties of the class that are certainly not among the values
 };
 struct ArrayBody {
     CMPIType elementType = CMPI_null;  ///< CMPI_chars for elements that a provider sees as such

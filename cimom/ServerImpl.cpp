@@ -204,6 +204,9 @@ namespace {
 void refuseUnplaced(const ObjectPath& path);
 
 void refuseUnplaced(const NamedValues& values) {
+    if (values.nesting() == 0) {
+        return;  // as most: there is no path among them
+    }
     for (const auto& each : values) {
         if (each.value.type() == CMPI_ref && !each.value.isNull()) {
             refuseUnplaced(each.value.reference());

@@ -9,6 +9,7 @@
 #include <cstring>
 #include <ctime>
 #include <limits>
+#include <mutex>
 #include <new>
 
 #include "Failure.h"
@@ -131,6 +132,14 @@ std::size_t NameHash::operator()(std::string_view name) const {
         name.remove_prefix(count);
     }
     return static_cast<std::size_t>(hash);
+}
+
+const std::string& lastingName(std::string_view name) {
+    static std::mutex mutex;
+    // never destroyed: values may outlive what is static
+    static auto& names = *new std::unordered_set<std::string>;
+    const std::lock_guard<std::mutex> lock(mutex);
+    return *names.emplace(name).first;
 }
 
 bool containsName(const std::vector<std::string>& names, const std::string& name) {
@@ -424,10 +433,10 @@ void NamedValues::reserve(std::size_t count) {
     }
 }
 
-void NamedValues::set(std::string_view name, Value value) {
+void NamedValues::set(std::string_view name, Value&& value) {
     const std::size_t at = indexOf(name);
     if (at == size()) {
-        return append(name, value);
+        return append(std::move(value), name);
     }
     if (!owns(size())) {
         makeOwn(size());
@@ -436,15 +445,20 @@ void NamedValues::set(std::string_view name, Value value) {
     m_block->entries()[at].value = std::move(value);
 }
 
-void NamedValues::add(std::string_view name, Value value) { append(name, value); }
+void NamedValues::add(std::string_view name, Value&& value) { append(std::move(value), name); }
 
-void NamedValues::append(std::string_view name, Value& value) {
+void NamedValues::addLasting(const std::string& name, Value&& value) {
+    append(std::move(value), Entry::Lasting(), name);
+}
+
+/// @param name  the arguments of the constructor in front of the value
+template <class... Name>
+void NamedValues::append(Value&& value, const Name&... name) {
     if (!owns(size() + 1)) {
         makeOwn(2 * (size() + 1));
     }
     const unsigned nesting = value.nesting();
-    Entry* const entry =
-        new (m_block->entries() + m_block->size) Entry{std::string(name), std::move(value)};
+    Entry* const entry = new (m_block->entries() + m_block->size) Entry(name..., std::move(value));
     ++m_block->size;
     m_block->nesting = std::max(m_block->nesting, nesting);
     if (m_block->index) {

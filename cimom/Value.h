@@ -13,6 +13,7 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <type_traits>
 #include <unordered_map>
 #include <unordered_set>
@@ -39,6 +40,10 @@ struct NameHash {
     std::size_t operator()(std::string_view name) const;
 };
 using NameSet = std::unordered_set<std::string, NameHash, NameEqual>;
+
+/// The text, which lasts as long as the process. For names of which there are few, as the
+/// properties of the classes that have been loaded.
+const std::string& lastingName(std::string_view name);
 
 bool isInteger(CMPIType type);
 bool isReal(CMPIType type);
@@ -169,9 +174,38 @@ private:
 /// of a context.
 class NamedValues {
 public:
-    struct Entry {
-        std::string name;
-        Value value;
+    /// A name and its value, which can be bound as such: const auto& [name, value]. The properties
+    /// of thousands of instances have the same names: they refer to one that lasts.
+    class Entry {
+    public:
+        Entry(std::string_view text, Value&& v)
+            : name(*new std::string(text)), value(std::move(v)), m_ownsName(true) {}
+        Entry(std::string_view text, const Value& v) : Entry(text, Value(v)) {}
+        struct Lasting {};
+        Entry(Lasting, const std::string& lasting, Value&& v)
+            : name(lasting), value(std::move(v)), m_ownsName(false) {}
+        Entry(const Entry& other) : Entry(other, Value(other.value)) {}
+        Entry(Entry&& other) noexcept
+            : name(other.name),
+              value(std::move(other.value)),
+              m_ownsName(std::exchange(other.m_ownsName, false)) {}
+        Entry& operator=(const Entry&) = delete;
+        ~Entry() {
+            if (m_ownsName) {
+                delete &name;
+            }
+        }
+
+        const std::string& name;
+        [[no_unique_address]] Value value;
+
+    private:
+        Entry(const Entry& other, Value&& copy)
+            : name(other.m_ownsName ? *new std::string(other.name) : other.name),
+              value(std::move(copy)),
+              m_ownsName(other.m_ownsName) {}
+
+        bool m_ownsName;  // finds room in what the value leaves free at its end
     };
 
     NamedValues() = default;
@@ -187,10 +221,14 @@ public:
     /// Makes room for so many values in all.
     void reserve(std::size_t count);
     /// Replaces the value of that name, or appends.
-    void set(std::string_view name, Value value);
+    void set(std::string_view name, Value&& value);
+    void set(std::string_view name, const Value& value) { set(name, Value(value)); }
     /// Appends, even to a value of that name: what a client sends may be wrong, and small servers
     /// leave it to the provider to say so. find() and set() know the first.
-    void add(std::string_view name, Value value);
+    void add(std::string_view name, Value&& value);
+    void add(std::string_view name, const Value& value) { add(name, Value(value)); }
+    /// The same with a name that lasts.
+    void addLasting(const std::string& name, Value&& value);
     /// @return null when there is none; valid until the next change
     const Value* find(std::string_view name) const;
 
@@ -220,7 +258,8 @@ private:
     };
     bool owns(std::size_t room) const;
     void makeOwn(std::size_t room);
-    void append(std::string_view name, Value& value);
+    template <class... Name>
+    void append(Value&& value, const Name&... name);
     std::size_t indexOf(std::string_view name) const;
 
     Block* m_block = nullptr;
@@ -252,6 +291,26 @@ struct Instance {
     bool operator==(const Instance& other) const;
 };
 
+template <std::size_t I>
+const auto& get(const NamedValues::Entry& entry) {
+    if constexpr (I == 0) {
+        return entry.name;
+    } else {
+        return entry.value;
+    }
+}
+
 }  // namespace cimom
+
+template <>
+struct std::tuple_size<cimom::NamedValues::Entry> : std::integral_constant<std::size_t, 2> {};
+template <>
+struct std::tuple_element<0, cimom::NamedValues::Entry> {
+    using type = const std::string;
+};
+template <>
+struct std::tuple_element<1, cimom::NamedValues::Entry> {
+    using type = const cimom::Value;
+};
 
 #endif

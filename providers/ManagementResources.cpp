@@ -162,7 +162,7 @@ ManagementService::Answer ManagementService::addResources(const Call& call) cons
     for (std::size_t i = 0; i < resources.size(); ++i) {
         zemRASD& resource = *system.getRASDs().getElementAt(static_cast<int>(i));
         paths.push_back(
-            settingPath(call.path, resources[i].row, resource.getInstanceID(true, &system)));
+            SettingPaths(call.path, resources[i].row)(resource.getInstanceID(true, &system)));
     }
     tellPaths(paths, call.out);
     return Done;
@@ -207,7 +207,7 @@ ManagementService::Answer ManagementService::modifyProfile(const Call& call,
         const Setting setting = {shown->getData()->m_InstanceID, *present.shown, shown->getData()};
         isAsked |= changeResource(
             {SettingUse::ChangeProfile, *one.said, one.row, call.path, setting}, system, *stored);
-        paths.push_back(settingPath(call.path, one.row, one.id.c_str()));
+        paths.push_back(SettingPaths(call.path, one.row)(one.id.c_str()));
     }
     const std::set<int> now = lastingTags(system);
     if (!std::includes(now.begin(), now.end(), tags.begin(), tags.end())) {

@@ -273,17 +273,25 @@ int PoolProvider::getInstance(const CmpiContext& context, const CmpiObjectPath& 
 void PoolProvider::enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
                                      zemDynamicArray<CmpiObjectPath>& out,
                                      const CmpiObjectPath& asked) {
-    read(context, scopeOf(asked), false, [&](const Found& found) {
-        out.addElement(std::make_unique<CmpiObjectPath>(pathOf(path, found)));
-    });
+    read(context, scopeOf(asked), false, namesInto(path, out));
 }
 
 void PoolProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                                  const char** properties, zemDynamicArray<CmpiInstance>& out,
                                  const CmpiObjectPath& asked) {
-    read(context, scopeOf(asked), true, [&](const Found& found) {
-        out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, found)));
-    });
+    read(context, scopeOf(asked), true, instancesInto(path, properties, out));
+}
+
+void PoolProvider::addInstanceNames(const CmpiContext& context, zemCECVisitor& hosts,
+                                    const CmpiObjectPath& path,
+                                    zemDynamicArray<CmpiObjectPath>& out) const {
+    tell(context, hosts, true, false, namesInto(path, out));
+}
+
+void PoolProvider::addInstances(const CmpiContext& context, zemCECVisitor& hosts,
+                                const CmpiObjectPath& path, const char** properties,
+                                zemDynamicArray<CmpiInstance>& out) const {
+    tell(context, hosts, true, true, instancesInto(path, properties, out));
 }
 
 CMPIBoolean PoolProvider::isValidInstanceClass(const char* className) {
@@ -300,19 +308,23 @@ void PoolProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
 void PoolProvider::read(const CmpiContext& context, const std::string& host, bool isFull,
                         const Sink& sink) const {
     const zemString user = getUserContext(context);
-    const zemOperEnv env(user, getExternalLanguageName(context));
     zemVirtualizationManager manager;
-    const std::unique_ptr<zemCECVisitor> hosts(manager.createCECVisitor(env));
-    if (hosts->initialize(user, false, host.c_str(), zemCECVisitor::Level_All) < 0) {
-        return;
+    const std::unique_ptr<zemCECVisitor> hosts(
+        manager.createCECVisitor({user, getExternalLanguageName(context)}));
+    if (hosts->initialize(user, false, host.c_str(), zemCECVisitor::Level_All) >= 0) {
+        tell(context, *hosts, false, isFull, sink);
     }
+}
+
+void PoolProvider::tell(const CmpiContext& context, zemCECVisitor& hosts, bool haveSettings,
+                        bool isFull, const Sink& sink) const {
     const Role& role = roleOf(m_class.role);
     const int mode = isFull ? role.everything : role.names;
-    zemRPVisitor::readHosts(*hosts, m_class.name, mode);
-    for (int i = 0; i < hosts->size(); ++i) {
-        const zemString mtms = hosts->getData(i)->getMTMS();
-        zemRPVisitor pools(hosts->getData(i), m_class.name);
-        pools.setOperEnv(env);
+    zemRPVisitor::readHosts(hosts, m_class.name, mode, haveSettings);
+    for (int i = 0; i < hosts.size(); ++i) {
+        const zemString mtms = hosts.getData(i)->getMTMS();
+        zemRPVisitor pools(hosts.getData(i), m_class.name);
+        pools.setOperEnv(getUserContext(context), getExternalLanguageName(context));
         pools.initialize("", mode);
         for (int j = 0; zemResourcePool* const pool = pools.getData(j); ++j) {
             role.take(*pool, [&](const zemString& name, const Show& show) {
@@ -320,6 +332,20 @@ void PoolProvider::read(const CmpiContext& context, const std::string& host, boo
             });
         }
     }
+}
+
+PoolProvider::Sink PoolProvider::namesInto(const CmpiObjectPath& path,
+                                           zemDynamicArray<CmpiObjectPath>& out) const {
+    return [this, &path, &out](const Found& found) {
+        out.addElement(std::make_unique<CmpiObjectPath>(pathOf(path, found)));
+    };
+}
+
+PoolProvider::Sink PoolProvider::instancesInto(const CmpiObjectPath& path, const char** properties,
+                                               zemDynamicArray<CmpiInstance>& out) const {
+    return [this, &path, properties, &out](const Found& found) {
+        out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, found)));
+    };
 }
 
 std::string PoolProvider::scopeOf(const CmpiObjectPath& asked) const {
@@ -364,16 +390,38 @@ void ResourceSettingProvider::enumInstanceNames(const CmpiContext& context,
                                                 const CmpiObjectPath& path,
                                                 zemDynamicArray<CmpiObjectPath>& out,
                                                 const CmpiObjectPath& asked) {
-    SettingProvider::enumInstanceNames(context, path, out, asked);
-    m_ofPools.enumInstanceNames(context, path, out, asked);
+    if (!isAll(asked)) {
+        SettingProvider::enumInstanceNames(context, path, out, asked);
+        m_ofPools.enumInstanceNames(context, path, out, asked);
+        return;
+    }
+    readAll(context, [&](zemCECVisitor& hosts) {
+        tell(hosts, namesInto(path, out));
+        m_ofPools.addInstanceNames(context, hosts, path, out);
+    });
 }
 
 void ResourceSettingProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                                             const char** properties,
                                             zemDynamicArray<CmpiInstance>& out,
                                             const CmpiObjectPath& asked) {
-    SettingProvider::enumInstances(context, path, properties, out, asked);
-    m_ofPools.enumInstances(context, path, properties, out, asked);
+    if (!isAll(asked)) {
+        SettingProvider::enumInstances(context, path, properties, out, asked);
+        m_ofPools.enumInstances(context, path, properties, out, asked);
+        return;
+    }
+    readAll(context, [&](zemCECVisitor& hosts) {
+        tell(hosts, instancesInto(path, properties, out));
+        m_ofPools.addInstances(context, hosts, path, properties, out);
+    });
+}
+
+template <class Take>
+void ResourceSettingProvider::readAll(const CmpiContext& context, Take take) const {
+    zemVirtualizationManager manager;
+    if (const auto hosts = readForSettings(manager, context, SettingOwner(), {&settingClass()})) {
+        take(*hosts);
+    }
 }
 
 #define ZEM_POOL_PROVIDERS(KIND)                                                   \

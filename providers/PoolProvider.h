@@ -82,6 +82,12 @@ public:
                        const CmpiObjectPath& asked) override;
     CMPIBoolean isValidInstanceClass(const char* className) override;
 
+    /// The same of hosts that have been read for the settings of this kind (readForSettings).
+    void addInstanceNames(const CmpiContext& context, zemCECVisitor& hosts,
+                          const CmpiObjectPath& path, zemDynamicArray<CmpiObjectPath>& out) const;
+    void addInstances(const CmpiContext& context, zemCECVisitor& hosts, const CmpiObjectPath& path,
+                      const char** properties, zemDynamicArray<CmpiInstance>& out) const;
+
 protected:
     void populateEssentialKeys(const char* className, CmpiArray& keys) override;
 
@@ -93,6 +99,12 @@ private:
     /// isFull.
     void read(const CmpiContext& context, const std::string& host, bool isFull,
               const Sink& sink) const;
+    /// The same of hosts of which only hosts have been read, or all that settings need.
+    void tell(const CmpiContext& context, zemCECVisitor& hosts, bool haveSettings, bool isFull,
+              const Sink& sink) const;
+    Sink namesInto(const CmpiObjectPath& path, zemDynamicArray<CmpiObjectPath>& out) const;
+    Sink instancesInto(const CmpiObjectPath& path, const char** properties,
+                       zemDynamicArray<CmpiInstance>& out) const;
     std::string scopeOf(const CmpiObjectPath& asked) const;
     CmpiObjectPath pathOf(const CmpiObjectPath& near, const Found& found) const;
     CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
@@ -101,7 +113,8 @@ private:
     const PoolClass m_class;
 };
 
-/// The setting data of resources: those of partitions, and behind them those of pools.
+/// The setting data of resources: those of partitions, and behind them those of pools, for which an
+/// enumeration of all reads what they have in common once.
 class ResourceSettingProvider : public SettingProvider {
 public:
     ResourceSettingProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
@@ -117,6 +130,10 @@ public:
                        const CmpiObjectPath& asked) override;
 
 private:
+    /// Hands what has been read of all hosts for settings to @p take.
+    template <class Take>
+    void readAll(const CmpiContext& context, Take take) const;
+
     PoolProvider m_ofPools;
 };
 

@@ -103,9 +103,16 @@ std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path) {
 
 std::string settingKeyOf(const CmpiObjectPath& path) { return keyOf(path, kKey); }
 
-CmpiObjectPath settingPath(const CmpiObjectPath& near, const SettingClass& row,
-                           const zemString& id) {
-    CmpiObjectPath path = zemBaseProvider::createObjectPath(near, row.name);
+SettingPaths::SettingPaths(const CmpiObjectPath& near, const SettingClass& row)
+    : m_className(row.name),
+      m_nameSpace(near.getNameSpace().charPtr()),
+      m_host(near.getHostname().charPtr()) {}
+
+CmpiObjectPath SettingPaths::operator()(const zemString& id) const {
+    CmpiObjectPath path(static_cast<const char*>(m_nameSpace), m_className);
+    if (!m_host.isEmpty()) {
+        path.setHostname(static_cast<const char*>(m_host));
+    }
     path.setKey(kKey, CmpiData(static_cast<const char*>(id)));
     return path;
 }
@@ -124,19 +131,18 @@ std::unique_ptr<zemCECVisitor> readPartitions(zemVirtualizationManager& manager,
     return hosts;
 }
 
-void readSettings(const CmpiContext& context, const SettingOwner& whose,
-                  const std::vector<const SettingClass*>& classes, const SystemSink& sink) {
-    zemVirtualizationManager manager;
-    const std::unique_ptr<zemCECVisitor> hosts = readPartitions(manager, context, whose);
+std::unique_ptr<zemCECVisitor> readForSettings(zemVirtualizationManager& manager,
+                                               const CmpiContext& context,
+                                               const SettingOwner& whose,
+                                               const std::vector<const SettingClass*>& classes) {
+    std::unique_ptr<zemCECVisitor> hosts = readPartitions(manager, context, whose);
     if (hosts == nullptr) {
-        return;
+        return nullptr;
     }
     const zemString user = zemBaseProvider::getUserContext(context);
     constexpr int kLevel = zemCECVisitor::Level_All;
     hosts->initializeLparProfile(user, whose.partition.c_str(), kLevel);
-    int type = 0;
     for (const SettingClass* row : classes) {
-        type |= row->type;
         if (row->ofHosts != nullptr) {
             (*hosts.*row->ofHosts)(user, kLevel);
         }
@@ -144,8 +150,17 @@ void readSettings(const CmpiContext& context, const SettingOwner& whose,
             (*hosts.*row->ofPartitions)(user, whose.partition.c_str(), kLevel);
         }
     }
-    for (int i = 0; i < hosts->size(); ++i) {
-        zemCEC& host = *hosts->getData(i);
+    return hosts;
+}
+
+void makeSettings(zemCECVisitor& hosts, const std::vector<const SettingClass*>& classes,
+                  const SystemSink& sink) {
+    int type = 0;
+    for (const SettingClass* row : classes) {
+        type |= row->type;
+    }
+    for (int i = 0; i < hosts.size(); ++i) {
+        zemCEC& host = *hosts.getData(i);
         zemVSSDVisitor systems(&host, classes.front()->name);
         for (int j = 0; j < host.getLPARs().size(); ++j) {
             zemLPAR& lpar = *host.getLPARs().getElementAt(j);
@@ -169,6 +184,14 @@ void readSettings(const CmpiContext& context, const SettingOwner& whose,
     }
 }
 
+void readSettings(const CmpiContext& context, const SettingOwner& whose,
+                  const std::vector<const SettingClass*>& classes, const SystemSink& sink) {
+    zemVirtualizationManager manager;
+    if (const auto hosts = readForSettings(manager, context, whose, classes)) {
+        makeSettings(*hosts, classes, sink);
+    }
+}
+
 SettingProvider::SettingProvider(const CmpiBroker& mb, const CmpiContext& ctx, const char* name)
     : CmpiBaseMI(mb, ctx),
       zemBaseZemInstanceProvider(mb, ctx, name),
@@ -186,7 +209,7 @@ int SettingProvider::getInstance(const CmpiContext& context, const CmpiObjectPat
         read(context, parts->owner, [&](const Setting& setting) {
             if (!isFound && setting.id == id.c_str()) {
                 isFound = true;
-                out = makeInstance(path, properties, setting);
+                out = makeInstance(SettingPaths(path, m_class), properties, setting);
             }
         });
     } catch (const zemException& e) {
@@ -200,17 +223,13 @@ int SettingProvider::getInstance(const CmpiContext& context, const CmpiObjectPat
 void SettingProvider::enumInstanceNames(const CmpiContext& context, const CmpiObjectPath& path,
                                         zemDynamicArray<CmpiObjectPath>& out,
                                         const CmpiObjectPath& asked) {
-    read(context, scopeOf(asked), [&](const Setting& setting) {
-        out.addElement(std::make_unique<CmpiObjectPath>(settingPath(path, m_class, setting.id)));
-    });
+    read(context, scopeOf(asked), namesInto(path, out));
 }
 
 void SettingProvider::enumInstances(const CmpiContext& context, const CmpiObjectPath& path,
                                     const char** properties, zemDynamicArray<CmpiInstance>& out,
                                     const CmpiObjectPath& asked) {
-    read(context, scopeOf(asked), [&](const Setting& setting) {
-        out.addElement(std::make_unique<CmpiInstance>(makeInstance(path, properties, setting)));
-    });
+    read(context, scopeOf(asked), instancesInto(path, properties, out));
 }
 
 CMPIBoolean SettingProvider::isValidInstanceClass(const char* className) {
@@ -221,33 +240,55 @@ void SettingProvider::populateEssentialKeys(const char*, CmpiArray& keys) {
     zemBaseProvider::setText(keys, 0, kKey);
 }
 
-void SettingProvider::read(const CmpiContext& context, const SettingOwner& whose,
-                           const Sink& sink) const {
-    readSettings(context, whose, {&m_class},
-                 [&](zemCEC&, std::unique_ptr<zemVSSD> system) { tell(*system, sink); });
+SettingProvider::Sink SettingProvider::namesInto(const CmpiObjectPath& path,
+                                                 zemDynamicArray<CmpiObjectPath>& out) const {
+    return [paths = SettingPaths(path, m_class), &out](const Setting& setting) {
+        out.addElement(std::make_unique<CmpiObjectPath>(paths(setting.id)));
+    };
 }
 
-void SettingProvider::tell(zemVSSD& system, const Sink& sink) const {
-    if (m_class.resourceType == 0) {
-        sink({system.getInstanceID(), system, nullptr});
-        return;
+SettingProvider::Sink SettingProvider::instancesInto(const CmpiObjectPath& path,
+                                                     const char** properties,
+                                                     zemDynamicArray<CmpiInstance>& out) const {
+    return [this, paths = SettingPaths(path, m_class), properties, &out](const Setting& setting) {
+        out.addElement(std::make_unique<CmpiInstance>(makeInstance(paths, properties, setting)));
+    };
+}
+
+void SettingProvider::tell(zemCECVisitor& hosts, const Sink& sink) const {
+    makeSettings(hosts, {&m_class}, [&](zemCEC&, const std::unique_ptr<zemVSSD>& system) {
+        if (m_class.resourceType == 0) {
+            sink({system->getInstanceID(), *system, nullptr});
+        }
+        for (int i = 0; i < system->getRASDs().size(); ++i) {
+            const zemRASDCommData& data = *system->getRASDs()[i]->getData();
+            if (data.m_ResourceType == m_class.resourceType) {
+                sink({data.m_InstanceID, *system, &data});
+            }
+        }
+    });
+}
+
+void SettingProvider::read(const CmpiContext& context, const SettingOwner& whose,
+                           const Sink& sink) const {
+    zemVirtualizationManager manager;
+    if (const auto hosts = readForSettings(manager, context, whose, {&m_class})) {
+        tell(*hosts, sink);
     }
-    const zemDynamicArray<zemRASD> resources = system.getRASD(m_class.resourceType);
-    for (int i = 0; i < resources.size(); ++i) {
-        const zemRASDCommData* const data = resources[i]->getData();
-        sink({data->m_InstanceID, system, data});
-    }
+}
+
+bool SettingProvider::isAll(const CmpiObjectPath& asked) const {
+    return asked.getClassName().equalsIgnoreCase(m_class.name);
 }
 
 SettingOwner SettingProvider::scopeOf(const CmpiObjectPath& asked) const {
-    const bool isOwn = asked.getClassName().equalsIgnoreCase(m_class.name);
-    return isOwn ? SettingOwner() : settingOwnerOf(asked).value_or(SettingOwner());
+    return isAll(asked) ? SettingOwner() : settingOwnerOf(asked).value_or(SettingOwner());
 }
 
-CmpiInstance SettingProvider::makeInstance(const CmpiObjectPath& near, const char** properties,
+CmpiInstance SettingProvider::makeInstance(const SettingPaths& paths, const char** properties,
                                            const Setting& setting) const {
     const Keys keys = {{kKey, CmpiData(static_cast<const char*>(setting.id))}};
-    CmpiInstance instance = newInstance(settingPath(near, m_class, setting.id), keys, properties);
+    CmpiInstance instance = newInstance(paths(setting.id), keys, properties);
     showSetting(instance, m_class, properties, setting);
     return instance;
 }

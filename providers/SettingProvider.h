@@ -47,9 +47,17 @@ std::optional<SettingId> settingIdOf(const SettingClass& row, const std::string&
 /// The InstanceID that is the key of a path; empty without it.
 std::string settingKeyOf(const CmpiObjectPath& path);
 
-/// The path of settings, in the namespace of @p near.
-CmpiObjectPath settingPath(const CmpiObjectPath& near, const SettingClass& row,
-                           const zemString& id);
+/// Makes paths of settings of a class, in the namespace of another path, of which the server is
+/// asked once for all of them.
+class SettingPaths {
+public:
+    SettingPaths(const CmpiObjectPath& near, const SettingClass& row);
+    CmpiObjectPath operator()(const zemString& id) const;
+
+private:
+    const char* m_className;
+    zemString m_nameSpace, m_host;
+};
 
 /// The partition that an object is, or whose settings it is.
 std::optional<SettingOwner> settingOwnerOf(const CmpiObjectPath& path);
@@ -61,11 +69,23 @@ std::unique_ptr<zemCECVisitor> readPartitions(zemVirtualizationManager& manager,
                                               const CmpiContext& context,
                                               const SettingOwner& whose);
 
+/// The same with profiles and all that the settings of @p classes are made of.
+std::unique_ptr<zemCECVisitor> readForSettings(zemVirtualizationManager& manager,
+                                               const CmpiContext& context,
+                                               const SettingOwner& whose,
+                                               const std::vector<const SettingClass*>& classes);
+
 /// Receives the settings of a system with its RASDs; the host lives as long as the call.
 using SystemSink = std::function<void(zemCEC& host, std::unique_ptr<zemVSSD> system)>;
 
-/// Hands the settings of @p whose to @p sink, those of a partition's state in front of those of its
-/// profiles, with the resources of @p classes, of which there is one at least.
+/// Hands the settings of all partitions that have been read for them to @p sink, those of a
+/// partition's state in front of those of its profiles, with the resources of @p classes, of which
+/// there is one at least.
+/// @throws what zemVSSDVisitor throws
+void makeSettings(zemCECVisitor& hosts, const std::vector<const SettingClass*>& classes,
+                  const SystemSink& sink);
+
+/// Reads the settings of @p whose for this, and hands them to @p sink.
 /// @throws what zemCECVisitor and zemVSSDVisitor throw
 void readSettings(const CmpiContext& context, const SettingOwner& whose,
                   const std::vector<const SettingClass*>& classes, const SystemSink& sink);
@@ -93,16 +113,28 @@ public:
     CMPIBoolean isValidInstanceClass(const char* className) override;
 
 protected:
-    void populateEssentialKeys(const char* className, CmpiArray& keys) override;
-
-private:
     using Sink = std::function<void(const Setting& setting)>;
 
+    void populateEssentialKeys(const char* className, CmpiArray& keys) override;
+
+    /// Whether all settings are asked for, not those that could belong to @p asked.
+    bool isAll(const CmpiObjectPath& asked) const;
+    const SettingClass& settingClass() const { return m_class; }
+
+    /// What makes of settings that it is handed the paths and the instances of an enumeration,
+    /// whose arguments outlive it.
+    Sink namesInto(const CmpiObjectPath& path, zemDynamicArray<CmpiObjectPath>& out) const;
+    Sink instancesInto(const CmpiObjectPath& path, const char** properties,
+                       zemDynamicArray<CmpiInstance>& out) const;
+
+    /// Hands the settings of hosts that have been read for them to @p sink.
+    void tell(zemCECVisitor& hosts, const Sink& sink) const;
+
+private:
     /// Hands the settings of @p whose to @p sink, those of a partition's state first.
     void read(const CmpiContext& context, const SettingOwner& whose, const Sink& sink) const;
-    void tell(zemVSSD& system, const Sink& sink) const;
     SettingOwner scopeOf(const CmpiObjectPath& asked) const;
-    CmpiInstance makeInstance(const CmpiObjectPath& near, const char** properties,
+    CmpiInstance makeInstance(const SettingPaths& paths, const char** properties,
                               const Setting& setting) const;
 
     const SettingClass& m_class;

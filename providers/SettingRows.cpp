@@ -261,10 +261,7 @@ bool takeQuantity(const CmpiData& value, const SettingTarget& target) {
            takeAmount<datum, numberIn<CMPIUint64>>(value, target);
 }
 
-bool showKey(const Setting& setting, CmpiData& value) {
-    value = CmpiData(CmpiString(setting.resource->getKey()));
-    return true;
-}
+bool showKey(const Setting& setting, CmpiData& value) { return setText(setting.key, value); }
 
 bool showType(const Setting& setting, CmpiData& value) {
     value = CmpiData(static_cast<CMPIUint16>(setting.resource->m_ResourceType));

@@ -21,6 +21,7 @@ struct Setting {
     const zemString& id;
     const zemVSSD& system;
     const zemRASDCommData* resource;  ///< null: the system itself
+    const zemString key = resource == nullptr ? zemString() : resource->getKey();  ///< its name
 };
 
 /// What a client does with the settings that it sends.

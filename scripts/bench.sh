@@ -108,13 +108,13 @@ COUNTERS = [
     ("GetAllLpars/1000", "resident_MB", 100),
     ("QyallocSplit/1000/manual_time", "ours_percent", 10),
     ("Initialize/1000/iterations:1/repeats:1/manual_time", "ours_percent", 10),
-    ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 40),
+    ("Settings/1000/iterations:1/repeats:1/manual_time", "ours_percent", 38),
     ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "model_percent", 22),
-    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "broker_percent", 15),
+    ("SettingsSplit/1000/iterations:1/repeats:1/manual_time", "broker_percent", 12),
     ("EventDelay/iterations:30/manual_time", "median_ms", 25),
     ("IndicationDelay/iterations:30/manual_time", "median_ms", 25),
     ("JournalDelay/iterations:30/manual_time", "median_ms", 25),
-    ("Settings/10000/iterations:1/repeats:1/manual_time", "resident_KB", 8),
+    ("Settings/10000/iterations:1/repeats:1/manual_time", "resident_KB", 5),
 ]
 TO_MS = {"ns": 1e-6, "us": 1e-3, "ms": 1.0, "s": 1e3}
 

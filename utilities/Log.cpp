@@ -1,5 +1,7 @@
 #include "Log.h"
 
+#include <stdio_ext.h>
+
 #include <cstdio>
 #include <cstring>
 
@@ -58,5 +60,11 @@ void zemLogLines::add(std::initializer_list<const char*> words, const char* text
 }
 
 zemLogLines::~zemLogLines() {
-    writeLines([this] { put(m_lines.data(), m_lines.size()); });
+    const OutputHold hold;
+    const bool isRoom = __fbufsize(stdout) > __fpending(stdout) + m_lines.size();
+    if (isRoom && __flbf(stdout) == 0) {
+        put(m_lines.data(), m_lines.size());
+    } else {
+        writeLines([this] { put(m_lines.data(), m_lines.size()); });
+    }
 }

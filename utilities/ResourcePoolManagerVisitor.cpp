@@ -36,6 +36,12 @@ void partitions(zemCECVisitor& hosts) {
     }
 }
 
+void poolProcessors(zemCECVisitor& hosts) {
+    if (!isThere(hosts, [](zemCEC& host) { return host.getPoolProcessor().getMTMS().length(); })) {
+        hosts.initializeProcessorLevelPool("", zemCECVisitor::Level_All);
+    }
+}
+
 void processorPools(zemCECVisitor& hosts) {
     if (!isThere(hosts, [](zemCEC& host) { return host.getProcessorPool().size(); })) {
         hosts.initializeProcessorPool("", zemCECVisitor::Level_All);
@@ -44,31 +50,25 @@ void processorPools(zemCECVisitor& hosts) {
 
 using V = zemCECVisitor;
 
-/// What is read for names, and for quantities besides, in the order of
-/// zemResourcePool::getIndexFromClassName().
+/// What is read in the order of zemResourcePool::getIndexFromClassName(): for names, of hosts and
+/// of their pools, and for quantities besides, of pools and of partitions. The settings of
+/// partitions are made of the first and the last of these, too.
 constexpr struct {
-    Step names[2];
-    Step quantities[3];
+    Step host, pools, poolQuantities, partition;
 } kSteps[zemPoolRowCount] = {
-    {{ofHosts<&V::initializeProcessorLevelSys>, processorPools},
-     {ofHosts<&V::initializeProcessorLevelPool>, partitions,
-      ofPartitions<&V::initializeProcessorLevelLpar>}},
-    {{ofHosts<&V::initializeMemoryLevelSys>, ofHosts<&V::initializeMemoryPool>},
-     {partitions, ofPartitions<&V::initializeMemoryLevelLpar>}},
-    {{},
-     {partitions, ofPartitions<&V::initializeIOSlotLevelLpar>,
-      ofHosts<&V::initializeIOSlotLevelSys>}},
-    {{}, {partitions, ofPartitions<&V::initializeEthernetAdapterLevelLpar>}},
-    {{}, {partitions, ofPartitions<&V::initializeSerialAdapterLevelLpar>}},
-    {{}, {partitions, ofPartitions<&V::initializeSCSIAdapterLevelLpar>}},
+    {ofHosts<&V::initializeProcessorLevelSys>, processorPools, poolProcessors,
+     ofPartitions<&V::initializeProcessorLevelLpar>},
+    {ofHosts<&V::initializeMemoryLevelSys>, ofHosts<&V::initializeMemoryPool>, nullptr,
+     ofPartitions<&V::initializeMemoryLevelLpar>},
+    {nullptr, nullptr, nullptr, ofPartitions<&V::initializeIOSlotLevelLpar>},
+    {nullptr, nullptr, nullptr, ofPartitions<&V::initializeEthernetAdapterLevelLpar>},
+    {nullptr, nullptr, nullptr, ofPartitions<&V::initializeSerialAdapterLevelLpar>},
+    {nullptr, nullptr, nullptr, ofPartitions<&V::initializeSCSIAdapterLevelLpar>},
 };
 
-template <std::size_t N>
-void run(const Step (&steps)[N], zemCECVisitor& hosts) {
-    for (const Step step : steps) {
-        if (step != nullptr) {
-            step(hosts);
-        }
+void run(bool isWanted, Step step, zemCECVisitor& hosts) {
+    if (isWanted && step != nullptr) {
+        step(hosts);
     }
 }
 
@@ -100,15 +100,18 @@ zemResourcePool* zemHierarchyPoolVistor::getData(int index) const {
     return nullptr;
 }
 
-void zemRPVisitor::readHosts(zemCECVisitor& hosts, const zemString& className, int mode) {
+void zemRPVisitor::readHosts(zemCECVisitor& hosts, const zemString& className, int mode,
+                             bool haveSettings) {
     const int row = zemResourcePool::getIndexFromClassName(className, true);
     if (row == -1) {
         return;
     }
-    run(kSteps[row].names, hosts);
-    if (zemResourcePool::isQuantified(mode)) {
-        run(kSteps[row].quantities, hosts);
-    }
+    const bool isQuantified = zemResourcePool::isQuantified(mode);
+    run(!haveSettings, kSteps[row].host, hosts);
+    run(true, kSteps[row].pools, hosts);
+    run(isQuantified, kSteps[row].poolQuantities, hosts);
+    run(isQuantified, partitions, hosts);
+    run(isQuantified && !haveSettings, kSteps[row].partition, hosts);
 }
 
 int zemRPVisitor::initialize(const zemString& className, int level) {

@@ -1,7 +1,7 @@
 /// zemRPVisitor: makes the pools of one host, and walks them.
 ///
 /// Pools are made from a host that has been read already. readHosts() lets all hosts of a manager
-/// be read for the pools of one class, with at most five calls of the management library however
+/// be read for the pools of one class, with at most four calls of the management library however
 /// many hosts, pools and partitions there are:
 ///
 ///     zemVirtualizationManager manager;
@@ -55,19 +55,22 @@ public:
     void setOperEnv(const zemString& user, const zemString& locale) { m_Env = {user, locale}; }
 
     /// Hangs on the hosts of @p hosts what their pools are made of. Once for a class after the
-    /// hosts have been read: slots and adapters add up. Partitions and shared pools of processors
-    /// that hang there already are not read again.
+    /// hosts have been read: slots and adapters add up. Partitions and what shared pools of
+    /// processors are made of, where that hangs there already, are not read again.
     ///
     ///     kind       calls for keys   where pools tell everything
-    ///     processor  2                5
+    ///     processor  2                4
     ///     memory     2                4
-    ///     slot       0                3
+    ///     slot       0                2
     ///     adapter    0                2
     ///
     /// @param className  as for initialize(); for another class nothing is read
     /// @param mode  as for zemResourcePool::initialize()
+    /// @param haveSettings  partitions hang there, and what hosts and all partitions have of this
+    ///        kind, as the settings of partitions need it: none of that is read again
     /// @throws what the operations of zemCECVisitor throw
-    static void readHosts(zemCECVisitor& hosts, const zemString& className, int mode);
+    static void readHosts(zemCECVisitor& hosts, const zemString& className, int mode,
+                          bool haveSettings = false);
 
     /// Makes the pools of the host, of which those before are dropped, whatever their kind.
     /// @param className  class of pools or of what is around them, in any case of letters; empty:

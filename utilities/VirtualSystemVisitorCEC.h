@@ -110,7 +110,8 @@ public:
                                int type);
 
     /// Of partitions, in addition to what hangs there: profiles, slots, adapters; in place of it:
-    /// processors, memory.
+    /// processors, memory. Where the slots of whole hosts are read, these tell how many they have,
+    /// free ones too.
     int initializeLparProfile(const zemString& userName, const zemString& lparid, int level);
     int initializeLparProfile(const zemString& userName, const zemString& lparid, int* mask);
     int initializeProcessorLevelLpar(const zemString& userName, const zemString& lparid, int level);
@@ -129,7 +130,6 @@ public:
     int initializeProcessorPool(const zemString& userName, int level);
     int initializeMemoryLevelSys(const zemString& userName, int level);
     int initializeMemoryPool(const zemString& userName, int level);
-    int initializeIOSlotLevelSys(const zemString& userName, int level);
 
     /// Whether partitions can be suspended and restarted elsewhere. The tool's answers do not name
     /// hosts: it is asked twice for each host that has partitions.
@@ -181,11 +181,6 @@ public:
     zemDynamicArray<zemPartitionIOSlotResource> getAllIOSlotLevelLparByKeys(
         const zemString& userName, int level, const zemString& mtms, const zemString& lparid) const;
 
-    /// A record for each slot of a host, free ones too, that tells no more than whose it is.
-    zemDynamicArray<zemHardwareResource> getAllIOSlotLevelSysByKeys(const zemString& userName,
-                                                                    int level,
-                                                                    const zemString& mtms) const;
-
     zemDynamicArray<zemSystemProcessorResource> getAllProcessorLevelSysByKeys(
         const zemString& userName, int level, const zemString& mtms) const;
     zemDynamicArray<zemPoolProcessorResource> getAllProcessorLevelPoolByKeys(
@@ -236,6 +231,10 @@ private:
     const zemString& actor(const zemString& userName) const {
         return userName.isEmpty() ? m_Env.m_userName : userName;
     }
+    /// Slots of partitions and, with an empty number and nothing else told, free ones.
+    zemDynamicArray<zemPartitionIOSlotResource> slots(const zemString& userName, int level,
+                                                      const zemString& mtms,
+                                                      const zemString& lparid) const;
     zemRecordSetsType partitionsInformation(int* wanted, const zemString& userName,
                                             const zemString& mtms, const zemString& lparid) const;
 

@@ -35,12 +35,18 @@ void set(Record& record, const zemApiProp& object, const char* key) {
     (record.*setter)(object.getProperty(key));
 }
 
-/// How processors are shared follows from the mode, from donating, and from the row's own property.
-template <auto setter, class Record>
-void sharing(Record& record, const zemApiProp& object, const char* mode, const char* donor,
-             const char* key) {
-    (record.*setter)(object.getProperty(mode), object.getProperty(donor), object.getProperty(key));
+template <class Record>
+void fill(Record& record, const zemApiProp& object, const Field<Record>* fields,
+          std::size_t count) {
+    for (std::size_t i = 0; i < count; ++i) {
+        fields[i].set(record, object, fields[i].key);
+    }
 }
+
+constexpr Field<PoolProcessor> kPoolProcessor[] = {
+    {"ConfigurableProcUnits", set<&PoolProcessor::setConfigurablePoolProcUnits>},
+    {"PendAvailProcUnits", set<&PoolProcessor::setPendAvailPoolProcUnits>},
+};
 
 constexpr Field<zemCEC> kHost[] = {
     {"Name", set<&zemCEC::setMTMS>},
@@ -52,13 +58,22 @@ constexpr Field<zemCEC> kHost[] = {
      [](zemCEC& host, const zemApiProp& object, const char* key) {
          host.setCapability(object.getProperty(key), object.getProperty("RuntimeCapability"));
      }},
+    // of the processors that a host's shared pools are made of
+    {"ConfigurableProcUnits",
+     [](zemCEC& host, const zemApiProp& object, const char* /*key*/) {
+         PoolProcessor pools(host.getMTMS());
+         fill(pools, object, kPoolProcessor, std::size(kPoolProcessor));
+         host.setPoolProcessor(pools);
+     }},
 };
 
-/// The first row is all that is read below Level_All.
+/// All that is read below Level_All.
+constexpr Field<Lpar> kLparState[] = {{"PartitionState", set<&Lpar::setStatePlus>}};
+
 constexpr Field<Lpar> kLpar[] = {
-    {"PartitionState", set<&Lpar::setStatePlus>},
     {"UserDefinedName", set<&Lpar::setLparName>},
     {"DefinitionState", set<&Lpar::setVirtualSystemType>},
+    {"PartitionState", set<&Lpar::setStatePlus>},
     {"BootMode", set<&Lpar::setBootMode>},
     {"MigrationState",
      [](Lpar& lpar, const zemApiProp& object, const char* key) {
@@ -82,11 +97,13 @@ constexpr Field<Profile> kProfile[] = {
     {"MaxVirtualSlots", set<&Profile::setMaxVirtualSlots>},
     {"BootMode", set<&Profile::setBootMode>},
     {"RedundantPath", set<&Profile::setRedundantErrPathReporting>},
-    {"ProcMode", set<&Profile::setProcMode>},
-    {"ProcessorMode", set<&Profile::setLparProcCompatMode>},
-    {"SharingMode",
+    {"ProcMode",
      [](Profile& profile, const zemApiProp& object, const char* key) {
-         sharing<&Profile::setSharingMode>(profile, object, "ProcMode", "DonorMode", key);
+         const zemString mode = object.getProperty(key);
+         profile.setProcMode(mode);
+         profile.setLparProcCompatMode(object.getProperty("ProcessorMode"));
+         const zemString sharing = object.getProperty("SharingMode");
+         profile.setSharingMode(mode, object.getProperty("DonorMode"), sharing);
      }},
     {"UncappedWeight", set<&Profile::setUncapWeight>},
     {"MinProcUnit", set<&Profile::setMinProcsUnits>},
@@ -113,36 +130,46 @@ constexpr Field<Profile> kProfile[] = {
     {"io_slots", set<&Profile::setIoSlots>},
 };
 
-/// The mode stands twice, and behind it the pending one: both setters of modes fill one field, in
-/// which the pending mode stays.
+/// Processors in effect, or of the pending change: the mode fills two fields, and says what the
+/// codes of sharing mean, which the library tells behind what is given out.
+template <auto setMode, auto setPool, auto setProcs, auto setUnits, auto setSharing>
+void setShares(Processor& record, const zemApiProp& object, const char* const (&keys)[5]) {
+    const zemString mode = object.getProperty(keys[0]);
+    (record.*setMode)(mode);
+    (record.*setPool)(mode);
+    (record.*setProcs)(object.getProperty(keys[1]));
+    (record.*setUnits)(object.getProperty(keys[2]));
+    const zemString donor = object.getProperty(keys[3]);
+    (record.*setSharing)(mode, donor, object.getProperty(keys[4]));
+}
+
+/// Both setters of modes fill one field, in which the pending mode stays.
 constexpr Field<Processor> kProcessor[] = {
     {"UserDefinedName", set<&Processor::setLparName>},
     {"CurMaxProcs", set<&Processor::setCurrMaxProcs>},
     {"CurMaxProcUnits", set<&Processor::setCurrMaxProcUnits>},
     {"CurMinProcs", set<&Processor::setCurrMinProcs>},
     {"CurMinProcUnits", set<&Processor::setCurrMinProcUnits>},
-    {"CurProcMode", set<&Processor::setCurrProcMode>},
-    {"CurProcMode", set<&Processor::setCurrSharedProcPoolId>},
-    {"CurAllocProcs", set<&Processor::setCurrProcs>},
-    {"CurAllocProcUnits", set<&Processor::setCurrProcUnits>},
-    {"CurSharingMode",
+    {"CurProcMode",
      [](Processor& record, const zemApiProp& object, const char* key) {
-         sharing<&Processor::setCurrSharingMode>(record, object, "CurProcMode", "CurDonorMode",
-                                                 key);
+         setShares<&Processor::setCurrProcMode, &Processor::setCurrSharedProcPoolId,
+                   &Processor::setCurrProcs, &Processor::setCurrProcUnits,
+                   &Processor::setCurrSharingMode>(
+             record, object,
+             {key, "CurAllocProcs", "CurAllocProcUnits", "CurDonorMode", "CurSharingMode"});
      }},
     {"CurUncappedWeight", set<&Processor::setCurrUncapWeight>},
     {"PendMaxProcs", set<&Processor::setPendMaxProcs>},
     {"PendMaxProcUnits", set<&Processor::setPendMaxProcUnits>},
     {"PendMinProcs", set<&Processor::setPendMinProcs>},
     {"PendMinProcUnits", set<&Processor::setPendMinProcUnits>},
-    {"PendProcMode", set<&Processor::setPendProcMode>},
-    {"PendProcMode", set<&Processor::setPendSharedProcPoolId>},
-    {"PendAllocProcs", set<&Processor::setPendProcs>},
-    {"PendAllocProcUnits", set<&Processor::setPendProcUnits>},
-    {"PendSharingMode",
+    {"PendProcMode",
      [](Processor& record, const zemApiProp& object, const char* key) {
-         sharing<&Processor::setPendSharingMode>(record, object, "PendProcMode", "PendDonorMode",
-                                                 key);
+         setShares<&Processor::setPendProcMode, &Processor::setPendSharedProcPoolId,
+                   &Processor::setPendProcs, &Processor::setPendProcUnits,
+                   &Processor::setPendSharingMode>(
+             record, object,
+             {key, "PendAllocProcs", "PendAllocProcUnits", "PendDonorMode", "PendSharingMode"});
      }},
     {"PendUncappedWeight", set<&Processor::setPendUncapWeight>},
     {"RuntimeProcs", set<&Processor::setRunProcs>},
@@ -233,11 +260,6 @@ constexpr Field<SysProcessor> kSysProcessor[] = {
     {"PendAvailProcUnits", set<&SysProcessor::setPendAvailSysProcUnits>},
 };
 
-constexpr Field<PoolProcessor> kPoolProcessor[] = {
-    {"ConfigurableProcUnits", set<&PoolProcessor::setConfigurablePoolProcUnits>},
-    {"PendAvailProcUnits", set<&PoolProcessor::setPendAvailPoolProcUnits>},
-};
-
 constexpr Field<ProcessorPool> kProcessorPool[] = {
     {"SharedProcPoolId", set<&ProcessorPool::setSharedProcPoolId>},
     {"MaxPoolCapacity", set<&ProcessorPool::setMaxPoolCapacity>},
@@ -260,10 +282,6 @@ constexpr Field<MemoryPool> kMemoryPool[] = {
     {"pend_pool_mem", set<&MemoryPool::setPendPoolMem>},
     {"SystemName", [](MemoryPool& pool, const zemApiProp& object,
                       const char* key) { pool.setSupport(!object.getProperty(key).isEmpty()); }},
-};
-
-constexpr Field<zemHardwareResource> kAnySlot[] = {
-    {"SystemName", set<&zemHardwareResource::setMTMS>},
 };
 
 /// The library's operations that give a collection: of all hosts, of one, and of one partition.
@@ -320,21 +338,16 @@ std::unique_ptr<Lpar> recordOf(const zemApiProp& object, const char* key) {
 
 template <>
 std::unique_ptr<Slot> recordOf(const zemApiProp& object, const char* key) {
-    const zemString lparid = object.getProperty("lpar_id");
     const zemString mtms = object.getProperty(key);
-    if (lparid.isEmpty() || mtms.isEmpty()) {
-        return nullptr;
-    }
-    return std::make_unique<Slot>(mtms, lparid);
+    return mtms.isEmpty() ? nullptr : std::make_unique<Slot>(mtms, object.getProperty("lpar_id"));
 }
 
+/// Of a slot that is free, nobody asks what it is.
 template <class Record>
-void fill(Record& record, const zemApiProp& object, const Field<Record>* fields,
-          std::size_t count) {
-    for (std::size_t i = 0; i < count; ++i) {
-        fields[i].set(record, object, fields[i].key);
-    }
+bool isFilled(const Record& /*record*/) {
+    return true;
 }
+bool isFilled(const Slot& slot) { return !slot.getLparID().isEmpty(); }
 
 /// The records of a collection, filled from the first @p count rows of @p fields.
 template <class Record>
@@ -347,10 +360,13 @@ zemDynamicArray<Record> recordsOf(const char* operation, const Calls& calls, con
     for (apiProp& each : objects) {
         const zemApiProp object(&each);
         std::unique_ptr<Record> record = recordOf<Record>(object, key);
-        if (record != nullptr) {
-            fill(*record, object, fields, count);
-            records.addElement(std::move(record));
+        if (record == nullptr) {
+            continue;
         }
+        if (isFilled(*record)) {
+            fill(*record, object, fields, count);
+        }
+        records.addElement(std::move(record));
     }
     return records;
 }
@@ -361,8 +377,10 @@ zemDynamicArray<zemLPAR> zemCECVisitor::getAllPartitionObjectsByKeys(
     const zemString& userName, int level, const zemString& mtms, const zemString& lparid) const {
     constexpr Calls calls = {&zemApiCaller::getAllLpars, &zemApiCaller::getAllLparsFromCec,
                              &zemApiCaller::getLparObj};
-    return recordsOf("getAllPartitionObjectsByKeys", calls, "Name", kLpar,
-                     level < Level_All ? 1 : std::size(kLpar), {actor(userName), mtms, lparid});
+    const bool isAll = level >= Level_All;
+    return recordsOf("getAllPartitionObjectsByKeys", calls, "Name", isAll ? kLpar : kLparState,
+                     isAll ? std::size(kLpar) : std::size(kLparState),
+                     {actor(userName), mtms, lparid});
 }
 
 zemDynamicArray<zemLPAR> zemCECVisitor::getAllPartitionObjectsByKeys(
@@ -405,9 +423,6 @@ OF_PARTITIONS(getAllProcessorLevelLparByKeys, Processor,
 OF_PARTITIONS(getAllMemoryLevelLparByKeys, Memory,
               getAllLparMemoryCfgs, getAllLparMemoryCfg, getLparMemoryCfg,
               "Name", kMemory)
-OF_PARTITIONS(getAllIOSlotLevelLparByKeys, Slot,
-              getAllIoSlots, getIoSlots, getLparIoSlots,
-              "SystemName", kSlot)
 OF_PARTITIONS(getAllSerialAdapterLevelLparByKeys, Serial,
               getAllLparVirtualSerial, getVirtualSerial, getLparVirtualSerial,
               "Name", kSerial)
@@ -429,12 +444,31 @@ OF_HOSTS(getAllMemoryLevelSysByKeys, SysMemory,
          getAllCecMemoryCfg, getCecMemoryCfg, "Name", kSysMemory)
 OF_HOSTS(getAllMemoryPoolByKeys, MemoryPool,
          getAllCecMemoryPoolCfgs, getCecMemoryPoolCfg, "SystemName", kMemoryPool)
-OF_HOSTS(getAllIOSlotLevelSysByKeys, zemHardwareResource,
-         getAllIoSlots, getIoSlots, "SystemName", kAnySlot)
 // clang-format on
 
 #undef OF_PARTITIONS
 #undef OF_HOSTS
+
+zemDynamicArray<Slot> zemCECVisitor::slots(const zemString& userName, int /*level*/,
+                                           const zemString& mtms, const zemString& lparid) const {
+    constexpr Calls calls = {&zemApiCaller::getAllIoSlots, &zemApiCaller::getIoSlots,
+                             &zemApiCaller::getLparIoSlots};
+    return recordsOf("getAllIOSlotLevelLparByKeys", calls, "SystemName", kSlot, std::size(kSlot),
+                     {actor(userName), mtms, lparid});
+}
+
+zemDynamicArray<Slot> zemCECVisitor::getAllIOSlotLevelLparByKeys(const zemString& userName,
+                                                                 int level, const zemString& mtms,
+                                                                 const zemString& lparid) const {
+    zemDynamicArray<Slot> all = slots(userName, level, mtms, lparid);
+    zemDynamicArray<Slot> owned;
+    for (int i = 0; i < all.size(); ++i) {
+        if (isFilled(*all.getElementAt(i))) {
+            owned.addElement(std::unique_ptr<Slot>(std::exchange(all[i], nullptr)));
+        }
+    }
+    return owned;
+}
 
 void zemReadProfile(apiProp& object, zemPartitionProfileConfiguration& profile) {
     fill(profile, zemApiProp(&object), kProfile, std::size(kProfile));

@@ -124,18 +124,35 @@ void hangAll(zemDynamicArray<Record> records, zemCECVisitor& visitor, Store stor
     }
 }
 
-template <class Owner, class Read, class Store>
-int hang(const Hanging& hanging, Read read, Store store) {
+/// The records of what is visited; none without hosts, and then nothing is asked for.
+template <class Read>
+auto recordsOf(const Hanging& hanging, Read read) {
     tellBegin(hanging.operation);
     const int hosts = hanging.visitor->size();
-    if (hosts == 0) {
-        return 0;
-    }
     const bool isSingle = hosts == 1;
     const zemString mtms = isSingle ? hanging.visitor->getData(0)->getMTMS() : zemString();
     const zemString lparid = isSingle ? hanging.lparid : zemString();
-    hangAll<Owner>(recordsOf(hanging, read, mtms, lparid), *hanging.visitor, store);
+    using Records = decltype(recordsOf(hanging, read, mtms, lparid));
+    return hosts == 0 ? Records() : recordsOf(hanging, read, mtms, lparid);
+}
+
+template <class Owner, class Read, class Store>
+int hang(const Hanging& hanging, Read read, Store store) {
+    hangAll<Owner>(recordsOf(hanging, read), *hanging.visitor, store);
     return 0;
+}
+
+/// Tells hosts how many slots they have.
+void countSlots(zemCECVisitor& visitor, const zemDynamicArray<zemPartitionIOSlotResource>& slots) {
+    for (int i = 0; i < visitor.size(); ++i) {
+        visitor.getData(i)->setIOSlotCount(0);
+    }
+    Owners owners(visitor);
+    for (int i = 0; i < slots.size(); ++i) {
+        if (zemCEC* const host = owners.of<zemCEC>(*slots.getElementAt(i))) {
+            host->setIOSlotCount(host->getIOSlotCount() + 1);
+        }
+    }
 }
 
 void addPartition(zemCEC& host, zemLPAR* lpar) {
@@ -205,7 +222,6 @@ int zemCECVisitor::initializeLparProfile(const zemString& userName, const zemStr
 // clang-format off
 ON_PARTITIONS(initializeProcessorLevelLpar, getAllProcessorLevelLparByKeys, setLparProcessor)
 ON_PARTITIONS(initializeMemoryLevelLpar, getAllMemoryLevelLparByKeys, setLparMemory)
-ON_PARTITIONS(initializeIOSlotLevelLpar, getAllIOSlotLevelLparByKeys, addLparIOSlot)
 ON_PARTITIONS(initializeSerialAdapterLevelLpar, getAllSerialAdapterLevelLparByKeys, addLparSerialAdapter)
 ON_PARTITIONS(initializeSCSIAdapterLevelLpar, getAllSCSIAdapterLevelLparByKeys, addLparSCSIAdapter)
 ON_PARTITIONS(initializeEthernetAdapterLevelLpar, getAllEthernetAdapterLevelLparByKeys, addLparEthernetAdapter)
@@ -220,15 +236,15 @@ ON_HOSTS(initializeMemoryPool, getAllMemoryPoolByKeys, setMemoryPool)
 #undef ON_PARTITIONS
 #undef ON_HOSTS
 
-int zemCECVisitor::initializeIOSlotLevelSys(const zemString& userName, int level) {
-    for (int i = 0; i < size(); ++i) {
-        getData(i)->setIOSlotCount(0);
+int zemCECVisitor::initializeIOSlotLevelLpar(const zemString& userName, const zemString& lparid,
+                                             int level) {
+    zemDynamicArray<zemPartitionIOSlotResource> all = recordsOf(
+        Hanging{"initializeIOSlotLevelLpar", this, userName, lparid, level}, &zemCECVisitor::slots);
+    if (lparid.isEmpty() || size() > 1) {
+        countSlots(*this, all);
     }
-    return hang<zemCEC>({"initializeIOSlotLevelSys", this, userName, zemString(), level},
-                        &zemCECVisitor::getAllIOSlotLevelSysByKeys,
-                        [](zemCEC& host, const zemHardwareResource& /*slot*/) {
-                            host.setIOSlotCount(host.getIOSlotCount() + 1);
-                        });
+    hangAll<zemLPAR>(std::move(all), *this, &zemLPAR::addLparIOSlot);
+    return 0;
 }
 
 int zemCECVisitor::initializeLparSuspendRR(const zemString& userName, const zemString& lparid,

@@ -228,28 +228,28 @@ TEST_P(SettingProvidersTest, NamesOfNothingAreNotFound) {
 // behind those, of the pools of the same kind.
 TEST_P(SettingProvidersTest, CollectionsAreAskedForOnceWhateverTheNumberOfPartitions) {
     const struct {
-        std::string all, one;           // of partitions
+        std::string all, behind, one;   // of partitions, and what the pools behind them need more
         std::string pools, quantities;  // of pools: what is read for names, and what besides
         std::string pool, ofOne;        // of those of one host
     } rows[] = {
         // as the classes
         {},
-        {"getAllCecProcessorCfg getAllLparProcessorCfgs ",
+        {"getAllCecProcessorCfg getAllLparProcessorCfgs ", "getAllCecProcessorPoolCfg ",
          "getCecProcessorCfg getLparProcessorCfg ",
-         "getAllCecProcessorCfg getAllCecProcessorPoolCfg ",
-         "getAllCecs getAllLpars getAllLparProcessorCfgs ",
+         "getAllCecProcessorCfg getAllCecProcessorPoolCfg ", "getAllLpars getAllLparProcessorCfgs ",
          "getCecProcessorCfg getCecProcessorPoolCfg ",
-         "getCecObj getAllLparsFromCec getAllLparProcessorCfg "},
-        {"getAllCecMemoryCfg getAllLparMemoryCfgs ", "getCecMemoryCfg getLparMemoryCfg ",
-         "getAllCecMemoryCfg getAllCecMemoryPoolCfgs ", "getAllLpars getAllLparMemoryCfgs ",
-         "getCecMemoryCfg getCecMemoryPoolCfg ", "getAllLparsFromCec getAllLparMemoryCfg "},
-        {"getAllIoSlots ", "getLparIoSlots ", "", "getAllLpars getAllIoSlots getAllIoSlots ", "",
-         "getAllLparsFromCec getIoSlots getIoSlots "},
-        {"getAllLparVirtualEthernet ", "getLparVirtualEthernet ", "",
+         "getAllLparsFromCec getAllLparProcessorCfg "},
+        {"getAllCecMemoryCfg getAllLparMemoryCfgs ", "getAllCecMemoryPoolCfgs ",
+         "getCecMemoryCfg getLparMemoryCfg ", "getAllCecMemoryCfg getAllCecMemoryPoolCfgs ",
+         "getAllLpars getAllLparMemoryCfgs ", "getCecMemoryCfg getCecMemoryPoolCfg ",
+         "getAllLparsFromCec getAllLparMemoryCfg "},
+        {"getAllIoSlots ", "", "getLparIoSlots ", "", "getAllLpars getAllIoSlots ", "",
+         "getAllLparsFromCec getIoSlots "},
+        {"getAllLparVirtualEthernet ", "", "getLparVirtualEthernet ", "",
          "getAllLpars getAllLparVirtualEthernet ", "", "getAllLparsFromCec getVirtualEthernet "},
-        {"getAllLparVirtualScsi ", "getLparVirtualScsi ", "", "getAllLpars getAllLparVirtualScsi ",
-         "", "getAllLparsFromCec getVirtualScsi "},
-        {"getAllLparVirtualSerial ", "getLparVirtualSerial ", "",
+        {"getAllLparVirtualScsi ", "", "getLparVirtualScsi ", "",
+         "getAllLpars getAllLparVirtualScsi ", "", "getAllLparsFromCec getVirtualScsi "},
+        {"getAllLparVirtualSerial ", "", "getLparVirtualSerial ", "",
          "getAllLpars getAllLparVirtualSerial ", "", "getAllLparsFromCec getVirtualSerial "},
     };
     const auto calls = [] {
@@ -267,7 +267,7 @@ TEST_P(SettingProvidersTest, CollectionsAreAskedForOnceWhateverTheNumberOfPartit
             const auto& row = rows[i];
             const std::string ofPools = i == 0 ? "" : "getAllCecs " + row.pools + row.quantities;
             std::vector<Instance> found = some(kClasses[i], "ORX:2*", "");
-            EXPECT_EQ(calls(), "getAllCecs getAllLpars getAllLparProfiles " + row.all + ofPools);
+            EXPECT_EQ(calls(), "getAllCecs getAllLpars getAllLparProfiles " + row.all + row.behind);
             m_server->getInstance(m_request, found.back().path);
             EXPECT_EQ(calls(), "getCecObj getLparObj getAllLparProfilesFromLpar " + row.one);
             for (std::size_t role = 0; i > 0 && role < 4; ++role) {

@@ -126,7 +126,6 @@ const Reader kReaders[] = {
     {READER(getAllProcessorPoolByKeys, zemProcessorPoolResource, OfHosts), {"getAllCecProcessorPoolCfg", "getCecProcessorPoolCfg"}, "1", ON_HOSTS(initializeProcessorPool, getProcessorPool)},
     {READER(getAllMemoryLevelSysByKeys, zemSystemMemoryResource, OfHosts), {"getAllCecMemoryCfg", "getCecMemoryCfg"}, "1", ON_HOSTS(initializeMemoryLevelSys, getMemoy)},
     {READER(getAllMemoryPoolByKeys, zemMemoryPoolResource, OfHosts), {"getAllCecMemoryPoolCfgs", "getCecMemoryPoolCfg"}, "1", ON_HOSTS(initializeMemoryPool, getMemoyPool)},
-    {READER(getAllIOSlotLevelSysByKeys, zemHardwareResource, OfHosts), {"getAllIoSlots", "getIoSlots"}, "1", [](Visitor& v) { return v.initializeIOSlotLevelSys("u", Visitor::Level_All); }, [](zemCEC& host) { return host.getIOSlotCount(); }},
 };
 // clang-format on
 

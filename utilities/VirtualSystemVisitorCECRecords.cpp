@@ -243,7 +243,7 @@ int zemCECVisitor::initializeIOSlotLevelLpar(const zemString& userName, const ze
     if (lparid.isEmpty() || size() > 1) {
         countSlots(*this, all);
     }
-    hangAll<zemLPAR>(std::move(all), *this, &zemLPAR::addLparIOSlot);
+    hangAll<zemLPAR>(all, *this, &zemLPAR::addLparIOSlot);
     return 0;
 }
 

@@ -378,7 +378,7 @@ bool Value::operator==(const Value& other) const {
 
 // -- NamedValues, ObjectPath, Instance ------------------------------------------------------
 
-NamedValues::NamedValues(std::initializer_list<Entry> entries) {
+NamedValues::NamedValues(std::initializer_list<Entry> entries) : NamedValues() {
     for (const Entry& entry : entries) {
         set(entry.name, entry.value);
     }
